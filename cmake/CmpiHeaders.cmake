@@ -1,0 +1,15 @@
+# CMPI headers: the system's where it has them, else those of include/cmpi.
+find_path(KORVA_CMPI_INCLUDE_DIR NAMES cmpi/cmpidt.h DOC "Folder that holds cmpi/cmpidt.h")
+if(NOT KORVA_CMPI_INCLUDE_DIR)
+    set(KORVA_CMPI_INCLUDE_DIR "${PROJECT_SOURCE_DIR}/include" CACHE PATH "" FORCE)
+endif()
+message(STATUS "CMPI headers: ${KORVA_CMPI_INCLUDE_DIR}/cmpi")
+
+add_library(korva_cmpi INTERFACE)
+add_library(korva::cmpi ALIAS korva_cmpi)
+if(KORVA_CMPI_INCLUDE_DIR STREQUAL "${PROJECT_SOURCE_DIR}/include")
+    target_include_directories(korva_cmpi INTERFACE "${KORVA_CMPI_INCLUDE_DIR}")
+else()
+    target_include_directories(korva_cmpi SYSTEM INTERFACE "${KORVA_CMPI_INCLUDE_DIR}")
+endif()
+target_compile_definitions(korva_cmpi INTERFACE CMPI_PLATFORM_LINUX_GENERIC_GNU)

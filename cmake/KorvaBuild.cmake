@@ -1,0 +1,64 @@
+# How every target of the tree is compiled: language level, warnings, hardening, word size, sanitizers.
+
+set(CMAKE_CXX_STANDARD 17)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+set(CMAKE_POSITION_INDEPENDENT_CODE ON)
+set(CMAKE_CXX_VISIBILITY_PRESET hidden)
+set(CMAKE_VISIBILITY_INLINES_HIDDEN ON)
+set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
+
+set(CMAKE_LIBRARY_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/lib")
+set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/lib/static")
+set(CMAKE_RUNTIME_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/bin")
+
+set(KORVA_WORD_SIZE "64" CACHE STRING "Word size of everything that is built: 32 or 64")
+set(KORVA_SANITIZE "" CACHE STRING "Value for -fsanitize=, empty for none")
+option(KORVA_WERROR "Treat warnings as errors" OFF)
+
+include(CheckPIESupported)
+check_pie_supported()
+
+# Everything carries these: they change the binary interface or the whole program.
+if(KORVA_WORD_SIZE STREQUAL "32")
+    add_compile_options(-m32)
+    add_link_options(-m32)
+endif()
+add_compile_definitions(_FILE_OFFSET_BITS=64 _TIME_BITS=64)
+if(KORVA_SANITIZE)
+    add_compile_options(-fsanitize=${KORVA_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer)
+    add_link_options(-fsanitize=${KORVA_SANITIZE})
+else()
+    add_compile_definitions($<$<NOT:$<CONFIG:Debug>>:_FORTIFY_SOURCE=2>)
+endif()
+if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+    # A unique symbol would pin a library in the process after dlclose.
+    add_compile_options($<$<COMPILE_LANGUAGE:CXX>:-fno-gnu-unique>)
+endif()
+add_compile_options(-fstack-protector-strong)
+add_link_options(-Wl,-z,relro -Wl,-z,now -Wl,-z,noexecstack)
+
+# Options for the project's own code; a test framework built from source goes without.
+add_library(korva_options INTERFACE)
+add_library(korva::options ALIAS korva_options)
+target_compile_options(korva_options INTERFACE
+    -Wall -Wextra -Wpedantic -Wshadow -Wconversion
+    $<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor -Woverloaded-virtual>
+    $<$<BOOL:${KORVA_WERROR}>:-Werror>)
+target_include_directories(korva_options INTERFACE "${PROJECT_SOURCE_DIR}/include")
+
+# Shared libraries find their neighbours beside themselves, programs in ../lib.
+function(korva_shared_library target)
+    set_target_properties(${target} PROPERTIES
+        VERSION 1.0.0 SOVERSION 1 BUILD_RPATH_USE_ORIGIN ON
+        BUILD_WITH_INSTALL_RPATH ON INSTALL_RPATH "$ORIGIN")
+    if(NOT KORVA_SANITIZE)
+        target_link_options(${target} PRIVATE -Wl,--no-undefined)
+    endif()
+endfunction()
+
+# A symbol list decides what a library exports: anything else stays inside.
+function(korva_export_only target map)
+    target_link_options(${target} PRIVATE "-Wl,--version-script=${map}")
+    set_property(TARGET ${target} APPEND PROPERTY LINK_DEPENDS "${map}")
+endfunction()
