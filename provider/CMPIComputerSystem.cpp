@@ -1,0 +1,93 @@
+#include "CMPIComputerSystem.h"
+
+#include <utility>
+
+#include "ProviderException.h"
+#include "UnitLog.h"
+
+namespace VA::OSStatusProvider {
+
+static const std::string loggerCMPIOSComputerSystem("Zumbrel.OperatingSystemProvider");
+static constexpr UnitLog records("CMPIComputerSystem.cpp", loggerCMPIOSComputerSystem);
+
+namespace {
+
+bool hasNext(const CMPIEnumeration* enumeration) {
+    return enumeration->ft->hasNext(enumeration, nullptr) != 0;
+}
+
+// The next instance of the enumeration; false when the broker reports a failure.
+bool fetch(const CMPIEnumeration* enumeration, CMPIInstance*& instance) {
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    const CMPIData data = enumeration->ft->getNext(enumeration, &status);
+    if (status.rc != CMPI_RC_OK) return false;
+    instance = data.value.inst;
+    return true;
+}
+
+}  // namespace
+
+CMPIOSComputerSystem::CMPIOSComputerSystem(const CMPIBroker* _broker, const CMPIContext* _context,
+                                           std::string _nameSpace)
+    : broker(_broker), context(_context), nameSpace(std::move(_nameSpace)) {
+    records.method();
+}
+
+CMPIOSComputerSystem::~CMPIOSComputerSystem() {
+    records.method();
+}
+
+void CMPIOSComputerSystem::setObjectPath(const CMPIObjectPath* objectPath) {
+    const std::string parameters = parameterList(" objectPath=", objectPath);
+    records.entering(parameters);
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    // Without a path there is nothing to ask for; a broker might not survive the question.
+    if (objectPath != nullptr)
+        enumeration =
+            broker->bft->enumerateInstances(broker, context, objectPath, nullptr, &status);
+    if (status.rc != CMPI_RC_OK || enumeration == nullptr || !hasNext(enumeration) ||
+        !fetch(enumeration, instance))
+        throw VA::ProviderException("Could not obtain an instance of Computer System");
+    firstPending = true;
+    records.exiting(parameters);
+}
+
+CMPIObjectPath* CMPIOSComputerSystem::getObjectPath() {
+    records.entering();
+    CMPIObjectPath* path = nullptr;
+    if (instance != nullptr) {
+        CMPIStatus status = {CMPI_RC_OK, nullptr};
+        path = instance->ft->getObjectPath(instance, &status);
+        if (status.rc != CMPI_RC_OK) path = nullptr;
+    }
+    records.exiting();
+    return path;
+}
+
+CMPIInstance* CMPIOSComputerSystem::getCMPIInstance(const char**) {
+    records.method();
+    return instance;
+}
+
+CMPIOSComputerSystem::operator bool() {
+    records.entering();
+    bool current = false;
+    if (firstPending) {
+        firstPending = false;
+        current = true;
+    } else if (enumeration != nullptr) {
+        current = hasNext(enumeration);
+    }
+    records.exiting();
+    return current;
+}
+
+CMPIOSComputerSystem& CMPIOSComputerSystem::operator++() {
+    records.entering();
+    instance = nullptr;
+    if (enumeration != nullptr) fetch(enumeration, instance);
+    records.exiting();
+    return *this;
+}
+
+}  // namespace VA::OSStatusProvider

@@ -1,0 +1,191 @@
+#include "CMPIElementCapabilities.h"
+
+#include "ClassIds.h"
+#include "FarEnd.h"
+#include "InstrumentationException.h"
+#include "ProviderUtilities.h"
+#include "UnitLog.h"
+
+namespace VA::OSStatusProvider {
+
+using Utilities = VA::ProviderUtilities;
+
+static const std::string loggerCMPIOSElementCapabilities("Zumbrel.OperatingSystemProvider");
+static constexpr UnitLog records("CMPIElementCapabilities.cpp", loggerCMPIOSElementCapabilities);
+
+CMPIOSElementCapabilities::CMPIOSElementCapabilities(const CMPIBroker* _broker,
+                                                     const CMPIContext* _context,
+                                                     const CMPIObjectPath* objectPath)
+    : broker(_broker),
+      context(_context),
+      nameSpace(Utilities::getNamespace(objectPath)),
+      capabilities(broker, context, nameSpace),
+      operatingSystem(broker, context, nameSpace) {
+    const std::string parameters = parameterList(broker, context, objectPath);
+    records.entering(parameters);
+    requestedClassId = Utilities::getClassId(objectPath);
+    records.variable("requestedClassId", requestedClassId);
+    switch (requestedClassId) {
+        case operatingSystemCapabilitiesId:
+            operatingSystem.setObjectPath(locateOperatingSystem(objectPath));
+            break;
+        case elementCapabilitiesId:
+            if (!setObjectPath(objectPath)) throw VA::InstrumentationException("Object Not Found.");
+            break;
+        case operatingSystemId:
+            capabilities.setObjectPath(locateCapabilities(objectPath));
+            break;
+        default:
+            break;
+    }
+    records.exiting(parameters);
+}
+
+CMPIOSElementCapabilities::~CMPIOSElementCapabilities() {
+    records.method();
+}
+
+bool CMPIOSElementCapabilities::setObjectPath(const CMPIObjectPath* objectPath) {
+    const std::string parameters = parameterList(" objectPath=", objectPath);
+    records.entering(parameters);
+    if (Utilities::getKeyCount(objectPath) == 0) {
+        if (!operatingSystem) return false;
+        pairWithCurrentOperatingSystem();
+    } else {
+        singleInstance = true;
+        if (!setKeyedObjectPath(objectPath)) return false;
+    }
+    records.exiting(parameters);
+    return true;
+}
+
+// Both ends must belong together: the operating system's "Name" is what the capabilities' end maps
+// to, letter for letter.
+bool CMPIOSElementCapabilities::setKeyedObjectPath(const CMPIObjectPath* objectPath) {
+    const CMPIObjectPath* end = nullptr;
+    if (!Utilities::getKeyProperty(objectPath, "Capabilities", &end)) return false;
+    capabilities.setObjectPath(end);
+    const CMPIObjectPath* expected = locateOperatingSystem(end);
+    if (!Utilities::getKeyProperty(objectPath, "ManagedElement", &end)) return false;
+    std::string name;
+    std::string expectedName;
+    if (!Utilities::getKeyProperty(end, "Name", name) ||
+        !Utilities::getKeyProperty(expected, "Name", expectedName) || name != expectedName)
+        return false;
+    operatingSystem.setObjectPath(end);
+    return true;
+}
+
+void CMPIOSElementCapabilities::pairWithCurrentOperatingSystem() {
+    capabilities.setObjectPath(locateCapabilities(operatingSystem.getObjectPath()));
+}
+
+CMPIObjectPath* CMPIOSElementCapabilities::getObjectPath() {
+    records.entering();
+    CMPIObjectPath* path =
+        Utilities::createObjectPath(broker, "KORVA_OSElementCapabilities", nameSpace);
+    if (path != nullptr) {
+        Utilities::setKeyProperty(path, "ManagedElement", operatingSystem.getObjectPath());
+        Utilities::setKeyProperty(path, "Capabilities", capabilities.getObjectPath());
+    }
+    records.exiting();
+    return path;
+}
+
+CMPIInstance* CMPIOSElementCapabilities::getCMPIInstance(const char** properties) {
+    const std::string parameters = parameterList(" properties=", properties);
+    records.entering(parameters);
+    CMPIObjectPath* path = getObjectPath();
+    CMPIInstance* instance = Utilities::createInstance(broker, path);
+    if (instance == nullptr) return nullptr;
+    setReference(path, instance, "ManagedElement");
+    setReference(path, instance, "Capabilities");
+    records.exiting(parameters);
+    return instance;
+}
+
+CMPIObjectPath* CMPIOSElementCapabilities::getAssociatorNames() {
+    records.entering();
+    CMPIObjectPath* path = nullptr;
+    if (requestedClassId == operatingSystemId) path = capabilities.getObjectPath();
+    if (requestedClassId == operatingSystemCapabilitiesId) path = operatingSystem.getObjectPath();
+    records.exiting();
+    return path;
+}
+
+CMPIInstance* CMPIOSElementCapabilities::getAssociator(const char** properties) {
+    records.entering(parameterList(" properties=", properties));
+    if (requestedClassId == operatingSystemId) return capabilities.getCMPIInstance(properties);
+    if (requestedClassId == operatingSystemCapabilitiesId)
+        return operatingSystem.getCMPIInstance(properties);
+    return nullptr;
+}
+
+CMPIObjectPath* CMPIOSElementCapabilities::locateCapabilities(const CMPIObjectPath* objectPath) {
+    const std::string parameters = parameterList(" objectPath=", objectPath);
+    records.entering(parameters);
+    CMPIObjectPath* path = locate(objectPath, "KORVA_OperatingSystemCapabilities",
+                                  &OSElementCapabilities::getOSCapabilitiesMoniker);
+    records.exiting(parameters);
+    return path;
+}
+
+CMPIObjectPath* CMPIOSElementCapabilities::locateOperatingSystem(const CMPIObjectPath* objectPath) {
+    const std::string parameters = parameterList(" objectPath=", objectPath);
+    records.entering(parameters);
+    CMPIObjectPath* path = locate(objectPath, "KORVA_OperatingSystem",
+                                  &OSElementCapabilities::getOperatingSystemMoniker);
+    records.exiting(parameters);
+    return path;
+}
+
+CMPIObjectPath* CMPIOSElementCapabilities::locate(
+    const CMPIObjectPath* objectPath, const char* className,
+    VA::Moniker (OSElementCapabilities::*map)(VA::Moniker&)) {
+    CMPIObjectPath* path = Utilities::createObjectPath(broker, className, nameSpace);
+    if (Utilities::getKeyCount(objectPath) != 0)
+        mapKeys(objectPath, elementCapabilities, map, path);
+    return path;
+}
+
+CMPIOSElementCapabilities::operator bool() {
+    records.entering();
+    return hasCurrent;
+}
+
+CMPIOSElementCapabilities& CMPIOSElementCapabilities::operator++() {
+    records.entering();
+    switch (requestedClassId) {
+        case operatingSystemCapabilitiesId:
+            ++operatingSystem;
+            hasCurrent = operatingSystem;
+            break;
+        case operatingSystemId:
+            ++capabilities;
+            hasCurrent = capabilities;
+            break;
+        case elementCapabilitiesId:
+            if (singleInstance)
+                hasCurrent = false;
+            else
+                advancePair();
+            break;
+        default:
+            break;
+    }
+    records.exiting();
+    return *this;
+}
+
+// Capabilities inner, operating systems outer. The inner walk does not start again for the next
+// operating system, since the capabilities apply no key: the walk ends when both are spent.
+void CMPIOSElementCapabilities::advancePair() {
+    ++capabilities;
+    if (!capabilities) {
+        ++operatingSystem;
+        if (operatingSystem) pairWithCurrentOperatingSystem();
+    }
+    hasCurrent = operatingSystem || capabilities;
+}
+
+}  // namespace VA::OSStatusProvider

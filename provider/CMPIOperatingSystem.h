@@ -1,0 +1,36 @@
+#ifndef OSSTATUS_CMPI_OPERATING_SYSTEM_H
+#define OSSTATUS_CMPI_OPERATING_SYSTEM_H
+
+#include "ElementAdapter.h"
+#include "Linux/OperatingSystem.h"
+
+namespace VA::OSStatusProvider {
+
+class UnitLog;
+
+/// What is KORVA_OperatingSystem's own: four keys, 43 properties, and the keys "CSName" and "Name"
+/// as filters. The creation class names of a path are not looked at.
+struct OperatingSystemDesign {
+    using Element = OperatingSystem;
+
+    static constexpr const char* className = "KORVA_OperatingSystem";
+    static constexpr const char* constructor = "CMPIOperatingSystem";
+    static constexpr const char* destructor = "~CMPIOperatingSystem";
+    static constexpr KeyFilter<Element> filters[] = {
+        {"CSName", "CSName", OperatingSystem::CSNameFilter},
+        {"Name", "Name", OperatingSystem::NameFilter},
+    };
+
+    static const UnitLog& records();
+    static void setKeys(Element& element, CMPIObjectPath* path);
+    static void setProperties(Element& element, const CMPIBroker* broker, CMPIInstance* instance);
+};
+
+/// Serves KORVA_OperatingSystem.
+using CMPIOperatingSystem = ElementAdapter<OperatingSystemDesign>;
+
+extern template class ElementAdapter<OperatingSystemDesign>;
+
+}  // namespace VA::OSStatusProvider
+
+#endif

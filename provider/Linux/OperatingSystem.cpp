@@ -1,0 +1,220 @@
+#include "OperatingSystem.h"
+
+#include <strings.h>
+
+#include <cstdio>
+#include <cstring>
+#include <ctime>
+#include <utility>
+
+#include "FilteredWalk.h"
+#include "NodeStatus.h"
+#include "UnitLog.h"
+
+namespace VA::OSStatusProvider {
+
+using namespace VA::NodeLexicon;
+
+static const std::string loggerOperatingSystem("Zumbrel.OperatingSystemProvider");
+static constexpr UnitLog records("Linux/OperatingSystem.cpp", loggerOperatingSystem);
+
+OperatingSystem::OperatingSystem() {
+    instrumentation.selectNode(OperatingSystemNode);
+}
+
+OperatingSystem::operator bool() {
+    records.method();
+    return instrumentation;
+}
+
+OperatingSystem& OperatingSystem::operator++() {
+    records.entering();
+    advanceToNext(instrumentation, filterSet, [this] { return passesFilters(); });
+    records.exiting();
+    return *this;
+}
+
+void OperatingSystem::setFilter(FilterType type, std::string value) {
+    filterSet = true;
+    filters.push_back({type, std::move(value)});
+    while (instrumentation && !passesFilters()) ++instrumentation;
+}
+
+bool OperatingSystem::passesFilters() {
+    std::string scratch;
+    for (const Filter& filter : filters) {
+        bool known = true;
+        switch (filter.type) {
+            case CSNameFilter:
+                known = getCSName(scratch);
+                break;
+            case NameFilter:
+                known = getName(scratch);
+                break;
+            default:
+                continue;
+        }
+        if (!known || strcasecmp(filter.value.c_str(), scratch.c_str()) != 0) return false;
+    }
+    return true;
+}
+
+bool OperatingSystem::getInstallDate(std::string& value) {
+    return getDateTime(InstallDate, value);
+}
+
+bool OperatingSystem::getOperationalStatus(std::vector<unsigned short>& value) {
+    const NodeStatus& status = meaningOf(instrumentation.getNodeStatus());
+    value.insert(value.end(), status.operationalStatus,
+                 status.operationalStatus + status.operationalStatusCount);
+    return true;
+}
+
+bool OperatingSystem::getHealthState(unsigned short& value) {
+    value = meaningOf(instrumentation.getNodeStatus()).healthState;
+    return true;
+}
+
+bool OperatingSystem::getStatus(std::string& value) {
+    value = "OK";
+    return true;
+}
+
+bool OperatingSystem::getEnabledState(unsigned short& value) {
+    value = meaningOf(instrumentation.getNodeStatus()).enabledState;
+    return true;
+}
+
+bool OperatingSystem::getCSCreationClassName(std::string& value) {
+    value = "KORVA_ComputerSystem";
+    return true;
+}
+
+bool OperatingSystem::getCSName(std::string& value) {
+    return instrumentation.getComputerName(value);
+}
+
+bool OperatingSystem::getCreationClassName(std::string& value) {
+    value = "KORVA_OperatingSystem";
+    return true;
+}
+
+bool OperatingSystem::getName(std::string& value) {
+    return instrumentation.getProperty(Name, value);
+}
+
+bool OperatingSystem::getOSType(unsigned short& value) {
+    unsigned int raw = 0;
+    if (!instrumentation.getProperty(OSType, raw)) return false;
+    // The CIM value map is ahead of the framework's numbers by one, from 65 on by two, and names
+    // nothing above 68.
+    if (raw == 0)
+        value = 0;  // Unknown
+    else if (raw <= 64)
+        value = static_cast<unsigned short>(raw + 1);
+    else if (raw <= 68)
+        value = static_cast<unsigned short>(raw + 2);
+    else
+        value = 1;  // Other
+    return true;
+}
+
+bool OperatingSystem::getVersion(std::string& value) {
+    return instrumentation.getProperty(Version, value);
+}
+
+bool OperatingSystem::getLastBootUpTime(std::string& value) {
+    return getDateTime(LastBootUpTime, value);
+}
+
+bool OperatingSystem::getNumberOfLicensedUsers(unsigned int& value) {
+    return instrumentation.getProperty(NumberOfLicensedUsers, value);
+}
+
+bool OperatingSystem::getNumberOfUsers(unsigned int& value) {
+    return instrumentation.getProperty(NumberOfUsers, value);
+}
+
+bool OperatingSystem::getNumberOfProcesses(unsigned int& value) {
+    return instrumentation.getProperty(NumberOfProcesses, value);
+}
+
+bool OperatingSystem::getMaxNumberOfProcesses(unsigned int& value) {
+    return instrumentation.getProperty(MaxNumberOfProcesses, value);
+}
+
+bool OperatingSystem::getTotalSwapSpaceSize(unsigned long long& value) {
+    return getSize(TotalSwapSpaceSize, value);
+}
+
+bool OperatingSystem::getTotalVirtualMemorySize(unsigned long long& value) {
+    return getSize(TotalVirtualMemorySize, value);
+}
+
+bool OperatingSystem::getFreeVirtualMemory(unsigned long long& value) {
+    return getSize(FreeVirtualMemory, value);
+}
+
+bool OperatingSystem::getFreePhysicalMemory(unsigned long long& value) {
+    return getSize(FreePhysicalMemory, value);
+}
+
+bool OperatingSystem::getTotalVisibleMemorySize(unsigned long long& value) {
+    return getSize(TotalVisibleMemorySize, value);
+}
+
+bool OperatingSystem::getSizeStoredInPagingFiles(unsigned long long& value) {
+    return getSize(SizeStoredInPagingFiles, value);
+}
+
+bool OperatingSystem::getFreeSpaceInPagingFiles(unsigned long long& value) {
+    return getSize(FreeSpaceInPagingFiles, value);
+}
+
+bool OperatingSystem::getMaxProcessMemorySize(unsigned long long& value) {
+    return getSize(MaxProcessMemorySize, value);
+}
+
+bool OperatingSystem::isDistributed(bool& value) {
+    return instrumentation.getProperty(Distributed, value);
+}
+
+bool OperatingSystem::getSize(Properties id, unsigned long long& value) {
+    unsigned int kilobytes = 0;
+    const bool known = instrumentation.getProperty(id, kilobytes);
+    value = kilobytes;
+    return known;
+}
+
+bool OperatingSystem::getDateTime(Properties id, std::string& value) {
+    if (!instrumentation.getProperty(id, value)) return false;
+    // The zone as libc holds it, without initialising it. The sign is '+' west of UTC, against the
+    // CIM convention: clients of this class know it so.
+    const bool east = timezone < 0;
+    const long offset = (east ? -timezone : timezone) / 60;
+
+    // Fields that the text does not reach stay 0. A separator is any one character but white space.
+    unsigned int year = 0, month = 0, day = 0, hour = 0, minute = 0, second = 0;
+    char separator = 0;
+    std::sscanf(value.c_str(), "%4u %1c %2u %1c %2u %1c %2u %1c %2u %1c %2u", &year, &separator,
+                &month, &separator, &day, &separator, &hour, &separator, &minute, &separator,
+                &second);
+
+    std::memset(dateTimeBuffer, 0, sizeof dateTimeBuffer);
+    const int printed = std::snprintf(
+        dateTimeBuffer, sizeof dateTimeBuffer, "%4u%02u%02u%02u%02u%02u.%06u%1c%03u", year, month,
+        day, hour, minute, second, 0U, east ? '-' : '+', static_cast<unsigned int>(offset));
+    if (printed == 0) return false;
+    value = dateTimeBuffer;
+    return true;
+}
+
+bool executeReboot() {
+    return false;
+}
+
+bool executeShutdown() {
+    return false;
+}
+
+}  // namespace VA::OSStatusProvider

@@ -1,0 +1,59 @@
+#include "OperatingSystemCapabilities.h"
+
+#include <strings.h>
+
+#include "FilteredWalk.h"
+#include "UnitLog.h"
+
+namespace VA::OSStatusProvider {
+
+static const std::string loggerOperatingSystemCapabilities("Zumbrel.OperatingSystemProvider");
+static constexpr UnitLog records("Linux/OperatingSystemCapabilities.cpp",
+                                 loggerOperatingSystemCapabilities);
+
+OperatingSystemCapabilities::OperatingSystemCapabilities() {
+    instrumentation.selectNode(NodeLexicon::OperatingSystemNode);
+}
+
+OperatingSystemCapabilities::operator bool() {
+    records.method();
+    return instrumentation;
+}
+
+OperatingSystemCapabilities& OperatingSystemCapabilities::operator++() {
+    records.entering();
+    advanceToNext(instrumentation, filterSet, [this] { return passesFilters(); });
+    records.exiting();
+    return *this;
+}
+
+bool OperatingSystemCapabilities::passesFilters() {
+    std::string identifier;
+    for (const Filter& filter : filters) {
+        if (filter.type != InstanceIDFilter) continue;
+        if (!getInstanceID(identifier)) return false;
+        if (strcasecmp(filter.value.c_str(), identifier.c_str()) != 0) return false;
+    }
+    return true;
+}
+
+bool OperatingSystemCapabilities::getInstanceID(std::string& value) {
+    return instrumentation.getProperty(NodeLexicon::Name, value);
+}
+
+bool OperatingSystemCapabilities::getElementName(std::string& value) {
+    return getInstanceID(value);
+}
+
+bool OperatingSystemCapabilities::getElementNameEditSupported(bool& value) {
+    if (!instrumentation.isPropertyReadOnly(NodeLexicon::Name, value)) return false;
+    value = !value;
+    return true;
+}
+
+bool OperatingSystemCapabilities::getHostShutdownBehavior(unsigned short& value) {
+    value = 3;
+    return true;
+}
+
+}  // namespace VA::OSStatusProvider

@@ -1,0 +1,99 @@
+#ifndef OSSTATUS_UNIT_LOG_H
+#define OSSTATUS_UNIT_LOG_H
+
+#include <exception>
+#include <string>
+
+#include "Trace.h"
+
+namespace VA::OSStatusProvider {
+
+/// The place that writes a record: the function's unqualified name, and the line.
+struct Caller {
+    const char* function;
+    unsigned int line;
+
+    /// The caller of the function whose default argument this is.
+    static constexpr Caller here(const char* function = __builtin_FUNCTION(),
+                                 unsigned int line = __builtin_LINE()) {
+        return {function, line};
+    }
+
+    /// The caller under another name: a template's constructor bears that of the class it serves.
+    static constexpr Caller named(const char* function, unsigned int line = __builtin_LINE()) {
+        return {function, line};
+    }
+};
+
+/// The records of one source unit: each goes to the log and to the trace, under the unit's file
+/// name and logger category.
+class UnitLog {
+  public:
+    /// `file` and `category` outlive the object.
+    constexpr UnitLog(const char* file, const std::string& category)
+        : file_(file), category_(category) {}
+
+    void entering(Caller caller = Caller::here()) const { plain(Entering, caller); }
+    void exiting(Caller caller = Caller::here()) const { plain(Exiting, caller); }
+    void method(Caller caller = Caller::here()) const { plain(Method, caller); }
+
+    /// The same with a parameter list, as parameterList gives it.
+    void entering(const std::string& parameters, Caller caller = Caller::here()) const {
+        withParameters(Entering, parameters, caller);
+    }
+    void exiting(const std::string& parameters, Caller caller = Caller::here()) const {
+        withParameters(Exiting, parameters, caller);
+    }
+
+    /// What a variable holds; `Value` is const char* or unsigned int.
+    template <class Value>
+    void variable(const char* name, Value value, Caller caller = Caller::here()) const {
+        write(recordLevel, caller, [&] { return trace(name, file_, caller.line, value); });
+    }
+
+    /// A caught exception.
+    void message(const std::exception& caught, Caller caller = Caller::here()) const {
+        write(parameterRecordLevel, caller,
+              [&] { return trace(file_, caught.what(), caller.line, Message); });
+    }
+
+  private:
+    void plain(MessageType type, Caller caller) const {
+        write(recordLevel, caller,
+              [&] { return trace(file_, caller.function, caller.line, type); });
+    }
+
+    void withParameters(MessageType type, const std::string& parameters, Caller caller) const {
+        write(parameterRecordLevel, caller, [&] {
+            return tracepara(file_, caller.function, caller.line, parameters.c_str(), type);
+        });
+    }
+
+    template <class Format>
+    void write(int level, Caller caller, Format format) const {
+        writeRecord(caller.function, file_, caller.line, category_, level, format);
+    }
+
+    const char* file_;
+    const std::string& category_;
+};
+
+/// The text of a parameter list with one pointer: its name, which brings the leading blank and the
+/// "=", and the address.
+template <class Object>
+std::string parameterList(const char* name, Object* pointer) {
+    ZBLog::ZBMessageBuffer buffer;
+    return buffer.str(buffer << name << pointer);
+}
+
+/// The parameter list of an adapter's construction for a request.
+template <class Broker, class Context, class Path>
+std::string parameterList(const Broker* broker, const Context* context, const Path* objectPath) {
+    ZBLog::ZBMessageBuffer buffer;
+    return buffer.str(buffer << " _broker=" << broker << " _context=" << context
+                             << " objectPath=" << objectPath);
+}
+
+}  // namespace VA::OSStatusProvider
+
+#endif
