@@ -1,0 +1,110 @@
+#include "support/RecordingLog.h"
+
+#include <atomic>
+#include <mutex>
+#include <regex>
+#include <sstream>
+#include <utility>
+
+#include "ZBLogger.h"
+
+namespace recording {
+namespace {
+
+std::mutex mutex;
+std::vector<Record> kept;
+std::function<void(const Record&)> hook;
+std::atomic<bool> recording{true};
+
+void keep(Record record) {
+    if (!recording) return;
+    std::function<void(const Record&)> current;
+    {
+        const std::lock_guard<std::mutex> lock(mutex);
+        current = hook;
+    }
+    if (current) current(record);
+    const std::lock_guard<std::mutex> lock(mutex);
+    kept.push_back(std::move(record));
+}
+
+std::string masked(std::string text) {
+    static const std::regex line("(Line: |at line )[0-9]+");
+    static const std::regex address("0x[0-9a-f]+");
+    text = std::regex_replace(text, line, "$1#");
+    return std::regex_replace(text, address, "0x*");
+}
+
+void render(std::ostream& out, const std::string& channel, const Record& record) {
+    out << channel << ' ' << record.function << ' ' << record.file << ':';
+    if (record.file == "include/Trace.h")
+        out << record.line;
+    else
+        out << '#';
+    out << ' ' << record.category << ' ' << record.level << ' '
+        << (record.reservedIsNull ? "null" : "not-null") << ' ' << record.reserved1 << ' '
+        << record.reserved2 << " | " << masked(record.text) << '\n';
+}
+
+}  // namespace
+
+bool sameArguments(const Record& left, const Record& right) {
+    return left.function == right.function && left.file == right.file && left.line == right.line &&
+           left.category == right.category && left.level == right.level &&
+           left.reservedIsNull == right.reservedIsNull && left.reserved1 == right.reserved1 &&
+           left.reserved2 == right.reserved2 && left.text == right.text;
+}
+
+std::vector<Record> take() {
+    const std::lock_guard<std::mutex> lock(mutex);
+    return std::exchange(kept, {});
+}
+
+void clear() {
+    take();
+}
+
+void setHook(std::function<void(const Record&)> newHook) {
+    const std::lock_guard<std::mutex> lock(mutex);
+    hook = std::move(newHook);
+}
+
+void setRecording(bool on) {
+    recording = on;
+}
+
+std::string rendered(const std::vector<Record>& records) {
+    std::ostringstream out;
+    for (std::size_t index = 0; index < records.size(); ++index) {
+        const bool twin = index + 1 < records.size() && records[index].channel == "log" &&
+                          records[index + 1].channel == "trace" &&
+                          sameArguments(records[index], records[index + 1]);
+        render(out, twin ? "both" : records[index].channel, records[index]);
+        if (twin) ++index;
+    }
+    return out.str();
+}
+
+std::string takeRendered() {
+    return rendered(take());
+}
+
+}  // namespace recording
+
+namespace ZBLog {
+
+void ZBLogger::logLevelMessage(const char* function, const char* file, int line,
+                               const std::string& category, int level, char* reserved,
+                               int reserved1, int reserved2, const std::string& text) {
+    recording::keep({"log", function, file, line, category, level, reserved == nullptr, reserved1,
+                     reserved2, text});
+}
+
+void ZBLogger::traceLevelMessage(const char* function, const char* file, int line,
+                                 const std::string& category, int level, char* reserved,
+                                 int reserved1, int reserved2, const std::string& text) {
+    recording::keep({"trace", function, file, line, category, level, reserved == nullptr, reserved1,
+                     reserved2, text});
+}
+
+}  // namespace ZBLog
