@@ -1,0 +1,34 @@
+# Sourced by run and check: installs the Debian packages that they name.
+# shellcheck shell=sh
+
+# Prints those of the named packages that are not installed.
+missing_packages() {
+    for package in "$@"; do
+        state=$(dpkg-query -W -f '${db:Status-Status}' "$package" 2>/dev/null) || state=none
+        [ "$state" = installed ] || printf '%s ' "$package"
+    done
+}
+
+# Installs the named packages, as root or through sudo. Does nothing when they are all there.
+need() {
+    missing=$(missing_packages "$@")
+    [ -n "$missing" ] || return 0
+    echo "== Installing packages: $missing"
+    as_root=
+    if [ "$(id -u)" -ne 0 ]; then
+        command -v sudo >/dev/null || {
+            echo "Run this as root, or install sudo, or install these packages: $missing" >&2
+            return 1
+        }
+        as_root=sudo
+    fi
+    $as_root env DEBIAN_FRONTEND=noninteractive apt-get -qq update
+    # The package names are meant to be split.
+    # shellcheck disable=SC2086
+    $as_root env DEBIAN_FRONTEND=noninteractive apt-get -qq -y install --no-install-recommends \
+        -o Dpkg::Use-Pty=0 $missing >/dev/null
+}
+
+# What every build needs; g++-multilib compiles 32-bit code on a 64-bit machine.
+build_packages="cmake ninja-build g++ libc6-dev googletest libcli11-dev nlohmann-json3-dev"
+[ "$(dpkg --print-architecture)" = i386 ] || build_packages="$build_packages g++-multilib"

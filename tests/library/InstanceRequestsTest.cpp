@@ -1,0 +1,312 @@
+#include <stdexcept>
+
+#include "host/broker/ResultCollector.h"
+#include "library/LibraryFixture.h"
+
+namespace {
+
+using namespace cmpihost;
+using namespace VA::NodeLexicon;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+const std::string linuxPath =
+    "root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\"KORVA_ComputerSystem\","
+    "CSName=\"host1\",CreationClassName=\"KORVA_OperatingSystem\",Name=\"Linux\"";
+
+class InstanceRequests : public LibraryFixture {};
+
+TEST_F(InstanceRequests, NamesComeOnePerNodeWithTheirKeysInOrder) {
+    setNodes({"a", "b"});
+    const Outcome outcome = enumerateNames("KORVA_OperatingSystem");
+    EXPECT_EQ(outcome.rc, CMPI_RC_OK);
+    EXPECT_FALSE(outcome.message.has_value());
+    EXPECT_EQ(outcome.doneCount, 1U);
+    EXPECT_THAT(
+        texts(outcome.paths),
+        ElementsAre("root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\"KORVA_ComputerSystem\","
+                    "CSName=\"host1\",CreationClassName=\"KORVA_OperatingSystem\",Name=\"a\"",
+                    "root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\"KORVA_ComputerSystem\","
+                    "CSName=\"host1\",CreationClassName=\"KORVA_OperatingSystem\",Name=\"b\""));
+}
+
+TEST_F(InstanceRequests, NamespaceOfTheRequestIsThatOfThePaths) {
+    OperationRequest request;
+    request.operation = Operation::EnumerateInstanceNames;
+    request.path = path("KORVA_OperatingSystem");
+    request.path.nameSpace = "root/other";
+    const Outcome outcome = invoke(request);
+    ASSERT_EQ(outcome.paths.size(), 1U);
+    EXPECT_EQ(outcome.paths[0].nameSpace, "root/other");
+}
+
+TEST_F(InstanceRequests, ClassNameOfTheRequestIsTakenInAnyLetterCase) {
+    EXPECT_THAT(texts(enumerateNames("korva_OPERATINGsystem").paths), ElementsAre(linuxPath));
+}
+
+TEST_F(InstanceRequests, InstanceCarriesEveryAvailablePropertyInOrderAndOfItsType) {
+    const Outcome outcome = enumerate("KORVA_OperatingSystem");
+    EXPECT_EQ(outcome.rc, CMPI_RC_OK);
+    EXPECT_EQ(outcome.doneCount, 1U);
+    ASSERT_EQ(outcome.instances.size(), 1U);
+    EXPECT_EQ(toString(outcome.instances[0].path), linuxPath);
+    std::vector<std::string> properties;
+    for (const PropertyValue& property : outcome.instances[0].properties)
+        properties.push_back(cimTypeName(property.value.type()) + " " + property.name);
+    // The keys come first: creating the instance sets them.
+    EXPECT_THAT(
+        properties,
+        ElementsAre("string CSCreationClassName", "string CSName", "string CreationClassName",
+                    "string Name", "string Description", "datetime InstallDate",
+                    "uint16[] OperationalStatus", "uint16 HealthState", "string Status",
+                    "uint16 EnabledState", "uint16 OSType", "string Version",
+                    "datetime LastBootUpTime", "uint32 NumberOfLicensedUsers",
+                    "uint32 NumberOfUsers", "uint32 NumberOfProcesses",
+                    "uint32 MaxNumberOfProcesses", "uint64 TotalSwapSpaceSize",
+                    "uint64 TotalVirtualMemorySize", "uint64 FreeVirtualMemory",
+                    "uint64 FreePhysicalMemory", "uint64 TotalVisibleMemorySize",
+                    "uint64 SizeStoredInPagingFiles", "uint64 FreeSpaceInPagingFiles",
+                    "uint64 MaxProcessMemorySize", "boolean Distributed"));
+}
+
+TEST_F(InstanceRequests, EachPropertyHoldsItsOwnValue) {
+    host->clearNodes();
+    VA::SimulatedHost::Node node;
+    unsigned int number = 1000;
+    for (const Properties id :
+         {MaxNumberOfProcesses, MaxProcessMemorySize, NumberOfProcesses, NumberOfUsers,
+          NumberOfLicensedUsers, TotalVirtualMemorySize, FreeVirtualMemory, FreePhysicalMemory,
+          TotalVisibleMemorySize, TotalSwapSpaceSize, SizeStoredInPagingFiles,
+          FreeSpaceInPagingFiles})
+        node.properties[id] = number++;
+    node.properties[Name] = std::string("Linux");
+    node.properties[Version] = std::string("12");
+    node.properties[OSType] = 35U;
+    node.properties[Distributed] = false;
+    node.properties[InstallDate] = std::string("2024-02-29-23:59:58");
+    node.properties[LastBootUpTime] = std::string("2026-01-02-03:04:05");
+    node.status = 20;
+    host->addNode(node);
+    const long before = timezone;
+    timezone = 18000;
+    const Outcome outcome = enumerate("KORVA_OperatingSystem");
+    timezone = before;
+    ASSERT_EQ(outcome.instances.size(), 1U);
+    const InstanceValue& instance = outcome.instances[0];
+    const std::pair<const char*, const char*> expected[] = {
+        {"Caption", "(absent)"},
+        {"Description", ""},
+        {"InstallDate", "20240229235958.000000+300"},
+        {"OperationalStatus", "{3, 5}"},
+        {"HealthState", "10"},
+        {"Status", "OK"},
+        {"EnabledState", "5"},
+        {"CSCreationClassName", "KORVA_ComputerSystem"},
+        {"CSName", "host1"},
+        {"CreationClassName", "KORVA_OperatingSystem"},
+        {"Name", "Linux"},
+        {"OSType", "36"},
+        {"Version", "12"},
+        {"LastBootUpTime", "20260102030405.000000+300"},
+        {"MaxNumberOfProcesses", "1000"},
+        {"MaxProcessMemorySize", "1001"},
+        {"NumberOfProcesses", "1002"},
+        {"NumberOfUsers", "1003"},
+        {"NumberOfLicensedUsers", "1004"},
+        {"TotalVirtualMemorySize", "1005"},
+        {"FreeVirtualMemory", "1006"},
+        {"FreePhysicalMemory", "1007"},
+        {"TotalVisibleMemorySize", "1008"},
+        {"TotalSwapSpaceSize", "1009"},
+        {"SizeStoredInPagingFiles", "1010"},
+        {"FreeSpaceInPagingFiles", "1011"},
+        {"Distributed", "false"},
+        {"MaxProcessesPerUser", "(absent)"},
+    };
+    for (const auto& [name, value] : expected) EXPECT_EQ(text(instance, name), value) << name;
+}
+
+TEST_F(InstanceRequests, PropertyThatTheHostCannotSupplyIsLeftOut) {
+    setNodes({"Linux"});
+    const Outcome outcome = enumerate("KORVA_OperatingSystem");
+    ASSERT_EQ(outcome.instances.size(), 1U);
+    std::vector<std::string> names;
+    for (const PropertyValue& property : outcome.instances[0].properties)
+        names.push_back(property.name);
+    EXPECT_THAT(names, ElementsAre("CSCreationClassName", "CSName", "CreationClassName", "Name",
+                                   "Description", "OperationalStatus", "HealthState", "Status",
+                                   "EnabledState"));
+}
+
+TEST_F(InstanceRequests, DateThatIsNoneIsLeftOutAndTheRestStays) {
+    host->clearNodes();
+    VA::SimulatedHost::Node node = VA::SimulatedHost::plausibleNode();
+    node.properties[InstallDate] = std::string("never");
+    host->addNode(node);
+    const Outcome outcome = enumerate("KORVA_OperatingSystem");
+    ASSERT_EQ(outcome.instances.size(), 1U);
+    EXPECT_EQ(text(outcome.instances[0], "InstallDate"), "(absent)");
+    EXPECT_NE(text(outcome.instances[0], "LastBootUpTime"), "(absent)");
+}
+
+TEST_F(InstanceRequests, UnknownComputerNameLeavesCSNameOut) {
+    host->setComputerName(std::nullopt);
+    const Outcome names = enumerateNames("KORVA_OperatingSystem");
+    ASSERT_EQ(names.paths.size(), 1U);
+    EXPECT_EQ(names.paths[0].key("CSName"), nullptr);
+    const Outcome instances = enumerate("KORVA_OperatingSystem");
+    ASSERT_EQ(instances.instances.size(), 1U);
+    EXPECT_EQ(text(instances.instances[0], "CSName"), "(absent)");
+    // The strict broker notes the key that the class declares.
+    EXPECT_FALSE(broker.takeViolations().empty());
+}
+
+TEST_F(InstanceRequests, PropertyListIsNotApplied) {
+    OperationRequest request;
+    request.operation = Operation::EnumerateInstances;
+    request.path = path("KORVA_OperatingSystem");
+    const std::size_t all = invoke(request).instances.at(0).properties.size();
+    for (const std::vector<std::string>& list :
+         {std::vector<std::string>{"Name"}, std::vector<std::string>{},
+          std::vector<std::string>{"NoSuchProperty"}}) {
+        request.properties = list;
+        const Outcome outcome = invoke(request);
+        ASSERT_EQ(outcome.instances.size(), 1U);
+        EXPECT_EQ(outcome.instances[0].properties.size(), all);
+    }
+}
+
+TEST_F(InstanceRequests, GetFindsTheNodeByItsKeysInAnyLetterCase) {
+    for (const ObjectPathValue& asked :
+         {operatingSystemPath("host1", "Linux"), operatingSystemPath("HOST1", "lINUX"),
+          path("KORVA_OperatingSystem", {{"Name", "linux"}}),
+          path("KORVA_OperatingSystem", {{"CSName", "Host1"}}),
+          path("KORVA_OperatingSystem", {{"csname", "host1"}, {"NAME", "Linux"}}),
+          path("KORVA_OperatingSystem", {{"CreationClassName", "Wrong"}, {"Name", "Linux"}}),
+          path("KORVA_OperatingSystem",
+               {{"Name", Value::fromText("Linux", CMPI_chars)}, {"Unknown", "x"}})}) {
+        const Outcome outcome = get(asked);
+        EXPECT_EQ(outcome.rc, CMPI_RC_OK);
+        EXPECT_THAT(texts(outcome.instances), ElementsAre(linuxPath));
+        EXPECT_EQ(outcome.doneCount, 1U);
+    }
+}
+
+TEST_F(InstanceRequests, GetOfAnotherNodeReturnsNothingAndDone) {
+    for (const ObjectPathValue& asked :
+         {operatingSystemPath("host1", "Linux "), operatingSystemPath("host1 ", "Linux"),
+          operatingSystemPath("host2", "Linux"), operatingSystemPath("host1", ""),
+          operatingSystemPath("", "Linux")}) {
+        const Outcome outcome = get(asked);
+        EXPECT_EQ(outcome.rc, CMPI_RC_OK);
+        EXPECT_FALSE(outcome.message.has_value());
+        EXPECT_THAT(outcome.instances, IsEmpty());
+        EXPECT_EQ(outcome.doneCount, 1U);
+    }
+}
+
+TEST_F(InstanceRequests, NumberAndBooleanKeysAreComparedAsText) {
+    setNodes({"17", "true"});
+    const auto named = [this](Value value) {
+        return texts(get(path("KORVA_OperatingSystem", {{"Name", std::move(value)}})).instances)
+            .size();
+    };
+    EXPECT_EQ(named(Value::fromUnsigned(17)), 1U);
+    EXPECT_EQ(named(Value::fromSigned(17)), 1U);
+    EXPECT_EQ(named(Value::fromBoolean(true)), 1U);
+    EXPECT_EQ(named(Value::fromBoolean(false)), 0U);
+    // A reference is no text: it filters nothing.
+    EXPECT_EQ(named(Value::fromReference(capabilitiesPath("x"))), 2U);
+}
+
+TEST_F(InstanceRequests, KeysNarrowEnumerationsToo) {
+    setNodes({"a", "b", "A"});
+    OperationRequest request;
+    request.operation = Operation::EnumerateInstanceNames;
+    request.path = path("KORVA_OperatingSystem", {{"Name", "a"}});
+    EXPECT_EQ(invoke(request).paths.size(), 2U);
+    request.path = path("KORVA_OperatingSystem", {{"SomethingElse", "a"}});
+    EXPECT_EQ(invoke(request).paths.size(), 3U);
+}
+
+TEST_F(InstanceRequests, WithoutANodeEveryOperationReturnsOnlyDone) {
+    setNodes({});
+    for (const Outcome& outcome :
+         {enumerateNames("KORVA_OperatingSystem"), enumerate("KORVA_OperatingSystem"),
+          get(operatingSystemPath("host1", "Linux"))}) {
+        EXPECT_EQ(outcome.rc, CMPI_RC_OK);
+        EXPECT_THAT(outcome.paths, IsEmpty());
+        EXPECT_THAT(outcome.instances, IsEmpty());
+        EXPECT_EQ(outcome.doneCount, 1U);
+    }
+}
+
+TEST_F(InstanceRequests, ClassThatIsNotServedIsInvalidAndNothingIsReturned) {
+    for (const char* className : {"KORVA_ComputerSystem", "CIM_OperatingSystem", "", "KORVA_",
+                                  "KORVA_OperatingSystemX", "\xff%n"}) {
+        for (const Outcome& outcome : {enumerateNames(className), enumerate(className),
+                                       get(path(className, {{"Name", "x"}}))}) {
+            EXPECT_EQ(outcome.rc, CMPI_RC_ERR_INVALID_CLASS) << className;
+            EXPECT_FALSE(outcome.message.has_value()) << className;
+            EXPECT_EQ(outcome.doneCount, 0U) << className;
+        }
+    }
+}
+
+TEST_F(InstanceRequests, FailingResultStillReceivesEveryElementAndOneDone) {
+    setNodes({"a", "b", "c"});
+    OperationRequest request;
+    request.path = path("KORVA_OperatingSystem");
+    request.operation = Operation::EnumerateInstances;
+    const Outcome instances = invoke(request, [](ResultCollector& collector) {
+        collector.failReturnInstance(1, CMPI_RC_ERR_FAILED);
+        collector.failReturnDone(1, CMPI_RC_ERR_FAILED);
+    });
+    EXPECT_EQ(instances.rc, CMPI_RC_OK);
+    EXPECT_EQ(instances.refusedInstances.size(), 3U);
+    EXPECT_EQ(instances.doneCount, 1U);
+    request.operation = Operation::EnumerateInstanceNames;
+    const Outcome names = invoke(request, [](ResultCollector& collector) {
+        collector.failReturnObjectPath(2, CMPI_RC_ERR_FAILED);
+    });
+    EXPECT_EQ(names.rc, CMPI_RC_OK);
+    EXPECT_EQ(names.paths.size(), 1U);
+    EXPECT_EQ(names.refusedPaths.size(), 2U);
+    EXPECT_EQ(names.doneCount, 1U);
+}
+
+TEST_F(InstanceRequests, PathOrInstanceThatTheBrokerDoesNotMakeEndsTheWalk) {
+    setNodes({"a", "b", "c"});
+    FaultPlan second(Fault{"newObjectPath", 2, 1, CMPI_RC_OK});
+    broker.setFaultPlan(&second);
+    const Outcome names = enumerateNames("KORVA_OperatingSystem");
+    EXPECT_EQ(names.rc, CMPI_RC_OK);
+    EXPECT_EQ(names.paths.size(), 1U);
+    EXPECT_EQ(names.doneCount, 1U);
+    FaultPlan first(Fault{"newInstance", 1, 1, CMPI_RC_ERR_FAILED});
+    broker.setFaultPlan(&first);
+    const Outcome instances = enumerate("KORVA_OperatingSystem");
+    EXPECT_EQ(instances.rc, CMPI_RC_OK);
+    EXPECT_THAT(instances.instances, IsEmpty());
+    EXPECT_EQ(instances.doneCount, 1U);
+    broker.setFaultPlan(nullptr);
+}
+
+/// A broker whose tables are as poor as a provider may meet them.
+class SparseBroker : public LibraryFixture {
+  protected:
+    SparseBroker() : LibraryFixture(BrokerOptions::sparse()) {}
+};
+
+TEST_F(SparseBroker, ServesTheSameInstances) {
+    const Outcome outcome = enumerate("KORVA_OperatingSystem");
+    EXPECT_THAT(texts(outcome.instances), ElementsAre(linuxPath));
+    EXPECT_EQ(outcome.instances[0].properties.size(), 26U);
+    EXPECT_THAT(texts(get(operatingSystemPath("HOST1", "linux")).instances),
+                ElementsAre(linuxPath));
+    EXPECT_EQ(
+        associatorNames(operatingSystemPath("host1", "Linux"), "KORVA_InstalledOS").paths.size(),
+        1U);
+}
+
+}  // namespace

@@ -1,0 +1,142 @@
+#include <dlfcn.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <fstream>
+#include <memory>
+#include <sstream>
+#include <string>
+#include <vector>
+
+// What the file of the provider is: looked at with the tools of the linker, and loaded on its own.
+
+namespace {
+
+using testing::Contains;
+using testing::HasSubstr;
+using testing::IsSubsetOf;
+using testing::Not;
+using testing::UnorderedElementsAre;
+
+const std::string folder = KORVA_BINARY_DIR "/lib/";
+const std::string provider = folder + "libkorzbosstatusprofileprovider.so.1";
+
+std::string output(const std::string& command) {
+    const std::unique_ptr<std::FILE, int (*)(std::FILE*)> pipe(popen(command.c_str(), "r"), pclose);
+    std::string text;
+    char part[4096];
+    while (pipe && std::fgets(part, sizeof part, pipe.get()) != nullptr) text += part;
+    return text;
+}
+
+std::vector<std::string> lines(const std::string& text) {
+    std::istringstream stream(text);
+    std::vector<std::string> result;
+    for (std::string line; std::getline(stream, line);) result.push_back(line);
+    return result;
+}
+
+// Names between brackets behind a tag of the dynamic section.
+std::vector<std::string> dynamicEntries(const std::string& file, const std::string& tag) {
+    std::vector<std::string> names;
+    for (const std::string& line : lines(output("readelf -dW " + file)))
+        if (line.find("(" + tag + ")") != std::string::npos)
+            names.push_back(line.substr(line.find('[') + 1, line.find(']') - line.find('[') - 1));
+    return names;
+}
+
+std::vector<std::string> undefinedSymbols(const std::string& file) {
+    std::vector<std::string> names;
+    for (const std::string& line : lines(output("nm -D --undefined-only " + file))) {
+        const std::string name = line.substr(line.rfind(' ') + 1);
+        names.push_back(name.substr(0, name.find('@')));
+    }
+    return names;
+}
+
+bool mapped(const std::string& name) {
+    std::ifstream maps("/proc/self/maps");
+    for (std::string line; std::getline(maps, line);)
+        if (line.find(name) != std::string::npos) return true;
+    return false;
+}
+
+TEST(LibraryFile, BearsItsSoname) {
+    EXPECT_EQ(dynamicEntries(provider, "SONAME"),
+              (std::vector<std::string>{"libkorzbosstatusprofileprovider.so.1"}));
+    EXPECT_EQ(dynamicEntries(folder + "libvaprovider.so.1", "SONAME"),
+              (std::vector<std::string>{"libvaprovider.so.1"}));
+    EXPECT_EQ(dynamicEntries(folder + "libvainstrumentation.so.1", "SONAME"),
+              (std::vector<std::string>{"libvainstrumentation.so.1"}));
+    EXPECT_EQ(dynamicEntries(folder + "libzblog.so.1", "SONAME"),
+              (std::vector<std::string>{"libzblog.so.1"}));
+}
+
+TEST(LibraryFile, ExportsTheTwoFactoriesAndTheNotice) {
+    std::vector<std::string> names;
+    for (const std::string& line : lines(output("nm -D --defined-only " + provider)))
+        names.push_back(line.substr(line.rfind(' ') + 1));
+    EXPECT_THAT(names, UnorderedElementsAre("OperatingSystemProvider_Create_InstanceMI",
+                                            "OperatingSystemProvider_Create_AssociationMI",
+                                            "_ZN2VA16OSStatusProvider9COPYRIGHTE"));
+}
+
+TEST(LibraryFile, NeedsTheFrameworkAndTheLanguagesLibrariesOnly) {
+    const std::vector<std::string> needed = dynamicEntries(provider, "NEEDED");
+    for (const char* framework :
+         {"libvaprovider.so.1", "libvainstrumentation.so.1", "libzblog.so.1", "libstdc++.so.6"})
+        EXPECT_THAT(needed, Contains(framework));
+    EXPECT_THAT(needed, IsSubsetOf({"libvaprovider.so.1", "libvainstrumentation.so.1",
+                                    "libzblog.so.1", "libstdc++.so.6", "libgcc_s.so.1", "libm.so.6",
+                                    "libc.so.6", "libasan.so.8", "libubsan.so.1", "libtsan.so.2",
+                                    "ld-linux-x86-64.so.2", "ld-linux.so.2"}));
+}
+
+TEST(LibraryFile, IsHardened) {
+    for (const char* name : {"libkorzbosstatusprofileprovider.so.1", "libvaprovider.so.1",
+                             "libvainstrumentation.so.1", "libzblog.so.1"}) {
+        const std::string segments = output("readelf -lW " + folder + name);
+        EXPECT_THAT(segments, HasSubstr("GNU_RELRO")) << name;
+        for (const std::string& line : lines(segments))
+            EXPECT_FALSE(line.find("GNU_STACK") != std::string::npos &&
+                         line.find("RWE") != std::string::npos)
+                << name;
+        EXPECT_THAT(output("readelf -dW " + folder + name), HasSubstr("NOW")) << name;
+        EXPECT_THAT(output("readelf -dW " + folder + name), Not(HasSubstr("TEXTREL"))) << name;
+    }
+    EXPECT_THAT(undefinedSymbols(provider),
+                Contains(testing::AnyOf("__stack_chk_fail", "__stack_chk_fail_local")));
+#ifdef KORVA_FORTIFIED
+    EXPECT_THAT(undefinedSymbols(provider), Contains("__snprintf_chk"));
+#endif
+}
+
+TEST(LibraryFile, StartsNoProcessAndTouchesNoProcessWideState) {
+    for (const char* name : {"libkorzbosstatusprofileprovider.so.1", "libvaprovider.so.1",
+                             "libvainstrumentation.so.1", "libzblog.so.1"})
+        for (const char* forbidden :
+             {"fork",          "vfork",     "execve",   "execv",      "execl",
+              "posix_spawn",   "system",    "popen",    "tzset",      "localtime",
+              "localtime_r",   "gmtime",    "gmtime_r", "mktime",     "getaddrinfo",
+              "gethostbyname", "openlog",   "closelog", "setlogmask", "setlocale",
+              "signal",        "sigaction", "chdir",    "umask",      "setenv",
+              "putenv",        "exit",      "_exit"})
+            EXPECT_THAT(undefinedSymbols(folder + name), Not(Contains(forbidden))) << name;
+}
+
+TEST(LibraryFile, IsGoneFromTheProcessAfterUnloading) {
+    for (int round = 0; round < 100; ++round) {
+        void* handle = dlopen(provider.c_str(), RTLD_NOW | RTLD_GLOBAL);
+        ASSERT_NE(handle, nullptr) << dlerror();
+        EXPECT_NE(dlsym(handle, "OperatingSystemProvider_Create_InstanceMI"), nullptr);
+        EXPECT_TRUE(mapped("libkorzbosstatusprofileprovider"));
+        EXPECT_EQ(dlclose(handle), 0);
+        EXPECT_FALSE(mapped("libkorzbosstatusprofileprovider"));
+        EXPECT_FALSE(mapped("libvaprovider"));
+        EXPECT_FALSE(mapped("libvainstrumentation"));
+        EXPECT_FALSE(mapped("libzblog"));
+    }
+}
+
+}  // namespace

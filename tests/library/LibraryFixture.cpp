@@ -1,0 +1,131 @@
+#include "library/LibraryFixture.h"
+
+#include "framework/instrumentation/HostSource.h"
+#include "host/Schema.h"
+#include "host/SchemaCatalogue.h"
+
+using namespace cmpihost;
+
+const char* const providerFile = KORVA_BINARY_DIR "/lib/libkorzbosstatusprofileprovider.so.1";
+
+const ClassCatalogue& schemaCatalogue() {
+    static const SchemaCatalogue catalogue(Schema::load(KORVA_SOURCE_DIR "/schema"));
+    return catalogue;
+}
+
+ObjectPathValue path(const std::string& className, std::vector<KeyBinding> keys) {
+    ObjectPathValue result;
+    result.nameSpace = "root/cimv2";
+    result.className = className;
+    result.keys = std::move(keys);
+    return result;
+}
+
+ObjectPathValue operatingSystemPath(const std::string& csName, const std::string& name) {
+    return path("KORVA_OperatingSystem", {{"CSCreationClassName", "KORVA_ComputerSystem"},
+                                          {"CSName", csName},
+                                          {"CreationClassName", "KORVA_OperatingSystem"},
+                                          {"Name", name}});
+}
+
+ObjectPathValue capabilitiesPath(const std::string& instanceId) {
+    return path("KORVA_OperatingSystemCapabilities", {{"InstanceID", instanceId}});
+}
+
+ObjectPathValue computerSystemPath(const std::string& name) {
+    return path("KORVA_ComputerSystem",
+                {{"CreationClassName", "KORVA_ComputerSystem"}, {"Name", name}});
+}
+
+std::vector<std::string> texts(const std::vector<ObjectPathValue>& paths) {
+    std::vector<std::string> result;
+    for (const ObjectPathValue& each : paths) result.push_back(toString(each));
+    return result;
+}
+
+std::vector<std::string> texts(const std::vector<InstanceValue>& instances) {
+    std::vector<std::string> result;
+    for (const InstanceValue& each : instances) result.push_back(toString(each.path));
+    return result;
+}
+
+std::string text(const InstanceValue& instance, const std::string& property) {
+    const Value* value = instance.property(property);
+    return value == nullptr ? "(absent)" : value->toText();
+}
+
+LibraryFixture::LibraryFixture(BrokerOptions options)
+    : host(std::make_shared<VA::SimulatedHost>()),
+      broker(&schemaCatalogue(), options),
+      library(providerFile, broker) {
+    VA::SimulatedHost::Node node = VA::SimulatedHost::plausibleNode();
+    node.properties[VA::NodeLexicon::Name] = std::string("Linux");
+    host->addNode(node);
+    host->setComputerName("host1");
+    VA::setHostSource(host);
+    broker.route(ComputerSystemService::className, computers);
+    recording::setRecording(true);
+    recording::clear();
+}
+
+LibraryFixture::~LibraryFixture() {
+    VA::setHostSource(nullptr);
+    recording::setHook({});
+    recording::clear();
+}
+
+void LibraryFixture::TearDown() {
+    EXPECT_THAT(broker.takeViolations(), testing::IsEmpty());
+}
+
+Outcome LibraryFixture::invoke(const OperationRequest& request, const CollectorSetup& setup) {
+    return cmpihost::invoke(library, broker, request, setup);
+}
+
+Outcome LibraryFixture::enumerateNames(const std::string& className) {
+    OperationRequest request;
+    request.operation = Operation::EnumerateInstanceNames;
+    request.path = path(className);
+    return invoke(request);
+}
+
+Outcome LibraryFixture::enumerate(const std::string& className) {
+    OperationRequest request;
+    request.operation = Operation::EnumerateInstances;
+    request.path = path(className);
+    return invoke(request);
+}
+
+Outcome LibraryFixture::get(const ObjectPathValue& instance) {
+    OperationRequest request;
+    request.operation = Operation::GetInstance;
+    request.path = instance;
+    return invoke(request);
+}
+
+Outcome LibraryFixture::associatorNames(const ObjectPathValue& source,
+                                        std::optional<std::string> assocClass) {
+    OperationRequest request;
+    request.operation = Operation::AssociatorNames;
+    request.path = source;
+    request.assocClass = std::move(assocClass);
+    return invoke(request);
+}
+
+Outcome LibraryFixture::associators(const ObjectPathValue& source,
+                                    std::optional<std::string> assocClass) {
+    OperationRequest request;
+    request.operation = Operation::Associators;
+    request.path = source;
+    request.assocClass = std::move(assocClass);
+    return invoke(request);
+}
+
+void LibraryFixture::setNodes(const std::vector<std::string>& names) {
+    host->clearNodes();
+    for (const std::string& name : names) {
+        VA::SimulatedHost::Node node;
+        node.properties[VA::NodeLexicon::Name] = name;
+        host->addNode(node);
+    }
+}
