@@ -1,0 +1,98 @@
+#include "ConfigurationFile.h"
+
+#include <fcntl.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <cstring>
+#include <utility>
+
+namespace ZBLog {
+
+namespace {
+
+bool sameTime(const timespec& one, const timespec& other) {
+    return one.tv_sec == other.tv_sec && one.tv_nsec == other.tv_nsec;
+}
+
+/// Appends up to `limit` bytes from the start of an open file; 0 or an error number.
+int readUpTo(std::size_t limit, int descriptor, std::string& text) {
+    char block[4096];
+    while (text.size() < limit) {
+        const ssize_t count =
+            ::pread(descriptor, block, std::min(sizeof block, limit - text.size()),
+                    static_cast<off_t>(text.size()));
+        if (count < 0 && errno == EINTR) continue;
+        if (count < 0) return errno;
+        if (count == 0) return 0;
+        text.append(block, static_cast<std::size_t>(count));
+    }
+    return 0;
+}
+
+}  // namespace
+
+ConfigurationFile::ConfigurationFile(ConfigurationSource source, Surroundings& surroundings)
+    : source_(std::move(source)), surroundings_(surroundings) {}
+
+bool ConfigurationFile::Stamp::operator==(const Stamp& other) const {
+    if (error != 0 || other.error != 0) return error == other.error;
+    return FileIdentity::of(status) == FileIdentity::of(other.status) &&
+           status.st_size == other.status.st_size &&
+           sameTime(status.st_mtim, other.status.st_mtim) &&
+           sameTime(status.st_ctim, other.status.st_ctim);
+}
+
+std::optional<ParsedConfiguration> ConfigurationFile::news() {
+    if (source_.path.empty()) {
+        return std::exchange(content_, Content{}) ? std::nullopt
+                                                  : std::optional(ParsedConfiguration{});
+    }
+    const Stamp found = stamp();
+    if (stamp_ && *stamp_ == found) return std::nullopt;
+
+    Content content = read();
+    stamp_ = isSettled(found) ? std::optional(found) : std::nullopt;
+    if (content_ && content.text == content_->text && content.problem == content_->problem) {
+        return std::nullopt;
+    }
+    content_.reset();  // should parsing run out of memory, the file is news again
+    ParsedConfiguration parsed = parseConfiguration(content.text);
+    if (!content.problem.empty()) parsed.errors.push_back({0, content.problem});
+    content_ = std::move(content);
+    return parsed;
+}
+
+ConfigurationFile::Stamp ConfigurationFile::stamp() const {
+    Stamp stamp{};
+    if (::stat(source_.path.c_str(), &stamp.status) != 0) stamp.error = errno;
+    return stamp;
+}
+
+/// A file that was changed a moment ago may be changed again with no trace in its stamp, since file
+/// times advance in steps. Its content is then looked at once more.
+bool ConfigurationFile::isSettled(const Stamp& stamp) const {
+    constexpr int settlingSeconds = 2;
+    if (stamp.error != 0) return true;
+    const auto age = surroundings_.utc().tv_sec - stamp.status.st_ctim.tv_sec;
+    return age < 0 || age > settlingSeconds;
+}
+
+ConfigurationFile::Content ConfigurationFile::read() const {
+    Descriptor file;
+    if (const int error = file.open(source_.path.c_str(), O_RDONLY)) return failure(error);
+    if (!S_ISREG(file.status().st_mode)) return {"", "not a regular file"};
+    Content content;
+    // One byte more than allowed shows that the file is too long.
+    const int error = readUpTo(configurationSizeLimit + 1, file.number(), content.text);
+    return error == 0 ? content : failure(error);
+}
+
+ConfigurationFile::Content ConfigurationFile::failure(int error) const {
+    const bool missing = error == ENOENT || error == ENOTDIR;
+    if (missing && !source_.required) return {};
+    return {"", std::string("cannot be read: ") + ::strerrordesc_np(error)};
+}
+
+}  // namespace ZBLog

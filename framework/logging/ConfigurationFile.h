@@ -1,0 +1,55 @@
+#ifndef ZBLOG_CONFIGURATION_FILE_H
+#define ZBLOG_CONFIGURATION_FILE_H
+
+#include <sys/stat.h>
+
+#include <optional>
+#include <string>
+
+#include "ConfigurationParser.h"
+#include "Descriptor.h"
+#include "Surroundings.h"
+
+namespace ZBLog {
+
+/// A configuration in a file that may change, vanish and come back. Serves one thread at a time.
+class ConfigurationFile {
+  public:
+    ConfigurationFile(ConfigurationSource source, Surroundings& surroundings);
+
+    /// What the file says, if that is news: at the first call, and when its content or the reason
+    /// why it cannot be read is another one than before. Costs one stat while the file rests.
+    /// A file that is missing says nothing (the defaults), and is an error if it is required; so is
+    /// one that cannot be read. Throws std::bad_alloc.
+    std::optional<ParsedConfiguration> news();
+
+    const std::string& path() const { return source_.path; }
+
+  private:
+    /// What stat tells; equal stamps mean that the file was not touched in between, unless the two
+    /// touches were too close in time to be told apart.
+    struct Stamp {
+        int error;
+        struct stat status;
+        bool operator==(const Stamp& other) const;
+    };
+
+    struct Content {
+        std::string text;
+        std::string problem;  // why there is no text; empty if nothing is wrong
+    };
+
+    Stamp stamp() const;
+    bool isSettled(const Stamp& stamp) const;
+    Content read() const;
+    Content failure(int error) const;
+
+    ConfigurationSource source_;
+    Surroundings& surroundings_;
+    std::optional<Stamp> stamp_;  // none: to be read again
+    std::optional<Content> content_;
+};
+
+}  // namespace ZBLog
+
+#endif

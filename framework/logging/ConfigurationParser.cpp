@@ -1,0 +1,175 @@
+#include "ConfigurationParser.h"
+
+#include <algorithm>
+#include <array>
+#include <charconv>
+
+#include "LineBuffer.h"
+
+namespace ZBLog {
+
+namespace {
+
+constexpr std::string_view blanks = " \t\r";
+
+std::string_view trimmed(std::string_view text) {
+    const std::size_t first = text.find_first_not_of(blanks);
+    if (first == std::string_view::npos) return {};
+    return text.substr(first, text.find_last_not_of(blanks) - first + 1);
+}
+
+/// Takes the part before the next separator off `text`, and the separator.
+std::string_view takeUntil(char separator, std::string_view& text) {
+    const std::size_t end = std::min(text.find(separator), text.size());
+    const std::string_view part = text.substr(0, end);
+    text.remove_prefix(std::min(end + 1, text.size()));
+    return part;
+}
+
+std::string quoted(std::string_view text) {
+    constexpr std::size_t room = 64;
+    LineBuffer printable;
+    printable.putEscaped(text, room);
+    return "\"" + std::string(printable.text()) + "\"";
+}
+
+bool isControl(char character) {
+    const auto byte = static_cast<unsigned char>(character);
+    return byte == 0x7F || (byte < 0x20 && blanks.find(character) == std::string_view::npos);
+}
+
+/// Each sets one thing from its text; false when the text is malformed.
+bool setSink(ChannelConfiguration& channel, std::string_view value) {
+    constexpr std::string_view filePrefix = "file:";
+    constexpr std::size_t longestPath = 4095;
+    constexpr std::pair<std::string_view, Destination> words[] = {
+        {"off", Destination::nowhere},
+        {"stderr", Destination::standardError},
+        {"syslog", Destination::systemLog},
+    };
+    for (const auto& [word, destination] : words) {
+        if (value != word) continue;
+        channel.destination = destination;
+        return true;
+    }
+    if (value.substr(0, filePrefix.size()) != filePrefix) return false;
+    value.remove_prefix(filePrefix.size());
+    if (value.empty() || value.size() > longestPath) return false;
+    if (value.front() != '/' || value.back() == '/') return false;
+    channel.destination = Destination::file;
+    channel.path = value;
+    return true;
+}
+
+bool setLevel(ChannelConfiguration& channel, std::string_view value) {
+    constexpr std::size_t mostDigits = 6;
+    if (value.size() > mostDigits || value.substr(0, 1) == "-") return false;
+    const char* const end = value.data() + value.size();
+    const auto [stop, error] = std::from_chars(value.data(), end, channel.level);
+    return error == std::errc() && stop == end;
+}
+
+bool setRecords(ChannelConfiguration& channel, std::string_view value) {
+    channel.failuresOnly = value == "failures";
+    return channel.failuresOnly || value == "all";
+}
+
+bool isPattern(std::string_view text) {
+    if (text.empty() || text.find_first_of(blanks) != std::string_view::npos) return false;
+    return text.find('*') >= text.size() - 1;
+}
+
+bool setCategory(ChannelConfiguration& channel, std::string_view value) {
+    std::size_t items = 1 + static_cast<std::size_t>(std::count(value.begin(), value.end(), ','));
+    for (; items > 0; --items) {
+        const std::string_view pattern = trimmed(takeUntil(',', value));
+        if (!isPattern(pattern)) return false;
+        channel.categories.add(pattern);
+    }
+    return true;
+}
+
+struct Setting {
+    std::string_view key;
+    Channel channel;
+    bool (*set)(ChannelConfiguration&, std::string_view);
+    const char* form;
+};
+
+constexpr const char* sinkForm = "off, stderr, syslog or file:/PATH";
+constexpr const char* levelForm = "a number from 0 to 999999";
+constexpr const char* recordsForm = "all or failures";
+constexpr const char* categoryForm = "NAME or BEGINNING*, separated by commas";
+
+constexpr Setting settings[] = {
+    {"log.sink", Channel::log, setSink, sinkForm},
+    {"log.level", Channel::log, setLevel, levelForm},
+    {"log.records", Channel::log, setRecords, recordsForm},
+    {"log.category", Channel::log, setCategory, categoryForm},
+    {"trace.sink", Channel::trace, setSink, sinkForm},
+    {"trace.level", Channel::trace, setLevel, levelForm},
+    {"trace.records", Channel::trace, setRecords, recordsForm},
+    {"trace.category", Channel::trace, setCategory, categoryForm},
+};
+
+/// Reads one line after the other into a configuration.
+class Reader {
+  public:
+    explicit Reader(Configuration& configuration) : configuration_(configuration) {}
+
+    /// What is wrong with the line, empty if nothing is.
+    std::string read(std::string_view line) {
+        line = trimmed(line);
+        if (line.empty() || line.front() == '#') return {};
+        if (std::any_of(line.begin(), line.end(), isControl)) {
+            return "control character in " + quoted(line);
+        }
+        if (line.find('=') == std::string_view::npos) {
+            return "not of the form KEY = VALUE: " + quoted(line);
+        }
+        const std::string_view key = trimmed(takeUntil('=', line));
+        return assign(key, trimmed(line));
+    }
+
+  private:
+    std::string assign(std::string_view key, std::string_view value) {
+        const auto* const setting =
+            std::find_if(std::begin(settings), std::end(settings),
+                         [&](const Setting& candidate) { return candidate.key == key; });
+        if (setting == std::end(settings)) return "unknown key " + quoted(key);
+        bool& given = given_[static_cast<std::size_t>(setting - std::begin(settings))];
+        if (given) return std::string(key) + " is given twice";
+        given = true;
+        if (setting->set(configuration_.of(setting->channel), value)) return {};
+        return std::string(key) + " must be " + setting->form + ", not " + quoted(value);
+    }
+
+    Configuration& configuration_;
+    std::array<bool, std::size(settings)> given_{};
+};
+
+}  // namespace
+
+ParsedConfiguration parseConfiguration(std::string_view text) {
+    ParsedConfiguration result;
+    if (text.size() > configurationSizeLimit) {
+        result.errors.push_back(
+            {0, "longer than " + std::to_string(configurationSizeLimit) + " bytes"});
+        return result;
+    }
+    Configuration configuration;
+    Reader reader(configuration);
+    for (unsigned line = 1; !text.empty(); ++line) {
+        std::string problem = reader.read(takeUntil('\n', text));
+        if (problem.empty()) continue;
+        if (result.errors.size() == configurationErrorLimit) {
+            result.errors.push_back({line, "further errors are not told"});
+            break;
+        }
+        result.errors.push_back({line, std::move(problem)});
+    }
+    if (result.errors.empty()) result.configuration = std::move(configuration);
+    return result;
+}
+
+}  // namespace ZBLog

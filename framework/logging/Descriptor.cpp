@@ -1,0 +1,46 @@
+#include "Descriptor.h"
+
+#include <fcntl.h>
+#include <unistd.h>
+
+#include <cerrno>
+
+namespace ZBLog {
+
+namespace {
+
+/// The same file under a number that is none of the standard streams'; -1 with errno if that fails.
+int beyondStandardStreams(int number) {
+    if (number < 0 || number > STDERR_FILENO) return number;
+    const int moved = ::fcntl(number, F_DUPFD_CLOEXEC, STDERR_FILENO + 1);
+    const int error = errno;
+    ::close(number);
+    errno = error;
+    return moved;
+}
+
+}  // namespace
+
+int Descriptor::open(const char* path, int flags, mode_t mode) noexcept {
+    close();
+    number_ = beyondStandardStreams(::open(path, flags | O_CLOEXEC | O_NONBLOCK | O_NOCTTY, mode));
+    if (number_ < 0) return errno;
+    if (::fstat(number_, &status_) == 0) return 0;
+    const int error = errno;
+    ::close(number_);
+    number_ = -1;
+    return error;
+}
+
+void Descriptor::close() noexcept {
+    if (isOpen()) ::close(number_);
+    number_ = -1;
+}
+
+bool Descriptor::isOpen() const noexcept {
+    struct stat now {};
+    return number_ >= 0 && ::fstat(number_, &now) == 0 &&
+           FileIdentity::of(now) == FileIdentity::of(status_);
+}
+
+}  // namespace ZBLog

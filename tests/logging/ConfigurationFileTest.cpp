@@ -1,0 +1,127 @@
+#include "framework/logging/ConfigurationFile.h"
+
+#include <gmock/gmock.h>
+#include <sys/stat.h>
+
+#include <filesystem>
+
+#include "tests/logging/LoggingSupport.h"
+
+namespace {
+
+using ZBLog::Channel;
+using ZBLog::ConfigurationFile;
+using ZBLog::configurationSourceFrom;
+
+/// What news brings: the log's level, and the errors.
+std::string newsOf(ConfigurationFile& file) {
+    const auto news = file.news();
+    if (!news) return "no news";
+    std::string text = std::to_string(news->configuration.of(Channel::log).level);
+    for (const auto& error : news->errors) {
+        text += " [" + std::to_string(error.line) + ": " + error.message + "]";
+    }
+    return text;
+}
+
+class ConfigurationFileTest : public testing::Test {
+  protected:
+    /// Writes the file as if that had been long ago.
+    void writeLongAgo(const std::string& content) {
+        logging_test::writeFile(path_, content);
+        surroundings_.setAhead(60);
+    }
+
+    logging_test::TemporaryFolder folder_;
+    logging_test::FakeSurroundings surroundings_;
+    const std::string path_ = folder_ / "zblog.conf";
+    ConfigurationFile file_{{path_, true}, surroundings_};
+};
+
+TEST_F(ConfigurationFileTest, IsNewsOnceAndAgainWhenItsContentChanges) {
+    writeLongAgo("log.level = 1\n");
+    EXPECT_EQ(newsOf(file_), "1");
+    EXPECT_EQ(newsOf(file_), "no news");
+    logging_test::writeFile(path_, "log.level = 22\n");
+    EXPECT_EQ(newsOf(file_), "22");
+    EXPECT_EQ(newsOf(file_), "no news");
+}
+
+TEST_F(ConfigurationFileTest, IsNoNewsWhenItWasOnlyTouchedOrReplacedByTheSame) {
+    writeLongAgo("log.level = x\n");
+    EXPECT_EQ(newsOf(file_), "3000 [1: log.level must be a number from 0 to 999999, not \"x\"]");
+    std::filesystem::last_write_time(path_, std::filesystem::file_time_type::clock::now());
+    EXPECT_EQ(newsOf(file_), "no news");
+    logging_test::writeFile(path_ + ".new", "log.level = x\n");
+    std::filesystem::rename(path_ + ".new", path_);
+    EXPECT_EQ(newsOf(file_), "no news");
+}
+
+TEST_F(ConfigurationFileTest, IsNewsWhenAnotherFileTakesItsPlace) {
+    writeLongAgo("log.level = 1\n");
+    EXPECT_EQ(newsOf(file_), "1");
+    logging_test::writeFile(path_ + ".new", "log.level = 2\n");
+    std::filesystem::rename(path_ + ".new", path_);
+    EXPECT_EQ(newsOf(file_), "2");
+}
+
+TEST_F(ConfigurationFileTest, SeesASecondChangeInTheSameMoment) {
+    for (int level = 1; level < 10; ++level) {
+        logging_test::writeFile(path_, "log.level = " + std::to_string(level) + "\n");
+        EXPECT_EQ(newsOf(file_), std::to_string(level));
+    }
+}
+
+TEST_F(ConfigurationFileTest, MissingFileIsAnErrorOnlyIfItIsRequired) {
+    EXPECT_EQ(newsOf(file_), "3000 [0: cannot be read: No such file or directory]");
+    EXPECT_EQ(newsOf(file_), "no news");
+    ConfigurationFile optional({path_, false}, surroundings_);
+    EXPECT_EQ(newsOf(optional), "3000");
+    EXPECT_EQ(newsOf(optional), "no news");
+    ConfigurationFile beneathAFile({"/etc/passwd/zblog.conf", false}, surroundings_);
+    EXPECT_EQ(newsOf(beneathAFile), "3000");
+}
+
+TEST_F(ConfigurationFileTest, ComesAndGoes) {
+    ConfigurationFile file({path_, false}, surroundings_);
+    EXPECT_EQ(newsOf(file), "3000");
+    writeLongAgo("log.level = 1\n");
+    EXPECT_EQ(newsOf(file), "1");
+    std::filesystem::remove(path_);
+    EXPECT_EQ(newsOf(file), "3000");
+    EXPECT_EQ(newsOf(file), "no news");
+    writeLongAgo("log.level = 1\n");
+    EXPECT_EQ(newsOf(file), "1");
+}
+
+TEST_F(ConfigurationFileTest, NoFileMeansTheDefaults) {
+    ConfigurationFile none({"", true}, surroundings_);
+    EXPECT_EQ(newsOf(none), "3000");
+    EXPECT_EQ(newsOf(none), "no news");
+}
+
+TEST_F(ConfigurationFileTest, IsRefusedWhenItIsTooLong) {
+    writeLongAgo(std::string(100000, '\n'));
+    EXPECT_EQ(newsOf(file_), "3000 [0: longer than 65536 bytes]");
+    EXPECT_EQ(newsOf(file_), "no news");
+}
+
+TEST_F(ConfigurationFileTest, IsRefusedWhenItIsNoRegularFile) {
+    ConfigurationFile folder({folder_.path(), true}, surroundings_);
+    EXPECT_EQ(newsOf(folder), "3000 [0: not a regular file]");
+    EXPECT_EQ(newsOf(folder), "no news");
+    ASSERT_EQ(::mkfifo(path_.c_str(), 0600), 0);
+    EXPECT_EQ(newsOf(file_), "3000 [0: not a regular file]");
+    ConfigurationFile endless({"/dev/zero", true}, surroundings_);
+    EXPECT_EQ(newsOf(endless), "3000 [0: not a regular file]");
+}
+
+TEST(ConfigurationSource, IsTheSystemsFileUnlessTheEnvironmentNamesAnother) {
+    EXPECT_EQ(configurationSourceFrom(nullptr).path, "/etc/zblog.conf");
+    EXPECT_FALSE(configurationSourceFrom(nullptr).required);
+    EXPECT_EQ(configurationSourceFrom("/proc/self/fd/7").path, "/proc/self/fd/7");
+    EXPECT_TRUE(configurationSourceFrom("/proc/self/fd/7").required);
+    EXPECT_EQ(configurationSourceFrom("").path, "");
+}
+
+}  // namespace

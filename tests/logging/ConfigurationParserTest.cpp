@@ -1,0 +1,205 @@
+#include "framework/logging/ConfigurationParser.h"
+
+#include <gtest/gtest.h>
+
+#include <random>
+#include <string>
+
+namespace {
+
+using ZBLog::Channel;
+using ZBLog::ChannelConfiguration;
+using ZBLog::Configuration;
+using ZBLog::Destination;
+using ZBLog::parseConfiguration;
+using ZBLog::ParsedConfiguration;
+
+std::string describe(const ChannelConfiguration& channel) {
+    const char* const names[] = {"off", "stderr", "syslog", "file"};
+    return std::string(names[static_cast<std::size_t>(channel.destination)]) + "[" + channel.path +
+           "] " + std::to_string(channel.level) + (channel.failuresOnly ? " failures" : " all") +
+           (channel.categories.passes("Zumbrel.A") ? " A" : "") +
+           (channel.categories.passes("Zumbrel.B") ? " B" : "");
+}
+
+std::string describe(const Configuration& configuration) {
+    return describe(configuration.of(Channel::log)) + "; " +
+           describe(configuration.of(Channel::trace));
+}
+
+std::string describe(const ParsedConfiguration& parsed) {
+    std::string text;
+    for (const ZBLog::ConfigurationError& error : parsed.errors) {
+        text += std::to_string(error.line) + ": " + error.message + "\n";
+    }
+    return text;
+}
+
+constexpr const char* defaults = "syslog[] 3000 failures A B; off[] 4000 all A B";
+
+struct GoodRow {
+    const char* description;
+    const char* text;
+    const char* expected;
+};
+
+const GoodRow goodRows[] = {
+    {"nothing", "", defaults},
+    {"empty lines and comments", "\n  \n# log.sink = off\n\t#\r\n", defaults},
+    {"sink off", "log.sink = off", "off[] 3000 failures A B; off[] 4000 all A B"},
+    {"sink stderr", "trace.sink = stderr\n", "syslog[] 3000 failures A B; stderr[] 4000 all A B"},
+    {"sink syslog", "trace.sink = syslog\n", "syslog[] 3000 failures A B; syslog[] 4000 all A B"},
+    {"sink file", "log.sink = file:/var/log/korva.log\n",
+     "file[/var/log/korva.log] 3000 failures A B; off[] 4000 all A B"},
+    {"a path with blanks and signs", "log.sink = file:/a b/#=,*.log\n",
+     "file[/a b/#=,*.log] 3000 failures A B; off[] 4000 all A B"},
+    {"levels", "log.level = 0\ntrace.level=999999\n",
+     "syslog[] 0 failures A B; off[] 999999 all A B"},
+    {"level with leading zeros", "log.level = 004000\n",
+     "syslog[] 4000 failures A B; off[] 4000 all A B"},
+    {"records", "log.records = all\ntrace.records = failures\n",
+     "syslog[] 3000 all A B; off[] 4000 failures A B"},
+    {"a category", "log.category = Zumbrel.A\n", "syslog[] 3000 failures A; off[] 4000 all A B"},
+    {"categories", "log.category = Other , Zumbrel.B,X*\n",
+     "syslog[] 3000 failures B; off[] 4000 all A B"},
+    {"a beginning", "trace.category = Zumbrel.*\n", defaults},
+    {"every category", "log.category = *\ntrace.category = No.*\n",
+     "syslog[] 3000 failures A B; off[] 4000 all"},
+    {"no blanks, ends of line of another system", "log.level=1\r\ntrace.level=2\r\n",
+     "syslog[] 1 failures A B; off[] 2 all A B"},
+    {"blanks everywhere", " \tlog.level\t =  7 \t", "syslog[] 7 failures A B; off[] 4000 all A B"},
+    {"all keys in any order",
+     "trace.category = Zumbrel.B\ntrace.records = failures\ntrace.level = 3000\n"
+     "trace.sink = file:/t\nlog.category = Zumbrel.A\nlog.records = all\nlog.level = 4000\n"
+     "log.sink = stderr\n",
+     "stderr[] 4000 all A; file[/t] 3000 failures B"},
+};
+
+TEST(ConfigurationParser, ReadsEveryKeyInEveryForm) {
+    for (const GoodRow& row : goodRows) {
+        const ParsedConfiguration parsed = parseConfiguration(row.text);
+        EXPECT_EQ(describe(parsed), "") << row.description;
+        EXPECT_EQ(describe(parsed.configuration), row.expected) << row.description;
+    }
+}
+
+struct BadRow {
+    const char* description;
+    std::string text;
+    const char* errors;
+};
+
+const BadRow badRows[] = {
+    {"no equals sign", "log.sink off\n", "1: not of the form KEY = VALUE: \"log.sink off\"\n"},
+    {"unknown key", "\n# x\nlog.sinks = off\n", "3: unknown key \"log.sinks\"\n"},
+    {"key in capitals", "Log.Sink = off\n", "1: unknown key \"Log.Sink\"\n"},
+    {"no key", " = off\n", "1: unknown key \"\"\n"},
+    {"key twice", "log.level = 1\nlog.level = 1\n", "2: log.level is given twice\n"},
+    {"unknown sink", "log.sink = console\n",
+     "1: log.sink must be off, stderr, syslog or file:/PATH, not \"console\"\n"},
+    {"sink in capitals", "log.sink = OFF\n",
+     "1: log.sink must be off, stderr, syslog or file:/PATH, not \"OFF\"\n"},
+    {"empty value", "trace.sink =\n",
+     "1: trace.sink must be off, stderr, syslog or file:/PATH, not \"\"\n"},
+    {"relative path", "log.sink = file:korva.log\n",
+     "1: log.sink must be off, stderr, syslog or file:/PATH, not \"file:korva.log\"\n"},
+    {"no path", "log.sink = file:\n",
+     "1: log.sink must be off, stderr, syslog or file:/PATH, not \"file:\"\n"},
+    {"a folder's path", "log.sink = file:/var/log/\n",
+     "1: log.sink must be off, stderr, syslog or file:/PATH, not \"file:/var/log/\"\n"},
+    {"negative level", "log.level = -1\n",
+     "1: log.level must be a number from 0 to 999999, not \"-1\"\n"},
+    {"level with a sign", "log.level = +1\n",
+     "1: log.level must be a number from 0 to 999999, not \"+1\"\n"},
+    {"level of seven digits", "log.level = 0000001\n",
+     "1: log.level must be a number from 0 to 999999, not \"0000001\"\n"},
+    {"level with more behind it", "trace.level = 4000 # fine\n",
+     "1: trace.level must be a number from 0 to 999999, not \"4000 # fine\"\n"},
+    {"empty level", "trace.level =\n",
+     "1: trace.level must be a number from 0 to 999999, not \"\"\n"},
+    {"unknown records", "log.records = some\n",
+     "1: log.records must be all or failures, not \"some\"\n"},
+    {"empty item", "log.category = A,,B\n",
+     "1: log.category must be NAME or BEGINNING*, separated by commas, not \"A,,B\"\n"},
+    {"comma at the end", "log.category = A,\n",
+     "1: log.category must be NAME or BEGINNING*, separated by commas, not \"A,\"\n"},
+    {"no category", "log.category =\n",
+     "1: log.category must be NAME or BEGINNING*, separated by commas, not \"\"\n"},
+    {"forgotten comma", "log.category = A B\n",
+     "1: log.category must be NAME or BEGINNING*, separated by commas, not \"A B\"\n"},
+    {"star in the middle", "log.category = A*B\n",
+     "1: log.category must be NAME or BEGINNING*, separated by commas, not \"A*B\"\n"},
+    {"two stars", "log.category = A**\n",
+     "1: log.category must be NAME or BEGINNING*, separated by commas, not \"A**\"\n"},
+    {"several errors", "x\nlog.level = y\n\nz = 1",
+     "1: not of the form KEY = VALUE: \"x\"\n"
+     "2: log.level must be a number from 0 to 999999, not \"y\"\n"
+     "4: unknown key \"z\"\n"},
+    {"NUL", std::string("log.level = 1\0\n", 15),
+     "1: control character in \"log.level = 1\\x00\"\n"},
+    {"terminal sequence", "log.sink = file:/a\x1b[2J\n",
+     "1: control character in \"log.sink = file:/a\\x1B[2J\"\n"},
+    {"DEL", "log.sink = file:/a\x7f\n", "1: control character in \"log.sink = file:/a\\x7F\"\n"},
+    {"mark of byte order", "\xEF\xBB\xBFlog.level = 1\n",
+     "1: unknown key \"\xEF\xBB\xBFlog.level\"\n"},
+    {"bytes that are no text", "\xFF\xFE = 1\n", "1: unknown key \"\\xFF\\xFE\"\n"},
+    {"a long key is cut", std::string(100, 'k') + " = 1\n",
+     "1: unknown key \"kkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkk\\...\"\n"},
+};
+
+TEST(ConfigurationParser, TellsTheLineOfEveryErrorAndKeepsTheDefaults) {
+    for (const BadRow& row : badRows) {
+        const ParsedConfiguration parsed =
+            parseConfiguration("trace.records = failures\n" + row.text);
+        EXPECT_EQ(describe(parsed.configuration), defaults) << row.description;
+        EXPECT_EQ(describe(parseConfiguration(row.text)), row.errors) << row.description;
+    }
+}
+
+TEST(ConfigurationParser, AllowsControlCharactersInComments) {
+    EXPECT_EQ(describe(parseConfiguration("# \x1b[0m\x07\nlog.level = 1\n")), "");
+}
+
+TEST(ConfigurationParser, TakesThePathAsLongAsTheSystemDoesAndNoLonger) {
+    const std::string key = "log.sink = file:";
+    EXPECT_EQ(describe(parseConfiguration(key + "/" + std::string(4094, 'a'))), "");
+    EXPECT_EQ(parseConfiguration(key + "/" + std::string(4095, 'a')).errors.size(), 1u);
+}
+
+TEST(ConfigurationParser, RefusesMoreThan65536BytesWithoutLookingAtThem) {
+    const std::string longest = "log.level = 1\n" + std::string(65536 - 14, '\n');
+    EXPECT_EQ(describe(parseConfiguration(longest)), "");
+    const ParsedConfiguration parsed = parseConfiguration(longest + "\n");
+    EXPECT_EQ(describe(parsed), "0: longer than 65536 bytes\n");
+    EXPECT_EQ(describe(parsed.configuration), defaults);
+}
+
+TEST(ConfigurationParser, TellsTenErrorsAndThatThereAreMore) {
+    std::string text;
+    for (int line = 0; line < 10; ++line) text += "x\n";
+    EXPECT_EQ(parseConfiguration(text).errors.size(), 10u);
+    for (int line = 0; line < 20000; ++line) text += "x\n";
+    const ParsedConfiguration parsed = parseConfiguration(text);
+    ASSERT_EQ(parsed.errors.size(), 11u);
+    EXPECT_EQ(parsed.errors.back().line, 11u);
+    EXPECT_EQ(parsed.errors.back().message, "further errors are not told");
+}
+
+TEST(ConfigurationParser, StaysPrintableWhateverItIsGiven) {
+    std::mt19937 random(4711);
+    constexpr char alphabet[] = "log.trace.sinklevelrecords=,*#:/\n\n\t\r \0\x1b\x7f\xC2\x9B\xFF";
+    for (int round = 0; round < 5000; ++round) {
+        std::string text;
+        for (std::size_t length = random() % 200; length > 0; --length) {
+            text += alphabet[random() % (sizeof alphabet - 1)];
+        }
+        for (const ZBLog::ConfigurationError& error : parseConfiguration(text).errors) {
+            for (const char character : error.message) {
+                ASSERT_GE(static_cast<unsigned char>(character), 0x20) << error.message;
+            }
+            ASSERT_LT(error.message.size(), 200u);
+        }
+    }
+}
+
+}  // namespace

@@ -1,0 +1,200 @@
+#include <gmock/gmock.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
+#include <syslog.h>
+#include <unistd.h>
+
+#include <csignal>
+#include <filesystem>
+
+#include "framework/logging/FileSink.h"
+#include "tests/logging/LoggingSupport.h"
+
+namespace {
+
+using logging_test::readFile;
+using logging_test::record;
+using logging_test::textsOf;
+using testing::ElementsAre;
+
+const std::string warning = std::to_string(LOG_DAEMON | LOG_WARNING) + " korva-osstatus: ";
+
+/// A limit on the size of files that the process may write, while it lives.
+class FileSizeLimit {
+  public:
+    explicit FileSizeLimit(rlim_t bytes) {
+        ::getrlimit(RLIMIT_FSIZE, &former_);
+        const rlimit limited{bytes, former_.rlim_max};
+        ::setrlimit(RLIMIT_FSIZE, &limited);
+    }
+    ~FileSizeLimit() { ::setrlimit(RLIMIT_FSIZE, &former_); }
+    FileSizeLimit(const FileSizeLimit&) = delete;
+    FileSizeLimit& operator=(const FileSizeLimit&) = delete;
+
+  private:
+    rlimit former_{};
+};
+
+class FileSinkFaultTest : public testing::Test {
+  protected:
+    logging_test::TemporaryFolder folder_;
+    logging_test::FakeSurroundings surroundings_;
+};
+
+TEST_F(FileSinkFaultTest, FullDiskIsToldOnce) {
+    ZBLog::FileSink sink("/dev/full", surroundings_);
+    for (int count = 0; count < 100; ++count) sink.write(record("one"));
+    EXPECT_THAT(surroundings_.takeSystemLog(),
+                ElementsAre(warning + "/dev/full: No space left on device; records are dropped "
+                                      "until it can be written again"));
+}
+
+TEST_F(FileSinkFaultTest, MissingFolderIsToldOnceAndTheLossIsToldInTheFileAfterwards) {
+    std::filesystem::create_directory(folder_ / "var");
+    const std::string path = folder_ / "var/korva.log";
+    ZBLog::FileSink sink(path, surroundings_);
+    sink.write(record("one"));
+    std::filesystem::remove_all(folder_ / "var");
+    for (int count = 0; count < 12; ++count) sink.write(record("lost"));
+    EXPECT_FALSE(std::filesystem::exists(folder_ / "var"));
+    EXPECT_THAT(surroundings_.takeSystemLog(),
+                ElementsAre(warning + path +
+                            ": No such file or directory; records are dropped "
+                            "until it can be written again"));
+
+    std::filesystem::create_directory(folder_ / "var");
+    sink.write(record("two"));
+    sink.write(record("three"));
+    EXPECT_THAT(textsOf(readFile(path)),
+                ElementsAre("12 records were dropped: No such file or directory", "two", "three"));
+    EXPECT_THAT(readFile(path), testing::HasSubstr(" log 0 ZBLog - -:0 12 records were dropped"));
+    EXPECT_TRUE(surroundings_.takeSystemLog().empty());
+
+    std::filesystem::remove_all(folder_ / "var");
+    sink.write(record("lost"));
+    EXPECT_EQ(surroundings_.takeSystemLog().size(), 1u);
+    std::filesystem::create_directory(folder_ / "var");
+    sink.write(record("four"));
+    EXPECT_THAT(textsOf(readFile(path)),
+                ElementsAre("1 record was dropped: No such file or directory", "four"));
+}
+
+TEST_F(FileSinkFaultTest, UnwritableFolderIsToldOnceAndTheFileIsUsedWhenItBecomesWritable) {
+    ASSERT_EQ(::chmod(folder_.path().c_str(), 0555), 0);
+    const std::string path = folder_ / "korva.log";
+    const int status = logging_test::inChildProcess([&] {
+        if (::geteuid() == 0 && ::setresuid(65534, 65534, 0) != 0) return 1;
+        ZBLog::FileSink sink(path, surroundings_);
+        sink.write(record("lost"));
+        sink.write(record("lost"));
+        const bool told = surroundings_.takeSystemLog() ==
+                          std::vector<std::string>{warning + path +
+                                                   ": Permission denied; records are dropped "
+                                                   "until it can be written again"};
+        if (::getuid() == 65534 && ::setresuid(0, 0, 0) != 0) return 2;
+        ::chmod(folder_.path().c_str(), 0755);
+        sink.write(record("one"));
+        return told ? 0 : 3;
+    });
+    EXPECT_EQ(status, 0);
+    EXPECT_THAT(textsOf(readFile(path)),
+                ElementsAre("2 records were dropped: Permission denied", "one"));
+}
+
+TEST_F(FileSinkFaultTest, HalfALineIsNeverContinuedByAnotherRecord) {
+    const std::string path = folder_ / "korva.log";
+    ZBLog::FileSink sink(path, surroundings_);
+    sink.write(record("one"));
+    const std::string before = readFile(path);
+    {
+        const FileSizeLimit limit(before.size() + 10);
+        sink.write(record("torn"));
+        sink.write(record("lost"));
+    }
+    const std::string torn = readFile(path);
+    EXPECT_EQ(torn.size(), before.size() + 10);
+    sink.write(record("two"));
+    sink.write(record("three"));
+
+    const std::string after = readFile(path);
+    EXPECT_EQ(after.substr(0, torn.size()), torn);
+    EXPECT_EQ(after[torn.size()], '\n');
+    EXPECT_THAT(textsOf(after.substr(torn.size() + 1)),
+                ElementsAre("2 records were dropped: File too large", "two", "three"));
+    EXPECT_EQ(surroundings_.takeSystemLog().size(), 1u);
+}
+
+TEST_F(FileSinkFaultTest, NewFileAfterATornLineBeginsWithoutAnEmptyLine) {
+    const std::string path = folder_ / "korva.log";
+    ZBLog::FileSink sink(path, surroundings_);
+    {
+        const FileSizeLimit limit(10);
+        sink.write(record("torn"));
+    }
+    std::filesystem::rename(path, path + ".1");
+    sink.write(record("one"));
+    EXPECT_THAT(textsOf(readFile(path)),
+                ElementsAre("1 record was dropped: File too large", "one"));
+}
+
+TEST_F(FileSinkFaultTest, TornLineIsRememberedWhileTheFileIsAway) {
+    const std::string path = folder_ / "var/korva.log";
+    std::filesystem::create_directory(folder_ / "var");
+    ZBLog::FileSink sink(path, surroundings_);
+    {
+        const FileSizeLimit limit(10);
+        sink.write(record("torn"));
+    }
+    std::filesystem::rename(folder_ / "var", folder_ / "away");
+    sink.write(record("lost"));
+    std::filesystem::rename(folder_ / "away", folder_ / "var");
+    sink.write(record("one"));
+    EXPECT_THAT(textsOf(readFile(path).substr(11)),
+                ElementsAre("2 records were dropped: No such file or directory", "one"));
+}
+
+TEST_F(FileSinkFaultTest, LimitOnFileSizesRaisesNoSignal) {
+    const std::string path = folder_ / "korva.log";
+    const int status = logging_test::inChildProcess([&] {
+        std::signal(SIGXFSZ, SIG_DFL);
+        ZBLog::FileSink sink(path, surroundings_);
+        const FileSizeLimit limit(0);
+        sink.write(record("lost"));
+        sigset_t pending;
+        ::sigpending(&pending);
+        return ::sigismember(&pending, SIGXFSZ);
+    });
+    EXPECT_EQ(status, 0);
+}
+
+TEST_F(FileSinkFaultTest, SymbolicLinkIsRefused) {
+    const std::string victim = folder_ / "victim";
+    const std::string path = folder_ / "korva.log";
+    logging_test::writeFile(victim, "precious");
+    std::filesystem::create_symlink(victim, path);
+    ZBLog::FileSink sink(path, surroundings_);
+    sink.write(record("one"));
+    EXPECT_EQ(readFile(victim), "precious");
+    EXPECT_THAT(surroundings_.takeSystemLog(),
+                ElementsAre(warning + path +
+                            ": Too many levels of symbolic links; records are "
+                            "dropped until it can be written again"));
+}
+
+TEST_F(FileSinkFaultTest, FifoIsRefusedWithoutWaitingForItsReader) {
+    const std::string path = folder_ / "fifo";
+    ASSERT_EQ(::mkfifo(path.c_str(), 0600), 0);
+    ZBLog::FileSink sink(path, surroundings_);
+    sink.write(record("one"));
+    EXPECT_THAT(surroundings_.takeSystemLog(),
+                ElementsAre(testing::StartsWith(warning + path + ": No such device or address")));
+}
+
+TEST_F(FileSinkFaultTest, FolderInPlaceOfTheFileIsRefused) {
+    ZBLog::FileSink sink(folder_.path(), surroundings_);
+    sink.write(record("one"));
+    EXPECT_THAT(surroundings_.takeSystemLog(),
+                ElementsAre(testing::StartsWith(warning + folder_.path() + ": Is a directory")));
+}
+
+}  // namespace

@@ -1,0 +1,228 @@
+#include <dlfcn.h>
+#include <gmock/gmock.h>
+#include <sys/mman.h>
+#include <unistd.h>
+
+#include <array>
+#include <chrono>
+#include <cstdio>
+#include <cstdlib>
+#include <set>
+#include <stdexcept>
+#include <thread>
+
+#include "tests/logging/LoggingSupport.h"
+
+namespace {
+
+using logging_test::readFile;
+using logging_test::textsOf;
+using testing::Contains;
+using testing::ElementsAre;
+using testing::Not;
+
+constexpr const char* library = ZBLOG_LIBRARY;
+
+using Write = void (*)(const char*, const char*, int, const std::string&, int, char*, int, int,
+                       const std::string&);
+using Construct = void (*)(void*);
+using Append = void* (*)(void*, const char*);
+using Take = const std::string& (*)(void*, void*);
+
+/// The library, loaded for as long as this object lives.
+class Loaded {
+  public:
+    Loaded() : handle_(::dlopen(library, RTLD_NOW | RTLD_GLOBAL)) {
+        if (handle_ == nullptr) throw std::runtime_error(::dlerror());
+    }
+    ~Loaded() { ::dlclose(handle_); }
+    Loaded(const Loaded&) = delete;
+    Loaded& operator=(const Loaded&) = delete;
+
+    template <class Function>
+    Function get(const char* name) const {
+        void* const address = ::dlsym(handle_, name);
+        if (address == nullptr) throw std::runtime_error(::dlerror());
+        return reinterpret_cast<Function>(address);
+    }
+
+    void log(const std::string& text) const { write("15logLevelMessage", text); }
+    void trace(const std::string& text) const { write("17traceLevelMessage", text); }
+
+  private:
+    void write(const std::string& function, const std::string& text) const {
+        const std::string name = "_ZN5ZBLog8ZBLogger" + function +
+                                 "EPKcS2_iRKNSt7__cxx1112basic_stringIcSt11char_traitsIcESaIcEEE"
+                                 "iPciiSA_";
+        get<Write>(name.c_str())("work", "Work.cpp", 12, "Zumbrel.Test", 3000, nullptr, 0, 0, text);
+    }
+
+    void* handle_;
+};
+
+/// A configuration in memory, named by the environment while it lives.
+class ConfigurationInMemory {
+  public:
+    explicit ConfigurationInMemory(const std::string& content)
+        : descriptor_(::memfd_create("zblog.conf", MFD_CLOEXEC)) {
+        set(content);
+        ::setenv("ZBLOG_CONF", ("/proc/self/fd/" + std::to_string(descriptor_)).c_str(), 1);
+    }
+    ~ConfigurationInMemory() {
+        ::unsetenv("ZBLOG_CONF");
+        ::close(descriptor_);
+    }
+    ConfigurationInMemory(const ConfigurationInMemory&) = delete;
+    ConfigurationInMemory& operator=(const ConfigurationInMemory&) = delete;
+
+    void set(const std::string& content) const {
+        EXPECT_EQ(::ftruncate(descriptor_, 0), 0);
+        EXPECT_EQ(::pwrite(descriptor_, content.data(), content.size(), 0),
+                  static_cast<ssize_t>(content.size()));
+    }
+
+  private:
+    int descriptor_;
+};
+
+std::set<std::string> outputOf(const std::string& command) {
+    std::set<std::string> lines;
+    std::FILE* const pipe = ::popen(command.c_str(), "r");
+    if (pipe == nullptr) return lines;
+    std::array<char, 4096> line{};
+    while (std::fgets(line.data(), static_cast<int>(line.size()), pipe) != nullptr) {
+        std::string text(line.data());
+        if (!text.empty() && text.back() == '\n') text.pop_back();
+        lines.insert(text);
+    }
+    ::pclose(pipe);
+    return lines;
+}
+
+bool isMapped() {
+    return readFile("/proc/self/maps").find("libzblog.so") != std::string::npos;
+}
+
+TEST(Library, ExportsTheTwoClassesAndNothingElse) {
+    const std::string text = "[abi:cxx11]";
+    EXPECT_THAT(
+        outputOf("nm -DC --defined-only '" + std::string(library) +
+                 "' | cut -d' ' -f3- | "
+                 "sed 's/std::__cxx11::basic_string<char, std::char_traits<char>, "
+                 "std::allocator<char> >/std::string/g'"),
+        testing::UnorderedElementsAre(
+            "ZBLog::ZBLogger::logLevelMessage(char const*, char const*, int, std::string const&, "
+            "int, char*, int, int, std::string const&)",
+            "ZBLog::ZBLogger::traceLevelMessage(char const*, char const*, int, std::string const&, "
+            "int, char*, int, int, std::string const&)",
+            "ZBLog::ZBMessageBuffer::ZBMessageBuffer()",
+            "ZBLog::ZBMessageBuffer::~ZBMessageBuffer()",
+            "ZBLog::ZBMessageBuffer::operator<<(char const*)",
+            "ZBLog::ZBMessageBuffer::operator std::ostream&()",
+            "ZBLog::ZBMessageBuffer::str" + text + "(ZBLog::ZBMessageBuffer&)",
+            "ZBLog::ZBMessageBuffer::str" + text + "(std::ostream&)"));
+}
+
+TEST(Library, NeedsNothingButTheLanguagesLibraries) {
+    const std::string needed =
+        "readelf -d '" + std::string(library) + "' | sed -n 's/.*(NEEDED).*\\[\\(.*\\)\\]/\\1/p'";
+    for (const std::string& name : outputOf(needed)) {
+        EXPECT_THAT(name, testing::MatchesRegex("(libstdc\\+\\+|libgcc_s|libc|libm|ld-linux[^ ]*|"
+                                                "lib[atu][a-z]*san)\\.so\\.[0-9]+"));
+    }
+    EXPECT_FALSE(outputOf(needed).empty());
+}
+
+TEST(Library, TouchesNothingThatBelongsToTheProcess) {
+    const std::set<std::string> used = outputOf("nm -D --undefined-only '" + std::string(library) +
+                                                "' | sed 's/^ *[Uw] //; s/@.*//'");
+    EXPECT_THAT(used, Contains("write"));
+    for (const char* name :
+         {"openlog",        "closelog",  "setlogmask",  "setlocale",   "uselocale",
+          "signal",         "sigaction", "localtime",   "localtime_r", "gmtime",
+          "gmtime_r",       "mktime",    "tzset",       "umask",       "fork",
+          "vfork",          "execve",    "posix_spawn", "system",      "popen",
+          "setenv",         "putenv",    "exit",        "abort",       "pthread_create",
+          "pthread_atfork", "chdir"}) {
+        EXPECT_THAT(used, Not(Contains(name)));
+    }
+}
+
+TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
+    const logging_test::TemporaryFolder folder;
+    const ConfigurationInMemory configuration("log.sink = file:" + (folder / "log") +
+                                              "\nlog.records = all\n"
+                                              "trace.sink = file:" +
+                                              (folder / "trace") + "\n");
+    std::size_t descriptors = 0;
+    for (int round = 0; round < 100; ++round) {
+        ASSERT_FALSE(isMapped());
+        {
+            const Loaded loaded;
+            ASSERT_TRUE(isMapped());
+            void* buffer = nullptr;
+            loaded.get<Construct>("_ZN5ZBLog15ZBMessageBufferC1Ev")(&buffer);
+            loaded.get<Append>("_ZN5ZBLog15ZBMessageBufferlsEPKc")(&buffer, "round");
+            const std::string& text =
+                loaded.get<Take>("_ZN5ZBLog15ZBMessageBuffer3strB5cxx11ERS0_")(&buffer, &buffer);
+            loaded.log(text + " " + std::to_string(round));
+            loaded.trace(text + " " + std::to_string(round));
+            std::thread([&] { loaded.log("of a thread"); }).join();
+            loaded.get<Construct>("_ZN5ZBLog15ZBMessageBufferD1Ev")(&buffer);
+        }
+        ASSERT_FALSE(isMapped());
+        if (round == 0) descriptors = logging_test::openDescriptors();
+        ASSERT_EQ(logging_test::openDescriptors(), descriptors);
+    }
+    const auto texts = textsOf(readFile(folder / "log"));
+    ASSERT_EQ(texts.size(), 200u);
+    EXPECT_EQ(texts.front(), "round 0");
+    EXPECT_EQ(texts[198], "round 99");
+    EXPECT_EQ(textsOf(readFile(folder / "trace")).size(), 100u);
+}
+
+TEST(Library, FollowsAConfigurationInMemoryThatChanges) {
+    const logging_test::TemporaryFolder folder;
+    const ConfigurationInMemory configuration("log.sink = off\n");
+    const Loaded loaded;
+    loaded.log("one");
+    configuration.set("log.sink = file:" + (folder / "log") + "\nlog.records = all\n");
+    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(10);
+    while (readFile(folder / "log").empty() && std::chrono::steady_clock::now() < deadline) {
+        loaded.log("two");
+        std::this_thread::sleep_for(std::chrono::milliseconds(20));
+    }
+    EXPECT_THAT(textsOf(readFile(folder / "log")), ElementsAre("two"));
+}
+
+TEST(Library, ReadsNoFileWhenTheEnvironmentNamesNone) {
+    ::setenv("ZBLOG_CONF", "", 1);
+    const Loaded loaded;
+    testing::internal::CaptureStderr();
+    loaded.log("nothing of this is a failure");
+    loaded.trace("MESSAGE [File: A, Line: 9]: traced nowhere");
+    EXPECT_EQ(testing::internal::GetCapturedStderr(), "");
+    ::unsetenv("ZBLOG_CONF");
+}
+
+/// A process that ends while its threads go on logging.
+TEST(Library, LetsAProcessEndWhileItsThreadsGoOn) {
+    const logging_test::TemporaryFolder folder;
+    for (int round = 0; round < 10; ++round) {
+        const int status = logging_test::inChildProcess([&]() -> int {
+            const ConfigurationInMemory configuration("log.sink = file:" + (folder / "log") +
+                                                      "\nlog.records = all\n");
+            static const Loaded& loaded = *new Loaded;  // stays loaded until the process is gone
+            for (int thread = 0; thread < 3; ++thread) {
+                std::thread([] {
+                    for (;;) loaded.log("going on");
+                }).detach();
+            }
+            while (readFile(folder / "log").size() < 1000) std::this_thread::yield();
+            std::exit(7);
+        });
+        EXPECT_EQ(status, 7);
+    }
+}
+
+}  // namespace

@@ -1,0 +1,178 @@
+#include <gmock/gmock.h>
+#include <syslog.h>
+
+#include <filesystem>
+#include <limits>
+
+#include "framework/logging/Logger.h"
+#include "tests/logging/LoggingSupport.h"
+
+namespace {
+
+using logging_test::readFile;
+using logging_test::record;
+using logging_test::textsOf;
+using logging_test::writeFile;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+const std::string warning = std::to_string(LOG_DAEMON | LOG_WARNING) + " korva-osstatus: ";
+constexpr const char* failure = "MESSAGE [File: Work.cpp, Line: 12]: it broke";
+
+class LoggerReloadTest : public testing::Test {
+  protected:
+    LoggerReloadTest() { surroundings_.source = {path_, true}; }
+
+    void configure(const std::string& content) { writeFile(path_, content); }
+    void write(const std::string& text) { logger_.write(record(text)); }
+
+    logging_test::TemporaryFolder folder_;
+    logging_test::FakeSurroundings surroundings_;
+    const std::string path_ = folder_ / "zblog.conf";
+    const std::string first_ = folder_ / "first";
+    const std::string second_ = folder_ / "second";
+    const std::string toFirst_ = "log.sink = file:" + first_ + "\nlog.records = all\n";
+    const std::string toSecond_ = "log.sink = file:" + second_ + "\nlog.records = all\n";
+    ZBLog::Logger logger_{surroundings_};
+};
+
+TEST_F(LoggerReloadTest, ReadsItsFileWhenTheFirstRecordComes) {
+    configure(toFirst_);
+    write("one");
+    EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one"));
+    EXPECT_THAT(surroundings_.takeSystemLog(), IsEmpty());
+}
+
+TEST_F(LoggerReloadTest, FollowsAChangeAfterOneSecondAndNotBefore) {
+    configure(toFirst_);
+    write("one");
+    configure(toSecond_);
+    surroundings_.advance(999);
+    write("two");
+    surroundings_.advance(1);
+    write("three");
+    EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one", "two"));
+    EXPECT_THAT(textsOf(readFile(second_)), ElementsAre("three"));
+}
+
+TEST_F(LoggerReloadTest, FollowsAChangeWhenItsClockWrapsAround) {
+    surroundings_.setMilliseconds(std::numeric_limits<std::uint32_t>::max() - 100);
+    configure(toFirst_);
+    write("one");
+    configure(toSecond_);
+    surroundings_.advance(1000);
+    write("two");
+    EXPECT_THAT(textsOf(readFile(second_)), ElementsAre("two"));
+}
+
+TEST_F(LoggerReloadTest, ClosesAFileThatIsNoLongerWanted) {
+    configure(toFirst_);
+    write("one");
+    const std::size_t before = logging_test::openDescriptors();
+    for (int round = 0; round < 20; ++round) {
+        configure(round % 2 == 0 ? toSecond_ : toFirst_);
+        surroundings_.advance(1000);
+        write("two");
+        EXPECT_EQ(logging_test::openDescriptors(), before);
+    }
+}
+
+TEST_F(LoggerReloadTest, OpensAClosedChannelAndClosesAnOpenOne) {
+    configure("log.sink = off\n");
+    write(failure);
+    configure(toFirst_);
+    surroundings_.advance(1000);
+    write("one");
+    configure("log.sink = off\n");
+    surroundings_.advance(1000);
+    write("two");
+    EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one"));
+    EXPECT_THAT(surroundings_.takeSystemLog(), IsEmpty());
+}
+
+TEST_F(LoggerReloadTest, KeepsCountingLostRecordsWhenOnlyTheLevelChanges) {
+    const std::string file = folder_ / "var/log";
+    const std::string sink = "log.sink = file:" + file + "\nlog.records = all\n";
+    configure(sink);
+    write("lost");
+    configure(sink + "log.level = 4000\n");
+    surroundings_.advance(1000);
+    write("lost");
+    std::filesystem::create_directory(folder_ / "var");
+    write("one");
+    EXPECT_THAT(textsOf(readFile(file)),
+                ElementsAre("2 records were dropped: No such file or directory", "one"));
+    EXPECT_EQ(surroundings_.takeSystemLog().size(), 1u);
+}
+
+TEST_F(LoggerReloadTest, ReportsErrorsOnceAndKeepsTheDefaults) {
+    configure(toFirst_ + "log.level = high\n");
+    for (int count = 0; count < 10; ++count) {
+        write(count == 5 ? failure : "one");
+        surroundings_.advance(1000);
+    }
+    EXPECT_FALSE(std::filesystem::exists(first_));
+    EXPECT_THAT(
+        surroundings_.takeSystemLog(),
+        ElementsAre(
+            warning + path_ + ":3: log.level must be a number from 0 to 999999, not \"high\"",
+            warning + path_ + ": not in force; the defaults hold",
+            std::to_string(LOG_DAEMON | LOG_ERR) +
+                " korva-osstatus: log 3000 Zumbrel.Test work Work.cpp:12 " + failure));
+}
+
+TEST_F(LoggerReloadTest, ReportsAgainWhenTheFileChangesAndIsStillWrong) {
+    configure("x\n");
+    write("one");
+    surroundings_.takeSystemLog();
+    configure("y\n");
+    surroundings_.advance(1000);
+    write("one");
+    EXPECT_THAT(surroundings_.takeSystemLog(),
+                ElementsAre(warning + path_ + ":1: not of the form KEY = VALUE: \"y\"",
+                            warning + path_ + ": not in force; the defaults hold"));
+}
+
+TEST_F(LoggerReloadTest, GoesBackToTheDefaultsWhenAGoodFileBecomesABadOne) {
+    configure(toFirst_);
+    write("one");
+    configure(toFirst_ + "nonsense\n");
+    surroundings_.advance(1000);
+    write("two");
+    configure(toFirst_);
+    surroundings_.advance(1000);
+    write("three");
+    EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one", "three"));
+}
+
+TEST_F(LoggerReloadTest, ReportsAMissingFileOnceIfItWasAskedFor) {
+    for (int count = 0; count < 10; ++count) {
+        write("one");
+        surroundings_.advance(1000);
+    }
+    EXPECT_THAT(surroundings_.takeSystemLog(),
+                ElementsAre(warning + path_ + ": cannot be read: No such file or directory",
+                            warning + path_ + ": not in force; the defaults hold"));
+}
+
+TEST_F(LoggerReloadTest, SaysNothingAboutAMissingFileOfTheSystem) {
+    surroundings_.source.required = false;
+    write("one");
+    EXPECT_THAT(surroundings_.takeSystemLog(), IsEmpty());
+    configure(toFirst_);
+    surroundings_.advance(1000);
+    write("two");
+    EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("two"));
+}
+
+TEST_F(LoggerReloadTest, LetsGoOfItsFileWhenAConfigurationIsPutInForce) {
+    configure(toFirst_);
+    write("one");
+    logger_.use(ZBLog::Configuration());
+    configure(toSecond_);
+    surroundings_.advance(1000);
+    write("two");
+    EXPECT_FALSE(std::filesystem::exists(second_));
+}
+
+}  // namespace

@@ -1,0 +1,115 @@
+#include "tests/logging/LoggingSupport.h"
+
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+#include <stdexcept>
+#include <utility>
+
+namespace logging_test {
+
+TemporaryFolder::TemporaryFolder() {
+    std::string pattern = (std::filesystem::temp_directory_path() / "korva-log-XXXXXX").string();
+    if (::mkdtemp(pattern.data()) == nullptr) throw std::runtime_error("no temporary folder");
+    path_ = pattern;
+}
+
+TemporaryFolder::~TemporaryFolder() {
+    std::error_code ignored;
+    std::filesystem::remove_all(path_, ignored);
+}
+
+timespec FakeSurroundings::utc() noexcept {
+    timespec now{};
+    ::clock_gettime(CLOCK_REALTIME, &now);
+    now.tv_sec += ahead_;
+    return now;
+}
+
+void FakeSurroundings::writeSystemLog(int priority, const char* text) noexcept {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    lines_.push_back(std::to_string(priority) + " " + text);
+}
+
+std::vector<std::string> FakeSurroundings::takeSystemLog() {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    return std::exchange(lines_, {});
+}
+
+void writeFile(const std::string& path, const std::string& content) {
+    std::ofstream file(path, std::ios::binary | std::ios::trunc);
+    file << content;
+    if (!file.flush()) throw std::runtime_error("cannot write " + path);
+}
+
+std::string readFile(const std::string& path) {
+    std::ifstream file(path, std::ios::binary);
+    std::ostringstream content;
+    content << file.rdbuf();
+    return content.str();
+}
+
+std::vector<std::string> linesOf(const std::string& text) {
+    std::vector<std::string> lines;
+    std::istringstream stream(text);
+    for (std::string line; std::getline(stream, line);) lines.push_back(line);
+    return lines;
+}
+
+std::vector<std::string> textsOf(const std::string& lines) {
+    constexpr int fieldsBeforeText = 8;
+    std::vector<std::string> texts;
+    for (const std::string& line : linesOf(lines)) {
+        std::size_t start = 0;
+        for (int field = 0; field < fieldsBeforeText && start <= line.size(); ++field) {
+            const std::size_t blank = line.find(' ', start);
+            start = blank == std::string::npos ? line.size() + 1 : blank + 1;
+        }
+        texts.push_back(start > line.size() ? "no record: " + line : line.substr(start));
+    }
+    return texts;
+}
+
+ZBLog::Record record(const std::string& text, int level, ZBLog::Channel channel) {
+    return {channel, "work", "Work.cpp", 12, "Zumbrel.Test", level, text};
+}
+
+ZBLog::ChannelConfiguration everythingTo(ZBLog::Destination destination, const std::string& path) {
+    ZBLog::ChannelConfiguration channel;
+    channel.destination = destination;
+    channel.path = path;
+    return channel;
+}
+
+std::size_t openDescriptors() {
+    std::size_t count = 0;
+    for (const auto& entry : std::filesystem::directory_iterator("/proc/self/fd")) {
+        static_cast<void>(entry);
+        ++count;
+    }
+    return count;
+}
+
+int inChildProcess(const std::function<int()>& work) {
+    const pid_t child = ::fork();
+    if (child < 0) throw std::runtime_error("no child process");
+    if (child == 0) ::_exit(work());
+    int status = 0;
+    ::waitpid(child, &status, 0);
+    return WIFEXITED(status) ? WEXITSTATUS(status) : 1000 + WTERMSIG(status);
+}
+
+StandardErrorAs::StandardErrorAs(int descriptor) : former_(::dup(STDERR_FILENO)) {
+    ::dup2(descriptor, STDERR_FILENO);
+}
+
+StandardErrorAs::~StandardErrorAs() {
+    ::dup2(former_, STDERR_FILENO);
+    ::close(former_);
+}
+
+}  // namespace logging_test

@@ -1,0 +1,187 @@
+#include <gtest/gtest.h>
+
+#include <deque>
+#include <iomanip>
+#include <locale>
+#include <sstream>
+#include <thread>
+#include <vector>
+
+#include "ZBMessageBuffer.h"
+
+namespace {
+
+using ZBLog::ZBMessageBuffer;
+
+TEST(MessageBuffer, GathersTextsInOrder) {
+    ZBMessageBuffer buffer;
+    EXPECT_EQ(buffer.str(buffer << "ENTERING"
+                                << ": "
+                                << "G()"),
+              "ENTERING: G()");
+}
+
+TEST(MessageBuffer, IsEmptyAfterItsTextWasTaken) {
+    ZBMessageBuffer buffer;
+    buffer << "one";
+    EXPECT_EQ(buffer.str(buffer), "one");
+    EXPECT_EQ(buffer.str(buffer), "");
+}
+
+TEST(MessageBuffer, GivesTheTwinOfARecordTheSameText) {
+    ZBMessageBuffer buffer;
+    const std::string log = buffer.str(buffer << "METHOD: B() was invoked in A [Line: 7]");
+    const std::string trace = buffer.str(buffer << "METHOD: B() was invoked in A [Line: 7]");
+    EXPECT_EQ(log, "METHOD: B() was invoked in A [Line: 7]");
+    EXPECT_EQ(trace, log);
+}
+
+TEST(MessageBuffer, TakenTextStaysWhileTheNextIsGathered) {
+    ZBMessageBuffer buffer;
+    const std::string& taken = buffer.str(buffer << "one");
+    buffer << "two";
+    static_cast<std::ostream&>(buffer) << 3;
+    EXPECT_EQ(taken, "one");
+    EXPECT_EQ(buffer.str(buffer), "two3");
+}
+
+TEST(MessageBuffer, TakesNullForNoText) {
+    ZBMessageBuffer buffer;
+    const char* const none = nullptr;
+    EXPECT_EQ(buffer.str(buffer << "a" << none << "b"), "ab");
+}
+
+TEST(MessageBuffer, HoldsTextOfAnyLength) {
+    ZBMessageBuffer buffer;
+    const std::string huge(3000000, 'x');
+    EXPECT_EQ(buffer.str(buffer << huge.c_str()), huge);
+    EXPECT_EQ(buffer.str(buffer << "small"), "small");
+}
+
+TEST(MessageBuffer, PrintsPointersAsStreamsDo) {
+    struct Moniker {
+    } moniker;
+    const Moniker* const constant = &moniker;
+    const char* text = "text";
+    const char** const texts = &text;
+    std::ostringstream expected;
+    expected << "p=" << static_cast<const void*>(&moniker) << " "
+             << static_cast<const void*>(constant) << " " << static_cast<const void*>(texts) << " "
+             << static_cast<const void*>(nullptr);
+
+    ZBMessageBuffer buffer;
+    buffer << "p=" << &moniker;
+    buffer << " " << constant;
+    buffer << " " << texts;
+    const Moniker* const none = nullptr;
+    EXPECT_EQ(buffer.str(buffer << " " << none), expected.str());
+}
+
+TEST(MessageBuffer, MixesTextAndStreamInOrder) {
+    ZBMessageBuffer buffer;
+    std::ostream& stream = buffer;
+    stream << "a" << 1;
+    buffer << "b";
+    stream << 2.5 << 'c' << std::string("d") << true << std::endl;
+    EXPECT_EQ(buffer.str(stream), "a1b2.5cd1\n");
+}
+
+TEST(MessageBuffer, ForgetsFormatWithTheTextAndWithTheBuffer) {
+    for (int round = 0; round < 3; ++round) {
+        ZBMessageBuffer buffer;
+        std::ostream& stream = buffer;
+        EXPECT_EQ(buffer.str(stream << 255 << ' ' << 0.1), "255 0.1");
+        EXPECT_EQ(buffer.str(stream << std::hex << std::showbase << std::setfill('*')
+                                    << std::setprecision(2) << std::boolalpha << 255 << true),
+                  "0xfftrue");
+        EXPECT_EQ(buffer.str(stream << 255 << std::setw(3) << 1 << 3.14159 << true),
+                  "255  13.141591");
+        stream << std::hex << std::setw(10);
+    }
+}
+
+TEST(MessageBuffer, ForgetsAFailedInsertion) {
+    ZBMessageBuffer buffer;
+    std::ostream& stream = buffer;
+    stream << "a" << static_cast<std::streambuf*>(nullptr) << "lost";
+    EXPECT_EQ(buffer.str(stream), "a");
+    EXPECT_EQ(buffer.str(stream << "b"), "b");
+    stream.exceptions(std::ios::badbit);
+    EXPECT_ANY_THROW(stream << static_cast<std::streambuf*>(nullptr));
+    EXPECT_EQ(buffer.str(stream), "");
+    EXPECT_EQ(buffer.str(stream << static_cast<std::streambuf*>(nullptr)), "");
+}
+
+TEST(MessageBuffer, ReturnsToItsOwnTextWhenItsStreamWasLedElsewhere) {
+    std::ostringstream elsewhere;
+    {
+        ZBMessageBuffer buffer;
+        std::ostream& stream = buffer;
+        stream.rdbuf(elsewhere.rdbuf());
+        stream << "gone";
+    }
+    ZBMessageBuffer buffer;
+    std::ostream& stream = buffer;
+    EXPECT_EQ(buffer.str(stream << "here"), "here");
+    EXPECT_EQ(elsewhere.str(), "gone");
+}
+
+struct Grouping : std::numpunct<char> {
+    char do_thousands_sep() const override { return '.'; }
+    std::string do_grouping() const override { return "\3"; }
+};
+
+TEST(MessageBuffer, PrintsNumbersTheSameInEveryLocale) {
+    const std::locale former =
+        std::locale::global(std::locale(std::locale::classic(), new Grouping));
+    std::deque<ZBMessageBuffer> buffers(40);
+    for (ZBMessageBuffer& buffer : buffers) {
+        std::ostream& stream = buffer;
+        EXPECT_EQ(buffer.str(stream << 1234567), "1234567");
+        stream.imbue(std::locale());
+        EXPECT_EQ(buffer.str(stream << 1234567), "1.234.567");
+        EXPECT_EQ(buffer.str(stream << 1234567), "1234567");
+    }
+    std::locale::global(former);
+}
+
+TEST(MessageBuffer, NestsDeeperThanBuffersAreKept) {
+    std::deque<ZBMessageBuffer> buffers(100);
+    for (std::size_t index = 0; index < buffers.size(); ++index) {
+        static_cast<std::ostream&>(buffers[index]) << "buffer " << index;
+    }
+    for (std::size_t index = 0; index < buffers.size(); ++index) {
+        EXPECT_EQ(buffers[index].str(buffers[index]), "buffer " + std::to_string(index));
+    }
+}
+
+TEST(MessageBuffer, BeginsEmptyWhateverItsPlaceHeldBefore) {
+    for (int round = 0; round < 100; ++round) {
+        ZBMessageBuffer buffer;
+        EXPECT_EQ(buffer.str(buffer), "");
+        buffer << "left behind";
+    }
+}
+
+TEST(MessageBuffer, ServesManyThreadsAtOnce) {
+    std::vector<std::thread> threads;
+    std::atomic<int> wrong{0};
+    for (int thread = 0; thread < 8; ++thread) {
+        threads.emplace_back([&, thread] {
+            const std::string own(static_cast<std::size_t>(thread + 1) * 10,
+                                  static_cast<char>('a' + thread));
+            for (int count = 0; count < 2000; ++count) {
+                ZBMessageBuffer buffer;
+                const std::string& text = buffer.str(buffer << own.c_str());
+                if (text != own) ++wrong;
+                ZBMessageBuffer inner;
+                std::ostream& stream = inner;
+                if (inner.str(stream << count) != std::to_string(count)) ++wrong;
+            }
+        });
+    }
+    for (std::thread& thread : threads) thread.join();
+    EXPECT_EQ(wrong, 0);
+}
+
+}  // namespace
