@@ -1,0 +1,27 @@
+#include "Numbers.h"
+
+#include <algorithm>
+#include <charconv>
+
+namespace VA::Linux {
+
+bool isAllDigits(std::string_view text) {
+    return !text.empty() &&
+           std::all_of(text.begin(), text.end(), [](char c) { return c >= '0' && c <= '9'; });
+}
+
+std::optional<std::uint64_t> parseDecimal(std::string_view text) {
+    if (!isAllDigits(text)) return std::nullopt;
+    std::uint64_t value = 0;
+    const auto result = std::from_chars(text.data(), text.data() + text.size(), value);
+    if (result.ec != std::errc()) return std::nullopt;
+    return value;
+}
+
+std::optional<std::uint64_t> parseNumberFile(std::string_view text) {
+    if (!text.empty() && text.back() == '\n') text.remove_suffix(1);
+    const auto value = parseDecimal(text);
+    return value && *value > 0 ? value : std::nullopt;
+}
+
+}  // namespace VA::Linux

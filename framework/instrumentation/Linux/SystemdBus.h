@@ -1,0 +1,52 @@
+#ifndef VA_LINUX_SYSTEMD_BUS_H
+#define VA_LINUX_SYSTEMD_BUS_H
+
+#include <chrono>
+#include <functional>
+#include <mutex>
+#include <optional>
+#include <string>
+
+#include "SystemState.h"
+
+namespace VA::Linux {
+
+struct SdBusFunctions;
+
+/// Asks systemd's manager over the system bus, through libsystemd.
+///
+/// The library is loaded when it is first needed, and closed with this object; a host without it
+/// gives no answer. A question is one connection, one property read and one deadline for
+/// everything: a bus that accepts connections and then stays silent costs that long, never more.
+class SystemdBus final : public SystemManager {
+  public:
+    using Lookup = std::function<void*(void* library, const char* symbol)>;
+
+    static constexpr const char* defaultLibrary = "libsystemd.so.0";
+    static constexpr std::chrono::milliseconds defaultDeadline{300};
+
+    /// `socket` is the path of the bus's socket; `library` is a name for dlopen; `lookup` finds the
+    /// functions in it, dlsym where empty.
+    explicit SystemdBus(std::string socket, std::string library = defaultLibrary,
+                        Lookup lookup = {}, std::chrono::milliseconds deadline = defaultDeadline);
+    ~SystemdBus() override;
+    SystemdBus(const SystemdBus&) = delete;
+    SystemdBus& operator=(const SystemdBus&) = delete;
+
+    std::optional<std::string> systemState() override;
+
+  private:
+    bool bindFunctions(SdBusFunctions& functions);
+    void* openedLibrary();
+
+    const std::string address_;
+    const std::string library_;
+    const Lookup lookup_;
+    const std::chrono::milliseconds deadline_;
+    std::mutex mutex_;
+    void* handle_ = nullptr;
+};
+
+}  // namespace VA::Linux
+
+#endif

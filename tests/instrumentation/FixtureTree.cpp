@@ -1,0 +1,67 @@
+#include "FixtureTree.h"
+
+#include <sys/stat.h>
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <stdexcept>
+
+namespace fs = std::filesystem;
+
+FixtureTree::FixtureTree() {
+    std::string pattern = (fs::temp_directory_path() / "korva-host-XXXXXX").string();
+    if (!::mkdtemp(pattern.data())) throw std::runtime_error("no temporary folder");
+    root_ = pattern;
+    // Readable for the tests that give up root's privileges.
+    fs::permissions(root_, fs::perms(0755));
+}
+
+FixtureTree::~FixtureTree() {
+    std::error_code ignored;
+    fs::remove_all(root_, ignored);
+}
+
+void FixtureTree::write(const std::string& name, const std::string& content) const {
+    fs::create_directories(fs::path(path(name)).parent_path());
+    std::ofstream file(path(name), std::ios::binary | std::ios::trunc);
+    file << content;
+    if (!file.flush()) throw std::runtime_error("cannot write " + path(name));
+}
+
+void FixtureTree::makeFolder(const std::string& name) const {
+    fs::create_directories(path(name));
+}
+
+void FixtureTree::makeFifo(const std::string& name) const {
+    fs::create_directories(fs::path(path(name)).parent_path());
+    if (::mkfifo(path(name).c_str(), 0644) != 0) throw std::runtime_error("no FIFO " + path(name));
+}
+
+void FixtureTree::makeLink(const std::string& name, const std::string& target) const {
+    fs::create_directories(fs::path(path(name)).parent_path());
+    fs::create_symlink(target, path(name));
+}
+
+void FixtureTree::remove(const std::string& name) const {
+    fs::remove_all(path(name));
+}
+
+void FixtureTree::writeCompleteHost() const {
+    write("etc/os-release", "NAME=\"Test Linux\"\nVERSION_ID=\"7.1\"\n");
+    write("etc/machine-id", "0123456789abcdef0123456789abcdef\n");
+    write("proc/stat", "cpu  1 2 3 4 0 0 0 0 0 0\nbtime 1700000000\nprocesses 4711\n");
+    write("proc/meminfo",
+          "MemTotal:       16777216 kB\n"
+          "MemFree:         1000000 kB\n"
+          "MemAvailable:    8388608 kB\n"
+          "Buffers:          500000 kB\n"
+          "Cached:          3000000 kB\n"
+          "SwapTotal:       2097152 kB\n"
+          "SwapFree:        1048576 kB\n");
+    write("proc/sys/kernel/pid_max", "32768\n");
+    write("proc/sys/kernel/threads-max", "127412\n");
+    for (const char* pid : {"1", "20", "300"}) makeFolder(std::string("proc/") + pid);
+    write("run/systemd/sessions/1", "UID=1000\nSTATE=active\nCLASS=user\n");
+    write("run/systemd/sessions/c2", "UID=1001\nSTATE=online\nCLASS=user\n");
+}

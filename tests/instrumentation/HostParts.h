@@ -1,0 +1,127 @@
+#ifndef TESTS_INSTRUMENTATION_HOST_PARTS_H
+#define TESTS_INSTRUMENTATION_HOST_PARTS_H
+
+#include <atomic>
+#include <map>
+#include <memory>
+#include <mutex>
+#include <optional>
+#include <string>
+
+#include "FixtureTree.h"
+#include "framework/instrumentation/Linux/Snapshot.h"
+#include "framework/instrumentation/LinuxHost.h"
+
+/// Files of a fixture tree that count each look, by path, and can be given other dates.
+class CountingFiles final : public VA::Linux::HostFiles {
+  public:
+    using HostFiles::HostFiles;
+
+    std::optional<VA::Linux::FileContent> read(const std::string& path) const override {
+        count(path);
+        return HostFiles::read(path);
+    }
+    std::optional<std::vector<std::string>> names(const std::string& path) const override {
+        count(path);
+        return HostFiles::names(path);
+    }
+    std::optional<VA::Linux::FileDates> dates(const std::string& path) const override {
+        count("dates of /" + path);
+        const auto found = fixedDates.find(path);
+        if (found == fixedDates.end()) return std::nullopt;
+        return found->second;
+    }
+    bool isFolder(const std::string& path) const override {
+        count(path);
+        return HostFiles::isFolder(path);
+    }
+
+    std::map<std::string, int> counts() const {
+        const std::lock_guard<std::mutex> lock(mutex_);
+        return counts_;
+    }
+
+    std::map<std::string, VA::Linux::FileDates> fixedDates;  ///< of all files that have dates
+
+  private:
+    void count(const std::string& path) const {
+        const std::lock_guard<std::mutex> lock(mutex_);
+        ++counts_[path];
+    }
+
+    mutable std::mutex mutex_;
+    mutable std::map<std::string, int> counts_;
+};
+
+/// A kernel that says what it was told to.
+class FixedKernel final : public VA::Linux::Kernel {
+  public:
+    std::optional<VA::Linux::KernelNames> names() const override {
+        ++namesCalls;
+        return fixedNames;
+    }
+    std::int64_t now() const override { return fixedNow; }
+    std::optional<std::int64_t> bootTime() const override { return fixedBootTime; }
+    std::optional<std::uint64_t> addressSpaceLimit() const override { return fixedLimit; }
+
+    std::optional<VA::Linux::KernelNames> fixedNames{{"Linux", "node.example", "6.1.0-18"}};
+    std::int64_t fixedNow = 1700100000;
+    std::optional<std::int64_t> fixedBootTime = 1699999999;
+    std::optional<std::uint64_t> fixedLimit = unlimited;
+    mutable std::atomic<int> namesCalls{0};
+};
+
+class FixedSystemManager final : public VA::Linux::SystemManager {
+  public:
+    std::optional<std::string> systemState() override {
+        ++calls;
+        return state;
+    }
+
+    std::optional<std::string> state = "running";
+    std::atomic<int> calls{0};
+};
+
+/// A Linux host over a fixture tree, with each of its parts within reach.
+class FixtureHost {
+  public:
+    FixtureHost() : FixtureHost(std::make_shared<FixtureTree>()) {}
+
+    const FixtureTree& tree() const { return *tree_; }
+
+    /// A walk that stands on the node; lives no longer than this object.
+    std::unique_ptr<VA::NodeCursor> cursor() {
+        auto cursor = host_->openCursor();
+        cursor->select(VA::NodeLexicon::OperatingSystemNode);
+        return cursor;
+    }
+
+    /// Reads from a new walk. T is the overload; nothing where that gives false.
+    template <class T>
+    std::optional<T> read(VA::NodeLexicon::Properties id) {
+        T value{};
+        const bool found = cursor()->readProperty(id, value);
+        return found ? std::optional<T>(value) : std::nullopt;
+    }
+    auto text(VA::NodeLexicon::Properties id) { return read<std::string>(id); }
+    auto number(VA::NodeLexicon::Properties id) { return read<unsigned int>(id); }
+    auto flag(VA::NodeLexicon::Properties id) { return read<bool>(id); }
+
+  private:
+    explicit FixtureHost(std::shared_ptr<FixtureTree> tree)
+        : tree_(std::move(tree)),
+          files(std::make_shared<CountingFiles>(tree_->root())),
+          host_(std::make_unique<VA::LinuxHost>(VA::Linux::HostParts{files, kernel, manager})) {}
+
+    std::shared_ptr<FixtureTree> tree_;
+
+  public:
+    std::shared_ptr<CountingFiles> files;
+    std::shared_ptr<FixedKernel> kernel = std::make_shared<FixedKernel>();
+    std::shared_ptr<FixedSystemManager> manager = std::make_shared<FixedSystemManager>();
+
+  private:
+    std::unique_ptr<VA::LinuxHost> host_;
+};
+
+#endif

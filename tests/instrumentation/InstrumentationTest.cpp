@@ -1,0 +1,240 @@
+// The contract of VA::Instrumentation, and the seam behind it.
+#include <Instrumentation.h>
+#include <gtest/gtest.h>
+
+#include <thread>
+#include <type_traits>
+#include <vector>
+
+#include "framework/instrumentation/HostSource.h"
+#include "framework/instrumentation/LinuxHost.h"
+#include "framework/instrumentation/SimulatedHost.h"
+#include "tests/instrumentation/FixtureTree.h"
+
+namespace {
+
+using namespace VA::NodeLexicon;
+using VA::Instrumentation;
+using VA::SimulatedHost;
+
+static_assert(!std::is_copy_constructible_v<Instrumentation>);
+static_assert(!std::is_copy_assignable_v<Instrumentation>);
+static_assert(sizeof(NodeType) == 4 && sizeof(Properties) == 4);
+
+// The operator is not const, as gtest would have it.
+bool standsOnNode(Instrumentation& cursor) {
+    return cursor;
+}
+
+class InstrumentationTest : public testing::Test {
+  protected:
+    ~InstrumentationTest() override { VA::setHostSource(nullptr); }
+
+    static void expectNothing(Instrumentation& cursor) {
+        std::string text;
+        unsigned int number = 0;
+        bool flag = false;
+        EXPECT_FALSE(standsOnNode(cursor));
+        for (unsigned int id = 100; id < 160; ++id) {
+            EXPECT_FALSE(cursor.getProperty(Properties(id), text)) << id;
+            EXPECT_FALSE(cursor.getProperty(Properties(id), number)) << id;
+            EXPECT_FALSE(cursor.getProperty(Properties(id), flag)) << id;
+            EXPECT_FALSE(cursor.isPropertyReadOnly(Properties(id), flag)) << id;
+        }
+        EXPECT_EQ(cursor.getNodeStatus(), 0u);
+    }
+
+    static std::string nameOf(Instrumentation& cursor) {
+        std::string name = "none";
+        cursor.getProperty(Name, name);
+        return name;
+    }
+
+    static std::shared_ptr<VA::HostSource> hostNamed(const std::string& name) {
+        auto host = std::make_shared<SimulatedHost>();
+        SimulatedHost::Node node;
+        node.properties[Name] = name;
+        host->addNode(node);
+        return host;
+    }
+};
+
+TEST_F(InstrumentationTest, StandsOnNoNodeBeforeItSelects) {
+    Instrumentation onThisMachine;
+    expectNothing(onThisMachine);
+    VA::setHostSource(SimulatedHost::withOneNode());
+    Instrumentation simulated;
+    expectNothing(simulated);
+}
+
+TEST_F(InstrumentationTest, FindsOneOperatingSystemOnThisMachineAndNothingBehindIt) {
+    Instrumentation cursor;
+    EXPECT_TRUE(cursor.selectNode(OperatingSystemNode));
+    EXPECT_TRUE(standsOnNode(cursor));
+    EXPECT_NE(nameOf(cursor), "none");
+    EXPECT_EQ(&++cursor, &cursor);
+    expectNothing(cursor);
+    std::string name;
+    EXPECT_TRUE(cursor.getComputerName(name));
+    EXPECT_NE(name, "");
+}
+
+TEST_F(InstrumentationTest, MovingPastTheLastNodeIsFinal) {
+    VA::setHostSource(SimulatedHost::withOneNode());
+    Instrumentation cursor;
+    cursor.selectNode(OperatingSystemNode);
+    for (int i = 0; i < 3; ++i) {
+        ++cursor;
+        expectNothing(cursor);
+    }
+}
+
+TEST_F(InstrumentationTest, HostWithoutNodesIsEmptyFromTheStart) {
+    VA::setHostSource(std::make_shared<SimulatedHost>());
+    Instrumentation cursor;
+    EXPECT_FALSE(cursor.selectNode(OperatingSystemNode));
+    expectNothing(cursor);
+    ++cursor;
+    expectNothing(cursor);
+}
+
+TEST_F(InstrumentationTest, OtherNodeTypesHaveNoNodes) {
+    for (const unsigned int type : {0u, 1u, 16u, 18u, 4294967295u}) {
+        Instrumentation cursor;
+        EXPECT_FALSE(cursor.selectNode(NodeType(type))) << type;
+        expectNothing(cursor);
+    }
+}
+
+TEST_F(InstrumentationTest, ReadsTheSourceThatWasCurrentWhenItWasConstructed) {
+    VA::setHostSource(hostNamed("first"));
+    Instrumentation first;
+    VA::setHostSource(hostNamed("second"));
+    Instrumentation second;
+    first.selectNode(OperatingSystemNode);
+    second.selectNode(OperatingSystemNode);
+    EXPECT_EQ(nameOf(first), "first");
+    EXPECT_EQ(nameOf(second), "second");
+}
+
+TEST_F(InstrumentationTest, KeepsItsSourceAliveAndLetsItGo) {
+    auto host = hostNamed("kept");
+    const std::weak_ptr<VA::HostSource> watched = host;
+    VA::setHostSource(std::move(host));
+    {
+        Instrumentation cursor;
+        cursor.selectNode(OperatingSystemNode);
+        VA::setHostSource(nullptr);
+        EXPECT_FALSE(watched.expired());
+        EXPECT_EQ(nameOf(cursor), "kept");
+    }
+    EXPECT_TRUE(watched.expired());
+}
+
+TEST_F(InstrumentationTest, NullRestoresThisMachine) {
+    VA::setHostSource(hostNamed("simulated"));
+    VA::setHostSource(nullptr);
+    Instrumentation cursor;
+    cursor.selectNode(OperatingSystemNode);
+    EXPECT_NE(nameOf(cursor), "simulated");
+    unsigned int type = 0;
+    EXPECT_TRUE(cursor.getProperty(OSType, type));
+    EXPECT_EQ(type, 35u);
+}
+
+TEST_F(InstrumentationTest, CurrentSourceIsTheOneThatWasSetAndOneAndTheSameByDefault) {
+    const auto host = hostNamed("x");
+    VA::setHostSource(host);
+    EXPECT_EQ(VA::currentHostSource(), host);
+    VA::setHostSource(nullptr);
+    const auto first = VA::currentHostSource();
+    ASSERT_TRUE(first);
+    EXPECT_EQ(VA::currentHostSource(), first);
+    EXPECT_TRUE(dynamic_cast<VA::LinuxHost*>(first.get()));
+}
+
+TEST_F(InstrumentationTest, ReadsALinuxHostUnderAnyRoot) {
+    FixtureTree tree;
+    tree.writeCompleteHost();
+    VA::setHostSource(std::make_shared<VA::LinuxHost>(tree.root()));
+    Instrumentation cursor;
+    ASSERT_TRUE(cursor.selectNode(OperatingSystemNode));
+    EXPECT_EQ(nameOf(cursor), "Test Linux");
+    unsigned int users = 0;
+    EXPECT_TRUE(cursor.getProperty(NumberOfUsers, users));
+    EXPECT_EQ(users, 2u);
+    bool readOnly = false;
+    EXPECT_TRUE(cursor.isPropertyReadOnly(Name, readOnly));
+    EXPECT_TRUE(readOnly);
+    EXPECT_EQ(cursor.getNodeStatus(), 1u);
+}
+
+TEST_F(InstrumentationTest, WrongOverloadFindsNothing) {
+    FixtureTree tree;
+    tree.writeCompleteHost();
+    const std::shared_ptr<VA::HostSource> sources[] = {
+        SimulatedHost::withOneNode(), std::make_shared<VA::LinuxHost>(tree.root())};
+    for (const auto& source : sources) {
+        VA::setHostSource(source);
+        Instrumentation cursor;
+        cursor.selectNode(OperatingSystemNode);
+        std::string text;
+        unsigned int number = 0;
+        bool flag = false;
+        EXPECT_FALSE(cursor.getProperty(Name, number));
+        EXPECT_FALSE(cursor.getProperty(Name, flag));
+        EXPECT_FALSE(cursor.getProperty(OSType, text));
+        EXPECT_FALSE(cursor.getProperty(OSType, flag));
+        EXPECT_FALSE(cursor.getProperty(Distributed, text));
+        EXPECT_FALSE(cursor.getProperty(Distributed, number));
+        EXPECT_FALSE(cursor.getProperty(LastBootUpTime, number));
+        EXPECT_FALSE(cursor.getProperty(TotalSwapSpaceSize, text));
+    }
+}
+
+TEST_F(InstrumentationTest, SourceMayBeReplacedWhileManyThreadsRead) {
+    std::vector<std::thread> threads;
+    for (int i = 0; i < 8; ++i) {
+        threads.emplace_back([i] {
+            for (int round = 0; round < 50; ++round) {
+                if (i == 0) VA::setHostSource(round % 2 ? hostNamed("even") : nullptr);
+                Instrumentation cursor;
+                EXPECT_TRUE(cursor.selectNode(OperatingSystemNode));
+                EXPECT_NE(nameOf(cursor), "none");
+                ++cursor;
+                EXPECT_FALSE(standsOnNode(cursor));
+            }
+        });
+    }
+    for (auto& thread : threads) thread.join();
+}
+
+TEST_F(InstrumentationTest, SourcesOutsideTheLibraryMayDeriveFromTheSeam) {
+    class Cursor final : public VA::NodeCursor {
+      public:
+        bool select(NodeType type) override { return type == NodeType(3); }
+        bool standsOnNode() override { return true; }
+        void advance() override {}
+        bool readProperty(Properties, std::string&) override { return false; }
+        bool readProperty(Properties id, unsigned int& value) override {
+            value = id + 1;
+            return true;
+        }
+        bool readProperty(Properties, bool&) override { return false; }
+        bool readOnlyProperty(Properties, bool&) override { return false; }
+        unsigned int nodeStatus() override { return 26; }
+        bool readComputerName(std::string&) override { return false; }
+    };
+    class Source final : public VA::HostSource {
+        std::unique_ptr<VA::NodeCursor> openCursor() override { return std::make_unique<Cursor>(); }
+    };
+    VA::setHostSource(std::make_shared<Source>());
+    Instrumentation cursor;
+    EXPECT_TRUE(cursor.selectNode(NodeType(3)));
+    unsigned int value = 0;
+    EXPECT_TRUE(cursor.getProperty(Name, value));
+    EXPECT_EQ(value, 109u);
+    EXPECT_EQ(cursor.getNodeStatus(), 26u);
+}
+
+}  // namespace

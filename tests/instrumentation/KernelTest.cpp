@@ -1,0 +1,76 @@
+#include "framework/instrumentation/Linux/Kernel.h"
+
+#include <gtest/gtest.h>
+#include <sys/resource.h>
+
+#include <ctime>
+#include <fstream>
+#include <string>
+
+#include "framework/instrumentation/Linux/BootTime.h"
+#include "tests/instrumentation/HostParts.h"
+
+namespace {
+
+using VA::Linux::Kernel;
+using VA::NodeLexicon::MaxProcessMemorySize;
+
+TEST(KernelClock, BootTimeAgreesWithTheKernelsOwnToASecond) {
+    std::ifstream file("/proc/stat");
+    const std::string text{std::istreambuf_iterator<char>(file), {}};
+    const auto expected = VA::Linux::parseBootTime(text);
+    ASSERT_TRUE(expected);
+    const auto actual = Kernel().bootTime();
+    ASSERT_TRUE(actual);
+    EXPECT_NEAR(static_cast<double>(*actual), static_cast<double>(*expected), 1.0);
+}
+
+TEST(KernelClock, NowIsTheTimeOfDay) {
+    EXPECT_NEAR(static_cast<double>(Kernel().now()), static_cast<double>(std::time(nullptr)), 1.0);
+}
+
+// The soft limit as the kernel reports it while it is `soft`; it is put back before this returns.
+std::optional<std::uint64_t> limitWhileSoftLimitIs(rlim_t soft) {
+    struct rlimit before;
+    if (::getrlimit(RLIMIT_AS, &before) != 0) return std::nullopt;
+    struct rlimit changed = before;
+    changed.rlim_cur = soft;
+    if (::setrlimit(RLIMIT_AS, &changed) != 0) return std::nullopt;
+    const auto limit = Kernel().addressSpaceLimit();
+    ::setrlimit(RLIMIT_AS, &before);
+    return limit;
+}
+
+TEST(KernelLimits, AddressSpaceLimitIsTheSoftOneIn64Bits) {
+    struct rlimit now;
+    ASSERT_EQ(::getrlimit(RLIMIT_AS, &now), 0);
+    if (now.rlim_max != RLIM_INFINITY) GTEST_SKIP() << "this process may not use all limits";
+    constexpr rlim_t eightGiB = rlim_t{8} << 30;
+    EXPECT_EQ(limitWhileSoftLimitIs(eightGiB), 8589934592u);
+    EXPECT_EQ(limitWhileSoftLimitIs((rlim_t{4} << 30) - 1), 4294967295u);
+    EXPECT_EQ(limitWhileSoftLimitIs(RLIM_INFINITY), Kernel::unlimited);
+}
+
+TEST(MostMemoryOfAProcess, IsTheLimitInKilobytesAndZeroWhenUnlimited) {
+    FixtureHost host;
+    struct Case {
+        std::optional<std::uint64_t> bytes;
+        std::optional<unsigned int> kiB;
+    };
+    const Case cases[] = {
+        {Kernel::unlimited, 0u},
+        {1073741824u, 1048576u},
+        {8589934592u, 8388608u},
+        {2047u, 1u},
+        {1023u, 1u},  // 0 would say that there is no limit
+        {0u, 1u},
+        {18446744073709551614u, 4294967295u},
+        {std::nullopt, std::nullopt},
+    };
+    for (const Case& c : cases) {
+        host.kernel->fixedLimit = c.bytes;
+        EXPECT_EQ(host.number(MaxProcessMemorySize), c.kiB) << testing::PrintToString(c.bytes);
+    }
+}
+
+}  // namespace

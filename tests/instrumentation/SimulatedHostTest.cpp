@@ -1,0 +1,255 @@
+#include "framework/instrumentation/SimulatedHost.h"
+
+#include <Instrumentation.h>
+#include <gtest/gtest.h>
+
+#include <set>
+#include <stdexcept>
+#include <thread>
+#include <vector>
+
+namespace {
+
+using namespace VA::NodeLexicon;
+using VA::Instrumentation;
+using VA::SimulatedHost;
+using Operation = SimulatedHost::Operation;
+
+// The operator is not const, as gtest would have it.
+bool standsOnNode(Instrumentation& cursor) {
+    return cursor;
+}
+
+class SimulatedHostTest : public testing::Test {
+  protected:
+    SimulatedHostTest() { VA::setHostSource(host); }
+    ~SimulatedHostTest() override { VA::setHostSource(nullptr); }
+
+    const std::shared_ptr<SimulatedHost> host = SimulatedHost::withOneNode();
+};
+
+constexpr unsigned int lexicon[] = {108, 128, 134, 139, 140, 141, 142, 143, 144,
+                                    145, 146, 147, 148, 149, 150, 151, 152, 153};
+
+TEST_F(SimulatedHostTest, PlausibleNodeHasEveryPropertyThroughOneOverload) {
+    Instrumentation cursor;
+    ASSERT_TRUE(cursor.selectNode(OperatingSystemNode));
+    for (const unsigned int id : lexicon) {
+        std::string text;
+        unsigned int number = 0;
+        bool flag = false;
+        const bool isText = id == 108 || id == 134 || id == 139 || id == 141;
+        const bool isFlag = id == 140;
+        EXPECT_EQ(cursor.getProperty(Properties(id), text), isText) << id;
+        EXPECT_EQ(cursor.getProperty(Properties(id), flag), isFlag) << id;
+        EXPECT_EQ(cursor.getProperty(Properties(id), number), !isText && !isFlag) << id;
+    }
+    bool readOnly = false;
+    EXPECT_TRUE(cursor.isPropertyReadOnly(Name, readOnly));
+    EXPECT_TRUE(readOnly);
+    EXPECT_FALSE(cursor.isPropertyReadOnly(Version, readOnly));
+    EXPECT_EQ(cursor.getNodeStatus(), 1u);
+    std::string name;
+    EXPECT_TRUE(cursor.getComputerName(name));
+    EXPECT_EQ(name, "simulated.example");
+}
+
+TEST_F(SimulatedHostTest, EachPropertyCanBeAbsent) {
+    for (const unsigned int absent : lexicon) {
+        auto node = SimulatedHost::plausibleNode();
+        node.properties.erase(Properties(absent));
+        host->clearNodes();
+        host->addNode(node);
+        Instrumentation cursor;
+        cursor.selectNode(OperatingSystemNode);
+        std::set<unsigned int> missing;
+        for (const unsigned int id : lexicon) {
+            std::string text;
+            unsigned int number = 0;
+            bool flag = false;
+            if (!cursor.getProperty(Properties(id), text) &&
+                !cursor.getProperty(Properties(id), number) &&
+                !cursor.getProperty(Properties(id), flag)) {
+                missing.insert(id);
+            }
+        }
+        EXPECT_EQ(missing, std::set<unsigned int>{absent});
+    }
+}
+
+TEST_F(SimulatedHostTest, NodesComeInTheOrderTheyWereAddedEachWithItsOwnValues) {
+    host->clearNodes();
+    for (unsigned int i = 0; i < 5; ++i) {
+        SimulatedHost::Node node;
+        node.properties[Name] = "node " + std::to_string(i);
+        node.readOnly[Name] = i % 2 == 0;
+        node.status = 20 + i;
+        host->addNode(node);
+    }
+    Instrumentation cursor;
+    cursor.selectNode(OperatingSystemNode);
+    for (unsigned int i = 0; i < 5; ++i) {
+        ASSERT_TRUE(standsOnNode(cursor));
+        std::string name;
+        bool readOnly = false;
+        EXPECT_TRUE(cursor.getProperty(Name, name));
+        EXPECT_EQ(name, "node " + std::to_string(i));
+        EXPECT_TRUE(cursor.isPropertyReadOnly(Name, readOnly));
+        EXPECT_EQ(readOnly, i % 2 == 0);
+        EXPECT_EQ(cursor.getNodeStatus(), 20 + i);
+        ++cursor;
+    }
+    EXPECT_FALSE(standsOnNode(cursor));
+}
+
+TEST_F(SimulatedHostTest, ComputerNameCanBeUnknown) {
+    host->setComputerName(std::nullopt);
+    Instrumentation cursor;
+    cursor.selectNode(OperatingSystemNode);
+    std::string name = "untouched";
+    EXPECT_FALSE(cursor.getComputerName(name));
+    EXPECT_EQ(name, "untouched");
+}
+
+TEST_F(SimulatedHostTest, WalkKeepsTheHostAsItStoodWhenItWasSelected) {
+    Instrumentation cursor;
+    cursor.selectNode(OperatingSystemNode);
+    host->clearNodes();
+    host->setComputerName("renamed");
+    EXPECT_TRUE(standsOnNode(cursor));
+    std::string name;
+    EXPECT_TRUE(cursor.getComputerName(name));
+    EXPECT_EQ(name, "simulated.example");
+    Instrumentation later;
+    EXPECT_FALSE(later.selectNode(OperatingSystemNode));
+    EXPECT_TRUE(later.getComputerName(name));
+    EXPECT_EQ(name, "renamed");
+}
+
+TEST_F(SimulatedHostTest, NodesAreOfTheOperatingSystemTypeAlone) {
+    Instrumentation cursor;
+    EXPECT_FALSE(cursor.selectNode(NodeType(16)));
+    EXPECT_FALSE(standsOnNode(cursor));
+}
+
+// Calls every operation once, in the order of the enumeration.
+void callEverything() {
+    std::string text;
+    unsigned int number = 0;
+    bool flag = false;
+    Instrumentation cursor;
+    cursor.selectNode(OperatingSystemNode);
+    standsOnNode(cursor);
+    ++cursor;
+    cursor.getProperty(Name, text);
+    cursor.getProperty(OSType, number);
+    cursor.getProperty(Distributed, flag);
+    cursor.isPropertyReadOnly(Name, flag);
+    cursor.getNodeStatus();
+    cursor.getComputerName(text);
+}
+
+const Operation everyOperation[] = {Operation::Construct,    Operation::Select,
+                                    Operation::StandsOnNode, Operation::Advance,
+                                    Operation::ReadText,     Operation::ReadNumber,
+                                    Operation::ReadFlag,     Operation::ReadOnlyQuery,
+                                    Operation::NodeStatus,   Operation::ComputerName};
+
+TEST_F(SimulatedHostTest, EachCallIsCountedOnceByOperationAndByProperty) {
+    callEverything();
+    callEverything();
+    EXPECT_EQ(host->calls(), 20u);
+    for (const Operation operation : everyOperation) {
+        EXPECT_EQ(host->calls(operation), 2u) << static_cast<int>(operation);
+    }
+    EXPECT_EQ(host->calls(Operation::ReadText, Name), 2u);
+    EXPECT_EQ(host->calls(Operation::ReadOnlyQuery, Name), 2u);
+    EXPECT_EQ(host->calls(Operation::ReadNumber, OSType), 2u);
+    EXPECT_EQ(host->calls(Operation::ReadFlag, Distributed), 2u);
+    EXPECT_EQ(host->calls(Operation::ReadText, Version), 0u);
+    EXPECT_EQ(host->calls(Operation::ReadNumber, Name), 0u);
+    host->resetCounts();
+    EXPECT_EQ(host->calls(), 0u);
+    EXPECT_EQ(host->calls(Operation::Select), 0u);
+    EXPECT_EQ(host->calls(Operation::ReadText, Name), 0u);
+}
+
+TEST_F(SimulatedHostTest, HookSeesEachCallInOrder) {
+    std::vector<SimulatedHost::Call> seen;
+    host->setHook([&](const SimulatedHost::Call& call) { seen.push_back(call); });
+    callEverything();
+    ASSERT_EQ(seen.size(), 10u);
+    for (std::size_t i = 0; i < seen.size(); ++i) {
+        EXPECT_EQ(seen[i].operation, everyOperation[i]);
+        EXPECT_EQ(seen[i].number, i + 1);
+        EXPECT_EQ(seen[i].numberOfOperation, 1u);
+        EXPECT_EQ(seen[i].id.has_value(), i >= 4 && i <= 7) << i;
+    }
+    EXPECT_EQ(seen[5].id, OSType);
+    host->setHook({});
+    callEverything();
+    EXPECT_EQ(seen.size(), 10u);
+}
+
+TEST_F(SimulatedHostTest, NthCallOfAllFailsWhateverItIs) {
+    for (std::uint64_t n = 1; n <= 10; ++n) {
+        host->resetCounts();
+        host->throwFromCall(n, std::runtime_error("fault"));
+        EXPECT_THROW(callEverything(), std::runtime_error) << n;
+        EXPECT_EQ(host->calls(), n);
+    }
+    host->resetCounts();
+    host->throwFromCall(11, std::runtime_error("fault"));
+    EXPECT_NO_THROW(callEverything());
+}
+
+TEST_F(SimulatedHostTest, NthCallOfAnOperationAndEachLaterOneFails) {
+    for (const Operation operation : everyOperation) {
+        host->resetCounts();
+        host->throwFromCall(operation, 2, std::runtime_error("fault"));
+        EXPECT_NO_THROW(callEverything());
+        EXPECT_THROW(callEverything(), std::runtime_error);
+        EXPECT_THROW(callEverything(), std::runtime_error);
+    }
+}
+
+TEST_F(SimulatedHostTest, ExceptionsOfAnyTypeComeThrough) {
+    struct Unrelated {};
+    host->throwFromCall(1, Unrelated{});
+    EXPECT_THROW(callEverything(), Unrelated);
+    host->throwFromCall(1, 42);
+    EXPECT_THROW(callEverything(), int);
+    host->throwFromCall(1, "text");
+    EXPECT_THROW(callEverything(), const char*);
+    host->throwFromCall(Operation::NodeStatus, 1, std::bad_alloc());
+    EXPECT_THROW(callEverything(), std::bad_alloc);
+}
+
+TEST_F(SimulatedHostTest, HookMayUseTheHost) {
+    host->setHook([&](const SimulatedHost::Call& call) {
+        if (call.operation == Operation::Select) host->clearNodes();
+        if (call.operation == Operation::Advance) host->setHook({});
+    });
+    Instrumentation cursor;
+    EXPECT_FALSE(cursor.selectNode(OperatingSystemNode));
+    ++cursor;
+    EXPECT_EQ(host->calls(), 3u);
+}
+
+TEST_F(SimulatedHostTest, CursorsOfManyThreadsAreCountedTogether) {
+    std::vector<std::thread> threads;
+    for (int i = 0; i < 8; ++i) {
+        threads.emplace_back([&] {
+            for (int round = 0; round < 100; ++round) callEverything();
+        });
+    }
+    for (int i = 0; i < 100; ++i) {
+        host->setComputerName("name " + std::to_string(i));
+        host->setHook([](const SimulatedHost::Call&) {});
+    }
+    for (auto& thread : threads) thread.join();
+    EXPECT_EQ(host->calls(), 8000u);
+    EXPECT_EQ(host->calls(Operation::ReadText, Name), 800u);
+}
+
+}  // namespace

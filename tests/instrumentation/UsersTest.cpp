@@ -1,0 +1,58 @@
+#include "framework/instrumentation/Linux/Users.h"
+
+#include <gtest/gtest.h>
+
+#include "tests/instrumentation/UtmpFile.h"
+
+namespace {
+
+using VA::Linux::countUtmpUsers;
+using VA::Linux::isUserSession;
+
+bool everyPidLives(std::uint64_t) {
+    return true;
+}
+
+TEST(UserSessions, AreThoseOfClassUserThatAreNotClosing) {
+    EXPECT_TRUE(isUserSession("UID=0\nCLASS=user\n"));
+    EXPECT_TRUE(isUserSession("UID=0\nSTATE=active\nCLASS=user\n"));
+    EXPECT_TRUE(isUserSession("STATE=online\nCLASS=user\n"));
+    EXPECT_FALSE(isUserSession("STATE=closing\nCLASS=user\n"));
+    for (const char* other : {"greeter", "lock-screen", "background", "manager", "USER", ""}) {
+        EXPECT_FALSE(isUserSession(std::string("STATE=active\nCLASS=") + other + "\n")) << other;
+    }
+    EXPECT_FALSE(isUserSession("STATE=active\n"));
+    EXPECT_FALSE(isUserSession(""));
+}
+
+TEST(UtmpUsers, AreTheUserProcessRecords) {
+    const std::string utmp =
+        utmpRecord(utmpBootTime, 0, "reboot") + utmpRecord(utmpLoginProcess, 700, "LOGIN") +
+        utmpRecord(utmpUserProcess, 1200, "ada") + utmpRecord(utmpDeadProcess, 1300, "bob") +
+        utmpRecord(utmpUserProcess, 1400, "ada") + utmpRecord(0, 0, "");
+    EXPECT_EQ(countUtmpUsers(utmp, everyPidLives), 2u);
+}
+
+TEST(UtmpUsers, ThoseWhoseProcessHasGoneDoNotCount) {
+    const std::string utmp =
+        utmpRecord(utmpUserProcess, 1200, "ada") + utmpRecord(utmpUserProcess, 1201, "bob");
+    EXPECT_EQ(countUtmpUsers(utmp, [](std::uint64_t pid) { return pid == 1201; }), 1u);
+}
+
+TEST(UtmpUsers, RecordWithoutAProcessDoesNotCount) {
+    EXPECT_EQ(countUtmpUsers(utmpRecord(utmpUserProcess, 0, "ada"), everyPidLives), 0u);
+    EXPECT_EQ(countUtmpUsers(utmpRecord(utmpUserProcess, -1, "ada"), everyPidLives), 0u);
+}
+
+TEST(UtmpUsers, EmptyFileTellsOfNobody) {
+    EXPECT_EQ(countUtmpUsers("", everyPidLives), 0u);
+}
+
+TEST(UtmpUsers, FileThatIsNotAWholeNumberOfRecordsTellsNothing) {
+    const std::string utmp = utmpRecord(utmpUserProcess, 1200, "ada");
+    EXPECT_EQ(countUtmpUsers(utmp + "x", everyPidLives), std::nullopt);
+    EXPECT_EQ(countUtmpUsers(utmp.substr(1), everyPidLives), std::nullopt);
+    EXPECT_EQ(countUtmpUsers("not a utmp file", everyPidLives), std::nullopt);
+}
+
+}  // namespace
