@@ -1,0 +1,55 @@
+// The schema as the broker needs it: which classes there are and what they declare.
+#pragma once
+
+#include <cmpi/cmpidt.h>
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace cmpihost {
+
+struct PropertyDeclaration {
+    std::string name;
+    /// Element type, with CMPI_ARRAY for an array; CMPI_ref for a reference, CMPI_string for text.
+    CMPIType type = CMPI_null;
+    bool key = false;
+    /// For a reference the class that it may point to, else empty.
+    std::string referenceClass{};
+};
+
+struct ClassDeclaration {
+    std::string name;
+    /// Empty for a root class. It need not be declared itself.
+    std::string superclass{};
+    bool association = false;
+    /// Inherited ones included.
+    std::vector<PropertyDeclaration> properties{};
+
+    /// The declaration of a property (name without case), null if there is none.
+    const PropertyDeclaration* property(std::string_view propertyName) const noexcept;
+};
+
+/// Finds class declarations. Any thread may call it, several at once.
+class ClassCatalogue {
+  public:
+    virtual ~ClassCatalogue() = default;
+
+    /// The class of that name (without case), null if it is not declared. Lives as long as the
+    /// catalogue.
+    virtual const ClassDeclaration* find(std::string_view className) const = 0;
+
+  protected:
+    ClassCatalogue() = default;
+    ClassCatalogue(const ClassCatalogue&) = default;
+    ClassCatalogue& operator=(const ClassCatalogue&) = default;
+};
+
+enum class Kinship { Same, Below, Unrelated, Unknown };
+
+/// How `className` stands to `ancestor`. Unknown: the chain of superclasses leaves the catalogue
+/// before it can be told. A null catalogue knows only equal names.
+Kinship kinship(const ClassCatalogue* catalogue, std::string_view className,
+                std::string_view ancestor);
+
+}  // namespace cmpihost

@@ -1,0 +1,77 @@
+#include "host/broker/FaultPlan.h"
+
+namespace cmpihost {
+
+namespace {
+
+bool names(std::string_view entry, std::string_view table, std::string_view slot) {
+    if (entry.empty() || entry == slot) return true;
+    return entry.size() == table.size() + 1 + slot.size() &&
+           entry.substr(0, table.size()) == table && entry[table.size()] == '.' &&
+           entry.substr(table.size() + 1) == slot;
+}
+
+}  // namespace
+
+FaultPlan::FaultPlan(Fault fault) {
+    add(std::move(fault));
+}
+
+void FaultPlan::add(Fault fault) {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    faults_.push_back({std::move(fault), 0});
+}
+
+void FaultPlan::clear() {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    faults_.clear();
+    calls_.clear();
+    total_ = 0;
+    fired_ = 0;
+}
+
+unsigned FaultPlan::calls() const {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    return total_;
+}
+
+unsigned FaultPlan::calls(std::string_view entry) const {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    unsigned sum = 0;
+    for (const auto& [name, count] : calls_) {
+        const std::size_t dot = name.find('.');
+        const std::string_view whole = name;
+        if (names(entry, whole.substr(0, dot), whole.substr(dot + 1))) sum += count;
+    }
+    return sum;
+}
+
+std::map<std::string, unsigned> FaultPlan::callsByEntry() const {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    return calls_;
+}
+
+unsigned FaultPlan::fired() const {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    return fired_;
+}
+
+std::optional<CMPIrc> FaultPlan::onCall(const char* table, const char* slot) {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    ++total_;
+    ++calls_[std::string(table) + '.' + slot];
+
+    std::optional<CMPIrc> answer;
+    for (Planned& planned : faults_) {
+        const Fault& fault = planned.fault;
+        if (!names(fault.entry, table, slot)) continue;
+        ++planned.seen;
+        const bool reached = planned.seen >= fault.nth;
+        const bool past = fault.times != 0 && planned.seen - fault.nth >= fault.times;
+        if (reached && !past && !answer) answer = fault.rc;
+    }
+    if (answer) ++fired_;
+    return answer;
+}
+
+}  // namespace cmpihost

@@ -1,0 +1,157 @@
+#include "host/broker/Invoke.h"
+
+#include "host/broker/BrokerCore.h"
+#include "host/broker/ResultCollector.h"
+
+namespace cmpihost {
+
+namespace {
+
+/// A null-terminated list over strings that live elsewhere.
+class NameList {
+  public:
+    explicit NameList(const std::optional<std::vector<std::string>>& names) {
+        if (!names) return;
+        for (const std::string& name : *names) pointers_.push_back(name.c_str());
+        pointers_.push_back(nullptr);
+    }
+    /// Null for no list.
+    const char** get() noexcept { return pointers_.empty() ? nullptr : pointers_.data(); }
+
+  private:
+    std::vector<const char*> pointers_;
+};
+
+const char* textOf(const std::optional<std::string>& text) noexcept {
+    return text ? text->c_str() : nullptr;
+}
+
+/// One request with everything that its slot takes.
+class Call {
+  public:
+    Call(Request& scope, const OperationRequest& request, const CMPIResult* result)
+        : scope_(scope),
+          request_(request),
+          context_(scope.makeContext(request.context, request.path.nameSpace)),
+          path_(scope.makePath(request.path)),
+          result_(result),
+          properties_(request.properties) {}
+
+    CMPIStatus run(const ManagementInterfaces& interfaces) {
+        switch (request_.operation) {
+            case Operation::Associators:
+            case Operation::AssociatorNames:
+            case Operation::References:
+            case Operation::ReferenceNames:
+                return runAssociation(interfaces.association);
+            default:
+                return runInstance(interfaces.instance);
+        }
+    }
+
+  private:
+    /// Calls a slot with the four arguments that all slots begin with and those of its own.
+    template <class MI, class... Rest, class... Given>
+    CMPIStatus slot(MI* interface,
+                    CMPIStatus (*function)(MI*, const CMPIContext*, const CMPIResult*,
+                                           const CMPIObjectPath*, Rest...),
+                    Given... given) {
+        if (function == nullptr) {
+            scope_.broker().core().report(std::string("no function for ") +
+                                          operationName(request_.operation));
+            return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
+        }
+        return function(interface, context_, result_, path_, given...);
+    }
+
+    CMPIStatus runInstance(CMPIInstanceMI* mi) {
+        if (mi == nullptr) return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
+        const CMPIInstanceMIFT& table = *mi->ft;
+        switch (request_.operation) {
+            case Operation::EnumerateInstances:
+                return slot(mi, table.enumerateInstances, properties_.get());
+            case Operation::EnumerateInstanceNames:
+                return slot(mi, table.enumerateInstanceNames);
+            case Operation::GetInstance:
+                return slot(mi, table.getInstance, properties_.get());
+            case Operation::CreateInstance:
+                return slot(mi, table.createInstance, scope_.makeInstance(request_.instance));
+            case Operation::ModifyInstance:
+                return slot(mi, table.modifyInstance, scope_.makeInstance(request_.instance),
+                            properties_.get());
+            case Operation::DeleteInstance:
+                return slot(mi, table.deleteInstance);
+            case Operation::ExecQuery:
+                return slot(mi, table.execQuery, request_.query.c_str(),
+                            request_.queryLanguage.c_str());
+            default:
+                return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
+        }
+    }
+
+    CMPIStatus runAssociation(CMPIAssociationMI* mi) {
+        if (mi == nullptr) return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
+        const CMPIAssociationMIFT& table = *mi->ft;
+        const char* const resultClass = textOf(request_.resultClass);
+        const char* const role = textOf(request_.role);
+        switch (request_.operation) {
+            case Operation::Associators:
+                return slot(mi, table.associators, textOf(request_.assocClass), resultClass, role,
+                            textOf(request_.resultRole), properties_.get());
+            case Operation::AssociatorNames:
+                return slot(mi, table.associatorNames, textOf(request_.assocClass), resultClass,
+                            role, textOf(request_.resultRole));
+            case Operation::References:
+                return slot(mi, table.references, resultClass, role, properties_.get());
+            default:
+                return slot(mi, table.referenceNames, resultClass, role);
+        }
+    }
+
+    Request& scope_;
+    const OperationRequest& request_;
+    const CMPIContext* context_;
+    const CMPIObjectPath* path_;
+    const CMPIResult* result_;
+    NameList properties_;
+};
+
+std::optional<std::string> messageOf(const CMPIStatus& status) {
+    if (status.msg == nullptr) return std::nullopt;
+    try {
+        const char* const text = fromHandle(status.msg, {"CMPIStatus", "msg"}).body.get();
+        return text == nullptr ? std::string() : std::string(text);
+    } catch (const Failure&) {
+        return std::nullopt;  // The violation is recorded.
+    }
+}
+
+}  // namespace
+
+Outcome invoke(const ManagementInterfaces& interfaces, Broker& broker,
+               const OperationRequest& request, const CollectorSetup& setup) {
+    Request scope(broker);
+    ResultCollector collector(scope);
+    if (setup) setup(collector);
+
+    const CMPIStatus status = Call(scope, request, collector.cmpi()).run(interfaces);
+
+    Outcome outcome;
+    outcome.rc = status.rc;
+    outcome.message = messageOf(status);
+    scope.end();
+    outcome.violations = scope.violations();
+    outcome.doneCount = collector.doneCount();
+    outcome.paths = collector.takePaths();
+    outcome.instances = collector.takeInstances();
+    outcome.refusedPaths = collector.takeRefusedPaths();
+    outcome.refusedInstances = collector.takeRefusedInstances();
+    return outcome;
+}
+
+Outcome invoke(const ProviderLibrary& library, Broker& broker, const OperationRequest& request,
+               const CollectorSetup& setup) {
+    return invoke(library.interfaces(), broker, request, setup);
+}
+
+}  // namespace cmpihost

@@ -1,0 +1,90 @@
+// A CMPI library, loaded as an object manager loads it.
+#pragma once
+
+#include "host/broker/Broker.h"
+
+#include <cmpi/cmpift.h>
+
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+namespace cmpihost {
+
+enum class LoadProblem {
+    FileMissing,
+    /// Not a shared library of this machine, or one of the other word size.
+    NotALibrary,
+    /// A library that it needs is missing, or a symbol does not resolve.
+    Unresolved,
+    /// No factory of either name.
+    NoFactory,
+    /// The factory set a status other than CMPI_RC_OK or returned null.
+    FactoryFailed,
+    /// The management interface has no function table.
+    NoTable
+};
+
+/// Why a library could not be loaded; what() is one line that names the file.
+class LoadError : public std::runtime_error {
+  public:
+    LoadError(LoadProblem problem, const std::string& text)
+        : std::runtime_error(text), problem_(problem) {}
+    LoadProblem problem() const noexcept { return problem_; }
+
+  private:
+    LoadProblem problem_;
+};
+
+struct LoadOptions {
+    std::string providerName = "OperatingSystemProvider";
+    /// Symbols go into the global scope, as real object managers do.
+    bool global = true;
+    /// Which management interfaces the library must have.
+    bool instance = true;
+    bool association = true;
+};
+
+/// The two interfaces that the host drives; either may be null.
+struct ManagementInterfaces {
+    CMPIInstanceMI* instance = nullptr;
+    CMPIAssociationMI* association = nullptr;
+};
+
+/// A loaded library and its management interfaces. The factory `_Generic_Create_<kind>MI` is looked
+/// up first, then `<provider name>_Create_<kind>MI`. Bad manners that still can be lived with (a
+/// table version below 100, an MI version above it, a null slot) become violations of the broker.
+/// One thread loads and unloads.
+class ProviderLibrary {
+  public:
+    /// Loads; throws LoadError. `broker` outlives the library.
+    ProviderLibrary(std::string file, Broker& broker, LoadOptions options = {});
+    /// unload(true).
+    ~ProviderLibrary();
+    ProviderLibrary(const ProviderLibrary&) = delete;
+    ProviderLibrary& operator=(const ProviderLibrary&) = delete;
+
+    const std::string& file() const noexcept { return file_; }
+    bool loaded() const noexcept { return handle_ != nullptr; }
+    ManagementInterfaces interfaces() const noexcept { return interfaces_; }
+    CMPIInstanceMI* instanceMI() const noexcept { return interfaces_.instance; }
+    CMPIAssociationMI* associationMI() const noexcept { return interfaces_.association; }
+
+    /// Calls cleanup of every interface, then closes the library. Not terminating: a provider that
+    /// answers CMPI_RC_DO_NOT_UNLOAD or CMPI_RC_NEVER_UNLOAD stays loaded, and the result is false.
+    bool unload(bool terminating = true);
+    /// Loads again after unload(); throws LoadError. Does nothing while loaded.
+    void load();
+
+    /// The address of an exported symbol, null if there is none or the library is not loaded.
+    void* symbol(const char* name) const noexcept;
+
+  private:
+    std::string file_;
+    Broker& broker_;
+    LoadOptions options_;
+    void* handle_ = nullptr;
+    ManagementInterfaces interfaces_;
+};
+
+}  // namespace cmpihost

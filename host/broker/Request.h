@@ -1,0 +1,49 @@
+// The scope in which the objects of a broker live.
+#pragma once
+
+#include "host/broker/Broker.h"
+#include "host/broker/Operation.h"
+
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace cmpihost {
+
+/// While a request is open on a thread, objects made by its broker on that thread belong to it.
+/// Requests nest: objects live until the outermost one of the broker on the thread ends. A use
+/// after that is a violation. Opened and ended on one thread, in reverse order of opening.
+class Request {
+  public:
+    explicit Request(Broker& broker);
+    ~Request();
+    Request(const Request&) = delete;
+    Request& operator=(const Request&) = delete;
+
+    /// Ends the request before its scope does; later calls do nothing.
+    void end() noexcept;
+
+    Broker& broker() const noexcept;
+    /// What the broker caught on this thread since the request was opened, nested requests
+    /// included.
+    const std::vector<std::string>& violations() const noexcept;
+
+    /// Objects for the provider, made without a call of the provider: no fault and no count
+    /// applies.
+    CMPIObjectPath* makePath(const ObjectPathValue& value);
+    CMPIInstance* makeInstance(const InstanceValue& value);
+    /// None: a string without characters (its pointer is null), as some object managers hand out.
+    CMPIString* makeString(const std::optional<std::string>& text);
+    /// CMPIInvocationFlags, CMPIPrincipal, CMPIInitNameSpace and CMPIRole.
+    CMPIContext* makeContext(const RequestContext& context, const std::string& nameSpace);
+
+  private:
+    struct State;
+    std::unique_ptr<State> state_;
+};
+
+/// The content of an object of any broker. The object must be alive: else std::invalid_argument.
+ObjectPathValue valueOf(const CMPIObjectPath* path);
+InstanceValue valueOf(const CMPIInstance* instance);
+
+}  // namespace cmpihost

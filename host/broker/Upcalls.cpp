@@ -1,0 +1,265 @@
+// CMPIBrokerFT: operations that the provider asks of the object manager.
+#include "host/broker/BrokerTables.h"
+#include "host/broker/Conversion.h"
+#include "host/broker/Entry.h"
+#include "host/broker/NamedItems.h"
+#include "host/broker/RequestScope.h"
+
+namespace cmpihost {
+
+namespace {
+
+std::optional<std::string> contextText(const std::vector<NamedValue>& entries, const char* name) {
+    const NamedValue* const entry = findNamed(entries, name);
+    return entry != nullptr && entry->value.isText() ? std::optional(entry->value.text())
+                                                     : std::nullopt;
+}
+
+RequestContext readContext(const CMPIContext* context, const CallName& call) {
+    const auto& entries = fromHandle(context, call).body;
+    RequestContext result;
+    const NamedValue* const flags = findNamed(entries, CMPIInvocationFlags);
+    if (flags != nullptr && flags->value.type() == CMPI_uint32 && !flags->value.isNull()) {
+        result.flags = static_cast<CMPIFlags>(flags->value.unsignedInteger());
+    }
+    result.principal = contextText(entries, CMPIPrincipal);
+    result.role = contextText(entries, CMPIRole);
+    return result;
+}
+
+OperationRequest requestOf(Operation operation, const CallName& call, const CMPIContext* context,
+                           const CMPIObjectPath* path) {
+    OperationRequest request;
+    request.operation = operation;
+    request.context = readContext(context, call);
+    request.path = *fromHandle(path, call).body;
+    return request;
+}
+
+/// Asks for the answer; a failure becomes the status of the call, with its message.
+std::optional<UpcallAnswer> answerTo(BrokerCore& core, const OperationRequest& request,
+                                     CMPIStatus* status) {
+    UpcallAnswer answer = core.perform(request);
+    if (answer.rc == CMPI_RC_OK) return answer;
+    if (status != nullptr) {
+        status->rc = answer.rc;
+        status->msg = answer.message ? makeString(core, *answer.message) : nullptr;
+    }
+    return std::nullopt;
+}
+
+CMPIStatus statusAnswer(BrokerCore& core, const OperationRequest& request) {
+    CMPIStatus status = statusOf(CMPI_RC_OK);
+    answerTo(core, request, &status);
+    return status;
+}
+
+bool answersPaths(Operation operation) noexcept {
+    return operation == Operation::EnumerateInstanceNames ||
+           operation == Operation::AssociatorNames || operation == Operation::ReferenceNames;
+}
+
+CMPIEnumeration* enumeration(BrokerCore& core, const OperationRequest& request,
+                             CMPIStatus* status) {
+    std::optional<UpcallAnswer> answer = answerTo(core, request, status);
+    if (!answer) return nullptr;
+
+    EnumerationBody body;
+    body.failAt = answer->failAt;
+    body.failRc = answer->failRc;
+    if (answersPaths(request.operation)) {
+        body.itemType = CMPI_ref;
+        for (auto& path : answer->paths)
+            body.items.push_back(Value::fromReference(std::move(path)));
+    } else {
+        body.itemType = CMPI_instance;
+        for (auto& item : answer->instances)
+            body.items.push_back(Value::fromInstance(std::move(item)));
+    }
+    return core.make<CMPIEnumeration>(std::move(body));
+}
+
+CMPIEnumeration* enumerateInstanceNames(BrokerCore& core, const CallName& call,
+                                        const CMPIContext* context, const CMPIObjectPath* path,
+                                        CMPIStatus* status) {
+    return enumeration(core, requestOf(Operation::EnumerateInstanceNames, call, context, path),
+                       status);
+}
+
+CMPIEnumeration* enumerateInstances(BrokerCore& core, const CallName& call,
+                                    const CMPIContext* context, const CMPIObjectPath* path,
+                                    const char** properties, CMPIStatus* status) {
+    OperationRequest request = requestOf(Operation::EnumerateInstances, call, context, path);
+    request.properties = readNames(properties);
+    return enumeration(core, request, status);
+}
+
+CMPIInstance* getInstance(BrokerCore& core, const CallName& call, const CMPIContext* context,
+                          const CMPIObjectPath* path, const char** properties, CMPIStatus* status) {
+    OperationRequest request = requestOf(Operation::GetInstance, call, context, path);
+    request.properties = readNames(properties);
+    std::optional<UpcallAnswer> answer = answerTo(core, request, status);
+    if (!answer) return nullptr;
+    if (answer->instances.empty()) return refuse(status, CMPI_RC_ERR_NOT_FOUND);
+    return makeInstance(core,
+                        std::make_shared<InstanceValue>(std::move(answer->instances.front())));
+}
+
+CMPIObjectPath* createInstance(BrokerCore& core, const CallName& call, const CMPIContext* context,
+                               const CMPIObjectPath* path, const CMPIInstance* instance,
+                               CMPIStatus* status) {
+    OperationRequest request = requestOf(Operation::CreateInstance, call, context, path);
+    request.instance = *fromHandle(instance, call).body.value;
+    std::optional<UpcallAnswer> answer = answerTo(core, request, status);
+    if (!answer) return nullptr;
+    if (answer->paths.empty()) return refuse(status, CMPI_RC_ERR_FAILED);
+    return core.make<CMPIObjectPath>(
+        std::make_shared<ObjectPathValue>(std::move(answer->paths.front())));
+}
+
+CMPIStatus modifyInstance(BrokerCore& core, const CallName& call, const CMPIContext* context,
+                          const CMPIObjectPath* path, const CMPIInstance* instance,
+                          const char** properties) {
+    OperationRequest request = requestOf(Operation::ModifyInstance, call, context, path);
+    request.instance = *fromHandle(instance, call).body.value;
+    request.properties = readNames(properties);
+    return statusAnswer(core, request);
+}
+
+CMPIStatus deleteInstance(BrokerCore& core, const CallName& call, const CMPIContext* context,
+                          const CMPIObjectPath* path) {
+    return statusAnswer(core, requestOf(Operation::DeleteInstance, call, context, path));
+}
+
+CMPIEnumeration* execQuery(BrokerCore& core, const CallName& call, const CMPIContext* context,
+                           const CMPIObjectPath* path, const char* query, const char* language,
+                           CMPIStatus* status) {
+    OperationRequest request = requestOf(Operation::ExecQuery, call, context, path);
+    request.query = required(core, query, call, "query");
+    request.queryLanguage = required(core, language, call, "language");
+    return enumeration(core, request, status);
+}
+
+CMPIEnumeration* associatorNames(BrokerCore& core, const CallName& call, const CMPIContext* context,
+                                 const CMPIObjectPath* path, const char* assocClass,
+                                 const char* resultClass, const char* role, const char* resultRole,
+                                 CMPIStatus* status) {
+    OperationRequest request = requestOf(Operation::AssociatorNames, call, context, path);
+    request.assocClass = optionalText(assocClass);
+    request.resultClass = optionalText(resultClass);
+    request.role = optionalText(role);
+    request.resultRole = optionalText(resultRole);
+    return enumeration(core, request, status);
+}
+
+CMPIEnumeration* associators(BrokerCore& core, const CallName& call, const CMPIContext* context,
+                             const CMPIObjectPath* path, const char* assocClass,
+                             const char* resultClass, const char* role, const char* resultRole,
+                             const char** properties, CMPIStatus* status) {
+    OperationRequest request = requestOf(Operation::Associators, call, context, path);
+    request.assocClass = optionalText(assocClass);
+    request.resultClass = optionalText(resultClass);
+    request.role = optionalText(role);
+    request.resultRole = optionalText(resultRole);
+    request.properties = readNames(properties);
+    return enumeration(core, request, status);
+}
+
+CMPIEnumeration* referenceNames(BrokerCore& core, const CallName& call, const CMPIContext* context,
+                                const CMPIObjectPath* path, const char* resultClass,
+                                const char* role, CMPIStatus* status) {
+    OperationRequest request = requestOf(Operation::ReferenceNames, call, context, path);
+    request.resultClass = optionalText(resultClass);
+    request.role = optionalText(role);
+    return enumeration(core, request, status);
+}
+
+CMPIEnumeration* references(BrokerCore& core, const CallName& call, const CMPIContext* context,
+                            const CMPIObjectPath* path, const char* resultClass, const char* role,
+                            const char** properties, CMPIStatus* status) {
+    OperationRequest request = requestOf(Operation::References, call, context, path);
+    request.resultClass = optionalText(resultClass);
+    request.role = optionalText(role);
+    request.properties = readNames(properties);
+    return enumeration(core, request, status);
+}
+
+/// Services that this host does not have.
+template <class... Args>
+CMPIStatus unsupported(BrokerCore&, Args...) {
+    return statusOf(CMPI_RC_ERR_NOT_SUPPORTED);
+}
+template <class... Args>
+CMPIData unsupportedData(BrokerCore&, Args... arguments) {
+    setStatus(statusArgument(arguments...), CMPI_RC_ERR_NOT_SUPPORTED);
+    return noData(CMPI_notFound);
+}
+
+CMPIContext* prepareAttachThread(BrokerCore& core, const CallName& call,
+                                 const CMPIContext* context) {
+    return core.makeClone<CMPIContext>(fromHandle(context, call).body);
+}
+
+CMPIStatus attachThread(BrokerCore& core, const CallName& call, const CMPIContext* context) {
+    fromHandle(context, call);
+    // detachThread deletes it, on this thread.
+    auto scope = std::make_unique<RequestScope>(core, true);
+    scope.release();
+    return statusOf(CMPI_RC_OK);
+}
+
+CMPIStatus detachThread(BrokerCore& core, const CallName& call, const CMPIContext* context) {
+    const Object<CMPIContext>& object = fromHandle(context, call);
+    const std::unique_ptr<RequestScope> scope(RequestScope::attachedTo(core));
+    if (scope == nullptr) {
+        core.report("detachThread on a thread that is not attached");
+        return statusOf(CMPI_RC_ERR_FAILED);
+    }
+    if (object.arena() != nullptr) {
+        core.report("detachThread with a context that is none of prepareAttachThread");
+        return statusOf(CMPI_RC_ERR_INVALID_HANDLE);
+    }
+    core.giveBack(object);
+    return statusOf(CMPI_RC_OK);
+}
+
+using FT = CMPIBrokerFT;
+using Context = const CMPIContext*;
+using Path = const CMPIObjectPath*;
+using Text = const char*;
+
+void bindOperations(FT& table) {
+    bind<&FT::enumerateInstanceNames, &enumerateInstanceNames>(table, "enumerateInstanceNames");
+    bind<&FT::enumerateInstances, &enumerateInstances>(table, "enumerateInstances");
+    bind<&FT::getInstance, &getInstance>(table, "getInstance");
+    bind<&FT::createInstance, &createInstance>(table, "createInstance");
+    bind<&FT::modifyInstance, &modifyInstance>(table, "modifyInstance");
+    bind<&FT::deleteInstance, &deleteInstance>(table, "deleteInstance");
+    bind<&FT::execQuery, &execQuery>(table, "execQuery");
+    bind<&FT::associators, &associators>(table, "associators");
+    bind<&FT::associatorNames, &associatorNames>(table, "associatorNames");
+    bind<&FT::references, &references>(table, "references");
+    bind<&FT::referenceNames, &referenceNames>(table, "referenceNames");
+}
+
+}  // namespace
+
+CMPIBrokerFT upcallTable() {
+    FT table{};
+    bindOperations(table);
+    bind<&FT::prepareAttachThread, &prepareAttachThread>(table, "prepareAttachThread");
+    bind<&FT::attachThread, &attachThread>(table, "attachThread");
+    bind<&FT::detachThread, &detachThread>(table, "detachThread");
+    bind<&FT::deliverIndication, &unsupported<Context, Text, const CMPIInstance*>>(
+        table, "deliverIndication");
+    bind<&FT::setProperty, &unsupported<Context, Path, Text, const CMPIValue*, CMPIType>>(
+        table, "setProperty");
+    bind<&FT::getProperty, &unsupportedData<Context, Path, Text, CMPIStatus*>>(table,
+                                                                               "getProperty");
+    bind<&FT::invokeMethod,
+         &unsupportedData<Context, Path, Text, const CMPIArgs*, CMPIArgs*, CMPIStatus*>>(
+        table, "invokeMethod");
+    return table;
+}
+
+}  // namespace cmpihost

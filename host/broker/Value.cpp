@@ -1,0 +1,277 @@
+#include "host/broker/Value.h"
+
+#include <algorithm>
+#include <array>
+#include <cstdio>
+
+namespace cmpihost {
+
+namespace {
+
+char lowerCase(char letter) noexcept {
+    return letter >= 'A' && letter <= 'Z' ? static_cast<char>(letter - 'A' + 'a') : letter;
+}
+
+struct TypeRow {
+    CMPIType type;
+    const char* name;
+    unsigned bits;
+};
+
+constexpr std::array<TypeRow, 20> typeRows = {{
+    {CMPI_null, "null", 0},       {CMPI_boolean, "boolean", 1},   {CMPI_char16, "char16", 16},
+    {CMPI_real32, "real32", 32},  {CMPI_real64, "real64", 64},    {CMPI_uint8, "uint8", 8},
+    {CMPI_uint16, "uint16", 16},  {CMPI_uint32, "uint32", 32},    {CMPI_uint64, "uint64", 64},
+    {CMPI_sint8, "sint8", 8},     {CMPI_sint16, "sint16", 16},    {CMPI_sint32, "sint32", 32},
+    {CMPI_sint64, "sint64", 64},  {CMPI_instance, "instance", 0}, {CMPI_ref, "ref", 0},
+    {CMPI_string, "string", 0},   {CMPI_chars, "string", 0},      {CMPI_dateTime, "datetime", 0},
+    {CMPI_charsptr, "string", 0}, {CMPI_ptr, "pointer", 0},
+}};
+
+const TypeRow* typeRow(CMPIType elementType) noexcept {
+    const auto row =
+        std::find_if(typeRows.begin(), typeRows.end(),
+                     [elementType](const TypeRow& r) { return r.type == elementType; });
+    return row == typeRows.end() ? nullptr : &*row;
+}
+
+unsigned bitsOf(CMPIType type) noexcept {
+    const TypeRow* row = typeRow(type);
+    return row == nullptr || row->bits == 0 ? 64 : row->bits;
+}
+
+/// CMPI_chars is only another way to pass a string.
+CMPIType comparable(CMPIType type) noexcept {
+    const auto arrayBit = static_cast<CMPIType>(type & CMPI_ARRAY);
+    const auto element = static_cast<CMPIType>(type & ~CMPI_ARRAY);
+    return element == CMPI_chars ? static_cast<CMPIType>(CMPI_string | arrayBit) : type;
+}
+
+/// Deep comparison of shared storage.
+struct SameContent {
+    template <class T>
+    bool operator()(const std::shared_ptr<T>& left, const std::shared_ptr<T>& right) const {
+        return left == right || *left == *right;
+    }
+    bool operator()(const CMPIValuePtr& left, const CMPIValuePtr& right) const {
+        return left.ptr == right.ptr && left.length == right.length;
+    }
+    template <class T>
+    bool operator()(const T& left, const T& right) const {
+        return left == right;
+    }
+    template <class T, class U>
+    bool operator()(const T&, const U&) const {
+        return false;
+    }
+};
+
+template <class Named>
+const Value* valueNamed(const std::vector<Named>& items, std::string_view name) noexcept {
+    const auto item = std::find_if(items.begin(), items.end(), [name](const Named& candidate) {
+        return equalNames(candidate.name, name);
+    });
+    return item == items.end() ? nullptr : &item->value;
+}
+
+/// Whether two lists hold the same named values in any order.
+template <class Named>
+bool sameSet(const std::vector<Named>& left, const std::vector<Named>& right) {
+    return left.size() == right.size() &&
+           std::all_of(left.begin(), left.end(), [&right](const Named& item) {
+               const Value* other = valueNamed(right, item.name);
+               return other != nullptr && *other == item.value;
+           });
+}
+
+std::string quoted(const std::string& text) {
+    std::string result = "\"";
+    for (const char letter : text) {
+        if (letter == '"' || letter == '\\') result += '\\';
+        result += letter;
+    }
+    return result + '"';
+}
+
+std::string bindingText(const Value& value) {
+    if (value.isNull()) return "NULL";
+    if (value.isText() || value.type() == CMPI_ref) return quoted(value.toText());
+    return value.toText();
+}
+
+std::string realText(double value, CMPIType type) {
+    std::array<char, 40> text{};
+    const int digits = type == CMPI_real32 ? 9 : 17;
+    std::snprintf(text.data(), text.size(), "%.*g", digits, value);
+    return text.data();
+}
+
+std::string arrayText(const std::vector<Value>& elements) {
+    std::string result = "{";
+    for (const Value& element : elements) {
+        if (result.size() > 1) result += ", ";
+        result += element.toText();
+    }
+    return result + "}";
+}
+
+struct ToText {
+    CMPIType type;
+
+    std::string operator()(std::monostate) const { return "NULL"; }
+    std::string operator()(bool value) const { return value ? "true" : "false"; }
+    std::string operator()(std::uint64_t value) const { return std::to_string(value); }
+    std::string operator()(std::int64_t value) const { return std::to_string(value); }
+    std::string operator()(double value) const { return realText(value, type); }
+    std::string operator()(const std::string& value) const { return value; }
+    std::string operator()(const std::shared_ptr<ObjectPathValue>& value) const {
+        return toString(*value);
+    }
+    std::string operator()(const std::shared_ptr<InstanceValue>& value) const {
+        return "instance of " + value->path.className;
+    }
+    std::string operator()(const std::shared_ptr<std::vector<Value>>& value) const {
+        return arrayText(*value);
+    }
+    std::string operator()(const CMPIValuePtr& value) const {
+        return std::to_string(value.length) + " bytes";
+    }
+};
+
+}  // namespace
+
+bool equalNames(std::string_view left, std::string_view right) noexcept {
+    return left.size() == right.size() &&
+           std::equal(left.begin(), left.end(), right.begin(),
+                      [](char a, char b) { return a == b || lowerCase(a) == lowerCase(b); });
+}
+
+std::string cimTypeName(CMPIType type) {
+    const TypeRow* row = typeRow(static_cast<CMPIType>(type & ~CMPI_ARRAY));
+    std::string name = row == nullptr ? "type " + std::to_string(type & ~CMPI_ARRAY) : row->name;
+    if ((type & CMPI_ARRAY) != 0) name += "[]";
+    return name;
+}
+
+Value::Value(std::string text) : type_(CMPI_string), data_(std::move(text)) {}
+Value::Value(const char* text) : Value(std::string(text)) {}
+
+Value Value::null(CMPIType type) {
+    return Value(type, std::monostate());
+}
+Value Value::fromText(std::string text, CMPIType type) {
+    return Value(type, std::move(text));
+}
+Value Value::fromBoolean(bool value) {
+    return Value(CMPI_boolean, value);
+}
+
+Value Value::fromUnsigned(std::uint64_t value, CMPIType type) {
+    const unsigned unused = 64 - bitsOf(type);
+    return Value(type, value << unused >> unused);
+}
+
+Value Value::fromSigned(std::int64_t value, CMPIType type) {
+    switch (type) {
+        case CMPI_sint8:
+            return Value(type, std::int64_t{static_cast<std::int8_t>(value)});
+        case CMPI_sint16:
+            return Value(type, std::int64_t{static_cast<std::int16_t>(value)});
+        case CMPI_sint32:
+            return Value(type, std::int64_t{static_cast<std::int32_t>(value)});
+        default:
+            return Value(type, value);
+    }
+}
+
+Value Value::fromReal(double value, CMPIType type) {
+    if (type == CMPI_real32) return Value(type, double{static_cast<float>(value)});
+    return Value(type, value);
+}
+
+Value Value::fromReference(ObjectPathValue path) {
+    return fromReference(std::make_shared<ObjectPathValue>(std::move(path)));
+}
+Value Value::fromReference(std::shared_ptr<ObjectPathValue> path) {
+    return Value(CMPI_ref, std::move(path));
+}
+Value Value::fromInstance(InstanceValue instance) {
+    return fromInstance(std::make_shared<InstanceValue>(std::move(instance)));
+}
+Value Value::fromInstance(std::shared_ptr<InstanceValue> instance) {
+    return Value(CMPI_instance, std::move(instance));
+}
+Value Value::fromArray(CMPIType elementType, std::vector<Value> elements) {
+    return fromArray(elementType, std::make_shared<std::vector<Value>>(std::move(elements)));
+}
+Value Value::fromArray(CMPIType elementType, std::shared_ptr<std::vector<Value>> elements) {
+    return Value(static_cast<CMPIType>(elementType | CMPI_ARRAY), std::move(elements));
+}
+Value Value::fromPointer(CMPIValuePtr pointer) {
+    return Value(CMPI_ptr, pointer);
+}
+
+const ObjectPathValue& Value::reference() const {
+    return *sharedReference();
+}
+const InstanceValue& Value::instance() const {
+    return *sharedInstance();
+}
+const std::vector<Value>& Value::elements() const {
+    return *sharedElements();
+}
+
+const std::shared_ptr<ObjectPathValue>& Value::sharedReference() const {
+    return std::get<std::shared_ptr<ObjectPathValue>>(data_);
+}
+const std::shared_ptr<InstanceValue>& Value::sharedInstance() const {
+    return std::get<std::shared_ptr<InstanceValue>>(data_);
+}
+const std::shared_ptr<std::vector<Value>>& Value::sharedElements() const {
+    return std::get<std::shared_ptr<std::vector<Value>>>(data_);
+}
+
+std::string Value::toText() const {
+    return std::visit(ToText{type_}, data_);
+}
+
+bool operator==(const Value& left, const Value& right) {
+    return comparable(left.type_) == comparable(right.type_) &&
+           std::visit(SameContent(), left.data_, right.data_);
+}
+
+const Value* ObjectPathValue::key(std::string_view name) const noexcept {
+    return valueNamed(keys, name);
+}
+
+const Value* InstanceValue::property(std::string_view name) const noexcept {
+    return valueNamed(properties, name);
+}
+
+bool operator==(const ObjectPathValue& left, const ObjectPathValue& right) {
+    return equalNames(left.nameSpace, right.nameSpace) &&
+           equalNames(left.className, right.className) && sameSet(left.keys, right.keys);
+}
+bool operator!=(const ObjectPathValue& left, const ObjectPathValue& right) {
+    return !(left == right);
+}
+
+bool operator==(const InstanceValue& left, const InstanceValue& right) {
+    return left.path == right.path && sameSet(left.properties, right.properties);
+}
+bool operator!=(const InstanceValue& left, const InstanceValue& right) {
+    return !(left == right);
+}
+
+std::string toString(const ObjectPathValue& path) {
+    std::string result =
+        path.nameSpace.empty() ? path.className : path.nameSpace + ":" + path.className;
+    char separator = '.';
+    for (const KeyBinding& key : path.keys) {
+        result += separator + key.name + '=' + bindingText(key.value);
+        separator = ',';
+    }
+    return result;
+}
+
+}  // namespace cmpihost

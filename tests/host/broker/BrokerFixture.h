@@ -1,0 +1,76 @@
+// What the tests of the broker share.
+#pragma once
+
+#include "host/broker/Broker.h"
+#include "host/broker/Request.h"
+
+#include <cmpi/cmpift.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <list>
+#include <string>
+#include <vector>
+
+namespace cmpihost {
+
+/// What a CMPIString holds; "(null)" for none.
+inline std::string textOf(const CMPIString* string) {
+    if (string == nullptr) return "(null)";
+    const char* const text = string->ft->getCharPtr(string, nullptr);
+    return text == nullptr ? "(no characters)" : text;
+}
+
+/// Classes given by the test.
+class TestCatalogue final : public ClassCatalogue {
+  public:
+    TestCatalogue& add(ClassDeclaration declaration) {
+        classes_.push_back(std::move(declaration));
+        return *this;
+    }
+    const ClassDeclaration* find(std::string_view className) const override {
+        for (const ClassDeclaration& declaration : classes_) {
+            if (equalNames(declaration.name, className)) return &declaration;
+        }
+        return nullptr;
+    }
+
+  private:
+    std::list<ClassDeclaration> classes_;
+};
+
+/// TEST_Thing (key Name), TEST_SmallThing below it, TEST_Other (key Id), TEST_Link between them.
+inline TestCatalogue testClasses() {
+    TestCatalogue catalogue;
+    const std::vector<PropertyDeclaration> thing = {
+        {"Name", CMPI_string, true}, {"Size", CMPI_uint32},
+        {"Made", CMPI_dateTime},     {"Tags", CMPI_stringA},
+        {"Codes", CMPI_uint16A},     {"Owner", CMPI_ref, false, "TEST_Other"}};
+    catalogue.add({"TEST_Thing", "CIM_Thing", false, thing});
+    catalogue.add({"TEST_SmallThing", "TEST_Thing", false, thing});
+    catalogue.add({"TEST_Other", "", false, {{"Id", CMPI_uint16, true}}});
+    catalogue.add(
+        {"TEST_Link",
+         "",
+         true,
+         {{"Left", CMPI_ref, true, "TEST_Thing"}, {"Right", CMPI_ref, true, "TEST_Other"}}});
+    return catalogue;
+}
+
+/// A broker without schema and an open request.
+class BrokerTest : public ::testing::Test {
+  protected:
+    Broker broker;
+    Request request{broker};
+    const CMPIBroker* mb = broker.cmpi();
+    CMPIStatus status = {CMPI_RC_ERROR, nullptr};
+
+    CMPIObjectPath* newPath(const char* className = "TEST_Thing") {
+        return CMNewObjectPath(mb, "root/cimv2", className, &status);
+    }
+    CMPIInstance* newInstance(const char* className = "TEST_Thing") {
+        return CMNewInstance(mb, newPath(className), &status);
+    }
+};
+
+}  // namespace cmpihost

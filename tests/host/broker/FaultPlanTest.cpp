@@ -1,0 +1,138 @@
+#include "host/broker/FaultPlan.h"
+
+#include "BrokerFixture.h"
+
+#include "host/broker/ResultCollector.h"
+
+#include <atomic>
+#include <thread>
+
+namespace cmpihost {
+namespace {
+
+using ::testing::IsEmpty;
+
+class Faults : public BrokerTest {
+  protected:
+    Faults() { broker.setFaultPlan(&plan); }
+    ~Faults() override { broker.setFaultPlan(nullptr); }
+
+    FaultPlan plan;
+};
+
+TEST_F(Faults, CallsAreCountedByEntryAndTable) {
+    CMPIInstance* const instance = newInstance();
+    CMSetProperty(instance, "A", "x", CMPI_chars);
+    CMSetProperty(instance, "B", "x", CMPI_chars);
+    CBSetProperty(mb, request.makeContext({}, ""), newPath(), "A", "x", CMPI_chars);
+    EXPECT_EQ(plan.calls("setProperty"), 3u);
+    EXPECT_EQ(plan.calls("CMPIInstanceFT.setProperty"), 2u);
+    EXPECT_EQ(plan.calls("CMPIBrokerFT.setProperty"), 1u);
+    EXPECT_EQ(plan.calls("Property"), 0u);
+    EXPECT_EQ(plan.calls(), 6u);
+    EXPECT_EQ(plan.callsByEntry().at("CMPIBrokerEncFT.newObjectPath"), 2u);
+    EXPECT_EQ(plan.fired(), 0u);
+}
+
+TEST_F(Faults, OnlyTheNthCallOfAnEntryFails) {
+    plan.add({"newObjectPath", 2, 1, CMPI_RC_ERR_ACCESS_DENIED});
+    EXPECT_NE(newPath(), nullptr);
+    EXPECT_EQ(newPath(), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_ACCESS_DENIED);
+    EXPECT_NE(newPath(), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_OK);
+    EXPECT_EQ(plan.fired(), 1u);
+}
+
+TEST_F(Faults, AFaultMayLastForSeveralCallsOrForEver) {
+    plan.add({"newObjectPath", 2, 2});
+    plan.add({"newArgs", 2, 0});
+    EXPECT_NE(newPath(), nullptr);
+    EXPECT_EQ(newPath(), nullptr);
+    EXPECT_EQ(newPath(), nullptr);
+    EXPECT_NE(newPath(), nullptr);
+    EXPECT_NE(CMNewArgs(mb, nullptr), nullptr);
+    for (int i = 0; i < 5; ++i) EXPECT_EQ(CMNewArgs(mb, nullptr), nullptr);
+    EXPECT_EQ(plan.fired(), 7u);
+}
+
+TEST_F(Faults, AnyEntryMayBeMeant) {
+    plan.add({"", 3});
+    CMPIObjectPath* const path = newPath();
+    EXPECT_EQ(CMAddKey(path, "Name", "x", CMPI_chars).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMGetKey(path, "Name", &status).state, CMPI_badValue);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(CMGetKeyCount(path, nullptr), 1u);
+}
+
+TEST_F(Faults, ACallMayReturnNullAndReportSuccess) {
+    plan.add({"newInstance", 1, 1, CMPI_RC_OK});
+    plan.add({"addKey", 1, 1, CMPI_RC_OK});
+    EXPECT_EQ(newInstance(), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_OK);
+    EXPECT_EQ(CMAddKey(newPath(), "Name", "x", CMPI_chars).rc, CMPI_RC_ERR_FAILED);
+}
+
+TEST_F(Faults, EveryShapeOfResultCanFail) {
+    CMPIString* const string = CMNewString(mb, "x", nullptr);
+    CMPIObjectPath* const path = newPath();
+    ResultCollector collector(request);
+    plan.add({"", 1, 0, CMPI_RC_ERR_FAILED});
+    EXPECT_EQ(CMGetCharsPtr(string, &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(CMGetKeyCount(path, &status), 0u);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(CMClone(path, &status), nullptr);
+    EXPECT_EQ(CMGetClassName(path, nullptr), nullptr);
+    EXPECT_FALSE(CDIsOfType(mb, path, "CMPIObjectPath", &status));
+    EXPECT_EQ(mb->eft->getMessage(mb, "", "text", &status, 0), nullptr);
+    EXPECT_EQ(CMReturnObjectPath(collector.cmpi(), path).rc, CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(CMReturnDone(collector.cmpi()).rc, CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(mb->mft->cmpiMalloc(mb, 1), nullptr);
+    mb->mft->freeObjectPath(mb, path);
+    EXPECT_EQ(mb->xft->newMutex(0), nullptr);
+    EXPECT_EQ(CBEnumInstances(mb, nullptr, nullptr, nullptr, &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);
+
+    broker.setFaultPlan(nullptr);
+    EXPECT_EQ(CMGetKeyCount(path, &status), 0u);
+    EXPECT_EQ(status.rc, CMPI_RC_OK);
+    EXPECT_EQ(collector.doneCount(), 0u);
+    EXPECT_THAT(broker.violations(), IsEmpty());
+}
+
+TEST_F(Faults, ClearingForgetsFaultsAndCounts) {
+    plan.add({"newObjectPath", 1, 0});
+    EXPECT_EQ(newPath(), nullptr);
+    plan.clear();
+    EXPECT_EQ(plan.calls(), 0u);
+    EXPECT_EQ(plan.fired(), 0u);
+    EXPECT_NE(newPath(), nullptr);
+}
+
+TEST_F(Faults, WhatTheHostMakesDoesNotCount) {
+    plan.add({"", 1, 0});
+    EXPECT_NE(request.makePath({"root", "TEST_Thing"}), nullptr);
+    EXPECT_NE(request.makeContext({}, ""), nullptr);
+    EXPECT_EQ(plan.calls(), 0u);
+}
+
+TEST_F(Faults, ExactlyOneOfTheCallsOfAllThreadsIsTheNth) {
+    plan.add({"newObjectPath", 100});
+    std::atomic<int> failures{0};
+    std::vector<std::thread> threads;
+    for (int t = 0; t < 4; ++t) {
+        threads.emplace_back([&] {
+            Request own(broker);
+            for (int i = 0; i < 50; ++i) {
+                if (CMNewObjectPath(mb, "root", "TEST_Thing", nullptr) == nullptr) ++failures;
+            }
+        });
+    }
+    for (std::thread& thread : threads) thread.join();
+    EXPECT_EQ(failures, 1);
+    EXPECT_EQ(plan.calls("newObjectPath"), 200u);
+}
+
+}  // namespace
+}  // namespace cmpihost

@@ -1,0 +1,227 @@
+// Errors, queries, messages and questions about objects.
+#include "BrokerFixture.h"
+
+namespace cmpihost {
+namespace {
+
+using ErrorObject = BrokerTest;
+
+TEST_F(ErrorObject, TellsWhatItWasMadeOf) {
+    CMPIError* const error = mb->eft->newCMPIError(mb, "owner", "ID1", "it broke", ErrorSevHigh,
+                                                   Out_of_Memory, CMPI_RC_ERR_FAILED, &status);
+    ASSERT_NE(error, nullptr);
+    EXPECT_EQ(textOf(error->ft->getOwningEntity(error, &status)), "owner");
+    EXPECT_EQ(textOf(error->ft->getMessageID(error, &status)), "ID1");
+    EXPECT_EQ(textOf(error->ft->getMessage(error, &status)), "it broke");
+    EXPECT_EQ(error->ft->getPerceivedSeverity(error, &status), ErrorSevHigh);
+    EXPECT_EQ(error->ft->getProbableCause(error, &status), Out_of_Memory);
+    EXPECT_EQ(error->ft->getCIMStatusCode(error, &status), CMPI_RC_ERR_FAILED);
+}
+
+TEST_F(ErrorObject, TakesTheRestLater) {
+    CMPIError* const error = mb->eft->newCMPIError(mb, nullptr, nullptr, nullptr, ErrorSevUnknown,
+                                                   ErrorProbCauseUnknown, CMPI_RC_OK, &status);
+    CMPIErrorFT* const ft = error->ft;
+    EXPECT_EQ(ft->getMessage(error, &status), nullptr);
+    EXPECT_EQ(ft->getErrorType(error, &status), UnknownErrorType);
+    EXPECT_EQ(ft->setErrorType(error, SoftwareError).rc, CMPI_RC_OK);
+    EXPECT_EQ(ft->setOtherErrorType(error, "other type").rc, CMPI_RC_OK);
+    EXPECT_EQ(ft->setProbableCauseDescription(error, "cause").rc, CMPI_RC_OK);
+    EXPECT_EQ(ft->setErrorSource(error, "source").rc, CMPI_RC_OK);
+    EXPECT_EQ(ft->setErrorSourceFormat(error, CIMObjectHandle).rc, CMPI_RC_OK);
+    EXPECT_EQ(ft->setOtherErrorSourceFormat(error, "format").rc, CMPI_RC_OK);
+    EXPECT_EQ(ft->setCIMStatusCodeDescription(error, "description").rc, CMPI_RC_OK);
+    EXPECT_EQ(ft->getErrorType(error, &status), SoftwareError);
+    EXPECT_EQ(textOf(ft->getOtherErrorType(error, &status)), "other type");
+    EXPECT_EQ(textOf(ft->getProbableCauseDescription(error, &status)), "cause");
+    EXPECT_EQ(textOf(ft->getErrorSource(error, &status)), "source");
+    EXPECT_EQ(ft->getErrorSourceFormat(error, &status), CIMObjectHandle);
+    EXPECT_EQ(textOf(ft->getOtherErrorSourceFormat(error, &status)), "format");
+    EXPECT_EQ(textOf(ft->getCIMStatusCodeDescription(error, &status)), "description");
+}
+
+TEST_F(ErrorObject, ListsAreArraysOfStrings) {
+    CMPIError* const error = mb->eft->newCMPIError(mb, "", "", "", ErrorSevLow,
+                                                   ErrorProbCauseUnknown, CMPI_RC_OK, &status);
+    CMPIArray* const texts = CMNewArray(mb, 1, CMPI_string, nullptr);
+    CMSetArrayElementAt(texts, 0, "do this", CMPI_chars);
+    CMPIArray* const numbers = CMNewArray(mb, 1, CMPI_uint16, nullptr);
+    EXPECT_EQ(error->ft->setRecommendedActions(error, texts).rc, CMPI_RC_OK);
+    EXPECT_EQ(error->ft->setMessageArguments(error, numbers).rc, CMPI_RC_ERR_TYPE_MISMATCH);
+    CMPIArray* const actions = error->ft->getRecommendedActions(error, &status);
+    EXPECT_EQ(textOf(CMGetArrayElementAt(actions, 0, nullptr).value.string), "do this");
+    EXPECT_EQ(CMGetArrayCount(error->ft->getMessageArguments(error, &status), nullptr), 0u);
+}
+
+class SelectObject : public BrokerTest {
+  protected:
+    CMPISelectExp* select(const char* query, CMPIArray** projection = nullptr,
+                          const char* language = "WQL") {
+        return CMNewSelectExp(mb, query, language, projection, &status);
+    }
+};
+
+TEST_F(SelectObject, SelectsByClassWhereThereIsNoCondition) {
+    CMPISelectExp* const query = select("select * from test_thing");
+    ASSERT_NE(query, nullptr);
+    EXPECT_EQ(textOf(query->ft->getString(query, nullptr)), "select * from test_thing");
+    EXPECT_TRUE(query->ft->evaluate(query, newInstance("TEST_Thing"), &status));
+    EXPECT_FALSE(query->ft->evaluate(query, newInstance("TEST_Other"), &status));
+    EXPECT_EQ(status.rc, CMPI_RC_OK);
+    EXPECT_TRUE(query->ft->evaluateUsingAccessor(query, nullptr, nullptr, &status));
+}
+
+TEST_F(SelectObject, HandsOutTheNamesThatItSelects) {
+    CMPIArray* names = nullptr;
+    select("SELECT Name , Size FROM TEST_Thing", &names);
+    ASSERT_NE(names, nullptr);
+    ASSERT_EQ(CMGetArrayCount(names, nullptr), 2u);
+    EXPECT_EQ(textOf(CMGetArrayElementAt(names, 0, nullptr).value.string), "Name");
+    EXPECT_EQ(textOf(CMGetArrayElementAt(names, 1, nullptr).value.string), "Size");
+    select("SELECT * FROM TEST_Thing", &names);
+    EXPECT_EQ(names, nullptr);
+}
+
+TEST_F(SelectObject, DoesNotEvaluateConditions) {
+    CMPISelectExp* const query = select("SELECT * FROM TEST_Thing WHERE Size > 5");
+    ASSERT_NE(query, nullptr);
+    query->ft->evaluate(query, newInstance(), &status);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    query->ft->evaluateUsingAccessor(query, nullptr, nullptr, &status);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(query->ft->getDOC(query, &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(query->ft->getCOD(query, &status), nullptr);
+}
+
+TEST_F(SelectObject, RefusesWhatIsNoQuery) {
+    for (const char* const text :
+         {"", "DELETE FROM TEST_Thing", "SELECT FROM TEST_Thing", "SELECT Name, FROM TEST_Thing",
+          "SELECT * TEST_Thing", "SELECT * FROM", "SELECT * FROM TEST_Thing HAVING x",
+          "SELECT * FROM TEST_Thing WHERE"}) {
+        EXPECT_EQ(select(text), nullptr) << text;
+        EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_QUERY) << text;
+    }
+    EXPECT_EQ(select("SELECT * FROM TEST_Thing", nullptr, "SQL"), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED);
+}
+
+class Messages : public BrokerTest {};
+
+TEST_F(Messages, TakeArgumentsOfEveryKind) {
+    CMPIString* const string = CMNewString(mb, "string", nullptr);
+    CMPIString* const text = mb->eft->getMessage(
+        mb, "ID", "$0 $1 $2 $3 $4 $5 $6 $7 $8", &status, 9, CMPI_sint32, -1, CMPI_uint32,
+        4294967295u, CMPI_sint64, -2LL, CMPI_uint64, 18446744073709551615ULL, CMPI_real64, 0.5,
+        CMPI_boolean, 1, CMPI_chars, "chars", CMPI_string, string, CMPI_chars,
+        static_cast<const char*>(nullptr));
+    EXPECT_EQ(textOf(text), "-1 4294967295 -2 18446744073709551615 0.5 true chars string NULL");
+    EXPECT_EQ(status.rc, CMPI_RC_OK);
+}
+
+TEST_F(Messages, LeaveAloneWhatIsNoArgument) {
+    CMPIString* const text =
+        mb->eft->getMessage(mb, "ID", "$1 costs 5$, $$0 $", &status, 1, CMPI_chars, "x");
+    EXPECT_EQ(textOf(text), "$1 costs 5$, $x $");
+}
+
+TEST_F(Messages, RefuseMoreThanTenArgumentsAndStrangeTypes) {
+    EXPECT_EQ(mb->eft->getMessage(mb, "ID", "$0", &status, 11), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_PARAMETER);
+    EXPECT_EQ(mb->eft->getMessage(mb, "ID", "$0", &status, 1, CMPI_instance, nullptr), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_DATA_TYPE);
+}
+
+TEST_F(Messages, HaveNoFiles) {
+    CMPIMsgFileHandle handle = &status;
+    EXPECT_EQ(CMOpenMessageFile(mb, "texts", &handle).rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(handle, nullptr);
+    EXPECT_EQ(CMCloseMessageFile(mb, handle).rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(
+        textOf(mb->eft->getMessage2(mb, "ID", handle, "default $0", &status, 1, CMPI_sint32, 3)),
+        "default 3");
+}
+
+TEST_F(Messages, LoggedAndTracedOnesAreKept) {
+    CMPIString* const string = CMNewString(mb, "from a string", nullptr);
+    EXPECT_EQ(CMLogMessage(mb, CMPI_SEV_WARNING, "ID", "text", string).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMTraceMessage(mb, CMPI_LEV_VERBOSE, "component", nullptr, string).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMLogMessage(mb, CMPI_SEV_INFO, nullptr, nullptr, nullptr).rc, CMPI_RC_OK);
+
+    const std::vector<LogRecord> records = broker.takeLogRecords();
+    ASSERT_EQ(records.size(), 3u);
+    EXPECT_EQ(records[0].channel, LogRecord::Channel::Log);
+    EXPECT_EQ(records[0].severity, CMPI_SEV_WARNING);
+    EXPECT_EQ(records[0].id, "ID");
+    EXPECT_EQ(records[0].text, "text");
+    EXPECT_EQ(records[1].channel, LogRecord::Channel::Trace);
+    EXPECT_EQ(records[1].id, "component");
+    EXPECT_EQ(records[1].text, "from a string");
+    EXPECT_EQ(records[2].text, "");
+    EXPECT_THAT(broker.logRecords(), ::testing::IsEmpty());
+}
+
+class ObjectQuestions : public BrokerTest {
+  protected:
+    std::string typeOf(const void* object) { return textOf(CDGetType(mb, object, &status)); }
+    std::string text(const void* object) { return textOf(CDToString(mb, object, &status)); }
+};
+
+TEST_F(ObjectQuestions, EveryKindKnowsItsType) {
+    EXPECT_EQ(typeOf(CMNewString(mb, "x", nullptr)), "CMPIString");
+    EXPECT_EQ(typeOf(newPath()), "CMPIObjectPath");
+    EXPECT_EQ(typeOf(newInstance()), "CMPIInstance");
+    EXPECT_EQ(typeOf(CMNewArray(mb, 1, CMPI_uint8, nullptr)), "CMPIArray");
+    EXPECT_EQ(typeOf(CMNewArgs(mb, nullptr)), "CMPIArgs");
+    EXPECT_EQ(typeOf(request.makeContext({}, "")), "CMPIContext");
+    EXPECT_EQ(typeOf(CMNewDateTime(mb, nullptr)), "CMPIDateTime");
+    EXPECT_EQ(typeOf(CMNewSelectExp(mb, "SELECT * FROM A", "WQL", nullptr, nullptr)),
+              "CMPISelectExp");
+    EXPECT_TRUE(CDIsOfType(mb, newPath(), "CMPIObjectPath", &status));
+    EXPECT_FALSE(CDIsOfType(mb, newPath(), "CMPIInstance", &status));
+}
+
+TEST_F(ObjectQuestions, EveryKindHasAText) {
+    CMPIInstance* const instance = newInstance();
+    CMSetProperty(instance, "Name", "x", CMPI_chars);
+    const CMPIUint16 number = 3;
+    CMSetProperty(instance, "Size", &number, CMPI_uint16);
+    CMPIArgs* const args = CMNewArgs(mb, nullptr);
+    CMAddArg(args, "A", "b", CMPI_chars);
+    EXPECT_EQ(text(instance), "root/cimv2:TEST_Thing {Name=\"x\", Size=3}");
+    EXPECT_EQ(text(newPath()), "root/cimv2:TEST_Thing");
+    EXPECT_EQ(text(CMNewString(mb, "plain", nullptr)), "plain");
+    EXPECT_EQ(text(CMNewArray(mb, 2, CMPI_uint8, nullptr)), "{NULL, NULL}");
+    EXPECT_EQ(text(args), "{A=\"b\"}");
+    EXPECT_EQ(text(CMNewDateTimeFromBinary(mb, 0, 0, nullptr)), "19700101000000.000000+000");
+}
+
+TEST_F(ObjectQuestions, WhatIsNoObjectIsAViolation) {
+    struct {
+        void* hdl = nullptr;
+        void* ft = nullptr;
+    } stranger;
+    EXPECT_EQ(CDGetType(mb, &stranger, &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_HANDLE);
+    EXPECT_EQ(CDToString(mb, nullptr, &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_PARAMETER);
+    EXPECT_THAT(broker.violations(),
+                ::testing::ElementsAre("CMPIBrokerEncFT.getType: no object of this host",
+                                       "CMPIBrokerEncFT.toString: null object"));
+}
+
+TEST_F(ObjectQuestions, ClassesDescendAsTheCatalogueSays) {
+    const TestCatalogue catalogue = testClasses();
+    Broker schooled(&catalogue);
+    Request scope(schooled);
+    const CMPIBroker* const other = schooled.cmpi();
+    const CMPIObjectPath* const small = CMNewObjectPath(other, "", "TEST_SmallThing", nullptr);
+    EXPECT_TRUE(CMClassPathIsA(other, small, "test_smallthing", &status));
+    EXPECT_TRUE(CMClassPathIsA(other, small, "TEST_Thing", &status));
+    EXPECT_TRUE(CMClassPathIsA(other, small, "CIM_Thing", &status));
+    EXPECT_FALSE(CMClassPathIsA(other, small, "TEST_Other", &status));
+    EXPECT_FALSE(CMClassPathIsA(mb, newPath("TEST_SmallThing"), "TEST_Thing", &status));
+}
+
+}  // namespace
+}  // namespace cmpihost
