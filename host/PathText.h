@@ -1,0 +1,42 @@
+#pragma once
+
+#include <stdexcept>
+#include <string>
+
+#include "host/broker/ClassCatalogue.h"
+#include "host/broker/Value.h"
+
+namespace cmpihost {
+
+/// The namespace of a path that names none.
+constexpr const char* defaultNamespace = "root/cimv2";
+
+/// A text that is no object path. what() is three lines: the complaint, the text, and a caret under
+/// the character that the complaint is about. It is safe to print on a terminal.
+class PathError : public std::runtime_error {
+  public:
+    /// `offset` is the byte of `text` that is meant; the size of the text means its end.
+    PathError(const std::string& text, std::size_t offset, const std::string& complaint);
+
+    std::size_t offset() const noexcept { return offset_; }
+    /// The complaint alone.
+    const std::string& complaint() const noexcept { return complaint_; }
+
+  private:
+    std::size_t offset_;
+    std::string complaint_;
+};
+
+/// Reads a path as WBEM clients write it: `[//host/][namespace:]Class[.Key=value,...]`. A value is
+/// a text in quotes (with \" and \\ for these two), an integer, TRUE or FALSE. A key that the
+/// catalogue declares as a reference takes a path in quotes, one that it declares as a datetime
+/// gives a datetime; a null catalogue declares nothing. Integers are CMPI_uint64, or CMPI_sint64
+/// when negative, whatever the class declares: that is what clients' requests carry. A reference
+/// that names no namespace is in the one of the outer path. Throws PathError.
+ObjectPathValue parsePath(const std::string& text, const ClassCatalogue* catalogue);
+
+/// The path as parsePath reads it. A host name goes before the namespace; the path of a class has
+/// no dot. Reals, which no key can be, are written as numbers, and null as an empty text.
+std::string writePath(const ObjectPathValue& path);
+
+}  // namespace cmpihost

@@ -1,0 +1,153 @@
+#include "host/Run.h"
+
+#include <optional>
+
+#include "host/Places.h"
+#include "host/ProviderHost.h"
+#include "host/RecordsOnStderr.h"
+#include "host/RequestBuilder.h"
+#include "host/SchemaCatalogue.h"
+#include "host/StatusText.h"
+#include "host/TerminalText.h"
+#include "host/UsageError.h"
+
+namespace cmpihost {
+
+namespace {
+
+namespace fs = std::filesystem;
+
+Schema loadSchema(const std::string& given, const fs::path& programFolder) {
+    try {
+        return Schema::load(given.empty() ? schemaFolder(programFolder) : fs::path(given));
+    } catch (const std::runtime_error& error) {
+        const char* hint = given.empty() ? " (--schema DIR names another folder)" : "";
+        throw UsageError(terminalText(error.what()) + hint);
+    }
+}
+
+std::string providerFile(const std::string& given, const fs::path& programFolder) {
+    if (!given.empty()) {
+        // The loader looks for a bare name in its own folders only, not in the current one.
+        std::error_code error;
+        const bool bare = given.find('/') == std::string::npos;
+        return bare && fs::exists(given, error) ? "./" + given : given;
+    }
+    const fs::path found = findProvider(programFolder);
+    if (found.empty()) {
+        std::string text = "no provider library was found; looked for";
+        for (const fs::path& candidate : providerCandidates(programFolder)) {
+            text += "\n  " + candidate.string();
+        }
+        throw LoadError(LoadProblem::FileMissing, text + "\n(--provider FILE names one)");
+    }
+    return found.string();
+}
+
+bool yieldsPaths(Operation operation) {
+    return operation == Operation::EnumerateInstanceNames ||
+           operation == Operation::AssociatorNames || operation == Operation::ReferenceNames ||
+           operation == Operation::CreateInstance;
+}
+
+bool yieldsNothing(Operation operation) {
+    return operation == Operation::ModifyInstance || operation == Operation::DeleteInstance;
+}
+
+void printResult(const OperationRequest& request, OperationResult result, const Schema& schema,
+                 Printer& printer) {
+    if (yieldsNothing(request.operation)) {
+        return;
+    }
+    if (yieldsPaths(request.operation)) {
+        printer.print(result.paths);
+        return;
+    }
+    if (request.properties) {
+        for (InstanceValue& instance : result.instances) {
+            instance = withoutUnlisted(std::move(instance), *request.properties, schema);
+        }
+    }
+    printer.print(result.instances);
+}
+
+/// What an object manager would do differently with such a result.
+void printNotes(const OperationRequest& request, const OperationResult& result, std::ostream& err) {
+    if (request.operation != Operation::GetInstance) {
+        return;
+    }
+    if (result.instances.empty()) {
+        err << "note: no instance was returned; an object manager answers "
+            << statusText(CMPI_RC_ERR_NOT_FOUND) << '\n';
+    } else if (result.instances.size() > 1) {
+        err << "note: " << result.instances.size()
+            << " instances were returned; an object manager takes the first\n";
+    }
+}
+
+class Run {
+  public:
+    Run(const CommandLine& commandLine, const fs::path& programFolder, std::ostream& out,
+        std::ostream& err)
+        : commandLine_(commandLine), programFolder_(programFolder), out_(out), err_(err) {}
+
+    ExitStatus guarded() {
+        try {
+            return execute();
+        } catch (const LoadError& error) {
+            err_ << error.what() << '\n';
+            return exitNotLoaded;
+        } catch (const PathError& error) {
+            err_ << error.what() << '\n';
+        } catch (const UsageError& error) {
+            err_ << error.what() << '\n';
+        }
+        return exitUsage;
+    }
+
+  private:
+    ExitStatus execute() {
+        const Schema schema = loadSchema(commandLine_.schema, programFolder_);
+        const SchemaCatalogue catalogue(schema);
+        const OperationRequest request = buildRequest(commandLine_, schema, catalogue);
+        const OperationResult result = perform(request, catalogue);
+        if (result.rc != CMPI_RC_OK) {
+            err_ << failureText(result) << '\n';
+            return exitCimStatus;
+        }
+        printResult(request, result, schema, *makePrinter(commandLine_.format, out_, schema));
+        printNotes(request, result, err_);
+        if (!out_.flush()) {
+            err_ << "the results cannot be written\n";
+            return exitCimStatus;
+        }
+        return exitDone;
+    }
+
+    OperationResult perform(const OperationRequest& request, const SchemaCatalogue& catalogue) {
+        std::optional<RecordsOnStderr> records;
+        if (commandLine_.log) {
+            records.emplace();
+        }
+        ProviderHost host(providerFile(commandLine_.provider, programFolder_), catalogue);
+        OperationResult result = host.run(request);
+        for (const std::string& violation : host.unload()) {
+            err_ << "caught: " << terminalText(violation) << '\n';
+        }
+        return result;
+    }
+
+    const CommandLine& commandLine_;
+    const fs::path& programFolder_;
+    std::ostream& out_;
+    std::ostream& err_;
+};
+
+}  // namespace
+
+ExitStatus run(const CommandLine& commandLine, const fs::path& programFolder, std::ostream& out,
+               std::ostream& err) {
+    return Run(commandLine, programFolder, out, err).guarded();
+}
+
+}  // namespace cmpihost

@@ -1,0 +1,178 @@
+#include "host/CommandLine.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using namespace cmpihost;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+
+ParsedCommandLine parsed(std::vector<const char*> words) {
+    words.insert(words.begin(), "cmpihost");
+    return parseCommandLine(static_cast<int>(words.size()), words.data());
+}
+
+CommandLine accepted(const std::vector<const char*>& words) {
+    const ParsedCommandLine result = parsed(words);
+    EXPECT_TRUE(result.commandLine.has_value()) << result.text;
+    return result.commandLine.value_or(CommandLine());
+}
+
+TEST(CommandLine, KnowsEveryOperation) {
+    const struct {
+        const char* word;
+        Operation operation;
+    } rows[] = {{"ei", Operation::EnumerateInstances}, {"ein", Operation::EnumerateInstanceNames},
+                {"gi", Operation::GetInstance},        {"ci", Operation::CreateInstance},
+                {"mi", Operation::ModifyInstance},     {"di", Operation::DeleteInstance},
+                {"ai", Operation::Associators},        {"ain", Operation::AssociatorNames},
+                {"ri", Operation::References},         {"rin", Operation::ReferenceNames}};
+    for (const auto& row : rows) {
+        const CommandLine line = accepted({row.word, "ns:Class"});
+        EXPECT_EQ(line.operation, row.operation) << row.word;
+        EXPECT_EQ(line.path, "ns:Class");
+        EXPECT_FALSE(line.properties.has_value());
+    }
+}
+
+TEST(CommandLine, HasQuietDefaults) {
+    const CommandLine line = accepted({"ei", "X"});
+    EXPECT_EQ(line.provider, "");
+    EXPECT_EQ(line.schema, "");
+    EXPECT_EQ(line.format, Format::Table);
+    EXPECT_FALSE(line.log);
+}
+
+TEST(CommandLine, TakesOptionsBeforeAndAfterTheOperation) {
+    for (const auto& words : std::vector<std::vector<const char*>>{
+             {"--provider", "p.so", "--format", "json", "--log", "--schema=d", "ei", "X"},
+             {"ei", "X", "--format=json", "--log", "--schema", "d", "--provider", "p.so"}}) {
+        const CommandLine line = accepted(words);
+        EXPECT_EQ(line.provider, "p.so");
+        EXPECT_EQ(line.format, Format::Json);
+        EXPECT_TRUE(line.log);
+        EXPECT_EQ(line.schema, "d");
+    }
+    EXPECT_EQ(accepted({"--format", "mof", "ei", "X"}).format, Format::Mof);
+    EXPECT_EQ(accepted({"--format", "table", "ei", "X"}).format, Format::Table);
+}
+
+TEST(CommandLine, GathersThePropertyList) {
+    EXPECT_THAT(*accepted({"ei", "X", "A", "B,C"}).properties, ElementsAre("A", "B", "C"));
+    EXPECT_THAT(*accepted({"gi", "X", "--properties", "A,B"}).properties, ElementsAre("A", "B"));
+    EXPECT_THAT(*accepted({"ai", "X", "A", "--properties", "B"}).properties, ElementsAre("A", "B"));
+    EXPECT_THAT(*accepted({"ri", "X", "--properties", ""}).properties, IsEmpty());
+    EXPECT_THAT(*accepted({"ei", "X", "gi"}).properties, ElementsAre("gi"));
+}
+
+TEST(CommandLine, TakesTheFiltersOfAssociations) {
+    const CommandLine line = accepted({"ain", "X", "--assoc-class", "A", "--result-class", "B",
+                                       "--role", "C", "--result-role", "D"});
+    EXPECT_EQ(line.assocClass, "A");
+    EXPECT_EQ(line.resultClass, "B");
+    EXPECT_EQ(line.role, "C");
+    EXPECT_EQ(line.resultRole, "D");
+    EXPECT_EQ(accepted({"rin", "X", "--result-class", "B", "--role", "C"}).role, "C");
+    EXPECT_FALSE(accepted({"ai", "X"}).assocClass.has_value());
+}
+
+TEST(CommandLine, TakesAssignmentsThatBeginLikeOptionsOrLists) {
+    const CommandLine line = accepted({"mi", "X.A=\"b\"", "Level=-5", "States={2, 11}", "Text="});
+    EXPECT_THAT(line.assignments, ElementsAre("Level=-5", "States={2, 11}", "Text="));
+    EXPECT_EQ(line.path, "X.A=\"b\"");
+}
+
+TEST(CommandLine, TakesAQueryWithLanguageAndNamespace) {
+    const CommandLine line = accepted({"xq", "SELECT * FROM X"});
+    EXPECT_EQ(line.operation, Operation::ExecQuery);
+    EXPECT_EQ(line.query, "SELECT * FROM X");
+    EXPECT_EQ(line.queryLanguage, "WQL");
+    EXPECT_EQ(line.nameSpace, "root/cimv2");
+    const CommandLine other = accepted({"xq", "q", "--lang", "DMTF:CQL", "--namespace", "interop"});
+    EXPECT_EQ(other.queryLanguage, "DMTF:CQL");
+    EXPECT_EQ(other.nameSpace, "interop");
+}
+
+struct Refusal {
+    std::vector<const char*> words;
+    const char* text;
+};
+
+TEST(CommandLine, RefusesWhatItDoesNotKnow) {
+    const Refusal rows[] = {
+        {{}, "An operation is required\n"},
+        {{"--log"}, "An operation is required\n"},
+        {{"zz"}, "There is no operation 'zz'\n"},
+        {{"\x1b[31m"}, "There is no operation '\\x1b[31m'\n"},
+        {{"ei"}, "PATH is required\n"},
+        {{"xq"}, "QUERY is required\n"},
+        {{"ein", "X", "Name"}, "The following argument was not expected: Name\n"},
+        {{"di", "X", "Y"}, "The following argument was not expected: Y\n"},
+        {{"ei", "X", "--role", "r"}, "The following argument was not expected: --role\n"},
+        {{"ri", "X", "--assoc-class", "A"},
+         "The following argument was not expected: --assoc-class\n"},
+        {{"--format", "xml", "ei", "X"}, "--format: expected table, mof or json, found 'xml'\n"},
+        {{"--format", "mof", "--format", "json", "ei", "X"},
+         "--format: At Most 1 required but received 2\n"},
+        {{"--colour", "ei", "X"}, "The following argument was not expected: --colour\n"},
+    };
+    for (const Refusal& row : rows) {
+        const ParsedCommandLine result = parsed(row.words);
+        EXPECT_FALSE(result.commandLine.has_value()) << row.text;
+        EXPECT_EQ(result.status, exitUsage) << row.text;
+        EXPECT_EQ(result.text,
+                  std::string(row.text) + "Run cmpihost --help for more information.\n");
+    }
+}
+
+TEST(CommandLine, TellsItsVersion) {
+    const ParsedCommandLine result = parsed({"--version"});
+    EXPECT_FALSE(result.commandLine.has_value());
+    EXPECT_EQ(result.status, exitDone);
+    EXPECT_EQ(result.text, "cmpihost 1.0.0\n");
+}
+
+TEST(CommandLine, DescribesEverythingInItsHelp) {
+    const ParsedCommandLine result = parsed({"--help"});
+    EXPECT_FALSE(result.commandLine.has_value());
+    EXPECT_EQ(result.status, exitDone);
+    for (const char* word : {"Usage: cmpihost [OPTIONS] OPERATION ARGUMENT...",
+                             "--provider FILE",
+                             "--format FORMAT",
+                             "--log",
+                             "--schema DIR",
+                             "--version",
+                             "\nei\n",
+                             "\nein\n",
+                             "\ngi\n",
+                             "\nci\n",
+                             "\nmi\n",
+                             "\ndi\n",
+                             "\nxq\n",
+                             "\nai\n",
+                             "\nain\n",
+                             "\nri\n",
+                             "\nrin\n",
+                             "--assoc-class",
+                             "--result-class",
+                             "--role",
+                             "--result-role",
+                             "--properties",
+                             "--lang",
+                             "--namespace",
+                             "Exit status:"}) {
+        EXPECT_THAT(result.text, HasSubstr(word));
+    }
+}
+
+TEST(CommandLine, DescribesOneOperation) {
+    const ParsedCommandLine result = parsed({"ai", "--help"});
+    EXPECT_EQ(result.status, exitDone);
+    EXPECT_THAT(result.text, HasSubstr("Usage: cmpihost ai [OPTIONS] PATH [PROPERTY...]"));
+    EXPECT_THAT(result.text, HasSubstr("--assoc-class CLASS"));
+    EXPECT_THAT(result.text, testing::Not(HasSubstr("--lang")));
+}
+
+}  // namespace

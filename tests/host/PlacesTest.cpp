@@ -1,0 +1,55 @@
+#include "host/Places.h"
+
+#include <gmock/gmock.h>
+#include <stdlib.h>
+
+#include <fstream>
+
+namespace {
+
+namespace fs = std::filesystem;
+using namespace cmpihost;
+
+class Places : public testing::Test {
+  protected:
+    void SetUp() override {
+        std::string name = (fs::temp_directory_path() / "placesXXXXXX").string();
+        ASSERT_NE(mkdtemp(name.data()), nullptr);
+        prefix_ = name;
+        for (const char* folder : {"bin", "lib/cmpi", "lib64/cmpi"}) {
+            fs::create_directories(prefix_ / folder);
+        }
+    }
+    void TearDown() override { fs::remove_all(prefix_); }
+    void touch(const char* file) { std::ofstream(prefix_ / file) << ""; }
+    fs::path found() { return findProvider(prefix_ / "bin"); }
+
+    fs::path prefix_;
+};
+
+TEST_F(Places, LookForTheSchemaBesideTheProgramsFolder) {
+    EXPECT_EQ(schemaFolder("/opt/x/bin"), "/opt/x/share/korva-osstatus/schema");
+}
+
+TEST_F(Places, PreferTheLibraryFolderThenTheProgramsThenTheObjectManagers) {
+    EXPECT_EQ(found(), "");
+    touch("lib64/cmpi/libkorzbosstatusprofileprovider.so");
+    EXPECT_EQ(found(), prefix_ / "lib64/cmpi/libkorzbosstatusprofileprovider.so");
+    touch("lib/cmpi/libkorzbosstatusprofileprovider.so");
+    EXPECT_EQ(found(), prefix_ / "lib/cmpi/libkorzbosstatusprofileprovider.so");
+    touch("bin/libkorzbosstatusprofileprovider.so.1");
+    EXPECT_EQ(found(), prefix_ / "bin/libkorzbosstatusprofileprovider.so.1");
+    touch("lib/libkorzbosstatusprofileprovider.so.1");
+    EXPECT_EQ(found(), prefix_ / "lib/libkorzbosstatusprofileprovider.so.1");
+}
+
+TEST_F(Places, DoNotTakeAFolderForALibrary) {
+    fs::create_directories(prefix_ / "lib/libkorzbosstatusprofileprovider.so.1");
+    EXPECT_EQ(found(), "");
+}
+
+TEST_F(Places, KnowTheFolderOfTheRunningProgram) {
+    EXPECT_EQ(programFolder(), fs::path(KORVA_BINARY_DIR) / "bin");
+}
+
+}  // namespace

@@ -1,0 +1,233 @@
+#include "host/Printer.h"
+
+#include <gmock/gmock.h>
+#include <stdlib.h>
+#include <time.h>
+
+#include <cmath>
+#include <sstream>
+
+#include "host/MofParser.h"
+
+namespace {
+
+using namespace cmpihost;
+
+const Schema& schema() {
+    static const Schema instance = [] {
+        Schema loaded;
+        loaded.add(mof::parse(
+            "class Machine { [Key] string Name;"
+            " [ValueMap{\"0\", \"2\", \"36\", \"..\"}, Values{\"None\", \"OK\", \"LINUX\", "
+            "\"Rest\"}] uint16 Kind; "
+            "[ValueMap{\"2\", \"11\"}, Values{\"OK\", \"In Service\"}] uint16 States[];"
+            "[ValueMap{\"-1\"}, Values{\"Below\"}] sint8 Level;"
+            "[Units(\"KiloBytes\")] uint64 Memory; [Units(\"KiloBytes\")] uint64 Small; };",
+            "x.mof"));
+        return loaded;
+    }();
+    return instance;
+}
+
+ObjectPathValue machinePath() {
+    return {"root/cimv2", "Machine", {{"Name", Value("m\"1")}}};
+}
+
+/// One property of every kind.
+InstanceValue machine() {
+    InstanceValue inner{{"", "Part", {}}, {{"Size", Value::fromUnsigned(3, CMPI_uint8)}}};
+    return {machinePath(),
+            {{"Name", Value("m\"1")},
+             {"Kind", Value::fromUnsigned(36, CMPI_uint16)},
+             {"States", Value::fromArray(CMPI_uint16, {Value::fromUnsigned(2, CMPI_uint16),
+                                                       Value::fromUnsigned(11, CMPI_uint16),
+                                                       Value::null(CMPI_uint16)})},
+             {"Level", Value::fromSigned(-1, CMPI_sint8)},
+             {"Memory", Value::fromUnsigned(8123456)},
+             {"Small", Value::fromUnsigned(1000)},
+             {"Largest", Value::fromUnsigned(18446744073709551615U)},
+             {"Least", Value::fromSigned(INT64_MIN)},
+             {"Started", Value::fromText("20240102030405.000000+000", CMPI_dateTime)},
+             {"Empty", Value("")},
+             {"Unset", Value::null(CMPI_string)},
+             {"Raw", Value("a\n\x1b[31m\xFF")},
+             {"Notes", Value::fromArray(CMPI_string, {Value("one, two"), Value("")})},
+             {"NoNotes", Value::fromArray(CMPI_string, std::vector<Value>())},
+             {"On", Value::fromBoolean(true)},
+             {"Ratio", Value::fromReal(static_cast<double>(0.1F), CMPI_real32)},
+             {"Whole", Value::fromReal(3, CMPI_real64)},
+             {"Letter", Value::fromUnsigned(0xE9, CMPI_char16)},
+             {"Other", Value::fromReference({"a/b", "Machine", {{"Name", Value("x")}}})},
+             {"Part", Value::fromInstance(inner)}}};
+}
+
+std::string printed(Format format, const std::vector<InstanceValue>& instances) {
+    std::ostringstream stream;
+    makePrinter(format, stream, schema())->print(instances);
+    return stream.str();
+}
+
+std::string printed(Format format, const std::vector<ObjectPathValue>& paths) {
+    std::ostringstream stream;
+    makePrinter(format, stream, schema())->print(paths);
+    return stream.str();
+}
+
+class Printers : public testing::Test {
+  protected:
+    void SetUp() override {
+        setenv("TZ", "UTC0", 1);
+        tzset();
+    }
+};
+
+TEST_F(Printers, ShowAnInstanceAsATable) {
+    EXPECT_EQ(printed(Format::Table, std::vector{machine()}),
+              "root/cimv2:Machine.Name=\"m\\\"1\"\n"
+              "  Name     m\"1\n"
+              "  Kind     36 (LINUX)\n"
+              "  States   2 (OK), 11 (In Service), NULL\n"
+              "  Level    -1 (Below)\n"
+              "  Memory   8123456 (7.7 GiB)\n"
+              "  Small    1000\n"
+              "  Largest  18446744073709551615\n"
+              "  Least    -9223372036854775808\n"
+              "  Started  20240102030405.000000+000 (2024-01-02 03:04:05 +00:00)\n"
+              "  Empty    \"\"\n"
+              "  Unset    NULL\n"
+              "  Raw      a\\n\\x1b[31m\\xff\n"
+              "  Notes    \"one, two\", \"\"\n"
+              "  NoNotes  {}\n"
+              "  On       TRUE\n"
+              "  Ratio    0.1\n"
+              "  Whole    3\n"
+              "  Letter   \xC3\xA9\n"
+              "  Other    a/b:Machine.Name=\"x\"\n"
+              "  Part     instance of Part\n");
+}
+
+TEST_F(Printers, ShowAnInstanceAsMof) {
+    EXPECT_EQ(printed(Format::Mof, std::vector{machine()}),
+              "instance of Machine {\n"
+              "    Name = \"m\\\"1\";\n"
+              "    Kind = 36;\n"
+              "    States = {2, 11, NULL};\n"
+              "    Level = -1;\n"
+              "    Memory = 8123456;\n"
+              "    Small = 1000;\n"
+              "    Largest = 18446744073709551615;\n"
+              "    Least = -9223372036854775808;\n"
+              "    Started = \"20240102030405.000000+000\";\n"
+              "    Empty = \"\";\n"
+              "    Unset = NULL;\n"
+              "    Raw = \"a\\n\\x001B[31m\xEF\xBF\xBD\";\n"
+              "    Notes = {\"one, two\", \"\"};\n"
+              "    NoNotes = {};\n"
+              "    On = TRUE;\n"
+              "    Ratio = 0.1;\n"
+              "    Whole = 3.0;\n"
+              "    Letter = '\\x00E9';\n"
+              "    Other = \"a/b:Machine.Name=\\\"x\\\"\";\n"
+              "    Part = \"instance of Part {\\n    Size = 3;\\n};\\n\";\n"
+              "};\n");
+}
+
+TEST_F(Printers, WriteMofThatTheReaderTakes) {
+    EXPECT_NO_THROW(mof::parse(printed(Format::Mof, std::vector{machine(), machine()}), "x.mof"));
+}
+
+TEST_F(Printers, ShowAnInstanceAsJson) {
+    EXPECT_EQ(printed(Format::Json, std::vector{machine()}), R"json([
+  {
+    "class": "Machine",
+    "path": "root/cimv2:Machine.Name=\"m\\\"1\"",
+    "properties": {
+      "Name": "m\"1",
+      "Kind": 36,
+      "States": [
+        2,
+        11,
+        null
+      ],
+      "Level": -1,
+      "Memory": 8123456,
+      "Small": 1000,
+      "Largest": 18446744073709551615,
+      "Least": -9223372036854775808,
+      "Started": "20240102030405.000000+000",
+      "Empty": "",
+      "Unset": null,
+)json"
+                                                             "      \"Raw\": \"a\\n\\u001b[31m"
+                                                             "\xEF\xBF\xBD\",\n"
+                                                             R"json(      "Notes": [
+        "one, two",
+        ""
+      ],
+      "NoNotes": [],
+      "On": true,
+      "Ratio": 0.1,
+      "Whole": 3.0,
+      "Letter": "é",
+      "Other": "a/b:Machine.Name=\"x\"",
+      "Part": {
+        "class": "Part",
+        "properties": {
+          "Size": 3
+        }
+      }
+    }
+  }
+]
+)json");
+}
+
+TEST_F(Printers, ShowPathsOneByOne) {
+    const std::vector<ObjectPathValue> paths = {machinePath(),
+                                                {"root", "Machine", {{"Name", Value("a\nb")}}}};
+    EXPECT_EQ(printed(Format::Table, paths),
+              "root/cimv2:Machine.Name=\"m\\\"1\"\n"
+              "root:Machine.Name=\"a\\nb\"\n");
+    EXPECT_EQ(printed(Format::Mof, paths),
+              "instance of Machine {\n"
+              "    Name = \"m\\\"1\";\n"
+              "};\n"
+              "\n"
+              "instance of Machine {\n"
+              "    Name = \"a\\nb\";\n"
+              "};\n");
+    EXPECT_EQ(printed(Format::Json, paths), R"json([
+  {
+    "class": "Machine",
+    "path": "root/cimv2:Machine.Name=\"m\\\"1\""
+  },
+  {
+    "class": "Machine",
+    "path": "root:Machine.Name=\"a\nb\""
+  }
+]
+)json");
+}
+
+TEST_F(Printers, ShowNothingAsNothing) {
+    EXPECT_EQ(printed(Format::Table, std::vector<InstanceValue>()), "");
+    EXPECT_EQ(printed(Format::Mof, std::vector<ObjectPathValue>()), "");
+    EXPECT_EQ(printed(Format::Json, std::vector<InstanceValue>()), "[]\n");
+    EXPECT_EQ(printed(Format::Json, std::vector<ObjectPathValue>()), "[]\n");
+}
+
+TEST_F(Printers, SeparateInstancesByALine) {
+    const InstanceValue small{{"n", "X", {}}, {{"A", Value::fromUnsigned(1, CMPI_uint8)}}};
+    EXPECT_EQ(printed(Format::Table, std::vector{small, small}), "n:X\n  A  1\n\nn:X\n  A  1\n");
+}
+
+TEST_F(Printers, GiveRealsThatAreNoNumbersAsNull) {
+    const InstanceValue odd{{"n", "X", {}},
+                            {{"A", Value::fromReal(std::nan(""), CMPI_real64)},
+                             {"B", Value::fromReal(1e300, CMPI_real64)}}};
+    EXPECT_EQ(printed(Format::Mof, std::vector{odd}),
+              "instance of X {\n    A = NULL;\n    B = 1.0e+300;\n};\n");
+    EXPECT_THAT(printed(Format::Json, std::vector{odd}), testing::HasSubstr("\"A\": null"));
+}
+
+}  // namespace

@@ -1,0 +1,284 @@
+// The built program as a user runs it, with stand-in libraries for the provider.
+#include <gmock/gmock.h>
+#include <sys/utsname.h>
+
+#include <filesystem>
+#include <fstream>
+
+#include "host/ProgramRun.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+using testing::HasSubstr;
+using testing::StartsWith;
+
+ProgramRun cmpihost(const std::vector<std::string>& arguments) {
+    return runProgram(KORVA_CMPIHOST, arguments, {"TZ=UTC0"});
+}
+
+ProgramRun withStandIn(std::vector<std::string> arguments) {
+    arguments.insert(arguments.begin(), {"--provider", KORVA_STAND_IN});
+    return cmpihost(arguments);
+}
+
+constexpr const char* moonPath =
+    "root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\"KORVA_ComputerSystem\",CSName=\"moon\","
+    "CreationClassName=\"KORVA_OperatingSystem\",Name=\"Test \\\"OS\\\"\"";
+
+TEST(Program, EnumeratesInstances) {
+    const ProgramRun run = withStandIn({"ei", "KORVA_OperatingSystem"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_EQ(run.out, std::string(moonPath) +
+                           "\n"
+                           "  CSName                  moon\n"
+                           "  Name                    Test \"OS\"\n"
+                           "  Version                 1\\x1b[31m\n"
+                           "  OSType                  36 (LINUX)\n"
+                           "  TotalVisibleMemorySize  8123456 (7.7 GiB)\n");
+    EXPECT_EQ(run.err, "");
+}
+
+TEST(Program, PrintsNamesThatItTakesBack) {
+    const ProgramRun names = withStandIn({"ein", "KORVA_OperatingSystem"});
+    EXPECT_EQ(names.status, 0);
+    EXPECT_EQ(names.out, std::string(moonPath) + "\n");
+    const ProgramRun instance = withStandIn({"gi", names.out.substr(0, names.out.size() - 1)});
+    EXPECT_EQ(instance.status, 0);
+    EXPECT_THAT(instance.out, StartsWith(moonPath));
+    EXPECT_EQ(instance.err, "");
+}
+
+TEST(Program, PrintsTheListedPropertiesOnly) {
+    const ProgramRun run =
+        withStandIn({"--format", "mof", "ei", "KORVA_OperatingSystem", "ostype"});
+    EXPECT_EQ(run.out,
+              "instance of KORVA_OperatingSystem {\n"
+              "    CSName = \"moon\";\n"
+              "    Name = \"Test \\\"OS\\\"\";\n"
+              "    OSType = 36;\n"
+              "};\n");
+}
+
+TEST(Program, PrintsJson) {
+    const ProgramRun run = withStandIn({"--format", "json", "ain", moonPath});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_EQ(run.out,
+              "[\n"
+              "  {\n"
+              "    \"class\": \"KORVA_OperatingSystem\",\n"
+              "    \"path\": \"root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\\\""
+              "KORVA_ComputerSystem\\\",CSName=\\\"moon\\\",CreationClassName=\\\""
+              "KORVA_OperatingSystem\\\",Name=\\\"Test \\\\\\\"OS\\\\\\\"\\\"\"\n"
+              "  }\n"
+              "]\n");
+}
+
+TEST(Program, PrintsAnEmptyResult) {
+    EXPECT_EQ(withStandIn({"rin", "X"}).out, "");
+    EXPECT_EQ(withStandIn({"--format", "json", "rin", "X"}).out, "[]\n");
+    EXPECT_EQ(withStandIn({"ei", "Unknown"}).status, 0);
+}
+
+TEST(Program, NotesThatNoInstanceWasReturned) {
+    const ProgramRun run = withStandIn({"gi", "KORVA_OperatingSystem.CSName=\"sun\""});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_EQ(run.out, "");
+    EXPECT_EQ(run.err,
+              "note: no instance was returned; an object manager answers CIM_ERR_NOT_FOUND (6)\n");
+}
+
+struct Failure {
+    const char* name;
+    std::vector<std::string> arguments;
+    const char* err;
+};
+
+const Failure failures[] = {
+    {"DeleteInstance", {"di", "X.A=1"}, "CIM_ERR_NOT_SUPPORTED (7)\n"},
+    {"ModifyInstance",
+     {"mi", "KORVA_OperatingSystem.Name=\"x\"", "Version=2", "OSType=36"},
+     "CIM_ERR_NOT_SUPPORTED (7): properties Version,OSType\n"},
+    {"CreateInstance",
+     {"ci", "KORVA_OperatingSystem", "OSType=36"},
+     "CMPI status 150: OSType 36\n"},
+    {"ExecQuery",
+     {"xq", "SELECT * FROM Thing", "--lang", "CQL", "--namespace", "interop"},
+     "CIM_ERR_INVALID_QUERY (15): CQL|SELECT * FROM Thing|interop|Thing\n"},
+    {"Associators",
+     {"ai", "X.A=1", "P", "--assoc-class", "a", "--result-class", "b", "--role", "c",
+      "--result-role", "d"},
+     "CIM_ERR_FAILED (1): a|b|c|d|P\n"},
+    {"AssociatorsWithoutFilters", {"ai", "X.A=1"}, "CIM_ERR_FAILED (1): -|-|-|-|all\n"},
+    {"References",
+     {"ri", "X.A=1", "--result-class", "b", "--role", "c", "--properties", "P,Q"},
+     "CIM_ERR_FAILED (1): b|c|P,Q\n"},
+    {"ResultsBeforeAFailureAreDropped",
+     {"ei", "KORVA_OperatingSystemCapabilities"},
+     "CIM_ERR_FAILED (1): properties all\\x1b[31m\n"},
+    {"Exception",
+     {"ei", "KORVA_RunningOS"},
+     "CIM_ERR_FAILED (1): an exception left the provider: the moon is down\n"},
+};
+
+class ProgramFailure : public testing::TestWithParam<Failure> {};
+
+TEST_P(ProgramFailure, NamesTheStatusAndExitsWithOne) {
+    const ProgramRun run = withStandIn(GetParam().arguments);
+    EXPECT_EQ(run.status, 1);
+    EXPECT_EQ(run.out, "");
+    EXPECT_EQ(run.err, GetParam().err);
+}
+
+INSTANTIATE_TEST_SUITE_P(Program, ProgramFailure, testing::ValuesIn(failures),
+                         [](const auto& row) { return std::string(row.param.name); });
+
+TEST(Program, ServesTheComputerSystemToTheProvidersUpCalls) {
+    utsname names{};
+    ASSERT_EQ(uname(&names), 0);
+    const ProgramRun run = withStandIn({"ein", "KORVA_ComputerSystem"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_THAT(run.out, StartsWith("root/cimv2:KORVA_ComputerSystem."));
+    EXPECT_THAT(run.out, HasSubstr("Name=\"" + std::string(names.nodename) + "\""));
+    EXPECT_EQ(run.err, "");
+}
+
+TEST(Program, TellsWhatTheBrokerCaught) {
+    const ProgramRun run = withStandIn({"ei", "KORVA_InstalledOS"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_EQ(run.out, "");
+    EXPECT_THAT(run.err, StartsWith("caught: "));
+}
+
+TEST(Program, ShowsAMalformedPathWithACaret) {
+    const ProgramRun run = withStandIn({"gi", "KORVA_OperatingSystem.Name=x"});
+    EXPECT_EQ(run.status, 2);
+    EXPECT_THAT(run.err, HasSubstr("\n  KORVA_OperatingSystem.Name=x\n"
+                                   "                             ^\n"));
+}
+
+TEST(Program, RefusesWrongUsage) {
+    EXPECT_EQ(cmpihost({}).status, 2);
+    EXPECT_EQ(cmpihost({}).err,
+              "An operation is required\nRun cmpihost --help for more information.\n");
+    const ProgramRun unknown = withStandIn({"ci", "KORVA_OperatingSystem", "Colour=red"});
+    EXPECT_EQ(unknown.status, 2);
+    EXPECT_EQ(unknown.err, "the class 'KORVA_OperatingSystem' has no property 'Colour'\n");
+}
+
+TEST(Program, RefusesASchemaFolderWithoutClasses) {
+    const ProgramRun run = withStandIn({"--schema", "/nowhere", "ei", "X"});
+    EXPECT_EQ(run.status, 2);
+    EXPECT_EQ(run.err, "the schema folder /nowhere cannot be read: No such file or directory\n");
+}
+
+TEST(Program, TakesAnotherSchemaFolder) {
+    const ProgramRun run =
+        withStandIn({"--schema", KORVA_TEST_DATA "/othermof", "ei", "KORVA_OperatingSystem"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_THAT(run.out, HasSubstr("  OSType                  36 (thirty-six)\n"));
+    EXPECT_THAT(run.err, HasSubstr("caught: "));
+}
+
+TEST(Program, PrintsHelpAndVersionOnTheStandardOutput) {
+    const ProgramRun help = cmpihost({"--help"});
+    EXPECT_EQ(help.status, 0);
+    EXPECT_THAT(help.out, HasSubstr("Usage: cmpihost [OPTIONS] OPERATION ARGUMENT..."));
+    EXPECT_EQ(help.err, "");
+    EXPECT_EQ(cmpihost({"--version"}).out, "cmpihost 1.0.0\n");
+}
+
+TEST(Program, SaysThatResultsCannotBeWritten) {
+    const ProgramRun run = runProgram(
+        "/bin/sh", {"-c", "exec \"$0\" --provider \"$1\" ein KORVA_OperatingSystem > /dev/full",
+                    KORVA_CMPIHOST, KORVA_STAND_IN});
+    EXPECT_EQ(run.status, 1);
+    EXPECT_EQ(run.err, "the results cannot be written\n");
+}
+
+class LibraryFile : public testing::Test {
+  protected:
+    void SetUp() override {
+        std::string name = (fs::temp_directory_path() / "libraryXXXXXX").string();
+        ASSERT_NE(mkdtemp(name.data()), nullptr);
+        folder_ = name;
+    }
+    void TearDown() override { fs::remove_all(folder_); }
+    std::string file(const std::string& content) {
+        std::ofstream(folder_ / "x.so", std::ios::binary) << content;
+        return (folder_ / "x.so").string();
+    }
+    static ProgramRun load(const std::string& library) {
+        return cmpihost({"--provider", library, "ei", "X"});
+    }
+
+    fs::path folder_;
+};
+
+TEST_F(LibraryFile, ThatIsMissingExitsWithThree) {
+    const ProgramRun run = load((folder_ / "missing.so").string());
+    EXPECT_EQ(run.status, 3);
+    EXPECT_THAT(run.err, HasSubstr("missing.so: No such file or directory"));
+}
+
+TEST_F(LibraryFile, ThatIsNoLibraryExitsWithThree) {
+    const ProgramRun run = load(file("hello"));
+    EXPECT_EQ(run.status, 3);
+    EXPECT_THAT(run.err, HasSubstr("x.so: not a shared library"));
+}
+
+TEST_F(LibraryFile, OfTheOtherWordSizeExitsWithThreeAndSaysSo) {
+    std::string header(
+        "\x7f"
+        "ELF");
+    header += sizeof(void*) == 8 ? '\1' : '\2';
+    header += "\1\1";
+    header.resize(16);
+    header += std::string("\3\0\3\0", 4);
+    header.resize(64);
+    const ProgramRun run = load(file(header));
+    EXPECT_EQ(run.status, 3);
+    EXPECT_THAT(run.err, HasSubstr(sizeof(void*) == 8 ? "a 32-bit library, this host is 64-bit"
+                                                      : "a 64-bit library, this host is 32-bit"));
+}
+
+TEST_F(LibraryFile, WithoutFactoryExitsWithThree) {
+    const ProgramRun run = load(KORVA_FACTORYLESS);
+    EXPECT_EQ(run.status, 3);
+    EXPECT_THAT(run.err, HasSubstr("OperatingSystemProvider_Create_InstanceMI"));
+}
+
+TEST_F(LibraryFile, WithoutFolderIsTakenFromTheCurrentOne) {
+    fs::copy_file(KORVA_STAND_IN, folder_ / "standin.so");
+    const ProgramRun run =
+        runProgram("/usr/bin/env", {"-C", folder_.string(), KORVA_CMPIHOST, "--provider",
+                                    "standin.so", "ein", "KORVA_OperatingSystem"});
+    EXPECT_EQ(run.status, 0) << run.err;
+    EXPECT_EQ(run.out, std::string(moonPath) + "\n");
+}
+
+TEST_F(LibraryFile, ThatIsNowhereAroundTheProgramExitsWithThreeAndTellsThePlaces) {
+    fs::create_directories(folder_ / "bin");
+    fs::copy_file(KORVA_CMPIHOST, folder_ / "bin/cmpihost");
+    fs::create_directories(folder_ / "share/korva-osstatus");
+    fs::copy(KORVA_SOURCE_DIR "/schema", folder_ / "share/korva-osstatus/schema");
+    const ProgramRun run = runProgram((folder_ / "bin/cmpihost").string(), {"ei", "X"});
+    EXPECT_EQ(run.status, 3);
+    EXPECT_THAT(run.err, StartsWith("no provider library was found; looked for\n"));
+    EXPECT_THAT(run.err,
+                HasSubstr((folder_ / "lib/libkorzbosstatusprofileprovider.so.1").string()));
+}
+
+TEST_F(LibraryFile, BesideTheProgramIsTakenWithoutBeingNamed) {
+    fs::create_directories(folder_ / "bin");
+    fs::create_directories(folder_ / "lib");
+    fs::copy_file(KORVA_CMPIHOST, folder_ / "bin/cmpihost");
+    fs::copy_file(KORVA_STAND_IN, folder_ / "lib/libkorzbosstatusprofileprovider.so.1");
+    const ProgramRun run =
+        runProgram((folder_ / "bin/cmpihost").string(),
+                   {"--schema", KORVA_SOURCE_DIR "/schema", "ein", "KORVA_OperatingSystem"});
+    EXPECT_EQ(run.status, 0) << run.err;
+    EXPECT_EQ(run.out, std::string(moonPath) + "\n");
+}
+
+}  // namespace

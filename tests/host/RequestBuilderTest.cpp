@@ -1,0 +1,188 @@
+#include "host/RequestBuilder.h"
+
+#include <gmock/gmock.h>
+
+#include "host/MofParser.h"
+#include "host/SchemaCatalogue.h"
+#include "host/UsageError.h"
+
+namespace {
+
+using namespace cmpihost;
+using testing::ElementsAre;
+
+const char* text =
+    "class Thing { [Key] string Name; [Key] uint16 Number; boolean On; sint8 Level; uint64 Size;"
+    " real32 Ratio; datetime When; char16 Letter; uint16 Codes[]; string Notes[]; Thing REF Next;"
+    " sint64 Deep; real64 Wide; };";
+
+class RequestBuilder : public testing::Test {
+  protected:
+    void SetUp() override { schema_.add(mof::parse(text, "x.mof")); }
+
+    OperationRequest built(const CommandLine& line) {
+        return buildRequest(line, schema_, SchemaCatalogue(schema_));
+    }
+    OperationRequest built(Operation operation, const char* path,
+                           std::vector<std::string> assignments) {
+        CommandLine line;
+        line.operation = operation;
+        line.path = path;
+        line.assignments = std::move(assignments);
+        return built(line);
+    }
+    Value assigned(const std::string& assignment) {
+        return built(Operation::ModifyInstance, "Thing", {assignment})
+            .instance.properties.at(0)
+            .value;
+    }
+    std::string refusal(const std::string& path, const std::vector<std::string>& assignments) {
+        try {
+            built(Operation::CreateInstance, path.c_str(), assignments);
+            return "accepted";
+        } catch (const UsageError& error) {
+            return error.what();
+        }
+    }
+
+    Schema schema_;
+};
+
+TEST_F(RequestBuilder, PassesPathPropertiesAndFiltersOn) {
+    CommandLine line;
+    line.operation = Operation::Associators;
+    line.path = "interop:Thing.Name=\"a\"";
+    line.properties = std::vector<std::string>{"On"};
+    line.assocClass = "A";
+    line.resultClass = "B";
+    line.role = "C";
+    line.resultRole = "D";
+    const OperationRequest request = built(line);
+    EXPECT_EQ(request.operation, Operation::Associators);
+    EXPECT_EQ(request.path, (ObjectPathValue{"interop", "Thing", {{"Name", Value("a")}}}));
+    EXPECT_THAT(*request.properties, ElementsAre("On"));
+    EXPECT_EQ(request.assocClass, "A");
+    EXPECT_EQ(request.resultClass, "B");
+    EXPECT_EQ(request.role, "C");
+    EXPECT_EQ(request.resultRole, "D");
+}
+
+TEST_F(RequestBuilder, GivesValuesTheTypesOfTheClass) {
+    EXPECT_EQ(assigned("Name=a b"), Value("a b"));
+    EXPECT_EQ(assigned("Name="), Value(""));
+    EXPECT_EQ(assigned("Name={x}"), Value("{x}"));
+    EXPECT_EQ(assigned("On=true"), Value::fromBoolean(true));
+    EXPECT_EQ(assigned("Level=-128"), Value::fromSigned(-128, CMPI_sint8));
+    EXPECT_EQ(assigned("Level=127"), Value::fromSigned(127, CMPI_sint8));
+    EXPECT_EQ(assigned("Deep=-9223372036854775808"), Value::fromSigned(INT64_MIN, CMPI_sint64));
+    EXPECT_EQ(assigned("Size=18446744073709551615"),
+              Value::fromUnsigned(18446744073709551615U, CMPI_uint64));
+    EXPECT_EQ(assigned("Size=-0"), Value::fromUnsigned(0, CMPI_uint64));
+    EXPECT_EQ(assigned("Ratio=0.5"), Value::fromReal(0.5, CMPI_real32));
+    EXPECT_EQ(assigned("Wide=-3"), Value::fromReal(-3, CMPI_real64));
+    EXPECT_EQ(assigned("Wide=3"), Value::fromReal(3, CMPI_real64));
+    EXPECT_EQ(assigned("When=20240102030405.000000+000"),
+              Value::fromText("20240102030405.000000+000", CMPI_dateTime));
+    EXPECT_EQ(assigned("Letter='x'"), Value::fromUnsigned('x', CMPI_char16));
+    EXPECT_EQ(assigned("Next=Thing.Name=\"y\""),
+              Value::fromReference({"root/cimv2", "Thing", {{"Name", Value("y")}}}));
+    EXPECT_EQ(assigned("On=NULL"), Value::null(CMPI_boolean));
+}
+
+TEST_F(RequestBuilder, TakesListsInBraces) {
+    const Value two = Value::fromUnsigned(2, CMPI_uint16);
+    EXPECT_EQ(assigned("Codes={2, 2}"), Value::fromArray(CMPI_uint16, {two, two}));
+    EXPECT_EQ(assigned("Codes=2"), Value::fromArray(CMPI_uint16, {two}));
+    EXPECT_EQ(assigned("Codes={}"), Value::fromArray(CMPI_uint16, std::vector<Value>()));
+    EXPECT_EQ(assigned("Codes=NULL"), Value::null(CMPI_uint16A));
+    EXPECT_EQ(assigned("Notes={\"a\", \"b,c\"}"),
+              Value::fromArray(CMPI_string, {Value("a"), Value("b,c")}));
+    EXPECT_EQ(assigned("Notes=plain"), Value::fromArray(CMPI_string, {Value("plain")}));
+}
+
+TEST_F(RequestBuilder, TakesValuesOfAnUnknownClassAsTexts) {
+    const OperationRequest request = built(Operation::CreateInstance, "Stranger", {"A=5"});
+    EXPECT_EQ(request.instance.properties.at(0).value, Value("5"));
+}
+
+TEST_F(RequestBuilder, MakesAssignedKeysPartOfThePath) {
+    const OperationRequest request =
+        built(Operation::CreateInstance, "Thing.Number=7", {"name=x", "On=FALSE"});
+    const ObjectPathValue path{
+        "root/cimv2", "Thing", {{"Number", Value::fromUnsigned(7)}, {"Name", Value("x")}}};
+    EXPECT_EQ(request.path, path);
+    EXPECT_EQ(request.instance, (InstanceValue{path,
+                                               {{"Name", Value("x")},
+                                                {"On", Value::fromBoolean(false)},
+                                                {"Number", Value::fromUnsigned(7)}}}));
+    EXPECT_FALSE(request.properties.has_value());
+}
+
+TEST_F(RequestBuilder, ModifiesTheAssignedPropertiesOnly) {
+    const OperationRequest request =
+        built(Operation::ModifyInstance, "Thing.Name=\"x\"", {"on=TRUE", "Level=1"});
+    EXPECT_THAT(*request.properties, ElementsAre("On", "Level"));
+    EXPECT_EQ(request.instance.properties.size(), 3U);
+}
+
+TEST_F(RequestBuilder, RefusesValuesThatDoNotFit) {
+    EXPECT_EQ(refusal("Thing", {"Level=128"}),
+              "'128' is no value of type sint8 for the property 'Level'");
+    EXPECT_EQ(refusal("Thing", {"Size=-1"}),
+              "'-1' is no value of type uint64 for the property 'Size'");
+    EXPECT_EQ(refusal("Thing", {"On=1"}), "'1' is no value of type boolean for the property 'On'");
+    EXPECT_EQ(refusal("Thing", {"Level={1}"}),
+              "'{1}' is a list, no single value, for the property 'Level'");
+    EXPECT_EQ(refusal("Thing", {"On=maybe"}),
+              "the value of 'On':1:1: expected a value (a string, a number, a character, TRUE, "
+              "FALSE or NULL), found 'maybe'");
+    EXPECT_EQ(refusal("Thing", {"Size=1 2"}),
+              "the value of 'Size':1:3: expected nothing after the value, found '2'");
+    EXPECT_EQ(refusal("Thing", {"Weight=1"}), "the class 'Thing' has no property 'Weight'");
+    EXPECT_EQ(refusal("Thing", {"On=TRUE", "on=FALSE"}), "the property 'On' stands twice");
+    EXPECT_EQ(refusal("Thing", {"On"}), "expected NAME=VALUE, found 'On'");
+    EXPECT_EQ(refusal("Thing", {"=1"}), "expected NAME=VALUE, found '=1'");
+    EXPECT_EQ(refusal("Stranger", {"A\x1b=1", "a\x1b=2"}), "the property 'a\\x1b' stands twice");
+}
+
+TEST_F(RequestBuilder, FindsTheClassOfAQuery) {
+    const struct {
+        const char* query;
+        const char* className;
+    } rows[] = {{"SELECT * FROM Thing", "Thing"},
+                {"select Name from\tThing;", "Thing"},
+                {"SELECT * FROM Thing WHERE a = 1", "Thing"},
+                {"SELECT * FROM", ""},
+                {"nonsense", ""},
+                {"", ""}};
+    for (const auto& row : rows) {
+        CommandLine line;
+        line.operation = Operation::ExecQuery;
+        line.query = row.query;
+        line.nameSpace = "interop";
+        const OperationRequest request = built(line);
+        EXPECT_EQ(request.path.className, row.className) << row.query;
+        EXPECT_EQ(request.path.nameSpace, "interop");
+        EXPECT_EQ(request.query, row.query);
+        EXPECT_EQ(request.queryLanguage, "WQL");
+    }
+}
+
+TEST_F(RequestBuilder, KeepsKeysWhateverThePropertyListSays) {
+    const InstanceValue instance{{"n", "Thing", {{"Extra", Value("k")}}},
+                                 {{"Name", Value("a")},
+                                  {"Extra", Value("k")},
+                                  {"On", Value::fromBoolean(true)},
+                                  {"Level", Value::fromSigned(1, CMPI_sint8)}}};
+    const auto names = [&](const std::vector<std::string>& list) {
+        std::vector<std::string> kept;
+        for (const PropertyValue& property : withoutUnlisted(instance, list, schema_).properties) {
+            kept.push_back(property.name);
+        }
+        return kept;
+    };
+    EXPECT_THAT(names({"LEVEL", "Missing"}), ElementsAre("Name", "Extra", "Level"));
+    EXPECT_THAT(names({}), ElementsAre("Name", "Extra"));
+}
+
+}  // namespace

@@ -1,0 +1,97 @@
+#include "host/Tree.h"
+
+#include <gtest/gtest.h>
+
+#include <sstream>
+
+namespace {
+
+using namespace cmpihost;
+
+// A host with one computer system and one operating system, as answers to requests.
+class FakeHost {
+  public:
+    OperationResult operator()(const OperationRequest& request) {
+        OperationResult result;
+        result.rc = failing == request.assocClass.value_or(request.path.className)
+                        ? CMPI_RC_ERR_FAILED
+                        : CMPI_RC_OK;
+        const std::string wanted = request.assocClass.value_or(request.path.className);
+        if (wanted == "KORVA_ComputerSystem") {
+            if (hasComputer)
+                result.instances = {instance("KORVA_ComputerSystem", {{"Name", "vm"}})};
+        } else if (wanted == "KORVA_OSElementCapabilities") {
+            result.instances = {
+                instance("KORVA_OperatingSystemCapabilities",
+                         {{"InstanceID", "Linux"},
+                          {"ElementNameEditSupported", Value::fromBoolean(false)},
+                          {"HostShutdownBehavior", Value::fromUnsigned(3, CMPI_uint16)}})};
+        } else {
+            result.instances = {instance("KORVA_OperatingSystem", system)};
+        }
+        return result;
+    }
+
+    bool hasComputer = true;
+    std::string failing;
+    std::vector<NamedValue> system = {{"Name", "Linux"},
+                                      {"Version", "12"},
+                                      {"EnabledState", Value::fromUnsigned(2, CMPI_uint16)},
+                                      {"HealthState", Value::fromUnsigned(5, CMPI_uint16)}};
+
+  private:
+    static InstanceValue instance(const std::string& className,
+                                  const std::vector<NamedValue>& properties) {
+        InstanceValue result;
+        result.path.className = className;
+        for (const NamedValue& property : properties)
+            result.properties.push_back({property.name, property.value});
+        return result;
+    }
+};
+
+std::string drawn(const FakeHost& host) {
+    static const Schema schema = Schema::load(KORVA_SOURCE_DIR "/schema");
+    std::ostringstream stream;
+    for (const TreeNode& root : hostTree(host, "root/cimv2", schema)) drawTree(root, stream);
+    return stream.str();
+}
+
+TEST(Tree, ShowsWhatIsInstalledAndRunningOnTheComputer) {
+    EXPECT_EQ(drawn(FakeHost()), R"(vm (KORVA_ComputerSystem)
+├── KORVA_InstalledOS
+│   └── Linux 12 (KORVA_OperatingSystem): installed (not known)
+│       └── KORVA_OSElementCapabilities
+│           └── Linux (KORVA_OperatingSystemCapabilities): name fixed, shutdown of the host: No effect
+└── KORVA_RunningOS
+    └── Linux 12 (KORVA_OperatingSystem): Enabled, health OK, up since (not known)
+)");
+}
+
+TEST(Tree, WithoutAComputerShowsTheOperatingSystemsAlone) {
+    FakeHost host;
+    host.hasComputer = false;
+    EXPECT_EQ(drawn(host), R"(no KORVA_ComputerSystem, so nothing is associated
+└── Linux 12 (KORVA_OperatingSystem): installed (not known)
+    └── KORVA_OSElementCapabilities
+        └── Linux (KORVA_OperatingSystemCapabilities): name fixed, shutdown of the host: No effect
+)");
+}
+
+TEST(Tree, WritesControlCharactersOut) {
+    FakeHost host;
+    host.system = {{"Name", "a\x1b[31m\n"}, {"Version", "1"}};
+    host.hasComputer = false;
+    EXPECT_EQ(drawn(host).find('\x1b'), std::string::npos);
+}
+
+TEST(Tree, FailedAnswerEndsIt) {
+    for (const char* failing : {"KORVA_ComputerSystem", "KORVA_InstalledOS", "KORVA_RunningOS",
+                                "KORVA_OSElementCapabilities"}) {
+        FakeHost host;
+        host.failing = failing;
+        EXPECT_THROW(drawn(host), TreeFailure) << failing;
+    }
+}
+
+}  // namespace
