@@ -1,0 +1,20 @@
+#!/bin/sh
+# Runs every command that the documents show in a block marked "sh", from the root folder. A command
+# that fails ends the run and is named.
+set -eu
+cd "$(dirname "$0")/.."
+script=$(mktemp)
+trap 'rm -f "$script"' EXIT
+for document in README.md docs/*.md; do
+    [ -e "$document" ] || continue
+    awk '/^```sh$/ {inside = 1; next} /^```/ {inside = 0} inside' "$document" >"$script"
+    [ -s "$script" ] || continue
+    echo "commands of $document"
+    sh -eu "$script" >/dev/null 2>"$script.errors" || {
+        cat "$script.errors" "$script" >&2
+        rm -f "$script.errors"
+        echo "a command of $document failed" >&2
+        exit 1
+    }
+    rm -f "$script.errors"
+done
