@@ -109,6 +109,7 @@ class Parser {
             addOperation(word);
         }
         addQuery();
+        addTree();
     }
 
     ParsedCommandLine parse(int argumentCount, const char* const* arguments) {
@@ -137,6 +138,7 @@ class Parser {
     void addOperation(const OperationWord& word);
     void addFilters(CLI::App& operation, Filters filters);
     void addQuery();
+    void addTree();
     void collectProperties();
     std::string help();
 
@@ -168,6 +170,15 @@ void Parser::addHostOptions() {
     app_.add_option("--schema", result_.schema,
                     "Folder of the MOF files; without it the one beside this program")
         ->type_name("DIR");
+    app_.add_option("--companion", result_.companion,
+                    "Library that serves the computer system; without it the one beside this\n"
+                    "program, else this program itself")
+        ->type_name("FILE");
+    app_.add_option(
+            "--computer-systems", result_.computerSystems,
+            "How many computer systems there are to be, 0 to 1000, to see what then happens")
+        ->check(CLI::Range(0, 1000))
+        ->type_name("N");
 }
 
 CLI::App* Parser::addWord(const char* word, const char* purpose, Operation operation) {
@@ -228,6 +239,17 @@ void Parser::addQuery() {
         ->type_name("NAME")
         ->capture_default_str();
     query->add_option("--namespace", result_.nameSpace, "Namespace of the query")
+        ->type_name("NAME")
+        ->capture_default_str();
+}
+
+void Parser::addTree() {
+    CLI::App* tree =
+        app_.add_subcommand("tree", "Draw the host, what is installed and running on it");
+    tree->fallthrough();
+    tree->group("Pictures");
+    tree->callback([this] { result_.tree = true; });
+    tree->add_option("--namespace", result_.nameSpace, "Namespace of the classes")
         ->type_name("NAME")
         ->capture_default_str();
 }

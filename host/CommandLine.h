@@ -21,6 +21,12 @@ struct CommandLine {
     std::string schema;
     Format format = Format::Table;
     bool log = false;
+    /// The library that serves the computer system; empty: the one beside this program, if any.
+    std::string companion;
+    /// How many computer systems the host is to have; none: what their provider finds.
+    std::optional<unsigned> computerSystems;
+    /// Draw the host instead of running an operation.
+    bool tree = false;
 
     Operation operation = Operation::EnumerateInstances;
     /// The class or instance; not for ExecQuery.

@@ -1,6 +1,7 @@
 #include "host/Places.h"
 
 #include <algorithm>
+#include <string>
 
 namespace cmpihost {
 
@@ -9,7 +10,32 @@ namespace fs = std::filesystem;
 namespace {
 
 constexpr const char* providerName = "libkorzbosstatusprofileprovider.so";
-constexpr const char* providerSoname = "libkorzbosstatusprofileprovider.so.1";
+constexpr const char* companionName = "libkorvacomputersystemprovider.so";
+
+std::vector<fs::path> candidatesFor(const std::string& name, const fs::path& programFolder) {
+    const std::string soname = name + ".1";
+    const fs::path prefix = programFolder.parent_path();
+    std::vector<fs::path> candidates = {prefix / "lib" / soname, programFolder / soname};
+    for (const char* libraries : {KORVA_LIBRARY_FOLDER, "lib", "lib64", "lib32"}) {
+        for (const std::string& file : {name, soname}) {
+            fs::path candidate = prefix / libraries / "cmpi" / file;
+            if (std::find(candidates.begin(), candidates.end(), candidate) == candidates.end()) {
+                candidates.push_back(std::move(candidate));
+            }
+        }
+    }
+    return candidates;
+}
+
+fs::path firstFile(const std::vector<fs::path>& candidates) {
+    for (const fs::path& candidate : candidates) {
+        std::error_code error;
+        if (fs::is_regular_file(candidate, error)) {
+            return candidate;
+        }
+    }
+    return {};
+}
 
 }  // namespace
 
@@ -22,28 +48,15 @@ fs::path schemaFolder(const fs::path& programFolder) {
 }
 
 std::vector<fs::path> providerCandidates(const fs::path& programFolder) {
-    const fs::path prefix = programFolder.parent_path();
-    std::vector<fs::path> candidates = {prefix / "lib" / providerSoname,
-                                        programFolder / providerSoname};
-    for (const char* libraries : {KORVA_LIBRARY_FOLDER, "lib", "lib64", "lib32"}) {
-        for (const char* name : {providerName, providerSoname}) {
-            fs::path candidate = prefix / libraries / "cmpi" / name;
-            if (std::find(candidates.begin(), candidates.end(), candidate) == candidates.end()) {
-                candidates.push_back(std::move(candidate));
-            }
-        }
-    }
-    return candidates;
+    return candidatesFor(providerName, programFolder);
 }
 
 fs::path findProvider(const fs::path& programFolder) {
-    for (const fs::path& candidate : providerCandidates(programFolder)) {
-        std::error_code error;
-        if (fs::is_regular_file(candidate, error)) {
-            return candidate;
-        }
-    }
-    return {};
+    return firstFile(providerCandidates(programFolder));
+}
+
+fs::path findCompanion(const fs::path& programFolder) {
+    return firstFile(candidatesFor(companionName, programFolder));
 }
 
 }  // namespace cmpihost

@@ -19,4 +19,8 @@ std::vector<std::filesystem::path> providerCandidates(const std::filesystem::pat
 /// The first candidate that exists; empty when none does.
 std::filesystem::path findProvider(const std::filesystem::path& programFolder);
 
+/// The library of the computer system's provider, looked for in the same places; empty when there
+/// is none.
+std::filesystem::path findCompanion(const std::filesystem::path& programFolder);
+
 }  // namespace cmpihost

@@ -2,13 +2,96 @@
 
 #include <sys/utsname.h>
 
+#include <cstdlib>
+
+#include "host/broker/ComputerSystemService.h"
+#include "host/broker/LibraryService.h"
+
 namespace cmpihost {
+
+class ComputerSystems {
+  public:
+    virtual ~ComputerSystems() = default;
+    virtual UpcallService& service() = 0;
+    virtual OperationResult run(Broker& broker, const OperationRequest& request) = 0;
+    virtual void unload() {}
+
+  protected:
+    ComputerSystems() = default;
+    ComputerSystems(const ComputerSystems&) = default;
+    ComputerSystems& operator=(const ComputerSystems&) = default;
+};
 
 namespace {
 
 std::string nodeName() {
     utsname names{};
     return ::uname(&names) == 0 ? names.nodename : "localhost";
+}
+
+std::vector<std::string> computerNames(std::optional<unsigned> count) {
+    std::vector<std::string> names;
+    for (unsigned number = 1; number <= count.value_or(1); ++number) {
+        names.push_back(number == 1 ? nodeName() : nodeName() + "-" + std::to_string(number));
+    }
+    return names;
+}
+
+/// The host answers for the computer system itself.
+class OwnComputerSystems final : public ComputerSystems {
+  public:
+    explicit OwnComputerSystems(std::optional<unsigned> count) : service_(computerNames(count)) {}
+
+    UpcallService& service() override { return service_; }
+    OperationResult run(Broker& broker, const OperationRequest& request) override {
+        return service_.perform(broker, request);
+    }
+
+  private:
+    ComputerSystemService service_;
+};
+
+LoadOptions companionOptions() {
+    LoadOptions options;
+    options.providerName = "ComputerSystemProvider";
+    options.association = false;
+    return options;
+}
+
+/// A library answers for it. It takes the number of computer systems from the environment.
+class CompanionComputerSystems final : public ComputerSystems {
+  public:
+    CompanionComputerSystems(const ComputerSystemSource& source, Broker& broker)
+        : library_(prepared(source), broker, companionOptions()), service_(library_) {}
+
+    UpcallService& service() override { return service_; }
+    OperationResult run(Broker& broker, const OperationRequest& request) override {
+        return invoke(library_, broker, request);
+    }
+    void unload() override { library_.unload(); }
+
+  private:
+    static const std::string& prepared(const ComputerSystemSource& source) {
+        if (source.count) {
+            ::setenv("KORVA_COMPUTER_SYSTEMS", std::to_string(*source.count).c_str(), 1);
+        }
+        return source.library;
+    }
+
+    ProviderLibrary library_;
+    LibraryService service_;
+};
+
+/// The computer system's provider with its route set, before the other provider can ask for it.
+std::unique_ptr<ComputerSystems> routed(const ComputerSystemSource& source, Broker& broker) {
+    std::unique_ptr<ComputerSystems> systems;
+    if (source.library.empty()) {
+        systems = std::make_unique<OwnComputerSystems>(source.count);
+    } else {
+        systems = std::make_unique<CompanionComputerSystems>(source, broker);
+    }
+    broker.route(ComputerSystemService::className, systems->service());
+    return systems;
 }
 
 OperationResult escaped(const std::string& what) {
@@ -18,22 +101,11 @@ OperationResult escaped(const std::string& what) {
     return result;
 }
 
-/// The broker with its routes set, before any provider can call it.
-ProviderLibrary loaded(const std::string& file, Broker& broker, UpcallService& computerSystem) {
-    broker.route(ComputerSystemService::className, computerSystem);
-    return ProviderLibrary(file, broker);
-}
-
-}  // namespace
-
-ProviderHost::ProviderHost(const std::string& file, const ClassCatalogue& catalogue)
-    : broker_(&catalogue),
-      computerSystem_(nodeName()),
-      library_(loaded(file, broker_, computerSystem_)) {}
-
-OperationResult ProviderHost::run(const OperationRequest& request) {
+/// Runs what calls a provider, whose exceptions must not end the host.
+template <class Call>
+OperationResult guarded(Call call) {
     try {
-        return invoke(library_, broker_, request);
+        return call();
     } catch (const std::exception& error) {
         return escaped(error.what());
     } catch (...) {
@@ -41,10 +113,33 @@ OperationResult ProviderHost::run(const OperationRequest& request) {
     }
 }
 
+}  // namespace
+
+ProviderHost::ProviderHost(const std::string& file, const ClassCatalogue& catalogue,
+                           const ComputerSystemSource& computerSystems)
+    : broker_(&catalogue),
+      computerSystems_(routed(computerSystems, broker_)),
+      library_(file, broker_) {}
+
+ProviderHost::~ProviderHost() = default;
+
+OperationResult ProviderHost::run(const OperationRequest& request) {
+    return guarded([&]() -> OperationResult { return invoke(library_, broker_, request); });
+}
+
+OperationResult ProviderHost::ask(const OperationRequest& request) {
+    if (request.assocClass ||
+        !equalNames(request.path.className, ComputerSystemService::className)) {
+        return run(request);
+    }
+    return guarded([&] { return computerSystems_->run(broker_, request); });
+}
+
 std::vector<std::string> ProviderHost::unload() {
     bool escapes = false;
     try {
         library_.unload();
+        computerSystems_->unload();
     } catch (...) {
         escapes = true;
     }

@@ -1,32 +1,49 @@
 #pragma once
 
+#include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "host/broker/Broker.h"
-#include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
 #include "host/broker/ProviderLibrary.h"
 
 namespace cmpihost {
 
-/// One provider library in a broker, among the other providers of this host: those that answer its
+/// Who serves the computer system, beside the provider.
+struct ComputerSystemSource {
+    /// The library of its provider; empty: the host serves it itself.
+    std::string library;
+    /// How many there are; none: what the provider finds, or one.
+    std::optional<unsigned> count;
+};
+
+/// The provider of the computer system, as the host reaches it.
+class ComputerSystems;
+
+/// One provider library in a broker, beside the provider of the computer system, which answers its
 /// up-calls. One thread uses it.
 class ProviderHost {
   public:
-    /// Loads the library; throws LoadError. `catalogue` outlives the host.
-    ProviderHost(const std::string& file, const ClassCatalogue& catalogue);
+    /// Loads the libraries; throws LoadError. `catalogue` outlives the host.
+    ProviderHost(const std::string& file, const ClassCatalogue& catalogue,
+                 const ComputerSystemSource& computerSystems = {});
+    ~ProviderHost();
 
-    /// Runs one operation. An exception that leaves the provider becomes CMPI_RC_ERR_FAILED with a
-    /// message that says so.
+    /// Runs one operation of the provider. An exception that leaves the provider becomes
+    /// CMPI_RC_ERR_FAILED with a message that says so.
     OperationResult run(const OperationRequest& request);
+
+    /// The same, but requests for the computer system's class go to its provider.
+    OperationResult ask(const OperationRequest& request);
 
     /// Unloads the library and hands out all that the broker caught since it was loaded.
     std::vector<std::string> unload();
 
   private:
     Broker broker_;
-    ComputerSystemService computerSystem_;
+    std::unique_ptr<ComputerSystems> computerSystems_;
     ProviderLibrary library_;
 };
 

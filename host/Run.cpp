@@ -1,6 +1,7 @@
 #include "host/Run.h"
 
 #include <optional>
+#include <type_traits>
 
 #include "host/Places.h"
 #include "host/ProviderHost.h"
@@ -9,6 +10,7 @@
 #include "host/SchemaCatalogue.h"
 #include "host/StatusText.h"
 #include "host/TerminalText.h"
+#include "host/Tree.h"
 #include "host/UsageError.h"
 
 namespace cmpihost {
@@ -26,12 +28,16 @@ Schema loadSchema(const std::string& given, const fs::path& programFolder) {
     }
 }
 
+/// The loader looks for a bare name in its own folders only, not in the current one.
+std::string loadable(const std::string& given) {
+    std::error_code error;
+    const bool bare = given.find('/') == std::string::npos;
+    return bare && fs::exists(given, error) ? "./" + given : given;
+}
+
 std::string providerFile(const std::string& given, const fs::path& programFolder) {
     if (!given.empty()) {
-        // The loader looks for a bare name in its own folders only, not in the current one.
-        std::error_code error;
-        const bool bare = given.find('/') == std::string::npos;
-        return bare && fs::exists(given, error) ? "./" + given : given;
+        return loadable(given);
     }
     const fs::path found = findProvider(programFolder);
     if (found.empty()) {
@@ -109,14 +115,44 @@ class Run {
     ExitStatus execute() {
         const Schema schema = loadSchema(commandLine_.schema, programFolder_);
         const SchemaCatalogue catalogue(schema);
+        return commandLine_.tree ? drawHost(schema, catalogue) : runOperation(schema, catalogue);
+    }
+
+    ExitStatus runOperation(const Schema& schema, const SchemaCatalogue& catalogue) {
         const OperationRequest request = buildRequest(commandLine_, schema, catalogue);
-        const OperationResult result = perform(request, catalogue);
+        const OperationResult result =
+            hosted(catalogue, [&](ProviderHost& host) { return host.run(request); });
         if (result.rc != CMPI_RC_OK) {
-            err_ << failureText(result) << '\n';
-            return exitCimStatus;
+            return failed(result);
         }
         printResult(request, result, schema, *makePrinter(commandLine_.format, out_, schema));
         printNotes(request, result, err_);
+        return written();
+    }
+
+    ExitStatus drawHost(const Schema& schema, const SchemaCatalogue& catalogue) {
+        try {
+            const std::vector<TreeNode> roots = hosted(catalogue, [&](ProviderHost& host) {
+                const Ask ask = [&host](const OperationRequest& request) {
+                    return host.ask(request);
+                };
+                return hostTree(ask, commandLine_.nameSpace, schema);
+            });
+            for (const TreeNode& root : roots) {
+                drawTree(root, out_);
+            }
+        } catch (const TreeFailure& failure) {
+            return failed(failure.result);
+        }
+        return written();
+    }
+
+    ExitStatus failed(const OperationResult& result) {
+        err_ << failureText(result) << '\n';
+        return exitCimStatus;
+    }
+
+    ExitStatus written() {
         if (!out_.flush()) {
             err_ << "the results cannot be written\n";
             return exitCimStatus;
@@ -124,17 +160,27 @@ class Run {
         return exitDone;
     }
 
-    OperationResult perform(const OperationRequest& request, const SchemaCatalogue& catalogue) {
+    /// Has the host do its work, and tells what it caught the provider at.
+    template <class Work>
+    std::invoke_result_t<Work, ProviderHost&> hosted(const SchemaCatalogue& catalogue, Work work) {
         std::optional<RecordsOnStderr> records;
         if (commandLine_.log) {
             records.emplace();
         }
-        ProviderHost host(providerFile(commandLine_.provider, programFolder_), catalogue);
-        OperationResult result = host.run(request);
+        ProviderHost host(providerFile(commandLine_.provider, programFolder_), catalogue,
+                          computerSystems());
+        auto result = work(host);
         for (const std::string& violation : host.unload()) {
             err_ << "caught: " << terminalText(violation) << '\n';
         }
         return result;
+    }
+
+    ComputerSystemSource computerSystems() const {
+        const std::string companion = commandLine_.companion.empty()
+                                          ? findCompanion(programFolder_).string()
+                                          : loadable(commandLine_.companion);
+        return {companion, commandLine_.computerSystems};
     }
 
     const CommandLine& commandLine_;

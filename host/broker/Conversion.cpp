@@ -128,6 +128,31 @@ void writeSigned(CMPIValue& target, std::int64_t value, CMPIType type) noexcept 
     }
 }
 
+void writeScalar(CMPIValue& target, const Value& value) {
+    switch (value.type()) {
+        case CMPI_boolean:
+            target.boolean = value.boolean() ? 1 : 0;
+            break;
+        case CMPI_real32:
+            target.real32 = static_cast<CMPIReal32>(value.real());
+            break;
+        case CMPI_real64:
+            target.real64 = value.real();
+            break;
+        case CMPI_ptr:
+            target.dataPtr = value.pointer();
+            break;
+        case CMPI_sint8:
+        case CMPI_sint16:
+        case CMPI_sint32:
+        case CMPI_sint64:
+            writeSigned(target, value.signedInteger(), value.type());
+            break;
+        default:
+            writeUnsigned(target, value.unsignedInteger(), value.type());
+    }
+}
+
 void writeText(BrokerCore& core, CMPIValue& target, const Value& value) {
     if (value.type() == CMPI_dateTime) {
         target.dateTime = core.make<CMPIDateTime>(value.text());
@@ -164,45 +189,17 @@ CMPIData writeValue(BrokerCore& core, const Value& value) {
     data.type = value.type();
     if (value.isNull()) {
         data.state = CMPI_nullValue;
-        return data;
-    }
-    if (value.isArray()) {
+    } else if (value.isArray()) {
         const auto elementType = static_cast<CMPIType>(value.type() & ~CMPI_ARRAY);
         data.value.array = core.make<CMPIArray>({elementType, value.sharedElements()});
-        return data;
-    }
-    switch (value.type()) {
-        case CMPI_string:
-        case CMPI_chars:
-        case CMPI_dateTime:
-            writeText(core, data.value, value);
-            break;
-        case CMPI_ref:
-            data.value.ref = core.make<CMPIObjectPath>(value.sharedReference());
-            break;
-        case CMPI_instance:
-            data.value.inst = makeInstance(core, value.sharedInstance());
-            break;
-        case CMPI_boolean:
-            data.value.boolean = value.boolean() ? 1 : 0;
-            break;
-        case CMPI_real32:
-            data.value.real32 = static_cast<CMPIReal32>(value.real());
-            break;
-        case CMPI_real64:
-            data.value.real64 = value.real();
-            break;
-        case CMPI_ptr:
-            data.value.dataPtr = value.pointer();
-            break;
-        case CMPI_sint8:
-        case CMPI_sint16:
-        case CMPI_sint32:
-        case CMPI_sint64:
-            writeSigned(data.value, value.signedInteger(), value.type());
-            break;
-        default:
-            writeUnsigned(data.value, value.unsignedInteger(), value.type());
+    } else if (value.isText()) {
+        writeText(core, data.value, value);
+    } else if (value.type() == CMPI_ref) {
+        data.value.ref = core.make<CMPIObjectPath>(value.sharedReference());
+    } else if (value.type() == CMPI_instance) {
+        data.value.inst = makeInstance(core, value.sharedInstance());
+    } else {
+        writeScalar(data.value, value);
     }
     return data;
 }
