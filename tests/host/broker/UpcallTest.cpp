@@ -5,6 +5,8 @@
 #include "host/broker/LibraryService.h"
 #include "host/broker/ProviderLibrary.h"
 
+#include <new>
+
 namespace cmpihost {
 namespace {
 
@@ -214,6 +216,20 @@ TEST_F(Upcalls, ALaterRouteReplacesAnEarlierOne) {
     CBDeleteInstance(mb, context, newPath());
     EXPECT_EQ(first.last.path.className, "");
     EXPECT_EQ(second.last.path.className, "TEST_Thing");
+}
+
+/// Fails in the way of C++.
+class ThrowingService final : public UpcallService {
+  public:
+    UpcallAnswer perform(Broker&, const OperationRequest&) override { throw std::bad_alloc(); }
+};
+
+TEST_F(Upcalls, AnExceptionNeverReachesTheProvider) {
+    ThrowingService service;
+    broker.route("TEST_Thing", service);
+    EXPECT_EQ(CBEnumInstances(mb, context, newPath(), nullptr, &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(CBDeleteInstance(mb, context, newPath()).rc, CMPI_RC_ERR_FAILED);
 }
 
 class LibraryUpcalls : public Upcalls {

@@ -1,0 +1,83 @@
+// The built program with the built provider and, beside it, the built companion.
+#include <gmock/gmock.h>
+#include <sys/utsname.h>
+
+#include "host/ProgramRun.h"
+
+namespace {
+
+using testing::HasSubstr;
+using testing::StartsWith;
+
+ProgramRun cmpihost(const std::vector<std::string>& arguments) {
+    return runProgram(KORVA_CMPIHOST, arguments);
+}
+
+std::string nodeName() {
+    utsname names{};
+    uname(&names);
+    return names.nodename;
+}
+
+std::size_t count(const std::string& part, const std::string& text) {
+    std::size_t found = 0;
+    for (std::size_t at = text.find(part); at != std::string::npos; at = text.find(part, at + 1))
+        ++found;
+    return found;
+}
+
+TEST(ProgramWithCompanion, DrawsTheHost) {
+    const ProgramRun run = cmpihost({"tree"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_EQ(run.err, "");
+    EXPECT_THAT(run.out, StartsWith(nodeName() + " (KORVA_ComputerSystem)\n├── KORVA_InstalledOS\n"
+                                                 "│   └── "));
+    EXPECT_THAT(run.out, HasSubstr("\n│       └── KORVA_OSElementCapabilities\n│           └── "));
+    EXPECT_THAT(run.out, HasSubstr("\n└── KORVA_RunningOS\n    └── "));
+}
+
+TEST(ProgramWithCompanion, AnswersUpCallsWithTheComputerSystem) {
+    const ProgramRun run =
+        cmpihost({"ai", "KORVA_OperatingSystem", "--assoc-class", "KORVA_InstalledOS"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_EQ(run.err, "");
+    EXPECT_THAT(run.out, HasSubstr("  Name               " + nodeName() + "\n"));
+    EXPECT_THAT(run.out, HasSubstr("  NameFormat         Other\n"));
+    EXPECT_THAT(run.out, HasSubstr("  Dedicated          0 (Not Dedicated)\n"));
+}
+
+TEST(ProgramWithCompanion, WithoutAComputerSystemAssociationsAreEmpty) {
+    for (const std::vector<std::string>& request :
+         {std::vector<std::string>{"--computer-systems", "0", "ein", "KORVA_RunningOS"},
+          {"--computer-systems", "0", "ain", "KORVA_OperatingSystem", "--assoc-class",
+           "KORVA_InstalledOS"}}) {
+        const ProgramRun run = cmpihost(request);
+        EXPECT_EQ(run.status, 0);
+        EXPECT_EQ(run.out, "");
+    }
+    EXPECT_THAT(cmpihost({"--computer-systems", "0", "tree"}).out,
+                StartsWith("no KORVA_ComputerSystem, so nothing is associated\n"));
+}
+
+TEST(ProgramWithCompanion, OfSeveralComputerSystemsTheLastIsNotReported) {
+    const ProgramRun run = cmpihost({"--computer-systems", "3", "ain", "KORVA_OperatingSystem",
+                                     "--assoc-class", "KORVA_RunningOS"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_EQ(count("root/cimv2:KORVA_ComputerSystem.", run.out), 2U);
+    EXPECT_THAT(run.out, HasSubstr("Name=\"" + nodeName() + "-2\""));
+    EXPECT_EQ(count(" (KORVA_ComputerSystem)\n", cmpihost({"--computer-systems", "3", "tree"}).out),
+              3U);
+}
+
+TEST(ProgramWithCompanion, CompanionThatDoesNotLoadExitsWithThree) {
+    const ProgramRun run = cmpihost({"--companion", "/nonexistent.so", "tree"});
+    EXPECT_EQ(run.status, 3);
+    EXPECT_THAT(run.err, HasSubstr("/nonexistent.so"));
+}
+
+TEST(ProgramWithCompanion, NumberOfComputerSystemsOutOfRangeIsWrongUsage) {
+    for (const char* number : {"-1", "1001", "x"})
+        EXPECT_EQ(cmpihost({"--computer-systems", number, "tree"}).status, 2) << number;
+}
+
+}  // namespace

@@ -1,0 +1,118 @@
+#include <stdexcept>
+
+#include "framework/instrumentation/HostSource.h"
+#include "library/LibraryFixture.h"
+
+namespace {
+
+using namespace cmpihost;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+/// The built companion under a strict broker with the schema, on a simulated computer "host1".
+class Companion : public testing::Test {
+  protected:
+    Companion() {
+        host->setComputerName("host1");
+        VA::setHostSource(host);
+    }
+    ~Companion() override {
+        VA::setHostSource(nullptr);
+        unsetenv("KORVA_COMPUTER_SYSTEMS");
+    }
+    void TearDown() override { EXPECT_THAT(broker.takeViolations(), IsEmpty()); }
+
+    static LoadOptions options() {
+        LoadOptions result;
+        result.providerName = "ComputerSystemProvider";
+        result.association = false;
+        return result;
+    }
+
+    Outcome run(Operation operation, const ObjectPathValue& asked) {
+        OperationRequest request;
+        request.operation = operation;
+        request.path = asked;
+        return invoke(library, broker, request);
+    }
+
+    std::shared_ptr<VA::SimulatedHost> host = std::make_shared<VA::SimulatedHost>();
+    Broker broker{&schemaCatalogue()};
+    ProviderLibrary library{KORVA_BINARY_DIR "/lib/libkorvacomputersystemprovider.so.1", broker,
+                            options()};
+};
+
+const std::string host1 =
+    "root/cimv2:KORVA_ComputerSystem.CreationClassName=\"KORVA_ComputerSystem\",Name=\"host1\"";
+
+TEST_F(Companion, ServesTheOneComputerSystemByTheFrameworksName) {
+    const Outcome names = run(Operation::EnumerateInstanceNames, path("KORVA_ComputerSystem"));
+    EXPECT_EQ(names.rc, CMPI_RC_OK);
+    EXPECT_EQ(names.doneCount, 1U);
+    EXPECT_THAT(texts(names.paths), ElementsAre(host1));
+    const Outcome instances = run(Operation::EnumerateInstances, path("KORVA_ComputerSystem"));
+    EXPECT_EQ(instances.doneCount, 1U);
+    ASSERT_EQ(instances.instances.size(), 1U);
+    std::string properties;
+    for (const PropertyValue& property : instances.instances[0].properties)
+        properties += property.name + "=" + property.value.toText() + ";";
+    EXPECT_EQ(
+        properties,
+        "CreationClassName=KORVA_ComputerSystem;Name=host1;ElementName=host1;NameFormat=Other;"
+        "Dedicated={0};EnabledState=2;OperationalStatus={2};HealthState=5;");
+}
+
+TEST_F(Companion, GetsTheInstanceThatThePathNames) {
+    EXPECT_THAT(texts(run(Operation::GetInstance, computerSystemPath("host1")).instances),
+                ElementsAre(host1));
+    EXPECT_EQ(run(Operation::GetInstance, computerSystemPath("host2")).rc, CMPI_RC_ERR_NOT_FOUND);
+    EXPECT_EQ(run(Operation::GetInstance,
+                  path("KORVA_ComputerSystem", {{"Name", "host1"}, {"CreationClassName", "x"}}))
+                  .rc,
+              CMPI_RC_ERR_NOT_FOUND);
+    EXPECT_EQ(run(Operation::GetInstance, path("KORVA_ComputerSystem")).rc, CMPI_RC_ERR_NOT_FOUND);
+}
+
+TEST_F(Companion, ServesNoneOrSeveralForDemonstrations) {
+    const auto served = [this](const char* setting) {
+        setenv("KORVA_COMPUTER_SYSTEMS", setting, 1);
+        return run(Operation::EnumerateInstanceNames, path("KORVA_ComputerSystem")).paths.size();
+    };
+    EXPECT_EQ(served("0"), 0U);
+    EXPECT_EQ(served("3"), 3U);
+    EXPECT_EQ(served("1000"), 1000U);
+    for (const char* wrong : {"", "-1", "1001", "3x", " 3", "99999999999999999999"})
+        EXPECT_EQ(served(wrong), 1U) << wrong;
+}
+
+TEST_F(Companion, WithoutAComputerNameServesNone) {
+    host->setComputerName(std::nullopt);
+    const Outcome outcome = run(Operation::EnumerateInstances, path("KORVA_ComputerSystem"));
+    EXPECT_EQ(outcome.rc, CMPI_RC_OK);
+    EXPECT_THAT(outcome.instances, IsEmpty());
+    EXPECT_EQ(outcome.doneCount, 1U);
+}
+
+TEST_F(Companion, RefusesToWriteAndToQuery) {
+    for (const Operation operation : {Operation::CreateInstance, Operation::ModifyInstance,
+                                      Operation::DeleteInstance, Operation::ExecQuery})
+        EXPECT_EQ(run(operation, computerSystemPath("host1")).rc, CMPI_RC_ERR_NOT_SUPPORTED);
+}
+
+TEST_F(Companion, FailsCleanlyWhenBrokerOrHostDo) {
+    for (const Operation operation : {Operation::EnumerateInstanceNames,
+                                      Operation::EnumerateInstances, Operation::GetInstance}) {
+        FaultPlan plan(Fault{"newObjectPath", 2, 1, CMPI_RC_OK});
+        broker.setFaultPlan(&plan);
+        run(operation, computerSystemPath("host1"));
+        FaultPlan first(Fault{"newObjectPath", 1, 0, CMPI_RC_OK});
+        broker.setFaultPlan(&first);
+        EXPECT_EQ(run(operation, computerSystemPath("host1")).rc, CMPI_RC_ERR_FAILED);
+        broker.setFaultPlan(nullptr);
+        host->throwFromCall(1, std::runtime_error("x"));
+        EXPECT_EQ(run(operation, computerSystemPath("host1")).rc, CMPI_RC_ERR_FAILED);
+        host->setHook({});
+    }
+}
+
+}  // namespace
