@@ -62,3 +62,21 @@ function(korva_export_only target map)
     target_link_options(${target} PRIVATE "-Wl,--version-script=${map}")
     set_property(TARGET ${target} APPEND PROPERTY LINK_DEPENDS "${map}")
 endfunction()
+
+# korva_framework_library(<name> SOURCES ... [LIBRARIES ...]): the shared library lib<name>.so.1 that
+# exports what exports.map lists, and <name>_static with the same code for unit tests of what it does
+# not export.
+function(korva_framework_library name)
+    cmake_parse_arguments(ARG "" "" "SOURCES;LIBRARIES" ${ARGN})
+    add_library(${name}_objects OBJECT ${ARG_SOURCES})
+    target_link_libraries(${name}_objects PRIVATE korva::options ${ARG_LIBRARIES})
+    add_library(${name} SHARED $<TARGET_OBJECTS:${name}_objects>)
+    add_library(${name}_static STATIC EXCLUDE_FROM_ALL $<TARGET_OBJECTS:${name}_objects>)
+    foreach(library ${name} ${name}_static)
+        add_library(korva::${library} ALIAS ${library})
+        target_include_directories(${library} PUBLIC "${PROJECT_SOURCE_DIR}/include")
+        target_link_libraries(${library} PUBLIC ${ARG_LIBRARIES})
+    endforeach()
+    korva_shared_library(${name})
+    korva_export_only(${name} "${CMAKE_CURRENT_SOURCE_DIR}/exports.map")
+endfunction()

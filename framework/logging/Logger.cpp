@@ -46,21 +46,20 @@ bool Logger::isReady() noexcept {
     if (state == State::closed) return false;
     const std::uint32_t now = surroundings_.milliseconds();
     if (state == State::unread) {
-        readConfiguration(true);
+        readConfiguration(patience);
         return true;
     }
     std::uint32_t last = lookedAt_.load(std::memory_order_relaxed);
     if (now - last >= interval && lookedAt_.compare_exchange_strong(last, now)) {
-        readConfiguration(false);
+        readConfiguration(std::chrono::milliseconds::zero());
     }
     return true;
 }
 
-void Logger::readConfiguration(bool first) noexcept {
+void Logger::readConfiguration(std::chrono::milliseconds longest) noexcept {
     const CallerState caller;
-    const auto lock = lockPatiently(mutex_, first ? patience : std::chrono::milliseconds::zero());
+    const auto lock = lockPatiently(mutex_, longest);
     if (!lock.owns_lock() || state_ == State::closed) return;
-    if (first && state_ == State::running) return;
     try {
         if (!file_) {
             file_ = std::make_unique<ConfigurationFile>(surroundings_.configurationSource(),
@@ -69,7 +68,8 @@ void Logger::readConfiguration(bool first) noexcept {
         follow(*file_);
         freeOlder();
         lookedAt_ = surroundings_.milliseconds();
-        state_ = State::running;
+        State unread = State::unread;  // not if the end has come meanwhile
+        state_.compare_exchange_strong(unread, State::running);
     } catch (...) {
         file_.reset();  // out of memory: all is news again at the next look
     }
@@ -126,8 +126,8 @@ void Logger::use(const Configuration& configuration) {
 void Logger::close() noexcept {
     const CallerState caller;
     state_ = State::closed;
-    for (Gate& gate : gates_) gate.close();
     const auto lock = lockPatiently(mutex_, patience);
+    for (Gate& gate : gates_) gate.close();
     if (!lock.owns_lock()) return;
     file_.reset();
     if (Setup* const last = setup_.exchange(nullptr)) leftOver_.reset(last);

@@ -55,7 +55,8 @@ class Logger {
     class Reading;
 
     bool isReady() noexcept;
-    void readConfiguration(bool first) noexcept;
+    /// Waits `longest` for another thread that is at it.
+    void readConfiguration(std::chrono::milliseconds longest) noexcept;
     void follow(ConfigurationFile& file);
     void report(const std::string& path, const ConfigurationError& error) noexcept;
     void putInForce(const Configuration& configuration);

@@ -64,7 +64,6 @@ bool ZBMessageBuffer::Gatherer::isWorthKeeping() const noexcept {
 }
 
 void ZBMessageBuffer::Gatherer::resetStream() noexcept {
-    stream_.exceptions(std::ios::goodbit);
     stream_.rdbuf(this);
     stream_.copyfmt(pristine_);
 }

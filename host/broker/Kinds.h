@@ -6,7 +6,6 @@
 
 #include <cmpi/cmpift.h>
 
-#include <cstring>
 #include <memory>
 #include <optional>
 #include <string>

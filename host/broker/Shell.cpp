@@ -3,7 +3,6 @@
 #include "host/broker/Kinds.h"
 
 #include <algorithm>
-#include <cstring>
 
 namespace cmpihost {
 

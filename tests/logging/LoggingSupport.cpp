@@ -24,6 +24,7 @@ TemporaryFolder::~TemporaryFolder() {
 }
 
 timespec FakeSurroundings::utc() noexcept {
+    if (stoppedAt_ != 0) return {stoppedAt_, 0};
     timespec now{};
     ::clock_gettime(CLOCK_REALTIME, &now);
     now.tv_sec += ahead_;

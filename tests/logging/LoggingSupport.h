@@ -43,6 +43,9 @@ class FakeSurroundings final : public ZBLog::Surroundings {
     /// Seconds by which the time of day is ahead of the real one.
     void setAhead(long seconds) { ahead_ = seconds; }
 
+    /// Makes the time of day stand still at `seconds`.
+    void stopUtcAt(time_t seconds) { stoppedAt_ = seconds; }
+
     /// The lines since the last call.
     std::vector<std::string> takeSystemLog();
 
@@ -51,6 +54,7 @@ class FakeSurroundings final : public ZBLog::Surroundings {
   private:
     std::atomic<std::uint32_t> milliseconds_{5000};
     std::atomic<long> ahead_{0};
+    std::atomic<time_t> stoppedAt_{0};
     std::mutex mutex_;
     std::vector<std::string> lines_;
 };

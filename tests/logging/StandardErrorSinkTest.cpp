@@ -148,26 +148,27 @@ TEST_F(StandardErrorSinkTest, ClosedStandardErrorIsToldOnce) {
 TEST_F(StandardErrorSinkTest, LosesPatienceWithAFullPipeOnceAndGoesOnWhenItIsRead) {
     using Clock = std::chrono::steady_clock;
     Pipe pipe;
-    pipe.fill();
+    for (int round = 0; round < 2; ++round) {
+        pipe.fill();
+        const auto start = Clock::now();
+        {
+            const StandardErrorAs standardError(pipe.ends[1]);
+            for (int count = 0; count < 50; ++count) sink_.write(record("lost"));
+        }
+        const auto waited = Clock::now() - start;
+        EXPECT_GE(waited, std::chrono::milliseconds(1900));
+        EXPECT_LT(waited, std::chrono::milliseconds(3900));
+        EXPECT_THAT(surroundings_.takeSystemLog(),
+                    ElementsAre(warning + "Connection timed out" + tillAgain));
 
-    const auto start = Clock::now();
-    {
-        const StandardErrorAs standardError(pipe.ends[1]);
-        for (int count = 0; count < 50; ++count) sink_.write(record("lost"));
+        pipe.drain();
+        {
+            const StandardErrorAs standardError(pipe.ends[1]);
+            sink_.write(record("one"));
+        }
+        EXPECT_THAT(textsOf(pipe.receive()),
+                    ElementsAre("50 records were dropped: Connection timed out", "one"));
     }
-    const auto waited = Clock::now() - start;
-    EXPECT_GE(waited, std::chrono::milliseconds(1900));
-    EXPECT_LT(waited, std::chrono::milliseconds(3900));
-    EXPECT_THAT(surroundings_.takeSystemLog(),
-                ElementsAre(warning + "Connection timed out" + tillAgain));
-
-    pipe.drain();
-    {
-        const StandardErrorAs standardError(pipe.ends[1]);
-        sink_.write(record("one"));
-    }
-    EXPECT_THAT(textsOf(pipe.receive()),
-                ElementsAre("50 records were dropped: Connection timed out", "one"));
 }
 
 TEST_F(StandardErrorSinkTest, ChildOfAForkInTheMiddleOfAWriteIsNotHeldUpForLong) {

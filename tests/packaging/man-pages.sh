@@ -1,0 +1,52 @@
+# The man pages, against what they describe.
+# shellcheck shell=sh
+: "${work:?}" "${KORVA_BINARY_DIR:?}" "${KORVA_SOURCE_DIR:?}"
+pages=$KORVA_SOURCE_DIR/docs/man
+
+# The text of a page, without marks.
+text() { mandoc -Tascii "$pages/$1" | sed "s/.$(printf '\b')//g"; }
+
+# Long options in a text, each once.
+options_in() { grep -oE '(^|[^-[:alnum:]])--[a-z][a-z-]*' | grep -oE -e '--.*' | sort -u; }
+
+PagesAreWithoutFault() {
+    need_tool mandoc mandoc
+    for page in "$pages"/*; do
+        # Whether the pages that it refers to are installed is another matter.
+        faults=$(mandoc -Tlint -Wstyle "$page" 2>/dev/null | grep -v 'referenced manual not found' || true)
+        expect_equal "$(basename "$page")" "" "$faults"
+    done
+}
+
+PageOfTheHostHasItsOptions() {
+    need_tool mandoc mandoc
+    host=$KORVA_BINARY_DIR/bin/cmpihost
+    operations="ei ein gi ai ain ri rin ci mi di xq tree"
+    {
+        "$host" --help
+        for operation in $operations; do "$host" "$operation" --help; done
+    } | options_in >"$work/told"
+    expect_equal options "$(cat "$work/told")" "$(text cmpihost.1 | options_in)"
+}
+
+PageOfTheHostHasItsOperations() {
+    need_tool mandoc mandoc
+    "$KORVA_BINARY_DIR/bin/cmpihost" --help | sed -n '/^Operations:/,$s/^\([a-z][a-z]*\)$/\1/p' |
+        sort >"$work/told"
+    expect_equal operations "$(cat "$work/told")" "$(sed -n 's/^\.It Cm \([a-z]*\) [AO][rp] .*/\1/p' "$pages/cmpihost.1" | sort)"
+    [ "$(wc -l <"$work/told")" -eq 12 ] || fail "not twelve operations: $(cat "$work/told")"
+}
+
+PageOfTheRegisterCommandHasItsOptions() {
+    need_tool mandoc mandoc
+    "$KORVA_BINARY_DIR/sbin/korva-osstatus-register" --help | options_in >"$work/told"
+    expect_equal options "$(cat "$work/told")" "$(text korva-osstatus-register.8 | options_in)"
+}
+
+PageOfTheConfigurationHasItsKeys() {
+    sed -n 's/^    {"\([a-z]*\.[a-z]*\)", Channel.*/\1/p' \
+        "$KORVA_SOURCE_DIR/framework/logging/ConfigurationParser.cpp" | sort >"$work/keys"
+    expect_equal keys "$(cat "$work/keys")" \
+        "$(sed -n 's/^\.It Cm \(log\.[a-z]*\) , \(trace\.[a-z]*\)$/\1 \2/p' "$pages/zblog.conf.5" | tr ' ' '\n' | sort)"
+    [ "$(wc -l <"$work/keys")" -eq 8 ] || fail "not eight keys: $(cat "$work/keys")"
+}

@@ -1,0 +1,54 @@
+# Sourced by the cases about object managers: an installed tree, and stand-ins for the managers.
+# shellcheck shell=sh
+: "${work:?}" "${KORVA_BINARY_DIR:?}"
+
+tree=$work/tree
+managers=$work/managers
+tools=$work/tools
+
+# What the command under test may use besides object managers.
+tool_names="basename cat cp dirname grep id mkdir mktemp mv readlink rm sed touch"
+
+prepare() {
+    mkdir -p "$managers/bin" "$managers/fail" "$tools" "$work/tmp" "$tree/share/korva-osstatus"
+    for name in $tool_names; do ln -s "$(command -v "$name")" "$tools/$name"; done
+    cp -R "$KORVA_BINARY_DIR/sbin" "$tree/"
+    for folder in schema registration register; do
+        cp -R "$KORVA_BINARY_DIR/share/korva-osstatus/$folder" "$tree/share/korva-osstatus/"
+    done
+    : >"$managers/calls"
+}
+
+without_companion() { rm "$tree"/share/korva-osstatus/registration/korva-osstatus-companion*; }
+
+stand_in() {
+    for name in "$@"; do cp stand-in "$managers/bin/$name"; done
+}
+
+with_sfcb() { stand_in sfcbstage sfcbunstage sfcbrepos; }
+with_pegasus() { stand_in cimmof cimmofl cimprovider; }
+with_running() {
+    stand_in "$1"
+    echo "$2" >"$managers/active"
+}
+server_is_stopped() { echo "cimserver does not answer" >"$managers/fail/cimprovider"; }
+
+# Runs the command under test with the stand-ins; see capture.
+register() {
+    capture env -i PATH="$managers/bin:$tools" TMPDIR="$work/tmp" \
+        "$tree/sbin/korva-osstatus-register" "$@"
+}
+
+expect_code() { [ "$code" -eq "$1" ] || fail "status $code, not $1: $output"; }
+
+# The recorded calls, with names for the folders, and nothing of what only asks.
+calls() {
+    sed "/^cimprovider -l/d; /is-active/d; /status$/d; s|$tree/share/korva-osstatus|SHARE|g; s|$work/tmp/[^/]*|TMP|g" \
+        "$managers/calls"
+}
+
+forget_calls() { : >"$managers/calls"; }
+
+expect_calls() { expect_equal "what the object manager was told" "$1" "$(calls)"; }
+
+prepare

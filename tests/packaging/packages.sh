@@ -1,0 +1,234 @@
+# The Debian packages: what they hold, and what becomes of a machine that they are installed on. That
+# machine is a folder, with the few commands in it that the packages' scripts need.
+# shellcheck shell=sh
+: "${work:?}" "${KORVA_BINARY_DIR:?}" "${KORVA_WORD_SIZE:?}"
+packages=$KORVA_BINARY_DIR/packages
+machine=$work/machine
+architecture=amd64
+[ "$KORVA_WORD_SIZE" = 64 ] || architecture=i386
+
+package() { echo "$packages/korva-osstatus-$1_1.0.0-1_$architecture.deb"; }
+
+EachComponentIsPacked() {
+    need_tool dpkg-deb dpkg
+    rm -rf "$packages"
+    expect_success cpack -G DEB --config "$KORVA_BINARY_DIR/CPackConfig.cmake"
+    for name in provider companion dev tools; do
+        [ -f "$(package $name)" ] || fail "$(package $name) is missing: $output"
+    done
+}
+
+# Names of files in a package, without the folders.
+contents() { dpkg-deb --fsys-tarfile "$(package "$1")" | tar -t | sed -n 's|^\./||; /[^/]$/p' | LC_ALL=C sort; }
+
+PackagesHoldTheirFiles() {
+    for name in provider companion dev tools; do
+        contents $name | sed "s|^|$name: |" | grep -v 'share/doc/korva-osstatus/' >>"$work/contents"
+    done
+    expect_equal "the packages" "$(cat package-files.txt)" "$(cat "$work/contents")"
+}
+
+PackagesDescribeThemselves() {
+    own="korva-osstatus-provider (= 1.0.0-1)"
+    libraries="libc6 (>= 2.34), libgcc-s1 (>= 7), libstdc++6 (>= 11)"
+    for name in provider companion dev tools; do
+        dpkg-deb -f "$(package $name)" Package Version Architecture Depends Recommends Suggests
+    done >"$work/fields"
+    expect_equal "the fields" "Package: korva-osstatus-provider
+Version: 1.0.0-1
+Architecture: $architecture
+Depends: $libraries
+Recommends: libsystemd0
+Suggests: korva-osstatus-companion, logrotate
+Package: korva-osstatus-companion
+Version: 1.0.0-1
+Architecture: $architecture
+Depends: $own, $libraries
+Package: korva-osstatus-dev
+Version: 1.0.0-1
+Architecture: $architecture
+Depends: $own
+Package: korva-osstatus-tools
+Version: 1.0.0-1
+Architecture: $architecture
+Depends: $own, $libraries" "$(cat "$work/fields")"
+}
+
+# Symbol versions of a kind that the files of a package need, highest last.
+needed_versions() {
+    find "$work/unpacked" -type f \( -name '*.so*' -o -path '*/bin/*' \) -exec readelf -V {} + |
+        sed -n "s/.*Name: $1_\([0-9.]*\) .*/\1/p" | sort -Vu
+}
+
+DependenciesCoverWhatTheFilesNeed() {
+    for name in provider companion tools; do dpkg-deb -x "$(package $name)" "$work/unpacked"; done
+    # libstdc++6 of version 11 has symbols up to 3.4.29.
+    for kind in GLIBC:2.34 GLIBCXX:3.4.29 GCC:7.0.0; do
+        needed=$(needed_versions "${kind%:*}" | tail -n 1)
+        [ -n "$needed" ] || fail "no symbol of ${kind%:*} is needed"
+        highest=$(printf '%s\n%s\n' "$needed" "${kind#*:}" | sort -V | tail -n 1)
+        expect_equal "the version of ${kind%:*}" "${kind#*:}" "$highest"
+    done
+}
+
+LintianFindsNoError() {
+    need_tool lintian lintian
+    capture lintian --allow-root --fail-on error "$packages"/*.deb
+    [ "$code" -eq 0 ] || fail "$output"
+}
+
+ScriptsOfPackagesSpareATreeForAnotherMachine() {
+    dpkg-deb -e "$(package provider)" "$work/control"
+    expect_success env DPKG_ROOT=/nowhere PATH=/nowhere "$work/control/postinst" configure
+    expect_success env DPKG_ROOT=/nowhere PATH=/nowhere "$work/control/prerm" remove
+}
+
+# ---- the machine
+
+as_root() { if [ "$(id -u)" -eq 0 ]; then "$@"; else unshare --user --map-root-user "$@"; fi; }
+
+on_machine() {
+    expect_success as_root dpkg --root="$machine" --force-depends --no-pager "$@"
+}
+
+# Copies a command and the libraries that it needs.
+bring() {
+    file=$(command -v "$1")
+    cp -L "$file" "$machine/usr/bin/"
+    ldd "$file" | grep -o '/[^ ]*' | while read -r library; do
+        mkdir -p "$machine$(dirname "$library")"
+        cp -Ln "$library" "$machine$library"
+    done
+}
+
+set_up_machine() {
+    mkdir -p "$machine/usr/bin" "$machine/dev" "$machine/tmp" "$machine/var/log"
+    mkdir -p "$machine/var/lib/dpkg/info" "$machine/var/lib/dpkg/updates" "$machine/var/lib/dpkg/triggers"
+    touch "$machine/var/lib/dpkg/status" "$machine/dev/null"
+    ln -s usr/bin "$machine/bin"
+    ln -s ../var "$machine/usr/var"
+    for name in sh basename cat cp dirname grep id mkdir mktemp mv readlink rm sed touch; do bring $name; done
+    [ "$architecture" = "$(dpkg --print-architecture)" ] || on_machine --add-architecture "$architecture"
+}
+
+with_sfcb() {
+    for name in sfcbstage sfcbunstage sfcbrepos; do cp stand-in "$machine/usr/bin/$name"; done
+    mkdir -p "$machine/usr/fail"
+}
+
+# What sfcb was told, by the names of the files.
+calls() { sed 's| /[^ ]*/| |g; s| -n root/cimv2||; s| KORVA.*||' "$machine/usr/calls"; }
+forget_calls() { rm -f "$machine/usr/calls"; }
+
+# All that is on the machine, except what dpkg and the stand-ins remember.
+everything() {
+    (cd "$machine" && find . ! -path './var/lib/*' ! -path ./usr/calls | LC_ALL=C sort)
+}
+
+install_all() {
+    on_machine -i "$(package provider)" "$(package companion)" "$(package dev)" "$(package tools)"
+}
+
+state_of() { dpkg-query --admindir="$machine/var/lib/dpkg" -W -f '${db:Status-Status}' "korva-osstatus-$1"; }
+
+InstallationRegistersProviderAndCompanion() {
+    set_up_machine
+    with_sfcb
+    install_all
+    for name in provider companion dev tools; do
+        expect_equal "the state of $name" installed "$(state_of $name)"
+    done
+    expect_equal "what sfcb was told" "sfcbstage -r korva-osstatus.reg
+sfcbrepos -f
+sfcbstage -r korva-osstatus-companion.reg
+sfcbrepos -f" "$(calls)"
+    expect_text "sfcb: the broker must be restarted" "$output"
+}
+
+InstallationNeedsNoObjectManager() {
+    set_up_machine
+    install_all
+    expect_equal "the state of the provider" installed "$(state_of provider)"
+    expect_text "no object manager was found" "$output"
+}
+
+InstallationSurvivesAFailingObjectManager() {
+    set_up_machine
+    with_sfcb
+    echo "the schema is missing" >"$machine/usr/fail/sfcbrepos"
+    install_all
+    expect_equal "the state of the provider" installed "$(state_of provider)"
+    expect_text "the schema is missing" "$output"
+}
+
+InstalledHostReportsTheOperatingSystem() {
+    set_up_machine
+    install_all
+    expect_success env -i "$machine/usr/bin/cmpihost" ein KORVA_OperatingSystem
+    expect_text 'KORVA_OperatingSystem.CSCreationClassName="KORVA_ComputerSystem"' "$output"
+}
+
+RemovalUnregistersAndLeavesNothing() {
+    set_up_machine
+    with_sfcb
+    everything >"$work/before"
+    install_all
+    forget_calls
+    on_machine -r korva-osstatus-tools korva-osstatus-dev korva-osstatus-companion korva-osstatus-provider
+    expect_equal "what sfcb was told" "sfcbunstage -r korva-osstatus-companion.reg
+sfcbrepos -f
+sfcbunstage -r korva-osstatus.reg
+sfcbrepos -f" "$(calls)"
+    touch "$machine/var/log/korva-osstatus.log" "$machine/var/log/korva-osstatus.log.1.gz"
+    on_machine -P korva-osstatus-provider
+    expect_equal "the machine" "$(cat "$work/before")" "$(everything)"
+}
+
+RemovalOfTheCompanionKeepsTheProviderRegistered() {
+    set_up_machine
+    with_sfcb
+    install_all
+    forget_calls
+    on_machine -r korva-osstatus-companion
+    expect_equal "what sfcb was told" "sfcbunstage -r korva-osstatus-companion.reg
+sfcbrepos -f" "$(calls)"
+    expect_equal "what is staged" korva-osstatus.reg "$(ls "$machine/var/lib/sfcb/stage/regs")"
+}
+
+RemovalSurvivesAFailingObjectManager() {
+    set_up_machine
+    with_sfcb
+    install_all
+    echo "disk full" >"$machine/usr/fail/sfcbunstage"
+    on_machine -P korva-osstatus-tools korva-osstatus-dev korva-osstatus-companion korva-osstatus-provider
+    expect_text "sfcbunstage failed with exit status 3" "$output"
+    [ ! -e "$machine/usr/sbin/korva-osstatus-register" ] || fail "the command is still there"
+}
+
+# The provider's package as a later version.
+later_provider() {
+    dpkg-deb -R "$(package provider)" "$work/later"
+    sed -i 's/^Version: .*/Version: 1.0.1-1/' "$work/later/DEBIAN/control"
+    dpkg-deb --root-owner-group -b "$work/later" "$work/later.deb" >/dev/null
+}
+
+UpgradeRegistersAgainAndUnregistersNothing() {
+    set_up_machine
+    with_sfcb
+    on_machine -i "$(package provider)"
+    forget_calls
+    later_provider
+    on_machine -i "$work/later.deb"
+    expect_equal "what sfcb was told" "sfcbstage -r korva-osstatus.reg
+sfcbrepos -f" "$(calls)"
+    expect_equal "the state of the provider" installed "$(state_of provider)"
+}
+
+UpgradeKeepsAChangedRotation() {
+    set_up_machine
+    on_machine -i "$(package provider)"
+    echo "# ours" >>"$machine/etc/logrotate.d/korva-osstatus"
+    later_provider
+    on_machine -i "$work/later.deb"
+    expect_text "# ours" "$(cat "$machine/etc/logrotate.d/korva-osstatus")"
+}
