@@ -17,6 +17,7 @@ TEST(UserSessions, AreThoseOfClassUserThatAreNotClosing) {
     EXPECT_TRUE(isUserSession("UID=0\nCLASS=user\n"));
     EXPECT_TRUE(isUserSession("UID=0\nSTATE=active\nCLASS=user\n"));
     EXPECT_TRUE(isUserSession("STATE=online\nCLASS=user\n"));
+    EXPECT_TRUE(isUserSession("STATE=active\nCLASS=user-early\n"));
     EXPECT_FALSE(isUserSession("STATE=closing\nCLASS=user\n"));
     for (const char* other : {"greeter", "lock-screen", "background", "manager", "USER", ""}) {
         EXPECT_FALSE(isUserSession(std::string("STATE=active\nCLASS=") + other + "\n")) << other;

@@ -10,7 +10,9 @@
 namespace VA::Linux {
 
 bool isUserSession(std::string_view sessionFile) {
-    return assignedValue(sessionFile, "CLASS") == "user" &&
+    // "user-early" is how newer versions call a session of root's.
+    const auto sessionClass = assignedValue(sessionFile, "CLASS");
+    return (sessionClass == "user" || sessionClass == "user-early") &&
            assignedValue(sessionFile, "STATE") != "closing";
 }
 
