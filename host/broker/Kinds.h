@@ -6,6 +6,7 @@
 
 #include <cmpi/cmpift.h>
 
+#include <cstring>
 #include <memory>
 #include <optional>
 #include <string>

@@ -3,6 +3,7 @@
 #include "host/broker/Kinds.h"
 
 #include <algorithm>
+#include <cstring>
 
 namespace cmpihost {
 
