@@ -1,7 +1,6 @@
 #include "CMPIOperatingSystem.h"
 
 #include "ElementAdapterOperations.h"
-#include "PropertyTable.h"
 
 namespace VA::OSStatusProvider {
 
@@ -10,7 +9,7 @@ static constexpr UnitLog unitLog("CMPIOperatingSystem.cpp", loggerCMPIOperatingS
 
 using OS = OperatingSystem;
 
-static constexpr Key<OS> keys[] = {
+static constexpr Key<OS> keyTable[] = {
     {"CSCreationClassName", &OS::getCSCreationClassName},
     {"CSName", &OS::getCSName},
     {"CreationClassName", &OS::getCreationClassName},
@@ -67,17 +66,12 @@ const UnitLog& OperatingSystemDesign::records() {
     return unitLog;
 }
 
-void OperatingSystemDesign::setKeys(Element& element, CMPIObjectPath* path) {
-    OSStatusProvider::setKeys(keys, element, path);
+Rows<Key<OperatingSystemDesign::Element>> OperatingSystemDesign::keys() {
+    return keyTable;
 }
 
-void OperatingSystemDesign::setProperties(Element& element, const CMPIBroker* broker,
-                                          CMPIInstance* instance) {
-    // One value of each type serves all rows: "Description", whose getter writes nothing, is
-    // published empty because no text was written before it.
-    PropertyValues values;
-    for (const Property<OS>& row : propertyTable)
-        row.publish(row.name, element, values, broker, instance);
+Rows<Property<OperatingSystemDesign::Element>> OperatingSystemDesign::properties() {
+    return propertyTable;
 }
 
 template class ElementAdapter<OperatingSystemDesign>;

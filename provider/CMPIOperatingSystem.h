@@ -3,6 +3,7 @@
 
 #include "ElementAdapter.h"
 #include "Linux/OperatingSystem.h"
+#include "PropertyTable.h"
 
 namespace VA::OSStatusProvider {
 
@@ -20,10 +21,13 @@ struct OperatingSystemDesign {
         {"CSName", "CSName", OperatingSystem::CSNameFilter},
         {"Name", "Name", OperatingSystem::NameFilter},
     };
+    /// One value of each type serves all rows, in order: "Description", whose getter writes
+    /// nothing, is published empty because no text was written before it.
+    static constexpr bool valuesAreShared = true;
 
     static const UnitLog& records();
-    static void setKeys(Element& element, CMPIObjectPath* path);
-    static void setProperties(Element& element, const CMPIBroker* broker, CMPIInstance* instance);
+    static Rows<Key<Element>> keys();
+    static Rows<Property<Element>> properties();
 };
 
 /// Serves KORVA_OperatingSystem.

@@ -1,7 +1,6 @@
 #include "CMPIOperatingSystemCapabilities.h"
 
 #include "ElementAdapterOperations.h"
-#include "PropertyTable.h"
 
 namespace VA::OSStatusProvider {
 
@@ -11,7 +10,7 @@ static const std::string loggerCMPIOperatingSystemCapabilities("Zumbrel.Operatin
 static constexpr UnitLog unitLog("CMPIOperatingSystemCapabilities.cpp",
                                  loggerCMPIOperatingSystemCapabilities);
 
-static constexpr Key<Capabilities> keys[] = {
+static constexpr Key<Capabilities> keyTable[] = {
     {"InstanceID", &Capabilities::getInstanceID},
 };
 
@@ -28,16 +27,13 @@ const UnitLog& OperatingSystemCapabilitiesDesign::records() {
     return unitLog;
 }
 
-void OperatingSystemCapabilitiesDesign::setKeys(Element& element, CMPIObjectPath* path) {
-    OSStatusProvider::setKeys(keys, element, path);
+Rows<Key<OperatingSystemCapabilitiesDesign::Element>> OperatingSystemCapabilitiesDesign::keys() {
+    return keyTable;
 }
 
-void OperatingSystemCapabilitiesDesign::setProperties(Element& element, const CMPIBroker* broker,
-                                                      CMPIInstance* instance) {
-    for (const Property<Capabilities>& row : propertyTable) {
-        PropertyValues fresh;
-        row.publish(row.name, element, fresh, broker, instance);
-    }
+Rows<Property<OperatingSystemCapabilitiesDesign::Element>>
+OperatingSystemCapabilitiesDesign::properties() {
+    return propertyTable;
 }
 
 template class ElementAdapter<OperatingSystemCapabilitiesDesign>;

@@ -3,6 +3,7 @@
 
 #include "ElementAdapter.h"
 #include "Linux/OperatingSystemCapabilities.h"
+#include "PropertyTable.h"
 
 namespace VA::OSStatusProvider {
 
@@ -20,10 +21,12 @@ struct OperatingSystemCapabilitiesDesign {
     static constexpr KeyFilter<Element> filters[] = {
         {"InstanceID", "instanceId", OperatingSystemCapabilities::InstanceIDFilter},
     };
+    /// Each row starts with fresh values.
+    static constexpr bool valuesAreShared = false;
 
     static const UnitLog& records();
-    static void setKeys(Element& element, CMPIObjectPath* path);
-    static void setProperties(Element& element, const CMPIBroker* broker, CMPIInstance* instance);
+    static Rows<Key<Element>> keys();
+    static Rows<Property<Element>> properties();
 };
 
 /// Serves KORVA_OperatingSystemCapabilities.

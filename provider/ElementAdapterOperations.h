@@ -6,6 +6,7 @@
 #include <utility>
 
 #include "ElementAdapter.h"
+#include "PropertyTable.h"
 #include "ProviderUtilities.h"
 #include "UnitLog.h"
 
@@ -55,7 +56,12 @@ CMPIObjectPath* ElementAdapter<Design>::getObjectPath() {
     Design::records().entering();
     CMPIObjectPath* path =
         VA::ProviderUtilities::createObjectPath(broker, Design::className, nameSpace);
-    if (path != nullptr) Design::setKeys(element, path);
+    if (path != nullptr) {
+        std::string value;
+        for (const Key<Element>& key : Design::keys())
+            if ((element.*key.getter)(value))
+                VA::ProviderUtilities::setKeyProperty(path, key.name, value);
+    }
     Design::records().exiting();
     return path;
 }
@@ -65,7 +71,13 @@ CMPIInstance* ElementAdapter<Design>::getCMPIInstance(const char** properties) {
     const std::string parameters = parameterList(" properties=", properties);
     Design::records().entering(parameters);
     CMPIInstance* instance = VA::ProviderUtilities::createInstance(broker, getObjectPath());
-    if (instance != nullptr) Design::setProperties(element, broker, instance);
+    if (instance != nullptr) {
+        PropertyValues values;
+        for (const Property<Element>& row : Design::properties()) {
+            if constexpr (!Design::valuesAreShared) values = {};
+            row.publish(row.name, element, values, broker, instance);
+        }
+    }
     Design::records().exiting(parameters);
     return instance;
 }

@@ -24,12 +24,45 @@ struct Property {
     using Publish = void (*)(const char* name, Element& element, PropertyValues& values,
                              const CMPIBroker* broker, CMPIInstance* instance);
     const char* name;
+    CMPIType type;  ///< the CIM type, with CMPI_ARRAY for an array
     Publish publish;
+};
+
+/// The rows of a table, in order.
+template <class Row>
+class Rows {
+  public:
+    template <std::size_t count>
+    constexpr Rows(const Row (&rows)[count]) : begin_(rows), end_(rows + count) {}
+    constexpr const Row* begin() const { return begin_; }
+    constexpr const Row* end() const { return end_; }
+
+  private:
+    const Row* begin_;
+    const Row* end_;
 };
 
 namespace detail {
 
-// The CIM type follows from the value's: arrays need the broker, the others do not.
+// The CIM type follows from the value's.
+template <class Value>
+constexpr CMPIType cimType = CMPI_null;
+template <>
+constexpr CMPIType cimType<std::string> = CMPI_string;
+template <>
+constexpr CMPIType cimType<unsigned short> = CMPI_uint16;
+template <>
+constexpr CMPIType cimType<unsigned int> = CMPI_uint32;
+template <>
+constexpr CMPIType cimType<unsigned long long> = CMPI_uint64;
+template <>
+constexpr CMPIType cimType<short> = CMPI_sint16;
+template <>
+constexpr CMPIType cimType<bool> = CMPI_boolean;
+template <class Element>
+constexpr CMPIType cimType<std::vector<Element>> = cimType<Element> | CMPI_ARRAY;
+
+// Arrays need the broker, the others do not.
 template <class Value>
 void setProperty(const CMPIBroker*, CMPIInstance* instance, const char* name, Value& value) {
     VA::ProviderUtilities::setProperty(instance, name, value);
@@ -62,7 +95,7 @@ struct Getter;
 template <class Element, class Value, bool (Element::*getter)(Value&)>
 struct Getter<getter> {
     static constexpr Property<Element> property(const char* name) {
-        return {name, publish<Element, Value, getter>};
+        return {name, cimType<Value>, publish<Element, Value, getter>};
     }
 };
 
@@ -77,7 +110,7 @@ constexpr auto property(const char* name) {
 /// The row of a datetime property, whose getter supplies a CIM datetime as text.
 template <class Element, bool (Element::*getter)(std::string&)>
 constexpr Property<Element> dateTime(const char* name) {
-    return {name, detail::publishDateTime<Element, getter>};
+    return {name, CMPI_dateTime, detail::publishDateTime<Element, getter>};
 }
 
 /// One row of a class's key table: the key's name, and the getter of its text.
@@ -86,15 +119,6 @@ struct Key {
     const char* name;
     bool (Element::*getter)(std::string& value);
 };
-
-/// Sets every key that the element can supply; one text serves all.
-template <class Element, std::size_t count>
-void setKeys(const Key<Element> (&keys)[count], Element& element, CMPIObjectPath* path) {
-    std::string value;
-    for (const Key<Element>& key : keys)
-        if ((element.*key.getter)(value))
-            VA::ProviderUtilities::setKeyProperty(path, key.name, value);
-}
 
 }  // namespace VA::OSStatusProvider
 

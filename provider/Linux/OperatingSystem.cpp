@@ -59,10 +59,6 @@ bool OperatingSystem::passesFilters() {
     return true;
 }
 
-bool OperatingSystem::getInstallDate(std::string& value) {
-    return getDateTime(InstallDate, value);
-}
-
 bool OperatingSystem::getOperationalStatus(std::vector<unsigned short>& value) {
     const NodeStatus& status = meaningOf(instrumentation.getNodeStatus());
     value.insert(value.end(), status.operationalStatus,
@@ -99,10 +95,6 @@ bool OperatingSystem::getCreationClassName(std::string& value) {
     return true;
 }
 
-bool OperatingSystem::getName(std::string& value) {
-    return instrumentation.getProperty(Name, value);
-}
-
 bool OperatingSystem::getOSType(unsigned short& value) {
     unsigned int raw = 0;
     if (!instrumentation.getProperty(OSType, raw)) return false;
@@ -117,66 +109,6 @@ bool OperatingSystem::getOSType(unsigned short& value) {
     else
         value = 1;  // Other
     return true;
-}
-
-bool OperatingSystem::getVersion(std::string& value) {
-    return instrumentation.getProperty(Version, value);
-}
-
-bool OperatingSystem::getLastBootUpTime(std::string& value) {
-    return getDateTime(LastBootUpTime, value);
-}
-
-bool OperatingSystem::getNumberOfLicensedUsers(unsigned int& value) {
-    return instrumentation.getProperty(NumberOfLicensedUsers, value);
-}
-
-bool OperatingSystem::getNumberOfUsers(unsigned int& value) {
-    return instrumentation.getProperty(NumberOfUsers, value);
-}
-
-bool OperatingSystem::getNumberOfProcesses(unsigned int& value) {
-    return instrumentation.getProperty(NumberOfProcesses, value);
-}
-
-bool OperatingSystem::getMaxNumberOfProcesses(unsigned int& value) {
-    return instrumentation.getProperty(MaxNumberOfProcesses, value);
-}
-
-bool OperatingSystem::getTotalSwapSpaceSize(unsigned long long& value) {
-    return getSize(TotalSwapSpaceSize, value);
-}
-
-bool OperatingSystem::getTotalVirtualMemorySize(unsigned long long& value) {
-    return getSize(TotalVirtualMemorySize, value);
-}
-
-bool OperatingSystem::getFreeVirtualMemory(unsigned long long& value) {
-    return getSize(FreeVirtualMemory, value);
-}
-
-bool OperatingSystem::getFreePhysicalMemory(unsigned long long& value) {
-    return getSize(FreePhysicalMemory, value);
-}
-
-bool OperatingSystem::getTotalVisibleMemorySize(unsigned long long& value) {
-    return getSize(TotalVisibleMemorySize, value);
-}
-
-bool OperatingSystem::getSizeStoredInPagingFiles(unsigned long long& value) {
-    return getSize(SizeStoredInPagingFiles, value);
-}
-
-bool OperatingSystem::getFreeSpaceInPagingFiles(unsigned long long& value) {
-    return getSize(FreeSpaceInPagingFiles, value);
-}
-
-bool OperatingSystem::getMaxProcessMemorySize(unsigned long long& value) {
-    return getSize(MaxProcessMemorySize, value);
-}
-
-bool OperatingSystem::isDistributed(bool& value) {
-    return instrumentation.getProperty(Distributed, value);
 }
 
 bool OperatingSystem::getSize(Properties id, unsigned long long& value) {

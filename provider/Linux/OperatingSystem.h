@@ -45,7 +45,7 @@ class OperatingSystem {
     /// A success without a value: what the output held is published.
     bool getDescription(std::string&) { return true; }
     bool getElementName(std::string&) { return false; }
-    bool getInstallDate(std::string& value);
+    bool getInstallDate(std::string& value) { return getDateTime(NodeLexicon::InstallDate, value); }
     /// Appends; never clears the output.
     bool getOperationalStatus(std::vector<unsigned short>& value);
     bool getStatusDescriptions(std::vector<std::string>&) { return false; }
@@ -65,28 +65,60 @@ class OperatingSystem {
     bool getCSCreationClassName(std::string& value);
     bool getCSName(std::string& value);
     bool getCreationClassName(std::string& value);
-    bool getName(std::string& value);
+    bool getName(std::string& value) {
+        return instrumentation.getProperty(NodeLexicon::Name, value);
+    }
     /// The framework's number as one of the CIM value map, which is shifted against it.
     bool getOSType(unsigned short& value);
     bool getOtherTypeDescription(std::string&) { return false; }
-    bool getVersion(std::string& value);
-    bool getLastBootUpTime(std::string& value);
+    bool getVersion(std::string& value) {
+        return instrumentation.getProperty(NodeLexicon::Version, value);
+    }
+    bool getLastBootUpTime(std::string& value) {
+        return getDateTime(NodeLexicon::LastBootUpTime, value);
+    }
     bool getLocalDateTime(std::string&) { return false; }
     bool getCurrentTimeZone(short&) { return false; }
-    bool getNumberOfLicensedUsers(unsigned int& value);
-    bool getNumberOfUsers(unsigned int& value);
-    bool getNumberOfProcesses(unsigned int& value);
-    bool getMaxNumberOfProcesses(unsigned int& value);
+    bool getNumberOfLicensedUsers(unsigned int& value) {
+        return instrumentation.getProperty(NodeLexicon::NumberOfLicensedUsers, value);
+    }
+    bool getNumberOfUsers(unsigned int& value) {
+        return instrumentation.getProperty(NodeLexicon::NumberOfUsers, value);
+    }
+    bool getNumberOfProcesses(unsigned int& value) {
+        return instrumentation.getProperty(NodeLexicon::NumberOfProcesses, value);
+    }
+    bool getMaxNumberOfProcesses(unsigned int& value) {
+        return instrumentation.getProperty(NodeLexicon::MaxNumberOfProcesses, value);
+    }
     /// Sizes are in kilobytes. Each writes its output, with 0 on failure, whatever it returns.
-    bool getTotalSwapSpaceSize(unsigned long long& value);
-    bool getTotalVirtualMemorySize(unsigned long long& value);
-    bool getFreeVirtualMemory(unsigned long long& value);
-    bool getFreePhysicalMemory(unsigned long long& value);
-    bool getTotalVisibleMemorySize(unsigned long long& value);
-    bool getSizeStoredInPagingFiles(unsigned long long& value);
-    bool getFreeSpaceInPagingFiles(unsigned long long& value);
-    bool getMaxProcessMemorySize(unsigned long long& value);
-    bool isDistributed(bool& value);
+    bool getTotalSwapSpaceSize(unsigned long long& value) {
+        return getSize(NodeLexicon::TotalSwapSpaceSize, value);
+    }
+    bool getTotalVirtualMemorySize(unsigned long long& value) {
+        return getSize(NodeLexicon::TotalVirtualMemorySize, value);
+    }
+    bool getFreeVirtualMemory(unsigned long long& value) {
+        return getSize(NodeLexicon::FreeVirtualMemory, value);
+    }
+    bool getFreePhysicalMemory(unsigned long long& value) {
+        return getSize(NodeLexicon::FreePhysicalMemory, value);
+    }
+    bool getTotalVisibleMemorySize(unsigned long long& value) {
+        return getSize(NodeLexicon::TotalVisibleMemorySize, value);
+    }
+    bool getSizeStoredInPagingFiles(unsigned long long& value) {
+        return getSize(NodeLexicon::SizeStoredInPagingFiles, value);
+    }
+    bool getFreeSpaceInPagingFiles(unsigned long long& value) {
+        return getSize(NodeLexicon::FreeSpaceInPagingFiles, value);
+    }
+    bool getMaxProcessMemorySize(unsigned long long& value) {
+        return getSize(NodeLexicon::MaxProcessMemorySize, value);
+    }
+    bool isDistributed(bool& value) {
+        return instrumentation.getProperty(NodeLexicon::Distributed, value);
+    }
     bool getMaxProcessesPerUser(unsigned int&) { return false; }
 
   private:

@@ -1,8 +1,8 @@
 #include "support/RecordingLog.h"
 
+#include <algorithm>
 #include <atomic>
 #include <mutex>
-#include <regex>
 #include <sstream>
 #include <utility>
 
@@ -28,11 +28,26 @@ void keep(Record record) {
     kept.push_back(std::move(record));
 }
 
-std::string masked(std::string text) {
-    static const std::regex line("(Line: |at line )[0-9]+");
-    static const std::regex address("0x[0-9a-f]+");
-    text = std::regex_replace(text, line, "$1#");
-    return std::regex_replace(text, address, "0x*");
+// Replaces each run of `characters` that follows `prefix` by `mask`.
+std::string masked(const std::string& text, const std::string& prefix, const char* characters,
+                   const char* mask) {
+    std::string result;
+    std::size_t from = 0;
+    for (std::size_t at = text.find(prefix); at != std::string::npos;
+         at = text.find(prefix, from)) {
+        const std::size_t begin = at + prefix.size();
+        const std::size_t end = std::min(text.find_first_not_of(characters, begin), text.size());
+        result.append(text, from, begin - from);
+        if (end > begin) result += mask;
+        from = end;
+    }
+    return result.append(text, from, std::string::npos);
+}
+
+std::string masked(const std::string& text) {
+    const char* const digits = "0123456789";
+    return masked(masked(masked(text, "Line: ", digits, "#"), "at line ", digits, "#"), "0x",
+                  "0123456789abcdef", "*");
 }
 
 void render(std::ostream& out, const std::string& channel, const Record& record) {
