@@ -46,21 +46,21 @@ namespace detail {
 
 // The CIM type follows from the value's.
 template <class Value>
-constexpr CMPIType cimType = CMPI_null;
+inline constexpr CMPIType cimType = CMPI_null;
 template <>
-constexpr CMPIType cimType<std::string> = CMPI_string;
+inline constexpr CMPIType cimType<std::string> = CMPI_string;
 template <>
-constexpr CMPIType cimType<unsigned short> = CMPI_uint16;
+inline constexpr CMPIType cimType<unsigned short> = CMPI_uint16;
 template <>
-constexpr CMPIType cimType<unsigned int> = CMPI_uint32;
+inline constexpr CMPIType cimType<unsigned int> = CMPI_uint32;
 template <>
-constexpr CMPIType cimType<unsigned long long> = CMPI_uint64;
+inline constexpr CMPIType cimType<unsigned long long> = CMPI_uint64;
 template <>
-constexpr CMPIType cimType<short> = CMPI_sint16;
+inline constexpr CMPIType cimType<short> = CMPI_sint16;
 template <>
-constexpr CMPIType cimType<bool> = CMPI_boolean;
+inline constexpr CMPIType cimType<bool> = CMPI_boolean;
 template <class Element>
-constexpr CMPIType cimType<std::vector<Element>> = cimType<Element> | CMPI_ARRAY;
+inline constexpr CMPIType cimType<std::vector<Element>> = cimType<Element> | CMPI_ARRAY;
 
 // Arrays need the broker, the others do not.
 template <class Value>
