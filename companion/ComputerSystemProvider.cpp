@@ -3,7 +3,6 @@
 #include <cmpi/cmpimacs.h>
 #include <strings.h>
 
-#include <exception>
 #include <string>
 
 #include "ComputerSystem.h"
@@ -24,7 +23,7 @@ template <class Serve>
 CMPIStatus guarded(const CMPIObjectPath* path, Serve serve) {
     try {
         return serve(Utilities::getNamespace(path));
-    } catch (const std::exception&) {
+    } catch (...) {
         return status(CMPI_RC_ERR_FAILED);
     }
 }

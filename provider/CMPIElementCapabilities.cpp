@@ -124,8 +124,10 @@ CMPIInstance* CMPIOSElementCapabilities::getAssociator(const char** properties) 
 CMPIObjectPath* CMPIOSElementCapabilities::locateCapabilities(const CMPIObjectPath* objectPath) {
     const std::string parameters = parameterList(" objectPath=", objectPath);
     records.entering(parameters);
-    CMPIObjectPath* path = locate(objectPath, "KORVA_OperatingSystemCapabilities",
-                                  &OSElementCapabilities::getOSCapabilitiesMoniker);
+    CMPIObjectPath* path =
+        locate({broker, nameSpace, "KORVA_OperatingSystemCapabilities"}, objectPath,
+               Utilities::getKeyCount(objectPath) != 0, elementCapabilities,
+               &OSElementCapabilities::getOSCapabilitiesMoniker);
     records.exiting(parameters);
     return path;
 }
@@ -133,18 +135,10 @@ CMPIObjectPath* CMPIOSElementCapabilities::locateCapabilities(const CMPIObjectPa
 CMPIObjectPath* CMPIOSElementCapabilities::locateOperatingSystem(const CMPIObjectPath* objectPath) {
     const std::string parameters = parameterList(" objectPath=", objectPath);
     records.entering(parameters);
-    CMPIObjectPath* path = locate(objectPath, "KORVA_OperatingSystem",
+    CMPIObjectPath* path = locate({broker, nameSpace, "KORVA_OperatingSystem"}, objectPath,
+                                  Utilities::getKeyCount(objectPath) != 0, elementCapabilities,
                                   &OSElementCapabilities::getOperatingSystemMoniker);
     records.exiting(parameters);
-    return path;
-}
-
-CMPIObjectPath* CMPIOSElementCapabilities::locate(
-    const CMPIObjectPath* objectPath, const char* className,
-    VA::Moniker (OSElementCapabilities::*map)(VA::Moniker&)) {
-    CMPIObjectPath* path = Utilities::createObjectPath(broker, className, nameSpace);
-    if (Utilities::getKeyCount(objectPath) != 0)
-        mapKeys(objectPath, elementCapabilities, map, path);
     return path;
 }
 

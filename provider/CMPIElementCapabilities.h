@@ -60,8 +60,6 @@ class CMPIOSElementCapabilities {
     bool setKeyedObjectPath(const CMPIObjectPath* objectPath);
     void pairWithCurrentOperatingSystem();
     void advancePair();
-    CMPIObjectPath* locate(const CMPIObjectPath* objectPath, const char* className,
-                           VA::Moniker (OSElementCapabilities::*map)(VA::Moniker&));
 
     const CMPIBroker* broker;
     const CMPIContext* context;

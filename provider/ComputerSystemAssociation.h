@@ -8,7 +8,6 @@
 
 #include "CMPIComputerSystem.h"
 #include "CMPIOperatingSystem.h"
-#include "Moniker.h"
 
 namespace VA::OSStatusProvider {
 
@@ -66,8 +65,6 @@ class ComputerSystemAssociation {
   private:
     using Mapping = typename Design::Mapping;
 
-    CMPIObjectPath* locate(const CMPIObjectPath* objectPath, const char* className,
-                           VA::Moniker (Mapping::*map)(VA::Moniker&));
     CMPIObjectPath* pathOf(End end);
 
     const CMPIBroker* broker;

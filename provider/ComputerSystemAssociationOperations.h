@@ -144,13 +144,18 @@ CMPIInstance* ComputerSystemAssociation<Design>::getAssociator(const char** prop
     return instance;
 }
 
+// These associations take the number of keys in 16 bits.
+inline bool hasKeys(const CMPIObjectPath* path) {
+    return static_cast<unsigned short>(VA::ProviderUtilities::getKeyCount(path)) != 0;
+}
+
 template <class Design>
 CMPIObjectPath* ComputerSystemAssociation<Design>::locateComputerSystem(
     const CMPIObjectPath* objectPath) {
     const std::string parameters = parameterList(" objectPath=", objectPath);
     Design::records().entering(parameters);
-    CMPIObjectPath* path =
-        locate(objectPath, "KORVA_ComputerSystem", &Mapping::getComputerSystemMoniker);
+    CMPIObjectPath* path = locate({broker, nameSpace, "KORVA_ComputerSystem"}, objectPath,
+                                  hasKeys(objectPath), mapping, &Mapping::getComputerSystemMoniker);
     Design::records().exiting(parameters);
     return path;
 }
@@ -161,19 +166,9 @@ CMPIObjectPath* ComputerSystemAssociation<Design>::locateOperatingSystem(
     const std::string parameters = parameterList(" objectPath=", objectPath);
     Design::records().entering(parameters);
     CMPIObjectPath* path =
-        locate(objectPath, "KORVA_OperatingSystem", &Mapping::getOperatingSystemMoniker);
+        locate({broker, nameSpace, "KORVA_OperatingSystem"}, objectPath, hasKeys(objectPath),
+               mapping, &Mapping::getOperatingSystemMoniker);
     Design::records().exiting(parameters);
-    return path;
-}
-
-template <class Design>
-CMPIObjectPath* ComputerSystemAssociation<Design>::locate(
-    const CMPIObjectPath* objectPath, const char* className,
-    VA::Moniker (Mapping::*map)(VA::Moniker&)) {
-    CMPIObjectPath* path = VA::ProviderUtilities::createObjectPath(broker, className, nameSpace);
-    // The count is taken in 16 bits.
-    if (static_cast<unsigned short>(VA::ProviderUtilities::getKeyCount(objectPath)) != 0)
-        mapKeys(objectPath, mapping, map, path);
     return path;
 }
 

@@ -1,21 +1,34 @@
 #ifndef OSSTATUS_FAR_END_H
 #define OSSTATUS_FAR_END_H
 
+#include <string>
+
 #include "Moniker.h"
 #include "ProviderUtilities.h"
 
 namespace VA::OSStatusProvider {
 
-/// Writes the keys of an association's far end into `farEnd`, as `mapping` derives them from the
-/// keys of `nearEnd`; without keys there, nothing is written. What the mapping throws passes
-/// through. `farEnd` may be null.
+/// What a far end's path is made with.
+struct FarEnd {
+    const CMPIBroker* broker;
+    const std::string& nameSpace;
+    const char* className;
+};
+
+/// A new path of the far end, null when the broker makes none. When `nearEnd` has keys, as the
+/// caller counts them, the path gets the keys that `mapping` derives from those; what the mapping
+/// throws passes through.
 template <class Mapping>
-void mapKeys(const CMPIObjectPath* nearEnd, Mapping& mapping,
-             VA::Moniker (Mapping::*map)(VA::Moniker&), CMPIObjectPath*& farEnd) {
+CMPIObjectPath* locate(const FarEnd& farEnd, const CMPIObjectPath* nearEnd, bool hasKeys,
+                       Mapping& mapping, VA::Moniker (Mapping::*map)(VA::Moniker&)) {
+    CMPIObjectPath* path =
+        VA::ProviderUtilities::createObjectPath(farEnd.broker, farEnd.className, farEnd.nameSpace);
+    if (!hasKeys) return path;
     VA::Moniker moniker;
     VA::ProviderUtilities::transformObjectPathToMoniker(nearEnd, moniker);
     VA::Moniker mapped = (mapping.*map)(moniker);
-    VA::ProviderUtilities::transformMonikerToObjectPath(mapped, &farEnd);
+    VA::ProviderUtilities::transformMonikerToObjectPath(mapped, &path);
+    return path;
 }
 
 /// Sets the reference that an association's path holds under `role` as a property of its instance;

@@ -120,8 +120,8 @@ bool OperatingSystem::getSize(Properties id, unsigned long long& value) {
 
 bool OperatingSystem::getDateTime(Properties id, std::string& value) {
     if (!instrumentation.getProperty(id, value)) return false;
-    // The zone as libc holds it, without initialising it. The sign is '+' west of UTC, against the
-    // CIM convention: clients of this class know it so.
+    // The zone as libc holds it, without initialising it. The sign is '+' west of UTC: the opposite
+    // of the host's own offset, and that of the zone in which the instrumentation gives its dates.
     const bool east = timezone < 0;
     const long offset = (east ? -timezone : timezone) / 60;
 
