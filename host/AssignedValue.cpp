@@ -7,13 +7,14 @@
 #include "host/SchemaCatalogue.h"
 #include "host/TerminalText.h"
 #include "host/UsageError.h"
+#include "host/broker/DateTimeText.h"
 
 namespace cmpihost {
 
 namespace {
 
 mof::Value constant(const std::string& text, const mof::Feature& property) {
-    mof::Tokens tokens(text, "the value of '" + property.name + "'");
+    mof::Tokens tokens(text, property.name);
     mof::Value result = mof::Values(tokens).scalarValue();
     if (!tokens.atEnd()) {
         tokens.expected("nothing after the value");
@@ -60,10 +61,17 @@ bool isWrittenBare(const mof::Feature& property) {
            property.type == mof::Type::Reference;
 }
 
+/// MOF takes any text for a datetime.
+bool isDateTimeOrNull(const mof::Scalar& scalar) {
+    const auto* text = std::get_if<std::string>(&scalar);
+    return text == nullptr || parseDateTime(*text).has_value();
+}
+
 /// A single text without quotes, as one gives it to a scalar: "{" begins a list instead.
 mof::Value constantOrText(const std::string& text, const mof::Feature& property) {
     const bool list = property.array && text.substr(0, 1) == "{";
-    const bool bare = isWrittenBare(property) && !list;
+    const bool absent = property.type == mof::Type::DateTime && equalNames(text, "NULL");
+    const bool bare = isWrittenBare(property) && !list && !absent;
     return bare ? mof::Value{false, {text}} : constant(text, property);
 }
 
@@ -79,7 +87,8 @@ Value assignedValue(const std::string& text, const mof::Feature& property,
     try {
         value = constantOrText(text, property);
     } catch (const mof::MofError& error) {
-        throw UsageError(terminalText(error.what()));
+        throw UsageError("the value of '" + property.name +
+                         "': " + terminalText(error.complaint()));
     }
     if (value.array && !property.array) {
         refuse("a list, no single value,");
@@ -88,7 +97,8 @@ Value assignedValue(const std::string& text, const mof::Feature& property,
     const auto elementType = static_cast<CMPIType>(type & ~CMPI_ARRAY);
     std::vector<Value> elements;
     for (const mof::Scalar& item : value.items) {
-        if (!mof::fits(item, property.type)) {
+        const bool wrongDate = property.type == mof::Type::DateTime && !isDateTimeOrNull(item);
+        if (wrongDate || !mof::fits(item, property.type)) {
             refuse(std::string("no value of type ") + mof::nameOf(property.type));
         }
         elements.push_back(typed(item, elementType, catalogue));

@@ -72,13 +72,22 @@ constexpr const char* statusHelp =
     "What the host catches the provider at (a null result, an undeclared property, an object used\n"
     "after its request) is told on the standard error in lines that begin with 'caught:'.";
 
+std::string withoutBlanksAround(const std::string& text) {
+    constexpr const char* blanks = " \t\r\n";
+    const std::size_t start = text.find_first_not_of(blanks);
+    return start == std::string::npos
+               ? std::string()
+               : text.substr(start, text.find_last_not_of(blanks) - start + 1);
+}
+
 /// The names between commas; an empty text holds none.
 void addNames(const std::string& list, std::vector<std::string>& to) {
     std::size_t start = 0;
     while (start < list.size()) {
         const std::size_t comma = std::min(list.find(',', start), list.size());
-        if (comma > start) {
-            to.push_back(list.substr(start, comma - start));
+        const std::string name = withoutBlanksAround(list.substr(start, comma - start));
+        if (!name.empty()) {
+            to.push_back(name);
         }
         start = comma + 1;
     }
@@ -122,6 +131,9 @@ class Parser {
         } catch (const CLI::ParseError& error) {
             return refused(app_.get_subcommands().empty() ? withoutOperation(error) : error.what());
         }
+        if (result_.tree && result_.format != Format::Table) {
+            return refused("--format: tree draws a picture, it has no other form");
+        }
         collectProperties();
         return {result_, {}, exitDone};
     }
@@ -164,7 +176,8 @@ void Parser::addHostOptions() {
         ->type_name("FILE");
     app_.add_option_function<std::string>(
             "--format", [this](const std::string& word) { result_.format = formatNamed(word); },
-            "How results are printed: table (the default), mof or json")
+            "How results are printed: table (the default), mof or json;\n"
+            "not for tree")
         ->type_name("FORMAT");
     app_.add_flag("--log", result_.log, "Show the records of the provider on the standard error");
     app_.add_option("--schema", result_.schema,

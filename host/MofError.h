@@ -18,11 +18,15 @@ class MofError : public std::runtime_error {
     MofError(const std::string& file, Position position, const std::string& complaint)
         : std::runtime_error(file + ":" + std::to_string(position.line) + ":" +
                              std::to_string(position.column) + ": " + complaint),
+          complaint_(complaint),
           position_(position) {}
 
+    /// What was expected, without the place.
+    const std::string& complaint() const { return complaint_; }
     Position position() const { return position_; }
 
   private:
+    std::string complaint_;
     Position position_;
 };
 

@@ -39,8 +39,15 @@ fs::path firstFile(const std::vector<fs::path>& candidates) {
 
 }  // namespace
 
-fs::path programFolder() {
-    return fs::read_symlink("/proc/self/exe").parent_path();
+fs::path programFolder(const std::string& invokedAs, const fs::path& ownFile) {
+    std::error_code error;
+    fs::path file = fs::read_symlink(ownFile, error);
+    if (!error) {
+        return file.parent_path();
+    }
+    const bool bare = invokedAs.find('/') == std::string::npos;
+    file = bare ? fs::path() : fs::canonical(invokedAs, error);
+    return file.empty() ? fs::path(KORVA_PROGRAM_FOLDER) : file.parent_path();
 }
 
 fs::path schemaFolder(const fs::path& programFolder) {

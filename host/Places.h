@@ -1,13 +1,16 @@
 #pragma once
 
 #include <filesystem>
+#include <string>
 #include <vector>
 
 namespace cmpihost {
 
-/// The folder that the running program's file is in. Throws std::system_error when the system does
-/// not tell it.
-std::filesystem::path programFolder();
+/// The folder that the running program's file is in. Where the system does not tell it (ownFile, a
+/// link to that file, cannot be read), the folder of invokedAs, the name that the program was
+/// called by; where that is a bare name, the folder that the program is made to be installed in.
+std::filesystem::path programFolder(const std::string& invokedAs,
+                                    const std::filesystem::path& ownFile = "/proc/self/exe");
 
 /// The folder of the MOF files that belongs to a program in that folder.
 std::filesystem::path schemaFolder(const std::filesystem::path& programFolder);

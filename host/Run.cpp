@@ -1,8 +1,10 @@
 #include "host/Run.h"
 
 #include <optional>
+#include <stdexcept>
 #include <type_traits>
 
+#include "host/Notes.h"
 #include "host/Places.h"
 #include "host/ProviderHost.h"
 #include "host/RecordsOnStderr.h"
@@ -35,6 +37,12 @@ std::string loadable(const std::string& given) {
     return bare && fs::exists(given, error) ? "./" + given : given;
 }
 
+/// There is no library to load; what() is safe to print on a terminal.
+class NoProvider : public std::runtime_error {
+  public:
+    using std::runtime_error::runtime_error;
+};
+
 std::string providerFile(const std::string& given, const fs::path& programFolder) {
     if (!given.empty()) {
         return loadable(given);
@@ -43,9 +51,9 @@ std::string providerFile(const std::string& given, const fs::path& programFolder
     if (found.empty()) {
         std::string text = "no provider library was found; looked for";
         for (const fs::path& candidate : providerCandidates(programFolder)) {
-            text += "\n  " + candidate.string();
+            text += "\n  " + terminalText(candidate.string());
         }
-        throw LoadError(LoadProblem::FileMissing, text + "\n(--provider FILE names one)");
+        throw NoProvider(text + "\n(--provider FILE names one)");
     }
     return found.string();
 }
@@ -77,20 +85,6 @@ void printResult(const OperationRequest& request, OperationResult result, const 
     printer.print(result.instances);
 }
 
-/// What an object manager would do differently with such a result.
-void printNotes(const OperationRequest& request, const OperationResult& result, std::ostream& err) {
-    if (request.operation != Operation::GetInstance) {
-        return;
-    }
-    if (result.instances.empty()) {
-        err << "note: no instance was returned; an object manager answers "
-            << statusText(CMPI_RC_ERR_NOT_FOUND) << '\n';
-    } else if (result.instances.size() > 1) {
-        err << "note: " << result.instances.size()
-            << " instances were returned; an object manager takes the first\n";
-    }
-}
-
 class Run {
   public:
     Run(const CommandLine& commandLine, const fs::path& programFolder, std::ostream& out,
@@ -100,8 +94,11 @@ class Run {
     ExitStatus guarded() {
         try {
             return execute();
-        } catch (const LoadError& error) {
+        } catch (const NoProvider& error) {
             err_ << error.what() << '\n';
+            return exitNotLoaded;
+        } catch (const LoadError& error) {
+            err_ << terminalText(error.what()) << '\n';
             return exitNotLoaded;
         } catch (const PathError& error) {
             err_ << error.what() << '\n';
@@ -123,10 +120,12 @@ class Run {
         const OperationResult result =
             hosted(catalogue, [&](ProviderHost& host) { return host.run(request); });
         if (result.rc != CMPI_RC_OK) {
-            return failed(result);
+            const ExitStatus status = failed(result);
+            err_ << hintFor(request, result, schema);
+            return status;
         }
         printResult(request, result, schema, *makePrinter(commandLine_.format, out_, schema));
-        printNotes(request, result, err_);
+        err_ << notesOn(request, result, schema);
         return written();
     }
 

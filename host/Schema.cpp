@@ -33,6 +33,12 @@ std::vector<fs::path> mofFiles(const fs::path& folder) {
 }
 
 std::string contentOf(const fs::path& file) {
+    // Opening a named pipe would wait for its other end.
+    std::error_code error;
+    const fs::file_status status = fs::status(file, error);
+    if (fs::exists(status) && !fs::is_regular_file(status)) {
+        throw std::runtime_error("the schema file " + file.string() + " is not a regular file");
+    }
     std::ifstream stream(file, std::ios::binary);
     std::string content{std::istreambuf_iterator<char>(stream), std::istreambuf_iterator<char>()};
     if (!stream) {

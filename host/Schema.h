@@ -24,7 +24,8 @@ class Schema {
 
     /// Reads every *.mof file of the folder, in the order of their names. An include pragma adds
     /// nothing, for all files of the folder are read anyway. Throws mof::MofError for a file that
-    /// is no MOF, std::runtime_error when the folder cannot be read or holds no class.
+    /// is no MOF, std::runtime_error when the folder or a file in it cannot be read, a *.mof is
+    /// no regular file, or there is no class.
     static Schema load(const std::filesystem::path& folder);
 
     /// Adds the classes of one text. Throws mof::MofError, also for a class that is there already,

@@ -7,6 +7,19 @@
 #include "host/Places.h"
 #include "host/Run.h"
 
+namespace {
+
+cmpihost::ExitStatus show(const cmpihost::ParsedCommandLine& parsed) {
+    std::ostream& stream = parsed.status == cmpihost::exitDone ? std::cout : std::cerr;
+    if (!(stream << parsed.text).flush()) {
+        std::cerr << "the text cannot be written\n";
+        return parsed.status == cmpihost::exitDone ? cmpihost::exitCimStatus : parsed.status;
+    }
+    return parsed.status;
+}
+
+}  // namespace
+
 int main(int argumentCount, char** arguments) {
     using namespace cmpihost;
     // A provider finds the time zone set, as in a server that writes a log.
@@ -14,10 +27,10 @@ int main(int argumentCount, char** arguments) {
     try {
         const ParsedCommandLine parsed = parseCommandLine(argumentCount, arguments);
         if (!parsed.commandLine) {
-            (parsed.status == exitDone ? std::cout : std::cerr) << parsed.text;
-            return parsed.status;
+            return show(parsed);
         }
-        return run(*parsed.commandLine, programFolder(), std::cout, std::cerr);
+        const char* const invokedAs = argumentCount > 0 ? arguments[0] : "";
+        return run(*parsed.commandLine, programFolder(invokedAs), std::cout, std::cerr);
     } catch (const std::exception& error) {
         std::cerr << "cmpihost: " << error.what() << '\n';
         return exitUsage;

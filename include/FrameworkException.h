@@ -6,10 +6,10 @@
 namespace VA {
 
 /// An identity that cannot be mapped: a moniker lacks the key that the far end is named by.
-class [[gnu::visibility("default")]] FrameworkException : public TextException{
-    public :
-        /// Copies `text`, which must not be null. Throws std::bad_alloc.
-        explicit FrameworkException(const char* text) : TextException(text){}
+class __attribute__((visibility("default"))) FrameworkException : public TextException {
+  public:
+    /// Copies `text`, which must not be null. Throws std::bad_alloc.
+    explicit FrameworkException(const char* text) : TextException(text) {}
 };
 
 }  // namespace VA

@@ -15,7 +15,7 @@ namespace VA {
 /// together: each source behind them is read at most once, when a property first needs it.
 ///
 /// No operation reports an error: what cannot be read is absent. std::bad_alloc may leave any.
-class [[gnu::visibility("default")]] Instrumentation {
+class __attribute__((visibility("default"))) Instrumentation {
   public:
     /// A cursor that stands on no node.
     Instrumentation();
@@ -35,7 +35,7 @@ class [[gnu::visibility("default")]] Instrumentation {
 
     /// Reads a property of the current node into `value`. False when the node has no such value of
     /// that type, or when the cursor stands on no node; `value` is then not to be used.
-    bool getProperty(NodeLexicon::Properties id, std::string & value);
+    bool getProperty(NodeLexicon::Properties id, std::string& value);
     bool getProperty(NodeLexicon::Properties id, unsigned int& value);
     bool getProperty(NodeLexicon::Properties id, bool& value);
 
@@ -49,7 +49,7 @@ class [[gnu::visibility("default")]] Instrumentation {
     unsigned int getNodeStatus();
 
     /// Writes the name of the computer that the nodes belong to; false when it is not known.
-    bool getComputerName(std::string & name);
+    bool getComputerName(std::string& name);
 
   private:
     class State;

@@ -6,7 +6,7 @@
 namespace VA {
 
 /// A request names an element that the instrumentation does not have.
-class [[gnu::visibility("default")]] InstrumentationException : public TextException {
+class __attribute__((visibility("default"))) InstrumentationException : public TextException {
   public:
     /// Copies `text`, which must not be null. Throws std::bad_alloc.
     explicit InstrumentationException(const char* text);

@@ -13,13 +13,13 @@ namespace VA {
 ///
 /// A plain value: copies are independent. One object serves one thread at a time. Operations that
 /// copy texts may throw std::bad_alloc.
-class [[gnu::visibility("default")]] Moniker {
+class __attribute__((visibility("default"))) Moniker {
   public:
     /// An empty moniker; no key is selected.
     Moniker();
     ~Moniker();
     Moniker(const Moniker&);
-    Moniker(Moniker &&) noexcept;
+    Moniker(Moniker&&) noexcept;
     Moniker& operator=(const Moniker&);
     Moniker& operator=(Moniker&&) noexcept;
 
@@ -34,8 +34,8 @@ class [[gnu::visibility("default")]] Moniker {
     bool selectKey(unsigned int index);
 
     /// Writes name or value of the selected key; writes nothing when no key is selected.
-    void getName(std::string & name) const;
-    void getValue(std::string & value) const;
+    void getName(std::string& name) const;
+    void getValue(std::string& value) const;
 
   private:
     static constexpr std::size_t none = static_cast<std::size_t>(-1);

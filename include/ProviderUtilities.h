@@ -19,7 +19,7 @@ namespace VA {
 /// everywhere: nothing is done then, and the result is null, 0, "" or false.
 /// Threads: no state, every function may be called from any number of threads.
 /// Failures show only in the results named here; std::bad_alloc may leave any function.
-class [[gnu::visibility("default")]] ProviderUtilities {
+class __attribute__((visibility("default"))) ProviderUtilities {
   public:
     /// The class id of a path's class, or of a class name: 1 KORVA_ComputerSystem,
     /// 55 KORVA_OperatingSystem, 56 KORVA_OperatingSystemCapabilities, 57 KORVA_InstalledOS,
@@ -39,9 +39,9 @@ class [[gnu::visibility("default")]] ProviderUtilities {
                                             std::string nameSpace);
 
     /// Adds or replaces a key binding: a text, or a reference to another path.
-    static void setKeyProperty(CMPIObjectPath * path, const char* name, const char* value);
-    static void setKeyProperty(CMPIObjectPath * path, const char* name, const std::string& value);
-    static void setKeyProperty(CMPIObjectPath * path, const char* name, CMPIObjectPath* value);
+    static void setKeyProperty(CMPIObjectPath* path, const char* name, const char* value);
+    static void setKeyProperty(CMPIObjectPath* path, const char* name, const std::string& value);
+    static void setKeyProperty(CMPIObjectPath* path, const char* name, CMPIObjectPath* value);
 
     /// Reads a key binding as text. A number is given in decimal, a boolean as "true" or "false".
     /// False, and `value` is left alone, when there is no such key, or when it is a reference or
@@ -59,13 +59,13 @@ class [[gnu::visibility("default")]] ProviderUtilities {
 
     /// Sets a property; the CIM type is that of the argument: boolean, uint16, sint16, uint32,
     /// uint64, string, reference.
-    static void setProperty(CMPIInstance * instance, const char* name, bool value);
-    static void setProperty(CMPIInstance * instance, const char* name, unsigned short value);
-    static void setProperty(CMPIInstance * instance, const char* name, short value);
-    static void setProperty(CMPIInstance * instance, const char* name, unsigned int value);
-    static void setProperty(CMPIInstance * instance, const char* name, unsigned long long value);
-    static void setProperty(CMPIInstance * instance, const char* name, std::string& value);
-    static void setProperty(CMPIInstance * instance, const char* name, CMPIObjectPath* value);
+    static void setProperty(CMPIInstance* instance, const char* name, bool value);
+    static void setProperty(CMPIInstance* instance, const char* name, unsigned short value);
+    static void setProperty(CMPIInstance* instance, const char* name, short value);
+    static void setProperty(CMPIInstance* instance, const char* name, unsigned int value);
+    static void setProperty(CMPIInstance* instance, const char* name, unsigned long long value);
+    static void setProperty(CMPIInstance* instance, const char* name, std::string& value);
+    static void setProperty(CMPIInstance* instance, const char* name, CMPIObjectPath* value);
 
     /// Sets an array property: uint16[] or string[].
     static void setProperty(const CMPIBroker* broker, CMPIInstance* instance, const char* name,
@@ -84,7 +84,7 @@ class [[gnu::visibility("default")]] ProviderUtilities {
 
     /// Sets the moniker's keys as key bindings on the path that `*path` holds. The moniker is only
     /// read; its selected key changes.
-    static void transformMonikerToObjectPath(Moniker & moniker, CMPIObjectPath * *path);
+    static void transformMonikerToObjectPath(Moniker& moniker, CMPIObjectPath** path);
 };
 
 }  // namespace VA

@@ -11,7 +11,7 @@ namespace ZBLog {
 ///
 /// Both calls may come from any number of threads, never throw, and keep nothing of their
 /// arguments after they return.
-class [[gnu::visibility("default")]] ZBLogger {
+class __attribute__((visibility("default"))) ZBLogger {
   public:
     /// `function` and `file` (not null) and `line` tell where the record was written; `category`
     /// names the unit; a higher `level` is a finer one (3000, 4000); the three arguments after it

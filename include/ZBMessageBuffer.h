@@ -15,7 +15,7 @@ namespace ZBLog {
 ///
 /// Taking the text empties the buffer, so that it can gather the next one. One object serves one
 /// thread. Construction and insertion may throw std::bad_alloc.
-class [[gnu::visibility("default")]] ZBMessageBuffer {
+class __attribute__((visibility("default"))) ZBMessageBuffer {
   public:
     ZBMessageBuffer();
     ~ZBMessageBuffer();
@@ -32,8 +32,8 @@ class [[gnu::visibility("default")]] ZBMessageBuffer {
     /// Takes the text gathered so far. The argument is what the insertions return; it is there so
     /// that they come first. The text is valid until the next call of str on this buffer, or the
     /// buffer's end.
-    const std::string& str(ZBMessageBuffer & inserted);
-    const std::string& str(std::ostream & inserted);
+    const std::string& str(ZBMessageBuffer& inserted);
+    const std::string& str(std::ostream& inserted);
 
   private:
     class Gatherer;

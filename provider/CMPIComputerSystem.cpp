@@ -33,8 +33,8 @@ CMPIOSComputerSystem::CMPIOSComputerSystem(const CMPIBroker* _broker, const CMPI
     records.method();
 }
 
-CMPIOSComputerSystem::~CMPIOSComputerSystem() {
-    records.method();
+CMPIOSComputerSystem::~CMPIOSComputerSystem() noexcept(false) {
+    records.destructor();
 }
 
 void CMPIOSComputerSystem::setObjectPath(const CMPIObjectPath* objectPath) {

@@ -18,7 +18,7 @@ class CMPIOSComputerSystem {
     /// Stands on nothing; does not ask the broker yet.
     CMPIOSComputerSystem(const CMPIBroker* _broker, const CMPIContext* _context,
                          std::string _nameSpace);
-    ~CMPIOSComputerSystem();
+    ~CMPIOSComputerSystem() noexcept(false);
     CMPIOSComputerSystem(const CMPIOSComputerSystem&) = delete;
     CMPIOSComputerSystem& operator=(const CMPIOSComputerSystem&) = delete;
 

@@ -41,8 +41,8 @@ CMPIOSElementCapabilities::CMPIOSElementCapabilities(const CMPIBroker* _broker,
     records.exiting(parameters);
 }
 
-CMPIOSElementCapabilities::~CMPIOSElementCapabilities() {
-    records.method();
+CMPIOSElementCapabilities::~CMPIOSElementCapabilities() noexcept(false) {
+    records.destructor();
 }
 
 bool CMPIOSElementCapabilities::setObjectPath(const CMPIObjectPath* objectPath) {

@@ -26,7 +26,7 @@ class CMPIOSElementCapabilities {
     /// the one that the far end is named by.
     CMPIOSElementCapabilities(const CMPIBroker* _broker, const CMPIContext* _context,
                               const CMPIObjectPath* objectPath);
-    ~CMPIOSElementCapabilities();
+    ~CMPIOSElementCapabilities() noexcept(false);
     CMPIOSElementCapabilities(const CMPIOSElementCapabilities&) = delete;
     CMPIOSElementCapabilities& operator=(const CMPIOSElementCapabilities&) = delete;
 

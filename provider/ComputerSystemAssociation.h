@@ -36,7 +36,7 @@ class ComputerSystemAssociation {
     /// path of the association are not read: every pair is walked.
     ComputerSystemAssociation(const CMPIBroker* _broker, const CMPIContext* _context,
                               const CMPIObjectPath* objectPath);
-    ~ComputerSystemAssociation();
+    ~ComputerSystemAssociation() noexcept(false);
     ComputerSystemAssociation(const ComputerSystemAssociation&) = delete;
     ComputerSystemAssociation& operator=(const ComputerSystemAssociation&) = delete;
 

@@ -43,8 +43,8 @@ ComputerSystemAssociation<Design>::ComputerSystemAssociation(const CMPIBroker* _
 }
 
 template <class Design>
-ComputerSystemAssociation<Design>::~ComputerSystemAssociation() {
-    Design::records().method(Caller::named(Design::destructor));
+ComputerSystemAssociation<Design>::~ComputerSystemAssociation() noexcept(false) {
+    Design::records().destructor(Caller::named(Design::destructor));
 }
 
 template <class Design>

@@ -38,7 +38,8 @@ class ElementAdapter {
     /// Stands on the first element of all.
     ElementAdapter(const CMPIBroker* _broker, const CMPIContext* _context, std::string _nameSpace);
 
-    ~ElementAdapter();
+    /// Throws what writing its record throws, unless it runs because of an exception.
+    ~ElementAdapter() noexcept(false);
     ElementAdapter(const ElementAdapter&) = delete;
     ElementAdapter& operator=(const ElementAdapter&) = delete;
 

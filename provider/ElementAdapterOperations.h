@@ -32,8 +32,8 @@ ElementAdapter<Design>::ElementAdapter(const CMPIBroker* _broker, const CMPICont
 }
 
 template <class Design>
-ElementAdapter<Design>::~ElementAdapter() {
-    Design::records().method(Caller::named(Design::destructor));
+ElementAdapter<Design>::~ElementAdapter() noexcept(false) {
+    Design::records().destructor(Caller::named(Design::destructor));
 }
 
 template <class Design>

@@ -58,7 +58,7 @@ static CMPIStatus serve(const DispatchRow (&dispatch)[rowCount], ClassSource cla
                           handler.line);
     const unsigned short classId = VA::ProviderUtilities::getClassId(classSource);
     CMPIStatus status = {CMPI_RC_OK, nullptr};
-    records.variable("classId", classId, handler);
+    records.variable("classId", classId, Caller::named(handler.function));
     const DispatchRow* row =
         std::find_if(dispatch, dispatch + rowCount,
                      [classId](const DispatchRow& each) { return each.classId == classId; });
@@ -68,10 +68,11 @@ static CMPIStatus serve(const DispatchRow (&dispatch)[rowCount], ClassSource cla
         try {
             row->walk(request);
         } catch (const std::exception& caught) {
-            records.message(caught, handler);
+            records.message(caught, Caller::named(handler.function));
         }
     }
-    VA::markProviderExit(loggerOperatingSystemProvider, sourceFile, handler.function, handler.line);
+    const Caller end = Caller::named(handler.function);
+    VA::markProviderExit(loggerOperatingSystemProvider, sourceFile, end.function, end.line);
     return status;
 }
 
@@ -161,7 +162,7 @@ static CMPIStatus OperatingSystem_ReferenceNames(CMPIAssociationMI*, const CMPIC
     return refuse();
 }
 
-static CMPIInstanceMIFT instMIFT__ = {
+static const CMPIInstanceMIFT instMIFT__ = {
     CMPIVersion200,
     CMPIVersion200,
     "instanceOperatingSystemProvider",
@@ -175,7 +176,7 @@ static CMPIInstanceMIFT instMIFT__ = {
     OperatingSystem_ExecQuery,
 };
 
-static CMPIAssociationMIFT assocMIFT__ = {
+static const CMPIAssociationMIFT assocMIFT__ = {
     CMPIVersion200,
     CMPIVersion200,
     "associationOperatingSystemProvider",
@@ -191,18 +192,21 @@ static CMPIAssociationMIFT assocMIFT__ = {
 extern "C" {
 
 // Each factory stores the broker, whichever is called later, and returns its one record. The status
-// is never written.
+// is never written. Records point to their tables as if these could be written; object managers
+// only read them, and they lie in memory that is read-only after loading.
 
 [[gnu::visibility("default")]] CMPIInstanceMI* OperatingSystemProvider_Create_InstanceMI(
     const CMPIBroker* broker, const CMPIContext*, CMPIStatus*) {
-    static CMPIInstanceMI mi = {nullptr, &VA::OSStatusProvider::instMIFT__};
+    static CMPIInstanceMI mi = {nullptr,
+                                const_cast<CMPIInstanceMIFT*>(&VA::OSStatusProvider::instMIFT__)};
     VA::OSStatusProvider::broker = broker;
     return &mi;
 }
 
 [[gnu::visibility("default")]] CMPIAssociationMI* OperatingSystemProvider_Create_AssociationMI(
     const CMPIBroker* broker, const CMPIContext*, CMPIStatus*) {
-    static CMPIAssociationMI mi = {nullptr, &VA::OSStatusProvider::assocMIFT__};
+    static CMPIAssociationMI mi = {
+        nullptr, const_cast<CMPIAssociationMIFT*>(&VA::OSStatusProvider::assocMIFT__)};
     VA::OSStatusProvider::broker = broker;
     return &mi;
 }

@@ -37,6 +37,16 @@ class UnitLog {
     void exiting(Caller caller = Caller::here()) const { plain(Exiting, caller); }
     void method(Caller caller = Caller::here()) const { plain(Method, caller); }
 
+    /// The method record of a destructor. It may throw as any record may, but not while another
+    /// exception is under way: then the record is given up, so that the first one gets through.
+    void destructor(Caller caller = Caller::here()) const {
+        if (std::uncaught_exceptions() == 0) return method(caller);
+        try {
+            method(caller);
+        } catch (...) {
+        }
+    }
+
     /// The same with a parameter list, as parameterList gives it.
     void entering(const std::string& parameters, Caller caller = Caller::here()) const {
         withParameters(Entering, parameters, caller);

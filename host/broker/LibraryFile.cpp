@@ -1,14 +1,19 @@
 #include "host/broker/LibraryFile.h"
 
-#include <elf.h>
+#include <link.h>
 
 #include <cerrno>
+#include <cstdint>
 #include <cstring>
+#include <filesystem>
 #include <fstream>
+#include <system_error>
 
 namespace cmpihost {
 
 namespace {
+
+namespace fs = std::filesystem;
 
 constexpr bool is64Bit = sizeof(void*) == 8;
 constexpr int ownClass = is64Bit ? ELFCLASS64 : ELFCLASS32;
@@ -20,26 +25,69 @@ struct ElfStart {
     Elf32_Half machine;
 };
 
+/// Fills `value` from that place of the file; false when the file ends before.
+template <class Record>
+bool readAt(std::istream& stream, std::uint64_t offset, Record& value) {
+    stream.clear();
+    stream.seekg(static_cast<std::streamoff>(offset));
+    stream.read(reinterpret_cast<char*>(&value), sizeof value);
+    return stream.gcount() == sizeof value;
+}
+
+bool liesWithin(std::uint64_t offset, std::uint64_t size, std::uint64_t fileSize) {
+    return size <= fileSize && offset <= fileSize - size;
+}
+
+/// Whether the file has every byte that the loader maps. Touching one that it lacks ends a process.
+bool isWhole(std::istream& stream, std::uint64_t fileSize) {
+    ElfW(Ehdr) header{};
+    if (!readAt(stream, 0, header)) return false;
+    for (std::uint64_t index = 0; index < header.e_phnum; ++index) {
+        ElfW(Phdr) segment{};
+        const std::uint64_t offset = header.e_phoff + index * sizeof segment;
+        if (!liesWithin(offset, sizeof segment, fileSize) || !readAt(stream, offset, segment)) {
+            return false;
+        }
+        if (segment.p_type == PT_LOAD &&
+            !liesWithin(segment.p_offset, segment.p_filesz, fileSize)) {
+            return false;
+        }
+    }
+    return true;
+}
+
+FileProblem notALibrary(const std::string& file, const std::string& why) {
+    return {LoadProblem::NotALibrary, file + ": " + why};
+}
+
 }  // namespace
 
 std::optional<FileProblem> examineLibraryFile(const std::string& file) {
     // A name without folder is searched by the loader.
     if (file.find('/') == std::string::npos) return std::nullopt;
 
+    // Opening a named pipe would wait for its other end.
+    std::error_code error;
+    const fs::file_status status = fs::status(file, error);
+    if (fs::exists(status) && !fs::is_regular_file(status)) {
+        return notALibrary(file, "not a regular file");
+    }
     std::ifstream stream(file, std::ios::binary);
     if (!stream) {
-        return FileProblem{LoadProblem::FileMissing, file + ": " + std::strerror(errno)};
+        const std::error_code reason(errno, std::generic_category());
+        return FileProblem{LoadProblem::FileMissing, file + ": " + reason.message()};
     }
     ElfStart start{};
-    stream.read(reinterpret_cast<char*>(&start), sizeof start);
-    const bool isElf = stream.gcount() == sizeof start &&
-                       std::memcmp(start.ident, ELFMAG, SELFMAG) == 0 && start.type == ET_DYN;
-    if (!isElf) return FileProblem{LoadProblem::NotALibrary, file + ": not a shared library"};
+    const bool isElf = readAt(stream, 0, start) && std::memcmp(start.ident, ELFMAG, SELFMAG) == 0 &&
+                       start.type == ET_DYN;
+    if (!isElf) return notALibrary(file, "not a shared library");
     if (start.ident[EI_CLASS] != ownClass) {
-        return FileProblem{LoadProblem::NotALibrary, file + ": a " + (is64Bit ? "32" : "64") +
-                                                         "-bit library, this host is " +
-                                                         (is64Bit ? "64" : "32") + "-bit"};
+        return notALibrary(file, std::string("a ") + (is64Bit ? "32" : "64") +
+                                     "-bit library, this host is " + (is64Bit ? "64" : "32") +
+                                     "-bit");
     }
+    const std::uintmax_t size = fs::file_size(file, error);
+    if (error || !isWhole(stream, size)) return notALibrary(file, "the file is cut off");
     return std::nullopt;
 }
 

@@ -28,8 +28,9 @@ LibraryHandle open(const std::string& file, bool global) {
         // The loader starts with the file's own name where the file itself is at fault.
         const std::string text = loaderText();
         const bool absent = text.rfind(file + ": cannot open shared object file", 0) == 0;
+        const bool named = text.rfind(file + ": ", 0) == 0;
         throw LoadError(absent ? LoadProblem::FileMissing : LoadProblem::Unresolved,
-                        absent ? text : file + ": " + text);
+                        named ? text : file + ": " + text);
     }
     return handle;
 }

@@ -13,8 +13,8 @@ OSElementCapabilities::OSElementCapabilities() {
     records.method();
 }
 
-OSElementCapabilities::~OSElementCapabilities() {
-    records.method();
+OSElementCapabilities::~OSElementCapabilities() noexcept(false) {
+    records.destructor();
 }
 
 VA::Moniker OSElementCapabilities::getOperatingSystemMoniker(VA::Moniker& monikerCapabilities) {

@@ -10,7 +10,7 @@ namespace VA::OSStatusProvider {
 class OSElementCapabilities {
   public:
     OSElementCapabilities();
-    ~OSElementCapabilities();
+    ~OSElementCapabilities() noexcept(false);
 
     /// The far end's identity, with one key. The input is only read; its selected key changes.
     /// Throws VA::FrameworkException when it lacks the key.

@@ -64,7 +64,25 @@ TEST(CommandLine, GathersThePropertyList) {
     EXPECT_THAT(*accepted({"gi", "X", "--properties", "A,B"}).properties, ElementsAre("A", "B"));
     EXPECT_THAT(*accepted({"ai", "X", "A", "--properties", "B"}).properties, ElementsAre("A", "B"));
     EXPECT_THAT(*accepted({"ri", "X", "--properties", ""}).properties, IsEmpty());
+    EXPECT_THAT(*accepted({"ei", "X", "A , B", " ,C\t"}).properties, ElementsAre("A", "B", "C"));
+    EXPECT_THAT(*accepted({"ri", "X", "--properties", " A, ,B "}).properties,
+                ElementsAre("A", "B"));
     EXPECT_THAT(*accepted({"ei", "X", "gi"}).properties, ElementsAre("gi"));
+}
+
+TEST(CommandLine, RefusesAnotherFormOfThePicture) {
+    for (const char* format : {"json", "mof"}) {
+        for (const auto& words : std::vector<std::vector<const char*>>{
+                 {"--format", format, "tree"}, {"tree", "--format", format}}) {
+            const ParsedCommandLine result = parsed(words);
+            EXPECT_FALSE(result.commandLine.has_value());
+            EXPECT_EQ(result.status, exitUsage);
+            EXPECT_EQ(result.text,
+                      "--format: tree draws a picture, it has no other form\n"
+                      "Run cmpihost --help for more information.\n");
+        }
+    }
+    EXPECT_TRUE(accepted({"--format", "table", "tree"}).tree);
 }
 
 TEST(CommandLine, TakesTheFiltersOfAssociations) {

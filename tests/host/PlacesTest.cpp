@@ -49,7 +49,22 @@ TEST_F(Places, DoNotTakeAFolderForALibrary) {
 }
 
 TEST_F(Places, KnowTheFolderOfTheRunningProgram) {
-    EXPECT_EQ(programFolder(), fs::path(KORVA_BINARY_DIR) / "bin");
+    EXPECT_EQ(programFolder("elsewhere"), fs::path(KORVA_BINARY_DIR) / "bin");
+}
+
+TEST_F(Places, TakeTheFolderOfTheCalledNameWhereTheSystemTellsNone) {
+    const fs::path missing = prefix_ / "exe";
+    touch("bin/program");
+    fs::create_symlink(prefix_ / "bin/program", prefix_ / "called");
+    EXPECT_EQ(programFolder((prefix_ / "bin/program").string(), missing), prefix_ / "bin");
+    EXPECT_EQ(programFolder((prefix_ / "called").string(), missing), prefix_ / "bin");
+}
+
+TEST_F(Places, TakeTheInstallationFolderWhereNothingTellsAnother) {
+    const fs::path missing = prefix_ / "exe";
+    EXPECT_EQ(programFolder("cmpihost", missing), KORVA_PROGRAM_FOLDER);
+    EXPECT_EQ(programFolder("", missing), KORVA_PROGRAM_FOLDER);
+    EXPECT_EQ(programFolder("/nowhere/cmpihost", missing), KORVA_PROGRAM_FOLDER);
 }
 
 }  // namespace

@@ -2,14 +2,10 @@
 #include <gmock/gmock.h>
 #include <sys/utsname.h>
 
-#include <filesystem>
-#include <fstream>
-
 #include "host/ProgramRun.h"
 
 namespace {
 
-namespace fs = std::filesystem;
 using testing::HasSubstr;
 using testing::StartsWith;
 
@@ -196,89 +192,20 @@ TEST(Program, SaysThatResultsCannotBeWritten) {
     EXPECT_EQ(run.err, "the results cannot be written\n");
 }
 
-class LibraryFile : public testing::Test {
-  protected:
-    void SetUp() override {
-        std::string name = (fs::temp_directory_path() / "libraryXXXXXX").string();
-        ASSERT_NE(mkdtemp(name.data()), nullptr);
-        folder_ = name;
+TEST(Program, SaysThatHelpAndVersionCannotBeWritten) {
+    for (const char* redirection : {"--help > /dev/full", "--version > /dev/full", "--help >&-"}) {
+        const ProgramRun run = runProgram(
+            "/bin/sh", {"-c", std::string("exec \"$0\" ") + redirection, KORVA_CMPIHOST});
+        EXPECT_EQ(run.status, 1) << redirection;
+        EXPECT_EQ(run.err, "the text cannot be written\n") << redirection;
     }
-    void TearDown() override { fs::remove_all(folder_); }
-    std::string file(const std::string& content) {
-        std::ofstream(folder_ / "x.so", std::ios::binary) << content;
-        return (folder_ / "x.so").string();
-    }
-    static ProgramRun load(const std::string& library) {
-        return cmpihost({"--provider", library, "ei", "X"});
-    }
-
-    fs::path folder_;
-};
-
-TEST_F(LibraryFile, ThatIsMissingExitsWithThree) {
-    const ProgramRun run = load((folder_ / "missing.so").string());
-    EXPECT_EQ(run.status, 3);
-    EXPECT_THAT(run.err, HasSubstr("missing.so: No such file or directory"));
 }
 
-TEST_F(LibraryFile, ThatIsNoLibraryExitsWithThree) {
-    const ProgramRun run = load(file("hello"));
-    EXPECT_EQ(run.status, 3);
-    EXPECT_THAT(run.err, HasSubstr("x.so: not a shared library"));
-}
-
-TEST_F(LibraryFile, OfTheOtherWordSizeExitsWithThreeAndSaysSo) {
-    std::string header(
-        "\x7f"
-        "ELF");
-    header += sizeof(void*) == 8 ? '\1' : '\2';
-    header += "\1\1";
-    header.resize(16);
-    header += std::string("\3\0\3\0", 4);
-    header.resize(64);
-    const ProgramRun run = load(file(header));
-    EXPECT_EQ(run.status, 3);
-    EXPECT_THAT(run.err, HasSubstr(sizeof(void*) == 8 ? "a 32-bit library, this host is 64-bit"
-                                                      : "a 64-bit library, this host is 32-bit"));
-}
-
-TEST_F(LibraryFile, WithoutFactoryExitsWithThree) {
-    const ProgramRun run = load(KORVA_FACTORYLESS);
-    EXPECT_EQ(run.status, 3);
-    EXPECT_THAT(run.err, HasSubstr("OperatingSystemProvider_Create_InstanceMI"));
-}
-
-TEST_F(LibraryFile, WithoutFolderIsTakenFromTheCurrentOne) {
-    fs::copy_file(KORVA_STAND_IN, folder_ / "standin.so");
-    const ProgramRun run =
-        runProgram("/usr/bin/env", {"-C", folder_.string(), KORVA_CMPIHOST, "--provider",
-                                    "standin.so", "ein", "KORVA_OperatingSystem"});
-    EXPECT_EQ(run.status, 0) << run.err;
-    EXPECT_EQ(run.out, std::string(moonPath) + "\n");
-}
-
-TEST_F(LibraryFile, ThatIsNowhereAroundTheProgramExitsWithThreeAndTellsThePlaces) {
-    fs::create_directories(folder_ / "bin");
-    fs::copy_file(KORVA_CMPIHOST, folder_ / "bin/cmpihost");
-    fs::create_directories(folder_ / "share/korva-osstatus");
-    fs::copy(KORVA_SOURCE_DIR "/schema", folder_ / "share/korva-osstatus/schema");
-    const ProgramRun run = runProgram((folder_ / "bin/cmpihost").string(), {"ei", "X"});
-    EXPECT_EQ(run.status, 3);
-    EXPECT_THAT(run.err, StartsWith("no provider library was found; looked for\n"));
-    EXPECT_THAT(run.err,
-                HasSubstr((folder_ / "lib/libkorzbosstatusprofileprovider.so.1").string()));
-}
-
-TEST_F(LibraryFile, BesideTheProgramIsTakenWithoutBeingNamed) {
-    fs::create_directories(folder_ / "bin");
-    fs::create_directories(folder_ / "lib");
-    fs::copy_file(KORVA_CMPIHOST, folder_ / "bin/cmpihost");
-    fs::copy_file(KORVA_STAND_IN, folder_ / "lib/libkorzbosstatusprofileprovider.so.1");
-    const ProgramRun run =
-        runProgram((folder_ / "bin/cmpihost").string(),
-                   {"--schema", KORVA_SOURCE_DIR "/schema", "ein", "KORVA_OperatingSystem"});
-    EXPECT_EQ(run.status, 0) << run.err;
-    EXPECT_EQ(run.out, std::string(moonPath) + "\n");
+TEST(Program, NotesListedNamesThatTheClassDoesNotDeclare) {
+    const ProgramRun run = withStandIn({"ei", "KORVA_OperatingSystem", "Versoin, Version"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_THAT(run.out, HasSubstr("\n  Version  "));
+    EXPECT_EQ(run.err, "note: the class KORVA_OperatingSystem declares no property 'Versoin'\n");
 }
 
 }  // namespace

@@ -83,6 +83,20 @@ TEST(ProgramWithProvider, NamesTheStatusOfARefusal) {
     EXPECT_EQ(unknown.err, "CIM_ERR_INVALID_CLASS (5)\n");
 }
 
+TEST(ProgramWithProvider, TellsHowToNameTheAssociation) {
+    for (const char* operation : {"ai", "ain"}) {
+        const ProgramRun run = cmpihost({operation, "KORVA_OperatingSystem"});
+        EXPECT_EQ(run.status, 1);
+        EXPECT_EQ(run.err,
+                  "CIM_ERR_INVALID_CLASS (5)\n"
+                  "hint: name the association with --assoc-class, one of KORVA_InstalledOS, "
+                  "KORVA_OSElementCapabilities, KORVA_RunningOS\n");
+    }
+    const ProgramRun named =
+        cmpihost({"ain", "KORVA_OperatingSystem", "--assoc-class", "CIM_RunningOS"});
+    EXPECT_EQ(named.err, "CIM_ERR_INVALID_CLASS (5)\n");
+}
+
 TEST(ProgramWithProvider, ShowsTheRecordsOnlyWhenAskedTo) {
     EXPECT_EQ(cmpihost({"ei", "KORVA_OperatingSystem"}).err, "");
     const ProgramRun run = cmpihost({"--log", "ei", "KORVA_OperatingSystem"});

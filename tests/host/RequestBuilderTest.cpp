@@ -134,15 +134,26 @@ TEST_F(RequestBuilder, RefusesValuesThatDoNotFit) {
     EXPECT_EQ(refusal("Thing", {"Level={1}"}),
               "'{1}' is a list, no single value, for the property 'Level'");
     EXPECT_EQ(refusal("Thing", {"On=maybe"}),
-              "the value of 'On':1:1: expected a value (a string, a number, a character, TRUE, "
+              "the value of 'On': expected a value (a string, a number, a character, TRUE, "
               "FALSE or NULL), found 'maybe'");
     EXPECT_EQ(refusal("Thing", {"Size=1 2"}),
-              "the value of 'Size':1:3: expected nothing after the value, found '2'");
+              "the value of 'Size': expected nothing after the value, found '2'");
     EXPECT_EQ(refusal("Thing", {"Weight=1"}), "the class 'Thing' has no property 'Weight'");
     EXPECT_EQ(refusal("Thing", {"On=TRUE", "on=FALSE"}), "the property 'On' stands twice");
     EXPECT_EQ(refusal("Thing", {"On"}), "expected NAME=VALUE, found 'On'");
     EXPECT_EQ(refusal("Thing", {"=1"}), "expected NAME=VALUE, found '=1'");
     EXPECT_EQ(refusal("Stranger", {"A\x1b=1", "a\x1b=2"}), "the property 'a\\x1b' stands twice");
+}
+
+TEST_F(RequestBuilder, TakesDatetimesOnly) {
+    EXPECT_EQ(assigned("When=00000012030405.000000:000"),
+              Value::fromText("00000012030405.000000:000", CMPI_dateTime));
+    EXPECT_EQ(assigned("When=null"), Value::null(CMPI_dateTime));
+    for (const char* wrong : {"yesterday", "", "20241302030405.000000+000", "{1}", "2024-01-02"}) {
+        EXPECT_EQ(
+            refusal("Thing", {std::string("When=") + wrong}),
+            "'" + std::string(wrong) + "' is no value of type datetime for the property 'When'");
+    }
 }
 
 TEST_F(RequestBuilder, FindsTheClassOfAQuery) {

@@ -168,7 +168,7 @@ void checkUsers(const Reading& actual) {
     if (::access("/run/systemd/sessions", R_OK | X_OK) == 0) {
         expectNear(actual,
                    shellNumber("cd /run/systemd/sessions; for s in *; do "
-                               "if [ -f \"$s\" ] && grep -qx CLASS=user \"$s\" && "
+                               "if [ -f \"$s\" ] && grep -qxE 'CLASS=user(-early)?' \"$s\" && "
                                "! grep -qx STATE=closing \"$s\"; then echo x; fi; done | wc -l"),
                    0.0);
     } else if (::access("/run/utmp", R_OK) == 0 || ::access("/var/run/utmp", R_OK) == 0) {

@@ -1,3 +1,5 @@
+#include <stdexcept>
+
 #include "library/LibraryFixture.h"
 
 #include "ProviderUtilities.h"
@@ -8,6 +10,7 @@
 namespace {
 
 unsigned short answered = 0;
+bool throwing = false;
 
 using namespace cmpihost;
 
@@ -68,6 +71,14 @@ TEST_F(ClassIds, AssociationRequestsRejectEveryIdFrom0To70ButTheThreeServed) {
     }
 }
 
+TEST_F(ClassIds, ExceptionFromTheFrameworkLeavesTheHandler) {
+    throwing = true;
+    EXPECT_THROW(enumerateNames("KORVA_OperatingSystem"), std::runtime_error);
+    EXPECT_THROW(associators(capabilitiesPath("Linux"), "KORVA_OSElementCapabilities"),
+                 std::runtime_error);
+    throwing = false;
+}
+
 TEST_F(ClassIds, LargestIdIsRecordedUncut) {
     answered = 65535;
     enumerateNames("KORVA_OperatingSystem");
@@ -79,11 +90,12 @@ TEST_F(ClassIds, LargestIdIsRecordedUncut) {
 namespace VA {
 
 unsigned short ProviderUtilities::getClassId(const CMPIObjectPath*) {
+    if (throwing) throw std::runtime_error("from the framework");
     return answered;
 }
 
 unsigned short ProviderUtilities::getClassId(const char*) {
-    return answered;
+    return getClassId(static_cast<const CMPIObjectPath*>(nullptr));
 }
 
 }  // namespace VA

@@ -17,7 +17,8 @@ struct Sequence {
     OperationRequest request;
     std::vector<std::string> nodes = {"Linux"};
     std::vector<std::string> computerSystems = {"host1"};
-    bool throwing = false;  ///< the instrumentation throws when a text is read
+    bool throwing = false;                     ///< the instrumentation throws when a text is read
+    std::vector<std::string> violations = {};  ///< what the strict broker notes
 };
 
 std::ostream& operator<<(std::ostream& out, const Sequence& sequence) {
@@ -94,7 +95,10 @@ std::vector<Sequence> sequences() {
                    {"a", "b"}});
     all.push_back({"EnumInstanceNamesOfTwoPairsWithCapabilities",
                    operation(names, path(element)),
-                   {"a", "b"}});
+                   {"a", "b"},
+                   {"host1"},
+                   false,
+                   {"path of KORVA_OperatingSystemCapabilities without key InstanceID"}});
     all.push_back({"EnumInstanceNamesOfTwoPairsOfThree",
                    operation(names, path("KORVA_InstalledOS")),
                    {"a", "b"},
@@ -132,7 +136,7 @@ TEST_P(Records, AreWrittenInThisSequence) {
     recording::clear();
     invoke(sequence.request);
     const std::string actual = recording::takeRendered();
-    broker.takeViolations();
+    EXPECT_EQ(broker.takeViolations(), sequence.violations);
 
     std::ifstream file(std::string(KORVA_TEST_DATA "/records/") + sequence.name + ".txt");
     std::ostringstream expected;

@@ -87,6 +87,19 @@ NamesAMissingFileAndTheWayOut() {
     expect_text "install the package again, or name the tree that holds it with --prefix" "$output"
 }
 
+NamesAMissingPartOfItself() {
+    with_sfcb
+    rm "$tree/share/korva-osstatus/register/sfcb.sh"
+    register register
+    expect_code 1
+    expect_calls ""
+    expect_text "cannot read $tree/share/korva-osstatus/register/sfcb.sh, a part of this command" "$output"
+    expect_text "install the package again" "$output"
+    register --package register
+    expect_code 0
+    expect_text "cannot read $tree/share/korva-osstatus/register/sfcb.sh" "$output"
+}
+
 TakesClassesFromTheNamedFolder() {
     with_sfcb
     mv "$tree/share/korva-osstatus/schema" "$work/classes"

@@ -8,8 +8,8 @@
 
 namespace VA::Linux {
 
-/// True for a session file of systemd that describes a session of a user (CLASS=user), be it active
-/// or not, that is not being closed (STATE=closing): its user has left.
+/// True for a session file of systemd that describes a session of a user (CLASS=user, or
+/// user-early), be it active or not, that is not being closed (STATE=closing): its user has left.
 bool isUserSession(std::string_view sessionFile);
 
 /// The number of user sessions in a utmp file: its USER_PROCESS records whose process passes

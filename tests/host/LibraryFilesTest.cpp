@@ -1,0 +1,158 @@
+// The built program with library files of all kinds, good and bad.
+#include <gmock/gmock.h>
+#include <link.h>
+#include <sys/stat.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <fstream>
+
+#include "host/ProgramRun.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+using testing::HasSubstr;
+using testing::StartsWith;
+
+constexpr const char* moonName = "CSName=\"moon\"";
+
+/// The length of that part of a library's file that the loader maps.
+std::uintmax_t mappedSize(const fs::path& library) {
+    std::ifstream stream(library, std::ios::binary);
+    ElfW(Ehdr) header{};
+    stream.read(reinterpret_cast<char*>(&header), sizeof header);
+    stream.seekg(static_cast<std::streamoff>(header.e_phoff));
+    std::uintmax_t size = 0;
+    for (unsigned index = 0; index < header.e_phnum; ++index) {
+        ElfW(Phdr) segment{};
+        stream.read(reinterpret_cast<char*>(&segment), sizeof segment);
+        if (segment.p_type == PT_LOAD) {
+            size = std::max<std::uintmax_t>(size, segment.p_offset + segment.p_filesz);
+        }
+    }
+    return size;
+}
+
+class LibraryFile : public testing::Test {
+  protected:
+    void SetUp() override {
+        std::string name = (fs::temp_directory_path() / "libraryXXXXXX").string();
+        ASSERT_NE(mkdtemp(name.data()), nullptr);
+        folder_ = name;
+    }
+    void TearDown() override { fs::remove_all(folder_); }
+    std::string file(const std::string& content) {
+        std::ofstream(folder_ / "x.so", std::ios::binary) << content;
+        return (folder_ / "x.so").string();
+    }
+    static ProgramRun load(const std::string& library) {
+        return runProgram(KORVA_CMPIHOST, {"--provider", library, "ei", "X"});
+    }
+
+    fs::path folder_;
+};
+
+TEST_F(LibraryFile, ThatIsMissingExitsWithThree) {
+    const ProgramRun run = load((folder_ / "missing.so").string());
+    EXPECT_EQ(run.status, 3);
+    EXPECT_THAT(run.err, HasSubstr("missing.so: No such file or directory"));
+}
+
+TEST_F(LibraryFile, ThatIsNoLibraryExitsWithThree) {
+    const ProgramRun run = load(file("hello"));
+    EXPECT_EQ(run.status, 3);
+    EXPECT_THAT(run.err, HasSubstr("x.so: not a shared library"));
+}
+
+TEST_F(LibraryFile, ThatIsANamedPipeExitsWithThree) {
+    const std::string pipe = (folder_ / "pipe\x1b[31m").string();
+    ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0);
+    const std::string complaint = (folder_ / "pipe\\x1b[31m: not a regular file\n").string();
+    EXPECT_EQ(load(pipe).status, 3);
+    EXPECT_EQ(load(pipe).err, complaint);
+    const ProgramRun companion =
+        runProgram(KORVA_CMPIHOST, {"--provider", KORVA_STAND_IN, "--companion", pipe, "ei", "X"});
+    EXPECT_EQ(companion.status, 3);
+    EXPECT_EQ(companion.err, complaint);
+}
+
+TEST_F(LibraryFile, ThatIsCutOffExitsWithThree) {
+    const fs::path cut = folder_ / "cut.so";
+    fs::copy_file(KORVA_STAND_IN, cut);
+    const std::uintmax_t needed = mappedSize(cut);
+    fs::resize_file(cut, needed);
+    EXPECT_EQ(load(cut.string()).status, 0);
+    for (const std::uintmax_t size :
+         {needed - 1, needed / 2, std::uintmax_t{100}, std::uintmax_t{30}}) {
+        fs::resize_file(cut, size);
+        const ProgramRun run = load(cut.string());
+        EXPECT_EQ(run.status, 3) << size;
+        EXPECT_EQ(run.err, cut.string() + ": the file is cut off\n") << size;
+    }
+}
+
+TEST_F(LibraryFile, NamedLikeASchemaFileButAPipeExitsWithTwo) {
+    ASSERT_EQ(mkfifo((folder_ / "x.mof").c_str(), 0600), 0);
+    const ProgramRun run = runProgram(
+        KORVA_CMPIHOST, {"--provider", KORVA_STAND_IN, "--schema", folder_.string(), "ei", "X"});
+    EXPECT_EQ(run.status, 2);
+    EXPECT_EQ(run.err,
+              "the schema file " + (folder_ / "x.mof").string() + " is not a regular file\n");
+}
+
+TEST_F(LibraryFile, OfTheOtherWordSizeExitsWithThreeAndSaysSo) {
+    std::string header(
+        "\x7f"
+        "ELF");
+    header += sizeof(void*) == 8 ? '\1' : '\2';
+    header += "\1\1";
+    header.resize(16);
+    header += std::string("\3\0\3\0", 4);
+    header.resize(64);
+    const ProgramRun run = load(file(header));
+    EXPECT_EQ(run.status, 3);
+    EXPECT_THAT(run.err, HasSubstr(sizeof(void*) == 8 ? "a 32-bit library, this host is 64-bit"
+                                                      : "a 64-bit library, this host is 32-bit"));
+}
+
+TEST_F(LibraryFile, WithoutFactoryExitsWithThree) {
+    const ProgramRun run = load(KORVA_FACTORYLESS);
+    EXPECT_EQ(run.status, 3);
+    EXPECT_THAT(run.err, HasSubstr("OperatingSystemProvider_Create_InstanceMI"));
+}
+
+TEST_F(LibraryFile, WithoutFolderIsTakenFromTheCurrentOne) {
+    fs::copy_file(KORVA_STAND_IN, folder_ / "standin.so");
+    const ProgramRun run =
+        runProgram("/usr/bin/env", {"-C", folder_.string(), KORVA_CMPIHOST, "--provider",
+                                    "standin.so", "ein", "KORVA_OperatingSystem"});
+    EXPECT_EQ(run.status, 0) << run.err;
+    EXPECT_THAT(run.out, HasSubstr(moonName));
+}
+
+TEST_F(LibraryFile, ThatIsNowhereAroundTheProgramExitsWithThreeAndTellsThePlaces) {
+    fs::create_directories(folder_ / "bin");
+    fs::copy_file(KORVA_CMPIHOST, folder_ / "bin/cmpihost");
+    fs::create_directories(folder_ / "share/korva-osstatus");
+    fs::copy(KORVA_SOURCE_DIR "/schema", folder_ / "share/korva-osstatus/schema");
+    const ProgramRun run = runProgram((folder_ / "bin/cmpihost").string(), {"ei", "X"});
+    EXPECT_EQ(run.status, 3);
+    EXPECT_THAT(run.err, StartsWith("no provider library was found; looked for\n"));
+    EXPECT_THAT(run.err,
+                HasSubstr((folder_ / "lib/libkorzbosstatusprofileprovider.so.1").string()));
+}
+
+TEST_F(LibraryFile, BesideTheProgramIsTakenWithoutBeingNamed) {
+    fs::create_directories(folder_ / "bin");
+    fs::create_directories(folder_ / "lib");
+    fs::copy_file(KORVA_CMPIHOST, folder_ / "bin/cmpihost");
+    fs::copy_file(KORVA_STAND_IN, folder_ / "lib/libkorzbosstatusprofileprovider.so.1");
+    const ProgramRun run =
+        runProgram((folder_ / "bin/cmpihost").string(),
+                   {"--schema", KORVA_SOURCE_DIR "/schema", "ein", "KORVA_OperatingSystem"});
+    EXPECT_EQ(run.status, 0) << run.err;
+    EXPECT_THAT(run.out, HasSubstr(moonName));
+}
+
+}  // namespace

@@ -1,0 +1,78 @@
+#include "host/Notes.h"
+
+#include <gtest/gtest.h>
+
+#include "host/MofParser.h"
+
+namespace {
+
+using namespace cmpihost;
+
+class Notes : public testing::Test {
+  protected:
+    void SetUp() override {
+        schema_.add(
+            mof::parse("class Thing { [Key] string Name; boolean On; };"
+                       "class Part : Thing { uint16 Weight; };"
+                       "[Association] class Link { [Key] Thing REF One; };",
+                       "x.mof"));
+    }
+    std::string notes(Operation operation, const std::vector<std::string>& list,
+                      const std::vector<std::string>& classesOfResults,
+                      const std::string& asked = "Thing") {
+        OperationRequest request;
+        request.operation = operation;
+        request.path.className = asked;
+        request.properties = list;
+        OperationResult result;
+        for (const std::string& name : classesOfResults) {
+            result.instances.push_back({{"ns", name, {}}, {}});
+        }
+        return notesOn(request, result, schema_);
+    }
+    std::string hint(Operation operation, CMPIrc rc) {
+        OperationRequest request;
+        request.operation = operation;
+        OperationResult failure;
+        failure.rc = rc;
+        return hintFor(request, failure, schema_);
+    }
+
+    Schema schema_;
+};
+
+TEST_F(Notes, NameEachListedNameThatNoClassOfTheAnswerDeclares) {
+    EXPECT_EQ(notes(Operation::EnumerateInstances, {"name", "Of\n", "Weight"}, {}),
+              "note: the class Thing declares no property 'Of\\n'\n"
+              "note: the class Thing declares no property 'Weight'\n");
+    EXPECT_EQ(notes(Operation::EnumerateInstances, {"Weight"}, {"thing", "Part"}), "");
+    EXPECT_EQ(notes(Operation::Associators, {"On", "Off"}, {"Part"}, "Other"),
+              "note: the class Part declares no property 'Off'\n");
+    EXPECT_EQ(notes(Operation::References, {"Two"}, {"Link"}),
+              "note: the class Link declares no property 'Two'\n");
+}
+
+TEST_F(Notes, AreSilentAboutNamesWhereTheClassIsNotKnown) {
+    EXPECT_EQ(notes(Operation::EnumerateInstances, {"Off"}, {}, "Stranger"), "");
+    EXPECT_EQ(notes(Operation::Associators, {"Off"}, {}), "");
+    EXPECT_EQ(notes(Operation::Associators, {"Off"}, {"Thing", "Stranger"}), "");
+    EXPECT_EQ(notes(Operation::ModifyInstance, {"Off"}, {}), "");
+}
+
+TEST_F(Notes, TellWhatAnObjectManagerMakesOfOtherThanOneInstance) {
+    EXPECT_EQ(notes(Operation::GetInstance, {}, {"Thing"}), "");
+    EXPECT_EQ(notes(Operation::GetInstance, {"Off"}, {}),
+              "note: no instance was returned; an object manager answers CIM_ERR_NOT_FOUND (6)\n"
+              "note: the class Thing declares no property 'Off'\n");
+    EXPECT_EQ(notes(Operation::GetInstance, {}, {"Thing", "Thing"}),
+              "note: 2 instances were returned; an object manager takes the first\n");
+}
+
+TEST_F(Notes, HintAtTheAssociationThatARequestDoesNotName) {
+    EXPECT_EQ(hint(Operation::AssociatorNames, CMPI_RC_ERR_INVALID_CLASS),
+              "hint: name the association with --assoc-class, one of Link\n");
+    EXPECT_EQ(hint(Operation::Associators, CMPI_RC_ERR_FAILED), "");
+    EXPECT_EQ(hint(Operation::EnumerateInstances, CMPI_RC_ERR_INVALID_CLASS), "");
+}
+
+}  // namespace

@@ -1,0 +1,182 @@
+// What the built program prints of this machine, held against the machine itself.
+#include <gmock/gmock.h>
+#include <sys/stat.h>
+#include <sys/utsname.h>
+
+#include <cctype>
+#include <ctime>
+#include <filesystem>
+#include <fstream>
+#include <nlohmann/json.hpp>
+#include <sstream>
+
+#include "host/ProgramRun.h"
+
+namespace {
+
+using nlohmann::json;
+
+json thisMachine() {
+    const ProgramRun run =
+        runProgram(KORVA_CMPIHOST, {"--format", "json", "ei", "KORVA_OperatingSystem"}, {"TZ=UTC"});
+    EXPECT_EQ(run.status, 0);
+    const json printed = json::parse(run.out);
+    EXPECT_EQ(printed.size(), 1U);
+    return printed.at(0).at("properties");
+}
+
+// NAME=value or Name: value, without quotes.
+std::string valueIn(const std::string& file, const std::string& name) {
+    std::ifstream stream(file);
+    for (std::string line; std::getline(stream, line);) {
+        if (line.rfind(name, 0) != 0 || line.size() == name.size()) continue;
+        if (line[name.size()] != '=' && line[name.size()] != ':' && line[name.size()] != ' ')
+            continue;
+        std::string value = line.substr(name.size() + 1);
+        value.erase(0, value.find_first_not_of(" \t\""));
+        value.erase(value.find_last_not_of(" \t\"") + 1);
+        return value;
+    }
+    return "";
+}
+
+long long kibibytes(const std::string& name) {
+    return std::stoll("0" + valueIn("/proc/meminfo", name));
+}
+
+std::size_t processes() {
+    std::size_t count = 0;
+    for (const auto& entry : std::filesystem::directory_iterator("/proc")) {
+        const std::string name = entry.path().filename();
+        if (name.find_first_not_of("0123456789") == std::string::npos) ++count;
+    }
+    return count;
+}
+
+// "yyyymmddhhmmss…+000" in seconds since 1970.
+std::time_t instant(const std::string& text) {
+    EXPECT_EQ(text.substr(14), ".000000+000");
+    std::tm fields{};
+    std::istringstream stream(text.substr(0, 4) + " " + text.substr(4, 2) + " " +
+                              text.substr(6, 2) + " " + text.substr(8, 2) + " " +
+                              text.substr(10, 2) + " " + text.substr(12, 2));
+    stream >> fields.tm_year >> fields.tm_mon >> fields.tm_mday >> fields.tm_hour >>
+        fields.tm_min >> fields.tm_sec;
+    fields.tm_year -= 1900;
+    fields.tm_mon -= 1;
+    return timegm(&fields);
+}
+
+TEST(ProgramValues, NameAndVersionAreThoseOfTheDistribution) {
+    utsname names{};
+    uname(&names);
+    const json machine = thisMachine();
+    EXPECT_EQ(machine.at("CSName"), names.nodename);
+    const std::string name = valueIn("/etc/os-release", "NAME");
+    const std::string version = valueIn("/etc/os-release", "VERSION_ID");
+    EXPECT_EQ(machine.at("Name"), name.empty() ? names.sysname : name);
+    if (!version.empty()) {
+        EXPECT_EQ(machine.at("Version"), version);
+    }
+    EXPECT_EQ(machine.at("OSType"), 36);
+    EXPECT_EQ(machine.at("Status"), "OK");
+    EXPECT_EQ(machine.at("Description"), "");
+    EXPECT_EQ(machine.at("Distributed"), false);
+    EXPECT_EQ(machine.at("NumberOfLicensedUsers"), 0);
+}
+
+TEST(ProgramValues, StateIsEnabledAndInServiceWhereNoSystemdRuns) {
+    struct stat folder {};
+    const bool systemd = stat("/run/systemd/system", &folder) == 0;
+    const json machine = thisMachine();
+    if (systemd) {
+        EXPECT_TRUE(machine.contains("EnabledState"));
+    } else {
+        EXPECT_EQ(machine.at("EnabledState"), 2);
+        EXPECT_EQ(machine.at("HealthState"), 5);
+        EXPECT_EQ(machine.at("OperationalStatus"), json::array({2, 11}));
+    }
+}
+
+TEST(ProgramValues, BootTimeIsTheKernels) {
+    const std::string boot = valueIn("/proc/stat", "btime");
+    ASSERT_FALSE(boot.empty());
+    EXPECT_EQ(instant(thisMachine().at("LastBootUpTime")), std::stoll(boot));
+}
+
+TEST(ProgramValues, MemoryAndSwapAreTheKernels) {
+    const json machine = thisMachine();
+    const long long total = kibibytes("MemTotal");
+    const long long swap = kibibytes("SwapTotal");
+    EXPECT_EQ(machine.at("TotalVisibleMemorySize"), total);
+    EXPECT_EQ(machine.at("TotalSwapSpaceSize"), swap);
+    EXPECT_EQ(machine.at("SizeStoredInPagingFiles"), swap);
+    EXPECT_EQ(machine.at("TotalVirtualMemorySize"), total + swap);
+    const long long available = kibibytes("MemAvailable");
+    EXPECT_NEAR(machine.at("FreePhysicalMemory").get<double>(), static_cast<double>(available),
+                static_cast<double>(total) / 4);
+    EXPECT_EQ(machine.at("FreeVirtualMemory").get<long long>() -
+                  machine.at("FreePhysicalMemory").get<long long>(),
+              machine.at("FreeSpaceInPagingFiles").get<long long>());
+}
+
+TEST(ProgramValues, ProcessesAreThoseThatProcLists) {
+    const double before = static_cast<double>(processes());
+    EXPECT_NEAR(thisMachine().at("NumberOfProcesses").get<double>(), before, before / 2 + 20);
+}
+
+// What finds the one operating system of this machine, and what does not.
+TEST(ProgramValues, GetFindsTheNodeByEitherKeyInAnyLetterCase) {
+    const json machine = thisMachine();
+    const auto inUpperCase = [&](const char* key) {
+        std::string text = machine.at(key);
+        for (char& character : text) character = static_cast<char>(std::toupper(character));
+        return text;
+    };
+    const std::string name = inUpperCase("Name");
+    const std::string computer = inUpperCase("CSName");
+    const std::string start = "KORVA_OperatingSystem.";
+    for (const std::string& keys :
+         {"CSName=\"" + computer + "\",Name=\"" + name + "\"", "Name=\"" + name + "\"",
+          "CSName=\"" + computer + "\"",
+          "CSCreationClassName=\"Wrong\",CreationClassName=\"Wrong\",Name=\"" + name + "\""}) {
+        const ProgramRun run = runProgram(KORVA_CMPIHOST, {"gi", start + keys, "Status"});
+        EXPECT_EQ(run.status, 0) << keys;
+        EXPECT_THAT(run.out, testing::HasSubstr("  Status  ")) << keys;
+    }
+    for (const std::string& keys : {"Name=\"" + name + " \"", std::string("Name=\"unknown\""),
+                                    "CSName=\"" + computer + ".\""}) {
+        const ProgramRun run = runProgram(KORVA_CMPIHOST, {"gi", start + keys});
+        EXPECT_EQ(run.status, 0) << keys;
+        EXPECT_EQ(run.out, "") << keys;
+    }
+}
+
+TEST(ProgramValues, OperationsThatTheProviderRefusesAreNamedSo) {
+    const std::string instance = "KORVA_OperatingSystem.Name=\"x\"";
+    for (const std::vector<std::string>& arguments :
+         {std::vector<std::string>{"ci", "KORVA_OperatingSystem", "Name=x"},
+          {"mi", instance, "Version=1"},
+          {"di", instance},
+          {"xq", "SELECT * FROM KORVA_OperatingSystem"},
+          {"ri", instance},
+          {"rin", instance}}) {
+        const ProgramRun run = runProgram(KORVA_CMPIHOST, arguments);
+        EXPECT_EQ(run.status, 1) << arguments[0];
+        EXPECT_THAT(run.err, testing::HasSubstr("CIM_ERR_NOT_SUPPORTED (7)")) << arguments[0];
+        EXPECT_EQ(run.out, "") << arguments[0];
+    }
+}
+
+TEST(ProgramValues, FullDiskUnderTheLogCostsNoRequest) {
+    const std::string configuration = testing::TempDir() + "full-disk.conf";
+    std::ofstream(configuration) << "log.sink = file:/dev/full\nlog.level = 4000\n"
+                                    "log.records = all\n";
+    const ProgramRun run = runProgram(KORVA_CMPIHOST, {"ein", "KORVA_OperatingSystem"},
+                                      {"ZBLOG_CONF=" + configuration});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_THAT(run.out, testing::StartsWith("root/cimv2:KORVA_OperatingSystem."));
+    std::filesystem::remove(configuration);
+}
+
+}  // namespace
