@@ -45,7 +45,6 @@ target_compile_options(korva_options INTERFACE
     -Wall -Wextra -Wpedantic -Wshadow -Wconversion
     $<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor -Woverloaded-virtual>
     $<$<BOOL:${KORVA_WERROR}>:-Werror>)
-target_include_directories(korva_options INTERFACE "${PROJECT_SOURCE_DIR}/include")
 
 # Shared libraries find their neighbours beside themselves, programs in ../lib.
 function(korva_shared_library target)
@@ -74,7 +73,7 @@ function(korva_framework_library name)
     add_library(${name}_static STATIC EXCLUDE_FROM_ALL $<TARGET_OBJECTS:${name}_objects>)
     foreach(library ${name} ${name}_static)
         add_library(korva::${library} ALIAS ${library})
-        target_include_directories(${library} PUBLIC "${PROJECT_SOURCE_DIR}/include")
+        target_include_directories(${library} PUBLIC "$<BUILD_INTERFACE:${KORVA_CONTRACT_INCLUDE_DIR}>")
         target_link_libraries(${library} PUBLIC ${ARG_LIBRARIES})
     endforeach()
     korva_shared_library(${name})
