@@ -39,6 +39,7 @@ class __attribute__((visibility("default"))) Moniker {
 
   private:
     static constexpr std::size_t none = static_cast<std::size_t>(-1);
+    static constexpr std::size_t usualCount = 4;
 
     std::vector<std::pair<std::string, std::string>> keys_;
     std::size_t selected_ = none;

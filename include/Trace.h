@@ -1,9 +1,11 @@
 #ifndef VA_TRACE_H
 #define VA_TRACE_H
 
-#include <cstdio>
+#include <cstddef>
 #include <cstring>
+#include <limits>
 #include <string>
+#include <string_view>
 
 #include "ZBLogger.h"
 #include "ZBMessageBuffer.h"
@@ -24,82 +26,122 @@ constexpr int parameterRecordLevel = 3000;  ///< records with a parameter list, 
 /// Kind of a record.
 enum MessageType : unsigned int { Entering = 0, Exiting = 1, Method = 2, Message = 3 };
 
+namespace detail {
+
+using namespace std::string_view_literals;
+
+constexpr std::size_t messageBufferSize = 512;
+
+/// Puts a record together in a message buffer: what does not fit is cut.
+class RecordText {
+  public:
+    /// Zeroes the buffer, the last character included: the text always ends.
+    explicit RecordText(char (&buffer)[messageBufferSize])
+        : next_(buffer), end_(buffer + messageBufferSize - 1) {
+        std::memset(buffer, 0, messageBufferSize);
+    }
+
+    RecordText& operator<<(const char* text) {
+        return *this << (text == nullptr ? std::string_view("(null)") : std::string_view(text));
+    }
+    /// Of constants the length is known, and copying them takes a few moves.
+    RecordText& operator<<(std::string_view text) {
+        const auto room = static_cast<std::size_t>(end_ - next_);
+        if (text.size() > room) return *this = cut(text, next_, end_);
+        std::memcpy(next_, text.data(), text.size());
+        next_ += text.size();
+        return *this;
+    }
+    RecordText& operator<<(int number) {
+        char digits[std::numeric_limits<int>::digits10 + 2];
+        char* const end = digits + sizeof digits;
+        char* begin = end;
+        const bool negative = number < 0;
+        unsigned int rest =
+            negative ? 0U - static_cast<unsigned int>(number) : static_cast<unsigned int>(number);
+        do {
+            *--begin = static_cast<char>('0' + rest % 10);
+            rest /= 10;
+        } while (rest != 0);
+        if (negative) *--begin = '-';
+        return *this << std::string_view(begin, static_cast<std::size_t>(end - begin));
+    }
+    RecordText& operator<<(unsigned int number) { return *this << static_cast<int>(number); }
+
+  private:
+    RecordText(char* next, char* end) : next_(next), end_(end) {}
+
+    // Out of line, and without an object, so that what fits is put together in registers.
+    [[gnu::noinline]] static RecordText cut(std::string_view text, char* next, char* end) {
+        std::memcpy(next, text.data(), static_cast<std::size_t>(end - next));
+        return {end, end};
+    }
+
+    char* next_;
+    char* end_;
+};
+
+/// Adds the text of a record of kind `type`; a type that is none adds nothing.
+inline RecordText describe(RecordText record, const char* file, const char* text, unsigned int line,
+                           MessageType type) {
+    switch (type) {
+        case Entering:
+            record << "ENTERING: "sv << text << "() in "sv << file << " [Line: "sv << line << "]"sv;
+            break;
+        case Exiting:
+            record << "EXITING: "sv << text << "() in "sv << file << " [Line: "sv << line << "]"sv;
+            break;
+        case Method:
+            record << "METHOD: "sv << text << "() was invoked in "sv << file << " [Line: "sv << line
+                   << "]"sv;
+            break;
+        case Message:
+            record << "MESSAGE [File: "sv << file << ", Line: "sv << line << "]: "sv << text;
+            break;
+    }
+    return record;
+}
+
+template <class Value>
+void describeVariable(RecordText record, const char* name, const char* file, unsigned int line,
+                      Value value) {
+    record << "VARIABLE: '"sv << name << "' has Value '"sv << value << "' at line "sv << line
+           << " in "sv << file;
+}
+
+}  // namespace detail
+
 /// The text of a record of kind `type`. `text` names a function, except for Message, where it is
 /// free. A type that is none gives the empty text.
 inline const char* trace(const char* file, const char* text, unsigned int line, MessageType type) {
-    static char messageBuffer[512];
-    std::memset(messageBuffer, 0, sizeof messageBuffer);
-    const int at = static_cast<int>(line);
-    switch (type) {
-        case Entering:
-            std::snprintf(messageBuffer, sizeof messageBuffer, "ENTERING: %s() in %s [Line: %d]",
-                          text, file, at);
-            break;
-        case Exiting:
-            std::snprintf(messageBuffer, sizeof messageBuffer, "EXITING: %s() in %s [Line: %d]",
-                          text, file, at);
-            break;
-        case Method:
-            std::snprintf(messageBuffer, sizeof messageBuffer,
-                          "METHOD: %s() was invoked in %s [Line: %d]", text, file, at);
-            break;
-        case Message:
-            std::snprintf(messageBuffer, sizeof messageBuffer, "MESSAGE [File: %s, Line: %d]: %s",
-                          file, at, text);
-            break;
-    }
+    static char messageBuffer[detail::messageBufferSize];
+    detail::describe(detail::RecordText(messageBuffer), file, text, line, type);
     return messageBuffer;
 }
 
 /// The text of a variable record. It names the file last.
 inline const char* trace(const char* name, const char* file, unsigned int line, const char* value) {
-    static char messageBuffer[512];
-    std::memset(messageBuffer, 0, sizeof messageBuffer);
-    std::snprintf(messageBuffer, sizeof messageBuffer,
-                  "VARIABLE: '%s' has Value '%s' at line %d in %s", name, value,
-                  static_cast<int>(line), file);
+    static char messageBuffer[detail::messageBufferSize];
+    detail::describeVariable(detail::RecordText(messageBuffer), name, file, line, value);
     return messageBuffer;
 }
 
 /// The same for a number, which is printed as a signed one.
 inline const char* trace(const char* name, const char* file, unsigned int line,
                          unsigned int value) {
-    static char messageBuffer[512];
-    std::memset(messageBuffer, 0, sizeof messageBuffer);
-    std::snprintf(messageBuffer, sizeof messageBuffer,
-                  "VARIABLE: '%s' has Value '%d' at line %d in %s", name, static_cast<int>(value),
-                  static_cast<int>(line), file);
+    static char messageBuffer[detail::messageBufferSize];
+    detail::describeVariable(detail::RecordText(messageBuffer), name, file, line, value);
     return messageBuffer;
 }
 
 /// The text of a record with a parameter list. No blank follows the comma before the list.
 inline const char* tracepara(const char* file, const char* function, unsigned int line,
                              const char* parameters, MessageType type) {
-    static char messageBuffer[512];
-    std::memset(messageBuffer, 0, sizeof messageBuffer);
-    const int at = static_cast<int>(line);
-    switch (type) {
-        case Entering:
-            std::snprintf(messageBuffer, sizeof messageBuffer,
-                          "ENTERING: %s() in %s [Line: %d],Parameters List: %s", function, file, at,
-                          parameters);
-            break;
-        case Exiting:
-            std::snprintf(messageBuffer, sizeof messageBuffer,
-                          "EXITING: %s() in %s [Line: %d],Parameters List: %s", function, file, at,
-                          parameters);
-            break;
-        case Method:
-            std::snprintf(messageBuffer, sizeof messageBuffer,
-                          "METHOD: %s() was invoked in %s [Line: %d],Parameters List: %s", function,
-                          file, at, parameters);
-            break;
-        case Message:
-            std::snprintf(messageBuffer, sizeof messageBuffer,
-                          "MESSAGE [File: %s, Line: %d]: %s,Parameters List: %s", file, at,
-                          function, parameters);
-            break;
-    }
+    static char messageBuffer[detail::messageBufferSize];
+    detail::RecordText record(messageBuffer);
+    if (type <= Message)
+        detail::describe(record, file, function, line, type)
+            << std::string_view(",Parameters List: ") << parameters;
     return messageBuffer;
 }
 

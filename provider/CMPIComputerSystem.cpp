@@ -38,7 +38,7 @@ CMPIOSComputerSystem::~CMPIOSComputerSystem() noexcept(false) {
 }
 
 void CMPIOSComputerSystem::setObjectPath(const CMPIObjectPath* objectPath) {
-    const std::string parameters = parameterList(" objectPath=", objectPath);
+    const ParameterList parameters(" objectPath=", objectPath);
     records.entering(parameters);
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     // Without a path there is nothing to ask for; a broker might not survive the question.

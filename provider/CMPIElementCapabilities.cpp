@@ -21,7 +21,7 @@ CMPIOSElementCapabilities::CMPIOSElementCapabilities(const CMPIBroker* _broker,
       nameSpace(Utilities::getNamespace(objectPath)),
       capabilities(broker, context, nameSpace),
       operatingSystem(broker, context, nameSpace) {
-    const std::string parameters = parameterList(broker, context, objectPath);
+    const ParameterList parameters(broker, context, objectPath);
     records.entering(parameters);
     requestedClassId = Utilities::getClassId(objectPath);
     records.variable("requestedClassId", requestedClassId);
@@ -46,7 +46,7 @@ CMPIOSElementCapabilities::~CMPIOSElementCapabilities() noexcept(false) {
 }
 
 bool CMPIOSElementCapabilities::setObjectPath(const CMPIObjectPath* objectPath) {
-    const std::string parameters = parameterList(" objectPath=", objectPath);
+    const ParameterList parameters(" objectPath=", objectPath);
     records.entering(parameters);
     if (Utilities::getKeyCount(objectPath) == 0) {
         if (!operatingSystem) return false;
@@ -93,7 +93,7 @@ CMPIObjectPath* CMPIOSElementCapabilities::getObjectPath() {
 }
 
 CMPIInstance* CMPIOSElementCapabilities::getCMPIInstance(const char** properties) {
-    const std::string parameters = parameterList(" properties=", properties);
+    const ParameterList parameters(" properties=", properties);
     records.entering(parameters);
     CMPIObjectPath* path = getObjectPath();
     CMPIInstance* instance = Utilities::createInstance(broker, path);
@@ -114,7 +114,7 @@ CMPIObjectPath* CMPIOSElementCapabilities::getAssociatorNames() {
 }
 
 CMPIInstance* CMPIOSElementCapabilities::getAssociator(const char** properties) {
-    records.entering(parameterList(" properties=", properties));
+    records.entering(ParameterList(" properties=", properties));
     if (requestedClassId == operatingSystemId) return capabilities.getCMPIInstance(properties);
     if (requestedClassId == operatingSystemCapabilitiesId)
         return operatingSystem.getCMPIInstance(properties);
@@ -122,7 +122,7 @@ CMPIInstance* CMPIOSElementCapabilities::getAssociator(const char** properties) 
 }
 
 CMPIObjectPath* CMPIOSElementCapabilities::locateCapabilities(const CMPIObjectPath* objectPath) {
-    const std::string parameters = parameterList(" objectPath=", objectPath);
+    const ParameterList parameters(" objectPath=", objectPath);
     records.entering(parameters);
     CMPIObjectPath* path =
         locate({broker, nameSpace, "KORVA_OperatingSystemCapabilities"}, objectPath,
@@ -133,7 +133,7 @@ CMPIObjectPath* CMPIOSElementCapabilities::locateCapabilities(const CMPIObjectPa
 }
 
 CMPIObjectPath* CMPIOSElementCapabilities::locateOperatingSystem(const CMPIObjectPath* objectPath) {
-    const std::string parameters = parameterList(" objectPath=", objectPath);
+    const ParameterList parameters(" objectPath=", objectPath);
     records.entering(parameters);
     CMPIObjectPath* path = locate({broker, nameSpace, "KORVA_OperatingSystem"}, objectPath,
                                   Utilities::getKeyCount(objectPath) != 0, elementCapabilities,

@@ -20,7 +20,7 @@ ComputerSystemAssociation<Design>::ComputerSystemAssociation(const CMPIBroker* _
       nameSpace(VA::ProviderUtilities::getNamespace(objectPath)),
       operatingSystem(broker, context, nameSpace),
       computerSystem(broker, context, nameSpace) {
-    const std::string parameters = parameterList(broker, context, objectPath);
+    const ParameterList parameters(broker, context, objectPath);
     Design::records().entering(parameters, Caller::named(Design::constructor));
     requestedClassId = VA::ProviderUtilities::getClassId(objectPath);
     Design::records().variable("requestedClassId", requestedClassId,
@@ -109,7 +109,7 @@ CMPIObjectPath* ComputerSystemAssociation<Design>::getObjectPath() {
 
 template <class Design>
 CMPIInstance* ComputerSystemAssociation<Design>::getCMPIInstance(const char** properties) {
-    const std::string parameters = parameterList(" properties=", properties);
+    const ParameterList parameters(" properties=", properties);
     Design::records().entering(parameters);
     CMPIObjectPath* path = getObjectPath();
     CMPIInstance* instance = VA::ProviderUtilities::createInstance(broker, path);
@@ -133,7 +133,7 @@ CMPIObjectPath* ComputerSystemAssociation<Design>::getAssociatorNames() {
 
 template <class Design>
 CMPIInstance* ComputerSystemAssociation<Design>::getAssociator(const char** properties) {
-    const std::string parameters = parameterList(" properties=", properties);
+    const ParameterList parameters(" properties=", properties);
     Design::records().entering(parameters);
     CMPIInstance* instance = nullptr;
     if (requestedClassId == computerSystemId)
@@ -152,7 +152,7 @@ inline bool hasKeys(const CMPIObjectPath* path) {
 template <class Design>
 CMPIObjectPath* ComputerSystemAssociation<Design>::locateComputerSystem(
     const CMPIObjectPath* objectPath) {
-    const std::string parameters = parameterList(" objectPath=", objectPath);
+    const ParameterList parameters(" objectPath=", objectPath);
     Design::records().entering(parameters);
     CMPIObjectPath* path = locate({broker, nameSpace, "KORVA_ComputerSystem"}, objectPath,
                                   hasKeys(objectPath), mapping, &Mapping::getComputerSystemMoniker);
@@ -163,7 +163,7 @@ CMPIObjectPath* ComputerSystemAssociation<Design>::locateComputerSystem(
 template <class Design>
 CMPIObjectPath* ComputerSystemAssociation<Design>::locateOperatingSystem(
     const CMPIObjectPath* objectPath) {
-    const std::string parameters = parameterList(" objectPath=", objectPath);
+    const ParameterList parameters(" objectPath=", objectPath);
     Design::records().entering(parameters);
     CMPIObjectPath* path =
         locate({broker, nameSpace, "KORVA_OperatingSystem"}, objectPath, hasKeys(objectPath),

@@ -18,7 +18,7 @@ ElementAdapter<Design>::ElementAdapter(const CMPIBroker* _broker, const CMPICont
     : broker(_broker),
       context(_context),
       nameSpace(VA::ProviderUtilities::getNamespace(objectPath)) {
-    const std::string parameters = parameterList(broker, context, objectPath);
+    const ParameterList parameters(broker, context, objectPath);
     Design::records().entering(parameters, Caller::named(Design::constructor));
     setObjectPath(objectPath);
     Design::records().exiting(parameters, Caller::named(Design::constructor));
@@ -38,7 +38,7 @@ ElementAdapter<Design>::~ElementAdapter() noexcept(false) {
 
 template <class Design>
 void ElementAdapter<Design>::setObjectPath(const CMPIObjectPath* objectPath) {
-    const std::string parameters = parameterList(" objectPath=", objectPath);
+    const ParameterList parameters(" objectPath=", objectPath);
     Design::records().entering(parameters);
     if (VA::ProviderUtilities::getKeyCount(objectPath) != 0) {
         for (const KeyFilter<Element>& filter : Design::filters) {
@@ -68,7 +68,7 @@ CMPIObjectPath* ElementAdapter<Design>::getObjectPath() {
 
 template <class Design>
 CMPIInstance* ElementAdapter<Design>::getCMPIInstance(const char** properties) {
-    const std::string parameters = parameterList(" properties=", properties);
+    const ParameterList parameters(" properties=", properties);
     Design::records().entering(parameters);
     CMPIInstance* instance = VA::ProviderUtilities::createInstance(broker, getObjectPath());
     if (instance != nullptr) {

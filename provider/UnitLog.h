@@ -25,6 +25,36 @@ struct Caller {
     }
 };
 
+/// The text of a parameter list, which the records on entering and on leaving share. It keeps the
+/// message buffer that it was made in, so that nothing is copied.
+class ParameterList {
+  public:
+    /// One pointer: its name, which brings the leading blank and the "=", and the address.
+    template <class Object>
+    ParameterList(const char* name, Object* pointer) {
+        buffer_ << name;
+        text_ = buffer_.str(buffer_ << pointer).c_str();
+    }
+
+    /// An adapter's construction for a request.
+    template <class Broker, class Context, class Path>
+    ParameterList(const Broker* broker, const Context* context, const Path* objectPath) {
+        buffer_ << " _broker=";
+        buffer_ << broker;
+        buffer_ << " _context=";
+        buffer_ << context;
+        buffer_ << " objectPath=";
+        text_ = buffer_.str(buffer_ << objectPath).c_str();
+    }
+
+    /// Valid as long as this object.
+    const char* text() const noexcept { return text_; }
+
+  private:
+    ZBLog::ZBMessageBuffer buffer_;
+    const char* text_;
+};
+
 /// The records of one source unit: each goes to the log and to the trace, under the unit's file
 /// name and logger category.
 class UnitLog {
@@ -47,11 +77,11 @@ class UnitLog {
         }
     }
 
-    /// The same with a parameter list, as parameterList gives it.
-    void entering(const std::string& parameters, Caller caller = Caller::here()) const {
+    /// The same with a parameter list.
+    void entering(const ParameterList& parameters, Caller caller = Caller::here()) const {
         withParameters(Entering, parameters, caller);
     }
-    void exiting(const std::string& parameters, Caller caller = Caller::here()) const {
+    void exiting(const ParameterList& parameters, Caller caller = Caller::here()) const {
         withParameters(Exiting, parameters, caller);
     }
 
@@ -73,9 +103,9 @@ class UnitLog {
               [&] { return trace(file_, caller.function, caller.line, type); });
     }
 
-    void withParameters(MessageType type, const std::string& parameters, Caller caller) const {
+    void withParameters(MessageType type, const ParameterList& parameters, Caller caller) const {
         write(parameterRecordLevel, caller, [&] {
-            return tracepara(file_, caller.function, caller.line, parameters.c_str(), type);
+            return tracepara(file_, caller.function, caller.line, parameters.text(), type);
         });
     }
 
@@ -87,22 +117,6 @@ class UnitLog {
     const char* file_;
     const std::string& category_;
 };
-
-/// The text of a parameter list with one pointer: its name, which brings the leading blank and the
-/// "=", and the address.
-template <class Object>
-std::string parameterList(const char* name, Object* pointer) {
-    ZBLog::ZBMessageBuffer buffer;
-    return buffer.str(buffer << name << pointer);
-}
-
-/// The parameter list of an adapter's construction for a request.
-template <class Broker, class Context, class Path>
-std::string parameterList(const Broker* broker, const Context* context, const Path* objectPath) {
-    ZBLog::ZBMessageBuffer buffer;
-    return buffer.str(buffer << " _broker=" << broker << " _context=" << context
-                             << " objectPath=" << objectPath);
-}
 
 }  // namespace VA::OSStatusProvider
 

@@ -1,6 +1,8 @@
 #ifndef ZBLOG_GATHERER_H
 #define ZBLOG_GATHERER_H
 
+#include <array>
+#include <cstddef>
 #include <ios>
 #include <memory>
 #include <ostream>
@@ -26,10 +28,13 @@ class [[gnu::visibility("hidden")]] ZBMessageBuffer::Gatherer final : private st
     static void release(std::unique_ptr<Gatherer> gatherer) noexcept;
 
     void append(std::string_view text) {
-        gathering_.append(text);
+        gathering().append(text);
     }
 
     std::ostream& stream() noexcept;
+
+    /// Appends an address as the stream prints it, and lends the stream.
+    std::ostream& appendAddress(const void* address);
 
     /// Takes the text; the stream is as a new one afterwards. Valid until the next call.
     const std::string& take() noexcept;
@@ -51,13 +56,21 @@ class [[gnu::visibility("hidden")]] ZBMessageBuffer::Gatherer final : private st
     std::streamsize xsputn(const char* text, std::streamsize count) override;
 
     bool isWorthKeeping() const noexcept;
+    bool isStreamAsNew() const;
     void resetStream() noexcept;
 
-    std::string gathering_;
-    std::string taken_;
+    std::string& gathering() noexcept {
+        return texts_[current_];
+    }
+
+    std::array<std::string, 2> texts_;  // the one that is gathered, and the one that was taken
+    std::size_t current_ = 0;
     std::ostream stream_;
-    std::ios pristine_;      // a stream's state as it should be
-    bool streamed_ = false;  // whether the stream was given out, and may be in another state
+    std::ios pristine_;  // a stream's state as it should be
+    // Whether the stream was given out, for whatever use, and may be in another state whenever the
+    // text is taken; or only after an address, which few go on to format.
+    bool streamed_ = false;
+    bool lent_ = false;
 };
 
 }  // namespace ZBLog

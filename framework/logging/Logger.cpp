@@ -24,12 +24,6 @@ class Logger::Reading {
     Logger& logger_;
 };
 
-void Logger::write(const Record& record) noexcept {
-    if (!isReady()) return;
-    if (!gates_[indexOf(record.channel)].passes(record.level, record.text)) return;
-    deliver(record);
-}
-
 void Logger::deliver(const Record& record) noexcept {
     const CallerState caller;
     const Reading reading(*this);

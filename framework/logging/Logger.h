@@ -38,7 +38,11 @@ class Logger {
     Logger& operator=(const Logger&) = delete;
 
     /// Writes a record to its channel, if it passes. errno is left alone.
-    void write(const Record& record) noexcept;
+    void write(const Record& record) noexcept {
+        if (isReady() && gates_[indexOf(record.channel)].passes(record.level, record.text)) {
+            deliver(record);
+        }
+    }
 
     /// Puts a configuration in force, and lets go of the file. For tests.
     /// Does nothing after close. Throws std::bad_alloc.

@@ -1,5 +1,7 @@
 #include "ZBMessageBuffer.h"
 
+#include <charconv>
+#include <cstdint>
 #include <locale>
 
 #include "Gatherer.h"
@@ -11,8 +13,7 @@ IdlePool<ZBMessageBuffer::Gatherer, ZBMessageBuffer::Gatherer::idleLimit>
 const ZBMessageBuffer::Gatherer::AtUnload ZBMessageBuffer::Gatherer::atUnload_{};
 
 ZBMessageBuffer::Gatherer::Gatherer() : stream_(this), pristine_(nullptr) {
-    gathering_.reserve(usualCapacity);
-    taken_.reserve(usualCapacity);
+    for (std::string& text : texts_) text.reserve(usualCapacity);
     // Numbers look the same in every process, whatever its locale.
     pristine_.imbue(std::locale::classic());
     stream_.imbue(std::locale::classic());
@@ -27,6 +28,7 @@ void ZBMessageBuffer::Gatherer::release(std::unique_ptr<Gatherer> gatherer) noex
     if (!gatherer->isWorthKeeping()) return;
     gatherer->take();
     gatherer->streamed_ = false;
+    gatherer->lent_ = false;
     idle_.give(std::move(gatherer));
 }
 
@@ -39,28 +41,51 @@ std::ostream& ZBMessageBuffer::Gatherer::stream() noexcept {
     return stream_;
 }
 
+std::ostream& ZBMessageBuffer::Gatherer::appendAddress(const void* address) {
+    if (streamed_ || (lent_ && !isStreamAsNew())) return stream() << address;
+    lent_ = true;
+    if (address == nullptr) {
+        append("0");
+        return stream_;
+    }
+    char text[2 + 2 * sizeof(std::uintptr_t)] = {'0', 'x'};
+    const auto number = reinterpret_cast<std::uintptr_t>(address);
+    const char* const end = std::to_chars(text + 2, text + sizeof text, number, 16).ptr;
+    append({text, static_cast<std::size_t>(end - text)});
+    return stream_;
+}
+
 const std::string& ZBMessageBuffer::Gatherer::take() noexcept {
-    gathering_.swap(taken_);
-    gathering_.clear();
-    if (streamed_) resetStream();
-    return taken_;
+    const std::string& taken = gathering();
+    current_ ^= 1;
+    gathering().clear();
+    if (streamed_ || (lent_ && !isStreamAsNew())) resetStream();
+    return taken;
 }
 
 ZBMessageBuffer::Gatherer::int_type ZBMessageBuffer::Gatherer::overflow(int_type character) {
     if (!traits_type::eq_int_type(character, traits_type::eof())) {
-        gathering_.push_back(traits_type::to_char_type(character));
+        gathering().push_back(traits_type::to_char_type(character));
     }
     return traits_type::not_eof(character);
 }
 
 std::streamsize ZBMessageBuffer::Gatherer::xsputn(const char* text, std::streamsize count) {
-    gathering_.append(text, static_cast<std::size_t>(count));
+    gathering().append(text, static_cast<std::size_t>(count));
     return count;
 }
 
 /// A huge text must not hold on to its memory for months.
 bool ZBMessageBuffer::Gatherer::isWorthKeeping() const noexcept {
-    return gathering_.capacity() <= keptCapacity && taken_.capacity() <= keptCapacity;
+    return texts_[0].capacity() <= keptCapacity && texts_[1].capacity() <= keptCapacity;
+}
+
+bool ZBMessageBuffer::Gatherer::isStreamAsNew() const {
+    return stream_.rdbuf() == this && stream_.rdstate() == std::ios::goodbit &&
+           stream_.flags() == pristine_.flags() && stream_.width() == pristine_.width() &&
+           stream_.precision() == pristine_.precision() && stream_.fill() == pristine_.fill() &&
+           stream_.exceptions() == pristine_.exceptions() && stream_.tie() == pristine_.tie() &&
+           stream_.getloc() == pristine_.getloc();
 }
 
 void ZBMessageBuffer::Gatherer::resetStream() noexcept {
@@ -81,6 +106,10 @@ ZBMessageBuffer& ZBMessageBuffer::operator<<(const char* text) {
 
 ZBMessageBuffer::operator std::ostream&() {
     return gatherer_->stream();
+}
+
+std::ostream& ZBMessageBuffer::appendAddress(const void* address) {
+    return gatherer_->appendAddress(address);
 }
 
 const std::string& ZBMessageBuffer::str(ZBMessageBuffer&) {

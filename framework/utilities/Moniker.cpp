@@ -10,6 +10,7 @@ Moniker& Moniker::operator=(const Moniker&) = default;
 Moniker& Moniker::operator=(Moniker&&) noexcept = default;
 
 void Moniker::addKey(std::string name, const std::string& value) {
+    if (keys_.empty()) keys_.reserve(usualCount);
     keys_.emplace_back(std::move(name), value);
 }
 

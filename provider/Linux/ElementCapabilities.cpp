@@ -18,7 +18,7 @@ OSElementCapabilities::~OSElementCapabilities() noexcept(false) {
 }
 
 VA::Moniker OSElementCapabilities::getOperatingSystemMoniker(VA::Moniker& monikerCapabilities) {
-    const std::string parameters = parameterList(" monikerCapabilities=", &monikerCapabilities);
+    const ParameterList parameters(" monikerCapabilities=", &monikerCapabilities);
     records.entering(parameters);
     const std::string instanceId = valueOfFirst(monikerCapabilities, {"InstanceID"},
                                                 "Could not find 'InstanceID' Key in Moniker");
@@ -29,7 +29,7 @@ VA::Moniker OSElementCapabilities::getOperatingSystemMoniker(VA::Moniker& monike
 }
 
 VA::Moniker OSElementCapabilities::getOSCapabilitiesMoniker(VA::Moniker& monikerOS) {
-    const std::string parameters = parameterList(" monikerOS=", &monikerOS);
+    const ParameterList parameters(" monikerOS=", &monikerOS);
     records.entering(parameters);
     const std::string name =
         valueOfFirst(monikerOS, {"Name"}, "Could not find 'Name' Key in Moniker");

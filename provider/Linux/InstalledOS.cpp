@@ -9,7 +9,7 @@ static const std::string loggerInstalledOS("Zumbrel.OperatingSystemProvider");
 static constexpr UnitLog records("Linux/InstalledOS.cpp", loggerInstalledOS);
 
 VA::Moniker InstalledOS::getComputerSystemMoniker(VA::Moniker& monikerOS) {
-    const std::string parameters = parameterList(" monikerOS=", &monikerOS);
+    const ParameterList parameters(" monikerOS=", &monikerOS);
     records.entering(parameters);
     VA::Moniker computerSystem = computerSystemMonikerOf(monikerOS);
     records.exiting(parameters);
@@ -17,7 +17,7 @@ VA::Moniker InstalledOS::getComputerSystemMoniker(VA::Moniker& monikerOS) {
 }
 
 VA::Moniker InstalledOS::getOperatingSystemMoniker(VA::Moniker& monikerComputer) {
-    const std::string parameters = parameterList(" monikerComputer=", &monikerComputer);
+    const ParameterList parameters(" monikerComputer=", &monikerComputer);
     records.entering(parameters);
     VA::Moniker operatingSystem = operatingSystemMonikerOf(monikerComputer);
     records.exiting(parameters);

@@ -77,6 +77,24 @@ TEST(MessageBuffer, PrintsPointersAsStreamsDo) {
     EXPECT_EQ(buffer.str(buffer << " " << none), expected.str());
 }
 
+TEST(MessageBuffer, PrintsPointersInTheFormatThatTheStreamWasGiven) {
+    int object = 0;
+    const void* const address = &object;
+    ZBMessageBuffer buffer;
+    std::ostringstream expected;
+    expected << address << std::setw(24) << std::setfill('*') << address;
+    EXPECT_EQ(buffer.str((buffer << &object) << std::setw(24) << std::setfill('*') << address),
+              expected.str());
+    // Taking the text brings the usual format back, after a pointer too.
+    std::ostringstream usual;
+    usual << address << 255;
+    EXPECT_EQ(buffer.str((buffer << &object) << 255), usual.str());
+    (buffer << &object) << std::setw(24) << std::left;
+    std::ostringstream left;
+    left << address << std::setw(24) << std::left << address;
+    EXPECT_EQ(buffer.str(buffer << &object), left.str());
+}
+
 TEST(MessageBuffer, MixesTextAndStreamInOrder) {
     ZBMessageBuffer buffer;
     std::ostream& stream = buffer;
