@@ -2,8 +2,6 @@
 
 #include <strings.h>
 
-#include <cstdio>
-#include <cstring>
 #include <ctime>
 #include <utility>
 
@@ -124,19 +122,9 @@ bool OperatingSystem::getDateTime(Properties id, std::string& value) {
     // of the host's own offset, and that of the zone in which the instrumentation gives its dates.
     const bool east = timezone < 0;
     const long offset = (east ? -timezone : timezone) / 60;
-
-    // Fields that the text does not reach stay 0. A separator is any one character but white space.
-    unsigned int year = 0, month = 0, day = 0, hour = 0, minute = 0, second = 0;
-    char separator = 0;
-    std::sscanf(value.c_str(), "%4u %1c %2u %1c %2u %1c %2u %1c %2u %1c %2u", &year, &separator,
-                &month, &separator, &day, &separator, &hour, &separator, &minute, &separator,
-                &second);
-
-    std::memset(dateTimeBuffer, 0, sizeof dateTimeBuffer);
-    const int printed = std::snprintf(
-        dateTimeBuffer, sizeof dateTimeBuffer, "%4u%02u%02u%02u%02u%02u.%06u%1c%03u", year, month,
-        day, hour, minute, second, 0U, east ? '-' : '+', static_cast<unsigned int>(offset));
-    if (printed == 0) return false;
+    if (!printDateTime(dateTimeBuffer, scanDate(value.c_str()), east ? '-' : '+',
+                       static_cast<unsigned int>(offset)))
+        return false;
     value = dateTimeBuffer;
     return true;
 }

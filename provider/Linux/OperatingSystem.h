@@ -4,6 +4,7 @@
 #include <string>
 #include <vector>
 
+#include "DateTimeText.h"
 #include "Instrumentation.h"
 
 namespace VA::OSStatusProvider {
@@ -129,7 +130,7 @@ class OperatingSystem {
     bool filterSet = false;
     std::vector<Filter> filters;
     VA::Instrumentation instrumentation;
-    char dateTimeBuffer[26] = {};
+    DateTimeText dateTimeBuffer = {};
 };
 
 /// State changes of the operating system, which offers none: both do nothing and return false.
