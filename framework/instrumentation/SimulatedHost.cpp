@@ -1,5 +1,8 @@
 #include "SimulatedHost.h"
 
+#include <algorithm>
+#include <array>
+#include <atomic>
 #include <mutex>
 #include <utility>
 #include <vector>
@@ -10,13 +13,13 @@ using NodeLexicon::Properties;
 
 class SimulatedHost::State {
   public:
-    /// What a walk sees: a copy, so that changes to the host leave it alone.
     struct View {
         std::vector<Node> nodes;
         std::optional<std::string> computerName;
     };
 
-    View view() const {
+    /// What a walk sees. It never changes: a change to the host makes another one.
+    std::shared_ptr<const View> view() const {
         const std::lock_guard<std::mutex> lock(mutex_);
         return view_;
     }
@@ -24,59 +27,63 @@ class SimulatedHost::State {
     template <class Change>
     void change(Change change) {
         const std::lock_guard<std::mutex> lock(mutex_);
-        change(view_);
+        if (view_.use_count() > 1) view_ = std::make_shared<View>(*view_);
+        change(*view_);
     }
 
     void setHook(Hook hook) {
         const std::lock_guard<std::mutex> lock(mutex_);
         hook_.swap(hook);
+        hooked_ = static_cast<bool>(hook_);
     }
 
     void enter(Operation operation, std::optional<Properties> id = std::nullopt) {
-        Call call{operation, id, 0, 0};
+        const Call call{operation, id, ++total_, ++countOf(operation)};
+        if (id) ++countOf(operation, *id);
+        if (hooked_) runHook(call);
+    }
+
+    std::uint64_t total() const { return total_; }
+    std::uint64_t count(Operation operation) { return countOf(operation); }
+    std::uint64_t count(Operation operation, Properties id) { return countOf(operation, id); }
+
+    void resetCounts() {
+        total_ = 0;
+        for (Count& count : perOperation_) count = 0;
+        for (auto& counts : perProperty_)
+            for (Count& count : counts) count = 0;
+    }
+
+  private:
+    using Count = std::atomic<std::uint64_t>;
+    static constexpr std::size_t operations = static_cast<std::size_t>(Operation::ComputerName) + 1;
+    // Ids past those of the lexicon share the last place.
+    static constexpr std::size_t ids = NodeLexicon::FreeSpaceInPagingFiles + 2;
+
+    Count& countOf(Operation operation) {
+        return perOperation_[static_cast<std::size_t>(operation)];
+    }
+    Count& countOf(Operation operation, Properties id) {
+        const auto index = std::min<std::size_t>(static_cast<std::size_t>(id), ids - 1);
+        return perProperty_[static_cast<std::size_t>(operation)][index];
+    }
+
+    void runHook(const Call& call) {
         Hook hook;
         {
             const std::lock_guard<std::mutex> lock(mutex_);
-            call.number = ++total_;
-            call.numberOfOperation = ++perOperation_[operation];
-            if (id) ++perProperty_[{operation, *id}];
             hook = hook_;
         }
         if (hook) hook(call);
     }
 
-    std::uint64_t total() const {
-        const std::lock_guard<std::mutex> lock(mutex_);
-        return total_;
-    }
-
-    std::uint64_t count(Operation operation) const { return count(perOperation_, operation); }
-
-    std::uint64_t count(Operation operation, Properties id) const {
-        return count(perProperty_, std::pair(operation, id));
-    }
-
-    void resetCounts() {
-        const std::lock_guard<std::mutex> lock(mutex_);
-        total_ = 0;
-        perOperation_.clear();
-        perProperty_.clear();
-    }
-
-  private:
-    template <class Key>
-    std::uint64_t count(const std::map<Key, std::uint64_t>& counts, const Key& key) const {
-        const std::lock_guard<std::mutex> lock(mutex_);
-        const auto found = counts.find(key);
-        return found == counts.end() ? 0 : found->second;
-    }
-
     mutable std::mutex mutex_;
-    View view_;
+    std::shared_ptr<View> view_ = std::make_shared<View>();
     Hook hook_;
-    std::uint64_t total_ = 0;
-    std::map<Operation, std::uint64_t> perOperation_;
-    std::map<std::pair<Operation, Properties>, std::uint64_t> perProperty_;
+    std::atomic<bool> hooked_{false};
+    Count total_{0};
+    std::array<Count, operations> perOperation_{};
+    std::array<std::array<Count, ids>, operations> perProperty_{};
 };
 
 class SimulatedHost::Cursor final : public NodeCursor {
@@ -88,8 +95,8 @@ class SimulatedHost::Cursor final : public NodeCursor {
     bool select(NodeLexicon::NodeType type) override {
         state_->enter(Operation::Select);
         view_ = state_->view();
+        hasNodes_ = type == NodeLexicon::OperatingSystemNode;
         position_ = 0;
-        if (type != NodeLexicon::OperatingSystemNode) view_.nodes.clear();
         return node() != nullptr;
     }
 
@@ -131,14 +138,15 @@ class SimulatedHost::Cursor final : public NodeCursor {
 
     bool readComputerName(std::string& name) override {
         state_->enter(Operation::ComputerName);
-        if (!view_.computerName) return false;
-        name = *view_.computerName;
+        if (!view_ || !view_->computerName) return false;
+        name = *view_->computerName;
         return true;
     }
 
   private:
     const Node* node() const {
-        return position_ < view_.nodes.size() ? &view_.nodes[position_] : nullptr;
+        if (!hasNodes_ || position_ >= view_->nodes.size()) return nullptr;
+        return &view_->nodes[position_];
     }
 
     template <class T>
@@ -154,7 +162,8 @@ class SimulatedHost::Cursor final : public NodeCursor {
     }
 
     const std::shared_ptr<State> state_;
-    State::View view_;
+    std::shared_ptr<const State::View> view_;
+    bool hasNodes_ = false;
     std::size_t position_ = 0;
 };
 
