@@ -1,0 +1,95 @@
+// The Linux host as a source: each part of its snapshot, and whole requests.
+
+#include <benchmark/benchmark.h>
+
+#include "bench/Benchmarks.h"
+#include "bench/Counts.h"
+#include "bench/Requests.h"
+#include "framework/instrumentation/LinuxHost.h"
+
+namespace bench {
+namespace {
+
+namespace Lexicon = VA::NodeLexicon;
+
+struct Part {
+    const char* name;
+    void (*read)(VA::NodeCursor& cursor);
+};
+
+template <class Value, Lexicon::Properties... ids>
+void read(VA::NodeCursor& cursor) {
+    Value value{};
+    (cursor.readProperty(ids, value), ...);
+}
+
+constexpr Part parts[] = {
+    {"no value", [](VA::NodeCursor&) {}},
+    {"computer name",
+     [](VA::NodeCursor& cursor) {
+         std::string name;
+         cursor.readComputerName(name);
+     }},
+    {"name and version", read<std::string, Lexicon::Name, Lexicon::Version>},
+    {"boot time", read<std::string, Lexicon::LastBootUpTime>},
+    {"install date", read<std::string, Lexicon::InstallDate>},
+    {"limits", read<unsigned, Lexicon::MaxNumberOfProcesses, Lexicon::MaxProcessMemorySize>},
+    {"processes", read<unsigned, Lexicon::NumberOfProcesses>},
+    {"users", read<unsigned, Lexicon::NumberOfUsers>},
+    {"memory",
+     read<unsigned, Lexicon::TotalVirtualMemorySize, Lexicon::FreeVirtualMemory,
+          Lexicon::FreePhysicalMemory, Lexicon::TotalVisibleMemorySize, Lexicon::TotalSwapSpaceSize,
+          Lexicon::SizeStoredInPagingFiles, Lexicon::FreeSpaceInPagingFiles>},
+    {"state", [](VA::NodeCursor& cursor) { cursor.nodeStatus(); }},
+};
+
+void readPart(VA::HostSource& host, const Part& part) {
+    const std::unique_ptr<VA::NodeCursor> cursor = host.openCursor();
+    cursor->select(Lexicon::OperatingSystemNode);
+    part.read(*cursor);
+}
+
+// Once more, for what is counted and not timed.
+template <class Work>
+void countOpened(benchmark::State& state, Work work) {
+    const Watch watch;
+    work();
+    state.counters["opened"] = static_cast<double>(watch.counts().opened);
+}
+
+void measurePart(benchmark::State& state, const Part& part) {
+    VA::LinuxHost host;
+    for (auto iteration : state) {
+        static_cast<void>(iteration);
+        readPart(host, part);
+    }
+    countOpened(state, [&] { readPart(host, part); });
+}
+
+void measureRequest(benchmark::State& state, Setting& setting,
+                    const cmpihost::OperationRequest& request) {
+    setting.useRealHost();
+    for (auto iteration : state) {
+        static_cast<void>(iteration);
+        benchmark::DoNotOptimize(setting.run(Answerer::Provider, request));
+    }
+    countOpened(state, [&] { setting.run(Answerer::Provider, request); });
+    setting.useSimulatedHost();
+}
+
+}  // namespace
+
+void addHostBenchmarks(Setting& setting) {
+    for (const Part& part : parts)
+        benchmark::RegisterBenchmark(
+            (std::string("host/snapshot: ") + part.name).c_str(),
+            [&part](benchmark::State& state) { measurePart(state, part); });
+    for (const char* name : {"EnumerateInstanceNames KORVA_OperatingSystem",
+                             "EnumerateInstances KORVA_OperatingSystem"})
+        benchmark::RegisterBenchmark((std::string("host/") + name).c_str(),
+                                     [&setting, name](benchmark::State& state) {
+                                         measureRequest(state, setting, requestNamed(name));
+                                     });
+}
+
+}  // namespace bench

@@ -1,0 +1,27 @@
+// How the logging behaves while something is measured.
+#pragma once
+
+#include <string>
+
+namespace bench {
+
+/// The logging library follows a configuration of this program's, kept in a folder that goes with
+/// the object. One at a time; made before the first record is written.
+class LoggingConfiguration {
+  public:
+    /// Nothing but failures passes, as without any configuration.
+    LoggingConfiguration();
+    ~LoggingConfiguration();
+    LoggingConfiguration(const LoggingConfiguration&) = delete;
+    LoggingConfiguration& operator=(const LoggingConfiguration&) = delete;
+
+    /// Puts settings in force; returns when they are.
+    void use(const std::string& settings);
+
+    const std::string& folder() const noexcept { return folder_; }
+
+  private:
+    std::string folder_;
+};
+
+}  // namespace bench

@@ -1,0 +1,63 @@
+// Every request of the list, answered by the provider and by the floor; and what a growing number
+// of nodes costs.
+
+#include <benchmark/benchmark.h>
+
+#include "bench/Benchmarks.h"
+#include "bench/Counts.h"
+#include "bench/Requests.h"
+
+namespace bench {
+namespace {
+
+constexpr unsigned nodeCounts[] = {0, 1, 10, 1000, 100000};
+constexpr const char* growing[] = {
+    "EnumerateInstances KORVA_OperatingSystem",
+    "EnumerateInstanceNames KORVA_OperatingSystem",
+    "EnumerateInstances KORVA_OperatingSystemCapabilities",
+    "Associators KORVA_ComputerSystem KORVA_InstalledOS",
+    "AssociatorNames KORVA_ComputerSystem KORVA_InstalledOS",
+};
+
+// One more request, for what is counted and not timed.
+void count(benchmark::State& state, Setting& setting, Answerer answerer,
+           const cmpihost::OperationRequest& request) {
+    const Watch watch;
+    setting.run(answerer, request);
+    const Counts counts = watch.counts();
+    state.counters["allocations"] = static_cast<double>(counts.allocations);
+    state.counters["peakBytes"] = static_cast<double>(counts.peakBytes);
+}
+
+void measure(benchmark::State& state, Setting& setting, Answerer answerer,
+             const cmpihost::OperationRequest& request, unsigned nodes) {
+    setting.setNodes(nodes);
+    for (auto iteration : state) {
+        static_cast<void>(iteration);
+        benchmark::DoNotOptimize(setting.run(answerer, request));
+    }
+    count(state, setting, answerer, request);
+}
+
+void add(Setting& setting, const std::string& group, const std::string& name,
+         const cmpihost::OperationRequest& request, unsigned nodes) {
+    for (const Answerer answerer : {Answerer::Provider, Answerer::Floor}) {
+        const char* const who = answerer == Answerer::Provider ? "provider" : "floor";
+        benchmark::RegisterBenchmark(
+            (group + "/" + name + "/" + std::to_string(nodes) + "/" + who).c_str(),
+            [&setting, answerer, &request, nodes](benchmark::State& state) {
+                measure(state, setting, answerer, request, nodes);
+            });
+    }
+}
+
+}  // namespace
+
+void addRequestBenchmarks(Setting& setting) {
+    for (const NamedRequest& each : requests()) add(setting, "request", each.name, each.request, 1);
+    for (const char* name : growing)
+        for (const unsigned nodes : nodeCounts)
+            add(setting, "nodes", name, requestNamed(name), nodes);
+}
+
+}  // namespace bench

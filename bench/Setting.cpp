@@ -1,0 +1,74 @@
+#include "bench/Setting.h"
+
+#include "bench/Requests.h"
+#include "framework/instrumentation/HostSource.h"
+#include "host/Schema.h"
+#include "host/SchemaCatalogue.h"
+
+#include <stdexcept>
+
+namespace bench {
+
+using namespace cmpihost;
+
+namespace {
+
+const ClassCatalogue& schemaCatalogue() {
+    static const SchemaCatalogue catalogue(Schema::load(KORVA_SOURCE_DIR "/schema"));
+    return catalogue;
+}
+
+LoadOptions optionsOf(const char* providerName) {
+    LoadOptions options;
+    options.providerName = providerName;
+    return options;
+}
+
+}  // namespace
+
+Setting::Setting()
+    : host_(VA::SimulatedHost::withOneNode()),
+      broker_(&schemaCatalogue()),
+      computers_("simulated.example"),
+      provider_(KORVA_BINARY_DIR "/lib/libkorzbosstatusprofileprovider.so.1", broker_),
+      floor_(KORVA_BINARY_DIR "/lib/libkorvafloor.so", broker_, optionsOf("FloorProvider")) {
+    broker_.route(ComputerSystemService::className, computers_);
+    useSimulatedHost();
+}
+
+Setting::~Setting() {
+    VA::setHostSource(nullptr);
+}
+
+Outcome Setting::run(Answerer answerer, const OperationRequest& request) {
+    Outcome outcome = invoke(answerer == Answerer::Provider ? provider_ : floor_, broker_, request);
+    if (!outcome.violations.empty()) throw std::runtime_error(outcome.violations.front());
+    return outcome;
+}
+
+void Setting::setNodes(unsigned count) {
+    host_->clearNodes();
+    for (unsigned made = 0; made < count; ++made)
+        host_->addNode(VA::SimulatedHost::plausibleNode());
+    reinterpret_cast<void (*)(unsigned)>(floor_.symbol("setFloorNodes"))(count);
+}
+
+void Setting::useRealHost() {
+    VA::setHostSource(nullptr);
+}
+
+void Setting::useSimulatedHost() {
+    VA::setHostSource(host_);
+}
+
+void Setting::compareAnswers() {
+    for (const NamedRequest& each : requests()) {
+        const Outcome ours = run(Answerer::Provider, each.request);
+        const Outcome floors = run(Answerer::Floor, each.request);
+        if (ours.rc != floors.rc || ours.doneCount != floors.doneCount ||
+            ours.paths != floors.paths || ours.instances != floors.instances)
+            throw std::runtime_error("provider and floor differ on " + each.name);
+    }
+}
+
+}  // namespace bench

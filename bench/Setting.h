@@ -1,0 +1,45 @@
+// Where requests are measured: one broker, the provider on a simulated host, and the floor.
+#pragma once
+
+#include "framework/instrumentation/SimulatedHost.h"
+#include "host/broker/ComputerSystemService.h"
+#include "host/broker/Invoke.h"
+
+#include <memory>
+
+namespace bench {
+
+/// Who answers.
+enum class Answerer { Provider, Floor };
+
+/// The built libraries under the strict broker with the schema. The provider sees a simulated host
+/// with one node, and both its logging channels let nothing pass. One thread uses it.
+class Setting {
+  public:
+    Setting();
+    ~Setting();
+    Setting(const Setting&) = delete;
+    Setting& operator=(const Setting&) = delete;
+
+    /// Runs one request. Throws std::runtime_error when the broker has to complain.
+    cmpihost::Outcome run(Answerer answerer, const cmpihost::OperationRequest& request);
+
+    /// Gives the simulated host, and the floor's enumerations, that many equal nodes.
+    void setNodes(unsigned count);
+
+    /// The provider sees the host that it runs on.
+    void useRealHost();
+    void useSimulatedHost();
+
+    /// Throws std::runtime_error, naming the request, unless both answer every request alike.
+    void compareAnswers();
+
+  private:
+    std::shared_ptr<VA::SimulatedHost> host_;
+    cmpihost::Broker broker_;
+    cmpihost::ComputerSystemService computers_;
+    cmpihost::ProviderLibrary provider_;
+    cmpihost::ProviderLibrary floor_;
+};
+
+}  // namespace bench

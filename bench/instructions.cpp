@@ -1,0 +1,44 @@
+// Runs every request of the list under callgrind, which then tells the instructions of each: the
+// totals of its dumps, which bear the names of the requests.
+
+#include <valgrind/callgrind.h>
+
+#include "bench/Logging.h"
+#include "bench/Requests.h"
+#include "bench/Setting.h"
+
+#include <exception>
+#include <iostream>
+#include <string>
+
+namespace {
+
+constexpr int rounds = 100;
+
+void measure(bench::Setting& setting, bench::Answerer answerer, const char* who,
+             const bench::NamedRequest& request) {
+    setting.run(answerer, request.request);
+    CALLGRIND_ZERO_STATS;
+    for (int round = 0; round < rounds; ++round) setting.run(answerer, request.request);
+    const std::string name = request.name + "/" + who;
+    CALLGRIND_DUMP_STATS_AT(name.c_str());
+}
+
+}  // namespace
+
+// The argument, if there is one, is a part of the names of the requests to run.
+int main(int argc, char** argv) try {
+    const std::string part = argc > 1 ? argv[1] : "";
+    const bench::LoggingConfiguration logging;
+    bench::Setting setting;
+    setting.compareAnswers();
+    for (const bench::NamedRequest& request : bench::requests()) {
+        if (request.name.find(part) == std::string::npos) continue;
+        measure(setting, bench::Answerer::Provider, "provider", request);
+        measure(setting, bench::Answerer::Floor, "floor", request);
+    }
+    return 0;
+} catch (const std::exception& caught) {
+    std::cerr << "korva_instructions: " << caught.what() << '\n';
+    return 1;
+}
