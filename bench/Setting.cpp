@@ -48,8 +48,7 @@ Outcome Setting::run(Answerer answerer, const OperationRequest& request) {
 
 void Setting::setNodes(unsigned count) {
     host_->clearNodes();
-    for (unsigned made = 0; made < count; ++made)
-        host_->addNode(VA::SimulatedHost::plausibleNode());
+    host_->addNodes(VA::SimulatedHost::plausibleNode(), count);
     reinterpret_cast<void (*)(unsigned)>(floor_.symbol("setFloorNodes"))(count);
 }
 

@@ -26,9 +26,14 @@ void measure(bench::Setting& setting, bench::Answerer answerer, const char* who,
 
 }  // namespace
 
-// The argument, if there is one, is a part of the names of the requests to run.
+// The argument, if there is one, is a part of the names of the requests to run, or --rounds, which
+// tells how often each is run.
 int main(int argc, char** argv) try {
     const std::string part = argc > 1 ? argv[1] : "";
+    if (part == "--rounds") {
+        std::cout << rounds << '\n';
+        return 0;
+    }
     const bench::LoggingConfiguration logging;
     bench::Setting setting;
     setting.compareAnswers();

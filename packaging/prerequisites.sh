@@ -29,6 +29,10 @@ need() {
         -o Dpkg::Use-Pty=0 $missing >/dev/null
 }
 
+# What the benchmarks need beyond that.
+# shellcheck disable=SC2034
+bench_packages="libbenchmark-dev valgrind"
+
 # What every build needs; g++-multilib compiles 32-bit code on a 64-bit machine.
 build_packages="cmake ninja-build g++ libc6-dev googletest libcli11-dev nlohmann-json3-dev"
 [ "$(dpkg --print-architecture)" = i386 ] || build_packages="$build_packages g++-multilib"

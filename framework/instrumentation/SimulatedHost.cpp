@@ -14,7 +14,7 @@ using NodeLexicon::Properties;
 class SimulatedHost::State {
   public:
     struct View {
-        std::vector<Node> nodes;
+        std::vector<std::shared_ptr<const Node>> nodes;
         std::optional<std::string> computerName;
     };
 
@@ -146,7 +146,7 @@ class SimulatedHost::Cursor final : public NodeCursor {
   private:
     const Node* node() const {
         if (!hasNodes_ || position_ >= view_->nodes.size()) return nullptr;
-        return &view_->nodes[position_];
+        return view_->nodes[position_].get();
     }
 
     template <class T>
@@ -206,7 +206,12 @@ SimulatedHost::Node SimulatedHost::plausibleNode() {
 }
 
 void SimulatedHost::addNode(Node node) {
-    state_->change([&](State::View& view) { view.nodes.push_back(std::move(node)); });
+    addNodes(std::move(node), 1);
+}
+
+void SimulatedHost::addNodes(Node node, std::size_t count) {
+    const auto shared = std::make_shared<const Node>(std::move(node));
+    state_->change([&](State::View& view) { view.nodes.insert(view.nodes.end(), count, shared); });
 }
 
 void SimulatedHost::clearNodes() {

@@ -1,6 +1,7 @@
 #ifndef VA_SIMULATED_HOST_H
 #define VA_SIMULATED_HOST_H
 
+#include <cstddef>
 #include <cstdint>
 #include <functional>
 #include <map>
@@ -67,6 +68,7 @@ class [[gnu::visibility("default")]] SimulatedHost final : public HostSource {
     static Node plausibleNode();
 
     void addNode(Node node);
+    void addNodes(Node node, std::size_t count);  ///< equal ones, which share the memory of one
     void clearNodes();
     void setComputerName(std::optional<std::string> name);  ///< nullopt: not known
 

@@ -43,7 +43,9 @@ bool Arena::retireSince(const void* mark, Shells& retired) {
     return true;
 }
 
-Shells Arena::retireAll() noexcept {
+Shells Arena::retireAll(std::size_t kept) noexcept {
+    const std::size_t surplus = shells_.size() - std::min(shells_.size(), kept);
+    shells_.erase(shells_.begin(), shells_.begin() + static_cast<std::ptrdiff_t>(surplus));
     for (const auto& shell : shells_) {
         if (shell != nullptr) shell->retire(Life::Ended);
     }

@@ -3,6 +3,7 @@
 
 #include "host/broker/Shell.h"
 
+#include <cstddef>
 #include <memory>
 #include <mutex>
 #include <unordered_set>
@@ -28,8 +29,9 @@ class Arena {
     void* mark();
     /// Retires what was made since the mark, inner marks included. False: no such mark.
     bool retireSince(const void* mark, Shells& retired);
-    /// Retires everything and hands the shells out.
-    Shells retireAll() noexcept;
+    /// Ends everything: destroys all objects but the last `kept`, and hands the shells of those
+    /// out.
+    Shells retireAll(std::size_t kept) noexcept;
 
     void* allocate(std::size_t size);
     /// Null: the block is none of this arena, or there is no memory.

@@ -16,7 +16,7 @@ void RequestScope::end() noexcept {
     if (!open_) return;
     open_ = false;
     innermostScope() = scope_.outer;
-    if (arena_) core_.quarantine(arena_->retireAll());
+    if (arena_) core_.quarantine(arena_->retireAll(core_.options().quarantine));
 }
 
 RequestScope* RequestScope::attachedTo(const BrokerCore& core) noexcept {

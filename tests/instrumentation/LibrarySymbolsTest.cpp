@@ -64,6 +64,7 @@ TEST(LibrarySymbols, ExportedAreInstrumentationAndTheSeamAlone) {
         "VA::SimulatedHost::withOneNode",
         "VA::SimulatedHost::plausibleNode",
         "VA::SimulatedHost::addNode",
+        "VA::SimulatedHost::addNodes",
         "VA::SimulatedHost::clearNodes",
         "VA::SimulatedHost::setComputerName",
         "VA::SimulatedHost::setHook",

@@ -77,6 +77,23 @@ TEST_F(SimulatedHostTest, EachPropertyCanBeAbsent) {
     }
 }
 
+TEST_F(SimulatedHostTest, EqualNodesAreAddedTogether) {
+    host->clearNodes();
+    SimulatedHost::Node node;
+    node.properties[Name] = std::string("one of many");
+    host->addNodes(node, 3);
+    host->addNodes(node, 0);
+    Instrumentation cursor;
+    cursor.selectNode(OperatingSystemNode);
+    for (int seen = 0; seen < 3; ++seen, ++cursor) {
+        ASSERT_TRUE(standsOnNode(cursor));
+        std::string name;
+        EXPECT_TRUE(cursor.getProperty(Name, name));
+        EXPECT_EQ(name, "one of many");
+    }
+    EXPECT_FALSE(standsOnNode(cursor));
+}
+
 TEST_F(SimulatedHostTest, NodesComeInTheOrderTheyWereAddedEachWithItsOwnValues) {
     host->clearNodes();
     for (unsigned int i = 0; i < 5; ++i) {

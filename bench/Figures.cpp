@@ -1,0 +1,52 @@
+#include "bench/Figures.h"
+
+#include <algorithm>
+#include <fstream>
+#include <nlohmann/json.hpp>
+#include <stdexcept>
+
+namespace bench {
+
+namespace {
+
+std::ifstream opened(const std::string& file) {
+    std::ifstream stream(file);
+    if (!stream) throw std::runtime_error("cannot read " + file);
+    return stream;
+}
+
+std::string describe(const nlohmann::json& context) {
+    return std::to_string(context.at("num_cpus").get<int>()) + " processors of " +
+           std::to_string(context.at("mhz_per_cpu").get<int>()) + " MHz";
+}
+
+}  // namespace
+
+Figures::Figures(const std::string& file) {
+    std::ifstream stream = opened(file);
+    const nlohmann::json all = nlohmann::json::parse(stream);
+    machine_ = describe(all.at("context"));
+    for (const nlohmann::json& each : all.at("benchmarks")) {
+        if (each.at("run_type") != "iteration") continue;
+        const auto name = each.at("run_name").get<std::string>();
+        const auto time = each.at("cpu_time").get<double>();
+        const auto [place, isNew] = figures_.try_emplace(name, Figure{time});
+        if (isNew) names_.push_back(name);
+        Figure& figure = place->second;
+        figure.nanoseconds = std::min(figure.nanoseconds, time);
+        for (const char* count : {"allocations", "opened", "peakBytes"})
+            if (each.contains(count)) figure.counts[count] = each.at(count).get<double>();
+    }
+}
+
+std::map<std::string, double> readInstructions(const std::string& file) {
+    std::ifstream stream = opened(file);
+    std::map<std::string, double> instructions;
+    std::string name;
+    double number = 0;
+    while (std::getline(stream, name, '\t') && stream >> number >> std::ws)
+        instructions[name] = number;
+    return instructions;
+}
+
+}  // namespace bench

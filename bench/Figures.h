@@ -1,0 +1,37 @@
+// The figures of a run, as Google Benchmark and callgrind leave them.
+#pragma once
+
+#include <map>
+#include <string>
+#include <vector>
+
+namespace bench {
+
+/// One benchmark: the quickest of its repetitions, and what was counted beside.
+struct Figure {
+    double nanoseconds = 0;
+    std::map<std::string, double> counts{};
+};
+
+/// Benchmarks by name, in the order of the list.
+class Figures {
+  public:
+    /// Reads the JSON of Google Benchmark; throws std::runtime_error.
+    explicit Figures(const std::string& file);
+
+    const std::vector<std::string>& names() const noexcept { return names_; }
+    /// The benchmark of that name, which must be there.
+    const Figure& at(const std::string& name) const { return figures_.at(name); }
+    const std::string& machine() const noexcept { return machine_; }
+
+  private:
+    std::vector<std::string> names_;
+    std::map<std::string, Figure> figures_;
+    std::string machine_;
+};
+
+/// Instructions a request by name ("EnumerateInstances KORVA_RunningOS/floor"): lines of the name,
+/// a tab and the number. Throws std::runtime_error.
+std::map<std::string, double> readInstructions(const std::string& file);
+
+}  // namespace bench
