@@ -74,12 +74,12 @@ bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* n
 
 void ProviderUtilities::transformObjectPathToMoniker(const CMPIObjectPath* path, Moniker& moniker) {
     const unsigned int count = getKeyCount(path);
+    std::string value;
     for (unsigned int index = 0; index < count; ++index) {
         CMPIStatus status = {CMPI_RC_OK, nullptr};
         CMPIString* name = nullptr;
         const CMPIData data = path->ft->getKeyAt(path, index, &name, &status);
         const char* characters = charactersOf(name);
-        std::string value;
         if (status.rc == CMPI_RC_OK && characters != nullptr && keyText(data, value))
             moniker.addKey(characters, value);
     }

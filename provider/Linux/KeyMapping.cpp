@@ -9,9 +9,9 @@ namespace VA::OSStatusProvider {
 std::string valueOfFirst(VA::Moniker& moniker, std::initializer_list<const char*> names,
                          const char* missing) {
     const unsigned int count = moniker.getKeyCount();
+    std::string name;
     for (unsigned int index = 0; index < count; ++index) {
         if (!moniker.selectKey(index)) continue;
-        std::string name;
         moniker.getName(name);
         if (std::find(names.begin(), names.end(), name) == names.end()) continue;
         std::string value;
