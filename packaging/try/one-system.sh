@@ -1,0 +1,177 @@
+# Called by try-packages, in a mount namespace of its own: tries the packages of one architecture on
+# one system: one-system.sh ARCHITECTURE SUITE MIRROR PACKAGES WORK
+# PACKAGES is the folder of the packages, WORK an empty folder that the system is made in.
+# shellcheck shell=sh
+# Functions are run by check, and dpkg-query fills in what stands in its format.
+# shellcheck disable=SC2317,SC2016
+set -eu
+architecture=$1
+suite=$2
+mirror=$3
+packages=$4
+work=$5
+root=$work/root
+log=$work/log
+own="korva-osstatus-provider korva-osstatus-companion korva-osstatus-dev korva-osstatus-tools"
+status=0
+
+# check WHAT COMMAND...: runs it, tells whether it did well, and goes on.
+check() {
+    what=$1
+    shift
+    # In a condition, a function would go on behind a command that fails.
+    set +e
+    (set -e; "$@") >"$log" 2>&1
+    code=$?
+    set -e
+    if [ "$code" -eq 0 ]; then
+        echo "ok      $what"
+    else
+        echo "FAILED  $what"
+        tail -n 40 "$log" | sed 's/^/        /'
+        status=1
+    fi
+}
+
+# ---- the system
+
+inside() {
+    env -i PATH=/usr/sbin:/usr/bin:/sbin:/bin LC_ALL=C DEBIAN_FRONTEND=noninteractive \
+        chroot "$root" "$@"
+}
+
+make_system() {
+    debootstrap --variant=minbase --arch="$architecture" "$suite" "$root" "$mirror"
+    mount -t proc proc "$root/proc"
+    inside apt-get -qq clean
+}
+
+# The packages go in twice: as they are, and as later ones.
+bring_packages() {
+    mkdir "$root/packages" "$root/later"
+    for package in "$packages"/korva-osstatus-*_"$architecture".deb; do
+        cp "$package" "$root/packages/"
+        version=$(dpkg-deb -f "$package" Version)
+        dpkg-deb -R "$package" "$work/unpacked"
+        sed -i "s/^Version: .*/&+later/; s/(= $version)/(= $version+later)/" "$work/unpacked/DEBIAN/control"
+        dpkg-deb --root-owner-group -b "$work/unpacked" "$root/later/"
+        rm -r "$work/unpacked"
+    done
+}
+
+# All that the system holds: kinds, rights and owners, then the contents; but for the state, caches and
+# logs of the package manager.
+everything() {
+    (
+        cd "$root"
+        set -- . -xdev \( -path ./var/lib/dpkg -o -path ./var/lib/apt -o -path ./var/cache/apt \
+            -o -path ./var/cache/debconf -o -path ./var/cache/ldconfig -o -path ./var/log/apt \
+            -o -path ./var/log/dpkg.log \) -prune -o
+        find "$@" -printf '%y %m %u %g %p %l\n' | LC_ALL=C sort
+        find "$@" -type f -exec cksum {} + | LC_ALL=C sort -k 3
+    )
+}
+
+# Names of the packages that are installed, or that left something.
+known_packages() { inside dpkg-query -W -f '${Package}\n' | sort; }
+installed_version() { inside dpkg-query -W -f '${db:Status-Status} ${Version}' "$1"; }
+
+# ---- the checks
+
+install_from() { inside sh -c "apt-get -y install /$1/*.deb"; }
+
+only_the_packages_came() {
+    known_packages >"$work/packages.now"
+    # The names are meant to be split.
+    # shellcheck disable=SC2086
+    printf '%s\n' $own | sort - "$work/packages.before" | diff - "$work/packages.now"
+}
+
+all_have_version() {
+    for name in $own; do
+        [ "$(installed_version "$name")" = "installed $1" ] || {
+            echo "$name: $(installed_version "$name"), not $1"
+            return 1
+        }
+    done
+}
+
+# The fifth byte of a binary tells its word size.
+has_word_size_of_the_architecture() {
+    class=2
+    [ "$architecture" = amd64 ] || class=1
+    for file in bin/cmpihost lib/cmpi/libkorzbosstatusprofileprovider.so lib/libvaprovider.so.1; do
+        [ "$(od -An -tu1 -j4 -N1 "$(readlink -f "$root/usr/$file")" | tr -d ' ')" = "$class" ] || {
+            echo "$file has another word size"
+            return 1
+        }
+    done
+}
+
+# shows PATTERN ARGUMENT...: the installed host, asked so, prints a line like that.
+shows() {
+    pattern=$1
+    shift
+    inside cmpihost "$@" >"$work/shown"
+    grep -Eq -e "$pattern" "$work/shown" || {
+        echo "no line like '$pattern':"
+        cat "$work/shown"
+        return 1
+    }
+}
+
+asks_the_host() {
+    check "cmpihost ei KORVA_OperatingSystem shows this Debian" \
+        shows '^  Name  +Debian GNU/Linux$' ei KORVA_OperatingSystem
+    check "... and its version" shows '^  Version  +12$' ei KORVA_OperatingSystem
+    check "cmpihost ein KORVA_OperatingSystem" shows ',Name="Debian GNU/Linux"$' ein KORVA_OperatingSystem
+    path=$(inside cmpihost ein KORVA_OperatingSystem 2>>"$log") || true
+    check "cmpihost ai from it to the computer system" \
+        shows '^  CreationClassName  +KORVA_ComputerSystem$' ai "$path" --assoc-class KORVA_RunningOS
+    check "cmpihost tree" shows 'Debian GNU/Linux 12 .KORVA_OperatingSystem.: Enabled' tree
+}
+
+has_man_pages() {
+    for page in man1/cmpihost.1 man5/zblog.conf.5 man7/korva-osstatus.7 man8/korva-osstatus-register.8; do
+        gzip -t "$root/usr/share/man/$page.gz"
+    done
+}
+
+keeps_a_log_where_the_configuration_says() {
+    cp "$root/usr/share/korva-osstatus/examples/zblog.conf" "$root/etc/zblog.conf"
+    inside cmpihost ein KORVA_OperatingSystem
+    rm "$root/etc/zblog.conf"
+    grep -q ' trace 4000 Zumbrel.OperatingSystemProvider ' "$root/var/log/korva-osstatus.log"
+}
+
+nothing_is_left() {
+    everything | diff "$work/before" -
+    known_packages | diff "$work/packages.before" -
+}
+
+check "a fresh system" make_system
+[ "$status" -eq 0 ] || exit 1
+check "packages of a later version" bring_packages
+version=$(dpkg-deb -f "$(find "$root/packages" -name '*-provider_*.deb')" Version)
+everything >"$work/before"
+known_packages >"$work/packages.before"
+
+check "apt-get install" install_from packages
+check "nothing but the packages came in" only_the_packages_came
+check "all of them have version $version" all_have_version "$version"
+check "word size of $architecture" has_word_size_of_the_architecture
+asks_the_host
+check "man pages" has_man_pages
+check "a log where /etc/zblog.conf says" keeps_a_log_where_the_configuration_says
+
+echo "# ours" >>"$root/etc/logrotate.d/korva-osstatus"
+check "apt-get install of the later version" install_from later
+check "all of them have version $version+later" all_have_version "$version+later"
+check "a changed configuration was kept" grep -q '^# ours$' "$root/etc/logrotate.d/korva-osstatus"
+asks_the_host
+
+# The names are meant to be split.
+# shellcheck disable=SC2086
+check "apt-get purge" inside apt-get -y purge $own
+check "nothing is left behind" nothing_is_left
+exit "$status"
