@@ -12,13 +12,24 @@ namespace {
 constexpr const char* providerName = "libkorzbosstatusprofileprovider.so";
 constexpr const char* companionName = "libkorvacomputersystemprovider.so";
 
-std::vector<fs::path> candidatesFor(const std::string& name, const fs::path& programFolder) {
+/// The folders that object managers load providers from, below a prefix: the one that the providers
+/// are installed in, then the usual ones.
+std::vector<fs::path> cmpiFolders(const fs::path& installed) {
+    std::vector<fs::path> folders = {installed};
+    for (const char* libraries : {KORVA_LIBRARY_FOLDER, "lib", "lib64", "lib32"}) {
+        folders.push_back(fs::path(libraries) / "cmpi");
+    }
+    return folders;
+}
+
+std::vector<fs::path> candidatesFor(const std::string& name, const fs::path& programFolder,
+                                    const fs::path& installed) {
     const std::string soname = name + ".1";
     const fs::path prefix = programFolder.parent_path();
     std::vector<fs::path> candidates = {prefix / "lib" / soname, programFolder / soname};
-    for (const char* libraries : {KORVA_LIBRARY_FOLDER, "lib", "lib64", "lib32"}) {
+    for (const fs::path& folder : cmpiFolders(installed)) {
         for (const std::string& file : {name, soname}) {
-            fs::path candidate = prefix / libraries / "cmpi" / file;
+            fs::path candidate = prefix / folder / file;
             if (std::find(candidates.begin(), candidates.end(), candidate) == candidates.end()) {
                 candidates.push_back(std::move(candidate));
             }
@@ -54,16 +65,20 @@ fs::path schemaFolder(const fs::path& programFolder) {
     return programFolder.parent_path() / "share/korva-osstatus/schema";
 }
 
-std::vector<fs::path> providerCandidates(const fs::path& programFolder) {
-    return candidatesFor(providerName, programFolder);
+fs::path installedProviderFolder() {
+    return KORVA_CMPI_FOLDER;
 }
 
-fs::path findProvider(const fs::path& programFolder) {
-    return firstFile(providerCandidates(programFolder));
+std::vector<fs::path> providerCandidates(const fs::path& programFolder, const fs::path& installed) {
+    return candidatesFor(providerName, programFolder, installed);
 }
 
-fs::path findCompanion(const fs::path& programFolder) {
-    return firstFile(candidatesFor(companionName, programFolder));
+fs::path findProvider(const fs::path& programFolder, const fs::path& installed) {
+    return firstFile(providerCandidates(programFolder, installed));
+}
+
+fs::path findCompanion(const fs::path& programFolder, const fs::path& installed) {
+    return firstFile(candidatesFor(companionName, programFolder, installed));
 }
 
 }  // namespace cmpihost

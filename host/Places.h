@@ -15,15 +15,26 @@ std::filesystem::path programFolder(const std::string& invokedAs,
 /// The folder of the MOF files that belongs to a program in that folder.
 std::filesystem::path schemaFolder(const std::filesystem::path& programFolder);
 
+/// The folder that the providers are installed in: below the prefix, or absolute.
+std::filesystem::path installedProviderFolder();
+
 /// Where the provider's library can be for a program in that folder, best place first: the library
-/// folder beside it, the folder itself, the folders that object managers load providers from.
-std::vector<std::filesystem::path> providerCandidates(const std::filesystem::path& programFolder);
+/// folder beside it, the folder itself, the folder that the providers are installed in (below the
+/// folder that holds the program's, or absolute), the folders that object managers usually load
+/// providers from.
+std::vector<std::filesystem::path> providerCandidates(
+    const std::filesystem::path& programFolder,
+    const std::filesystem::path& installed = installedProviderFolder());
 
 /// The first candidate that exists; empty when none does.
-std::filesystem::path findProvider(const std::filesystem::path& programFolder);
+std::filesystem::path findProvider(
+    const std::filesystem::path& programFolder,
+    const std::filesystem::path& installed = installedProviderFolder());
 
 /// The library of the computer system's provider, looked for in the same places; empty when there
 /// is none.
-std::filesystem::path findCompanion(const std::filesystem::path& programFolder);
+std::filesystem::path findCompanion(
+    const std::filesystem::path& programFolder,
+    const std::filesystem::path& installed = installedProviderFolder());
 
 }  // namespace cmpihost

@@ -43,6 +43,23 @@ TEST_F(Places, PreferTheLibraryFolderThenTheProgramsThenTheObjectManagers) {
     EXPECT_EQ(found(), prefix_ / "lib/libkorzbosstatusprofileprovider.so.1");
 }
 
+TEST_F(Places, KnowTheFolderThatTheProvidersAreInstalledIn) {
+    fs::create_directories(prefix_ / "agents");
+    touch("lib/cmpi/libkorzbosstatusprofileprovider.so");
+    touch("lib/cmpi/libkorvacomputersystemprovider.so");
+    EXPECT_EQ(findProvider(prefix_ / "bin", "agents"),
+              prefix_ / "lib/cmpi/libkorzbosstatusprofileprovider.so");
+    touch("agents/libkorzbosstatusprofileprovider.so");
+    touch("agents/libkorvacomputersystemprovider.so");
+    for (const fs::path& installed : {fs::path("agents"), prefix_ / "agents"}) {
+        EXPECT_EQ(findProvider(prefix_ / "bin", installed),
+                  prefix_ / "agents/libkorzbosstatusprofileprovider.so");
+        EXPECT_EQ(findCompanion(prefix_ / "bin", installed),
+                  prefix_ / "agents/libkorvacomputersystemprovider.so");
+    }
+    EXPECT_EQ(installedProviderFolder(), KORVA_CMPI_FOLDER);
+}
+
 TEST_F(Places, DoNotTakeAFolderForALibrary) {
     fs::create_directories(prefix_ / "lib/libkorzbosstatusprofileprovider.so.1");
     EXPECT_EQ(found(), "");

@@ -175,10 +175,30 @@ AgentIsBuiltWithPkgConfig() {
     expect_equal "the agent's output" "$(uname -n) 55 0" "$output"
 }
 
+# configure OPTION...: a tree of its own in $work/build, which is not built.
+configure() {
+    expect_success cmake -G Ninja -S "$KORVA_SOURCE_DIR" -B "$work/build" -DKORVA_TEST_AREAS= \
+        -DKORVA_WORD_SIZE="$KORVA_WORD_SIZE" "$@"
+}
+
 ProvidersFollowTheLibrariesToAnotherFolder() {
-    expect_success cmake -G Ninja -S "$KORVA_SOURCE_DIR" -B "$work/build" -DCMAKE_INSTALL_LIBDIR=lib64 \
-        -DKORVA_TEST_AREAS= -DKORVA_WORD_SIZE="$KORVA_WORD_SIZE"
+    configure -DCMAKE_INSTALL_LIBDIR=lib64
     grep -qx "KORVA_CMPI_LIBDIR:STRING=lib64/cmpi" "$work/build/CMakeCache.txt" ||
         fail "the providers do not go to lib64/cmpi"
     expect_text "libdir=\${prefix}/lib64" "$(cat "$work/build/generated/zblog.pc")"
+}
+
+HostKnowsAnotherFolderOfTheProviders() {
+    configure -DKORVA_CMPI_LIBDIR=agents/cim
+    grep -F 'Places.cpp' "$work/build/compile_commands.json" >"$work/compiled"
+    expect_text 'KORVA_CMPI_FOLDER=\\\"agents/cim\\\"' "$(cat "$work/compiled")"
+}
+
+LibrariesOfDebianGoToTheFolderOfTheirArchitecture() {
+    architecture=x86_64
+    [ "$KORVA_WORD_SIZE" = 64 ] || architecture=i386
+    configure -DCMAKE_INSTALL_PREFIX=/usr
+    expect_text "libdir=\${prefix}/lib/$architecture-linux-gnu" "$(cat "$work/build/generated/zblog.pc")"
+    grep -qx "KORVA_CMPI_LIBDIR:STRING=lib/cmpi" "$work/build/CMakeCache.txt" ||
+        fail "the providers do not go to lib/cmpi"
 }
