@@ -146,6 +146,19 @@ RefusesWrongUsage() {
     expect_calls ""
 }
 
+RefusesOptionsOfOpenPegasusForSfcb() {
+    with_sfcb
+    with_pegasus
+    for option in --repository --interop; do
+        register --cimom sfcb "$option" srv/x register
+        expect_code 2
+        expect_text "$option is for OpenPegasus only, not for --cimom sfcb" "$output"
+        register "$option=srv/x" --cimom=sfcb register
+        expect_code 2
+    done
+    expect_calls ""
+}
+
 RefusesNamesThatAreNoNamespaces() {
     with_sfcb
     for name in /root root/ root//cimv2 'root;id' 'a|b' 'a b' '../x'; do
@@ -181,7 +194,7 @@ RunsInEveryShell() {
 ShellScriptsAreWithoutFault() {
     need_tool shellcheck shellcheck
     packaging=$KORVA_SOURCE_DIR/packaging
-    expect_success shellcheck "$packaging/korva-osstatus-register" "$packaging/build-packages" \
-        "$packaging"/register/*.sh "$packaging"/debian/*/p*
+    expect_success shellcheck -x "$packaging/korva-osstatus-register" "$packaging/build-packages" \
+        "$packaging/try-packages" "$packaging"/try/*.sh "$packaging"/register/*.sh "$packaging"/debian/*/p*
     expect_success shellcheck stand-in ./*.sh
 }
