@@ -10,7 +10,7 @@ namespace ZBLog {
 
 namespace {
 
-constexpr std::string_view blanks = " \t\r";
+constexpr std::string_view blanks = " \t";
 
 std::string_view trimmed(std::string_view text) {
     const std::size_t first = text.find_first_not_of(blanks);
@@ -38,10 +38,20 @@ bool isControl(char character) {
     return byte == 0x7F || (byte < 0x20 && blanks.find(character) == std::string_view::npos);
 }
 
-/// Each sets one thing from its text; false when the text is malformed.
-bool setSink(ChannelConfiguration& channel, std::string_view value) {
-    constexpr std::string_view filePrefix = "file:";
+constexpr const char* sinkForm = "off, stderr, syslog or file:/PATH";
+
+/// What the path of a file must be; null if this is one.
+const char* faultOfPath(std::string_view path) {
     constexpr std::size_t longestPath = 4095;
+    if (path.empty()) return sinkForm;
+    if (path.front() != '/') return "file:/PATH with a path that begins with /";
+    if (path.back() == '/') return "file:/PATH with a path that does not end in /";
+    return path.size() > longestPath ? "file:/PATH with a path of at most 4095 bytes" : nullptr;
+}
+
+/// Each sets one thing from its text; null, or what the text must be and is not.
+const char* setSink(ChannelConfiguration& channel, std::string_view value) {
+    constexpr std::string_view filePrefix = "file:";
     constexpr std::pair<std::string_view, Destination> words[] = {
         {"off", Destination::nowhere},
         {"stderr", Destination::standardError},
@@ -50,28 +60,27 @@ bool setSink(ChannelConfiguration& channel, std::string_view value) {
     for (const auto& [word, destination] : words) {
         if (value != word) continue;
         channel.destination = destination;
-        return true;
+        return nullptr;
     }
-    if (value.substr(0, filePrefix.size()) != filePrefix) return false;
+    if (value.substr(0, filePrefix.size()) != filePrefix) return sinkForm;
     value.remove_prefix(filePrefix.size());
-    if (value.empty() || value.size() > longestPath) return false;
-    if (value.front() != '/' || value.back() == '/') return false;
     channel.destination = Destination::file;
     channel.path = value;
-    return true;
+    return faultOfPath(value);
 }
 
-bool setLevel(ChannelConfiguration& channel, std::string_view value) {
+const char* setLevel(ChannelConfiguration& channel, std::string_view value) {
+    constexpr const char* form = "a number from 0 to 999999";
     constexpr std::size_t mostDigits = 6;
-    if (value.size() > mostDigits || value.substr(0, 1) == "-") return false;
+    if (value.size() > mostDigits || value.substr(0, 1) == "-") return form;
     const char* const end = value.data() + value.size();
     const auto [stop, error] = std::from_chars(value.data(), end, channel.level);
-    return error == std::errc() && stop == end;
+    return error == std::errc() && stop == end ? nullptr : form;
 }
 
-bool setRecords(ChannelConfiguration& channel, std::string_view value) {
+const char* setRecords(ChannelConfiguration& channel, std::string_view value) {
     channel.failuresOnly = value == "failures";
-    return channel.failuresOnly || value == "all";
+    return channel.failuresOnly || value == "all" ? nullptr : "all or failures";
 }
 
 bool isPattern(std::string_view text) {
@@ -79,37 +88,27 @@ bool isPattern(std::string_view text) {
     return text.find('*') >= text.size() - 1;
 }
 
-bool setCategory(ChannelConfiguration& channel, std::string_view value) {
+const char* setCategory(ChannelConfiguration& channel, std::string_view value) {
     std::size_t items = 1 + static_cast<std::size_t>(std::count(value.begin(), value.end(), ','));
     for (; items > 0; --items) {
         const std::string_view pattern = trimmed(takeUntil(',', value));
-        if (!isPattern(pattern)) return false;
+        if (!isPattern(pattern)) return "NAME or BEGINNING*, separated by commas";
         channel.categories.add(pattern);
     }
-    return true;
+    return nullptr;
 }
 
 struct Setting {
     std::string_view key;
     Channel channel;
-    bool (*set)(ChannelConfiguration&, std::string_view);
-    const char* form;
+    const char* (*set)(ChannelConfiguration&, std::string_view);
 };
 
-constexpr const char* sinkForm = "off, stderr, syslog or file:/PATH";
-constexpr const char* levelForm = "a number from 0 to 999999";
-constexpr const char* recordsForm = "all or failures";
-constexpr const char* categoryForm = "NAME or BEGINNING*, separated by commas";
-
 constexpr Setting settings[] = {
-    {"log.sink", Channel::log, setSink, sinkForm},
-    {"log.level", Channel::log, setLevel, levelForm},
-    {"log.records", Channel::log, setRecords, recordsForm},
-    {"log.category", Channel::log, setCategory, categoryForm},
-    {"trace.sink", Channel::trace, setSink, sinkForm},
-    {"trace.level", Channel::trace, setLevel, levelForm},
-    {"trace.records", Channel::trace, setRecords, recordsForm},
-    {"trace.category", Channel::trace, setCategory, categoryForm},
+    {"log.sink", Channel::log, setSink},           {"log.level", Channel::log, setLevel},
+    {"log.records", Channel::log, setRecords},     {"log.category", Channel::log, setCategory},
+    {"trace.sink", Channel::trace, setSink},       {"trace.level", Channel::trace, setLevel},
+    {"trace.records", Channel::trace, setRecords}, {"trace.category", Channel::trace, setCategory},
 };
 
 /// Reads one line after the other into a configuration.
@@ -119,6 +118,7 @@ class Reader {
 
     /// What is wrong with the line, empty if nothing is.
     std::string read(std::string_view line) {
+        if (!line.empty() && line.back() == '\r') line.remove_suffix(1);
         line = trimmed(line);
         if (line.empty() || line.front() == '#') return {};
         if (std::any_of(line.begin(), line.end(), isControl)) {
@@ -140,8 +140,9 @@ class Reader {
         bool& given = given_[static_cast<std::size_t>(setting - std::begin(settings))];
         if (given) return std::string(key) + " is given twice";
         given = true;
-        if (setting->set(configuration_.of(setting->channel), value)) return {};
-        return std::string(key) + " must be " + setting->form + ", not " + quoted(value);
+        const char* const form = setting->set(configuration_.of(setting->channel), value);
+        if (form == nullptr) return {};
+        return std::string(key) + " must be " + form + ", not " + quoted(value);
     }
 
     Configuration& configuration_;

@@ -67,6 +67,8 @@ const GoodRow goodRows[] = {
      "syslog[] 3000 failures A B; off[] 4000 all"},
     {"no blanks, ends of line of another system", "log.level=1\r\ntrace.level=2\r\n",
      "syslog[] 1 failures A B; off[] 2 all A B"},
+    {"a comment, and a last line without a newline, of another system", "# x\r\nlog.level = 1\r",
+     "syslog[] 1 failures A B; off[] 4000 all A B"},
     {"blanks everywhere", " \tlog.level\t =  7 \t", "syslog[] 7 failures A B; off[] 4000 all A B"},
     {"all keys in any order",
      "trace.category = Zumbrel.B\ntrace.records = failures\ntrace.level = 3000\n"
@@ -102,11 +104,16 @@ const BadRow badRows[] = {
     {"empty value", "trace.sink =\n",
      "1: trace.sink must be off, stderr, syslog or file:/PATH, not \"\"\n"},
     {"relative path", "log.sink = file:korva.log\n",
-     "1: log.sink must be off, stderr, syslog or file:/PATH, not \"file:korva.log\"\n"},
+     "1: log.sink must be file:/PATH with a path that begins with /, not \"file:korva.log\"\n"},
     {"no path", "log.sink = file:\n",
      "1: log.sink must be off, stderr, syslog or file:/PATH, not \"file:\"\n"},
     {"a folder's path", "log.sink = file:/var/log/\n",
-     "1: log.sink must be off, stderr, syslog or file:/PATH, not \"file:/var/log/\"\n"},
+     "1: log.sink must be file:/PATH with a path that does not end in /, not "
+     "\"file:/var/log/\"\n"},
+    {"a carriage return within a line", "log.level = 1\rtrace.level = 2\r\n",
+     "1: control character in \"log.level = 1\\x0Dtrace.level = 2\"\n"},
+    {"two carriage returns", "log.level = 1\r\r\n",
+     "1: control character in \"log.level = 1\\x0D\"\n"},
     {"negative level", "log.level = -1\n",
      "1: log.level must be a number from 0 to 999999, not \"-1\"\n"},
     {"level with a sign", "log.level = +1\n",
@@ -163,7 +170,10 @@ TEST(ConfigurationParser, AllowsControlCharactersInComments) {
 TEST(ConfigurationParser, TakesThePathAsLongAsTheSystemDoesAndNoLonger) {
     const std::string key = "log.sink = file:";
     EXPECT_EQ(describe(parseConfiguration(key + "/" + std::string(4094, 'a'))), "");
-    EXPECT_EQ(parseConfiguration(key + "/" + std::string(4095, 'a')).errors.size(), 1u);
+    const ParsedConfiguration parsed = parseConfiguration(key + "/" + std::string(4095, 'a'));
+    ASSERT_EQ(parsed.errors.size(), 1u);
+    EXPECT_EQ(parsed.errors.front().message.substr(0, 60),
+              "log.sink must be file:/PATH with a path of at most 4095 byte");
 }
 
 TEST(ConfigurationParser, RefusesMoreThan65536BytesWithoutLookingAtThem) {

@@ -44,8 +44,8 @@ PageOfTheRegisterCommandHasItsOptions() {
 }
 
 PageOfTheConfigurationHasItsKeys() {
-    sed -n 's/^    {"\([a-z]*\.[a-z]*\)", Channel.*/\1/p' \
-        "$KORVA_SOURCE_DIR/framework/logging/ConfigurationParser.cpp" | sort >"$work/keys"
+    grep -o '{"[a-z]*\.[a-z]*", Channel' "$KORVA_SOURCE_DIR/framework/logging/ConfigurationParser.cpp" |
+        cut -d '"' -f 2 | sort >"$work/keys"
     expect_equal keys "$(cat "$work/keys")" \
         "$(sed -n 's/^\.It Cm \(log\.[a-z]*\) , \(trace\.[a-z]*\)$/\1 \2/p' "$pages/zblog.conf.5" | tr ' ' '\n' | sort)"
     [ "$(wc -l <"$work/keys")" -eq 8 ] || fail "not eight keys: $(cat "$work/keys")"
