@@ -49,6 +49,26 @@ TEST_F(FileSinkFaultTest, FullDiskIsToldOnce) {
                                       "until it can be written again"));
 }
 
+TEST_F(FileSinkFaultTest, LossOnAFullDiskIsToldInTheFileWhenThereIsRoomAgain) {
+    const std::string disk = folder_ / "disk";
+    const std::string path = disk + "/full";
+    std::filesystem::create_directory_symlink("/dev", disk);
+    ZBLog::FileSink sink(path, surroundings_);
+    for (int count = 0; count < 100; ++count) sink.write(record("lost"));
+    EXPECT_THAT(surroundings_.takeSystemLog(),
+                ElementsAre(warning + path +
+                            ": No space left on device; records are dropped "
+                            "until it can be written again"));
+
+    std::filesystem::remove(disk);
+    std::filesystem::create_directory(disk);
+    sink.write(record("one"));
+    sink.write(record("two"));
+    EXPECT_THAT(textsOf(readFile(path)),
+                ElementsAre("100 records were dropped: No space left on device", "one", "two"));
+    EXPECT_TRUE(surroundings_.takeSystemLog().empty());
+}
+
 TEST_F(FileSinkFaultTest, MissingFolderIsToldOnceAndTheLossIsToldInTheFileAfterwards) {
     std::filesystem::create_directory(folder_ / "var");
     const std::string path = folder_ / "var/korva.log";
