@@ -103,6 +103,35 @@ Format formatNamed(const std::string& word) {
     return found->second;
 }
 
+CLI::Validator notEmpty() {
+    return {[](const std::string& value) {
+                return value.empty() ? std::string("the value is empty") : std::string();
+            },
+            {}};
+}
+
+/// The arguments behind the program's name, last one first. An empty value that stands behind a
+/// sign of equality becomes an argument of its own: the parser would take the next argument for it.
+std::vector<std::string> separated(int argumentCount, const char* const* arguments) {
+    std::vector<std::string> result;
+    bool options = true;
+    for (int index = 1; index < argumentCount; ++index) {
+        std::string argument = arguments[index];
+        options = options && argument != "--";
+        const bool emptyValue = options && argument.compare(0, 2, "--") == 0 &&
+                                argument.find('=') == argument.size() - 1;
+        if (emptyValue) {
+            argument.pop_back();
+        }
+        result.push_back(std::move(argument));
+        if (emptyValue) {
+            result.emplace_back();
+        }
+    }
+    std::reverse(result.begin(), result.end());
+    return result;
+}
+
 /// The command line as CLI11 fills it, and the description of it all.
 class Parser {
   public:
@@ -123,7 +152,7 @@ class Parser {
 
     ParsedCommandLine parse(int argumentCount, const char* const* arguments) {
         try {
-            app_.parse(argumentCount, arguments);
+            app_.parse(separated(argumentCount, arguments));
         } catch (const CLI::CallForVersion& version) {
             return {std::nullopt, std::string(version.what()) + "\n", exitDone};
         } catch (const CLI::CallForHelp&) {
@@ -173,7 +202,8 @@ std::string Parser::withoutOperation(const CLI::ParseError& error) const {
 void Parser::addHostOptions() {
     app_.add_option("--provider", result_.provider,
                     "Library of the provider; without it the one beside this program")
-        ->type_name("FILE");
+        ->type_name("FILE")
+        ->check(notEmpty());
     app_.add_option_function<std::string>(
             "--format", [this](const std::string& word) { result_.format = formatNamed(word); },
             "How results are printed: table (the default), mof or json;\n"
@@ -182,11 +212,13 @@ void Parser::addHostOptions() {
     app_.add_flag("--log", result_.log, "Show the records of the provider on the standard error");
     app_.add_option("--schema", result_.schema,
                     "Folder of the MOF files; without it the one beside this program")
-        ->type_name("DIR");
+        ->type_name("DIR")
+        ->check(notEmpty());
     app_.add_option("--companion", result_.companion,
                     "Library that serves the computer system; without it the one beside this\n"
                     "program, else this program itself")
-        ->type_name("FILE");
+        ->type_name("FILE")
+        ->check(notEmpty());
     app_.add_option(
             "--computer-systems", result_.computerSystems,
             "How many computer systems there are to be, 0 to 1000, to see what then happens")
@@ -229,30 +261,39 @@ void Parser::addFilters(CLI::App& operation, Filters filters) {
     }
     if (filters == Filters::Associators) {
         operation.add_option("--assoc-class", result_.assocClass, "Class of the association")
-            ->type_name("CLASS");
+            ->type_name("CLASS")
+            ->check(notEmpty());
     }
     operation
         .add_option(
             "--result-class", result_.resultClass,
             filters == Filters::Associators ? "Class of the far end" : "Class of the association")
-        ->type_name("CLASS");
+        ->type_name("CLASS")
+        ->check(notEmpty());
     operation.add_option("--role", result_.role, "Reference that points to the source")
-        ->type_name("NAME");
+        ->type_name("NAME")
+        ->check(notEmpty());
     if (filters == Filters::Associators) {
         operation
             .add_option("--result-role", result_.resultRole, "Reference that points to the far end")
-            ->type_name("NAME");
+            ->type_name("NAME")
+            ->check(notEmpty());
     }
 }
 
 void Parser::addQuery() {
     CLI::App* query = addWord("xq", "Execute a query", Operation::ExecQuery);
-    query->add_option("QUERY", result_.query, "Text of the query")->required()->type_name("");
+    query->add_option("QUERY", result_.query, "Text of the query")
+        ->required()
+        ->check(notEmpty())
+        ->type_name("");
     query->add_option("--lang", result_.queryLanguage, "Language of the query")
         ->type_name("NAME")
+        ->check(notEmpty())
         ->capture_default_str();
     query->add_option("--namespace", result_.nameSpace, "Namespace of the query")
         ->type_name("NAME")
+        ->check(notEmpty())
         ->capture_default_str();
 }
 
@@ -264,6 +305,7 @@ void Parser::addTree() {
     tree->callback([this] { result_.tree = true; });
     tree->add_option("--namespace", result_.nameSpace, "Namespace of the classes")
         ->type_name("NAME")
+        ->check(notEmpty())
         ->capture_default_str();
 }
 

@@ -49,6 +49,7 @@ class PathParser {
         : written_(written), source_(std::move(source)), catalogue_(catalogue) {}
 
     ObjectPathValue parse(const std::string& outerNamespace);
+    std::string parseNamespace();
 
   private:
     [[noreturn]] void fail(std::size_t offset, const std::string& complaint) const {
@@ -167,6 +168,17 @@ ObjectPathValue PathParser::parse(const std::string& outerNamespace) {
     return path;
 }
 
+std::string PathParser::parseNamespace() {
+    const std::string word = takeWhile(isNamespacePart);
+    if (word.empty()) {
+        fail(0, "expected the name of a namespace");
+    }
+    if (!atEnd()) {
+        fail(offset_, "the name of a namespace holds letters, digits, '_', '-' and '/' only");
+    }
+    return nameSpace(word, 0);
+}
+
 void PathParser::keys(ObjectPathValue& path) {
     const ClassDeclaration* declaration =
         catalogue_ == nullptr ? nullptr : catalogue_->find(path.className);
@@ -282,6 +294,10 @@ PathError::PathError(const std::string& text, std::size_t offset, const std::str
 
 ObjectPathValue parsePath(const std::string& text, const ClassCatalogue* catalogue) {
     return PathParser(text, wholeText(text), catalogue).parse(defaultNamespace);
+}
+
+std::string parseNamespace(const std::string& text) {
+    return PathParser(text, wholeText(text), nullptr).parseNamespace();
 }
 
 }  // namespace cmpihost

@@ -35,6 +35,10 @@ class PathError : public std::runtime_error {
 /// that names no namespace is in the one of the outer path. Throws PathError.
 ObjectPathValue parsePath(const std::string& text, const ClassCatalogue* catalogue);
 
+/// The name of a namespace, as it stands in a path: names of letters, digits, '_' and '-' with '/'
+/// between them. Throws PathError for any other text.
+std::string parseNamespace(const std::string& text);
+
 /// The path as parsePath reads it. A host name goes before the namespace; the path of a class has
 /// no dot. Reals, which no key can be, are written as numbers, and null as an empty text.
 std::string writePath(const ObjectPathValue& path);

@@ -102,7 +102,7 @@ OperationRequest buildRequest(const CommandLine& commandLine, const Schema& sche
     if (request.operation == Operation::ExecQuery) {
         request.query = commandLine.query;
         request.queryLanguage = commandLine.queryLanguage;
-        request.path = {commandLine.nameSpace, selectedClass(commandLine.query)};
+        request.path = {parseNamespace(commandLine.nameSpace), selectedClass(commandLine.query)};
         return request;
     }
     request.path = parsePath(commandLine.path, &catalogue);

@@ -5,6 +5,7 @@
 #include <type_traits>
 
 #include "host/Notes.h"
+#include "host/PathText.h"
 #include "host/Places.h"
 #include "host/ProviderHost.h"
 #include "host/RecordsOnStderr.h"
@@ -130,12 +131,13 @@ class Run {
     }
 
     ExitStatus drawHost(const Schema& schema, const SchemaCatalogue& catalogue) {
+        const std::string nameSpace = parseNamespace(commandLine_.nameSpace);
         try {
             const std::vector<TreeNode> roots = hosted(catalogue, [&](ProviderHost& host) {
                 const Ask ask = [&host](const OperationRequest& request) {
                     return host.ask(request);
                 };
-                return hostTree(ask, commandLine_.nameSpace, schema);
+                return hostTree(ask, nameSpace, schema);
             });
             for (const TreeNode& root : roots) {
                 drawTree(root, out_);

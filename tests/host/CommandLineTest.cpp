@@ -145,6 +145,48 @@ TEST(CommandLine, RefusesWhatItDoesNotKnow) {
     }
 }
 
+TEST(CommandLine, RefusesAnEmptyValueHoweverItIsWritten) {
+    const std::vector<std::pair<const char*, std::vector<const char*>>> rows = {
+        {"--provider", {"ei", "X"}},     {"--schema", {"ei", "X"}},
+        {"--companion", {"ei", "X"}},    {"--assoc-class", {"ai", "X"}},
+        {"--result-class", {"ri", "X"}}, {"--role", {"rin", "X"}},
+        {"--result-role", {"ain", "X"}}, {"--lang", {"xq", "q"}},
+        {"--namespace", {"xq", "q"}},    {"--namespace", {"tree"}},
+    };
+    for (const auto& [option, operation] : rows) {
+        const std::string sign = std::string(option) + "=";
+        for (const std::vector<const char*>& value :
+             {std::vector<const char*>{option, ""}, {sign.c_str()}}) {
+            std::vector<const char*> words = operation;
+            words.insert(words.end(), value.begin(), value.end());
+            const ParsedCommandLine result = parsed(words);
+            EXPECT_FALSE(result.commandLine.has_value()) << option;
+            EXPECT_EQ(result.status, exitUsage);
+            EXPECT_EQ(result.text, std::string(option) +
+                                       ": the value is empty\n"
+                                       "Run cmpihost --help for more information.\n");
+        }
+    }
+    EXPECT_EQ(parsed({"xq", ""}).text,
+              "QUERY: the value is empty\nRun cmpihost --help for more information.\n");
+    for (const char* option : {"--format=", "--computer-systems=", "--log="}) {
+        EXPECT_EQ(parsed({option, "ei", "X"}).status, exitUsage) << option;
+        EXPECT_FALSE(parsed({option, "ei", "X"}).commandLine.has_value()) << option;
+    }
+}
+
+TEST(CommandLine, TakesAnEmptyListOfPropertiesBehindASignOfEquality) {
+    const CommandLine line = accepted({"ei", "X", "--properties=", "--log"});
+    EXPECT_THAT(*line.properties, IsEmpty());
+    EXPECT_TRUE(line.log);
+    EXPECT_THAT(*accepted({"gi", "X", "--properties=", "A"}).properties, ElementsAre("A"));
+    EXPECT_THAT(*accepted({"gi", "X", "--properties=A="}).properties, ElementsAre("A="));
+}
+
+TEST(CommandLine, LeavesWhatStandsBehindTwoDashesAsItIs) {
+    EXPECT_THAT(accepted({"ci", "X", "--", "--a="}).assignments, ElementsAre("--a="));
+}
+
 TEST(CommandLine, TellsItsVersion) {
     const ParsedCommandLine result = parsed({"--version"});
     EXPECT_FALSE(result.commandLine.has_value());

@@ -279,4 +279,36 @@ TEST(PathParser, AnswersEveryBeginningOfAGoodPathWithAResultOrAnError) {
     }
 }
 
+std::string complaintAboutNamespace(const std::string& text) {
+    try {
+        return "accepted as " + parseNamespace(text);
+    } catch (const PathError& error) {
+        return error.what();
+    }
+}
+
+TEST(NamespaceParser, TakesWhatAPathTakes) {
+    for (const char* name : {"interop", "root/cimv2", "root/PG_InterOp", "a-b/c_1"}) {
+        EXPECT_EQ(parseNamespace(name), name);
+    }
+}
+
+TEST(NamespaceParser, ShowsWhereANameIsNone) {
+    const std::vector<std::pair<const char*, const char*>> rows = {
+        {"", "expected the name of a namespace\n  \n  ^"},
+        {"/root", "expected a name before '/' in the namespace\n  /root\n  ^"},
+        {"root//cimv2", "expected a name before '/' in the namespace\n  root//cimv2\n       ^"},
+        {"root/", "expected a name after '/' in the namespace\n  root/\n       ^"},
+        {"root cimv2",
+         "the name of a namespace holds letters, digits, '_', '-' and '/' only\n"
+         "  root cimv2\n      ^"},
+        {"root:X",
+         "the name of a namespace holds letters, digits, '_', '-' and '/' only\n"
+         "  root:X\n      ^"},
+    };
+    for (const auto& [name, complaint] : rows) {
+        EXPECT_EQ(complaintAboutNamespace(name), complaint);
+    }
+}
+
 }  // namespace

@@ -153,6 +153,17 @@ TEST(Program, ShowsAMalformedPathWithACaret) {
                                    "                             ^\n"));
 }
 
+TEST(Program, ShowsAMalformedNamespaceWithACaret) {
+    for (const auto& words : std::vector<std::vector<std::string>>{
+             {"tree", "--namespace", "root//cimv2"}, {"xq", "q", "--namespace=root//cimv2"}}) {
+        const ProgramRun run = withStandIn(words);
+        EXPECT_EQ(run.status, 2);
+        EXPECT_EQ(run.out, "");
+        EXPECT_EQ(run.err,
+                  "expected a name before '/' in the namespace\n  root//cimv2\n       ^\n");
+    }
+}
+
 TEST(Program, RefusesWrongUsage) {
     EXPECT_EQ(cmpihost({}).status, 2);
     EXPECT_EQ(cmpihost({}).err,
