@@ -1,0 +1,129 @@
+// The installed library and its framework, under the habits of object managers' loaders.
+#include <dlfcn.h>
+#include <gmock/gmock.h>
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+
+#include "host/Schema.h"
+#include "host/SchemaCatalogue.h"
+#include "host/broker/ComputerSystemService.h"
+#include "host/broker/Invoke.h"
+#include "host/broker/ProviderLibrary.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+using namespace cmpihost;
+
+/// Lines of a file under /proc/self.
+std::vector<std::string> linesOfProcess(const char* file) {
+    std::ifstream stream(std::string("/proc/self/") + file);
+    std::vector<std::string> lines;
+    for (std::string line; std::getline(stream, line);) lines.push_back(line);
+    return lines;
+}
+
+std::size_t openFiles() {
+    const fs::directory_iterator files("/proc/self/fd");
+    return static_cast<std::size_t>(std::distance(begin(files), end(files)));
+}
+
+long residentKiB() {
+    constexpr const char* label = "VmRSS:";
+    for (const std::string& line : linesOfProcess("status")) {
+        if (line.compare(0, 6, label) == 0) return std::strtol(line.c_str() + 6, nullptr, 10);
+    }
+    return 0;
+}
+
+class InstalledLibrary : public testing::Test {
+  protected:
+    static void SetUpTestSuite() {
+        std::string pattern = (fs::temp_directory_path() / "installedXXXXXX").string();
+        ASSERT_NE(mkdtemp(pattern.data()), nullptr);
+        prefix_ = pattern;
+        const std::string command = KORVA_CMAKE " --install '" KORVA_BINARY_DIR
+                                                "' --component provider --prefix '" +
+                                    pattern + "' >/dev/null";
+        ASSERT_EQ(std::system(command.c_str()), 0);
+        setenv("ZBLOG_CONF", "", 1);
+    }
+    static void TearDownTestSuite() { fs::remove_all(prefix_); }
+
+    InstalledLibrary()
+        : catalogue_(Schema::load(prefix_ / "share/korva-osstatus/schema")), broker_(&catalogue_) {
+        broker_.route(ComputerSystemService::className, computers_);
+    }
+    void TearDown() override { EXPECT_THAT(broker_.takeViolations(), testing::IsEmpty()); }
+
+    static std::string file() {
+        return prefix_ / KORVA_CMPI_FOLDER "/libkorzbosstatusprofileprovider.so";
+    }
+    static std::vector<std::string> mapped() {
+        std::vector<std::string> found;
+        for (const std::string& line : linesOfProcess("maps")) {
+            if (line.find(prefix_.string()) != std::string::npos) found.push_back(line);
+        }
+        return found;
+    }
+    std::size_t instancesOf(const char* className, ProviderLibrary& library) {
+        OperationRequest request;
+        request.operation = Operation::EnumerateInstances;
+        request.path = {"root/cimv2", className};
+        return invoke(library, broker_, request).instances.size();
+    }
+
+    static inline fs::path prefix_;
+    SchemaCatalogue catalogue_;
+    ComputerSystemService computers_{"host1"};
+    Broker broker_;
+};
+
+TEST_F(InstalledLibrary, OffersItsFactoriesByNameAndNoGenericOne) {
+    void* const handle = dlopen(file().c_str(), RTLD_NOW | RTLD_GLOBAL);
+    ASSERT_NE(handle, nullptr) << dlerror();
+    EXPECT_NE(dlsym(handle, "OperatingSystemProvider_Create_InstanceMI"), nullptr);
+    EXPECT_NE(dlsym(handle, "OperatingSystemProvider_Create_AssociationMI"), nullptr);
+    for (const char* kind : {"Instance", "Association", "Method", "Indication", "Property"}) {
+        const std::string generic = std::string("_Generic_Create_") + kind + "MI";
+        EXPECT_EQ(dlsym(handle, generic.c_str()), nullptr) << generic;
+    }
+    EXPECT_EQ(dlclose(handle), 0);
+    EXPECT_THAT(mapped(), testing::IsEmpty());
+}
+
+TEST_F(InstalledLibrary, ServesRequestsAfterAnIdleCleanup) {
+    ProviderLibrary library(file(), broker_);
+    for (int round = 0; round < 3; ++round) {
+        EXPECT_EQ(instancesOf("KORVA_OperatingSystem", library), 1U);
+        EXPECT_EQ(instancesOf("KORVA_RunningOS", library), 1U);
+        CMPIInstanceMI* const instance = library.instanceMI();
+        EXPECT_EQ(instance->ft->cleanup(instance, nullptr, 0).rc, CMPI_RC_OK);
+        CMPIAssociationMI* const association = library.associationMI();
+        EXPECT_EQ(association->ft->cleanup(association, nullptr, 0).rc, CMPI_RC_OK);
+    }
+}
+
+TEST_F(InstalledLibrary, LeavesNothingBehindWhenItIsLoadedAndUnloadedAHundredTimes) {
+    ProviderLibrary library(file(), broker_);
+    std::size_t filesBefore = 0;
+    long memoryBefore = 0;
+    for (int round = 1; round <= 100; ++round) {
+        library.load();
+        ASSERT_EQ(instancesOf("KORVA_OperatingSystem", library), 1U);
+        ASSERT_EQ(instancesOf("KORVA_InstalledOS", library), 1U);
+        ASSERT_TRUE(library.unload(false));
+        ASSERT_THAT(mapped(), testing::IsEmpty());
+        if (round == 20) {
+            filesBefore = openFiles();
+            memoryBefore = residentKiB();
+        }
+    }
+    EXPECT_EQ(openFiles(), filesBefore);
+    EXPECT_LT(residentKiB() - memoryBefore, 512);
+}
+
+}  // namespace
