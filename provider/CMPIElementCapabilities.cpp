@@ -147,6 +147,12 @@ CMPIOSElementCapabilities::operator bool() {
     return hasCurrent;
 }
 
+bool CMPIOSElementCapabilities::movesOn() const {
+    return requestedClassId == operatingSystemId ||
+           requestedClassId == operatingSystemCapabilitiesId ||
+           requestedClassId == elementCapabilitiesId;
+}
+
 CMPIOSElementCapabilities& CMPIOSElementCapabilities::operator++() {
     records.entering();
     switch (requestedClassId) {

@@ -53,6 +53,10 @@ class CMPIOSElementCapabilities {
     /// a further result.
     operator bool();
 
+    /// False when the path that the adapter was built from is of none of the classes that it walks:
+    /// operator++ then changes nothing, and operator bool stays true.
+    bool movesOn() const;
+
     /// Moves to the next result.
     CMPIOSElementCapabilities& operator++();
 

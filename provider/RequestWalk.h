@@ -4,6 +4,8 @@
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
 
+#include "CMPIElementCapabilities.h"
+
 namespace VA::OSStatusProvider {
 
 /// What a handler was called with, as far as a walk needs it.
@@ -29,18 +31,28 @@ inline bool handOver(const Request& request, const CMPIInstance* instance) {
     return true;
 }
 
+/// True for an adapter that would hand over one and the same element for ever: the broker told it
+/// another class of the path than it told the handler.
+template <class Adapter>
+bool neverEnds(const Adapter&) {
+    return false;
+}
+inline bool neverEnds(const CMPIOSElementCapabilities& adapter) {
+    return !adapter.movesOn();
+}
+
 /// The operations: what each takes from an adapter for its current element.
 struct ObjectPaths {
     template <class Adapter>
     static CMPIObjectPath* take(Adapter& adapter, const Request&) {
-        return adapter.getObjectPath();
+        return neverEnds(adapter) ? nullptr : adapter.getObjectPath();
     }
 };
 
 struct Instances {
     template <class Adapter>
     static CMPIInstance* take(Adapter& adapter, const Request& request) {
-        return adapter.getCMPIInstance(request.properties);
+        return neverEnds(adapter) ? nullptr : adapter.getCMPIInstance(request.properties);
     }
 };
 
