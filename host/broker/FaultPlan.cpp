@@ -27,7 +27,7 @@ void FaultPlan::clear() {
     faults_.clear();
     calls_.clear();
     total_ = 0;
-    fired_ = 0;
+    fired_.clear();
 }
 
 unsigned FaultPlan::calls() const {
@@ -53,13 +53,19 @@ std::map<std::string, unsigned> FaultPlan::callsByEntry() const {
 
 unsigned FaultPlan::fired() const {
     const std::lock_guard<std::mutex> lock(mutex_);
+    return static_cast<unsigned>(fired_.size());
+}
+
+std::vector<std::string> FaultPlan::firedCalls() const {
+    const std::lock_guard<std::mutex> lock(mutex_);
     return fired_;
 }
 
 std::optional<CMPIrc> FaultPlan::onCall(const char* table, const char* slot) {
     const std::lock_guard<std::mutex> lock(mutex_);
     ++total_;
-    ++calls_[std::string(table) + '.' + slot];
+    const std::string call = std::string(table) + '.' + slot;
+    ++calls_[call];
 
     std::optional<CMPIrc> answer;
     for (Planned& planned : faults_) {
@@ -70,7 +76,7 @@ std::optional<CMPIrc> FaultPlan::onCall(const char* table, const char* slot) {
         const bool past = fault.times != 0 && planned.seen - fault.nth >= fault.times;
         if (reached && !past && !answer) answer = fault.rc;
     }
-    if (answer) ++fired_;
+    if (answer) fired_.push_back(call);
     return answer;
 }
 

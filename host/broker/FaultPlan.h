@@ -46,6 +46,8 @@ class FaultPlan {
     std::map<std::string, unsigned> callsByEntry() const;
     /// How many calls were made to fail.
     unsigned fired() const;
+    /// "table.slot" of each call that was made to fail, in order.
+    std::vector<std::string> firedCalls() const;
 
     /// For the broker: counts one call and says how it fails, if it does.
     std::optional<CMPIrc> onCall(const char* table, const char* slot);
@@ -59,7 +61,7 @@ class FaultPlan {
     std::vector<Planned> faults_;
     std::map<std::string, unsigned> calls_;
     unsigned total_ = 0;
-    unsigned fired_ = 0;
+    std::vector<std::string> fired_;
 };
 
 }  // namespace cmpihost

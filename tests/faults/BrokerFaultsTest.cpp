@@ -1,0 +1,228 @@
+// A broker whose n-th call fails, or returns null, n counted up until none fails any more.
+#include <algorithm>
+
+#include "faults/FaultFixture.h"
+
+namespace {
+
+using namespace cmpihost;
+using Texts = std::vector<std::string>;
+
+constexpr unsigned mostCalls = 1000;  ///< no request makes so many
+
+const char* const noComputerSystem = "Could not obtain an instance of Computer System";
+const Texts exceptionTexts = {noComputerSystem, "Object Not Found.",
+                              "Could not find 'Name' Key in Moniker",
+                              "Could not find 'CSName' or 'Name' Key in Moniker",
+                              "Could not find 'InstanceID' Key in Moniker"};
+
+/// What is due for the elements of an answer, in view of the reference.
+enum class Elements {
+    Same,
+    None,
+    OneLess,          ///< the others as they were
+    EndEarly,         ///< those before the failure
+    LackOneProperty,  ///< one of one instance, unless another call supplied it as well
+    Differ,           ///< some name less than they did, or the walk was narrowed less
+};
+
+/// What is due when a call of an entry fails.
+struct Rule {
+    const char* entry;
+    Elements elements;
+    Texts messages;  ///< besides that of the reference
+};
+
+const Rule rules[] = {
+    {"CMPIBrokerFT.enumerateInstances", Elements::None, {noComputerSystem}},
+    {"CMPIEnumerationFT.hasNext", Elements::EndEarly, {noComputerSystem}},
+    {"CMPIEnumerationFT.getNext", Elements::Differ, {noComputerSystem}},
+    {"CMPIInstanceFT.getObjectPath", Elements::Differ, {}},
+    {"CMPIBrokerEncFT.newInstance", Elements::EndEarly, {}},
+    {"CMPIBrokerEncFT.newObjectPath", Elements::Differ, exceptionTexts},
+    {"CMPIBrokerEncFT.newArray", Elements::LackOneProperty, {}},
+    {"CMPIArrayFT.setElementAt", Elements::LackOneProperty, {}},
+    {"CMPIBrokerEncFT.newDateTimeFromChars", Elements::LackOneProperty, {}},
+    {"CMPIInstanceFT.setProperty", Elements::LackOneProperty, {}},
+    {"CMPIResultFT.returnObjectPath", Elements::OneLess, {}},
+    {"CMPIResultFT.returnInstance", Elements::OneLess, {}},
+    {"CMPIResultFT.returnDone", Elements::Same, {}},
+    {"CMPIObjectPathFT.getClassName", Elements::None, {}},
+    {"CMPIObjectPathFT.getNameSpace", Elements::Differ, {}},
+    {"CMPIObjectPathFT.addKey", Elements::Differ, exceptionTexts},
+    {"CMPIObjectPathFT.getKey", Elements::Differ, exceptionTexts},
+    {"CMPIObjectPathFT.getKeyAt", Elements::Differ, exceptionTexts},
+    {"CMPIObjectPathFT.getKeyCount", Elements::Differ, exceptionTexts},
+    {"CMPIStringFT.getCharPtr", Elements::Differ, exceptionTexts},
+};
+
+const Rule* ruleOf(const std::string& entry) {
+    const Rule* rule = std::find_if(std::begin(rules), std::end(rules),
+                                    [&](const Rule& each) { return each.entry == entry; });
+    return rule == std::end(rules) ? nullptr : rule;
+}
+
+bool contains(const Texts& texts, const std::string& text) {
+    return std::find(texts.begin(), texts.end(), text) != texts.end();
+}
+
+std::size_t propertiesIn(const Answer& answer) {
+    std::size_t count = 0;
+    for (const InstanceValue& instance : answer.outcome.instances)
+        count += instance.properties.size();
+    return count;
+}
+
+bool areDue(Elements due, const Answer& answer, const Answer& reference) {
+    switch (due) {
+        case Elements::Same:
+            return answer.elements == reference.elements;
+        case Elements::None:
+            return answer.elements.empty();
+        case Elements::OneLess:
+            return answer.elements.size() + 1 == reference.elements.size() &&
+                   isSubsequence(answer.elements, reference.elements);
+        case Elements::EndEarly:
+            return isPrefix(answer.elements, reference.elements);
+        case Elements::LackOneProperty:
+            return texts(answer.outcome.instances) == texts(reference.outcome.instances) &&
+                   propertiesIn(answer) + 1 >= propertiesIn(reference) &&
+                   (answer.elements == reference.elements ||
+                    propertiesIn(answer) < propertiesIn(reference));
+        case Elements::Differ:
+            return answer.elements.size() <= 4;
+    }
+    return false;
+}
+
+/// One fault and what came of it.
+struct Trial {
+    FaultPlan plan;
+    Answer answer;
+    Texts violations;
+};
+
+class BrokerFaults : public FaultsOfHandler {
+  protected:
+    // False when no call failed.
+    bool run(Trial& trial, unsigned n, unsigned times, CMPIrc rc) {
+        trial.plan.add({"", n, times, rc});
+        broker.setFaultPlan(&trial.plan);
+        trial.answer = answerTo(asked);
+        broker.setFaultPlan(nullptr);
+        trial.violations = broker.takeViolations();
+        return trial.plan.fired() != 0;
+    }
+
+    // What holds for each fault.
+    void expectAnswered(const Trial& trial) const {
+        expectSound(asked, trial.answer);
+        const bool refused = trial.answer.outcome.rc == CMPI_RC_ERR_INVALID_CLASS;
+        const bool ended = !refused && trial.answer.messages.empty();
+        EXPECT_EQ(trial.plan.calls("CMPIResultFT.returnDone"), ended ? 1U : 0U);
+    }
+
+    void expectDue(const Trial& trial, const Rule& rule) const {
+        EXPECT_TRUE(areDue(rule.elements, trial.answer, reference));
+        for (const std::string& message : trial.answer.messages)
+            EXPECT_TRUE(contains(rule.messages, message) || message == asked.message) << message;
+        // The result notes a path that lacks a key; nothing else may be wrong.
+        for (const std::string& violation : trial.violations) {
+            const bool missingKey = violation.rfind("path of ", 0) == 0 &&
+                                    violation.find(" without key ") != std::string::npos;
+            EXPECT_TRUE(missingKey && (rule.elements == Elements::Differ ||
+                                       contains(referenceViolations, violation)))
+                << violation;
+        }
+    }
+
+    // The class of the request is asked for first: its name, and the characters of that.
+    bool classIsUnknown(unsigned n) const {
+        const Operation operation = asked.request.operation;
+        const bool byAssociation =
+            operation == Operation::Associators || operation == Operation::AssociatorNames;
+        return !byAssociation && n <= 2;
+    }
+};
+
+TEST_P(BrokerFaults, ReferenceIsWhatIsDue) {
+    forEachRequest([this] {
+        expectSound(asked, reference);
+        EXPECT_EQ(reference.messages, asked.message.empty() ? Texts{} : Texts{asked.message});
+        EXPECT_EQ(reference.outcome.doneCount, asked.message.empty() ? 1U : 0U);
+    });
+}
+
+TEST_P(BrokerFaults, NthCallAloneFailsAndOnlyWhatHangsOnItIsMissing) {
+    forEachRequest([this] {
+        for (const CMPIrc rc : {CMPI_RC_ERR_FAILED, CMPI_RC_OK}) {
+            for (unsigned n = 1;; ++n) {
+                ASSERT_LT(n, mostCalls);
+                Trial trial;
+                if (!run(trial, n, 1, rc)) break;
+                const std::string entry = trial.plan.firedCalls().front();
+                SCOPED_TRACE(testing::Message() << "call " << n << ", " << entry << ", rc " << rc);
+                const Rule* rule = ruleOf(entry);
+                ASSERT_NE(rule, nullptr);
+                expectAnswered(trial);
+                expectDue(trial, *rule);
+                EXPECT_EQ(trial.answer.outcome.rc,
+                          classIsUnknown(n) ? CMPI_RC_ERR_INVALID_CLASS : CMPI_RC_OK);
+            }
+        }
+    });
+}
+
+TEST_P(BrokerFaults, EveryCallFromTheNthOnFailsAndTheRequestStillEnds) {
+    forEachRequest([this] {
+        for (const CMPIrc rc : {CMPI_RC_ERR_FAILED, CMPI_RC_OK}) {
+            for (unsigned n = 1;; ++n) {
+                ASSERT_LT(n, mostCalls);
+                Trial trial;
+                if (!run(trial, n, 0, rc)) break;
+                SCOPED_TRACE(testing::Message() << "from call " << n << " on, rc " << rc);
+                expectAnswered(trial);
+                // Nothing is handed over from there on.
+                EXPECT_TRUE(isPrefix(trial.answer.elements, reference.elements));
+                for (const std::string& message : trial.answer.messages)
+                    EXPECT_TRUE(contains(exceptionTexts, message)) << message;
+                for (const std::string& violation : trial.violations)
+                    EXPECT_TRUE(contains(referenceViolations, violation)) << violation;
+                EXPECT_EQ(trial.answer.outcome.rc,
+                          classIsUnknown(n) ? CMPI_RC_ERR_INVALID_CLASS : CMPI_RC_OK);
+            }
+        }
+    });
+}
+
+INSTANTIATE_TEST_SUITE_P(Of, BrokerFaults, testing::ValuesIn(servingHandlers()), nameOf);
+
+class UnservedRequests : public FaultFixture {};
+
+TEST_F(UnservedRequests, AreRefusedWithoutACallOfTheBroker) {
+    for (const NamedRequest& asked : refusedRequests()) {
+        FaultPlan plan(Fault{"", 1, 0, CMPI_RC_ERR_FAILED});
+        broker.setFaultPlan(&plan);
+        const Answer answer = answerTo(asked);
+        broker.setFaultPlan(nullptr);
+        EXPECT_EQ(answer.outcome.rc, CMPI_RC_ERR_NOT_SUPPORTED) << asked;
+        EXPECT_EQ(plan.calls(), 0U) << asked;
+        EXPECT_EQ(answer.records.size(), 2U) << asked;
+    }
+}
+
+TEST_F(UnservedRequests, OfAnotherClassAreInvalidWhateverCallFails) {
+    for (const NamedRequest& asked : strangeRequests()) {
+        for (unsigned n = 1; n <= 3; ++n) {
+            FaultPlan plan(Fault{"", n, 0, CMPI_RC_ERR_FAILED});
+            broker.setFaultPlan(&plan);
+            const Answer answer = answerTo(asked);
+            broker.setFaultPlan(nullptr);
+            EXPECT_EQ(answer.outcome.rc, CMPI_RC_ERR_INVALID_CLASS) << asked;
+            EXPECT_LE(plan.calls(), 2U) << asked;
+            expectSound(asked, answer);
+        }
+    }
+}
+
+}  // namespace

@@ -1,0 +1,73 @@
+#ifndef TESTS_FAULTS_FAULT_FIXTURE_H
+#define TESTS_FAULTS_FAULT_FIXTURE_H
+
+#include <string>
+#include <vector>
+
+#include "faults/Requests.h"
+#include "library/LibraryFixture.h"
+
+/// What a request left behind.
+struct Answer {
+    cmpihost::Outcome outcome;
+    std::vector<recording::Record> records;
+    std::vector<std::string> elements;  ///< paths and instances in full, in order
+    std::vector<std::string> messages;  ///< texts of the message records in the log
+};
+
+/// The built provider on a host of two nodes, one with every property and one with a name, under a
+/// broker with two computer systems.
+class FaultFixture : public LibraryFixture {
+  protected:
+    explicit FaultFixture(cmpihost::BrokerOptions options = {});
+
+    /// Forgets the records so far and runs the request; exceptions of the provider pass through.
+    Answer answerTo(const NamedRequest& asked);
+
+    /// Checks what holds for each request that was served, whatever failed on the way: every record
+    /// stands in both channels, the handler's markers are around all others, and either there is
+    /// one message and no returnDone, or no message and one returnDone.
+    static void expectSound(const NamedRequest& asked, const Answer& answer);
+
+    /// Checks that the answer is the reference: status, elements, and every record.
+    static void expectSame(const Answer& reference, const Answer& answer);
+};
+
+/// Runs a test once for each request that one of the handlers serves.
+class FaultsOfHandler : public FaultFixture, public testing::WithParamInterface<std::string> {
+  protected:
+    using FaultFixture::FaultFixture;
+
+    /// Calls `body` for each of the requests, with its reference at hand; at the end the request is
+    /// to be answered again as if nothing had happened.
+    template <class Body>
+    void forEachRequest(Body body) {
+        for (const NamedRequest& each : servedRequests()) {
+            if (each.handler != GetParam()) continue;
+            SCOPED_TRACE(each.name);
+            asked = each;
+            reference = answerTo(asked);
+            referenceViolations = broker.takeViolations();
+            body();
+            expectSame(reference, answerTo(asked));
+            EXPECT_EQ(broker.takeViolations(), referenceViolations);
+            if (HasFatalFailure()) return;
+        }
+    }
+
+    NamedRequest asked;
+    Answer reference;
+    std::vector<std::string> referenceViolations;
+};
+
+/// Names a test after the handler.
+std::string nameOf(const testing::TestParamInfo<std::string>& info);
+
+/// The rendered records, one string.
+std::string recordsOf(const Answer& answer);
+
+/// True when `part` is `whole` with some of its elements left out.
+bool isSubsequence(const std::vector<std::string>& part, const std::vector<std::string>& whole);
+bool isPrefix(const std::vector<std::string>& part, const std::vector<std::string>& whole);
+
+#endif

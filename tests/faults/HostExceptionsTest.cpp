@@ -1,0 +1,197 @@
+// Exceptions of every kind from the n-th call of the instrumentation and from the n-th record, n
+// counted up until none is thrown any more.
+#include <new>
+#include <stdexcept>
+
+#include "FrameworkException.h"
+#include "InstrumentationException.h"
+#include "ProviderException.h"
+#include "faults/FaultFixture.h"
+
+namespace {
+
+using namespace cmpihost;
+using Texts = std::vector<std::string>;
+
+constexpr std::uint64_t mostCalls = 2000;  ///< no request makes so many
+
+struct OwnException : std::exception {
+    const char* what() const noexcept override { return "own"; }
+};
+struct ForeignType {
+    std::string text = "a text that has to be given back to the heap";
+};
+
+/// What is thrown, and the text of the message that it leaves; no text: it is of a foreign type.
+struct Kind {
+    const char* name;
+    void (*raise)();
+    const char* text;
+};
+
+const Kind kinds[] = {
+    {"FrameworkException", [] { throw VA::FrameworkException("framework"); }, "framework"},
+    {"ProviderException", [] { throw VA::ProviderException("provider"); }, "provider"},
+    {"InstrumentationException", [] { throw VA::InstrumentationException("host"); }, "host"},
+    {"RuntimeError", [] { throw std::runtime_error("runtime"); }, "runtime"},
+    {"BadAlloc", [] { throw std::bad_alloc(); }, "std::bad_alloc"},
+    {"OwnException", [] { throw OwnException(); }, "own"},
+    {"Integer", [] { throw 42; }, nullptr},
+    {"Structure", [] { throw ForeignType(); }, nullptr},
+    {"Characters", [] { throw "characters"; }, nullptr},
+};
+
+/// An answer, or none where an exception left the handler.
+struct Trial {
+    bool thrown = false;   ///< the fault was met
+    bool foreign = false;  ///< what left the handler is of a foreign type
+    bool standard = false;
+    Answer answer;
+};
+
+class ExceptionFaults : public FaultsOfHandler {
+  protected:
+    ~ExceptionFaults() override { host->setHook({}); }
+
+    void run(Trial& trial) {
+        try {
+            trial.answer = answerTo(asked);
+        } catch (const std::exception&) {
+            trial.standard = true;
+        } catch (...) {
+            trial.foreign = true;
+        }
+        if (trial.standard || trial.foreign) trial.answer.records = recording::take();
+        host->setHook({});
+        recording::setHook({});
+        broker.takeViolations();
+    }
+
+    Trial throwFromHost(const Kind& kind, std::uint64_t n) {
+        Trial trial;
+        std::uint64_t calls = 0;
+        host->setHook([&](const VA::SimulatedHost::Call&) {
+            if (++calls != n) return;
+            trial.thrown = true;
+            kind.raise();
+        });
+        run(trial);
+        return trial;
+    }
+
+    Trial throwFromLog(const Kind& kind, std::uint64_t n) {
+        Trial trial;
+        std::uint64_t calls = 0;
+        recording::setHook([&](const recording::Record&) {
+            if (++calls != n) return;
+            trial.thrown = true;
+            kind.raise();
+        });
+        run(trial);
+        return trial;
+    }
+
+    // The exception left the handler, with neither a message nor the marker of the end.
+    static void expectLeft(const Trial& trial, const Kind& kind) {
+        EXPECT_EQ(trial.foreign, kind.text == nullptr);
+        EXPECT_EQ(trial.standard, kind.text != nullptr);
+        const std::string records = recordsOf(trial.answer);
+        EXPECT_EQ(records.find("MESSAGE "), std::string::npos);
+        EXPECT_EQ(records.find("markProviderExit"), std::string::npos);
+    }
+
+    void expectReported(const Trial& trial, const Kind& kind) const {
+        ASSERT_FALSE(trial.standard || trial.foreign);
+        expectSound(asked, trial.answer);
+        EXPECT_EQ(trial.answer.outcome.rc, CMPI_RC_OK);
+        EXPECT_EQ(trial.answer.messages, Texts{kind.text});
+        EXPECT_TRUE(isPrefix(trial.answer.elements, reference.elements));
+    }
+};
+
+TEST_P(ExceptionFaults, FromTheNthCallOfTheHostAreReportedOrLeaveByTheirType) {
+    forEachRequest([this] {
+        for (const Kind& kind : kinds) {
+            for (std::uint64_t n = 1;; ++n) {
+                ASSERT_LT(n, mostCalls);
+                SCOPED_TRACE(testing::Message() << kind.name << " from call " << n);
+                const Trial trial = throwFromHost(kind, n);
+                if (!trial.thrown) break;
+                if (kind.text == nullptr) {
+                    expectLeft(trial, kind);
+                } else {
+                    expectReported(trial, kind);
+                    EXPECT_EQ(trial.answer.outcome.doneCount, 0U);
+                }
+            }
+            expectSame(reference, answerTo(asked));
+            broker.takeViolations();
+        }
+    });
+}
+
+// The first six records and the last four, in both channels, are written outside the walk.
+TEST_P(ExceptionFaults, FromTheNthRecordAreReportedWhereTheyMeetTheWalk) {
+    forEachRequest([this] {
+        constexpr std::uint64_t before = 6, after = 4;
+        const std::uint64_t all = reference.records.size();
+        const bool ownMessage = !reference.messages.empty();
+        for (const Kind& kind : kinds) {
+            for (std::uint64_t n = 1;; ++n) {
+                ASSERT_LT(n, mostCalls);
+                SCOPED_TRACE(testing::Message() << kind.name << " from record " << n);
+                const Trial trial = throwFromLog(kind, n);
+                if (!trial.thrown) {
+                    EXPECT_EQ(n, all + 1);
+                    break;
+                }
+                const recording::Record& met = reference.records[n - 1];
+                if (ownMessage && n > before && met.function[0] == '~')
+                    continue;  // given up: see below
+                if (ownMessage && met.text.rfind("MESSAGE ", 0) == 0) continue;
+                if (n > all - after) {
+                    EXPECT_EQ(trial.foreign, kind.text == nullptr);
+                    EXPECT_EQ(trial.standard, kind.text != nullptr);
+                } else if (kind.text == nullptr || n <= before) {
+                    expectLeft(trial, kind);
+                } else {
+                    ASSERT_FALSE(trial.standard || trial.foreign);
+                    EXPECT_EQ(trial.answer.messages, Texts{kind.text});
+                    EXPECT_TRUE(isPrefix(trial.answer.elements, reference.elements));
+                    EXPECT_EQ(trial.answer.outcome.doneCount, met.function[0] == '~' ? 1U : 0U);
+                }
+            }
+            expectSame(reference, answerTo(asked));
+            broker.takeViolations();
+        }
+    });
+}
+
+// While the request's own exception is under way, destructors give up their records; the message of
+// the exception is written outside the walk.
+TEST_P(ExceptionFaults, FromRecordsDuringAnExceptionNeverReplaceIt) {
+    forEachRequest([this] {
+        if (reference.messages.empty()) return;
+        for (const Kind& kind : kinds) {
+            for (std::uint64_t n = 1; n <= reference.records.size(); ++n) {
+                const recording::Record& met = reference.records[n - 1];
+                const bool message = met.text.rfind("MESSAGE ", 0) == 0;
+                if (!message && met.function[0] != '~') continue;
+                SCOPED_TRACE(testing::Message() << kind.name << " from record " << n);
+                const Trial trial = throwFromLog(kind, n);
+                ASSERT_TRUE(trial.thrown);
+                EXPECT_EQ(trial.foreign, message && kind.text == nullptr);
+                EXPECT_EQ(trial.standard, message && kind.text != nullptr);
+                if (!message) {
+                    EXPECT_EQ(trial.answer.messages, reference.messages);
+                }
+            }
+            expectSame(reference, answerTo(asked));
+            broker.takeViolations();
+        }
+    });
+}
+
+INSTANTIATE_TEST_SUITE_P(Of, ExceptionFaults, testing::ValuesIn(servingHandlers()), nameOf);
+
+}  // namespace
