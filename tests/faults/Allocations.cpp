@@ -1,0 +1,138 @@
+#include "faults/Allocations.h"
+
+#include <link.h>
+#include <unwind.h>
+
+#include <algorithm>
+#include <array>
+#include <atomic>
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+#include <new>
+
+namespace {
+
+struct Range {
+    std::uintptr_t begin = 0;
+    std::uintptr_t end = 0;
+    bool holds(std::uintptr_t address) const { return address >= begin && address < end; }
+};
+
+constexpr const char* libraries[] = {"libkorzbosstatusprofileprovider", "libvainstrumentation",
+                                     "libvaprovider", "libzblog"};
+
+// Nothing here may allocate.
+struct State {
+    std::array<Range, 4> libraries{};
+    Range program{};
+    bool armed = false;
+    bool andLater = false;
+    std::size_t n = 0;
+    std::size_t asked = 0;
+    std::size_t failed = 0;
+};
+
+State state;
+std::atomic<std::size_t> inUse{0};
+
+Range codeOf(const dl_phdr_info& module) {
+    Range range;
+    for (int index = 0; index < module.dlpi_phnum; ++index) {
+        const auto& segment = module.dlpi_phdr[index];
+        if (segment.p_type != PT_LOAD || (segment.p_flags & PF_X) == 0) continue;
+        range.begin = static_cast<std::uintptr_t>(module.dlpi_addr + segment.p_vaddr);
+        range.end = range.begin + static_cast<std::uintptr_t>(segment.p_memsz);
+    }
+    return range;
+}
+
+// The program itself comes first, and without a name.
+int noteModule(dl_phdr_info* module, std::size_t, void*) {
+    if (module->dlpi_name == nullptr || *module->dlpi_name == '\0') {
+        if (state.program.end == 0) state.program = codeOf(*module);
+        return 0;
+    }
+    for (std::size_t index = 0; index < state.libraries.size(); ++index)
+        if (std::strstr(module->dlpi_name, libraries[index]) != nullptr)
+            state.libraries[index] = codeOf(*module);
+    return 0;
+}
+
+struct Search {
+    unsigned frames = 0;
+    bool ofLibrary = false;
+};
+
+// The first frame that is neither operator new's own nor the C++ library's has asked.
+_Unwind_Reason_Code visitFrame(_Unwind_Context* context, void* data) {
+    auto& search = *static_cast<Search*>(data);
+    constexpr unsigned own = 3;  // inLibrary, ask, operator new
+    if (++search.frames <= own) return _URC_NO_REASON;
+    const auto address = static_cast<std::uintptr_t>(_Unwind_GetIP(context)) - 1;
+    search.ofLibrary = std::any_of(state.libraries.begin(), state.libraries.end(),
+                                   [&](const Range& range) { return range.holds(address); });
+    const bool found = search.ofLibrary || state.program.holds(address);
+    return found ? _URC_END_OF_STACK : _URC_NO_REASON;
+}
+
+[[gnu::noinline]] bool askedByLibrary() {
+    Search search;
+    _Unwind_Backtrace(visitFrame, &search);
+    return search.ofLibrary;
+}
+
+[[gnu::noinline]] bool mustFail() {
+    // Unwinding itself may allocate.
+    state.armed = false;
+    const bool counted = askedByLibrary();
+    state.armed = true;
+    if (!counted) return false;
+    ++state.asked;
+    return state.andLater ? state.asked >= state.n : state.asked == state.n;
+}
+
+}  // namespace
+
+namespace allocations {
+
+void failFrom(std::size_t n, bool andLater) {
+    state = State{};
+    dl_iterate_phdr(noteModule, nullptr);
+    state.n = n;
+    state.andLater = andLater;
+    state.armed = true;
+}
+
+std::size_t release() {
+    state.armed = false;
+    return state.failed;
+}
+
+std::size_t blocksInUse() {
+    return inUse;
+}
+
+}  // namespace allocations
+
+// The other forms of new and delete end in these two.
+
+[[gnu::visibility("default")]] void* operator new(std::size_t size) {
+    if (state.armed && mustFail()) {
+        ++state.failed;
+        throw std::bad_alloc();
+    }
+    void* const block = std::malloc(size == 0 ? 1 : size);
+    if (block == nullptr) throw std::bad_alloc();
+    ++inUse;
+    return block;
+}
+
+[[gnu::visibility("default")]] void operator delete(void* block) noexcept {
+    if (block != nullptr) --inUse;
+    std::free(block);
+}
+
+[[gnu::visibility("default")]] void operator delete(void* block, std::size_t) noexcept {
+    operator delete(block);
+}

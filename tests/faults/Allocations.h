@@ -1,0 +1,23 @@
+#ifndef TESTS_FAULTS_ALLOCATIONS_H
+#define TESTS_FAULTS_ALLOCATIONS_H
+
+#include <cstddef>
+
+/// The program's own operator new: lets allocations fail that the provider or one of the
+/// framework's libraries asks for, in its own code or through the C++ library. Those that the
+/// broker, the log of the test and the test itself ask for, never fail. All for one thread.
+namespace allocations {
+
+/// From now on until release(), the n-th allocation (from 1) of the libraries throws
+/// std::bad_alloc, and with `andLater` each one after it. The libraries are loaded.
+void failFrom(std::size_t n, bool andLater);
+
+/// Nothing fails any more. Says how many did.
+std::size_t release();
+
+/// How many blocks of operator new are in use, whoever asked for them.
+std::size_t blocksInUse();
+
+}  // namespace allocations
+
+#endif
