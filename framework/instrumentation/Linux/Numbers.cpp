@@ -19,8 +19,9 @@ std::optional<std::uint64_t> parseDecimal(std::string_view text) {
 }
 
 std::optional<std::uint64_t> parseNumberFile(std::string_view text) {
-    if (!text.empty() && text.back() == '\n') text.remove_suffix(1);
-    const auto value = parseDecimal(text);
+    // Without its newline the number was cut short.
+    if (text.empty() || text.back() != '\n') return std::nullopt;
+    const auto value = parseDecimal(text.substr(0, text.size() - 1));
     return value && *value > 0 ? value : std::nullopt;
 }
 

@@ -15,7 +15,8 @@ bool isAllDigits(std::string_view text);
 /// The value of a text that is all digits; nothing for any other text, and for one past 64 bits.
 std::optional<std::uint64_t> parseDecimal(std::string_view text);
 
-/// The value of a file that holds one positive number, such as the limits of proc/sys/kernel.
+/// The value of a file that holds one line with a positive number, such as the limits of
+/// proc/sys/kernel.
 std::optional<std::uint64_t> parseNumberFile(std::string_view text);
 
 /// `value`, or the largest 32-bit number where that is less.
