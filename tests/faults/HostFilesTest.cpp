@@ -1,0 +1,185 @@
+// A Linux host whose n-th read fails, n counted up until none fails any more: what came from the
+// file that could not be read is absent or comes from the next source, and nothing else changes.
+#include <sys/utsname.h>
+
+#include <algorithm>
+#include <ctime>
+
+#include "faults/FaultFixture.h"
+#include "faults/FileFaults.h"
+#include "framework/instrumentation/HostSource.h"
+#include "framework/instrumentation/LinuxHost.h"
+#include "instrumentation/FixtureTree.h"
+
+namespace {
+
+using namespace cmpihost;
+using fileFaults::Fault;
+using Texts = std::vector<std::string>;
+
+constexpr unsigned mostReads = 200;  ///< no request makes so many
+
+const char* const absent = "(absent)";
+const char* const another = "(another value)";
+
+/// A property, and what it is when its source cannot be read.
+struct Property {
+    std::string name;
+    std::string value;
+};
+
+struct Source {
+    std::string path;
+    std::vector<Property> properties;
+};
+
+std::vector<Source> sources() {
+    utsname kernel;
+    EXPECT_EQ(::uname(&kernel), 0);
+    return {
+        {"etc/os-release", {{"Name", kernel.sysname}, {"Version", kernel.release}}},
+        // The kernel tells when it was booted as well: before the tree was made.
+        {"proc/stat", {{"LastBootUpTime", another}, {"InstallDate", absent}}},
+        {"proc/meminfo",
+         {{"TotalVirtualMemorySize", absent},
+          {"FreeVirtualMemory", absent},
+          {"FreePhysicalMemory", absent},
+          {"TotalVisibleMemorySize", absent},
+          {"TotalSwapSpaceSize", absent},
+          {"SizeStoredInPagingFiles", absent},
+          {"FreeSpaceInPagingFiles", absent}}},
+        {"proc/sys/kernel/pid_max", {{"MaxNumberOfProcesses", "127412"}}},
+        {"proc/sys/kernel/threads-max", {}},
+        {"proc", {{"NumberOfProcesses", absent}}},
+        {"run/systemd/sessions", {{"NumberOfUsers", absent}}},
+        {"run/systemd/sessions/1", {{"NumberOfUsers", "1"}}},
+        {"run/systemd/sessions/c2", {{"NumberOfUsers", "1"}}},
+        // Whatever of the tree is asked for next is as old as its root.
+        {"", {}},
+        {"etc/machine-id", {{"InstallDate", absent}}},
+    };
+}
+
+struct Row {
+    const char* name;
+    Fault fault;
+    bool harmless;  ///< the reader goes on and gets everything
+};
+
+const Row rows[] = {
+    {"Missing", Fault::Missing, false},    {"Denied", Fault::Denied, false},
+    {"Gone", Fault::Gone, false},          {"Error", Fault::Error, false},
+    {"Garbage", Fault::Garbage, false},    {"CutShort", Fault::CutShort, false},
+    {"Piecemeal", Fault::Piecemeal, true}, {"Interrupted", Fault::Interrupted, true},
+};
+
+std::ostream& operator<<(std::ostream& out, const Row& row) {
+    return out << row.name;
+}
+
+class HostFiles : public FaultFixture, public testing::WithParamInterface<Row> {
+  protected:
+    HostFiles() {
+        VA::setHostSource(std::make_shared<VA::LinuxHost>(tree.root()));
+        writeHost();
+    }
+    ~HostFiles() override { fileFaults::release(); }
+
+    // The host was booted after the tree was made, and tells so at the end of a long file.
+    void writeHost() const {
+        tree.writeCompleteHost();
+        tree.write("proc/stat", "cpu  1 2 3 4\nintr " + std::string(40000, '0') + "\nbtime " +
+                                    std::to_string(bootTime) + "\nprocesses 4711\n");
+    }
+
+    // The path that met the fault.
+    std::string serve(const NamedRequest& asked, unsigned n, Answer& answer) {
+        writeHost();
+        fileFaults::meet(GetParam().fault, n, tree.root());
+        answer = answerTo(asked);
+        broker.takeViolations();
+        return fileFaults::release();
+    }
+
+    const std::time_t bootTime = std::time(nullptr) + 1000;
+    FixtureTree tree;
+};
+
+const NamedRequest enumeration = {"EnumInstances",
+                                  "OperatingSystem_EnumInstances",
+                                  {Operation::EnumerateInstances, path("KORVA_OperatingSystem")},
+                                  ""};
+
+Texts propertyNames(const InstanceValue& instance) {
+    Texts names;
+    for (const auto& property : instance.properties) names.push_back(property.name);
+    return names;
+}
+
+void expectLike(const InstanceValue& reference, const InstanceValue& instance,
+                const Source& broken) {
+    Texts names = propertyNames(reference);
+    for (const std::string& name : propertyNames(instance))
+        if (reference.property(name) == nullptr) names.push_back(name);
+    for (const std::string& name : names) {
+        const auto changed = std::find_if(broken.properties.begin(), broken.properties.end(),
+                                          [&](const Property& each) { return each.name == name; });
+        const std::string value = text(instance, name);
+        if (changed == broken.properties.end()) {
+            EXPECT_EQ(value, text(reference, name)) << name;
+        } else if (changed->value != another) {
+            EXPECT_EQ(value, changed->value) << name;
+        } else {
+            EXPECT_NE(value, absent) << name;
+            EXPECT_NE(value, text(reference, name)) << name;
+        }
+    }
+}
+
+TEST_P(HostFiles, OfWhichOneCannotBeReadCostOnlyWhatItTells) {
+    const std::vector<Source> table = sources();
+    Answer reference;
+    ASSERT_EQ(serve(enumeration, 0, reference), "(none)");
+    ASSERT_EQ(reference.outcome.instances.size(), 1U);
+    EXPECT_EQ(reference.outcome.instances[0].properties.size(), 26U);
+    unsigned n = 1;
+    for (;; ++n) {
+        ASSERT_LT(n, mostReads);
+        Answer answer;
+        const std::string met = serve(enumeration, n, answer);
+        if (met == "(none)") break;
+        SCOPED_TRACE(testing::Message() << "call " << n << ", for \"" << met << '"');
+        const auto source = std::find_if(table.begin(), table.end(),
+                                         [&](const Source& each) { return each.path == met; });
+        ASSERT_NE(source, table.end());
+        expectSound(enumeration, answer);
+        EXPECT_EQ(recordsOf(answer), recordsOf(reference));
+        EXPECT_EQ(answer.outcome.doneCount, 1U);
+        ASSERT_EQ(answer.outcome.instances.size(), 1U);
+        expectLike(reference.outcome.instances[0], answer.outcome.instances[0],
+                   GetParam().harmless ? Source{} : *source);
+    }
+    EXPECT_GT(n, 6U);
+}
+
+TEST_P(HostFiles, OfWhichOneCannotBeReadLeaveEveryOtherRequestAnswered) {
+    for (const NamedRequest& asked : servedRequests()) {
+        SCOPED_TRACE(asked.name);
+        Answer reference;
+        serve(asked, 0, reference);
+        for (unsigned n = 1;; ++n) {
+            ASSERT_LT(n, mostReads);
+            Answer answer;
+            if (serve(asked, n, answer) == "(none)") break;
+            expectSound(asked, answer);
+            EXPECT_EQ(answer.outcome.rc, CMPI_RC_OK);
+            EXPECT_EQ(answer.messages, reference.messages);
+            EXPECT_EQ(answer.outcome.doneCount, reference.outcome.doneCount);
+        }
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(By, HostFiles, testing::ValuesIn(rows),
+                         [](const auto& row) { return row.param.name; });
+
+}  // namespace
