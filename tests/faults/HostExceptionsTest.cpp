@@ -1,11 +1,9 @@
 // Exceptions of every kind from the n-th call of the instrumentation and from the n-th record, n
 // counted up until none is thrown any more.
-#include <new>
-#include <stdexcept>
 
-#include "FrameworkException.h"
-#include "InstrumentationException.h"
-#include "ProviderException.h"
+#include <exception>
+
+#include "faults/ExceptionKinds.h"
 #include "faults/FaultFixture.h"
 
 namespace {
@@ -13,33 +11,7 @@ namespace {
 using namespace cmpihost;
 using Texts = std::vector<std::string>;
 
-constexpr std::uint64_t mostCalls = 2000;  ///< no request makes so many
-
-struct OwnException : std::exception {
-    const char* what() const noexcept override { return "own"; }
-};
-struct ForeignType {
-    std::string text = "a text that has to be given back to the heap";
-};
-
-/// What is thrown, and the text of the message that it leaves; no text: it is of a foreign type.
-struct Kind {
-    const char* name;
-    void (*raise)();
-    const char* text;
-};
-
-const Kind kinds[] = {
-    {"FrameworkException", [] { throw VA::FrameworkException("framework"); }, "framework"},
-    {"ProviderException", [] { throw VA::ProviderException("provider"); }, "provider"},
-    {"InstrumentationException", [] { throw VA::InstrumentationException("host"); }, "host"},
-    {"RuntimeError", [] { throw std::runtime_error("runtime"); }, "runtime"},
-    {"BadAlloc", [] { throw std::bad_alloc(); }, "std::bad_alloc"},
-    {"OwnException", [] { throw OwnException(); }, "own"},
-    {"Integer", [] { throw 42; }, nullptr},
-    {"Structure", [] { throw ForeignType(); }, nullptr},
-    {"Characters", [] { throw "characters"; }, nullptr},
-};
+constexpr std::size_t mostCalls = 2000;  ///< no request makes so many
 
 /// An answer, or none where an exception left the handler.
 struct Trial {
@@ -67,9 +39,9 @@ class ExceptionFaults : public FaultsOfHandler {
         broker.takeViolations();
     }
 
-    Trial throwFromHost(const Kind& kind, std::uint64_t n) {
+    Trial throwFromHost(const ExceptionKind& kind, std::size_t n) {
         Trial trial;
-        std::uint64_t calls = 0;
+        std::size_t calls = 0;
         host->setHook([&](const VA::SimulatedHost::Call&) {
             if (++calls != n) return;
             trial.thrown = true;
@@ -79,9 +51,9 @@ class ExceptionFaults : public FaultsOfHandler {
         return trial;
     }
 
-    Trial throwFromLog(const Kind& kind, std::uint64_t n) {
+    Trial throwFromLog(const ExceptionKind& kind, std::size_t n) {
         Trial trial;
-        std::uint64_t calls = 0;
+        std::size_t calls = 0;
         recording::setHook([&](const recording::Record&) {
             if (++calls != n) return;
             trial.thrown = true;
@@ -92,7 +64,7 @@ class ExceptionFaults : public FaultsOfHandler {
     }
 
     // The exception left the handler, with neither a message nor the marker of the end.
-    static void expectLeft(const Trial& trial, const Kind& kind) {
+    static void expectLeft(const Trial& trial, const ExceptionKind& kind) {
         EXPECT_EQ(trial.foreign, kind.text == nullptr);
         EXPECT_EQ(trial.standard, kind.text != nullptr);
         const std::string records = recordsOf(trial.answer);
@@ -100,7 +72,7 @@ class ExceptionFaults : public FaultsOfHandler {
         EXPECT_EQ(records.find("markProviderExit"), std::string::npos);
     }
 
-    void expectReported(const Trial& trial, const Kind& kind) const {
+    void expectReported(const Trial& trial, const ExceptionKind& kind) const {
         ASSERT_FALSE(trial.standard || trial.foreign);
         expectSound(asked, trial.answer);
         EXPECT_EQ(trial.answer.outcome.rc, CMPI_RC_OK);
@@ -111,8 +83,8 @@ class ExceptionFaults : public FaultsOfHandler {
 
 TEST_P(ExceptionFaults, FromTheNthCallOfTheHostAreReportedOrLeaveByTheirType) {
     forEachRequest([this] {
-        for (const Kind& kind : kinds) {
-            for (std::uint64_t n = 1;; ++n) {
+        for (const ExceptionKind& kind : exceptionKinds) {
+            for (std::size_t n = 1;; ++n) {
                 ASSERT_LT(n, mostCalls);
                 SCOPED_TRACE(testing::Message() << kind.name << " from call " << n);
                 const Trial trial = throwFromHost(kind, n);
@@ -133,11 +105,11 @@ TEST_P(ExceptionFaults, FromTheNthCallOfTheHostAreReportedOrLeaveByTheirType) {
 // The first six records and the last four, in both channels, are written outside the walk.
 TEST_P(ExceptionFaults, FromTheNthRecordAreReportedWhereTheyMeetTheWalk) {
     forEachRequest([this] {
-        constexpr std::uint64_t before = 6, after = 4;
-        const std::uint64_t all = reference.records.size();
+        constexpr std::size_t before = 6, after = 4;
+        const std::size_t all = reference.records.size();
         const bool ownMessage = !reference.messages.empty();
-        for (const Kind& kind : kinds) {
-            for (std::uint64_t n = 1;; ++n) {
+        for (const ExceptionKind& kind : exceptionKinds) {
+            for (std::size_t n = 1;; ++n) {
                 ASSERT_LT(n, mostCalls);
                 SCOPED_TRACE(testing::Message() << kind.name << " from record " << n);
                 const Trial trial = throwFromLog(kind, n);
@@ -172,8 +144,8 @@ TEST_P(ExceptionFaults, FromTheNthRecordAreReportedWhereTheyMeetTheWalk) {
 TEST_P(ExceptionFaults, FromRecordsDuringAnExceptionNeverReplaceIt) {
     forEachRequest([this] {
         if (reference.messages.empty()) return;
-        for (const Kind& kind : kinds) {
-            for (std::uint64_t n = 1; n <= reference.records.size(); ++n) {
+        for (const ExceptionKind& kind : exceptionKinds) {
+            for (std::size_t n = 1; n <= reference.records.size(); ++n) {
                 const recording::Record& met = reference.records[n - 1];
                 const bool message = met.text.rfind("MESSAGE ", 0) == 0;
                 if (!message && met.function[0] != '~') continue;

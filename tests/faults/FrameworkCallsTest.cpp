@@ -1,0 +1,84 @@
+// Exceptions of every kind from the n-th function of the framework that is entered for a request, n
+// counted up until the request succeeds: object paths, instances, monikers and message buffers.
+#include <iterator>
+
+#include "faults/ExceptionKinds.h"
+#include "faults/FaultFixture.h"
+#include "faults/FrameworkCalls.h"
+
+namespace {
+
+using namespace cmpihost;
+using Texts = std::vector<std::string>;
+
+constexpr std::size_t mostCalls = 20000;  ///< no request makes so many
+
+class FrameworkCallFaults : public FaultsOfHandler {
+  protected:
+    ~FrameworkCallFaults() override { frameworkCalls::release(); }
+
+    // False when nothing was thrown any more.
+    bool throwFrom(std::size_t n, const ExceptionKind& kind) {
+        enum { Returned, Standard, Foreign } end = Returned;
+        Answer answer;
+        recording::clear();
+        frameworkCalls::throwFrom(n, kind.raise);
+        try {
+            answer = answerTo(asked);
+        } catch (const std::exception&) {
+            end = Standard;
+        } catch (...) {
+            end = Foreign;
+        }
+        const bool met = frameworkCalls::release();
+        if (end != Returned) answer.records = recording::take();
+        broker.takeViolations();
+        if (!met) return false;
+
+        const std::string records = recordsOf(answer);
+        if (kind.text == nullptr) {
+            EXPECT_EQ(end, Foreign);
+            EXPECT_EQ(records.find("MESSAGE "), std::string::npos);
+        } else if (end == Standard) {
+            expectOutsideTheWalk(answer);
+        } else {
+            EXPECT_EQ(end, Returned);
+            EXPECT_EQ(answer.outcome.rc, CMPI_RC_OK);
+            EXPECT_EQ(answer.messages, Texts{kind.text});
+            EXPECT_LE(answer.outcome.doneCount, 1U);
+            EXPECT_TRUE(isPrefix(answer.elements, reference.elements));
+            EXPECT_NE(records.find("markProviderExit"), std::string::npos);
+        }
+        return true;
+    }
+
+    // Before the walk are six records, and four after it.
+    void expectOutsideTheWalk(const Answer& answer) const {
+        const std::size_t written = answer.records.size();
+        EXPECT_TRUE(written < 6 || written >= reference.records.size() - 4) << written;
+        EXPECT_EQ(recordsOf(answer).find("MESSAGE "), std::string::npos);
+    }
+};
+
+// Each call throws one of the kinds, each request another one from the same call.
+TEST_P(FrameworkCallFaults, AreReportedOrLeaveByTypeAndTheNextRequestIsRight) {
+    std::size_t turn = 0;
+    forEachRequest([&] {
+        ++turn;
+        // Exceptions that meet one that is under way are a matter of the records alone.
+        if (!reference.messages.empty()) return;
+        for (std::size_t n = 1;; ++n) {
+            ASSERT_LT(n, mostCalls);
+            const ExceptionKind& kind = exceptionKinds[(n + turn) % std::size(exceptionKinds)];
+            SCOPED_TRACE(testing::Message() << kind.name << " from call " << n);
+            if (!throwFrom(n, kind)) {
+                EXPECT_GT(n, 50U);
+                break;
+            }
+        }
+    });
+}
+
+INSTANTIATE_TEST_SUITE_P(Of, FrameworkCallFaults, testing::ValuesIn(servingHandlers()), nameOf);
+
+}  // namespace
