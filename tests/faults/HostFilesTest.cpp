@@ -94,11 +94,12 @@ class HostFiles : public FaultFixture, public testing::WithParamInterface<Row> {
 
     // The path that met the fault.
     std::string serve(const NamedRequest& asked, unsigned n, Answer& answer) {
-        writeHost();
         fileFaults::meet(GetParam().fault, n, tree.root());
         answer = answerTo(asked);
         broker.takeViolations();
-        return fileFaults::release();
+        const std::string met = fileFaults::release();
+        if (GetParam().fault == Fault::Gone) writeHost();
+        return met;
     }
 
     const std::time_t bootTime = std::time(nullptr) + 1000;
