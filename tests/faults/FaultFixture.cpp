@@ -25,6 +25,10 @@ bool startsWith(const std::string& text, const std::string& start) {
 
 const std::string banner(78, '=');
 
+constexpr std::size_t mostRecords = 10000;  ///< no request writes so many
+
+struct EndlessRequest {};
+
 void expectRecord(const Record& record, const std::string& marker, const std::string& text) {
     EXPECT_EQ(record.function, marker);
     EXPECT_TRUE(startsWith(record.text, text)) << record.text;
@@ -51,10 +55,23 @@ FaultFixture::FaultFixture(BrokerOptions options) : LibraryFixture(options) {
     bare.properties[VA::NodeLexicon::Name] = std::string("other");
     host->addNode(bare);
     computers.setNames({"host1", "host2"});
+    limitRecords();
+}
+
+FaultFixture::~FaultFixture() {
+    recording::setHook({});
+}
+
+void FaultFixture::limitRecords() {
+    recording::setHook([this](const Record&) {
+        if (recordsLeft == 0) throw EndlessRequest();
+        --recordsLeft;
+    });
 }
 
 Answer FaultFixture::answerTo(const NamedRequest& asked) {
     recording::clear();
+    recordsLeft = mostRecords;
     Answer answer;
     answer.outcome = invoke(asked.request);
     answer.records = recording::take();

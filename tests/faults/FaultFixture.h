@@ -21,6 +21,12 @@ class FaultFixture : public LibraryFixture {
   protected:
     explicit FaultFixture(cmpihost::BrokerOptions options = {});
 
+    ~FaultFixture() override;
+
+    /// Lets a foreign type leave a request that writes records without end. On from the start; a
+    /// test that sets a hook of its own for the records turns it on again.
+    void limitRecords();
+
     /// Forgets the records so far and runs the request; exceptions of the provider pass through.
     Answer answerTo(const NamedRequest& asked);
 
@@ -31,6 +37,9 @@ class FaultFixture : public LibraryFixture {
 
     /// Checks that the answer is the reference: status, elements, and every record.
     static void expectSame(const Answer& reference, const Answer& answer);
+
+  private:
+    std::size_t recordsLeft = 0;
 };
 
 /// Runs a test once for each request that one of the handlers serves.

@@ -36,7 +36,7 @@ class ExceptionFaults : public FaultsOfHandler {
         }
         if (trial.standard || trial.foreign) trial.answer.records = recording::take();
         host->setHook({});
-        recording::setHook({});
+        limitRecords();
         broker.takeViolations();
     }
 
