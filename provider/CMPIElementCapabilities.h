@@ -76,6 +76,11 @@ class CMPIOSElementCapabilities {
     bool singleInstance = false;
 };
 
+/// The broker may tell the adapter another class of its path than it told the handler.
+inline bool movesOn(const CMPIOSElementCapabilities& adapter) {
+    return adapter.movesOn();
+}
+
 }  // namespace VA::OSStatusProvider
 
 #endif

@@ -4,8 +4,6 @@
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
 
-#include "CMPIElementCapabilities.h"
-
 namespace VA::OSStatusProvider {
 
 /// What a handler was called with, as far as a walk needs it.
@@ -31,28 +29,25 @@ inline bool handOver(const Request& request, const CMPIInstance* instance) {
     return true;
 }
 
-/// True for an adapter that would hand over one and the same element for ever: the broker told it
-/// another class of the path than it told the handler.
+/// Whether the adapter comes to another element or to its end. One that may stand on one and the
+/// same element for ever has an overload.
 template <class Adapter>
-bool neverEnds(const Adapter&) {
-    return false;
-}
-inline bool neverEnds(const CMPIOSElementCapabilities& adapter) {
-    return !adapter.movesOn();
+bool movesOn(const Adapter&) {
+    return true;
 }
 
 /// The operations: what each takes from an adapter for its current element.
 struct ObjectPaths {
     template <class Adapter>
     static CMPIObjectPath* take(Adapter& adapter, const Request&) {
-        return neverEnds(adapter) ? nullptr : adapter.getObjectPath();
+        return movesOn(adapter) ? adapter.getObjectPath() : nullptr;
     }
 };
 
 struct Instances {
     template <class Adapter>
     static CMPIInstance* take(Adapter& adapter, const Request& request) {
-        return neverEnds(adapter) ? nullptr : adapter.getCMPIInstance(request.properties);
+        return movesOn(adapter) ? adapter.getCMPIInstance(request.properties) : nullptr;
     }
 };
 

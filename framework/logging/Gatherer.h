@@ -56,7 +56,7 @@ class [[gnu::visibility("hidden")]] ZBMessageBuffer::Gatherer final : private st
     std::streamsize xsputn(const char* text, std::streamsize count) override;
 
     bool isWorthKeeping() const noexcept;
-    bool isStreamAsNew() const;
+    bool isStreamAsNew() const noexcept;
     void resetStream() noexcept;
 
     std::string& gathering() noexcept {

@@ -80,7 +80,7 @@ bool ZBMessageBuffer::Gatherer::isWorthKeeping() const noexcept {
     return texts_[0].capacity() <= keptCapacity && texts_[1].capacity() <= keptCapacity;
 }
 
-bool ZBMessageBuffer::Gatherer::isStreamAsNew() const {
+bool ZBMessageBuffer::Gatherer::isStreamAsNew() const noexcept {
     return stream_.rdbuf() == this && stream_.rdstate() == std::ios::goodbit &&
            stream_.flags() == pristine_.flags() && stream_.width() == pristine_.width() &&
            stream_.precision() == pristine_.precision() && stream_.fill() == pristine_.fill() &&
