@@ -1,0 +1,27 @@
+#ifndef TESTS_LOAD_PROCESS_STATE_H
+#define TESTS_LOAD_PROCESS_STATE_H
+
+#include <string>
+
+namespace load {
+
+/// What the calling process holds at one moment.
+struct ProcessState {
+    long residentPages;       ///< all resident memory: heap, stacks, libraries
+    long anonymousKilobytes;  ///< that part of it which no file stands behind
+    long peakKilobytes;       ///< the most resident memory so far
+    long descriptors;         ///< open files, without the one that this count needs
+    long threads;
+};
+
+/// Reads it from /proc. Memory that the allocator keeps for later is given back first
+/// (malloc_trim), so that only what is in use counts. Throws std::runtime_error when /proc cannot
+/// be read.
+ProcessState readProcessState();
+
+/// In a line, for people.
+std::string describe(const ProcessState& state);
+
+}  // namespace load
+
+#endif
