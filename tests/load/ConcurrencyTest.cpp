@@ -5,6 +5,7 @@
 #include <cstdlib>
 #include <fstream>
 #include <memory>
+#include <ostream>
 #include <sstream>
 #include <utility>
 
@@ -51,6 +52,10 @@ struct Host {
     std::shared_ptr<VA::HostSource> (*make)(const FixtureTree& tree);
     const char* systemName;
 };
+
+void PrintTo(const Host& host, std::ostream* out) {
+    *out << host.name;
+}
 
 std::shared_ptr<VA::HostSource> simulatedHost(const FixtureTree&) {
     auto host = std::make_shared<VA::SimulatedHost>();

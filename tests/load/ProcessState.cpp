@@ -10,24 +10,15 @@
 namespace load {
 namespace {
 
-// The number behind a name in /proc/self/status.
-long statusEntry(const std::string& name) {
-    std::ifstream file("/proc/self/status");
-    for (std::string word; file >> word;) {
-        long number = 0;
-        if (word == name && file >> number) return number;
-    }
-    throw std::runtime_error("no " + name + " in /proc/self/status");
+// The number behind a name in a file of /proc/self.
+long entry(const std::string& fileName, const std::string& name) {
+    std::ifstream file("/proc/self/" + fileName);
+    for (std::string line; std::getline(file, line);)
+        if (line.rfind(name + ':', 0) == 0) return std::stol(line.substr(name.size() + 1));
+    throw std::runtime_error("no " + name + " in /proc/self/" + fileName);
 }
 
-long residentPages() {
-    std::ifstream file("/proc/self/statm");
-    long all = 0;
-    long resident = 0;
-    if (!(file >> all >> resident)) throw std::runtime_error("/proc/self/statm cannot be read");
-    return resident;
-}
-
+// Without the one that the count needs.
 long openDescriptors() {
     const std::filesystem::directory_iterator all("/proc/self/fd"), end;
     return static_cast<long>(std::distance(all, end)) - 1;
@@ -35,17 +26,19 @@ long openDescriptors() {
 
 }  // namespace
 
+// The counters in statm and status lag behind; smaps_rollup counts the pages.
 ProcessState readProcessState() {
     ::malloc_trim(0);
-    return {residentPages(), statusEntry("RssAnon:"), statusEntry("VmHWM:"), openDescriptors(),
-            statusEntry("Threads:")};
+    return {entry("smaps_rollup", "Rss"), entry("smaps_rollup", "Anonymous"),
+            entry("status", "VmHWM"), openDescriptors(), entry("status", "Threads")};
 }
 
 std::string describe(const ProcessState& state) {
-    return std::to_string(state.residentPages) + " pages resident (" +
-           std::to_string(state.anonymousKilobytes) + " KiB anonymous, peak " +
-           std::to_string(state.peakKilobytes) + " KiB), " + std::to_string(state.descriptors) +
-           " open files, " + std::to_string(state.threads) + " threads";
+    return std::to_string(state.residentKilobytes) + " KiB resident, of them " +
+           std::to_string(state.anonymousKilobytes) + " anonymous (peak " +
+           std::to_string(state.peakKilobytes) + "), " + std::to_string(state.descriptors) +
+           " open files, " + std::to_string(state.threads) +
+           (state.threads == 1 ? " thread" : " threads");
 }
 
 }  // namespace load

@@ -7,10 +7,10 @@ namespace load {
 
 /// What the calling process holds at one moment.
 struct ProcessState {
-    long residentPages;       ///< all resident memory: heap, stacks, libraries
-    long anonymousKilobytes;  ///< that part of it which no file stands behind
+    long residentKilobytes;   ///< all resident memory: heap, stacks, and the files that are mapped
+    long anonymousKilobytes;  ///< of that, what no file stands behind
     long peakKilobytes;       ///< the most resident memory so far
-    long descriptors;         ///< open files, without the one that this count needs
+    long descriptors;         ///< open files
     long threads;
 };
 

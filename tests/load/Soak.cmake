@@ -1,1 +1,43 @@
-# Loads and unloads the provider itself: nothing of it or of its framework may be in the program.
+# The soak loads and unloads the provider: nothing of the provider or of the framework may be in the
+# program itself. What chooses the host comes and goes with them.
+add_library(load_hosts MODULE Hosts.cpp)
+target_link_libraries(load_hosts PRIVATE korva::options korva::vainstrumentation)
+target_include_directories(load_hosts PRIVATE "${PROJECT_SOURCE_DIR}")
+korva_shared_library(load_hosts)
+
+add_executable(soak ProcessState.cpp Soak.cpp SoakOptions.cpp Workload.cpp)
+target_compile_definitions(soak PRIVATE
+    KORVA_BINARY_DIR="${CMAKE_BINARY_DIR}" KORVA_LOAD_HOSTS="$<TARGET_FILE:load_hosts>")
+target_link_libraries(soak PRIVATE korva_load korva::broker)
+add_dependencies(soak load_hosts korzbosstatusprofileprovider)
+
+korva_test(soak_tests SOURCES ProcessState.cpp ProcessStateTest.cpp SoakOptions.cpp)
+
+# korva_soak(<name> <option>...): a soak is one test.
+function(korva_soak name)
+    add_test(NAME load.${name}
+        COMMAND "${CMAKE_CURRENT_SOURCE_DIR}/run" $<TARGET_FILE:soak> ${ARGN} --report)
+    set_tests_properties(load.${name} PROPERTIES TIMEOUT 300 COST 100)
+endfunction()
+
+# Sanitizers keep freed memory, so that only files, threads and what they report themselves count. The
+# thread sanitizer cannot name the variables of a library that was loaded again: it has the concurrency
+# tests.
+if(NOT KORVA_SANITIZE)
+    korva_soak(TwoHundredThousandRequestsLeaveMemoryFilesAndThreadsAsTheyWere --requests 200000)
+    korva_soak(RequestsOnEightThreadsLeaveMemoryFilesAndThreadsAsTheyWere
+        --requests 40000 --threads 8)
+elseif(NOT KORVA_SANITIZE MATCHES "thread")
+    korva_soak(RequestsLeaveFilesAndThreadsAsTheyWere --requests 4000 --no-memory)
+    korva_soak(RequestsOnEightThreadsLeaveFilesAndThreadsAsTheyWere
+        --requests 4000 --threads 8 --no-memory)
+endif()
+
+# In 32-bit valgrind needs the symbols of the 32-bit loader, for which there is no package among those of
+# a 64-bit system.
+if(NOT KORVA_SANITIZE AND KORVA_WORD_SIZE STREQUAL "64")
+    add_test(NAME load.ValgrindFindsNoErrorAndNothingThatIsNotFreed
+        COMMAND "${CMAKE_CURRENT_SOURCE_DIR}/memcheck" $<TARGET_FILE:soak>)
+    set_tests_properties(load.ValgrindFindsNoErrorAndNothingThatIsNotFreed PROPERTIES
+        TIMEOUT 300 SKIP_RETURN_CODE 77)
+endif()

@@ -1,0 +1,123 @@
+#include "load/Workload.h"
+
+#include <dlfcn.h>
+
+#include <algorithm>
+#include <fstream>
+#include <memory>
+#include <stdexcept>
+#include <thread>
+
+#include "host/broker/Invoke.h"
+
+namespace load {
+
+using namespace cmpihost;
+
+namespace {
+
+const char* const folder = KORVA_BINARY_DIR "/lib/";
+
+// The hosts, in turn.
+constexpr int thisMachine = -1;
+constexpr int turns[] = {thisMachine, 1, 20, 0};
+
+// Few shells are kept: the memory that they take is the broker's.
+BrokerOptions options() {
+    BrokerOptions result;
+    result.quarantine = 0;
+    return result;
+}
+
+struct CloseLibrary {
+    void operator()(void* handle) const noexcept { ::dlclose(handle); }
+};
+using LibraryHandle = std::unique_ptr<void, CloseLibrary>;
+
+// Has the instrumentation show simulated nodes as long as the result lives.
+LibraryHandle simulate(unsigned int nodes) {
+    LibraryHandle hosts(::dlopen(KORVA_LOAD_HOSTS, RTLD_NOW | RTLD_LOCAL));
+    if (hosts == nullptr) throw std::runtime_error(::dlerror());
+    reinterpret_cast<void (*)(unsigned int)>(::dlsym(hosts.get(), "showNodes"))(nodes);
+    return hosts;
+}
+
+std::vector<MixedRequest> requestsOfThisMachine(const ProviderLibrary& library, Broker& broker) {
+    OperationRequest names;
+    names.operation = Operation::EnumerateInstanceNames;
+    names.path = {"root/cimv2", "KORVA_OperatingSystem"};
+    const Outcome outcome = invoke(library, broker, names);
+    if (outcome.paths.size() != 1) throw std::runtime_error("this machine has no one system");
+    const Value* const computer = outcome.paths[0].key("CSName");
+    const Value* const system = outcome.paths[0].key("Name");
+    return mixedRequests(computer == nullptr ? "" : computer->text(),
+                         system == nullptr ? "" : system->text());
+}
+
+}  // namespace
+
+Workload::Workload()
+    : computers_("host1"),
+      broker_(nullptr, options()),
+      library_(std::string(folder) + "libkorzbosstatusprofileprovider.so.1", broker_),
+      ofThisMachine_(requestsOfThisMachine(library_, broker_)),
+      ofSimulatedHosts_(mixedRequests("host1", "os1")) {
+    broker_.route(ComputerSystemService::className, computers_);
+    library_.unload();
+}
+
+void Workload::runOnce(unsigned long count, unsigned int threads) {
+    const int host = turns[turn_++ % std::size(turns)];
+    const bool real = host == thisMachine;
+    library_.load();
+    LibraryHandle hosts = real ? nullptr : simulate(static_cast<unsigned int>(host));
+    send(pick(real ? ofThisMachine_ : ofSimulatedHosts_, count), threads);
+    library_.unload();
+    hosts.reset();
+    checkLeftovers();
+}
+
+// Goes through all of them in one order, then in another.
+std::vector<const MixedRequest*> Workload::pick(const std::vector<MixedRequest>& from,
+                                                unsigned long count) {
+    std::vector<const MixedRequest*> order;
+    for (const MixedRequest& each : from) order.push_back(&each);
+    std::vector<const MixedRequest*> result;
+    while (result.size() < count) {
+        std::shuffle(order.begin(), order.end(), random_);
+        const std::size_t missing = std::min<std::size_t>(order.size(), count - result.size());
+        result.insert(result.end(), order.begin(),
+                      order.begin() + static_cast<std::ptrdiff_t>(missing));
+    }
+    return result;
+}
+
+void Workload::send(const std::vector<const MixedRequest*>& picked, unsigned int threads) {
+    std::atomic<std::size_t> next{0};
+    std::vector<std::thread> others;
+    for (unsigned int number = 1; number < threads; ++number)
+        others.emplace_back([&] { sendShare(picked, next); });
+    sendShare(picked, next);
+    for (std::thread& other : others) other.join();
+    const MixedRequest* const wrong = wrong_;
+    if (wrong != nullptr) throw std::runtime_error("wrong status of " + describe(wrong->request));
+}
+
+void Workload::sendShare(const std::vector<const MixedRequest*>& picked,
+                         std::atomic<std::size_t>& next) {
+    for (std::size_t at = next++; at < picked.size(); at = next++) {
+        const MixedRequest& each = *picked[at];
+        if (invoke(library_, broker_, each.request).rc != each.status) wrong_ = &each;
+    }
+}
+
+void Workload::checkLeftovers() {
+    broker_.takeViolations();
+    if (broker_.unreleasedClones() != 0) throw std::runtime_error("a clone was not released");
+    std::ifstream maps("/proc/self/maps");
+    for (std::string line; std::getline(maps, line);)
+        if (line.find(folder) != std::string::npos)
+            throw std::runtime_error("still in the process: " + line);
+}
+
+}  // namespace load
