@@ -70,6 +70,7 @@ std::shared_ptr<VA::HostSource> simulatedHost(const FixtureTree&) {
 
 std::shared_ptr<VA::HostSource> linuxHost(const FixtureTree& tree) {
     tree.writeCompleteHost();
+    tree.makeFolder("run/systemd/system");  // so that libsystemd is asked where there is one
     return std::make_shared<VA::LinuxHost>(tree.root());
 }
 

@@ -20,14 +20,12 @@ function(korva_soak name)
     set_tests_properties(load.${name} PROPERTIES TIMEOUT 300 COST 100)
 endfunction()
 
-# Sanitizers keep freed memory, so that only files, threads and what they report themselves count. The
-# thread sanitizer cannot name the variables of a library that was loaded again: it has the concurrency
-# tests.
+# The address sanitizer keeps freed memory: only files and threads count then, and what it reports itself.
 if(NOT KORVA_SANITIZE)
     korva_soak(TwoHundredThousandRequestsLeaveMemoryFilesAndThreadsAsTheyWere --requests 200000)
     korva_soak(RequestsOnEightThreadsLeaveMemoryFilesAndThreadsAsTheyWere
         --requests 40000 --threads 8)
-elseif(NOT KORVA_SANITIZE MATCHES "thread")
+else()
     korva_soak(RequestsLeaveFilesAndThreadsAsTheyWere --requests 4000 --no-memory)
     korva_soak(RequestsOnEightThreadsLeaveFilesAndThreadsAsTheyWere
         --requests 4000 --threads 8 --no-memory)
