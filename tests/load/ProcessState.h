@@ -14,9 +14,10 @@ struct ProcessState {
     long threads;
 };
 
-/// Reads it from /proc. Memory that the allocator keeps for later is given back first
-/// (malloc_trim), so that only what is in use counts. Throws std::runtime_error when /proc cannot
-/// be read.
+/// Reads it from /proc. Before, memory that the allocator keeps for later is given back
+/// (malloc_trim), and the files that are mapped are brought into memory in whole (where the kernel
+/// is 5.14 or newer), so that what is resident is what is in use and does not change by itself.
+/// Throws std::runtime_error when /proc cannot be read.
 ProcessState readProcessState();
 
 /// In a line, for people.
