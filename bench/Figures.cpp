@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <fstream>
+#include <iterator>
 #include <nlohmann/json.hpp>
 #include <stdexcept>
 
@@ -15,6 +16,15 @@ std::ifstream opened(const std::string& file) {
     return stream;
 }
 
+// Deviations of counts that are always 0 are written as NaN, which is no JSON.
+std::string withoutNaN(std::istream& stream) {
+    std::string text(std::istreambuf_iterator<char>(stream), {});
+    const std::string nan = ": NaN";
+    for (std::size_t place = text.find(nan); place != std::string::npos; place = text.find(nan))
+        text.replace(place, nan.size(), ": null");
+    return text;
+}
+
 std::string describe(const nlohmann::json& context) {
     return std::to_string(context.at("num_cpus").get<int>()) + " processors of " +
            std::to_string(context.at("mhz_per_cpu").get<int>()) + " MHz";
@@ -24,7 +34,7 @@ std::string describe(const nlohmann::json& context) {
 
 Figures::Figures(const std::string& file) {
     std::ifstream stream = opened(file);
-    const nlohmann::json all = nlohmann::json::parse(stream);
+    const nlohmann::json all = nlohmann::json::parse(withoutNaN(stream));
     machine_ = describe(all.at("context"));
     for (const nlohmann::json& each : all.at("benchmarks")) {
         if (each.at("run_type") != "iteration") continue;
