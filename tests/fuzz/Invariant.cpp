@@ -1,0 +1,13 @@
+#include "fuzz/Invariant.h"
+
+#include <cstdio>
+#include <cstdlib>
+
+namespace fuzz {
+
+void broken(const std::string& invariant) {
+    std::fprintf(stderr, "Broken invariant: %s\n", invariant.c_str());
+    std::abort();
+}
+
+}  // namespace fuzz

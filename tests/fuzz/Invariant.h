@@ -1,0 +1,24 @@
+// What a fuzz target expects beyond not crashing.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <string_view>
+
+namespace fuzz {
+
+/// Prints the text and ends the program, which libFuzzer counts as a finding.
+[[noreturn]] void broken(const std::string& invariant);
+
+/// `invariant` is a sentence that holds.
+inline void expect(bool holds, const char* invariant) {
+    if (!holds) broken(invariant);
+}
+
+/// The input as text.
+inline std::string_view textOf(const std::uint8_t* data, std::size_t size) {
+    return {reinterpret_cast<const char*>(data), size};
+}
+
+}  // namespace fuzz

@@ -1,0 +1,63 @@
+// MOF: read, added to a schema, and its texts written and read back.
+#include <algorithm>
+
+#include "fuzz/Invariant.h"
+#include "host/MofLexer.h"
+#include "host/MofParser.h"
+#include "host/MofText.h"
+#include "host/Schema.h"
+#include "host/SchemaCatalogue.h"
+#include "host/Utf8.h"
+
+using namespace cmpihost;
+
+namespace {
+
+void checkError(const mof::MofError& error, std::string_view text) {
+    const auto lines = static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n')) + 1;
+    fuzz::expect(error.position().line >= 1 && error.position().line <= lines,
+                 "an error lies on a line of the text");
+    fuzz::expect(
+        error.position().column >= 1 && error.position().column <= countCharacters(text) + 1,
+        "an error lies on a column of the text");
+    fuzz::expect(!error.complaint().empty(), "an error says what is wrong");
+}
+
+void checkSchema(const Schema& schema) {
+    for (const std::string& name : schema.classNames()) {
+        fuzz::expect(schema.find(name) != nullptr, "a class is found by its name");
+        fuzz::expect(schema.isA(name, name), "a class is itself");
+        schema.isAssociation(name);
+        for (const mof::Feature* property : schema.properties(name)) {
+            fuzz::expect(schema.findProperty(name, property->name) != nullptr,
+                         "a property is found by its name");
+            schema.isKey(name, property->name);
+            schema.valueMap(name, property->name);
+        }
+    }
+    const SchemaCatalogue catalogue(schema);
+    for (const std::string& name : schema.classNames())
+        fuzz::expect(catalogue.find(name) != nullptr, "the catalogue has every class");
+}
+
+void checkText(std::string_view text) {
+    const std::string written = mofString(text);
+    mof::Lexer lexer(written, "written");
+    fuzz::expect(lexer.next().text == validUtf8(text), "a text is read back as it was written");
+    fuzz::expect(lexer.next().kind == mof::TokenKind::End, "a text is one token");
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+    const std::string_view text = fuzz::textOf(data, size);
+    checkText(text);
+    try {
+        Schema schema;
+        schema.add(mof::parse(text, "input"));
+        checkSchema(schema);
+    } catch (const mof::MofError& error) {
+        checkError(error, text);
+    }
+    return 0;
+}
