@@ -39,7 +39,56 @@ constexpr CMPIType scalarTypes[] = {
     CMPI_sint32, CMPI_sint64, CMPI_real32,  CMPI_real64, CMPI_dateTime,
 };
 
+ObjectPathValue pathOf(const char* className, std::vector<cmpihost::KeyBinding> keys) {
+    return {"root/cimv2", className, std::move(keys)};
+}
+
+ObjectPathValue operatingSystem(const std::string& name) {
+    return pathOf("KORVA_OperatingSystem", {{"CSCreationClassName", "KORVA_ComputerSystem"},
+                                            {"CSName", "host1"},
+                                            {"CreationClassName", "KORVA_OperatingSystem"},
+                                            {"Name", name}});
+}
+
+ObjectPathValue capabilities(const std::string& id) {
+    return pathOf("KORVA_OperatingSystemCapabilities", {{"InstanceID", id}});
+}
+
+ObjectPathValue computerSystem(const std::string& name) {
+    return pathOf("KORVA_ComputerSystem",
+                  {{"CreationClassName", "KORVA_ComputerSystem"}, {"Name", name}});
+}
+
+ObjectPathValue association(const char* className, const char* first, ObjectPathValue firstEnd,
+                            const char* second, ObjectPathValue secondEnd) {
+    return pathOf(className, {{first, Value::fromReference(std::move(firstEnd))},
+                              {second, Value::fromReference(std::move(secondEnd))}});
+}
+
 }  // namespace
+
+ObjectPathValue Decoder::knownPath() {
+    const auto kind = numberUpTo(5);
+    const std::string name = textLike(texts);
+    const std::string other = flag() ? textLike(texts) : name;
+    switch (kind) {
+        case 0:
+            return operatingSystem(name);
+        case 1:
+            return capabilities(name);
+        case 2:
+            return computerSystem(name);
+        case 3:
+            return association("KORVA_OSElementCapabilities", "ManagedElement",
+                               operatingSystem(name), "Capabilities", capabilities(other));
+        case 4:
+            return association("KORVA_InstalledOS", "GroupComponent", computerSystem(other),
+                               "PartComponent", operatingSystem(name));
+        default:
+            return association("KORVA_RunningOS", "Antecedent", operatingSystem(name), "Dependent",
+                               computerSystem(other));
+    }
+}
 
 std::string Decoder::className() {
     return textLike(classNames);
@@ -127,11 +176,16 @@ Value Decoder::value(unsigned depth) {
 
 ObjectPathValue Decoder::path(unsigned depth) {
     ObjectPathValue result;
-    result.className = className();
+    if (flag()) result = knownPath();
+    if (result.className.empty() || flag()) result.className = className();
     result.nameSpace = textLike(nameSpaces);
-    for (auto keys = numberUpTo(6); keys > 0; --keys) {
+    for (auto changes = numberUpTo(6); changes > 0; --changes) {
         std::string name = textLike(itemNames);
-        result.keys.push_back({std::move(name), value(depth)});
+        const auto place = numberUpTo(result.keys.size());
+        if (place < result.keys.size())
+            result.keys[place].value = value(depth);
+        else
+            result.keys.push_back({std::move(name), value(depth)});
     }
     if (flag()) result.hostName = text(64);
     return result;

@@ -47,13 +47,14 @@ class Decoder {
     /// times at most.
     cmpihost::Value value(unsigned depth = 2);
 
-    /// A path of any class with any keys.
+    /// A path of any class with any keys, or one that the provider gives out, changed at will.
     cmpihost::ObjectPathValue path(unsigned depth = 2);
     cmpihost::InstanceValue instance(unsigned depth = 2);
 
   private:
     cmpihost::Value scalar(CMPIType type);
     cmpihost::Value array(unsigned depth);
+    cmpihost::ObjectPathValue knownPath();
 
     FuzzedDataProvider input_;
 };

@@ -52,6 +52,23 @@ void checkRefusal(const Outcome& outcome) {
     expect(countedRecords().all == 2, "a refused operation leaves one record a channel");
 }
 
+// A request for all elements of a class whose elements are the nodes.
+bool asksForEveryNode(const cmpihost::OperationRequest& request) {
+    constexpr const char* elements[] = {"KORVA_OperatingSystem",
+                                        "KORVA_OperatingSystemCapabilities"};
+    const std::string name = request.path.className.c_str();
+    return !isAssociationOperation(request.operation) && request.path.keys.empty() &&
+           std::any_of(std::begin(elements), std::end(elements),
+                       [&](const char* each) { return cmpihost::equalNames(name, each); });
+}
+
+void checkCount(const Scene& scene, const Outcome& outcome) {
+    const std::size_t found = outcome.paths.size() + outcome.refusedPaths.size() +
+                              outcome.instances.size() + outcome.refusedInstances.size();
+    if (outcome.doneCount == 1 && asksForEveryNode(scene.request))
+        expect(found == scene.nodes, "every node is one element");
+}
+
 void checkService(const Scene& scene, const Outcome& outcome, bool faultless) {
     const RecordCounts records = countedRecords();
     expect(records.entries == 4 && records.exits == 4, "two markers open and close a request");
@@ -73,6 +90,7 @@ void checkService(const Scene& scene, const Outcome& outcome, bool faultless) {
     expect(records.messages == 0 || records.messages == 2, "one exception leaves one message");
     expect((outcome.doneCount == 1) == (records.messages == 0),
            "the end is reported unless an exception was");
+    checkCount(scene, outcome);
 }
 
 void checkException(const Scene& scene, const Ending& ending) {

@@ -50,17 +50,29 @@ fuzz::Ending run(fuzz::Scene& scene, Broker& broker) {
     return ending;
 }
 
+// For people who look at an input: FUZZ_SHOW in the environment has it told.
+void show(const fuzz::Scene& scene, const fuzz::Ending& ending, const Broker& broker) {
+    if (std::getenv("FUZZ_SHOW") == nullptr) return;
+    std::fputs(describe(scene).c_str(), stderr);
+    if (ending.outcome)
+        std::fprintf(stderr, "  status %u, %zu paths, %zu instances, %u times done\n",
+                     static_cast<unsigned>(ending.outcome->rc), ending.outcome->paths.size(),
+                     ending.outcome->instances.size(), ending.outcome->doneCount);
+    for (const std::string& violation : broker.violations())
+        std::fprintf(stderr, "  violation: %s\n", violation.c_str());
+}
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     fuzz::Decoder input(data, size);
     fuzz::Scene scene = fuzz::decodeScene(input);
-    if (std::getenv("FUZZ_SHOW") != nullptr) std::fputs(describe(scene).c_str(), stderr);
     VA::setHostSource(scene.host);
     {
         Broker broker(&catalogue(), scene.options);
         if (scene.computersServed) broker.route("KORVA_ComputerSystem", scene.computers);
         const fuzz::Ending ending = run(scene, broker);
+        show(scene, ending, broker);
         fuzz::checkEnding(scene, ending, broker);
     }
     VA::setHostSource(nullptr);

@@ -1,5 +1,5 @@
-// Stands in for ZBLog::ZBLogger in a fuzz target: every record is formatted as a line of a log, and
-// checked. A record that breaks a rule is a finding.
+// Stands in for ZBLog::ZBLogger in a fuzz target: every record is checked, and those that quote
+// clients or the host are formatted as lines of a log. A record that breaks a rule is a finding.
 #pragma once
 
 #include <cstdint>
