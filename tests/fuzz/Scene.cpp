@@ -131,8 +131,11 @@ void addComputers(Decoder& input, Scene& scene) {
     answer.failAt = static_cast<unsigned>(input.numberUpTo(3));
     answer.failRc = input.status();
     std::vector<InstanceValue> systems(1, computerSystem("host1"));
-    for (auto more = input.numberUpTo(3); more > 0; --more)
-        systems.push_back(input.flag() ? input.instance(1) : computerSystem(input.text(64)));
+    for (auto more = input.numberUpTo(3); more > 0; --more) {
+        const bool odd = input.flag();
+        systems.push_back(odd ? input.instance(1) : computerSystem(input.text(64)));
+        scene.oddComputers = scene.oddComputers || odd;
+    }
     if (input.flag()) systems.clear();
     const unsigned times = input.pick(repetitions);
     for (unsigned each = 0; each < times; ++each) {

@@ -38,6 +38,8 @@ struct Scene {
     /// False: the broker knows nobody who serves computer systems.
     bool computersServed = true;
     ComputerSystems computers;
+    /// Whether among them are instances of anything.
+    bool oddComputers = false;
     std::vector<cmpihost::Fault> faults;
     /// From this call of the result on it fails; 0: none does.
     unsigned resultFailsFrom = 0;
