@@ -68,6 +68,18 @@ void count(const ZBLog::Record& record) {
     if (ZBLog::isFailure(record.text)) ++counts.messages;
 }
 
+void take(const ZBLog::Record& record) {
+    expect(record.text.size() <= 511, "a record has at most 511 bytes");
+    expect(record.level == 3000 || record.level == 4000, "a record is of level 3000 or 4000");
+    count(record);
+    if (throwFrom != 0 && counts.all >= throwFrom) {
+        twinIsDue = false;
+        throw std::runtime_error("from the log");
+    }
+    checkTwin(record);
+    if (quotesOthers(record.text)) checkLines(record);
+}
+
 }  // namespace
 
 void startRecords(std::uint64_t newThrowFrom) {
@@ -78,18 +90,6 @@ void startRecords(std::uint64_t newThrowFrom) {
 
 RecordCounts countedRecords() {
     return counts;
-}
-
-static void take(const ZBLog::Record& record) {
-    expect(record.text.size() <= 511, "a record has at most 511 bytes");
-    expect(record.level == 3000 || record.level == 4000, "a record is of level 3000 or 4000");
-    count(record);
-    if (throwFrom != 0 && counts.all >= throwFrom) {
-        twinIsDue = false;
-        throw std::runtime_error("from the log");
-    }
-    checkTwin(record);
-    if (quotesOthers(record.text)) checkLines(record);
 }
 
 }  // namespace fuzz
