@@ -30,6 +30,12 @@ constexpr const char* filePaths[] = {
 constexpr const char* folderPaths[] = {"proc", "run/systemd/sessions"};
 constexpr const char* datedPaths[] = {"", "var/log/installer", "etc/machine-id"};
 
+// Any instant, with those of the years 1966 to 2106 as the likely ones.
+std::int64_t instant(FuzzedDataProvider& input) {
+    return input.ConsumeBool() ? input.ConsumeIntegral<std::int64_t>()
+                               : input.ConsumeIntegralInRange<std::int64_t>(-0x7FFFFFF, 0xFFFFFFFF);
+}
+
 class AnyFiles final : public Linux::HostFiles {
   public:
     explicit AnyFiles(FuzzedDataProvider& input) : HostFiles("/nonexistent") {
@@ -43,8 +49,8 @@ class AnyFiles final : public Linux::HostFiles {
         for (const char* path : datedPaths)
             if (input.ConsumeBool()) {
                 Linux::FileDates& dates = dates_[path];
-                if (input.ConsumeBool()) dates.birth = input.ConsumeIntegral<std::int64_t>();
-                dates.change = input.ConsumeIntegral<std::int64_t>();
+                if (input.ConsumeBool()) dates.birth = instant(input);
+                dates.change = instant(input);
             }
         hasSystemd_ = input.ConsumeBool();
     }
@@ -86,8 +92,8 @@ class AnyFiles final : public Linux::HostFiles {
 class AnyKernel final : public Linux::Kernel {
   public:
     explicit AnyKernel(FuzzedDataProvider& input)
-        : now_(input.ConsumeIntegral<std::int64_t>()),
-          boot_(input.ConsumeIntegral<std::int64_t>()),
+        : now_(instant(input)),
+          boot_(instant(input)),
           limit_(input.ConsumeIntegral<std::uint64_t>()) {
         if (input.ConsumeBool())
             names_ = {input.ConsumeRandomLengthString(300), input.ConsumeRandomLengthString(300),
