@@ -35,7 +35,8 @@ if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
     # A unique symbol would pin a library in the process after dlclose.
     add_compile_options($<$<COMPILE_LANGUAGE:CXX>:-fno-gnu-unique>)
 endif()
-add_compile_options(-fstack-protector-strong)
+# Everything is bound when it is loaded: calls need no stub that binds them later.
+add_compile_options(-fstack-protector-strong -fno-plt)
 add_link_options(-Wl,-z,relro -Wl,-z,now -Wl,-z,noexecstack)
 
 # Options for the project's own code; a test framework built from source goes without.

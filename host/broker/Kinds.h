@@ -6,6 +6,7 @@
 
 #include <cmpi/cmpift.h>
 
+#include <array>
 #include <cstring>
 #include <memory>
 #include <optional>
@@ -30,10 +31,16 @@ class Characters {
     Characters& operator=(const Characters&) = delete;
     ~Characters() = default;
 
-    char* get() const noexcept { return text_.get(); }
+    /// Short text lies in the object: the pointer does not outlive a move.
+    char* get() const noexcept {
+        if (!present_) return nullptr;
+        return long_ ? long_.get() : short_.data();
+    }
 
   private:
-    std::unique_ptr<char[]> text_;
+    bool present_ = false;
+    mutable std::array<char, 32> short_{};
+    std::unique_ptr<char[]> long_;
 };
 
 struct InstanceBody {
