@@ -36,17 +36,20 @@ Figures::Figures(const std::string& file) {
     std::ifstream stream = opened(file);
     const nlohmann::json all = nlohmann::json::parse(withoutNaN(stream));
     machine_ = describe(all.at("context"));
+    // Repetitions that alternate leave the benchmarks in no order; the index is that of the list.
+    std::multimap<int, std::string> places;
     for (const nlohmann::json& each : all.at("benchmarks")) {
         if (each.at("run_type") != "iteration") continue;
         const auto name = each.at("run_name").get<std::string>();
         const auto time = each.at("cpu_time").get<double>();
         const auto [place, isNew] = figures_.try_emplace(name, Figure{time});
-        if (isNew) names_.push_back(name);
+        if (isNew) places.emplace(each.at("family_index").get<int>(), name);
         Figure& figure = place->second;
         figure.nanoseconds = std::min(figure.nanoseconds, time);
         for (const char* count : {"allocations", "opened", "peakBytes"})
             if (each.contains(count)) figure.counts[count] = each.at(count).get<double>();
     }
+    for (const auto& [place, name] : places) names_.push_back(name);
 }
 
 std::map<std::string, double> readInstructions(const std::string& file) {

@@ -66,14 +66,14 @@ void measurePart(benchmark::State& state, const Part& part) {
     countOpened(state, [&] { readPart(host, part); });
 }
 
-void measureRequest(benchmark::State& state, Setting& setting,
+void measureRequest(benchmark::State& state, Setting& setting, Answerer answerer,
                     const cmpihost::OperationRequest& request) {
     setting.useRealHost();
     for (auto iteration : state) {
         static_cast<void>(iteration);
-        benchmark::DoNotOptimize(setting.run(Answerer::Provider, request));
+        benchmark::DoNotOptimize(setting.run(answerer, request));
     }
-    countOpened(state, [&] { setting.run(Answerer::Provider, request); });
+    countOpened(state, [&] { setting.run(answerer, request); });
     setting.useSimulatedHost();
 }
 
@@ -86,10 +86,12 @@ void addHostBenchmarks(Setting& setting) {
             [&part](benchmark::State& state) { measurePart(state, part); });
     for (const char* name : {"EnumerateInstanceNames KORVA_OperatingSystem",
                              "EnumerateInstances KORVA_OperatingSystem"})
-        benchmark::RegisterBenchmark((std::string("host/") + name).c_str(),
-                                     [&setting, name](benchmark::State& state) {
-                                         measureRequest(state, setting, requestNamed(name));
-                                     });
+        for (const Answerer answerer : {Answerer::Provider, Answerer::Floor})
+            benchmark::RegisterBenchmark(
+                (std::string("host/") + name + ", " + nameOf(answerer)).c_str(),
+                [&setting, answerer, name](benchmark::State& state) {
+                    measureRequest(state, setting, answerer, requestNamed(name));
+                });
 }
 
 }  // namespace bench

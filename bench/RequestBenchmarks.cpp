@@ -26,6 +26,7 @@ void count(benchmark::State& state, Setting& setting, Answerer answerer,
     setting.run(answerer, request);
     const Counts counts = watch.counts();
     state.counters["allocations"] = static_cast<double>(counts.allocations);
+    state.counters["opened"] = static_cast<double>(counts.opened);
     state.counters["peakBytes"] = static_cast<double>(counts.peakBytes);
 }
 
@@ -42,9 +43,8 @@ void measure(benchmark::State& state, Setting& setting, Answerer answerer,
 void add(Setting& setting, const std::string& group, const std::string& name,
          const cmpihost::OperationRequest& request, unsigned nodes) {
     for (const Answerer answerer : {Answerer::Provider, Answerer::Floor}) {
-        const char* const who = answerer == Answerer::Provider ? "provider" : "floor";
         benchmark::RegisterBenchmark(
-            (group + "/" + name + "/" + std::to_string(nodes) + "/" + who).c_str(),
+            (group + "/" + name + "/" + std::to_string(nodes) + "/" + nameOf(answerer)).c_str(),
             [&setting, answerer, &request, nodes](benchmark::State& state) {
                 measure(state, setting, answerer, request, nodes);
             });

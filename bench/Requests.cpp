@@ -85,11 +85,13 @@ std::vector<NamedRequest> makeRequests() {
             made.back().request.assocClass = hop.assocClass;
         }
     }
-    for (const Operation operation :
-         {Operation::CreateInstance, Operation::ModifyInstance, Operation::DeleteInstance,
-          Operation::ExecQuery, Operation::References, Operation::ReferenceNames}) {
-        made.push_back(onPath(operation, systemPath()));
-        made.back().request.instance.path = systemPath();
+    for (const ObjectPathValue& instance : instancePaths()) {
+        for (const Operation operation :
+             {Operation::CreateInstance, Operation::ModifyInstance, Operation::DeleteInstance,
+              Operation::ExecQuery, Operation::References, Operation::ReferenceNames}) {
+            made.push_back(onPath(operation, instance));
+            made.back().request.instance.path = instance;
+        }
     }
     return made;
 }

@@ -14,8 +14,8 @@ struct NamedRequest {
 };
 
 /// For each of the five classes EnumerateInstances, EnumerateInstanceNames and GetInstance; for
-/// each hop of an association Associators and AssociatorNames; the six operations that are refused,
-/// once each, since they look at no class. Paths are those of Setting's one node.
+/// each hop of an association Associators and AssociatorNames; for each class the six operations
+/// that are refused. Paths are those of Setting's one node.
 const std::vector<NamedRequest>& requests();
 
 /// The request of that name, which must be one of them.

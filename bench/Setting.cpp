@@ -26,6 +26,10 @@ LoadOptions optionsOf(const char* providerName) {
 
 }  // namespace
 
+const char* nameOf(Answerer answerer) noexcept {
+    return answerer == Answerer::Provider ? "provider" : "floor";
+}
+
 Setting::Setting()
     : host_(VA::SimulatedHost::withOneNode()),
       broker_(&schemaCatalogue()),

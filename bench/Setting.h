@@ -12,6 +12,9 @@ namespace bench {
 /// Who answers.
 enum class Answerer { Provider, Floor };
 
+/// "provider" or "floor".
+const char* nameOf(Answerer answerer) noexcept;
+
 /// The built libraries under the strict broker with the schema. The provider sees a simulated host
 /// with one node, and both its logging channels let nothing pass. One thread uses it.
 class Setting {

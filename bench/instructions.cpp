@@ -15,12 +15,12 @@ namespace {
 
 constexpr int rounds = 100;
 
-void measure(bench::Setting& setting, bench::Answerer answerer, const char* who,
+void measure(bench::Setting& setting, bench::Answerer answerer,
              const bench::NamedRequest& request) {
     setting.run(answerer, request.request);
     CALLGRIND_ZERO_STATS;
     for (int round = 0; round < rounds; ++round) setting.run(answerer, request.request);
-    const std::string name = request.name + "/" + who;
+    const std::string name = request.name + "/" + nameOf(answerer);
     CALLGRIND_DUMP_STATS_AT(name.c_str());
 }
 
@@ -39,8 +39,8 @@ int main(int argc, char** argv) try {
     setting.compareAnswers();
     for (const bench::NamedRequest& request : bench::requests()) {
         if (request.name.find(part) == std::string::npos) continue;
-        measure(setting, bench::Answerer::Provider, "provider", request);
-        measure(setting, bench::Answerer::Floor, "floor", request);
+        measure(setting, bench::Answerer::Provider, request);
+        measure(setting, bench::Answerer::Floor, request);
     }
     return 0;
 } catch (const std::exception& caught) {

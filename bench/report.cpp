@@ -80,7 +80,7 @@ void printRequests(const Figures& figures, const std::map<std::string, double>& 
                    Verdict& verdict) {
     std::cout << "## Requests\n\nOne node. Times in microseconds, instructions in thousands.\n\n"
                  "| request | time | floor | ratio | limit | instructions | floor | ratio | "
-                 "allocations | floor |\n|---|--:|--:|--:|--:|--:|--:|--:|--:|--:|\n";
+                 "allocations | floor | opened |\n|---|--:|--:|--:|--:|--:|--:|--:|--:|--:|--:|\n";
     for (const std::string& request : requestsOf(figures, "request/")) {
         const bench::Figure& ours = figureOf(figures, "request/", request, 1, "provider");
         const bench::Figure& floor = figureOf(figures, "request/", request, 1, "floor");
@@ -92,7 +92,7 @@ void printRequests(const Figures& figures, const std::map<std::string, double>& 
                   << verdict.cell(ratio, limitOf(request)) << " | " << fixed(ourWork / 1000, 1)
                   << " | " << fixed(floorWork / 1000, 1) << " | " << fixed(ourWork / floorWork, 2)
                   << " | " << ours.counts.at("allocations") << " | "
-                  << floor.counts.at("allocations") << " |\n";
+                  << floor.counts.at("allocations") << " | " << ours.counts.at("opened") << " |\n";
     }
 }
 
@@ -131,7 +131,7 @@ void printNodes(const Figures& figures, Verdict& verdict) {
 }
 
 void printGroup(const Figures& figures, const char* title, const char* group, const char* count) {
-    std::cout << "\n## " << title << "\n\n| what | time | " << count << " |\n|---|--:|--:|\n";
+    std::cout << "\n## " << title << "\n\n| what | time (µs) | " << count << " |\n|---|--:|--:|\n";
     for (const std::string& name : figures.names())
         if (beginsWith(name, group))
             std::cout << "| " << name.substr(std::string_view(group).size()) << " | "

@@ -27,8 +27,9 @@ class SimulatedHost::State {
     template <class Change>
     void change(Change change) {
         const std::lock_guard<std::mutex> lock(mutex_);
-        if (view_.use_count() > 1) view_ = std::make_shared<View>(*view_);
-        change(*view_);
+        const auto changed = std::make_shared<View>(*view_);
+        change(*changed);
+        view_ = changed;
     }
 
     void setHook(Hook hook) {
@@ -78,7 +79,7 @@ class SimulatedHost::State {
     }
 
     mutable std::mutex mutex_;
-    std::shared_ptr<View> view_ = std::make_shared<View>();
+    std::shared_ptr<const View> view_ = std::make_shared<const View>();
     Hook hook_;
     std::atomic<bool> hooked_{false};
     Count total_{0};

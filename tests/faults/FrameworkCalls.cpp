@@ -7,14 +7,14 @@ namespace {
 bool armed = false;
 bool met = false;
 std::size_t left = 0;
-std::function<void()> raise;
+std::function<void()> raiseNow;
 
 }  // namespace
 
 namespace frameworkCalls {
 
 void throwFrom(std::size_t n, std::function<void()> raiser) {
-    raise = std::move(raiser);
+    raiseNow = std::move(raiser);
     left = n;
     met = false;
     armed = true;
@@ -38,7 +38,7 @@ void __cyg_profile_func_enter(void*, void*) {
     if (!armed || --left != 0) return;
     armed = false;
     met = true;
-    raise();
+    raiseNow();
 }
 
 void __cyg_profile_func_exit(void*, void*) {}

@@ -77,6 +77,23 @@ TEST_F(SimulatedHostTest, EachPropertyCanBeAbsent) {
     }
 }
 
+TEST_F(SimulatedHostTest, ChangesWhileWalksBeginAndEndLeaveEachWalkItsOwnView) {
+    std::thread changing([this] {
+        for (int change = 0; change < 2000; ++change)
+            host->setComputerName("computer " + std::to_string(change));
+    });
+    for (int walk = 0; walk < 2000; ++walk) {
+        Instrumentation cursor;
+        cursor.selectNode(OperatingSystemNode);
+        std::string first;
+        std::string second;
+        cursor.getComputerName(first);
+        cursor.getComputerName(second);
+        EXPECT_EQ(first, second);
+    }
+    changing.join();
+}
+
 TEST_F(SimulatedHostTest, EqualNodesAreAddedTogether) {
     host->clearNodes();
     SimulatedHost::Node node;
