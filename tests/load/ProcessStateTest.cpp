@@ -71,14 +71,24 @@ TEST(SoakOptions, WithoutAnyTwoHundredThousandRequestsAndMemoryCompared) {
     EXPECT_TRUE(options.memory);
 }
 
+TEST(SoakOptions, OneLoadMoreThanThoseBeforeTheFirstReadingIsEnough) {
+    EXPECT_EQ(parsed({"--requests", "1001"}).requests, 1001U);
+    EXPECT_EQ(parsed({"--settle", "0", "--requests", "1"}).settle, 0U);
+}
+
 TEST(SoakOptions, MistakesAreRefusedWithTheUsage) {
     for (const std::vector<const char*>& wrong : {std::vector<const char*>{"--unknown"},
                                                   {"--requests"},
                                                   {"--requests", "-1"},
                                                   {"--requests", ""},
                                                   {"--threads", "0"},
-                                                  {"--per-load", "0"}})
-        EXPECT_THROW(parsed(wrong), std::invalid_argument) << wrong[0];
+                                                  {"--per-load", "0"},
+                                                  {"--requests", "500"},
+                                                  {"--requests", "1000"},
+                                                  {"--per-load", "600", "--requests", "1200"},
+                                                  {"--settle", "200000"},
+                                                  {"--per-load", "200000"}})
+        EXPECT_THROW(parsed(wrong), std::invalid_argument) << testing::PrintToString(wrong);
 }
 
 }  // namespace

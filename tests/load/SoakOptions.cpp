@@ -8,7 +8,8 @@ namespace {
 
 constexpr const char* usage =
     "usage: soak [--requests N] [--settle N] [--per-load N] [--threads N]\n"
-    "            [--no-memory] [--report]";
+    "            [--no-memory] [--report]\n"
+    "The requests must fill more loads than those before the first reading (--settle).";
 
 struct NumberOption {
     const char* name;
@@ -37,6 +38,16 @@ bool takeNumber(SoakOptions& options, const std::string& name, const char* text)
     return false;
 }
 
+// Requests are sent by whole loads.
+unsigned long loads(unsigned long requests, unsigned long perLoad) {
+    return requests / perLoad + (requests % perLoad == 0 ? 0 : 1);
+}
+
+bool measuresSomething(const SoakOptions& options) {
+    if (options.perLoad == 0 || options.threads == 0) return false;
+    return loads(options.requests, options.perLoad) > loads(options.settle, options.perLoad);
+}
+
 }  // namespace
 
 SoakOptions soakOptions(int count, const char* const* arguments) {
@@ -53,7 +64,7 @@ SoakOptions soakOptions(int count, const char* const* arguments) {
             throw std::invalid_argument(usage);
         }
     }
-    if (options.perLoad == 0 || options.threads == 0) throw std::invalid_argument(usage);
+    if (!measuresSomething(options)) throw std::invalid_argument(usage);
     return options;
 }
 
