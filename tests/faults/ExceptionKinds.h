@@ -3,6 +3,7 @@
 
 #include <exception>
 #include <new>
+#include <ostream>
 #include <stdexcept>
 #include <string>
 
@@ -23,6 +24,10 @@ struct ExceptionKind {
     void (*raise)();
     const char* text;
 };
+
+inline std::ostream& operator<<(std::ostream& out, const ExceptionKind& kind) {
+    return out << kind.name;
+}
 
 inline const ExceptionKind exceptionKinds[] = {
     {"FrameworkException", [] { throw VA::FrameworkException("framework"); }, "framework"},

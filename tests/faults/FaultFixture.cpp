@@ -119,8 +119,12 @@ void FaultFixture::expectSame(const Answer& reference, const Answer& answer) {
     EXPECT_EQ(recordsOf(answer), recordsOf(reference));
 }
 
+std::string shortNameOf(const std::string& handler) {
+    return handler.substr(handler.find('_') + 1);
+}
+
 std::string nameOf(const testing::TestParamInfo<std::string>& info) {
-    return info.param.substr(info.param.find('_') + 1);
+    return shortNameOf(info.param);
 }
 
 std::string recordsOf(const Answer& answer) {

@@ -2,6 +2,7 @@
 #define TESTS_FAULTS_FAULT_FIXTURE_H
 
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "faults/Requests.h"
@@ -42,17 +43,17 @@ class FaultFixture : public LibraryFixture {
     std::size_t recordsLeft = 0;
 };
 
-/// Runs a test once for each request that one of the handlers serves.
-class FaultsOfHandler : public FaultFixture, public testing::WithParamInterface<std::string> {
+/// Runs a test once for each request of a handler.
+class EachRequestFixture : public FaultFixture {
   protected:
     using FaultFixture::FaultFixture;
 
-    /// Calls `body` for each of the requests, with its reference at hand; at the end the request is
-    /// to be answered again as if nothing had happened.
+    /// Calls `body` for each of the requests that the handler serves, with its reference at hand;
+    /// at the end the request is to be answered again as if nothing had happened.
     template <class Body>
-    void forEachRequest(Body body) {
+    void forEachRequestOf(const std::string& handler, Body body) {
         for (const NamedRequest& each : servedRequests()) {
-            if (each.handler != GetParam()) continue;
+            if (each.handler != handler) continue;
             SCOPED_TRACE(each.name);
             asked = each;
             reference = answerTo(asked);
@@ -69,7 +70,19 @@ class FaultsOfHandler : public FaultFixture, public testing::WithParamInterface<
     std::vector<std::string> referenceViolations;
 };
 
-/// Names a test after the handler.
+/// The same for the handler that is the test's parameter.
+class FaultsOfHandler : public EachRequestFixture, public testing::WithParamInterface<std::string> {
+  protected:
+    using EachRequestFixture::EachRequestFixture;
+
+    template <class Body>
+    void forEachRequest(Body body) {
+        forEachRequestOf(GetParam(), std::move(body));
+    }
+};
+
+/// The handler's name as it stands in the name of a test.
+std::string shortNameOf(const std::string& handler);
 std::string nameOf(const testing::TestParamInfo<std::string>& info);
 
 /// The rendered records, one string.

@@ -1,6 +1,7 @@
 // Exceptions of every kind from the n-th function of the framework that is entered for a request, n
 // counted up until the request succeeds: object paths, instances, monikers and message buffers.
-#include <iterator>
+#include <string>
+#include <tuple>
 
 #include "faults/ExceptionKinds.h"
 #include "faults/FaultFixture.h"
@@ -13,7 +14,10 @@ using Texts = std::vector<std::string>;
 
 constexpr std::size_t mostCalls = 20000;  ///< no request makes so many
 
-class FrameworkCallFaults : public FaultsOfHandler {
+using HandlerAndKind = std::tuple<std::string, ExceptionKind>;
+
+class FrameworkCallFaults : public EachRequestFixture,
+                            public testing::WithParamInterface<HandlerAndKind> {
   protected:
     ~FrameworkCallFaults() override { frameworkCalls::release(); }
 
@@ -60,17 +64,15 @@ class FrameworkCallFaults : public FaultsOfHandler {
     }
 };
 
-// Each call throws one of the kinds, each request another one from the same call.
 TEST_P(FrameworkCallFaults, AreReportedOrLeaveByTypeAndTheNextRequestIsRight) {
-    std::size_t turn = 0;
-    forEachRequest([&] {
-        ++turn;
+    const auto& [handler, thrown] = GetParam();
+    const ExceptionKind& kind = thrown;
+    forEachRequestOf(handler, [&] {
         // Exceptions that meet one that is under way are a matter of the records alone.
         if (!reference.messages.empty()) return;
         for (std::size_t n = 1;; ++n) {
             ASSERT_LT(n, mostCalls);
-            const ExceptionKind& kind = exceptionKinds[(n + turn) % std::size(exceptionKinds)];
-            SCOPED_TRACE(testing::Message() << kind.name << " from call " << n);
+            SCOPED_TRACE(testing::Message() << "from call " << n);
             if (!throwFrom(n, kind)) {
                 EXPECT_GT(n, 50U);
                 break;
@@ -79,6 +81,14 @@ TEST_P(FrameworkCallFaults, AreReportedOrLeaveByTypeAndTheNextRequestIsRight) {
     });
 }
 
-INSTANTIATE_TEST_SUITE_P(Of, FrameworkCallFaults, testing::ValuesIn(servingHandlers()), nameOf);
+std::string nameOfBoth(const testing::TestParamInfo<HandlerAndKind>& info) {
+    const auto& [handler, kind] = info.param;
+    return shortNameOf(handler) + '_' + kind.name;
+}
+
+INSTANTIATE_TEST_SUITE_P(Of, FrameworkCallFaults,
+                         testing::Combine(testing::ValuesIn(servingHandlers()),
+                                          testing::ValuesIn(exceptionKinds)),
+                         nameOfBoth);
 
 }  // namespace
