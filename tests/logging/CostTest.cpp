@@ -11,7 +11,10 @@
 #include <csignal>
 #include <cstddef>
 #include <cstdlib>
+#include <fstream>
 #include <new>
+#include <optional>
+#include <string>
 
 #include "ZBLogger.h"
 #include "ZBMessageBuffer.h"
@@ -99,6 +102,18 @@ long allocationsOf(Work work) {
     const long before = allocations;
     for (int round = 0; round < rounds; ++round) work();
     return allocations - before;
+}
+
+/// How many system calls of this process have written to a file so far, whatever their names:
+/// write, writev, pwrite and their like. Nothing where the kernel keeps no account of it.
+std::optional<long> writeCalls() {
+    std::ifstream account("/proc/self/io");
+    for (std::string name; account >> name;) {
+        long number = 0;
+        account >> number;
+        if (name == "syscw:") return number;
+    }
+    return std::nullopt;
 }
 
 class CostTest : public testing::Test {
@@ -191,6 +206,17 @@ TEST_F(CostTest, WrittenRecordCostsNoAllocation) {
     logger_.use(configuration_);
     logger_.write(record(text_));
     EXPECT_EQ(allocationsOf([&] { logger_.write(record(text_)); }), 0);
+}
+
+TEST_F(CostTest, WrittenRecordCostsOneWrite) {
+    configuration_.of(Channel::log).categories = {};
+    logger_.use(configuration_);
+    const std::optional<long> before = writeCalls();
+    if (!before) GTEST_SKIP() << "the kernel does not count writes";
+    for (int round = 0; round < rounds; ++round) logger_.write(record(text_));
+    EXPECT_EQ(*writeCalls() - *before, rounds);
+    EXPECT_EQ(logging_test::linesOf(logging_test::readFile(folder_ / "log")).size(),
+              static_cast<std::size_t>(rounds));
 }
 
 TEST_F(CostTest, WarmMessageBufferCostsNoAllocationAndNoSystemCall) {
