@@ -10,6 +10,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <new>
+#include <unordered_map>
 
 namespace {
 
@@ -22,19 +23,41 @@ struct Range {
 constexpr const char* libraries[] = {"libkorzbosstatusprofileprovider", "libvainstrumentation",
                                      "libvaprovider", "libzblog"};
 
+enum class Purpose { None, Fail, Measure };
+
 // Nothing here may allocate.
 struct State {
     std::array<Range, 4> libraries{};
     Range program{};
-    bool armed = false;
+    Purpose purpose = Purpose::None;
     bool andLater = false;
     std::size_t n = 0;
     std::size_t asked = 0;
     std::size_t failed = 0;
+    std::size_t peak = 0;
+    std::size_t current = 0;
 };
 
 State state;
 std::atomic<std::size_t> inUse{0};
+
+/// Keeps what it does from being watched itself: unwinding allocates, and so does the ledger.
+class Pause {
+  public:
+    Pause() : purpose_(state.purpose) { state.purpose = Purpose::None; }
+    ~Pause() { state.purpose = purpose_; }
+    Pause(const Pause&) = delete;
+    Pause& operator=(const Pause&) = delete;
+
+  private:
+    Purpose purpose_;
+};
+
+/// The sizes of the blocks that are measured and in use.
+std::unordered_map<void*, std::size_t>& ledger() {
+    static std::unordered_map<void*, std::size_t> sizes;
+    return sizes;
+}
 
 Range codeOf(const dl_phdr_info& module) {
     Range range;
@@ -67,7 +90,7 @@ struct Search {
 // The first frame that is neither operator new's own nor the C++ library's has asked.
 _Unwind_Reason_Code visitFrame(_Unwind_Context* context, void* data) {
     auto& search = *static_cast<Search*>(data);
-    constexpr unsigned own = 3;  // inLibrary, ask, operator new
+    constexpr unsigned own = 2;  // askedByLibrary, operator new
     if (++search.frames <= own) return _URC_NO_REASON;
     const auto address = static_cast<std::uintptr_t>(_Unwind_GetIP(context)) - 1;
     search.ofLibrary = std::any_of(state.libraries.begin(), state.libraries.end(),
@@ -77,19 +100,38 @@ _Unwind_Reason_Code visitFrame(_Unwind_Context* context, void* data) {
 }
 
 [[gnu::noinline]] bool askedByLibrary() {
+    const Pause pause;
     Search search;
     _Unwind_Backtrace(visitFrame, &search);
     return search.ofLibrary;
 }
 
-[[gnu::noinline]] bool mustFail() {
-    // Unwinding itself may allocate.
-    state.armed = false;
-    const bool counted = askedByLibrary();
-    state.armed = true;
-    if (!counted) return false;
-    ++state.asked;
-    return state.andLater ? state.asked >= state.n : state.asked == state.n;
+bool mustFail() {
+    if (state.purpose != Purpose::Fail) return false;
+    const bool fails = state.andLater ? state.asked >= state.n : state.asked == state.n;
+    if (fails) ++state.failed;
+    return fails;
+}
+
+void enter(void* block, std::size_t size) {
+    const Pause pause;
+    ledger().emplace(block, size);
+    state.current += size;
+    state.peak = std::max(state.peak, state.current);
+}
+
+void strike(void* block) {
+    const Pause pause;
+    const auto found = ledger().find(block);
+    if (found == ledger().end()) return;
+    state.current -= found->second;
+    ledger().erase(found);
+}
+
+void watch(Purpose purpose) {
+    state = State{};
+    dl_iterate_phdr(noteModule, nullptr);
+    state.purpose = purpose;
 }
 
 }  // namespace
@@ -97,16 +139,25 @@ _Unwind_Reason_Code visitFrame(_Unwind_Context* context, void* data) {
 namespace allocations {
 
 void failFrom(std::size_t n, bool andLater) {
-    state = State{};
-    dl_iterate_phdr(noteModule, nullptr);
+    watch(Purpose::None);
     state.n = n;
     state.andLater = andLater;
-    state.armed = true;
+    state.purpose = Purpose::Fail;
 }
 
 std::size_t release() {
-    state.armed = false;
+    state.purpose = Purpose::None;
     return state.failed;
+}
+
+void measure() {
+    ledger().clear();
+    watch(Purpose::Measure);
+}
+
+Usage measured() {
+    state.purpose = Purpose::None;
+    return {state.asked, state.peak, state.current};
 }
 
 std::size_t blocksInUse() {
@@ -118,18 +169,22 @@ std::size_t blocksInUse() {
 // The other forms of new and delete end in these two.
 
 [[gnu::visibility("default")]] void* operator new(std::size_t size) {
-    if (state.armed && mustFail()) {
-        ++state.failed;
-        throw std::bad_alloc();
+    const bool counted = state.purpose != Purpose::None && askedByLibrary();
+    if (counted) {
+        ++state.asked;
+        if (mustFail()) throw std::bad_alloc();
     }
     void* const block = std::malloc(size == 0 ? 1 : size);
     if (block == nullptr) throw std::bad_alloc();
     ++inUse;
+    if (counted && state.purpose == Purpose::Measure) enter(block, size);
     return block;
 }
 
 [[gnu::visibility("default")]] void operator delete(void* block) noexcept {
-    if (block != nullptr) --inUse;
+    if (block == nullptr) return;
+    --inUse;
+    if (state.purpose == Purpose::Measure) strike(block);
     std::free(block);
 }
 

@@ -3,9 +3,10 @@
 
 #include <cstddef>
 
-/// The program's own operator new: lets allocations fail that the provider or one of the
-/// framework's libraries asks for, in its own code or through the C++ library. Those that the
-/// broker, the log of the test and the test itself ask for, never fail. All for one thread.
+/// The program's own operator new: lets allocations fail, or measures them, that the provider or
+/// one of the framework's libraries asks for, in its own code or through the C++ library. Those
+/// that the broker, the log of the test and the test itself ask for, never fail and are not
+/// measured. All for one thread, and either of the two at a time.
 namespace allocations {
 
 /// From now on until release(), the n-th allocation (from 1) of the libraries throws
@@ -14,6 +15,18 @@ void failFrom(std::size_t n, bool andLater);
 
 /// Nothing fails any more. Says how many did.
 std::size_t release();
+
+/// What the libraries asked for while they were measured.
+struct Usage {
+    std::size_t allocations = 0;  ///< in all
+    std::size_t peak = 0;         ///< most bytes that were in use at once
+    std::size_t left = 0;         ///< bytes that were still in use at the end
+};
+
+/// Measures from now on until measured(). What is in use already does not count. The libraries are
+/// loaded.
+void measure();
+Usage measured();
 
 /// How many blocks of operator new are in use, whoever asked for them.
 std::size_t blocksInUse();
