@@ -100,6 +100,28 @@ NamesAMissingPartOfItself() {
     expect_text "cannot read $tree/share/korva-osstatus/register/sfcb.sh" "$output"
 }
 
+NamesAnUnusableFolderForTemporaryFiles() {
+    with_sfcb
+    temporary=/nowhere
+    register register
+    expect_code 1
+    expect_calls ""
+    expect_text "cannot make a temporary folder in /nowhere" "$output"
+    expect_text "make room there or set TMPDIR" "$output"
+    expect_no_text "install the package again" "$output"
+}
+
+ServesAPackageWithoutAFolderForTemporaryFiles() {
+    with_sfcb
+    temporary=/nowhere
+    for operation in register unregister; do
+        register --package "$operation"
+        expect_code 0
+        expect_text "cannot make a temporary folder in /nowhere" "$output"
+    done
+    expect_calls ""
+}
+
 TakesClassesFromTheNamedFolder() {
     with_sfcb
     mv "$tree/share/korva-osstatus/schema" "$work/classes"

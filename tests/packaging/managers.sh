@@ -5,12 +5,13 @@
 tree=$work/tree
 managers=$work/managers
 tools=$work/tools
+temporary=$work/tmp
 
 # What the command under test may use besides object managers.
 tool_names="basename cat cp dirname grep id mkdir mktemp mv readlink rm sed touch"
 
 prepare() {
-    mkdir -p "$managers/bin" "$managers/fail" "$tools" "$work/tmp" "$tree/share/korva-osstatus"
+    mkdir -p "$managers/bin" "$managers/fail" "$tools" "$temporary" "$tree/share/korva-osstatus"
     for name in $tool_names; do ln -s "$(command -v "$name")" "$tools/$name"; done
     cp -R "$KORVA_BINARY_DIR/sbin" "$tree/"
     for folder in schema registration register; do
@@ -35,7 +36,7 @@ server_is_stopped() { echo "cimserver does not answer" >"$managers/fail/cimprovi
 
 # Runs the command under test with the stand-ins; see capture.
 register() {
-    capture env -i PATH="$managers/bin:$tools" TMPDIR="$work/tmp" \
+    capture env -i PATH="$managers/bin:$tools" TMPDIR="$temporary" \
         "$tree/sbin/korva-osstatus-register" "$@"
 }
 

@@ -83,6 +83,16 @@ ScriptsOfPackagesSpareATreeForAnotherMachine() {
     expect_success env DPKG_ROOT=/nowhere PATH=/nowhere "$work/control/prerm" remove
 }
 
+ScriptsOfPackagesSurviveAFailingCommand() {
+    mkdir "$work/bin"
+    ln -s "$(command -v false)" "$work/bin/korva-osstatus-register"
+    for name in provider companion; do
+        dpkg-deb -e "$(package $name)" "$work/$name"
+        expect_success env PATH="$work/bin:$PATH" "$work/$name/postinst" configure
+        expect_success env PATH="$work/bin:$PATH" "$work/$name/prerm" remove
+    done
+}
+
 # ---- the machine
 
 as_root() { if [ "$(id -u)" -eq 0 ]; then "$@"; else unshare --user --map-root-user "$@"; fi; }
