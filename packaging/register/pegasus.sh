@@ -4,7 +4,8 @@
 
 # Set by the command that sources this.
 registration=
-: "${namespace:?}" "${interop:?}" "${schema_dir:?}" "${parts:?}" "${work:?}"
+: "${default_namespace:?}" "${interop:?}" "${schema_dir:?}" "${parts:?}" "${work:?}"
+classes_namespace=${namespace:-$default_namespace}
 
 pegasus_present() { installed cimprovider && { installed cimmof || installed cimmofl; }; }
 
@@ -44,14 +45,14 @@ pegasus_withdraw() {
 }
 
 pegasus_add() {
-    find_registration "$(stem_of "$1")-pegasus.mof" || return 1
+    find_registration "$(stem_of "$1")-pegasus.mof" "$classes_namespace" || return 1
     part=$1
     set --
     for class in $(classes_of "$part"); do
         need_file "$schema_dir/$class.mof" || return 1
         set -- "$@" "$schema_dir/$class.mof"
     done
-    pegasus_compile "$namespace" "$@" || return 1
+    pegasus_compile "$classes_namespace" "$@" || return 1
     # Instances that are there already are not replaced, so the former ones go first.
     if [ "$answers" = yes ] && pegasus_knows "$part"; then pegasus_withdraw "$part" || return 1; fi
     pegasus_compile "$interop" "$registration"
@@ -80,7 +81,7 @@ pegasus_unregister() {
     for part in $parts; do
         if pegasus_knows "$part"; then
             pegasus_withdraw "$part" || return 1
-            say "OpenPegasus: the classes of the $part stay in $namespace"
+            say "OpenPegasus: the classes of the $part stay in $classes_namespace"
         else
             say "OpenPegasus: the $part is not registered"
         fi

@@ -4,7 +4,7 @@
 
 # Set by the command that sources this.
 registration=
-: "${namespace:?}" "${schema_dir:?}" "${parts:?}" "${restart:?}"
+: "${default_namespace:?}" "${schema_dir:?}" "${parts:?}" "${restart:?}"
 
 sfcb_present() { installed sfcbstage && installed sfcbunstage && installed sfcbrepos; }
 
@@ -17,24 +17,61 @@ sfcb_stage() {
     esac
 }
 
-sfcb_knows() { [ -e "$(sfcb_stage)/regs/$(stem_of "$1").reg" ]; }
+sfcb_staged_registration() { echo "$(sfcb_stage)/regs/$(stem_of "$1").reg"; }
 
+sfcb_knows() { [ -e "$(sfcb_staged_registration "$1")" ]; }
+
+# The namespace that a part is registered in; nothing for one that is not.
+sfcb_namespace_of() {
+    sfcb_knows "$1" || return 0
+    staged_namespace=$(sed -n '/^ *namespace: */{s///;s/[[:space:]].*//;p;q;}' "$(sfcb_staged_registration "$1")")
+    echo "${staged_namespace:-$default_namespace}"
+}
+
+# sfcb_add PART NAMESPACE
 sfcb_add() {
-    find_registration "$(stem_of "$1").reg" || return 1
-    set -- "$1" -n "$namespace" -r "$registration"
-    for class in $(classes_of "$1"); do
-        need_file "$schema_dir/$class.mof" || return 1
-        set -- "$@" "$schema_dir/$class.mof"
-    done
+    find_registration "$(stem_of "$1").reg" "$2" || return 1
+    set -- "$1" -n "$2" -r "$registration"
+    for class in $(classes_of "$1"); do set -- "$@" "$schema_dir/$class.mof"; done
     shift
     attempt sfcbstage "$@" || failed sfcbstage "mend what it names and register again"
 }
 
+# sfcb_withdraw PART NAMESPACE
 sfcb_withdraw() {
-    set -- "$1" -n "$namespace" -r "$(stem_of "$1").reg"
+    set -- "$1" -n "$2" -r "$(stem_of "$1").reg"
     for class in $(classes_of "$1"); do set -- "$@" "$class.mof"; done
     shift
-    attempt sfcbunstage "$@" || failed sfcbunstage "mend what it names and unregister again"
+    attempt sfcbunstage "$@" || failed sfcbunstage "mend what it names and run this again"
+}
+
+# True if all files of a part can be read; tells the first one that cannot.
+sfcb_has_files() {
+    find_registration "$(stem_of "$1").reg" "$default_namespace" || return 1
+    for class in $(classes_of "$1"); do need_file "$schema_dir/$class.mof" || return 1; done
+}
+
+# Registers a part where the caller says, or else where it is: sfcb_place PART FORMER-NAMESPACE
+sfcb_place() {
+    into=${namespace:-${2:-$default_namespace}}
+    sfcb_has_files "$1" || return 1
+    if [ -n "$2" ] && [ "$2" != "$into" ]; then
+        say "sfcb: the $1 moves from $2 to $into"
+        sfcb_withdraw "$1" "$2" || return 1
+    fi
+    sfcb_add "$1" "$into"
+}
+
+# Nothing that was staged just now may spoil the next rebuild: sfcb_put_back PART=FORMER-NAMESPACE...
+sfcb_put_back() {
+    for place in "$@"; do
+        part=${place%%=*}
+        former=${place#*=}
+        now=$(sfcb_namespace_of "$part")
+        [ "$now" != "$former" ] || continue
+        [ -z "$now" ] || sfcb_withdraw "$part" "$now" || continue
+        [ -z "$former" ] || sfcb_add "$part" "$former" || continue
+    done
 }
 
 sfcb_rebuild() {
@@ -42,15 +79,15 @@ sfcb_rebuild() {
         "the broker keeps its former repository; mend what sfcbrepos names and run: sfcbrepos -f"
 }
 
+sfcb_stage_parts() {
+    for part in $parts; do sfcb_place "$part" "$(sfcb_namespace_of "$part")" || return 1; done
+}
+
 sfcb_register() {
-    fresh=
-    for part in $parts; do
-        sfcb_knows "$part" || fresh="$fresh $part"
-        sfcb_add "$part" || return 1
-    done
-    if ! sfcb_rebuild; then
-        # Nothing that was staged just now may spoil the next rebuild too.
-        for part in $fresh; do sfcb_withdraw "$part" || true; done
+    set --
+    for part in $parts; do set -- "$@" "$part=$(sfcb_namespace_of "$part")"; done
+    if ! sfcb_stage_parts || ! sfcb_rebuild; then
+        sfcb_put_back "$@"
         return 1
     fi
     sfcb_restart
@@ -60,7 +97,7 @@ sfcb_unregister() {
     withdrawn=no
     for part in $parts; do
         if sfcb_knows "$part"; then
-            sfcb_withdraw "$part" || return 1
+            sfcb_withdraw "$part" "$(sfcb_namespace_of "$part")" || return 1
             withdrawn=yes
         else
             say "sfcb: the $part is not registered"

@@ -234,6 +234,25 @@ sfcbrepos -f" "$(calls)"
     expect_equal "the state of the provider" installed "$(state_of provider)"
 }
 
+# register_on_machine OPTION...
+register_on_machine() { expect_success as_root chroot "$machine" /usr/sbin/korva-osstatus-register "$@" register; }
+
+UpgradeKeepsTheNamespaceThatTheClassesAreIn() {
+    set_up_machine
+    with_sfcb
+    on_machine -i "$(package provider)"
+    register_on_machine --namespace root/other
+    forget_calls
+    later_provider
+    on_machine -i "$work/later.deb"
+    expect_equal "what sfcb was told" "sfcbstage -n root/other -r korva-osstatus.reg
+sfcbrepos -f" "$(calls)"
+    forget_calls
+    on_machine -r korva-osstatus-provider
+    expect_equal "what sfcb was told" "sfcbunstage -n root/other -r korva-osstatus.reg
+sfcbrepos -f" "$(calls)"
+}
+
 UpgradeKeepsAChangedRotation() {
     set_up_machine
     on_machine -i "$(package provider)"

@@ -13,6 +13,10 @@ unstage_provider="sfcbunstage -n root/cimv2 -r korva-osstatus.reg KORVA_Operatin
  KORVA_OperatingSystemCapabilities.mof KORVA_InstalledOS.mof KORVA_RunningOS.mof KORVA_OSElementCapabilities.mof"
 unstage_companion="sfcbunstage -n root/cimv2 -r korva-osstatus-companion.reg KORVA_ComputerSystem.mof"
 
+
+# The same calls for another namespace.
+elsewhere() { printf '%s\n' "$1" | sed "s|-n root/cimv2|-n root/other|; s|SHARE/registration/|TMP/|"; }
+
 staged() { ls "$managers/var/lib/sfcb/stage/regs"; }
 
 StagesTheClassesAndBuildsTheRepository() {
@@ -184,4 +188,61 @@ sfcbrepos -f"
    type: instance
    namespace: root/korva
 #" "$(cat "$managers/var/lib/sfcb/stage/regs/korva-osstatus-companion.reg")"
+}
+
+classes_in() { ls "$managers/var/lib/sfcb/stage/mofs/$1"; }
+
+UnregistersFromTheNamespaceThatItIsIn() {
+    register --without-companion --namespace root/other register
+    forget_calls
+    register --without-companion unregister
+    expect_code 0
+    expect_calls "$(elsewhere "$unstage_provider")
+sfcbrepos -f"
+    expect_equal "what is staged" "" "$(staged)"
+    expect_equal "the classes" "" "$(classes_in root/other)"
+}
+
+RegistersAgainInTheNamespaceThatItIsIn() {
+    register --without-companion --namespace root/other register
+    forget_calls
+    register --without-companion register
+    expect_code 0
+    expect_calls "$(elsewhere "$stage_provider")
+sfcbrepos -f"
+}
+
+MovesToTheNamespaceThatIsNamed() {
+    register --without-companion --namespace root/other register
+    forget_calls
+    register --without-companion --namespace root/cimv2 register
+    expect_code 0
+    expect_calls "$(elsewhere "$unstage_provider")
+$stage_provider
+sfcbrepos -f"
+    expect_text "sfcb: the provider moves from root/other to root/cimv2" "$output"
+    expect_equal "the classes" "" "$(classes_in root/other)"
+}
+
+MovesBackWhenTheRepositoryCannotBeBuilt() {
+    register --without-companion register
+    forget_calls
+    echo "root/other is unknown" >"$managers/fail/sfcbrepos"
+    register --without-companion --namespace root/other register
+    expect_code 1
+    expect_calls "$unstage_provider
+$(elsewhere "$stage_provider")
+sfcbrepos -f
+$(elsewhere "$unstage_provider")
+$stage_provider"
+}
+
+StaysWhereItIsWhenAClassCannotBeRead() {
+    register --without-companion register
+    forget_calls
+    rm "$tree/share/korva-osstatus/schema/KORVA_RunningOS.mof"
+    register --without-companion --namespace root/other register
+    expect_code 1
+    expect_calls ""
+    expect_equal "what is staged" korva-osstatus.reg "$(staged)"
 }
