@@ -117,6 +117,7 @@ write_agent() {
 #include <Instrumentation.h>
 #include <Moniker.h>
 #include <ZBLogger.h>
+#include <ZBMessageBuffer.h>
 #include <cmpi/cmpimacs.h>
 #include <ProviderUtilities.h>
 
@@ -131,7 +132,9 @@ int main() {
     moniker.addKey("Name", name);
     moniker.selectKey(0);
     moniker.getValue(name);
-    ZBLog::ZBLogger::traceLevelMessage("main", "agent.cpp", 1, "Agent", 4000, nullptr, 0, 0, name);
+    ZBLog::ZBMessageBuffer record;
+    ZBLog::ZBLogger::traceLevelMessage("main", "agent.cpp", 1, "Agent", 4000, nullptr, 0, 0,
+                                       record.str(record << "name: " << name.c_str()));
     std::cout << name << ' ' << VA::ProviderUtilities::getClassId("KORVA_OperatingSystem") << ' ' << CMPI_RC_OK << '\n';
 }
 EOF
@@ -152,6 +155,15 @@ AgentIsBuiltWithTheCMakePackage() {
     expect_success cmake --build "$work/build"
     expect_success env -i "$work/build/agent"
     expect_equal "the agent's output" "$(uname -n) 55 0" "$output"
+}
+
+# The libraries ask for the language of their headers themselves.
+AgentOfAnOlderLanguageIsBuiltInThatOfTheHeaders() {
+    install_tree
+    write_agent
+    expect_success cmake -S "$work/agent" -B "$work/build" -DCMAKE_PREFIX_PATH="$tree" \
+        -DCMAKE_CXX_FLAGS="-m$KORVA_WORD_SIZE" -DCMAKE_CXX_STANDARD=14
+    expect_success cmake --build "$work/build"
 }
 
 CMakePackageOfAnotherWordSizeIsRefused() {
