@@ -1,8 +1,9 @@
 #!/bin/sh
-# Runs every command that the documents show in a block marked "sh", from the root folder. A command
-# that fails ends the run and is named.
+# Follows the links of the documents, then runs every command that they show in a block marked "sh", from
+# the root folder. A dead link or a command that fails ends the run and is named.
 set -eu
 cd "$(dirname "$0")/.."
+sh tests/links.sh README.md CHANGELOG.md docs/*.md
 script=$(mktemp)
 trap 'rm -f "$script"' EXIT
 for document in README.md docs/*.md; do
