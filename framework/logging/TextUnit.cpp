@@ -26,8 +26,11 @@ struct CodePoints {
 
 constexpr CodePoints notPrintable[] = {
     {0x0080, 0x009F},  // C1 controls
+    {0x200B, 0x200F},  // blanks and joiners of no width, marks of direction
     {0x2028, 0x202E},  // line and paragraph separator, embeddings and overrides of direction
+    {0x2060, 0x2064},  // word joiner, invisible operators
     {0x2066, 0x2069},  // isolates of direction
+    {0xFEFF, 0xFEFF},  // byte order mark
 };
 
 std::uint8_t byteAt(std::string_view text, std::size_t index) {

@@ -14,7 +14,8 @@ struct TextUnit {
 
 /// The first unit of `text`, which must not be empty. Not printable are control characters (C0,
 /// DEL, C1), the line and paragraph separators, the characters that turn the direction of writing
-/// around, and bytes that are not well-formed UTF-8 (overlong forms, surrogates, beyond U+10FFFF).
+/// around, invisible ones (of no width, joiners, the byte order mark), and bytes that are not
+/// well-formed UTF-8 (overlong forms, surrogates, beyond U+10FFFF).
 TextUnit firstUnit(std::string_view text) noexcept;
 
 }  // namespace ZBLog

@@ -148,7 +148,7 @@ const BadRow badRows[] = {
      "1: control character in \"log.sink = file:/a\\x1B[2J\"\n"},
     {"DEL", "log.sink = file:/a\x7f\n", "1: control character in \"log.sink = file:/a\\x7F\"\n"},
     {"mark of byte order", "\xEF\xBB\xBFlog.level = 1\n",
-     "1: unknown key \"\xEF\xBB\xBFlog.level\"\n"},
+     "1: unknown key \"\\xEF\\xBB\\xBFlog.level\"\n"},
     {"bytes that are no text", "\xFF\xFE = 1\n", "1: unknown key \"\\xFF\\xFE\"\n"},
     {"a long key is cut", std::string(100, 'k') + " = 1\n",
      "1: unknown key \"kkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkkk\\...\"\n"},
