@@ -189,7 +189,8 @@ RemovalUnregistersAndLeavesNothing() {
 sfcbrepos -f
 sfcbunstage -r korva-osstatus.reg
 sfcbrepos -f" "$(calls)"
-    touch "$machine/var/log/korva-osstatus.log" "$machine/var/log/korva-osstatus.log.1.gz"
+    touch "$machine/var/log/korva-osstatus.log" "$machine/var/log/korva-osstatus.log.1.gz" \
+        "$machine/var/log/korva-osstatus.log-20261121" "$machine/var/log/korva-osstatus-other.log-20261121.gz"
     on_machine -P korva-osstatus-provider
     expect_equal "the machine" "$(cat "$work/before")" "$(everything)"
 }
