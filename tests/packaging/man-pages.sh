@@ -18,6 +18,23 @@ PagesAreWithoutFault() {
     done
 }
 
+# The pages in a folder that refer to one of ours that is not there.
+dead_references() {
+    for page in "$1"/*; do
+        sed -n 's/^\.\(.* \)\{0,1\}Xr \([^ ]*\) \([1-8]\).*/\2.\3/p' "$page" |
+            grep -E '^(korva|cmpi|zblog)' | while read -r name; do
+            [ -e "$1/$name" ] || echo "$(basename "$page"): $name"
+        done
+    done
+}
+
+PagesReferToPagesThatThereAre() {
+    expect_equal "what is missing" "" "$(dead_references "$pages")"
+    cp -R "$pages" "$work/pages"
+    mv "$work/pages/zblog.conf.5" "$work/pages/zblog.conf.8"
+    expect_text "korva-osstatus.7: zblog.conf.5" "$(dead_references "$work/pages")"
+}
+
 PageOfTheHostHasItsOptions() {
     need_tool mandoc mandoc
     host=$KORVA_BINARY_DIR/bin/cmpihost
