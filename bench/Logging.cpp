@@ -13,8 +13,6 @@ namespace bench {
 
 namespace {
 
-constexpr const char* failuresOnly = "log.sink = syslog\nlog.records = failures\n";
-
 std::string makeFolder() {
     std::string name = (std::filesystem::temp_directory_path() / "korva-bench-XXXXXX").string();
     if (::mkdtemp(name.data()) == nullptr) throw std::runtime_error("no folder for the logging");

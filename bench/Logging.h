@@ -9,6 +9,9 @@ namespace bench {
 /// the object. One at a time; made before the first record is written.
 class LoggingConfiguration {
   public:
+    /// What holds without any configuration.
+    static constexpr const char* failuresOnly = "log.sink = syslog\nlog.records = failures\n";
+
     /// Nothing but failures passes, as without any configuration.
     LoggingConfiguration();
     ~LoggingConfiguration();
