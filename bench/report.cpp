@@ -132,11 +132,14 @@ void printNodes(const Figures& figures, Verdict& verdict) {
 
 void printGroup(const Figures& figures, const char* title, const char* group, const char* count) {
     std::cout << "\n## " << title << "\n\n| what | time (µs) | " << count << " |\n|---|--:|--:|\n";
-    for (const std::string& name : figures.names())
-        if (beginsWith(name, group))
-            std::cout << "| " << name.substr(std::string_view(group).size()) << " | "
-                      << microseconds(figures.at(name).nanoseconds) << " | "
-                      << figures.at(name).counts.at(count) << " |\n";
+    for (const std::string& name : figures.names()) {
+        if (!beginsWith(name, group)) continue;
+        // Google Benchmark adds a fixed number of iterations to the name.
+        const std::size_t begin = std::string_view(group).size();
+        std::cout << "| " << name.substr(begin, name.find("/iterations:") - begin) << " | "
+                  << microseconds(figures.at(name).nanoseconds) << " | "
+                  << figures.at(name).counts.at(count) << " |\n";
+    }
 }
 
 }  // namespace
