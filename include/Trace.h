@@ -7,8 +7,9 @@
 #include <string>
 #include <string_view>
 
-#include "ZBLogger.h"
-#include "ZBMessageBuffer.h"
+// In angle brackets: another logging layer's headers may come first in the order of folders.
+#include <ZBLogger.h>
+#include <ZBMessageBuffer.h>
 
 /// The records that every unit writes: their texts, and the one way in which they are written.
 ///

@@ -29,9 +29,6 @@ class __attribute__((visibility("default"))) ZBMessageBuffer {
     /// buffer and appends to the same text.
     operator std::ostream&();
 
-    /// Appends an address, as streams print pointers, and goes on as that output stream.
-    std::ostream& appendAddress(const void* address);
-
     /// Takes the text gathered so far. The argument is what the insertions return; it is there so
     /// that they come first. The text is valid until the next call of str on this buffer, or the
     /// buffer's end.
@@ -47,7 +44,7 @@ class __attribute__((visibility("default"))) ZBMessageBuffer {
 template <class Object,
           std::enable_if_t<!std::is_same_v<std::remove_cv_t<Object>, char>, bool> = true>
 inline std::ostream& operator<<(ZBMessageBuffer& buffer, Object* pointer) {
-    return buffer.appendAddress(pointer);
+    return static_cast<std::ostream&>(buffer) << static_cast<const void*>(pointer);
 }
 
 }  // namespace ZBLog

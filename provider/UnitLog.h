@@ -2,6 +2,7 @@
 #define OSSTATUS_UNIT_LOG_H
 
 #include <exception>
+#include <ostream>
 #include <string>
 
 #include "Trace.h"
@@ -25,34 +26,37 @@ struct Caller {
     }
 };
 
-/// The text of a parameter list, which the records on entering and on leaving share. It keeps the
-/// message buffer that it was made in, so that nothing is copied.
+/// The text of a parameter list, which the records on entering and on leaving share. Each parameter
+/// is a name, which brings the leading blank and the "=", and an address.
 class ParameterList {
   public:
-    /// One pointer: its name, which brings the leading blank and the "=", and the address.
-    template <class Object>
-    ParameterList(const char* name, Object* pointer) {
-        buffer_ << name;
-        text_ = buffer_.str(buffer_ << pointer).c_str();
+    /// One parameter.
+    ParameterList(const char* name, const void* pointer) {
+        ZBLog::ZBMessageBuffer buffer;
+        text_ = buffer.str(insert(buffer, name, pointer));
     }
 
     /// An adapter's construction for a request.
-    template <class Broker, class Context, class Path>
-    ParameterList(const Broker* broker, const Context* context, const Path* objectPath) {
-        buffer_ << " _broker=";
-        buffer_ << broker;
-        buffer_ << " _context=";
-        buffer_ << context;
-        buffer_ << " objectPath=";
-        text_ = buffer_.str(buffer_ << objectPath).c_str();
+    ParameterList(const void* broker, const void* context, const void* objectPath) {
+        ZBLog::ZBMessageBuffer buffer;
+        insert(buffer, " _broker=", broker);
+        insert(buffer, " _context=", context);
+        text_ = buffer.str(insert(buffer, " objectPath=", objectPath));
     }
 
     /// Valid as long as this object.
-    const char* text() const noexcept { return text_; }
+    const char* text() const noexcept { return text_.c_str(); }
 
   private:
-    ZBLog::ZBMessageBuffer buffer_;
-    const char* text_;
+    // Addresses go through the buffer's output stream, which every logging layer offers.
+    static std::ostream& insert(ZBLog::ZBMessageBuffer& buffer, const char* name,
+                                const void* pointer) {
+        buffer << name;
+        std::ostream& stream = buffer;
+        return stream << pointer;
+    }
+
+    std::string text_;
 };
 
 /// The records of one source unit: each goes to the log and to the trace, under the unit's file

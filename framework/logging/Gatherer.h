@@ -3,7 +3,6 @@
 
 #include <array>
 #include <cstddef>
-#include <ios>
 #include <memory>
 #include <ostream>
 #include <streambuf>
@@ -33,9 +32,6 @@ class [[gnu::visibility("hidden")]] ZBMessageBuffer::Gatherer final : private st
 
     std::ostream& stream() noexcept;
 
-    /// Appends an address as the stream prints it, and lends the stream.
-    std::ostream& appendAddress(const void* address);
-
     /// Takes the text; the stream is as a new one afterwards. Valid until the next call.
     const std::string& take() noexcept;
 
@@ -56,7 +52,6 @@ class [[gnu::visibility("hidden")]] ZBMessageBuffer::Gatherer final : private st
     std::streamsize xsputn(const char* text, std::streamsize count) override;
 
     bool isWorthKeeping() const noexcept;
-    bool isStreamAsNew() const noexcept;
     void resetStream() noexcept;
 
     std::string& gathering() noexcept {
@@ -66,11 +61,7 @@ class [[gnu::visibility("hidden")]] ZBMessageBuffer::Gatherer final : private st
     std::array<std::string, 2> texts_;  // the one that is gathered, and the one that was taken
     std::size_t current_ = 0;
     std::ostream stream_;
-    std::ios pristine_;  // a stream's state as it should be
-    // Whether the stream was given out, for whatever use, and may be in another state whenever the
-    // text is taken; or only after an address, which few go on to format.
-    bool streamed_ = false;
-    bool lent_ = false;
+    bool streamed_ = false;  // whether the stream was given out, and may be in any state
 };
 
 }  // namespace ZBLog
