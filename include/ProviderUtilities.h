@@ -5,6 +5,7 @@
 #include <cmpi/cmpift.h>
 
 #include <string>
+#include <type_traits>
 #include <vector>
 
 #include "Moniker.h"
@@ -58,14 +59,20 @@ class __attribute__((visibility("default"))) ProviderUtilities {
     static CMPIInstance* createInstance(const CMPIBroker* broker, CMPIObjectPath* path);
 
     /// Sets a property; the CIM type is that of the argument: boolean, uint16, sint16, uint32,
-    /// uint64, string, reference.
+    /// uint64 (for unsigned long too, whatever its size), string, reference. Of no other type does
+    /// it compile; a text may be any that converts to const char*.
     static void setProperty(CMPIInstance* instance, const char* name, bool value);
     static void setProperty(CMPIInstance* instance, const char* name, unsigned short value);
     static void setProperty(CMPIInstance* instance, const char* name, short value);
     static void setProperty(CMPIInstance* instance, const char* name, unsigned int value);
     static void setProperty(CMPIInstance* instance, const char* name, unsigned long long value);
+    static void setProperty(CMPIInstance* instance, const char* name, unsigned long value);
     static void setProperty(CMPIInstance* instance, const char* name, std::string& value);
+    static void setProperty(CMPIInstance* instance, const char* name, const char* value);
     static void setProperty(CMPIInstance* instance, const char* name, CMPIObjectPath* value);
+    // A pointer or an enumerator would be converted, to a boolean or to some number.
+    template <class Other, class = std::enable_if_t<!std::is_convertible_v<Other, const char*>>>
+    static void setProperty(CMPIInstance* instance, const char* name, Other value) = delete;
 
     /// Sets an array property: uint16[] or string[].
     static void setProperty(const CMPIBroker* broker, CMPIInstance* instance, const char* name,

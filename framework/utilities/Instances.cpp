@@ -1,6 +1,6 @@
 #include "CimDateTime.h"
+#include "Keys.h"
 #include "ProviderUtilities.h"
-#include "Strings.h"
 
 namespace VA {
 namespace {
@@ -46,17 +46,14 @@ void setArray(const CMPIBroker* broker, CMPIInstance* instance, const char* name
 // A property for each key of the path, of the key's own type.
 void setKeys(CMPIInstance* instance, const CMPIObjectPath* path) {
     const unsigned int count = ProviderUtilities::getKeyCount(path);
+    const char* name = nullptr;
+    CMPIData key = {};
     for (unsigned int index = 0; index < count; ++index) {
-        CMPIStatus status = {CMPI_RC_OK, nullptr};
-        CMPIString* name = nullptr;
-        const CMPIData data = path->ft->getKeyAt(path, index, &name, &status);
-        const char* characters = charactersOf(name);
-        if (status.rc != CMPI_RC_OK || characters == nullptr) continue;
-        if ((data.state & (CMPI_nullValue | CMPI_notFound)) != 0) continue;
-        if (data.type == CMPI_chars)
-            setCharacters(instance, characters, data.value.chars);
+        if (!readKeyAt(path, index, name, key)) continue;
+        if (key.type == CMPI_chars)
+            setCharacters(instance, name, key.value.chars);
         else
-            set(instance, characters, data.value, data.type);
+            set(instance, name, key.value, key.type);
     }
 }
 
@@ -93,8 +90,16 @@ void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name,
     set(instance, name, &CMPIValue::uint64, value, CMPI_uint64);
 }
 
+void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, unsigned long value) {
+    setProperty(instance, name, static_cast<unsigned long long>(value));
+}
+
 void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, std::string& value) {
-    setCharacters(instance, name, value.c_str());
+    setProperty(instance, name, value.c_str());
+}
+
+void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name, const char* value) {
+    setCharacters(instance, name, value);
 }
 
 void ProviderUtilities::setProperty(CMPIInstance* instance, const char* name,

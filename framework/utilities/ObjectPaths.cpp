@@ -1,23 +1,10 @@
 #include <utility>
 
-#include "KeyText.h"
+#include "Keys.h"
 #include "ProviderUtilities.h"
 #include "Strings.h"
 
 namespace VA {
-namespace {
-
-// Reads one key binding; false when the broker has none of that name. Brokers differ in the status
-// they give then: any but OK counts.
-bool readKey(const CMPIObjectPath* path, const char* name, CMPIData& data) {
-    if (path == nullptr || name == nullptr) return false;
-    CMPIStatus status = {CMPI_RC_OK, nullptr};
-    data = path->ft->getKey(path, name, &status);
-    return status.rc == CMPI_RC_OK;
-}
-
-}  // namespace
-
 unsigned int ProviderUtilities::getKeyCount(const CMPIObjectPath* path) {
     return path == nullptr ? 0 : path->ft->getKeyCount(path, nullptr);
 }
@@ -58,31 +45,25 @@ void ProviderUtilities::setKeyProperty(CMPIObjectPath* path, const char* name,
 
 bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name,
                                        std::string& value) {
-    CMPIData data = {};
-    return readKey(path, name, data) && keyText(data, value);
+    CMPIData key = {};
+    return readKey(path, name, key) && keyText(key, value);
 }
 
 bool ProviderUtilities::getKeyProperty(const CMPIObjectPath* path, const char* name,
                                        const CMPIObjectPath** value) {
-    CMPIData data = {};
-    if (!readKey(path, name, data) || data.type != CMPI_ref || data.value.ref == nullptr ||
-        (data.state & CMPI_nullValue) != 0)
-        return false;
-    *value = data.value.ref;
+    CMPIData key = {};
+    if (!readKey(path, name, key) || key.type != CMPI_ref || key.value.ref == nullptr) return false;
+    *value = key.value.ref;
     return true;
 }
 
 void ProviderUtilities::transformObjectPathToMoniker(const CMPIObjectPath* path, Moniker& moniker) {
     const unsigned int count = getKeyCount(path);
+    const char* name = nullptr;
+    CMPIData key = {};
     std::string value;
-    for (unsigned int index = 0; index < count; ++index) {
-        CMPIStatus status = {CMPI_RC_OK, nullptr};
-        CMPIString* name = nullptr;
-        const CMPIData data = path->ft->getKeyAt(path, index, &name, &status);
-        const char* characters = charactersOf(name);
-        if (status.rc == CMPI_RC_OK && characters != nullptr && keyText(data, value))
-            moniker.addKey(characters, value);
-    }
+    for (unsigned int index = 0; index < count; ++index)
+        if (readKeyAt(path, index, name, key) && keyText(key, value)) moniker.addKey(name, value);
 }
 
 void ProviderUtilities::transformMonikerToObjectPath(Moniker& moniker, CMPIObjectPath** path) {

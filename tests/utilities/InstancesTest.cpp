@@ -1,3 +1,6 @@
+#include <cstdint>
+#include <type_traits>
+
 #include "utilities/UtilitiesFixture.h"
 
 namespace {
@@ -5,6 +8,28 @@ namespace {
 using cmpihost::InstanceValue;
 using cmpihost::Value;
 using testing::ElementsAre;
+
+template <class Value, class = void>
+struct CanBeSet : std::false_type {};
+template <class Value>
+struct CanBeSet<Value, std::void_t<decltype(VA::ProviderUtilities::setProperty(
+                           std::declval<CMPIInstance*>(), "", std::declval<Value>()))>>
+    : std::true_type {};
+template <class... Values>
+constexpr bool canAllBeSet = (CanBeSet<Values>::value && ...);
+template <class... Values>
+constexpr bool canAnyBeSet = (CanBeSet<Values>::value || ...);
+
+enum Enumerator : std::uint32_t {};
+
+static_assert(canAllBeSet<bool, unsigned short, short, unsigned int, unsigned long,
+                          unsigned long long, std::string&, CMPIObjectPath*>);
+static_assert(canAllBeSet<std::uint16_t, std::int16_t, std::uint32_t, std::uint64_t, std::size_t>);
+static_assert(canAllBeSet<const char*, char*, const char (&)[5], char (&)[26]>);
+static_assert(!canAnyBeSet<char, signed char, unsigned char, wchar_t, int, long, long long, float,
+                           double, Enumerator, std::nullptr_t, std::string, const std::string&>);
+static_assert(!canAnyBeSet<void*, const void*, std::string*, const char**, const unsigned char*,
+                           const CMPIObjectPath*, CMPIInstance*, CMPIString*, void (*)()>);
 
 class Instances : public UtilitiesFixture {
   protected:
@@ -54,6 +79,7 @@ TEST_P(Instances, TypeOfTheArgumentIsTheTypeOfTheProperty) {
     Utilities::setProperty(instance, "sint16", static_cast<short>(-32768));
     Utilities::setProperty(instance, "uint32", 4294967295U);
     Utilities::setProperty(instance, "uint64", 18446744073709551615ULL);
+    Utilities::setProperty(instance, "unsigned long", 4294967295UL);
     Utilities::setProperty(instance, "string", text);
     Utilities::setProperty(instance, "ref", path("D", {{"x", "y"}}));
     EXPECT_EQ(property("bool"), Value::fromBoolean(true));
@@ -61,8 +87,19 @@ TEST_P(Instances, TypeOfTheArgumentIsTheTypeOfTheProperty) {
     EXPECT_EQ(property("sint16"), Value::fromSigned(-32768, CMPI_sint16));
     EXPECT_EQ(property("uint32"), Value::fromUnsigned(4294967295U, CMPI_uint32));
     EXPECT_EQ(property("uint64"), Value::fromUnsigned(18446744073709551615ULL, CMPI_uint64));
+    EXPECT_EQ(property("unsigned long"), Value::fromUnsigned(4294967295U, CMPI_uint64));
     EXPECT_EQ(property("string"), Value("text"));
     EXPECT_EQ(property("ref").reference().className, "D");
+}
+
+TEST_P(Instances, CharactersAreATextInWhateverFormTheyAreGiven) {
+    char written[] = "written";
+    const char* const pointer = "pointer";
+    Utilities::setProperty(instance, "literal", "literal");
+    Utilities::setProperty(instance, "written", written);
+    Utilities::setProperty(instance, "pointer", pointer);
+    for (const char* name : {"literal", "written", "pointer"})
+        EXPECT_EQ(property(name), Value(name));
 }
 
 TEST_P(Instances, ArraysCarryTheirElementsInOrder) {
@@ -141,6 +178,8 @@ TEST_P(Instances, NullArgumentsDoNothing) {
     Utilities::setProperty(nullptr, "x", 1U);
     Utilities::setProperty(nullptr, "x", text);
     Utilities::setProperty(nullptr, "x", path("C"));
+    Utilities::setProperty(nullptr, "x", "text");
+    Utilities::setProperty(instance, "x", static_cast<const char*>(nullptr));
     Utilities::setProperty(instance, "x", static_cast<CMPIObjectPath*>(nullptr));
     Utilities::setProperty(broker.cmpi(), nullptr, "x", numbers);
     Utilities::setProperty(broker.cmpi(), nullptr, "x", words);

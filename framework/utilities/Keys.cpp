@@ -1,4 +1,4 @@
-#include "KeyText.h"
+#include "Keys.h"
 
 #include <cmpi/cmpift.h>
 
@@ -8,6 +8,11 @@
 
 namespace VA {
 namespace {
+
+bool hasValue(const CMPIStatus& status, const CMPIData& key) {
+    constexpr CMPIValueState absent = CMPI_nullValue | CMPI_notFound | CMPI_badValue;
+    return status.rc == CMPI_RC_OK && (key.state & absent) == 0;
+}
 
 bool assign(const char* characters, std::string& text) {
     if (characters == nullptr) return false;
@@ -35,10 +40,24 @@ bool dateTime(const CMPIDateTime* moment, std::string& text) {
 
 }  // namespace
 
-bool keyText(const CMPIData& data, std::string& text) {
-    if ((data.state & (CMPI_nullValue | CMPI_notFound | CMPI_badValue)) != 0) return false;
-    const CMPIValue& value = data.value;
-    switch (data.type) {
+bool readKey(const CMPIObjectPath* path, const char* name, CMPIData& key) {
+    if (path == nullptr || name == nullptr) return false;
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    key = path->ft->getKey(path, name, &status);
+    return hasValue(status, key);
+}
+
+bool readKeyAt(const CMPIObjectPath* path, CMPICount index, const char*& name, CMPIData& key) {
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    CMPIString* text = nullptr;
+    key = path->ft->getKeyAt(path, index, &text, &status);
+    name = charactersOf(text);
+    return name != nullptr && hasValue(status, key);
+}
+
+bool keyText(const CMPIData& key, std::string& text) {
+    const CMPIValue& value = key.value;
+    switch (key.type) {
         case CMPI_string:
             return assign(charactersOf(value.string), text);
         case CMPI_chars:
