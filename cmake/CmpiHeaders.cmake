@@ -24,3 +24,10 @@ else()
 endif()
 target_include_directories(korva_options INTERFACE "${KORVA_CONTRACT_INCLUDE_DIR}")
 target_compile_definitions(korva_cmpi INTERFACE CMPI_PLATFORM_LINUX_GENERIC_GNU)
+
+# The embedded broker fills every slot of its tables, and so knows what slots there are: it is compiled
+# with the headers of include/cmpi alone. Their layout is the same.
+add_library(korva_own_cmpi INTERFACE)
+add_library(korva::own_cmpi ALIAS korva_own_cmpi)
+target_include_directories(korva_own_cmpi INTERFACE "${PROJECT_SOURCE_DIR}/include")
+target_compile_definitions(korva_own_cmpi INTERFACE CMPI_PLATFORM_LINUX_GENERIC_GNU)

@@ -18,8 +18,7 @@ endif()
 set_target_properties(korva_cmpi PROPERTIES EXPORT_NAME cmpi)
 foreach(target korva_cmpi ${KORVA_FRAMEWORK})
     get_target_property(folders ${target} INTERFACE_INCLUDE_DIRECTORIES)
-    list(TRANSFORM folders REPLACE "^${PROJECT_SOURCE_DIR}/include$"
-         "$<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}/include>")
+    list(TRANSFORM folders REPLACE "^${PROJECT_SOURCE_DIR}/.*" "$<BUILD_INTERFACE:\\0>")
     set_target_properties(${target} PROPERTIES
         INTERFACE_INCLUDE_DIRECTORIES "${folders};$<INSTALL_INTERFACE:${korva_include_dir}>")
 endforeach()

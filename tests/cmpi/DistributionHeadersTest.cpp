@@ -1,0 +1,80 @@
+// The provider and its companion as they are built with a distribution's CMPI headers of a later
+// level, under the broker, which is of this level.
+#include <gmock/gmock.h>
+
+#include <cstdlib>
+
+#include "host/Schema.h"
+#include "host/SchemaCatalogue.h"
+#include "host/broker/Invoke.h"
+#include "host/broker/LibraryService.h"
+#include "host/broker/ProviderLibrary.h"
+
+namespace {
+
+using namespace cmpihost;
+using testing::ElementsAre;
+
+constexpr const char* folder = KORVA_DISTRIBUTION_BUILD "/lib/";
+
+LoadOptions companionOptions() {
+    LoadOptions options;
+    options.providerName = "ComputerSystemProvider";
+    options.association = false;
+    return options;
+}
+
+class DistributionHeaders : public testing::Test {
+  protected:
+    DistributionHeaders() {
+        setenv("ZBLOG_CONF", "", 1);
+        broker.route("KORVA_ComputerSystem", computerSystems);
+    }
+    void TearDown() override { EXPECT_THAT(broker.takeViolations(), testing::IsEmpty()); }
+
+    Outcome ask(ProviderLibrary& library, Operation operation, const ObjectPathValue& path,
+                std::optional<std::string> assocClass = std::nullopt) {
+        OperationRequest request;
+        request.operation = operation;
+        request.path = path;
+        request.assocClass = std::move(assocClass);
+        return invoke(library, broker, request);
+    }
+
+    SchemaCatalogue catalogue{Schema::load(KORVA_SOURCE_DIR "/schema")};
+    Broker broker{&catalogue};
+    ProviderLibrary provider{std::string(folder) + "libkorzbosstatusprofileprovider.so.1", broker};
+    ProviderLibrary companion{std::string(folder) + "libkorvacomputersystemprovider.so.1", broker,
+                              companionOptions()};
+    LibraryService computerSystems{companion};
+};
+
+TEST_F(DistributionHeaders, LeaveTheProviderAtItsLevel) {
+    const CMPIInstanceMIFT& instance = *provider.instanceMI()->ft;
+    EXPECT_EQ(instance.ftVersion, 200);
+    EXPECT_EQ(instance.miVersion, 200);
+    const CMPIAssociationMIFT& association = *provider.associationMI()->ft;
+    EXPECT_EQ(association.ftVersion, 200);
+    EXPECT_EQ(association.miVersion, 200);
+}
+
+TEST_F(DistributionHeaders, LeaveTheAnswersAsTheyAre) {
+    const std::vector<ObjectPathValue> computers =
+        ask(companion, Operation::EnumerateInstanceNames, {"root/cimv2", "KORVA_ComputerSystem"})
+            .paths;
+    ASSERT_EQ(computers.size(), 1U);
+    const std::vector<InstanceValue> systems =
+        ask(provider, Operation::EnumerateInstances, {"root/cimv2", "KORVA_OperatingSystem"})
+            .instances;
+    ASSERT_EQ(systems.size(), 1U);
+    const ObjectPathValue& system = systems[0].path;
+    EXPECT_EQ(*system.key("CSName"), *computers[0].key("Name"));
+    EXPECT_EQ(systems[0].property("OSType")->toText(), "36");
+    EXPECT_EQ(ask(provider, Operation::GetInstance, system).instances.size(), 1U);
+    EXPECT_THAT(ask(provider, Operation::AssociatorNames, computers[0], "KORVA_InstalledOS").paths,
+                ElementsAre(system));
+    EXPECT_THAT(ask(provider, Operation::AssociatorNames, system, "KORVA_RunningOS").paths,
+                ElementsAre(computers[0]));
+}
+
+}  // namespace
