@@ -1,7 +1,8 @@
 #include "OperatingSystem.h"
 
-#include <strings.h>
-
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
 #include <ctime>
 #include <utility>
 
@@ -39,22 +40,10 @@ void OperatingSystem::setFilter(FilterType type, std::string value) {
 }
 
 bool OperatingSystem::passesFilters() {
-    std::string scratch;
-    for (const Filter& filter : filters) {
-        bool known = true;
-        switch (filter.type) {
-            case CSNameFilter:
-                known = getCSName(scratch);
-                break;
-            case NameFilter:
-                known = getName(scratch);
-                break;
-            default:
-                continue;
-        }
-        if (!known || strcasecmp(filter.value.c_str(), scratch.c_str()) != 0) return false;
-    }
-    return true;
+    // By FilterType.
+    static constexpr bool (OperatingSystem::*texts[])(std::string&) = {&OperatingSystem::getCSName,
+                                                                       &OperatingSystem::getName};
+    return passesAll(*this, filters, texts);
 }
 
 bool OperatingSystem::getOperationalStatus(std::vector<unsigned short>& value) {
@@ -120,10 +109,18 @@ bool OperatingSystem::getDateTime(Properties id, std::string& value) {
     if (!instrumentation.getProperty(id, value)) return false;
     // The zone as libc holds it, without initialising it. The sign is '+' west of UTC: the opposite
     // of the host's own offset, and that of the zone in which the instrumentation gives its dates.
-    const bool east = timezone < 0;
-    const long offset = (east ? -timezone : timezone) / 60;
-    if (!printDateTime(dateTimeBuffer, scanDate(value.c_str()), east ? '-' : '+',
-                       static_cast<unsigned int>(offset)))
+    const long zone = timezone;
+    const char sign = zone < 0 ? '-' : '+';
+    const auto minutes = static_cast<unsigned int>(std::labs(zone / 60));
+    // What the text does not reach stays 0.
+    unsigned int year = 0, month = 0, day = 0, hour = 0, minute = 0, second = 0;
+    char separator = 0;
+    std::sscanf(value.c_str(), "%4u %1c %2u %1c %2u %1c %2u %1c %2u %1c %2u", &year, &separator,
+                &month, &separator, &day, &separator, &hour, &separator, &minute, &separator,
+                &second);
+    std::memset(dateTimeBuffer, 0, sizeof dateTimeBuffer);
+    if (std::snprintf(dateTimeBuffer, sizeof dateTimeBuffer, "%4u%02u%02u%02u%02u%02u.%06u%1c%03u",
+                      year, month, day, hour, minute, second, 0U, sign, minutes) == 0)
         return false;
     value = dateTimeBuffer;
     return true;

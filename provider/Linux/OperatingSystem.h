@@ -4,7 +4,6 @@
 #include <string>
 #include <vector>
 
-#include "DateTimeText.h"
 #include "Instrumentation.h"
 
 namespace VA::OSStatusProvider {
@@ -130,7 +129,7 @@ class OperatingSystem {
     bool filterSet = false;
     std::vector<Filter> filters;
     VA::Instrumentation instrumentation;
-    DateTimeText dateTimeBuffer = {};
+    char dateTimeBuffer[26] = {};  // of a CIM datetime: 25 characters and the NUL
 };
 
 /// State changes of the operating system, which offers none: both do nothing and return false.

@@ -1,7 +1,5 @@
 #include "OperatingSystemCapabilities.h"
 
-#include <strings.h>
-
 #include "FilteredWalk.h"
 #include "UnitLog.h"
 
@@ -28,13 +26,10 @@ OperatingSystemCapabilities& OperatingSystemCapabilities::operator++() {
 }
 
 bool OperatingSystemCapabilities::passesFilters() {
-    std::string identifier;
-    for (const Filter& filter : filters) {
-        if (filter.type != InstanceIDFilter) continue;
-        if (!getInstanceID(identifier)) return false;
-        if (strcasecmp(filter.value.c_str(), identifier.c_str()) != 0) return false;
-    }
-    return true;
+    // By FilterType.
+    static constexpr bool (OperatingSystemCapabilities::*texts[])(std::string&) = {
+        &OperatingSystemCapabilities::getInstanceID};
+    return passesAll(*this, filters, texts);
 }
 
 bool OperatingSystemCapabilities::getInstanceID(std::string& value) {

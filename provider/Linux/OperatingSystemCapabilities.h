@@ -46,11 +46,14 @@ class OperatingSystemCapabilities {
     /// Always 3: shutting down the operating system has no effect on a host of it.
     bool getHostShutdownBehavior(unsigned short& value);
 
+  protected:
+    /// What operator++ applies once a derived class has set it; this one leaves it alone.
+    bool filterSet = false;
+    std::vector<Filter> filters;
+
   private:
     bool passesFilters();
 
-    bool filterSet = false;
-    std::vector<Filter> filters;
     VA::Instrumentation instrumentation;
 };
 

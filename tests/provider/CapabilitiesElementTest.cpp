@@ -2,6 +2,7 @@
 
 #include <stdexcept>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "Linux/OperatingSystemCapabilities.h"
@@ -33,6 +34,48 @@ TEST_F(CapabilitiesElement, FilterChangesNothing) {
     EXPECT_TRUE(element.getInstanceID(identifier));
     EXPECT_EQ(identifier, "b");
     EXPECT_EQ(host->calls(Operation::Advance), 1U);
+}
+
+/// Capabilities that a derived class has narrowed, as setFilter does not.
+class NarrowedCapabilities : public OperatingSystemCapabilities {
+  public:
+    explicit NarrowedCapabilities(std::vector<Filter> narrowing) {
+        filterSet = true;
+        filters = std::move(narrowing);
+    }
+
+    // The identifiers of the nodes that it stands on, from the second one on.
+    std::string furtherIdentifiers() {
+        std::string result;
+        for (++*this; *this; ++*this) {
+            std::string identifier = "(none) ";
+            if (getInstanceID(identifier)) identifier += ' ';
+            result += identifier;
+        }
+        return result;
+    }
+};
+
+TEST_F(CapabilitiesElement, AdvancePassesOverNodesThatFailAFilterOnceThereIsOne) {
+    using Filter = OperatingSystemCapabilities::Filter;
+    const auto identifier = OperatingSystemCapabilities::InstanceIDFilter;
+    const auto unknown = static_cast<OperatingSystemCapabilities::FilterType>(1);
+    for (const char* name : {"first", "b", "Wanted", "b"}) addNode(name);
+    host->addNode({});
+    for (const char* name : {"WANTED", "wanted ", "b"}) addNode(name);
+    const std::pair<std::vector<Filter>, std::string> rows[] = {
+        {{}, "b Wanted b (none) WANTED wanted  b "},
+        {{{identifier, "wanted"}}, "Wanted WANTED "},
+        {{{unknown, "x"}}, "b Wanted b (none) WANTED wanted  b "},
+        {{{unknown, "x"}, {identifier, "wanted"}, {unknown, "y"}}, "Wanted WANTED "},
+        {{{identifier, "wanted"}, {identifier, "b"}}, ""},
+        {{{identifier, ""}}, ""},
+        {{{identifier, "nowhere"}}, ""},
+    };
+    for (const auto& [filters, expected] : rows) {
+        NarrowedCapabilities element(filters);
+        EXPECT_EQ(element.furtherIdentifiers(), expected);
+    }
 }
 
 TEST_F(CapabilitiesElement, WalksEveryNode) {
