@@ -16,13 +16,13 @@ bool hasNext(const CMPIEnumeration* enumeration) {
     return enumeration->ft->hasNext(enumeration, nullptr) != 0;
 }
 
-// The next instance of the enumeration; false when the broker reports a failure.
+// The next instance of the enumeration; false, and null, when the broker reports a failure.
 bool fetch(const CMPIEnumeration* enumeration, CMPIInstance*& instance) {
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     const CMPIData data = enumeration->ft->getNext(enumeration, &status);
-    if (status.rc != CMPI_RC_OK) return false;
-    instance = data.value.inst;
-    return true;
+    const bool fetched = status.rc == CMPI_RC_OK;
+    instance = fetched ? data.value.inst : nullptr;
+    return fetched;
 }
 
 }  // namespace
@@ -40,16 +40,18 @@ CMPIOSComputerSystem::~CMPIOSComputerSystem() noexcept(false) {
 void CMPIOSComputerSystem::setObjectPath(const CMPIObjectPath* objectPath) {
     const ParameterList parameters(" objectPath=", objectPath);
     records.entering(parameters);
-    CMPIStatus status = {CMPI_RC_OK, nullptr};
     // Without a path there is nothing to ask for; a broker might not survive the question.
-    if (objectPath != nullptr)
-        enumeration =
-            broker->bft->enumerateInstances(broker, context, objectPath, nullptr, &status);
-    if (status.rc != CMPI_RC_OK || enumeration == nullptr || !hasNext(enumeration) ||
-        !fetch(enumeration, instance))
+    if (objectPath == nullptr || !fetchFirst(objectPath))
         throw VA::ProviderException("Could not obtain an instance of Computer System");
     firstPending = true;
     records.exiting(parameters);
+}
+
+bool CMPIOSComputerSystem::fetchFirst(const CMPIObjectPath* objectPath) {
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    enumeration = broker->bft->enumerateInstances(broker, context, objectPath, nullptr, &status);
+    return status.rc == CMPI_RC_OK && enumeration != nullptr && hasNext(enumeration) &&
+           fetch(enumeration, instance);
 }
 
 CMPIObjectPath* CMPIOSComputerSystem::getObjectPath() {

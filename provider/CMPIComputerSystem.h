@@ -23,7 +23,8 @@ class CMPIOSComputerSystem {
     CMPIOSComputerSystem& operator=(const CMPIOSComputerSystem&) = delete;
 
     /// Asks the broker for the instances of the path's class and fetches the first. Throws
-    /// VA::ProviderException when there is none.
+    /// VA::ProviderException when there is none; whatever enumeration the broker gave is kept even
+    /// then. A null path asks nobody, changes nothing and throws.
     void setObjectPath(const CMPIObjectPath* objectPath);
 
     /// The path of the current instance, asked of the instance; null when there is none.
@@ -42,6 +43,8 @@ class CMPIOSComputerSystem {
     CMPIOSComputerSystem& operator++();
 
   private:
+    bool fetchFirst(const CMPIObjectPath* objectPath);
+
     CMPIInstance* instance = nullptr;
     CMPIEnumeration* enumeration = nullptr;
     bool firstPending = false;

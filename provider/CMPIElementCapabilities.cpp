@@ -125,9 +125,8 @@ CMPIObjectPath* CMPIOSElementCapabilities::locateCapabilities(const CMPIObjectPa
     const ParameterList parameters(" objectPath=", objectPath);
     records.entering(parameters);
     CMPIObjectPath* path =
-        locate({broker, nameSpace, "KORVA_OperatingSystemCapabilities"}, objectPath,
-               Utilities::getKeyCount(objectPath) != 0, elementCapabilities,
-               &OSElementCapabilities::getOSCapabilitiesMoniker);
+        locate<unsigned int>({broker, nameSpace, "KORVA_OperatingSystemCapabilities"}, objectPath,
+                             elementCapabilities, &OSElementCapabilities::getOSCapabilitiesMoniker);
     records.exiting(parameters);
     return path;
 }
@@ -135,9 +134,9 @@ CMPIObjectPath* CMPIOSElementCapabilities::locateCapabilities(const CMPIObjectPa
 CMPIObjectPath* CMPIOSElementCapabilities::locateOperatingSystem(const CMPIObjectPath* objectPath) {
     const ParameterList parameters(" objectPath=", objectPath);
     records.entering(parameters);
-    CMPIObjectPath* path = locate({broker, nameSpace, "KORVA_OperatingSystem"}, objectPath,
-                                  Utilities::getKeyCount(objectPath) != 0, elementCapabilities,
-                                  &OSElementCapabilities::getOperatingSystemMoniker);
+    CMPIObjectPath* path = locate<unsigned int>({broker, nameSpace, "KORVA_OperatingSystem"},
+                                                objectPath, elementCapabilities,
+                                                &OSElementCapabilities::getOperatingSystemMoniker);
     records.exiting(parameters);
     return path;
 }

@@ -144,18 +144,16 @@ CMPIInstance* ComputerSystemAssociation<Design>::getAssociator(const char** prop
     return instance;
 }
 
-// These associations take the number of keys in 16 bits.
-inline bool hasKeys(const CMPIObjectPath* path) {
-    return static_cast<unsigned short>(VA::ProviderUtilities::getKeyCount(path)) != 0;
-}
+// These associations count keys in 16 bits.
 
 template <class Design>
 CMPIObjectPath* ComputerSystemAssociation<Design>::locateComputerSystem(
     const CMPIObjectPath* objectPath) {
     const ParameterList parameters(" objectPath=", objectPath);
     Design::records().entering(parameters);
-    CMPIObjectPath* path = locate({broker, nameSpace, "KORVA_ComputerSystem"}, objectPath,
-                                  hasKeys(objectPath), mapping, &Mapping::getComputerSystemMoniker);
+    CMPIObjectPath* path =
+        locate<unsigned short>({broker, nameSpace, "KORVA_ComputerSystem"}, objectPath, mapping,
+                               &Mapping::getComputerSystemMoniker);
     Design::records().exiting(parameters);
     return path;
 }
@@ -166,8 +164,8 @@ CMPIObjectPath* ComputerSystemAssociation<Design>::locateOperatingSystem(
     const ParameterList parameters(" objectPath=", objectPath);
     Design::records().entering(parameters);
     CMPIObjectPath* path =
-        locate({broker, nameSpace, "KORVA_OperatingSystem"}, objectPath, hasKeys(objectPath),
-               mapping, &Mapping::getOperatingSystemMoniker);
+        locate<unsigned short>({broker, nameSpace, "KORVA_OperatingSystem"}, objectPath, mapping,
+                               &Mapping::getOperatingSystemMoniker);
     Design::records().exiting(parameters);
     return path;
 }

@@ -15,15 +15,15 @@ struct FarEnd {
     const char* className;
 };
 
-/// A new path of the far end, null when the broker makes none. When `nearEnd` has keys, as the
-/// caller counts them, the path gets the keys that `mapping` derives from those; what the mapping
-/// throws passes through.
-template <class Mapping>
-CMPIObjectPath* locate(const FarEnd& farEnd, const CMPIObjectPath* nearEnd, bool hasKeys,
-                       Mapping& mapping, VA::Moniker (Mapping::*map)(VA::Moniker&)) {
+/// A new path of the far end, null when the broker makes none. When `nearEnd` has keys, the path
+/// gets those that `mapping` derives from them; what the mapping throws passes through. Keys are
+/// counted, once there is a path, in a number of type `Count`.
+template <class Count, class Mapping>
+CMPIObjectPath* locate(const FarEnd& farEnd, const CMPIObjectPath* nearEnd, Mapping& mapping,
+                       VA::Moniker (Mapping::*map)(VA::Moniker&)) {
     CMPIObjectPath* path =
         VA::ProviderUtilities::createObjectPath(farEnd.broker, farEnd.className, farEnd.nameSpace);
-    if (!hasKeys) return path;
+    if (static_cast<Count>(VA::ProviderUtilities::getKeyCount(nearEnd)) == 0) return path;
     VA::Moniker moniker;
     VA::ProviderUtilities::transformObjectPathToMoniker(nearEnd, moniker);
     VA::Moniker mapped = (mapping.*map)(moniker);

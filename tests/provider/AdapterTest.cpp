@@ -1,151 +1,17 @@
-#include <memory>
-#include <string>
-#include <vector>
+#include <optional>
+#include <sstream>
 
-#include "CMPIComputerSystem.h"
 #include "CMPIElementCapabilities.h"
 #include "CMPIInstalledOS.h"
 #include "CMPIOperatingSystem.h"
 #include "CMPIRunningOS.h"
-#include "ProviderException.h"
-#include "host/broker/ComputerSystemService.h"
-#include "host/broker/Request.h"
-#include "provider/SimulatedFixture.h"
+#include "provider/AdapterFixture.h"
 
 namespace {
 
 using namespace cmpihost;
 using namespace VA::OSStatusProvider;
-
-ObjectPathValue pathOf(const std::string& className, std::vector<KeyBinding> keys = {}) {
-    return {"root/cimv2", className, std::move(keys)};
-}
-
-template <class Adapter>
-bool stands(Adapter& adapter) {
-    return static_cast<bool>(adapter);
-}
-
-/// The adapters on their own, within one request of a broker that serves one computer system.
-class Adapters : public SimulatedFixture {
-  protected:
-    Adapters() {
-        broker.route(ComputerSystemService::className, computers);
-        addNode("a");
-        addNode("b");
-    }
-
-    void TearDown() override { EXPECT_EQ(broker.takeViolations(), std::vector<std::string>{}); }
-
-    CMPIObjectPath* made(const std::string& className, std::vector<KeyBinding> keys = {}) {
-        return request.makePath(pathOf(className, std::move(keys)));
-    }
-
-    // The named key of a path, "(none)" for null, "(absent)" for a path without it.
-    static std::string key(const CMPIObjectPath* path, const char* name) {
-        if (path == nullptr) return "(none)";
-        const ObjectPathValue value = valueOf(path);
-        const Value* found = value.key(name);
-        return found == nullptr ? "(absent)" : found->toText();
-    }
-
-    ComputerSystemService computers{"host1"};
-    Broker broker;
-    Request request{broker};
-    CMPIContext* context = request.makeContext({}, "root/cimv2");
-};
-
-class ComputerSystemAdapter : public Adapters {
-  protected:
-    // Not a member itself: destroying an adapter may throw, destroying a fixture must not.
-    std::unique_ptr<CMPIOSComputerSystem> owned =
-        std::make_unique<CMPIOSComputerSystem>(broker.cmpi(), context, "root/cimv2");
-    CMPIOSComputerSystem& adapter = *owned;
-};
-
-TEST_F(ComputerSystemAdapter, IsTrueOnceForTheOneComputer) {
-    adapter.setObjectPath(made("KORVA_ComputerSystem"));
-    EXPECT_TRUE(stands(adapter));
-    EXPECT_FALSE(stands(adapter));
-    EXPECT_FALSE(stands(adapter));
-    // It still stands on the computer.
-    EXPECT_EQ(key(adapter.getObjectPath(), "Name"), "host1");
-}
-
-TEST_F(ComputerSystemAdapter, IsTrueAgainWhileFurtherComputersArePending) {
-    computers.setNames({"cs1", "cs2"});
-    adapter.setObjectPath(made("KORVA_ComputerSystem"));
-    EXPECT_TRUE(stands(adapter));
-    EXPECT_TRUE(stands(adapter));
-    EXPECT_TRUE(stands(adapter));
-    ++adapter;
-    EXPECT_FALSE(stands(adapter));
-    EXPECT_EQ(key(adapter.getObjectPath(), "Name"), "cs2");
-}
-
-TEST_F(ComputerSystemAdapter, GivesTheSameInstanceEachTime) {
-    adapter.setObjectPath(made("KORVA_ComputerSystem"));
-    CMPIInstance* const first = adapter.getCMPIInstance(nullptr);
-    ASSERT_NE(first, nullptr);
-    const char* properties[] = {"Name", nullptr};
-    EXPECT_EQ(adapter.getCMPIInstance(properties), first);
-}
-
-TEST_F(ComputerSystemAdapter, StandsOnNothingBeforeItHasAPath) {
-    EXPECT_EQ(adapter.getObjectPath(), nullptr);
-    EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
-    EXPECT_FALSE(stands(adapter));
-    ++adapter;
-    EXPECT_FALSE(stands(adapter));
-    EXPECT_EQ(adapter.getObjectPath(), nullptr);
-}
-
-TEST_F(ComputerSystemAdapter, StandsOnNothingPastTheLast) {
-    adapter.setObjectPath(made("KORVA_ComputerSystem"));
-    EXPECT_TRUE(stands(adapter));
-    for (int step = 0; step < 2; ++step) {
-        ++adapter;
-        EXPECT_FALSE(stands(adapter));
-        EXPECT_EQ(adapter.getObjectPath(), nullptr);
-        EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
-    }
-}
-
-TEST_F(ComputerSystemAdapter, HasNoPathWhenTheInstanceRefusesIt) {
-    adapter.setObjectPath(made("KORVA_ComputerSystem"));
-    for (const CMPIrc rc : {CMPI_RC_OK, CMPI_RC_ERR_FAILED}) {
-        FaultPlan plan(Fault{"CMPIInstanceFT.getObjectPath", 1, 0, rc});
-        broker.setFaultPlan(&plan);
-        EXPECT_EQ(adapter.getObjectPath(), nullptr);
-        EXPECT_EQ(plan.fired(), 1U);
-        broker.setFaultPlan(nullptr);
-    }
-    EXPECT_EQ(key(adapter.getObjectPath(), "Name"), "host1");
-}
-
-TEST_F(ComputerSystemAdapter, ThrowsWhenTheBrokerHasNoneToGive) {
-    CMPIObjectPath* const asked = made("KORVA_ComputerSystem");
-    const auto message = [&] {
-        try {
-            adapter.setObjectPath(asked);
-        } catch (const VA::ProviderException& caught) {
-            return std::string(caught.what());
-        }
-        return std::string("(nothing thrown)");
-    };
-    const std::string expected = "Could not obtain an instance of Computer System";
-    for (const CMPIrc rc : {CMPI_RC_OK, CMPI_RC_ERR_FAILED}) {
-        FaultPlan plan(Fault{"enumerateInstances", 1, 0, rc});
-        broker.setFaultPlan(&plan);
-        EXPECT_EQ(message(), expected);
-        EXPECT_EQ(plan.fired(), 1U);
-        broker.setFaultPlan(nullptr);
-    }
-    computers.setNames({});
-    EXPECT_EQ(message(), expected);
-    EXPECT_FALSE(stands(adapter));
-    EXPECT_EQ(adapter.getObjectPath(), nullptr);
-}
+using Texts = std::vector<std::string>;
 
 TEST_F(Adapters, OfCapabilitiesFromAnotherClassNeverEndsAndHasNoFarEnd) {
     for (const char* className : {"KORVA_ComputerSystem", "KORVA_RunningOS", "KORVA_Unknown"}) {
@@ -157,6 +23,53 @@ TEST_F(Adapters, OfCapabilitiesFromAnotherClassNeverEndsAndHasNoFarEnd) {
             ++adapter;
         }
     }
+}
+
+// From whatever class the adapter was built, the association's own path and instance have both
+// ends.
+TEST_F(Adapters, OfCapabilitiesSetBothReferencesWhateverClassWasRequested) {
+    for (const char* className :
+         {"KORVA_OperatingSystem", "KORVA_OperatingSystemCapabilities",
+          "KORVA_OSElementCapabilities", "KORVA_ComputerSystem", "KORVA_Unknown"}) {
+        CMPIOSElementCapabilities adapter(broker.cmpi(), context, made(className));
+        const std::string system =
+            "root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\"KORVA_ComputerSystem\","
+            "CSName=\"Host1\",CreationClassName=\"KORVA_OperatingSystem\",Name=\"a\"";
+        const std::string capabilities =
+            "root/cimv2:KORVA_OperatingSystemCapabilities.InstanceID=\"a\"";
+        CMPIObjectPath* const path = adapter.getObjectPath();
+        EXPECT_EQ(key(path, "ManagedElement"), system) << className;
+        EXPECT_EQ(key(path, "Capabilities"), capabilities) << className;
+        const InstanceValue instance = valueOf(adapter.getCMPIInstance(nullptr));
+        EXPECT_EQ(text(instance, "ManagedElement"), system) << className;
+        EXPECT_EQ(text(instance, "Capabilities"), capabilities) << className;
+    }
+}
+
+TEST_F(Adapters, OfAssociationsHandThePropertyListToTheFarEnd) {
+    const char* list[] = {"Name", nullptr};
+    std::ostringstream address;
+    address << list;
+    // The records of the far end's getCMPIInstance that bear the list's address.
+    const auto recorded = [&](auto& adapter, const std::string& file) {
+        recording::clear();
+        EXPECT_NE(adapter.getAssociator(list), nullptr);
+        unsigned found = 0;
+        for (const recording::Record& record : recording::take())
+            if (record.function == "getCMPIInstance" && record.file == file &&
+                record.text.find(" properties=" + address.str()) != std::string::npos)
+                ++found;
+        return found;
+    };
+    CMPIOSElementCapabilities ofSystem(broker.cmpi(), context, made("KORVA_OperatingSystem"));
+    EXPECT_EQ(recorded(ofSystem, "CMPIOperatingSystemCapabilities.cpp"), 4U);
+    CMPIOSElementCapabilities ofCapabilities(broker.cmpi(), context,
+                                             made("KORVA_OperatingSystemCapabilities"));
+    EXPECT_EQ(recorded(ofCapabilities, "CMPIOperatingSystem.cpp"), 4U);
+    CMPIInstalledOS installed(broker.cmpi(), context, made("KORVA_ComputerSystem"));
+    EXPECT_EQ(recorded(installed, "CMPIOperatingSystem.cpp"), 4U);
+    CMPIRunningOS running(broker.cmpi(), context, made("KORVA_ComputerSystem"));
+    EXPECT_EQ(recorded(running, "CMPIOperatingSystem.cpp"), 4U);
 }
 
 template <class Association>
@@ -194,6 +107,31 @@ TYPED_TEST(ComputerAssociationAdapter, FromAnUnrelatedClassIsEmpty) {
     }
 }
 
+/// What InstalledOS::isPrimaryOS is to answer in place of its own; none: its own answer.
+std::optional<bool> primaryAnswer;
+
+TEST_F(Adapters, OfInstalledSystemsAskForPrimaryOSAndSetItWhereItIsKnown) {
+    CMPIInstalledOS installed(broker.cmpi(), context, made("KORVA_InstalledOS"));
+    CMPIRunningOS running(broker.cmpi(), context, made("KORVA_RunningOS"));
+    const auto namesOf = [](const InstanceValue& instance) {
+        Texts names;
+        for (const PropertyValue& property : instance.properties) names.push_back(property.name);
+        return names;
+    };
+    for (const bool primary : {true, false}) {
+        primaryAnswer = primary;
+        const InstanceValue instance = valueOf(installed.getCMPIInstance(nullptr));
+        EXPECT_EQ(namesOf(instance), (Texts{"GroupComponent", "PartComponent", "PrimaryOS"}));
+        EXPECT_EQ(text(instance, "PrimaryOS"), primary ? "true" : "false");
+        EXPECT_EQ(instance.property("PrimaryOS")->type(), CMPI_boolean);
+        EXPECT_EQ(namesOf(valueOf(running.getCMPIInstance(nullptr))),
+                  (Texts{"Antecedent", "Dependent"}));
+    }
+    primaryAnswer.reset();
+    EXPECT_EQ(namesOf(valueOf(installed.getCMPIInstance(nullptr))),
+              (Texts{"GroupComponent", "PartComponent"}));
+}
+
 TEST_F(Adapters, OfTheOperatingSystemIsNarrowedByEachFurtherPath) {
     CMPIOperatingSystem adapter(broker.cmpi(), context, "root/cimv2");
     EXPECT_EQ(key(adapter.getObjectPath(), "Name"), "a");
@@ -210,3 +148,16 @@ TEST_F(Adapters, OfTheOperatingSystemIsNarrowedByEachFurtherPath) {
 }
 
 }  // namespace
+
+// The linker binds the provider's call of InstalledOS::isPrimaryOS to the first, and the second to
+// the function itself.
+extern "C" {
+bool __real__ZN2VA16OSStatusProvider11InstalledOS11isPrimaryOSERb(InstalledOS* self, bool& primary);
+bool __wrap__ZN2VA16OSStatusProvider11InstalledOS11isPrimaryOSERb(InstalledOS* self,
+                                                                  bool& primary) {
+    if (!primaryAnswer)
+        return __real__ZN2VA16OSStatusProvider11InstalledOS11isPrimaryOSERb(self, primary);
+    primary = *primaryAnswer;
+    return true;
+}
+}
