@@ -28,10 +28,13 @@ struct InstalledOSDesign {
     static void setOwnProperties(Mapping& mapping, CMPIInstance* instance);
 };
 
-/// Serves KORVA_InstalledOS: the installed operating systems of the computer system.
-using CMPIInstalledOS = ComputerSystemAssociation<InstalledOSDesign>;
-
 extern template class ComputerSystemAssociation<InstalledOSDesign>;
+
+/// Serves KORVA_InstalledOS: the installed operating systems of the computer system.
+class CMPIInstalledOS : public ComputerSystemAssociation<InstalledOSDesign> {
+  public:
+    using ComputerSystemAssociation::ComputerSystemAssociation;
+};
 
 }  // namespace VA::OSStatusProvider
 

@@ -30,10 +30,13 @@ struct OperatingSystemDesign {
     static Rows<Property<Element>> properties();
 };
 
-/// Serves KORVA_OperatingSystem.
-using CMPIOperatingSystem = ElementAdapter<OperatingSystemDesign>;
-
 extern template class ElementAdapter<OperatingSystemDesign>;
+
+/// Serves KORVA_OperatingSystem.
+class CMPIOperatingSystem : public ElementAdapter<OperatingSystemDesign> {
+  public:
+    using ElementAdapter::ElementAdapter;
+};
 
 }  // namespace VA::OSStatusProvider
 

@@ -29,10 +29,13 @@ struct OperatingSystemCapabilitiesDesign {
     static Rows<Property<Element>> properties();
 };
 
-/// Serves KORVA_OperatingSystemCapabilities.
-using CMPIOperatingSystemCapabilities = ElementAdapter<OperatingSystemCapabilitiesDesign>;
-
 extern template class ElementAdapter<OperatingSystemCapabilitiesDesign>;
+
+/// Serves KORVA_OperatingSystemCapabilities.
+class CMPIOperatingSystemCapabilities : public ElementAdapter<OperatingSystemCapabilitiesDesign> {
+  public:
+    using ElementAdapter::ElementAdapter;
+};
 
 }  // namespace VA::OSStatusProvider
 

@@ -27,10 +27,13 @@ struct RunningOSDesign {
     static void setOwnProperties(Mapping&, CMPIInstance*) {}
 };
 
-/// Serves KORVA_RunningOS: the running operating systems of the computer system.
-using CMPIRunningOS = ComputerSystemAssociation<RunningOSDesign>;
-
 extern template class ComputerSystemAssociation<RunningOSDesign>;
+
+/// Serves KORVA_RunningOS: the running operating systems of the computer system.
+class CMPIRunningOS : public ComputerSystemAssociation<RunningOSDesign> {
+  public:
+    using ComputerSystemAssociation::ComputerSystemAssociation;
+};
 
 }  // namespace VA::OSStatusProvider
 
