@@ -50,7 +50,8 @@ static constexpr DispatchRow associationDispatch[] = {
 
 // Serves a request: finds the adapter for the class that `classSource`, a path or a class name,
 // stands for, and walks it. An exception of the standard hierarchy leaves a message record and the
-// status OK; others pass through, as do those from outside the walk.
+// status OK; others pass through, as do those from outside the walk. All records are the handler's
+// own.
 template <class ClassSource, std::size_t rowCount>
 static CMPIStatus serve(const DispatchRow (&dispatch)[rowCount], ClassSource classSource,
                         const Request& request, Caller handler = Caller::here()) {
@@ -58,7 +59,7 @@ static CMPIStatus serve(const DispatchRow (&dispatch)[rowCount], ClassSource cla
                           handler.line);
     const unsigned short classId = VA::ProviderUtilities::getClassId(classSource);
     CMPIStatus status = {CMPI_RC_OK, nullptr};
-    records.variable("classId", classId, Caller::named(handler.function));
+    records.variable("classId", classId, handler);
     const DispatchRow* row =
         std::find_if(dispatch, dispatch + rowCount,
                      [classId](const DispatchRow& each) { return each.classId == classId; });
@@ -68,11 +69,10 @@ static CMPIStatus serve(const DispatchRow (&dispatch)[rowCount], ClassSource cla
         try {
             row->walk(request);
         } catch (const std::exception& caught) {
-            records.message(caught, Caller::named(handler.function));
+            records.message(caught, handler);
         }
     }
-    const Caller end = Caller::named(handler.function);
-    VA::markProviderExit(loggerOperatingSystemProvider, sourceFile, end.function, end.line);
+    VA::markProviderExit(loggerOperatingSystemProvider, sourceFile, handler.function, handler.line);
     return status;
 }
 

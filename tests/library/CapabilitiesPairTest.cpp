@@ -82,6 +82,9 @@ TEST_F(CapabilitiesPair, ForeignReferenceFailsWithTheMappingsMessage) {
     expectNotFound(getPair({{"ManagedElement", ref(operatingSystemPath("host1", "Linux"))},
                             {"Capabilities", ref(path("KORVA_Other", {{"Key", "Linux"}}))}}),
                    "Could not find 'InstanceID' Key in Moniker");
+    // Before it is seen that the other one is missing.
+    expectNotFound(getPair({{"Capabilities", ref(path("KORVA_Other", {{"Key", "Linux"}}))}}),
+                   "Could not find 'InstanceID' Key in Moniker");
     // The classes of the references are not looked at, only their keys.
     expectFound(getPair({{"ManagedElement", ref(path("KORVA_Other", {{"Name", "Linux"}}))},
                          {"Capabilities", ref(path("KORVA_Other", {{"InstanceID", "Linux"}}))}}),

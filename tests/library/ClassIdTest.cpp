@@ -1,3 +1,4 @@
+#include <functional>
 #include <stdexcept>
 
 #include "library/LibraryFixture.h"
@@ -10,7 +11,7 @@
 namespace {
 
 unsigned short answered = 0;
-bool throwing = false;
+std::function<void()> onQuestion = [] {};
 
 using namespace cmpihost;
 
@@ -22,15 +23,20 @@ bool isOneOf(unsigned int id, std::initializer_list<unsigned int> ids) {
     return false;
 }
 
-std::string rejected(const std::string& handler, unsigned int id) {
-    const std::string category = "Zumbrel.OperatingSystemProvider 4000 null 0 0 | ";
-    const std::string banner =
-        "==============================================================================\n";
+const std::string category = "Zumbrel.OperatingSystemProvider 4000 null 0 0 | ";
+const std::string banner =
+    "==============================================================================\n";
+
+std::string entered(const std::string& handler) {
     return "both markProviderEntry include/Trace.h:336 " + category + banner +
            "both markProviderEntry include/Trace.h:337 " + category + "ENTERING: " + handler +
-           "() in OperatingSystemProvider.cpp [Line: #]\n" + "both " + handler +
-           " OperatingSystemProvider.cpp:# " + category + "VARIABLE: 'classId' has Value '" +
-           std::to_string(id) + "' at line # in OperatingSystemProvider.cpp\n" +
+           "() in OperatingSystemProvider.cpp [Line: #]\n";
+}
+
+std::string rejected(const std::string& handler, unsigned int id) {
+    return entered(handler) + "both " + handler + " OperatingSystemProvider.cpp:# " + category +
+           "VARIABLE: 'classId' has Value '" + std::to_string(id) +
+           "' at line # in OperatingSystemProvider.cpp\n" +
            "both markProviderExit include/Trace.h:348 " + category + "EXITING: " + handler +
            "() in OperatingSystemProvider.cpp [Line: #]\n" +
            "both markProviderExit include/Trace.h:349 " + category + banner;
@@ -72,11 +78,31 @@ TEST_F(ClassIds, AssociationRequestsRejectEveryIdFrom0To70ButTheThreeServed) {
 }
 
 TEST_F(ClassIds, ExceptionFromTheFrameworkLeavesTheHandler) {
-    throwing = true;
+    onQuestion = [] { throw std::runtime_error("from the framework"); };
     EXPECT_THROW(enumerateNames("KORVA_OperatingSystem"), std::runtime_error);
     EXPECT_THROW(associators(capabilitiesPath("Linux"), "KORVA_OSElementCapabilities"),
                  std::runtime_error);
-    throwing = false;
+    onQuestion = [] {};
+}
+
+TEST_F(ClassIds, AreAskedForOnceTheEntryMarkerIsWritten) {
+    const ObjectPathValue system = operatingSystemPath("host1", "Linux");
+    const std::pair<const char*, std::function<void()>> requests[] = {
+        {"OperatingSystem_EnumInstanceNames", [&] { enumerateNames("KORVA_OperatingSystem"); }},
+        {"OperatingSystem_EnumInstances", [&] { enumerate("KORVA_OperatingSystem"); }},
+        {"OperatingSystem_GetInstance", [&] { get(system); }},
+        {"OperatingSystem_AssociatorNames", [&] { associatorNames(system, "KORVA_RunningOS"); }},
+        {"OperatingSystem_Associators", [&] { associators(system, "KORVA_RunningOS"); }},
+    };
+    answered = 0;
+    for (const auto& [handler, request] : requests) {
+        std::string before;
+        onQuestion = [&before] { before += recording::takeRendered() + "asked\n"; };
+        recording::clear();
+        request();
+        onQuestion = [] {};
+        EXPECT_EQ(before, entered(handler) + "asked\n");
+    }
 }
 
 TEST_F(ClassIds, LargestIdIsRecordedUncut) {
@@ -90,7 +116,7 @@ TEST_F(ClassIds, LargestIdIsRecordedUncut) {
 namespace VA {
 
 unsigned short ProviderUtilities::getClassId(const CMPIObjectPath*) {
-    if (throwing) throw std::runtime_error("from the framework");
+    onQuestion();
     return answered;
 }
 

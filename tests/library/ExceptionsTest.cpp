@@ -120,6 +120,26 @@ TEST_F(Exceptions, ForeignTypeLeavesTheHandlerWithoutMessageOrExitMarker) {
     }
 }
 
+// The last records of the request are those of its destructors.
+TEST_F(Exceptions, ForeignTypeLeavesTheHandlerOnceTheAdapterIsDestroyed) {
+    struct Foreign {};
+    host->throwFromCall(HostOperation::Advance, 1, Foreign{});
+    for (Request each : requests()) {
+        const bool association = each.request.assocClass.has_value();
+        each.request.path.keys.clear();
+        recording::clear();
+        EXPECT_THROW(invoke(each.request), Foreign) << each.handler;
+        std::string functions;
+        for (const recording::Record& record : recording::take())
+            functions += record.channel == "log" ? record.function + ";" : "";
+        const std::string destroyed =
+            association ? "~CMPIOSElementCapabilities;~OSElementCapabilities;~CMPIOperatingSystem;"
+                          "~CMPIOperatingSystemCapabilities;"
+                        : "~CMPIOperatingSystem;";
+        EXPECT_THAT(functions, testing::EndsWith("operator++;" + destroyed)) << each.handler;
+    }
+}
+
 TEST_F(Exceptions, AdapterIsDestroyedBeforeTheMessageIsWritten) {
     host->throwFromCall(HostOperation::ReadText, 1, std::runtime_error("x"));
     recording::clear();

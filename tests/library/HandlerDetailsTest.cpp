@@ -1,3 +1,4 @@
+#include <fstream>
 #include <stdexcept>
 
 #include "host/broker/ResultCollector.h"
@@ -84,6 +85,45 @@ TEST_F(HandlerDetails, LineOfARecordIsTheOneInItsText) {
                         record.text.find("at line " + line + " in") != std::string::npos)
                 << record.text;
         }
+    }
+}
+
+// The function of the provider's handlers in whose body a line of its source stands.
+std::string functionAround(unsigned long line) {
+    std::ifstream source(KORVA_SOURCE_DIR "/provider/OperatingSystemProvider.cpp");
+    const std::string start = "static CMPIStatus ";
+    std::string function = "(none)";
+    std::string text;
+    for (unsigned long number = 1; number <= line && std::getline(source, text); ++number)
+        if (text.rfind(start, 0) == 0)
+            function = text.substr(start.size(), text.find('(') - start.size());
+        else if (text == "}" && number < line)
+            function = "(none)";
+    return function;
+}
+
+TEST_F(HandlerDetails, MarkersBearALineOfTheHandlersOwn) {
+    const ObjectPathValue system = operatingSystemPath("host1", "Linux");
+    const OperationRequest requests[] = {
+        request(Operation::EnumerateInstanceNames, path("KORVA_OperatingSystem")),
+        request(Operation::EnumerateInstances, path("KORVA_OperatingSystem")),
+        request(Operation::GetInstance, system),
+        request(Operation::AssociatorNames, system, "KORVA_RunningOS"),
+        request(Operation::Associators, system, "KORVA_RunningOS")};
+    for (const OperationRequest& each : requests) {
+        recording::clear();
+        invoke(each);
+        unsigned int markers = 0;
+        for (const recording::Record& record : recording::take()) {
+            const std::size_t found = record.text.find(" [Line: ");
+            if (record.file != "include/Trace.h" || found == std::string::npos) continue;
+            ++markers;
+            const std::size_t begin = record.text.find(": ") + 2;
+            EXPECT_EQ(functionAround(std::stoul(record.text.substr(found + 8))),
+                      record.text.substr(begin, record.text.find('(') - begin))
+                << record.text;
+        }
+        EXPECT_EQ(markers, 4U);
     }
 }
 

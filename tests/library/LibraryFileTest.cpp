@@ -4,6 +4,7 @@
 
 #include <cstdio>
 #include <fstream>
+#include <map>
 #include <memory>
 #include <sstream>
 #include <string>
@@ -17,6 +18,7 @@ using testing::Contains;
 using testing::HasSubstr;
 using testing::IsSubsetOf;
 using testing::Not;
+using testing::StartsWith;
 using testing::UnorderedElementsAre;
 
 const std::string folder = KORVA_BINARY_DIR "/lib/";
@@ -80,6 +82,37 @@ TEST(LibraryFile, ExportsTheTwoFactoriesAndTheNotice) {
     EXPECT_THAT(names, UnorderedElementsAre("OperatingSystemProvider_Create_InstanceMI",
                                             "OperatingSystemProvider_Create_AssociationMI",
                                             "_ZN2VA16OSStatusProvider9COPYRIGHTE"));
+}
+
+// The sections of the provider's objects whose names contain `part`, by name.
+std::map<std::string, std::string> sectionsOf(const std::string& part) {
+    std::map<std::string, std::string> sections;
+    for (const std::string& line : lines(output("objdump -t " + provider))) {
+        const std::string name = line.substr(line.rfind(' ') + 1);
+        const std::size_t begin = line.find(" O ");
+        if (begin == std::string::npos || name.find(part) == std::string::npos) continue;
+        sections[name] = line.substr(begin + 3, line.find('\t') - begin - 3);
+    }
+    return sections;
+}
+
+// What the loader fills in is read-only from then on; nothing is left to be built at a first call.
+TEST(LibraryFile, HoldsItsFunctionTablesAndRecordsAsConstantData) {
+    const auto tables = sectionsOf("MIFT__");
+    EXPECT_EQ(tables.size(), 2U);
+    for (const auto& [name, section] : tables) EXPECT_EQ(section, ".data.rel.ro") << name;
+    const auto records = sectionsOf("2mi");
+    EXPECT_EQ(records.size(), 2U);
+    for (const auto& [name, section] : records) EXPECT_THAT(section, StartsWith(".data")) << name;
+    EXPECT_THAT(sectionsOf("_ZGV"), testing::IsEmpty());
+}
+
+// One for each of the functions that format a record, whatever number of units call them.
+TEST(LibraryFile, HasFourMessageBuffers) {
+    std::vector<std::string> buffers;
+    for (const std::string& line : lines(output("nm " + provider)))
+        if (line.find("messageBuffer") != std::string::npos) buffers.push_back(line);
+    EXPECT_EQ(buffers.size(), 4U);
 }
 
 TEST(LibraryFile, NeedsTheFrameworkAndTheLanguagesLibrariesOnly) {

@@ -46,6 +46,8 @@ const ObjectPathValue computer1 = computerSystemPath("host1");
 const ObjectPathValue pair1 =
     path("KORVA_OSElementCapabilities", {{"ManagedElement", Value::fromReference(system1)},
                                          {"Capabilities", Value::fromReference(capabilities1)}});
+const ObjectPathValue halfPair =
+    path("KORVA_OSElementCapabilities", {{"Capabilities", Value::fromReference(capabilities1)}});
 const ObjectPathValue brokenPair =
     path("KORVA_OSElementCapabilities",
          {{"ManagedElement", Value::fromReference(system1)},
@@ -66,6 +68,7 @@ std::vector<Sequence> sequences() {
     all.push_back({"GetInstanceOfRunningOS", operation(get, path("KORVA_RunningOS"))});
     all.push_back({"GetInstanceOfOSElementCapabilities", operation(get, pair1)});
     all.push_back({"GetInstanceOfContradictingPair", operation(get, brokenPair)});
+    all.push_back({"GetInstanceOfPairWithoutManagedElement", operation(get, halfPair)});
     all.push_back(
         {"GetInstanceOfUnknownName", operation(get, operatingSystemPath("host1", "unknown"))});
     for (const char* association : {"KORVA_InstalledOS", "KORVA_RunningOS"}) {

@@ -1,0 +1,125 @@
+#include <functional>
+#include <stdexcept>
+
+#include "host/broker/Request.h"
+#include "library/LibraryFixture.h"
+
+// A result whose functions throw: what they throw meets the handler's guarded region.
+
+namespace {
+
+using namespace cmpihost;
+
+/// Throws from returnDone, or from the calls that take an element.
+class ThrowingResult {
+  public:
+    explicit ThrowingResult(bool fromDone) : fromDone_(fromDone) {
+        calls_.returnInstance = [](const CMPIResult* self, const CMPIInstance*) {
+            return of(self).answer(false);
+        };
+        calls_.returnObjectPath = [](const CMPIResult* self, const CMPIObjectPath*) {
+            return of(self).answer(false);
+        };
+        calls_.returnDone = [](const CMPIResult* self) { return of(self).answer(true); };
+    }
+
+    const CMPIResult* cmpi() const { return &result_; }
+    unsigned int calls = 0;
+
+  private:
+    static ThrowingResult& of(const CMPIResult* self) {
+        return *static_cast<ThrowingResult*>(self->hdl);
+    }
+
+    CMPIStatus answer(bool done) {
+        ++calls;
+        if (done == fromDone_) throw std::runtime_error("from the result");
+        return {CMPI_RC_OK, nullptr};
+    }
+
+    bool fromDone_;
+    CMPIResultFT calls_ = {};
+    CMPIResult result_ = {this, &calls_};
+};
+
+class ThrowingResults : public LibraryFixture {
+  protected:
+    struct Handler {
+        const char* name;
+        std::function<CMPIStatus(const CMPIContext*, const CMPIResult*, Request&)> call;
+    };
+
+    // The five, each for one element.
+    std::vector<Handler> handlers() {
+        CMPIInstanceMI* const instances = library.instanceMI();
+        CMPIAssociationMI* const associations = library.associationMI();
+        const ObjectPathValue system = operatingSystemPath("host1", "Linux");
+        const char* const association = "KORVA_RunningOS";
+        return {
+            {"OperatingSystem_EnumInstanceNames",
+             [=](auto* context, auto* result, Request& request) {
+                 return instances->ft->enumerateInstanceNames(
+                     instances, context, result, request.makePath(path(system.className)));
+             }},
+            {"OperatingSystem_EnumInstances",
+             [=](auto* context, auto* result, Request& request) {
+                 return instances->ft->enumerateInstances(
+                     instances, context, result, request.makePath(path(system.className)), nullptr);
+             }},
+            {"OperatingSystem_GetInstance",
+             [=](auto* context, auto* result, Request& request) {
+                 return instances->ft->getInstance(instances, context, result,
+                                                   request.makePath(system), nullptr);
+             }},
+            {"OperatingSystem_AssociatorNames",
+             [=](auto* context, auto* result, Request& request) {
+                 return associations->ft->associatorNames(associations, context, result,
+                                                          request.makePath(system), association,
+                                                          nullptr, nullptr, nullptr);
+             }},
+            {"OperatingSystem_Associators",
+             [=](auto* context, auto* result, Request& request) {
+                 return associations->ft->associators(associations, context, result,
+                                                      request.makePath(system), association,
+                                                      nullptr, nullptr, nullptr, nullptr);
+             }},
+        };
+    }
+
+    // The records end with a destructor's, one message and the exit marker.
+    static void expectReported(const std::string& handler) {
+        const std::string category = " Zumbrel.OperatingSystemProvider ";
+        const std::string expected =
+            "both " + handler + " OperatingSystemProvider.cpp:#" + category +
+            "3000 null 0 0 | MESSAGE [File: OperatingSystemProvider.cpp, Line: #]: from the "
+            "result\nboth markProviderExit include/Trace.h:348" +
+            category + "4000 null 0 0 | EXITING: " + handler +
+            "() in OperatingSystemProvider.cpp [Line: #]\n"
+            "both markProviderExit include/Trace.h:349" +
+            category +
+            "4000 null 0 0 | "
+            "==============================================================================\n";
+        const std::string records = recording::takeRendered();
+        ASSERT_THAT(records, testing::EndsWith(expected));
+        const std::string before = records.substr(0, records.size() - expected.size());
+        EXPECT_EQ(before.rfind("both ~"), before.rfind("both ")) << before;
+    }
+};
+
+TEST_F(ThrowingResults, AreReportedOnceTheAdapterIsDestroyed) {
+    for (const Handler& handler : handlers()) {
+        for (const bool fromDone : {false, true}) {
+            Request request(broker);
+            ThrowingResult result(fromDone);
+            recording::clear();
+            const CMPIStatus status =
+                handler.call(request.makeContext({}, "root/cimv2"), result.cmpi(), request);
+            EXPECT_EQ(status.rc, CMPI_RC_OK) << handler.name;
+            EXPECT_EQ(status.msg, nullptr) << handler.name;
+            EXPECT_EQ(result.calls, fromDone ? 2U : 1U) << handler.name;
+            expectReported(handler.name);
+        }
+    }
+}
+
+}  // namespace
