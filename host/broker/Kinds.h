@@ -6,7 +6,6 @@
 
 #include <cmpi/cmpift.h>
 
-#include <array>
 #include <cstring>
 #include <memory>
 #include <optional>
@@ -31,16 +30,10 @@ class Characters {
     Characters& operator=(const Characters&) = delete;
     ~Characters() = default;
 
-    /// Short text lies in the object: the pointer does not outlive a move.
-    char* get() const noexcept {
-        if (!present_) return nullptr;
-        return long_ ? long_.get() : short_.data();
-    }
+    char* get() const noexcept { return text_.get(); }
 
   private:
-    bool present_ = false;
-    mutable std::array<char, 32> short_{};
-    std::unique_ptr<char[]> long_;
+    std::unique_ptr<char[]> text_;
 };
 
 struct InstanceBody {

@@ -23,11 +23,9 @@ Characters::Characters(const char* text) {
     if (text != nullptr) *this = Characters(std::string_view(text));
 }
 
-Characters::Characters(std::string_view text) : present_(true) {
-    if (text.size() >= short_.size()) long_.reset(new char[text.size() + 1]);
-    char* const place = get();
-    std::copy(text.begin(), text.end(), place);
-    place[text.size()] = '\0';
+Characters::Characters(std::string_view text) : text_(new char[text.size() + 1]) {
+    std::copy(text.begin(), text.end(), text_.get());
+    text_[text.size()] = '\0';
 }
 
 }  // namespace cmpihost

@@ -1,5 +1,13 @@
 #include "BrokerFixture.h"
 
+#include "host/broker/Object.h"
+
+#include <functional>
+
+#ifdef __SANITIZE_ADDRESS__
+#include <sanitizer/asan_interface.h>
+#endif
+
 namespace cmpihost {
 namespace {
 
@@ -192,6 +200,22 @@ TEST_F(StringObject, CopiesItsTextAndLendsItThroughItsHandle) {
     EXPECT_EQ(status.rc, CMPI_RC_OK);
     EXPECT_STREQ(CMGetCharPtr(string), "some text");
     EXPECT_EQ(CMGetCharsPtr(string, nullptr), CMGetCharPtr(string));
+}
+
+// The object stays as a shell when it has ended; its characters do not.
+TEST_F(StringObject, KeepsItsCharactersApartFromTheObjectHoweverFewTheyAre) {
+    for (const std::size_t length : {0U, 1U, 31U, 1000U}) {
+        CMPIString* const string = CMNewString(mb, std::string(length, 'x').c_str(), &status);
+        const char* const characters = CMGetCharsPtr(string, nullptr);
+        const auto* const object = reinterpret_cast<const char*>(string);
+        EXPECT_TRUE(std::less<>()(characters, object) ||
+                    std::greater_equal<>()(characters, object + sizeof(Object<CMPIString>)))
+            << length;
+#ifdef __SANITIZE_ADDRESS__
+        mb->mft->freeString(mb, string);
+        EXPECT_TRUE(__asan_address_is_poisoned(characters)) << length;
+#endif
+    }
 }
 
 TEST_F(StringObject, IsNotMadeOfNull) {
