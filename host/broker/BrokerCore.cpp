@@ -133,8 +133,11 @@ std::vector<LogRecord> BrokerCore::logRecords(bool take) {
     return result;
 }
 
-void BrokerCore::inject(FaultPlan& plan, const CallName& call) {
-    if (const auto rc = plan.onCall(call.table, call.slot)) throw Failure{*rc};
+CMPIrc BrokerCore::inject(FaultPlan& plan, const CallName& call) {
+    const std::optional<PlannedFailure> failure = plan.onCall(call.table, call.slot);
+    if (!failure) return CMPI_RC_OK;
+    if (!failure->withValue) throw Failure{failure->rc};
+    return failure->rc;
 }
 
 void BrokerCore::route(std::string className, UpcallService& service) {

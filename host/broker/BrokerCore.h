@@ -78,9 +78,11 @@ class BrokerCore {
     void report(std::string violation) noexcept;
     void log(LogRecord record);
 
-    /// Counts a call and throws Failure if it is to fail.
-    void countCall(const CallName& call) {
-        if (FaultPlan* const plan = plan_.load(std::memory_order_acquire)) inject(*plan, call);
+    /// Counts a call and throws Failure if it is to fail. Else the status that it is to report
+    /// beside its value, CMPI_RC_OK for its own.
+    CMPIrc countCall(const CallName& call) {
+        FaultPlan* const plan = plan_.load(std::memory_order_acquire);
+        return plan == nullptr ? CMPI_RC_OK : inject(*plan, call);
     }
     void setFaultPlan(FaultPlan* plan) noexcept { plan_.store(plan, std::memory_order_release); }
 
@@ -95,7 +97,7 @@ class BrokerCore {
   private:
     void adopt(std::unique_ptr<Shell> shell);
     void adoptClone(std::unique_ptr<Shell> shell);
-    static void inject(FaultPlan& plan, const CallName& call);
+    static CMPIrc inject(FaultPlan& plan, const CallName& call);
     UpcallService* serviceFor(const OperationRequest& request) const;
     UpcallService* service(const std::string& className) const;
 

@@ -63,6 +63,20 @@ R guarded(CMPIStatus* status, Body&& body) noexcept {
     return failed<R>(rc);
 }
 
+/// Does the work of a call; a status other than CMPI_RC_OK takes the place of its own.
+template <class R, class Work>
+R reporting(CMPIrc rc, CMPIStatus* status, Work&& work) {
+    if constexpr (std::is_void_v<R>) {
+        work();
+    } else {
+        R result = work();
+        if (rc == CMPI_RC_OK) return result;
+        setStatus(status, rc);
+        if constexpr (std::is_same_v<R, CMPIStatus>) result = statusOf(rc);
+        return result;
+    }
+}
+
 /// The table function of `Slot` in live objects: Impl(target, arguments...) or Impl(target, name of
 /// the call, arguments...), with the status among the arguments.
 template <auto Slot, auto Impl>
@@ -71,16 +85,18 @@ template <class Table, class R, class Self, class... Args, R (*Table::*Slot)(Sel
           auto Impl>
 struct Entry<Slot, Impl> {
     static R call(Self* self, Args... args) noexcept {
-        return guarded<R>(statusArgument(args...), [&]() -> R {
+        CMPIStatus* const status = statusArgument(args...);
+        return guarded<R>(status, [&]() -> R {
             const CallName name = callName();
             auto& object = target(self, name);
-            coreOf(object).countCall(name);
-            if constexpr (std::is_invocable_v<decltype(Impl), decltype(object), const CallName&,
-                                              Args...>) {
-                return Impl(object, name, args...);
-            } else {
-                return Impl(object, args...);
-            }
+            return reporting<R>(coreOf(object).countCall(name), status, [&]() -> R {
+                if constexpr (std::is_invocable_v<decltype(Impl), decltype(object), const CallName&,
+                                                  Args...>) {
+                    return Impl(object, name, args...);
+                } else {
+                    return Impl(object, args...);
+                }
+            });
         });
     }
 

@@ -171,9 +171,11 @@ CMPIString* expanded(const CMPIBroker* broker, const CallName& call, const char*
                      CMPIStatus* status, CMPICount count, std::va_list& arguments) noexcept {
     return guarded<CMPIString*>(status, [&]() -> CMPIString* {
         BrokerCore& core = target(broker, call);
-        core.countCall(call);
-        const char* const message = required(core, text, call, "default message");
-        return makeString(core, expandMessage(message, messageArguments(count, arguments, call)));
+        return reporting<CMPIString*>(core.countCall(call), status, [&] {
+            const char* const message = required(core, text, call, "default message");
+            return makeString(core,
+                              expandMessage(message, messageArguments(count, arguments, call)));
+        });
     });
 }
 

@@ -61,20 +61,20 @@ std::vector<std::string> FaultPlan::firedCalls() const {
     return fired_;
 }
 
-std::optional<CMPIrc> FaultPlan::onCall(const char* table, const char* slot) {
+std::optional<PlannedFailure> FaultPlan::onCall(const char* table, const char* slot) {
     const std::lock_guard<std::mutex> lock(mutex_);
     ++total_;
     const std::string call = std::string(table) + '.' + slot;
     ++calls_[call];
 
-    std::optional<CMPIrc> answer;
+    std::optional<PlannedFailure> answer;
     for (Planned& planned : faults_) {
         const Fault& fault = planned.fault;
         if (!names(fault.entry, table, slot)) continue;
         ++planned.seen;
         const bool reached = planned.seen >= fault.nth;
         const bool past = fault.times != 0 && planned.seen - fault.nth >= fault.times;
-        if (reached && !past && !answer) answer = fault.rc;
+        if (reached && !past && !answer) answer = PlannedFailure{fault.rc, fault.withValue};
     }
     if (answer) fired_.push_back(call);
     return answer;

@@ -25,6 +25,15 @@ struct Fault {
     /// it returns null and reports success. A call that returns only a status then answers
     /// CMPI_RC_ERR_FAILED.
     CMPIrc rc = CMPI_RC_ERR_FAILED;
+    /// On: the call does its work and hands its value out with `rc` beside it, as some object
+    /// managers do.
+    bool withValue = false;
+};
+
+/// How one call fails.
+struct PlannedFailure {
+    CMPIrc rc;
+    bool withValue;
 };
 
 /// Counts the calls of all tables by name and decides which of them fail. Attach it with
@@ -50,7 +59,7 @@ class FaultPlan {
     std::vector<std::string> firedCalls() const;
 
     /// For the broker: counts one call and says how it fails, if it does.
-    std::optional<CMPIrc> onCall(const char* table, const char* slot);
+    std::optional<PlannedFailure> onCall(const char* table, const char* slot);
 
   private:
     struct Planned {

@@ -2,6 +2,7 @@
 
 #include "BrokerFixture.h"
 
+#include "host/broker/ComputerSystemService.h"
 #include "host/broker/ResultCollector.h"
 
 #include <atomic>
@@ -71,6 +72,40 @@ TEST_F(Faults, ACallMayReturnNullAndReportSuccess) {
     EXPECT_EQ(newInstance(), nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_OK);
     EXPECT_EQ(CMAddKey(newPath(), "Name", "x", CMPI_chars).rc, CMPI_RC_ERR_FAILED);
+}
+
+TEST_F(Faults, ACallMayHandItsValueOutBesideAFailure) {
+    const auto failing = [](const char* entry) {
+        return Fault{entry, 1, 1, CMPI_RC_ERR_ACCESS_DENIED, true};
+    };
+    ComputerSystemService computers(std::string("host1"));
+    broker.route(ComputerSystemService::className, computers);
+    for (const char* entry : {"enumerateInstances", "getNext", "getObjectPath", "addKey", "getKey",
+                              "getMessage", "freeInstance"})
+        plan.add(failing(entry));
+
+    const CMPIContext* const context = request.makeContext({}, "");
+    const CMPIEnumeration* const computersFound =
+        CBEnumInstances(mb, context, newPath(ComputerSystemService::className), nullptr, &status);
+    ASSERT_NE(computersFound, nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_ACCESS_DENIED);
+    const CMPIData next = CMGetNext(computersFound, &status);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_ACCESS_DENIED);
+    ASSERT_EQ(next.type, CMPI_instance);
+    EXPECT_FALSE(CMHasNext(computersFound, &status));
+    EXPECT_EQ(status.rc, CMPI_RC_OK);
+    CMPIObjectPath* const path = CMGetObjectPath(next.value.inst, &status);
+    ASSERT_NE(path, nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_ACCESS_DENIED);
+    EXPECT_EQ(CMAddKey(path, "Extra", "x", CMPI_chars).rc, CMPI_RC_ERR_ACCESS_DENIED);
+    EXPECT_EQ(textOf(CMGetKey(path, "Extra", &status).value.string), "x");
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_ACCESS_DENIED);
+    EXPECT_EQ(textOf(mb->eft->getMessage(mb, "", "text", &status, 0)), "text");
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_ACCESS_DENIED);
+    mb->mft->freeInstance(mb, next.value.inst);
+    EXPECT_EQ(plan.fired(), 7u);
+    EXPECT_EQ(CMGetPropertyCount(next.value.inst, &status), 0u);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_HANDLE);
 }
 
 TEST_F(Faults, EveryShapeOfResultCanFail) {
