@@ -1,9 +1,5 @@
 #include "ComputerSystem.h"
 
-#include <charconv>
-#include <cstdlib>
-#include <cstring>
-
 #include "Instrumentation.h"
 #include "ProviderUtilities.h"
 
@@ -14,33 +10,14 @@ using Utilities = VA::ProviderUtilities;
 
 constexpr const char* className = "KORVA_ComputerSystem";
 
-constexpr unsigned short enabled = 2;
-constexpr unsigned short statusOk = 2;
-constexpr unsigned short healthOk = 5;
-constexpr unsigned short notDedicated = 0;
-
-unsigned int demonstrationCount() {
-    constexpr unsigned int most = 1000;
-    const char* const text = std::getenv("KORVA_COMPUTER_SYSTEMS");
-    unsigned int count = 1;
-    if (text == nullptr) return count;
-    const char* const end = text + std::strlen(text);
-    const auto [rest, error] = std::from_chars(text, end, count);
-    return error == std::errc() && rest == end && count <= most ? count : 1;
-}
-
 }  // namespace
 
-std::vector<std::string> names() {
+std::optional<std::string> name() {
     VA::Instrumentation instrumentation;
     instrumentation.selectNode(VA::NodeLexicon::OperatingSystemNode);
     std::string host;
-    if (!instrumentation.getComputerName(host)) return {};
-    std::vector<std::string> result;
-    const unsigned int count = demonstrationCount();
-    for (unsigned int number = 1; number <= count; ++number)
-        result.push_back(number == 1 ? host : host + "-" + std::to_string(number));
-    return result;
+    if (!instrumentation.getComputerName(host)) return std::nullopt;
+    return host;
 }
 
 CMPIObjectPath* makePath(const CMPIBroker* broker, const std::string& nameSpace,
@@ -51,19 +28,15 @@ CMPIObjectPath* makePath(const CMPIBroker* broker, const std::string& nameSpace,
     return path;
 }
 
+// Nobody measures the state of the computer system, its health or its purpose: those properties are
+// left out.
 CMPIInstance* makeInstance(const CMPIBroker* broker, const std::string& nameSpace,
                            const std::string& name) {
     CMPIInstance* instance = Utilities::createInstance(broker, makePath(broker, nameSpace, name));
     std::string elementName = name;
     std::string nameFormat = "Other";
-    std::vector<unsigned short> dedicated = {notDedicated};
-    std::vector<unsigned short> operationalStatus = {statusOk};
     Utilities::setProperty(instance, "ElementName", elementName);
     Utilities::setProperty(instance, "NameFormat", nameFormat);
-    Utilities::setProperty(broker, instance, "Dedicated", dedicated);
-    Utilities::setProperty(instance, "EnabledState", enabled);
-    Utilities::setProperty(broker, instance, "OperationalStatus", operationalStatus);
-    Utilities::setProperty(instance, "HealthState", healthOk);
     return instance;
 }
 

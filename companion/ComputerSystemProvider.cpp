@@ -3,6 +3,7 @@
 #include <cmpi/cmpimacs.h>
 #include <strings.h>
 
+#include <optional>
 #include <string>
 
 #include "ComputerSystem.h"
@@ -20,18 +21,33 @@ CMPIStatus status(CMPIrc rc) {
 
 // Serves one request. No exception may reach the object manager.
 template <class Serve>
-CMPIStatus guarded(const CMPIObjectPath* path, Serve serve) {
+CMPIStatus guarded(Serve serve) {
     try {
-        return serve(Utilities::getNamespace(path));
+        return serve(computersystem::name());
     } catch (...) {
         return status(CMPI_RC_ERR_FAILED);
     }
 }
 
-// Object managers do not survive a null.
+// Returns the one object and the end of the results. Object managers do not survive a null.
 template <class Object, class Return>
 CMPIStatus handOver(const CMPIResult* result, Object* object, Return give) {
-    return object == nullptr ? status(CMPI_RC_ERR_FAILED) : give(result, object);
+    if (object == nullptr) return status(CMPI_RC_ERR_FAILED);
+    const CMPIStatus given = give(result, object);
+    return given.rc == CMPI_RC_OK ? CMReturnDone(result) : given;
+}
+
+CMPIStatus handOverPath(const CMPIResult* result, const CMPIObjectPath* asked,
+                        const std::string& name) {
+    return handOver(result, computersystem::makePath(broker, Utilities::getNamespace(asked), name),
+                    result->ft->returnObjectPath);
+}
+
+CMPIStatus handOverInstance(const CMPIResult* result, const CMPIObjectPath* asked,
+                            const std::string& name) {
+    return handOver(result,
+                    computersystem::makeInstance(broker, Utilities::getNamespace(asked), name),
+                    result->ft->returnInstance);
 }
 
 // Whether the path names this computer system: by its keys, which compare as object managers give
@@ -53,43 +69,25 @@ static CMPIStatus ComputerSystem_Cleanup(CMPIInstanceMI*, const CMPIContext*, CM
 static CMPIStatus ComputerSystem_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext*,
                                                    const CMPIResult* result,
                                                    const CMPIObjectPath* path) {
-    return guarded(path, [&](const std::string& nameSpace) {
-        for (const std::string& name : computersystem::names()) {
-            const CMPIStatus given =
-                handOver(result, computersystem::makePath(broker, nameSpace, name),
-                         result->ft->returnObjectPath);
-            if (given.rc != CMPI_RC_OK) return given;
-        }
-        return CMReturnDone(result);
+    return guarded([&](const std::optional<std::string>& name) {
+        return name ? handOverPath(result, path, *name) : CMReturnDone(result);
     });
 }
 
 static CMPIStatus ComputerSystem_EnumInstances(CMPIInstanceMI*, const CMPIContext*,
                                                const CMPIResult* result, const CMPIObjectPath* path,
                                                const char**) {
-    return guarded(path, [&](const std::string& nameSpace) {
-        for (const std::string& name : computersystem::names()) {
-            const CMPIStatus given =
-                handOver(result, computersystem::makeInstance(broker, nameSpace, name),
-                         result->ft->returnInstance);
-            if (given.rc != CMPI_RC_OK) return given;
-        }
-        return CMReturnDone(result);
+    return guarded([&](const std::optional<std::string>& name) {
+        return name ? handOverInstance(result, path, *name) : CMReturnDone(result);
     });
 }
 
 static CMPIStatus ComputerSystem_GetInstance(CMPIInstanceMI*, const CMPIContext*,
                                              const CMPIResult* result, const CMPIObjectPath* path,
                                              const char**) {
-    return guarded(path, [&](const std::string& nameSpace) {
-        for (const std::string& name : computersystem::names()) {
-            if (!names(path, name)) continue;
-            const CMPIStatus given =
-                handOver(result, computersystem::makeInstance(broker, nameSpace, name),
-                         result->ft->returnInstance);
-            return given.rc == CMPI_RC_OK ? CMReturnDone(result) : given;
-        }
-        return status(CMPI_RC_ERR_NOT_FOUND);
+    return guarded([&](const std::optional<std::string>& name) {
+        return name && names(path, *name) ? handOverInstance(result, path, *name)
+                                          : status(CMPI_RC_ERR_NOT_FOUND);
     });
 }
 

@@ -214,15 +214,17 @@ void Parser::addHostOptions() {
                     "Folder of the MOF files; without it the one beside this program")
         ->type_name("DIR")
         ->check(notEmpty());
-    app_.add_option("--companion", result_.companion,
-                    "Library that serves the computer system; without it the one beside this\n"
-                    "program, else this program itself")
-        ->type_name("FILE")
-        ->check(notEmpty());
-    app_.add_option(
-            "--computer-systems", result_.computerSystems,
-            "How many computer systems there are to be, 0 to 1000, to see what then happens")
+    CLI::Option* companion =
+        app_.add_option("--companion", result_.companion,
+                        "Library that serves the computer system; without it the one beside this\n"
+                        "program, else this program itself")
+            ->type_name("FILE")
+            ->check(notEmpty());
+    app_.add_option("--computer-systems", result_.computerSystems,
+                    "Answer for so many computer systems without that library, 0 to 1000, to see\n"
+                    "what then happens")
         ->check(CLI::Range(0, 1000))
+        ->excludes(companion)
         ->type_name("N");
 }
 

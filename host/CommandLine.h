@@ -23,7 +23,7 @@ struct CommandLine {
     bool log = false;
     /// The library that serves the computer system; empty: the one beside this program, if any.
     std::string companion;
-    /// How many computer systems the host is to have; none: what their provider finds.
+    /// How many computer systems the host is to serve itself, in place of that library.
     std::optional<unsigned> computerSystems;
     /// Draw the host instead of running an operation.
     bool tree = false;

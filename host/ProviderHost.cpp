@@ -2,8 +2,6 @@
 
 #include <sys/utsname.h>
 
-#include <cstdlib>
-
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/LibraryService.h"
 
@@ -29,18 +27,18 @@ std::string nodeName() {
     return ::uname(&names) == 0 ? names.nodename : "localhost";
 }
 
-std::vector<std::string> computerNames(std::optional<unsigned> count) {
+std::vector<std::string> computerNames(unsigned count) {
     std::vector<std::string> names;
-    for (unsigned number = 1; number <= count.value_or(1); ++number) {
+    for (unsigned number = 1; number <= count; ++number) {
         names.push_back(number == 1 ? nodeName() : nodeName() + "-" + std::to_string(number));
     }
     return names;
 }
 
-/// The host answers for the computer system itself.
+/// The host answers for the computer systems itself.
 class OwnComputerSystems final : public ComputerSystems {
   public:
-    explicit OwnComputerSystems(std::optional<unsigned> count) : service_(computerNames(count)) {}
+    explicit OwnComputerSystems(unsigned count) : service_(computerNames(count)) {}
 
     UpcallService& service() override { return service_; }
     OperationResult run(Broker& broker, const OperationRequest& request) override {
@@ -58,11 +56,11 @@ LoadOptions companionOptions() {
     return options;
 }
 
-/// A library answers for it. It takes the number of computer systems from the environment.
+/// A library answers for it.
 class CompanionComputerSystems final : public ComputerSystems {
   public:
-    CompanionComputerSystems(const ComputerSystemSource& source, Broker& broker)
-        : library_(prepared(source), broker, companionOptions()), service_(library_) {}
+    CompanionComputerSystems(const std::string& file, Broker& broker)
+        : library_(file, broker, companionOptions()), service_(library_) {}
 
     UpcallService& service() override { return service_; }
     OperationResult run(Broker& broker, const OperationRequest& request) override {
@@ -71,13 +69,6 @@ class CompanionComputerSystems final : public ComputerSystems {
     void unload() override { library_.unload(); }
 
   private:
-    static const std::string& prepared(const ComputerSystemSource& source) {
-        if (source.count) {
-            ::setenv("KORVA_COMPUTER_SYSTEMS", std::to_string(*source.count).c_str(), 1);
-        }
-        return source.library;
-    }
-
     ProviderLibrary library_;
     LibraryService service_;
 };
@@ -88,7 +79,7 @@ std::unique_ptr<ComputerSystems> routed(const ComputerSystemSource& source, Brok
     if (source.library.empty()) {
         systems = std::make_unique<OwnComputerSystems>(source.count);
     } else {
-        systems = std::make_unique<CompanionComputerSystems>(source, broker);
+        systems = std::make_unique<CompanionComputerSystems>(source.library, broker);
     }
     broker.route(ComputerSystemService::className, systems->service());
     return systems;

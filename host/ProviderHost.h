@@ -1,7 +1,6 @@
 #pragma once
 
 #include <memory>
-#include <optional>
 #include <string>
 #include <vector>
 
@@ -14,9 +13,9 @@ namespace cmpihost {
 /// Who serves the computer system, beside the provider.
 struct ComputerSystemSource {
     /// The library of its provider; empty: the host serves it itself.
-    std::string library;
-    /// How many there are; none: what the provider finds, or one.
-    std::optional<unsigned> count;
+    std::string library{};
+    /// How many the host serves itself.
+    unsigned count = 1;
 };
 
 /// The provider of the computer system, as the host reaches it.

@@ -178,10 +178,13 @@ class Run {
     }
 
     ComputerSystemSource computerSystems() const {
+        if (commandLine_.computerSystems) {
+            return {{}, *commandLine_.computerSystems};
+        }
         const std::string companion = commandLine_.companion.empty()
                                           ? findCompanion(programFolder_).string()
                                           : loadable(commandLine_.companion);
-        return {companion, commandLine_.computerSystems};
+        return {companion};
     }
 
     const CommandLine& commandLine_;

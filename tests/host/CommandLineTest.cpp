@@ -135,6 +135,8 @@ TEST(CommandLine, RefusesWhatItDoesNotKnow) {
         {{"--format", "mof", "--format", "json", "ei", "X"},
          "--format: At Most 1 required but received 2\n"},
         {{"--colour", "ei", "X"}, "The following argument was not expected: --colour\n"},
+        {{"--companion", "c.so", "--computer-systems", "2", "tree"},
+         "--companion excludes --computer-systems\n"},
     };
     for (const Refusal& row : rows) {
         const ParsedCommandLine result = parsed(row.words);

@@ -7,6 +7,7 @@
 namespace {
 
 using testing::HasSubstr;
+using testing::Not;
 using testing::StartsWith;
 
 ProgramRun cmpihost(const std::vector<std::string>& arguments) {
@@ -43,7 +44,14 @@ TEST(ProgramWithCompanion, AnswersUpCallsWithTheComputerSystem) {
     EXPECT_EQ(run.err, "");
     EXPECT_THAT(run.out, HasSubstr("  Name               " + nodeName() + "\n"));
     EXPECT_THAT(run.out, HasSubstr("  NameFormat         Other\n"));
-    EXPECT_THAT(run.out, HasSubstr("  Dedicated          0 (Not Dedicated)\n"));
+}
+
+TEST(ProgramWithCompanion, AnswersForANumberOfComputerSystemsItself) {
+    const ProgramRun run = cmpihost({"--computer-systems", "1", "ai", "KORVA_OperatingSystem",
+                                     "--assoc-class", "KORVA_InstalledOS"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_THAT(run.out, HasSubstr("Name               " + nodeName() + "\n"));
+    EXPECT_THAT(run.out, Not(HasSubstr("NameFormat")));
 }
 
 TEST(ProgramWithCompanion, WithoutAComputerSystemAssociationsAreEmpty) {
