@@ -1,12 +1,53 @@
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
+#include <cxxabi.h>
 
+#include <exception>
+#include <string>
+
+#include "AssociationRequests.h"
+#include "InstanceRequests.h"
+#include "Names.h"
 #include "Provider.h"
+#include "Refusal.h"
+#include "Request.h"
 
 namespace VA::OSStatusFacade {
 
 // Not guarded: factories run before requests.
 static Provider provider;
+
+// Serves a request; whatever goes wrong becomes a status. No exception but the end of a thread that
+// the object manager cancels passes here.
+template <class Serve>
+static CMPIStatus guarded(Serve serve, Handler handler = Handler::here()) {
+    try {
+        serve();
+        return {CMPI_RC_OK, nullptr};
+    } catch (const Refusal& refusal) {
+        return refuse(provider.broker, refusal.rc(), refusal.what(), handler);
+    } catch (const abi::__forced_unwind&) {
+        throw;
+    } catch (const std::exception& unexpected) {
+        return refuse(provider.broker, CMPI_RC_ERR_FAILED, unexpected.what(), handler);
+    } catch (...) {
+        return refuse(provider.broker, CMPI_RC_ERR_FAILED, "unknown exception", handler);
+    }
+}
+
+// Passes an operation on that is none of a reader's; the provider refuses it.
+template <class Pass>
+static CMPIStatus passedOn(const char* operation, const CMPIObjectPath* path, Pass pass,
+                           Handler handler = Handler::here()) {
+    return guarded(
+        [&] {
+            const CMPIStatus status = pass(provider.instances);
+            if (status.rc != CMPI_RC_OK)
+                throw Refusal(status.rc, std::string(operation) + " is not supported for " +
+                                             printable(classNameOf(path)));
+        },
+        handler);
+}
 
 static CMPIStatus OSStatusFacade_Cleanup(CMPIInstanceMI*, const CMPIContext* context,
                                          CMPIBoolean terminating) {
@@ -16,30 +57,28 @@ static CMPIStatus OSStatusFacade_Cleanup(CMPIInstanceMI*, const CMPIContext* con
 static CMPIStatus OSStatusFacade_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext* context,
                                                    const CMPIResult* result,
                                                    const CMPIObjectPath* path) {
-    return provider.instances->ft->enumerateInstanceNames(provider.instances, context, result,
-                                                          path);
+    return guarded([&] { enumerateInstanceNames({provider, context, result, path}); });
 }
 
 static CMPIStatus OSStatusFacade_EnumInstances(CMPIInstanceMI*, const CMPIContext* context,
                                                const CMPIResult* result, const CMPIObjectPath* path,
                                                const char** properties) {
-    return provider.instances->ft->enumerateInstances(provider.instances, context, result, path,
-                                                      properties);
+    return guarded([&] { enumerateInstances({provider, context, result, path}, properties); });
 }
 
 static CMPIStatus OSStatusFacade_GetInstance(CMPIInstanceMI*, const CMPIContext* context,
                                              const CMPIResult* result, const CMPIObjectPath* path,
                                              const char** properties) {
-    return provider.instances->ft->getInstance(provider.instances, context, result, path,
-                                               properties);
+    return guarded([&] { getInstance({provider, context, result, path}, properties); });
 }
 
 static CMPIStatus OSStatusFacade_CreateInstance(CMPIInstanceMI*, const CMPIContext* context,
                                                 const CMPIResult* result,
                                                 const CMPIObjectPath* path,
                                                 const CMPIInstance* instance) {
-    return provider.instances->ft->createInstance(provider.instances, context, result, path,
-                                                  instance);
+    return passedOn("CreateInstance", path, [&](CMPIInstanceMI* mi) {
+        return mi->ft->createInstance(mi, context, result, path, instance);
+    });
 }
 
 static CMPIStatus OSStatusFacade_ModifyInstance(CMPIInstanceMI*, const CMPIContext* context,
@@ -47,21 +86,25 @@ static CMPIStatus OSStatusFacade_ModifyInstance(CMPIInstanceMI*, const CMPIConte
                                                 const CMPIObjectPath* path,
                                                 const CMPIInstance* instance,
                                                 const char** properties) {
-    return provider.instances->ft->modifyInstance(provider.instances, context, result, path,
-                                                  instance, properties);
+    return passedOn("ModifyInstance", path, [&](CMPIInstanceMI* mi) {
+        return mi->ft->modifyInstance(mi, context, result, path, instance, properties);
+    });
 }
 
 static CMPIStatus OSStatusFacade_DeleteInstance(CMPIInstanceMI*, const CMPIContext* context,
                                                 const CMPIResult* result,
                                                 const CMPIObjectPath* path) {
-    return provider.instances->ft->deleteInstance(provider.instances, context, result, path);
+    return passedOn("DeleteInstance", path, [&](CMPIInstanceMI* mi) {
+        return mi->ft->deleteInstance(mi, context, result, path);
+    });
 }
 
 static CMPIStatus OSStatusFacade_ExecQuery(CMPIInstanceMI*, const CMPIContext* context,
                                            const CMPIResult* result, const CMPIObjectPath* path,
                                            const char* query, const char* language) {
-    return provider.instances->ft->execQuery(provider.instances, context, result, path, query,
-                                             language);
+    return passedOn("ExecQuery", path, [&](CMPIInstanceMI* mi) {
+        return mi->ft->execQuery(mi, context, result, path, query, language);
+    });
 }
 
 static CMPIStatus OSStatusFacade_AssociationCleanup(CMPIAssociationMI*, const CMPIContext* context,
@@ -74,9 +117,10 @@ static CMPIStatus OSStatusFacade_Associators(CMPIAssociationMI*, const CMPIConte
                                              const char* assocClass, const char* resultClass,
                                              const char* role, const char* resultRole,
                                              const char** properties) {
-    return provider.associations->ft->associators(provider.associations, context, result, path,
-                                                  assocClass, resultClass, role, resultRole,
-                                                  properties);
+    return guarded([&] {
+        associators({provider, context, result, path}, {assocClass, resultClass, role, resultRole},
+                    properties);
+    });
 }
 
 static CMPIStatus OSStatusFacade_AssociatorNames(CMPIAssociationMI*, const CMPIContext* context,
@@ -84,24 +128,30 @@ static CMPIStatus OSStatusFacade_AssociatorNames(CMPIAssociationMI*, const CMPIC
                                                  const CMPIObjectPath* path, const char* assocClass,
                                                  const char* resultClass, const char* role,
                                                  const char* resultRole) {
-    return provider.associations->ft->associatorNames(provider.associations, context, result, path,
-                                                      assocClass, resultClass, role, resultRole);
+    return guarded([&] {
+        associatorNames({provider, context, result, path},
+                        {assocClass, resultClass, role, resultRole});
+    });
 }
 
+// Of references, the result is the association.
 static CMPIStatus OSStatusFacade_References(CMPIAssociationMI*, const CMPIContext* context,
                                             const CMPIResult* result, const CMPIObjectPath* path,
                                             const char* resultClass, const char* role,
                                             const char** properties) {
-    return provider.associations->ft->references(provider.associations, context, result, path,
-                                                 resultClass, role, properties);
+    return guarded([&] {
+        references({provider, context, result, path}, {resultClass, nullptr, role, nullptr},
+                   properties);
+    });
 }
 
 static CMPIStatus OSStatusFacade_ReferenceNames(CMPIAssociationMI*, const CMPIContext* context,
                                                 const CMPIResult* result,
                                                 const CMPIObjectPath* path, const char* resultClass,
                                                 const char* role) {
-    return provider.associations->ft->referenceNames(provider.associations, context, result, path,
-                                                     resultClass, role);
+    return guarded([&] {
+        referenceNames({provider, context, result, path}, {resultClass, nullptr, role, nullptr});
+    });
 }
 
 static const CMPIInstanceMIFT instanceTable = {

@@ -1,0 +1,189 @@
+#include "AssociationRequests.h"
+
+#include <cmpi/cmpift.h>
+
+#include <map>
+#include <set>
+
+#include "KeyCheck.h"
+#include "Names.h"
+#include "Refusal.h"
+
+namespace VA::OSStatusFacade {
+
+namespace {
+
+/// A way from the source over one association.
+struct Hop {
+    const Class& association;
+    const End& near;
+    const End& far;
+};
+
+bool isGiven(const char* filter) {
+    return filter != nullptr && *filter != '\0';
+}
+
+bool admits(const char* filter, const Class& itsClass) {
+    return !isGiven(filter) || itsClass.isA(filter);
+}
+
+bool admits(const char* filter, const char* role) {
+    return !isGiven(filter) || equalNames(filter, role);
+}
+
+// The ways that a source of that class has. None from a path that can name no instance.
+std::vector<Hop> hopsFrom(const Request& request, const Filter& filter) {
+    std::vector<Hop> hops;
+    const Class* const source = request.knownClass();
+    if (source == nullptr || !keyProblem(*source, request.path()).empty()) return hops;
+    for (const Association& association : associations())
+        for (const int near : {0, 1}) {
+            const Hop hop = {association.itself, association.ends[near],
+                             association.ends[1 - near]};
+            if (&hop.near.elements == source && admits(filter.associationClass, hop.association) &&
+                admits(filter.farClass, hop.far.elements) && admits(filter.role, hop.near.role) &&
+                admits(filter.farRole, hop.far.role))
+                hops.push_back(hop);
+        }
+    return hops;
+}
+
+/// A pair that has the source at its near end.
+struct Pair {
+    const Class& farClass;
+    const CMPIObjectPath* path;
+    const CMPIObjectPath* far;
+    const CMPIInstance* instance;  ///< null where only names were asked for
+};
+
+// Adds the pair that a path names, if the source is at its near end. One without a far end, or
+// whose far end has no keys, ties the source to nothing.
+void addPair(std::vector<Pair>& pairs, const Request& request, const Hop& hop,
+             const Identity& source, const CMPIObjectPath* path, const CMPIInstance* instance) {
+    if (path == nullptr) return;
+    const CMPIObjectPath* const near = referenceOf(path, hop.near.role);
+    const CMPIObjectPath* const far = referenceOf(path, hop.far.role);
+    if (near == nullptr || far == nullptr || keysOf(far).empty()) return;
+    if (request.identityOf(near) == source)
+        pairs.push_back({hop.far.elements, path, far, instance});
+}
+
+enum class Ask { names, instances };
+
+std::vector<Pair> pairsOf(const Request& request, const Filter& filter, Ask ask) {
+    std::vector<Pair> pairs;
+    const std::vector<Hop> hops = hopsFrom(request, filter);
+    if (hops.empty()) return pairs;
+    const Identity source = request.identityOf(request.path());
+    for (const Hop& hop : hops) {
+        const CMPIObjectPath* const classPath = request.newPath(hop.association.name);
+        const Answer answer = ask == Ask::names ? request.enumerateInstanceNames(classPath)
+                                                : request.enumerateInstances(classPath);
+        requireWhole(answer, hop.association.name);
+        for (const CMPIObjectPath* path : answer.paths())
+            addPair(pairs, request, hop, source, path, nullptr);
+        for (const CMPIInstance* instance : answer.instances())
+            addPair(pairs, request, hop, source, instance->ft->getObjectPath(instance, nullptr),
+                    instance);
+    }
+    return pairs;
+}
+
+/// Tells what comes again.
+class Seen {
+  public:
+    bool isNew(const Identity& identity) { return identities_.insert(identity).second; }
+
+  private:
+    std::set<Identity> identities_;
+};
+
+using Paths = std::vector<const CMPIObjectPath*>;
+using Instances = std::vector<const CMPIInstance*>;
+
+// The computer systems, which another provider of the object manager serves.
+Instances computerSystems(const Request& request, const Class& itsClass) {
+    const Refusal failure(CMPI_RC_ERR_FAILED,
+                          std::string("the object manager does not enumerate ") + itsClass.name);
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    CMPIEnumeration* const enumeration = request.broker()->bft->enumerateInstances(
+        request.broker(), request.context(), request.newPath(itsClass.name), nullptr, &status);
+    if (enumeration == nullptr || status.rc != CMPI_RC_OK) throw failure;
+    Instances instances;
+    while (enumeration->ft->hasNext(enumeration, nullptr) != 0) {
+        const CMPIData data = enumeration->ft->getNext(enumeration, &status);
+        if (status.rc != CMPI_RC_OK || data.value.inst == nullptr) throw failure;
+        instances.push_back(data.value.inst);
+    }
+    return instances;
+}
+
+Instances instancesOf(const Request& request, const Class& itsClass) {
+    if (!itsClass.isOfProvider) return computerSystems(request, itsClass);
+    const Answer answer = request.enumerateInstances(request.newPath(itsClass.name));
+    requireWhole(answer, itsClass.name);
+    return answer.instances();
+}
+
+/// Instances by what they stand for, fetched class by class when one is first looked for.
+class InstanceIndex {
+  public:
+    explicit InstanceIndex(const Request& request) : request_(request) {}
+
+    /// Null when there is no such instance any more.
+    const CMPIInstance* find(const Identity& identity, const Class& itsClass) {
+        if (fetched_.insert(&itsClass).second)
+            for (const CMPIInstance* instance : instancesOf(request_, itsClass))
+                instances_.emplace(
+                    request_.identityOf(instance->ft->getObjectPath(instance, nullptr)), instance);
+        const auto found = instances_.find(identity);
+        return found == instances_.end() ? nullptr : found->second;
+    }
+
+  private:
+    const Request& request_;
+    std::set<const Class*> fetched_;
+    std::map<Identity, const CMPIInstance*> instances_;
+};
+
+}  // namespace
+
+void associatorNames(const Request& request, const Filter& filter) {
+    Paths paths;
+    Seen seen;
+    for (const Pair& pair : pairsOf(request, filter, Ask::names))
+        if (seen.isNew(request.identityOf(pair.far))) paths.push_back(pair.far);
+    request.deliver(paths);
+}
+
+void associators(const Request& request, const Filter& filter, const char** properties) {
+    Instances instances;
+    InstanceIndex index(request);
+    Seen seen;
+    for (const Pair& pair : pairsOf(request, filter, Ask::names)) {
+        const Identity far = request.identityOf(pair.far);
+        if (!seen.isNew(far)) continue;
+        if (const CMPIInstance* instance = index.find(far, pair.farClass))
+            instances.push_back(instance);
+    }
+    request.deliver(instances, properties);
+}
+
+void referenceNames(const Request& request, const Filter& filter) {
+    Paths paths;
+    Seen seen;
+    for (const Pair& pair : pairsOf(request, filter, Ask::names))
+        if (seen.isNew(request.identityOf(pair.path))) paths.push_back(pair.path);
+    request.deliver(paths);
+}
+
+void references(const Request& request, const Filter& filter, const char** properties) {
+    Instances instances;
+    Seen seen;
+    for (const Pair& pair : pairsOf(request, filter, Ask::instances))
+        if (seen.isNew(request.identityOf(pair.path))) instances.push_back(pair.instance);
+    request.deliver(instances, properties);
+}
+
+}  // namespace VA::OSStatusFacade

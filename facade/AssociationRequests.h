@@ -1,0 +1,32 @@
+#ifndef OSSTATUS_FACADE_ASSOCIATION_REQUESTS_H
+#define OSSTATUS_FACADE_ASSOCIATION_REQUESTS_H
+
+#include "Request.h"
+
+namespace VA::OSStatusFacade {
+
+/// What a client wants of the associations of a source; null filters nothing.
+struct Filter {
+    const char* associationClass = nullptr;
+    const char* farClass = nullptr;
+    const char* role = nullptr;
+    const char* farRole = nullptr;
+};
+
+// Each answers one request, or throws Refusal. The pairs that the provider enumerates are the
+// truth: what is returned is the other end, or the pair itself, of each pair that has the source at
+// one end. A source that is at no end, or filters that admit nothing, give an empty answer.
+//
+// A question to the object manager for computer systems is what costs most. Each association with
+// the computer system that is looked at costs one, asked by the provider; associators that lead to
+// computer systems cost one more, for the instances. Names of them, and all other instances, need
+// none.
+
+void associatorNames(const Request& request, const Filter& filter);
+void associators(const Request& request, const Filter& filter, const char** properties);
+void referenceNames(const Request& request, const Filter& filter);
+void references(const Request& request, const Filter& filter, const char** properties);
+
+}  // namespace VA::OSStatusFacade
+
+#endif

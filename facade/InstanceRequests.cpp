@@ -1,0 +1,93 @@
+#include "InstanceRequests.h"
+
+#include <cmpi/cmpift.h>
+
+#include <algorithm>
+
+#include "KeyCheck.h"
+#include "Names.h"
+#include "Refusal.h"
+
+namespace VA::OSStatusFacade {
+
+namespace {
+
+using Identities = std::vector<Identity>;
+
+// The path of a request for an instance as the provider is asked for it: its text keys in their
+// order, which has a meaning to the provider, and the references left out, which keeps the provider
+// from judging them. What comes back is compared anyway.
+CMPIObjectPath* pathToAskFor(const Request& request, const Class& itsClass) {
+    CMPIObjectPath* const path = request.newPath(itsClass.name);
+    const std::vector<KeyBinding> bindings = keysOf(request.path());
+    for (const Key& key : itsClass.keys)
+        for (const KeyBinding& binding : bindings)
+            if (!key.isReference && equalNames(binding.name, key.name))
+                // Of characters, brokers take the pointer itself, not the address of one.
+                path->ft->addKey(path, key.name,
+                                 reinterpret_cast<const CMPIValue*>(binding.text()->c_str()),
+                                 CMPI_chars);
+    return path;
+}
+
+bool hasKey(const Identity& candidate, const std::pair<std::string, std::string>& key) {
+    return std::find(candidate.keys.begin(), candidate.keys.end(), key) != candidate.keys.end();
+}
+
+// Names the keys that no instance has, or all of them when instances have each, but none has all.
+Refusal notFound(const Class& itsClass, const Identity& wanted, const Identities& candidates) {
+    std::string all;
+    std::string unknown;
+    for (const Key& key : itsClass.keys) {
+        const std::string name = std::string(all.empty() ? "" : ", ") + key.name;
+        all += name;
+        const auto wantedKey =
+            std::find_if(wanted.keys.begin(), wanted.keys.end(),
+                         [&key](const auto& each) { return equalNames(each.first, key.name); });
+        if (std::none_of(candidates.begin(), candidates.end(),
+                         [&](const Identity& candidate) { return hasKey(candidate, *wantedKey); }))
+            unknown += std::string(unknown.empty() ? "" : ", ") + key.name;
+    }
+    return Refusal(CMPI_RC_ERR_NOT_FOUND, std::string("no instance of ") + itsClass.name +
+                                              " has this " + (unknown.empty() ? all : unknown));
+}
+
+}  // namespace
+
+void enumerateInstanceNames(const Request& request) {
+    const Answer answer = request.enumerateInstanceNames(request.path());
+    requireWhole(answer, request.className());
+    request.deliver(answer.paths());
+}
+
+void enumerateInstances(const Request& request, const char** properties) {
+    const Answer answer = request.enumerateInstances(request.path());
+    requireWhole(answer, request.className());
+    request.deliver(answer.instances(), properties);
+}
+
+void getInstance(const Request& request, const char** properties) {
+    const Class* const known = request.knownClass();
+    if (known == nullptr || !known->isOfProvider)
+        return requireServed(request.getInstance(request.path()), request.className());
+    const std::string problem = keyProblem(*known, request.path());
+    if (!problem.empty()) throw Refusal(CMPI_RC_ERR_INVALID_PARAMETER, problem);
+
+    const Identity wanted = request.identityOf(request.path());
+    const Answer answer = request.getInstance(pathToAskFor(request, *known));
+    requireServed(answer, request.className());
+    Identities candidates;
+    for (const CMPIInstance* instance : answer.instances()) {
+        candidates.push_back(request.identityOf(instance->ft->getObjectPath(instance, nullptr)));
+        if (candidates.back() == wanted) return request.deliver({instance}, properties);
+    }
+    // The provider tells of elements only those that have some of the keys.
+    if (!known->isAssociation()) {
+        const Answer names = request.enumerateInstanceNames(request.newPath(known->name));
+        for (const CMPIObjectPath* path : names.paths())
+            candidates.push_back(request.identityOf(path));
+    }
+    throw notFound(*known, wanted, candidates);
+}
+
+}  // namespace VA::OSStatusFacade

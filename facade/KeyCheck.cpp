@@ -1,0 +1,52 @@
+#include "KeyCheck.h"
+
+#include <algorithm>
+#include <vector>
+
+#include "Names.h"
+#include "ObjectPath.h"
+
+namespace VA::OSStatusFacade {
+
+namespace {
+
+std::string referenceProblem(const CMPIObjectPath* reference) {
+    if (const Class* const known = findClass(classNameOf(reference)))
+        return keyProblem(*known, reference);
+    // Of a class that is not known here only the depth is limited: elements have no references.
+    for (const KeyBinding& key : keysOf(reference))
+        if (key.reference() != nullptr) return "key " + printable(key.name) + " is a reference";
+    return {};
+}
+
+std::string valueProblem(const Key& key, const KeyBinding& binding) {
+    if (!key.isReference)
+        return binding.text() ? "" : std::string("key ") + key.name + " is no text";
+    if (binding.reference() == nullptr) return std::string("key ") + key.name + " is no reference";
+    const std::string problem = referenceProblem(binding.reference());
+    return problem.empty() ? "" : std::string(key.name) + ": " + problem;
+}
+
+}  // namespace
+
+std::string keyProblem(const Class& itsClass, const CMPIObjectPath* path) {
+    const std::string of = std::string(" of ") + itsClass.name;
+    const std::vector<KeyBinding> bindings = keysOf(path);
+    for (const KeyBinding& binding : bindings)
+        if (itsClass.key(binding.name) == nullptr)
+            return std::string(itsClass.name) + " has no key " + printable(binding.name);
+    for (const Key& key : itsClass.keys) {
+        const auto named = [&key](const KeyBinding& each) {
+            return equalNames(each.name, key.name);
+        };
+        const auto found = std::find_if(bindings.begin(), bindings.end(), named);
+        if (found == bindings.end()) return std::string("key ") + key.name + of + " is missing";
+        if (std::count_if(bindings.begin(), bindings.end(), named) > 1)
+            return std::string("key ") + key.name + of + " is there twice";
+        const std::string problem = valueProblem(key, *found);
+        if (!problem.empty()) return problem;
+    }
+    return {};
+}
+
+}  // namespace VA::OSStatusFacade

@@ -1,0 +1,40 @@
+#ifndef OSSTATUS_FACADE_REFUSAL_H
+#define OSSTATUS_FACADE_REFUSAL_H
+
+#include <cmpi/cmpidt.h>
+
+#include <stdexcept>
+#include <string>
+
+namespace VA::OSStatusFacade {
+
+/// Ends a request with a status other than OK. The text is for the client and for the log: what a
+/// client wrote stands in it as printable() gives it.
+class Refusal : public std::runtime_error {
+  public:
+    Refusal(CMPIrc rc, const std::string& text) : std::runtime_error(text), rc_(rc) {}
+
+    CMPIrc rc() const noexcept { return rc_; }
+
+  private:
+    CMPIrc rc_;
+};
+
+/// Where a request arrived: the function that the object manager called, and a line of it.
+struct Handler {
+    const char* function;
+    unsigned int line;
+
+    static constexpr Handler here(const char* function = __builtin_FUNCTION(),
+                                  unsigned int line = __builtin_LINE()) {
+        return {function, line};
+    }
+};
+
+/// Writes the one record of a refused request, and makes its status. Without memory for record or
+/// message, those are left out.
+CMPIStatus refuse(const CMPIBroker* broker, CMPIrc rc, const char* text, Handler handler) noexcept;
+
+}  // namespace VA::OSStatusFacade
+
+#endif

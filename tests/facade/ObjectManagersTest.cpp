@@ -1,0 +1,163 @@
+#include <algorithm>
+
+#include "facade/FacadeFixture.h"
+
+// The facade beside another association provider, asked in the two ways that object managers have.
+
+namespace {
+
+using namespace facade;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+const CMPIBroker* linkBroker;
+
+// The other provider: TEST_Link ties each TEST_Thing to the computer system. It looks at nothing
+// but association class and source class, as simple providers do.
+CMPIStatus linkAnswer(const CMPIResult* result, const CMPIObjectPath* source,
+                      const char* associationClass, const char* answer, const char* name) {
+    const bool asked = associationClass == nullptr || equalNames(associationClass, "TEST_Link") ||
+                       equalNames(associationClass, "CIM_Dependency");
+    const CMPIString* const sourceClass = source->ft->getClassName(source, nullptr);
+    if (asked && equalNames(sourceClass->ft->getCharPtr(sourceClass, nullptr), "TEST_Thing")) {
+        CMPIObjectPath* const path =
+            linkBroker->eft->newObjectPath(linkBroker, "root/cimv2", answer, nullptr);
+        path->ft->addKey(path, "Name", reinterpret_cast<const CMPIValue*>(name), CMPI_chars);
+        result->ft->returnObjectPath(result, path);
+    }
+    result->ft->returnDone(result);
+    return {CMPI_RC_OK, nullptr};
+}
+
+CMPIStatus linkAssociatorNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
+                               const CMPIObjectPath* source, const char* associationClass,
+                               const char*, const char*, const char*) {
+    return linkAnswer(result, source, associationClass, "KORVA_ComputerSystem", "host1");
+}
+
+CMPIStatus linkReferenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
+                              const CMPIObjectPath* source, const char* associationClass,
+                              const char*) {
+    return linkAnswer(result, source, associationClass, "TEST_Link", "link");
+}
+
+class ObjectManagers : public FacadeFixture {
+  protected:
+    struct Registered {
+        ManagementInterfaces interfaces;
+        std::vector<std::pair<const char*, Texts>> associations;  // and the classes they refer to
+    };
+
+    ObjectManagers() : FacadeFixture() {
+        linkBroker = plainBroker.cmpi();
+        plainBroker.route(ComputerSystemService::className, computers);
+    }
+
+    void registerProviders(const ProviderLibrary& ours) {
+        const Texts systems = {"KORVA_OperatingSystem", "KORVA_ComputerSystem"};
+        providers = {{ours.interfaces(),
+                      {{"KORVA_InstalledOS", systems},
+                       {"KORVA_RunningOS", systems},
+                       {"KORVA_OSElementCapabilities",
+                        {"KORVA_OperatingSystem", "KORVA_OperatingSystemCapabilities"}}}},
+                     {{nullptr, &link}, {{"TEST_Link", {"TEST_Thing", "KORVA_ComputerSystem"}}}}};
+    }
+
+    // As sfcb: every association provider gets the client's filters, and the first failure is the
+    // answer.
+    Texts everyProvider(const OperationRequest& request) {
+        Texts result;
+        for (const Registered& provider : providers) {
+            const Outcome outcome = cmpihost::invoke(provider.interfaces, plainBroker, request);
+            if (outcome.rc != CMPI_RC_OK) return {"failed: " + std::to_string(outcome.rc)};
+            for (const std::string& text : texts(outcome.paths)) result.push_back(text);
+        }
+        return result;
+    }
+
+    // As OpenPegasus: one call for each association class that refers to the source's class, with
+    // its name; a provider that supports no such operation is forgiven.
+    Texts everyClass(OperationRequest request) {
+        Texts result;
+        for (const Registered& provider : providers)
+            for (const auto& [association, classes] : provider.associations) {
+                if (std::find(classes.begin(), classes.end(), request.path.className) ==
+                    classes.end())
+                    continue;
+                (ofReferences(request.operation) ? request.resultClass : request.assocClass) =
+                    association;
+                const Outcome outcome = cmpihost::invoke(provider.interfaces, plainBroker, request);
+                if (outcome.rc == CMPI_RC_ERR_NOT_SUPPORTED) continue;
+                if (outcome.rc != CMPI_RC_OK) return {"failed: " + std::to_string(outcome.rc)};
+                for (const std::string& text : texts(outcome.paths)) result.push_back(text);
+            }
+        return result;
+    }
+
+    static constexpr CMPIAssociationMIFT linkTable = {
+        CMPIVersion200,      CMPIVersion200, "associationTestLink", nullptr, nullptr,
+        linkAssociatorNames, nullptr,        linkReferenceNames};
+    CMPIAssociationMI link = {nullptr, const_cast<CMPIAssociationMIFT*>(&linkTable)};
+    Broker plainBroker;  // knows no schema, so that there may be other classes
+    ProviderLibrary bareProvider{providerFile, plainBroker};
+    ProviderLibrary inFront{file, plainBroker, loadOptions()};
+    std::vector<Registered> providers;
+};
+
+const ObjectPathValue thing = path("TEST_Thing", {{"Name", "thing"}});
+const std::string farOfThing = R"(root/cimv2:KORVA_ComputerSystem.Name="host1")";
+const std::string linkOfThing = R"(root/cimv2:TEST_Link.Name="link")";
+
+TEST_F(ObjectManagers, AnotherProvidersObjectsAreAnsweredAsIfTheFacadeWereNotThere) {
+    registerProviders(inFront);
+    for (const char* associationClass : {"", "TEST_Link", "CIM_Dependency"}) {
+        EXPECT_THAT(
+            everyProvider(associationRequest(Operation::AssociatorNames, thing, associationClass)),
+            ElementsAre(farOfThing));
+        EXPECT_THAT(
+            everyProvider(associationRequest(Operation::ReferenceNames, thing, associationClass)),
+            ElementsAre(linkOfThing));
+    }
+    EXPECT_THAT(everyClass(associationRequest(Operation::AssociatorNames, thing)),
+                ElementsAre(farOfThing));
+    EXPECT_THAT(everyClass(associationRequest(Operation::ReferenceNames, thing)),
+                ElementsAre(linkOfThing));
+    EXPECT_THAT(everyProvider(associationRequest(Operation::AssociatorNames, thing, "CIM_Other")),
+                IsEmpty());
+}
+
+TEST_F(ObjectManagers, WithoutComputerSystemsAnotherProvidersObjectsAreAnsweredToo) {
+    registerProviders(inFront);
+    computers.failEnumerations(CMPI_RC_ERR_NOT_FOUND);
+    EXPECT_THAT(everyProvider(associationRequest(Operation::AssociatorNames, thing)),
+                ElementsAre(farOfThing));
+    EXPECT_THAT(everyProvider(associationRequest(Operation::AssociatorNames,
+                                                 operatingSystemPath("host1", "Linux"))),
+                ElementsAre(capabilities));
+}
+
+TEST_F(ObjectManagers, FacadesObjectsAreAnsweredBesideAnotherProvider) {
+    registerProviders(inFront);
+    const ObjectPathValue source = operatingSystemPath("host1", "Linux");
+    const OperationRequest names = associationRequest(Operation::AssociatorNames, source);
+    EXPECT_THAT(everyProvider(names), ElementsAre(computerSystem, capabilities));
+    // Class by class, what two associations lead to comes twice, as from any provider.
+    EXPECT_THAT(everyClass(names), ElementsAre(computerSystem, computerSystem, capabilities));
+    EXPECT_EQ(everyProvider(associationRequest(Operation::ReferenceNames, source)).size(), 3U);
+    EXPECT_EQ(everyClass(associationRequest(Operation::ReferenceNames, source)).size(), 3U);
+    OperationRequest filtered = names;
+    filtered.role = "ManagedElement";
+    EXPECT_THAT(everyProvider(filtered), ElementsAre(capabilities));
+    EXPECT_THAT(everyClass(filtered), ElementsAre(capabilities));
+}
+
+// Why there is a facade.
+TEST_F(ObjectManagers, ProviderAloneBreaksTheRequestsOfAnother) {
+    registerProviders(bareProvider);
+    EXPECT_THAT(everyProvider(associationRequest(Operation::AssociatorNames, thing)),
+                ElementsAre("failed: 5"));
+    EXPECT_THAT(everyProvider(associationRequest(Operation::ReferenceNames, thing)),
+                ElementsAre("failed: 7"));
+}
+
+}  // namespace
