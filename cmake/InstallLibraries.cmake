@@ -6,7 +6,7 @@ install(TARGETS ${KORVA_FRAMEWORK} EXPORT KorvaFrameworkTargets
             COMPONENT provider NAMELINK_COMPONENT development)
 
 # Object managers open the name without a version.
-install(TARGETS korzbosstatusprofileprovider
+install(TARGETS korvaosstatusfacade korzbosstatusprofileprovider
         LIBRARY DESTINATION "${KORVA_CMPI_LIBDIR}" COMPONENT provider)
 install(TARGETS korvacomputersystemprovider
         LIBRARY DESTINATION "${KORVA_CMPI_LIBDIR}" COMPONENT companion)
@@ -18,7 +18,7 @@ else()
     file(RELATIVE_PATH korva_framework_folder "/${KORVA_CMPI_LIBDIR}" "/${CMAKE_INSTALL_LIBDIR}")
     string(REGEX REPLACE "/$" "" korva_framework_folder "$ORIGIN/${korva_framework_folder}")
 endif()
-set_target_properties(korzbosstatusprofileprovider korvacomputersystemprovider PROPERTIES
-    INSTALL_RPATH "$ORIGIN;${korva_framework_folder}")
+set_target_properties(korvaosstatusfacade korzbosstatusprofileprovider korvacomputersystemprovider
+    PROPERTIES INSTALL_RPATH "$ORIGIN;${korva_framework_folder}")
 
 install(TARGETS cmpihost RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}" COMPONENT tools)

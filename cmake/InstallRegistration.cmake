@@ -3,12 +3,6 @@
 set(korva_registration_dir "${KORVA_SHARE_DIR}/registration")
 set(korva_registration_source "${PROJECT_SOURCE_DIR}/schema/registration")
 
-# A 64-bit server must be told that a module needs its 32-bit agent.
-set(KORVA_PEGASUS_BITNESS "")
-if(KORVA_WORD_SIZE STREQUAL "32")
-    set(KORVA_PEGASUS_BITNESS "\n   Bitness = 2;")
-endif()
-
 # korva_registration(<component> <stem>): the registrations for both object managers.
 function(korva_registration component stem)
     set(folder "${CMAKE_BINARY_DIR}/${korva_registration_dir}")
@@ -28,9 +22,19 @@ install(FILES ${korva_classes} DESTINATION "${KORVA_SHARE_DIR}/schema" COMPONENT
 set(korva_register "${PROJECT_SOURCE_DIR}/packaging/korva-osstatus-register")
 configure_file("${korva_register}" "${CMAKE_BINARY_DIR}/sbin/korva-osstatus-register" COPYONLY)
 install(PROGRAMS "${korva_register}" DESTINATION "${CMAKE_INSTALL_SBINDIR}" COMPONENT provider)
-foreach(manager sfcb pegasus)
-    set(source "${PROJECT_SOURCE_DIR}/packaging/register/${manager}.sh")
-    configure_file("${source}" "${CMAKE_BINARY_DIR}/${KORVA_SHARE_DIR}/register/${manager}.sh"
-                   COPYONLY)
-    install(FILES "${source}" DESTINATION "${KORVA_SHARE_DIR}/register" COMPONENT provider)
+set(korva_register_source "${PROJECT_SOURCE_DIR}/packaging/register")
+set(korva_register_dir "${CMAKE_BINARY_DIR}/${KORVA_SHARE_DIR}/register")
+foreach(part parts client sfcb sfcb-broker pegasus-server pegasus)
+    configure_file("${korva_register_source}/${part}.sh" "${korva_register_dir}/${part}.sh" COPYONLY)
+    install(FILES "${korva_register_source}/${part}.sh"
+            DESTINATION "${KORVA_SHARE_DIR}/register" COMPONENT provider)
 endforeach()
+
+# The libraries are elsewhere when they are installed.
+set(KORVA_REGISTERED_FOLDER lib)
+configure_file("${korva_register_source}/libraries.sh.in" "${korva_register_dir}/libraries.sh" @ONLY)
+set(KORVA_REGISTERED_FOLDER "${KORVA_CMPI_LIBDIR}")
+configure_file("${korva_register_source}/libraries.sh.in"
+               "${CMAKE_BINARY_DIR}/generated/register/libraries.sh" @ONLY)
+install(FILES "${CMAKE_BINARY_DIR}/generated/register/libraries.sh"
+        DESTINATION "${KORVA_SHARE_DIR}/register" COMPONENT provider)

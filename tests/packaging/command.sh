@@ -158,7 +158,7 @@ LeavesNoTemporaryFiles() {
 RefusesWrongUsage() {
     with_sfcb
     for arguments in "" "register unregister" "--frob register" "frob" "--namespace" "--namespace= register" \
-        "--cimom other register" "--restart=yes register"; do
+        "--cimom other register" "--restart=yes register" "--agent-bits 64 register"; do
         # Split into arguments on purpose.
         # shellcheck disable=SC2086
         register $arguments
@@ -171,11 +171,11 @@ RefusesWrongUsage() {
 RefusesOptionsOfOpenPegasusForSfcb() {
     with_sfcb
     with_pegasus
-    for option in --repository --interop; do
-        register --cimom sfcb "$option" srv/x register
+    for option in --repository=srv/x --interop=srv/x --agent-bits=32; do
+        register --cimom sfcb "${option%=*}" "${option#*=}" register
         expect_code 2
-        expect_text "$option is for OpenPegasus only, not for --cimom sfcb" "$output"
-        register "$option=srv/x" --cimom=sfcb register
+        expect_text "${option%=*} is for OpenPegasus only, not for --cimom sfcb" "$output"
+        register "$option" --cimom=sfcb register
         expect_code 2
     done
     expect_calls ""
@@ -194,7 +194,7 @@ RefusesNamesThatAreNoNamespaces() {
 HelpNamesEveryOption() {
     register --help
     expect_code 0
-    for option in --cimom --namespace --interop --repository --with-companion --without-companion \
+    for option in --cimom --bare --namespace --interop --repository --agent-bits --with-companion --without-companion \
         --only-companion --restart --dry-run --package --prefix --schema-dir --help; do
         expect_text "  $option " "$output"
     done
@@ -217,6 +217,7 @@ ShellScriptsAreWithoutFault() {
     need_tool shellcheck shellcheck
     packaging=$KORVA_SOURCE_DIR/packaging
     expect_success shellcheck -x "$packaging/korva-osstatus-register" "$packaging/build-packages" \
-        "$packaging/try-packages" "$packaging"/try/*.sh "$packaging"/register/*.sh "$packaging"/debian/*/p*
+        "$packaging/try-packages" "$packaging"/try/*.sh "$packaging"/register/*.sh \
+        "$packaging"/register/*.sh.in "$packaging"/debian/*/p*
     expect_success shellcheck stand-in ./*.sh
 }

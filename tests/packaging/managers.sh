@@ -1,22 +1,25 @@
 # Sourced by the cases about object managers: an installed tree, and stand-ins for the managers.
 # shellcheck shell=sh
-: "${work:?}" "${KORVA_BINARY_DIR:?}"
+: "${work:?}" "${KORVA_BINARY_DIR:?}" "${KORVA_WORD_SIZE:?}"
 
 tree=$work/tree
 managers=$work/managers
 tools=$work/tools
 temporary=$work/tmp
+path=$managers/bin:$tools
 
 # What the command under test may use besides object managers.
-tool_names="basename cat cp dirname grep id mkdir mktemp mv readlink rm sed touch"
+tool_names="basename cat cp dirname grep id ldd ln mkdir mktemp mv od readlink rm rmdir sed touch tr"
 
 prepare() {
-    mkdir -p "$managers/bin" "$managers/fail" "$tools" "$temporary" "$tree/share/korva-osstatus"
+    mkdir -p "$managers/bin" "$managers/fail" "$managers/half" "$managers/says" "$tools" "$temporary" \
+        "$tree/share/korva-osstatus"
     for name in $tool_names; do ln -s "$(command -v "$name")" "$tools/$name"; done
     cp -R "$KORVA_BINARY_DIR/sbin" "$tree/"
     for folder in schema registration register; do
         cp -R "$KORVA_BINARY_DIR/share/korva-osstatus/$folder" "$tree/share/korva-osstatus/"
     done
+    ln -s "$KORVA_BINARY_DIR/lib" "$tree/lib"
     : >"$managers/calls"
 }
 
@@ -27,25 +30,37 @@ stand_in() {
 }
 
 with_sfcb() { stand_in sfcbstage sfcbunstage sfcbrepos; }
-with_pegasus() { stand_in cimmof cimmofl cimprovider; }
 with_running() {
     stand_in "$1"
     echo "$2" >"$managers/active"
+}
+
+# elf WORD-SIZE: the beginning of a program or library.
+elf() { if [ "$1" = 32 ]; then printf '\177ELF\001'; else printf '\177ELF\002'; fi; }
+
+server_has_bits() {
+    elf "$1" >"$managers/bin/cimserver"
+    chmod +x "$managers/bin/cimserver"
+}
+
+with_pegasus() {
+    stand_in cimmof cimmofl cimprovider cimconfig
+    echo "/usr/nowhere:$tree/lib" >"$managers/providerDir"
+    server_has_bits "$KORVA_WORD_SIZE"
 }
 server_is_stopped() { echo "cimserver does not answer" >"$managers/fail/cimprovider"; }
 
 # Runs the command under test with the stand-ins; see capture.
 register() {
-    capture env -i PATH="$managers/bin:$tools" TMPDIR="$temporary" \
-        "$tree/sbin/korva-osstatus-register" "$@"
+    capture env -i PATH="$path" TMPDIR="$temporary" "$tree/sbin/korva-osstatus-register" "$@"
 }
 
 expect_code() { [ "$code" -eq "$1" ] || fail "status $code, not $1: $output"; }
 
 # The recorded calls, with names for the folders, and nothing of what only asks.
 calls() {
-    sed "/^cimprovider -l/d; /is-active/d; /status$/d; s|$tree/share/korva-osstatus|SHARE|g; s|$work/tmp/[^/]*|TMP|g" \
-        "$managers/calls"
+    sed "/^cimprovider -l/d; /^cimconfig/d; /^cimcli/d; /^wbemcli/d; /^p[gi]/d; /is-active/d; /status$/d
+        s|$tree/share/korva-osstatus|SHARE|g; s|$work/tmp/[^/]*|TMP|g" "$managers/calls"
 }
 
 forget_calls() { : >"$managers/calls"; }

@@ -39,19 +39,12 @@ cimmofl -uc -n root/PG_InterOp $companion_registration"
     expect_text "OpenPegasus: cimserver does not answer; its repository is written to directly" "$output"
 }
 
-WritesToTheRepositoryThatIsNamed() {
-    server_is_stopped
-    register --only-companion --repository /srv/repository register
-    expect_calls "cimmofl -R /srv/repository -uc -n root/cimv2 $companion_mof
-cimmofl -R /srv/repository -uc -n root/PG_InterOp $companion_registration"
-}
-
 TakesARegistrationThatAStoppedServerHasForDone() {
     server_is_stopped
     echo "CIM_ERR_ALREADY_EXISTS: PG_ProviderModule" >"$managers/fail/cimmofl"
     register --only-companion register
     expect_code 0
-    expect_text "OpenPegasus: root/PG_InterOp holds this already" "$output"
+    expect_text "OpenPegasus: root/PG_InterOp holds this already, and it stays as it is" "$output"
 }
 
 SaysThatAStoppedServerNeedsItsOtherCompiler() {
@@ -64,12 +57,83 @@ SaysThatAStoppedServerNeedsItsOtherCompiler() {
     expect_text "start cimserver and register again" "$output"
 }
 
-NamesTheNamespaceThatMayBeMissing() {
-    echo "CIM_ERR_INVALID_NAMESPACE" >"$managers/fail/cimmof"
-    register --only-companion --interop interop register
+# Each line: what the compiler says of its failure, and the way out.
+failures_of_the_compiler() {
+    cat <<'EOF'
+CIM_ERR_INVALID_NAMESPACE: root/cimv2|the namespace root/cimv2 does not exist: make it, or name another one
+CIM_ERR_INVALID_SUPERCLASS: CIM_OperatingSystem|mend what it names and register again
+disk full|mend what it names and register again
+EOF
+}
+
+SpeaksOfTheNamespaceOnlyWhereItIsTheCause() {
+    failures_of_the_compiler >"$work/failures"
+    while IFS='|' read -r said way_out; do
+        echo "$said" >"$managers/fail/cimmof"
+        register --only-companion register
+        expect_code 1
+        expect_text "cimmof failed with exit status 3" "$output"
+        expect_text "    $said" "$output"
+        expect_text "korva-osstatus-register: $way_out" "$output"
+        [ "$said" = "${said#*NAMESPACE}" ] || continue
+        expect_no_text "namespace" "$output"
+    done <"$work/failures"
+}
+
+ShowsWhatTheCompilerSaysThoughItDidItsWork() {
+    echo "Warning: KORVA_ComputerSystem: not updated, same Version" >"$managers/says/cimmof"
+    register --only-companion register
+    expect_code 0
+    expect_text "    cimmof: Warning: KORVA_ComputerSystem: not updated, same Version" "$output"
+}
+
+TakesOutWhatAFailedRegistrationLeft() {
+    echo "CIM_ERR_FAILED: broken" >"$managers/half/cimmof"
+    register --without-companion register
     expect_code 1
-    expect_text "cimmof failed with exit status 3" "$output"
-    expect_text "does the namespace root/cimv2 exist?" "$output"
+    expect_calls "cimmof -uc -n root/cimv2 $provider_mofs
+cimmof -uc -n root/PG_InterOp $provider_registration
+cimprovider -d -m KorvaOSStatusModule
+cimprovider -r -m KorvaOSStatusModule"
+    expect_equal "the modules that are left" "" "$(cat "$managers/modules")"
+    expect_text "what it left of the provider is taken out; the provider is not registered" "$output"
+}
+
+TellsHowToTakeOutWhatAFailedRegistrationLeftInAStoppedServer() {
+    server_is_stopped
+    echo "CIM_ERR_FAILED: broken" >"$managers/half/cimmofl"
+    register --without-companion register
+    expect_code 1
+    expect_text "once cimserver runs, see whether KorvaOSStatusModule is left: cimprovider -l" "$output"
+    expect_text "and take it out: cimprovider -r -m KorvaOSStatusModule" "$output"
+}
+
+# Each line: what is registered after a registration, and its options.
+registrations_in_turn() {
+    cat <<EOF
+OSStatusFacade
+OperatingSystemProvider --bare
+OperatingSystemProvider --package
+OSStatusFacade
+OSStatusFacade --package
+EOF
+}
+
+RegistersTheFacadeOrTheBareProvider() {
+    registrations_in_turn >"$work/turns"
+    while read -r expected options; do
+        # Options, without blanks in them.
+        # shellcheck disable=SC2086
+        register --without-companion $options register
+        expect_code 0
+        expect_equal "the names in the registration after '$options'" "$expected" \
+            "$(sed -n 's/^   ProviderName = "\(.*\)";/\1/p' "$managers/registration.mof" | sort -u)"
+        expect_equal "the modules" "KorvaOSStatusModule    OK" "$(cat "$managers/modules")"
+    done <"$work/turns"
+    register --without-companion --bare register
+    expect_text 'Location = "korzbosstatusprofileprovider";' "$(cat "$managers/registration.mof")"
+    register --without-companion unregister
+    expect_equal "the modules" "" "$(cat "$managers/modules")"
 }
 
 UsesTheInteropNamespaceThatIsNamed() {
@@ -118,21 +182,4 @@ CannotUnregisterWhileTheServerIsStopped() {
     expect_code 1
     expect_text "OpenPegasus forgets a provider only while it runs" "$output"
     expect_text "start cimserver and unregister again" "$output"
-}
-
-TellsWhatIsRegistered() {
-    register --without-companion register
-    register status
-    expect_code 1
-    expect_equal output "OpenPegasus: the companion is not registered
-OpenPegasus: the provider is registered" "$output"
-    register --without-companion status
-    expect_code 0
-}
-
-TellsNothingOfAStoppedServer() {
-    server_is_stopped
-    register status
-    expect_code 1
-    expect_equal output "OpenPegasus: cimserver does not answer" "$output"
 }

@@ -1,6 +1,6 @@
 # The registrations for the object managers, as they are built for this word size.
 # shellcheck shell=sh
-: "${work:?}" "${KORVA_BINARY_DIR:?}" "${KORVA_SOURCE_DIR:?}" "${KORVA_WORD_SIZE:?}"
+: "${work:?}" "${KORVA_BINARY_DIR:?}" "${KORVA_SOURCE_DIR:?}"
 folder=$KORVA_BINARY_DIR/share/korva-osstatus/registration
 schema=$KORVA_SOURCE_DIR/schema
 
@@ -46,27 +46,25 @@ EachClassIsRegisteredWithOpenPegasusAsWhatItIs() {
 }
 
 OpenPegasusIsToldOfTheModule() {
-    bitness=
-    [ "$KORVA_WORD_SIZE" = 64 ] || bitness="
-   Bitness = 2;"
     expect_equal "the module" "instance of PG_ProviderModule {
    Name = \"KorvaOSStatusModule\";
    Vendor = \"Korva\";
    Version = \"1.0.0\";
    InterfaceType = \"CMPI\";
    InterfaceVersion = \"2.0.0\";
-   Location = \"korzbosstatusprofileprovider\";$bitness
+   Location = \"korvaosstatusfacade\";
+   // Bitness = 2;   for the 32-bit agents of a 64-bit server, which take 32-bit libraries only
 };" "$(sed -n '/^instance of PG_ProviderModule/,/^}/p' "$folder/korva-osstatus-pegasus.mof")"
     expect_equal "the provider" "instance of PG_Provider {
    ProviderModuleName = \"KorvaOSStatusModule\";
-   Name = \"OperatingSystemProvider\";
+   Name = \"OSStatusFacade\";
 };" "$(sed -n '/^instance of PG_Provider {/,/^}/p' "$folder/korva-osstatus-pegasus.mof")"
 }
 
 OpenPegasusIsToldOfACapability() {
     expect_equal "the last capability" "instance of PG_ProviderCapabilities {
    ProviderModuleName = \"KorvaOSStatusModule\";
-   ProviderName = \"OperatingSystemProvider\";
+   ProviderName = \"OSStatusFacade\";
    CapabilityID = \"5\";
    ClassName = \"KORVA_OSElementCapabilities\";
    Namespaces = {\"root/cimv2\"};
@@ -81,12 +79,14 @@ CapabilitiesAreNumberedApart() {
         "$(sed -n 's/^   CapabilityID = "\(.*\)";$/\1/p' "$folder/korva-osstatus-pegasus.mof" | paste -sd ' ')"
 }
 
-# expect_factories REGISTRATION LIBRARY TYPE...: the names that an object manager looks up.
+# The one value of a key: value_of KEY REGISTRATION
+value_of() { sed -n "s/^   $1: //p" "$folder/$2" | sort -u; }
+
+# expect_factories PROVIDER LOCATION TYPE...: the names that an object manager looks up.
 expect_factories() {
-    provider=$(sed -n 's/^   provider: //p' "$folder/$1" | sort -u)
-    location=$(sed -n 's/^   location: //p' "$folder/$1" | sort -u)
-    library=$KORVA_BINARY_DIR/lib/lib$location.so
-    shift
+    provider=$1
+    library=$KORVA_BINARY_DIR/lib/lib$2.so
+    shift 2
     for type in "$@"; do
         nm -D --defined-only "$library" | grep -q " T ${provider}_Create_${type}MI\$" ||
             fail "$library has no factory for $type of $provider"
@@ -94,6 +94,43 @@ expect_factories() {
 }
 
 EachProviderNameHasItsFactoriesInItsLibrary() {
-    expect_factories korva-osstatus.reg Instance Association
-    expect_factories korva-osstatus-companion.reg Instance
+    for stem in korva-osstatus korva-osstatus-companion; do
+        types=Instance
+        [ "$stem" != korva-osstatus ] || types="Instance Association"
+        # Two words.
+        # shellcheck disable=SC2086
+        expect_factories "$(value_of provider $stem.reg)" "$(value_of location $stem.reg)" $types
+    done
+    expect_factories OperatingSystemProvider korzbosstatusprofileprovider Instance Association
+}
+
+# ---- versions of the classes
+
+# Name, Version and content of each class in a folder; comments on lines of their own are no content.
+class_versions() {
+    for file in "$1"/*.mof; do
+        printf '%s %s %s\n' "$(basename "$file" .mof)" "$(sed -n 's/.*Version ( "\(.*\)" ).*/\1/p' "$file")" \
+            "$(sed '/^ *\/\//d' "$file" | sha256sum | cut -d ' ' -f 1)"
+    done
+}
+
+# Object managers keep a class that has the same Version as before. A class that changes gets a Version of
+# its own, and a line in class-versions.txt beside the former ones.
+AClassThatChangesGetsAnotherVersion() {
+    class_versions "$schema" >"$work/versions"
+    while read -r version; do
+        grep -qxF "$version" class-versions.txt ||
+            fail "$version: changed without another Version, or not in class-versions.txt"
+    done <"$work/versions"
+    expect_equal "the Versions with two contents" "" "$(cut -d ' ' -f 1,2 class-versions.txt | sort | uniq -d)"
+}
+
+AChangeOfAClassIsNoticed() {
+    cp -R "$schema" "$work/schema"
+    class_versions "$work/schema" >"$work/before"
+    echo "// A comment." >>"$work/schema/KORVA_RunningOS.mof"
+    expect_equal "the versions" "$(cat "$work/before")" "$(class_versions "$work/schema")"
+    sed -i 's/Max ( 1 )/Max ( 2 )/' "$work/schema/KORVA_RunningOS.mof"
+    expect_equal "the classes that changed" "KORVA_RunningOS 1.0.0" \
+        "$(class_versions "$work/schema" | grep -vxF -f "$work/before" | cut -d ' ' -f 1,2)"
 }

@@ -84,16 +84,6 @@ UnregistersNothingWhereNothingIsRegistered() {
     expect_text "sfcb: the provider is not registered" "$output"
 }
 
-TellsWhatIsRegistered() {
-    register --without-companion register
-    register status
-    expect_code 1
-    expect_equal output "sfcb: the companion is not registered
-sfcb: the provider is registered" "$output"
-    register --without-companion status
-    expect_code 0
-}
-
 SaysThatTheBrokerMustBeRestarted() {
     with_running systemctl sfcb.service
     register --without-companion register
@@ -133,7 +123,21 @@ RestartsNothingThatDoesNotRun() {
     expect_code 0
     expect_calls "$stage_companion
 sfcbrepos -f"
-    expect_text "sfcb: no running service was found" "$output"
+    expect_text "sfcb: no running broker was found; it reads this when it is started" "$output"
+}
+
+TellsOfABrokerThatOnlyItsStarterCanRestart() {
+    for tool in pgrep pidof; do
+        with_running "$tool" sfcbd
+        register --only-companion --restart register
+        expect_code 3
+        expect_text "sfcbd runs, but not as a service" "$output"
+        expect_text "stop it and start it again; everything else is done" "$output"
+        rm "$managers/bin/$tool"
+    done
+    echo "disk full" >"$managers/fail/sfcbrepos"
+    register --only-companion --restart register
+    expect_code 1
 }
 
 FailsWhenTheRestartFails() {
@@ -245,4 +249,50 @@ StaysWhereItIsWhenAClassCannotBeRead() {
     expect_code 1
     expect_calls ""
     expect_equal "what is staged" korva-osstatus.reg "$(staged)"
+}
+
+# What is staged of the provider: its name and its library.
+staged_provider() {
+    sed -n 's/^   provider: //p; s/^   location: //p' "$managers/var/lib/sfcb/stage/regs/korva-osstatus.reg" |
+        sort -u | paste -sd ' '
+}
+
+# Each line: what is staged after a registration, and its options.
+registrations_in_turn() {
+    cat <<EOF
+facade
+bare --bare
+facade
+bare --bare --namespace root/other
+bare --package
+facade --namespace root/cimv2
+facade --package
+bare --bare --package
+EOF
+}
+
+RegistersTheFacadeOrTheBareProvider() {
+    facade="OSStatusFacade korvaosstatusfacade"
+    bare="OperatingSystemProvider korzbosstatusprofileprovider"
+    registrations_in_turn >"$work/turns"
+    while read -r expected options; do
+        # Options, without blanks in them.
+        # shellcheck disable=SC2086
+        register --without-companion $options register
+        expect_code 0
+        case $expected in
+            facade) expect_equal "what is staged after '$options'" "$facade" "$(staged_provider)" ;;
+            bare) expect_equal "what is staged after '$options'" "$bare" "$(staged_provider)" ;;
+        esac
+    done <"$work/turns"
+    register --without-companion unregister
+    expect_equal "what is staged" "" "$(staged)"
+}
+
+BareStaysWhenTheRepositoryCannotBeBuiltWithTheFacade() {
+    register --without-companion --bare register
+    echo "disk full" >"$managers/fail/sfcbrepos"
+    register --without-companion register
+    expect_code 1
+    expect_equal "what is staged" "OperatingSystemProvider korzbosstatusprofileprovider" "$(staged_provider)"
 }

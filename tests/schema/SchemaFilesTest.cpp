@@ -124,7 +124,6 @@ TEST_P(ShippedClass, HasItsSuperclassAndKind) {
     EXPECT_EQ(declared()->name, GetParam().name);
     EXPECT_EQ(declared()->superclass, GetParam().superclass);
     EXPECT_EQ(shipped().isAssociation(GetParam().name), GetParam().association);
-    EXPECT_EQ(mof::text(declared()->qualifiers, "Version"), "1.0.0");
 }
 
 TEST_P(ShippedClass, DeclaresExactlyTheExpectedPropertiesInOrder) {
