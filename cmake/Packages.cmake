@@ -94,14 +94,6 @@ set(CPACK_DEBIAN_PROVIDER_PACKAGE_SUGGESTS "korva-osstatus-companion, logrotate"
 foreach(key COMPANION DEVELOPMENT TOOLS)
     set(CPACK_RPM_${key}_PACKAGE_REQUIRES "korva-osstatus-provider = ${PROJECT_VERSION}-1")
 endforeach()
-# This CMake has no variable for what a package recommends. The state of the system comes through
-# libsystemd, which a 64-bit system may lack in 32-bit.
-set(korva_isa x86-64)
-if(KORVA_WORD_SIZE STREQUAL "32")
-    set(korva_isa x86-32)
-endif()
-set(CPACK_RPM_PROVIDER_PACKAGE_SUGGESTS
-    "korva-osstatus-companion, logrotate\nRecommends: systemd-libs(${korva_isa})")
 set(CPACK_RPM_PROVIDER_POST_UNINSTALL_SCRIPT_FILE "${korva_packaging}/rpm/provider/postun")
 foreach(component provider companion)
     string(TOUPPER ${component} key)

@@ -12,6 +12,8 @@ packages=$4
 work=$5
 root=$work/root
 log=$work/log
+stand_in=$(dirname "$0")/../../tests/packaging/stand-in
+manager=/opt/manager
 own="korva-osstatus-provider korva-osstatus-companion korva-osstatus-dev korva-osstatus-tools"
 status=0
 
@@ -59,12 +61,18 @@ bring_packages() {
     done
 }
 
+# An object manager that keeps what it is told, outside of the PATH that apt has.
+bring_object_manager() {
+    mkdir -p "$root$manager/bin" "$root$manager/fail" "$root$manager/says"
+    for name in sfcbstage sfcbunstage sfcbrepos; do cp "$stand_in" "$root$manager/bin/$name"; done
+}
+
 # All that the system holds: kinds, rights and owners, then the contents; but for the state, caches and
 # logs of the package manager.
 everything() {
     (
         cd "$root"
-        set -- . -xdev \( -path ./var/lib/dpkg -o -path ./var/lib/apt -o -path ./var/cache/apt \
+        set -- . -xdev \( -path ".$manager" -o -path ./var/lib/dpkg -o -path ./var/lib/apt -o -path ./var/cache/apt \
             -o -path ./var/cache/debconf -o -path ./var/cache/ldconfig -o -path ./var/log/apt \
             -o -path ./var/log/dpkg.log \) -prune -o
         find "$@" -printf '%y %m %u %g %p %l\n' | LC_ALL=C sort
@@ -100,7 +108,8 @@ all_have_version() {
 has_word_size_of_the_architecture() {
     class=2
     [ "$architecture" = amd64 ] || class=1
-    for file in bin/cmpihost lib/cmpi/libkorzbosstatusprofileprovider.so lib/libvaprovider.so.1; do
+    for file in bin/cmpihost lib/cmpi/libkorvaosstatusfacade.so \
+        lib/cmpi/libkorzbosstatusprofileprovider.so lib/libvaprovider.so.1; do
         [ "$(od -An -tu1 -j4 -N1 "$(readlink -f "$root/usr/$file")" | tr -d ' ')" = "$class" ] || {
             echo "$file has another word size"
             return 1
@@ -131,6 +140,24 @@ asks_the_host() {
     check "cmpihost tree" shows 'Debian GNU/Linux 12 .KORVA_OperatingSystem.: Enabled' tree
 }
 
+# ---- the registration
+
+register() { inside env PATH="/usr/sbin:/usr/bin:$manager/bin" korva-osstatus-register "$@"; }
+
+# The name and the library that the object manager was told of, in the repository that it built.
+has_registered() {
+    for line in "provider: $1" "location: $2"; do
+        grep -q "^ *$line\$" "$root$manager/var/lib/sfcb/registration/providerRegister" || {
+            echo "no line '$line'"
+            return 1
+        }
+    done
+}
+
+has_registered_facade() { has_registered OSStatusFacade korvaosstatusfacade; }
+has_registered_bare() { has_registered OperatingSystemProvider korzbosstatusprofileprovider; }
+has_registered_nothing() { [ ! -s "$root$manager/var/lib/sfcb/registration/providerRegister" ]; }
+
 has_man_pages() {
     for page in man1/cmpihost.1 man5/zblog.conf.5 man7/korva-osstatus.7 man8/korva-osstatus-register.8; do
         gzip -t "$root/usr/share/man/$page.gz"
@@ -152,6 +179,7 @@ nothing_is_left() {
 check "a fresh system" make_system
 [ "$status" -eq 0 ] || exit 1
 check "packages of a later version" bring_packages
+check "an object manager that keeps what it is told" bring_object_manager
 version=$(dpkg-deb -f "$(find "$root/packages" -name '*-provider_*.deb')" Version)
 everything >"$work/before"
 known_packages >"$work/packages.before"
@@ -164,14 +192,22 @@ asks_the_host
 check "man pages" has_man_pages
 check "a log where /etc/zblog.conf says" keeps_a_log_where_the_configuration_says
 
+check "korva-osstatus-register --bare register" register --bare register
+check "the object manager knows the provider itself" has_registered_bare
+check "korva-osstatus-register register" register register
+check "the object manager knows the facade" has_registered_facade
+check "korva-osstatus-register status" register status
+
 echo "# ours" >>"$root/etc/logrotate.d/korva-osstatus"
 check "apt-get install of the later version" install_from later
 check "all of them have version $version+later" all_have_version "$version+later"
 check "a changed configuration was kept" grep -q '^# ours$' "$root/etc/logrotate.d/korva-osstatus"
+check "the object manager knows the facade" has_registered_facade
 asks_the_host
 
 # The names are meant to be split.
 # shellcheck disable=SC2086
 check "apt-get purge" inside apt-get -y purge $own
+check "the object manager knows nothing of it any more" has_registered_nothing
 check "nothing is left behind" nothing_is_left
 exit "$status"

@@ -1,4 +1,4 @@
-// The installed library and its framework, under the habits of object managers' loaders.
+// The installed libraries and their framework, under the habits of object managers' loaders.
 #include <dlfcn.h>
 #include <gmock/gmock.h>
 
@@ -39,7 +39,13 @@ long residentKiB() {
     return 0;
 }
 
-class InstalledLibrary : public testing::Test {
+/// What object managers are told of, by default or with --bare.
+struct Registered {
+    const char* file;
+    const char* provider;
+};
+
+class InstalledLibrary : public testing::TestWithParam<Registered> {
   protected:
     static void SetUpTestSuite() {
         std::string pattern = (fs::temp_directory_path() / "installedXXXXXX").string();
@@ -59,8 +65,11 @@ class InstalledLibrary : public testing::Test {
     }
     void TearDown() override { EXPECT_THAT(broker_.takeViolations(), testing::IsEmpty()); }
 
-    static std::string file() {
-        return prefix_ / KORVA_CMPI_FOLDER "/libkorzbosstatusprofileprovider.so";
+    static std::string file() { return prefix_ / KORVA_CMPI_FOLDER / GetParam().file; }
+    static LoadOptions options() {
+        LoadOptions options;
+        options.providerName = GetParam().provider;
+        return options;
     }
     static std::vector<std::string> mapped() {
         std::vector<std::string> found;
@@ -82,11 +91,13 @@ class InstalledLibrary : public testing::Test {
     Broker broker_;
 };
 
-TEST_F(InstalledLibrary, OffersItsFactoriesByNameAndNoGenericOne) {
+TEST_P(InstalledLibrary, OffersItsFactoriesByNameAndNoGenericOne) {
     void* const handle = dlopen(file().c_str(), RTLD_NOW | RTLD_GLOBAL);
     ASSERT_NE(handle, nullptr) << dlerror();
-    EXPECT_NE(dlsym(handle, "OperatingSystemProvider_Create_InstanceMI"), nullptr);
-    EXPECT_NE(dlsym(handle, "OperatingSystemProvider_Create_AssociationMI"), nullptr);
+    for (const char* kind : {"Instance", "Association"}) {
+        const std::string factory = std::string(GetParam().provider) + "_Create_" + kind + "MI";
+        EXPECT_NE(dlsym(handle, factory.c_str()), nullptr) << factory;
+    }
     for (const char* kind : {"Instance", "Association", "Method", "Indication", "Property"}) {
         const std::string generic = std::string("_Generic_Create_") + kind + "MI";
         EXPECT_EQ(dlsym(handle, generic.c_str()), nullptr) << generic;
@@ -95,8 +106,8 @@ TEST_F(InstalledLibrary, OffersItsFactoriesByNameAndNoGenericOne) {
     EXPECT_THAT(mapped(), testing::IsEmpty());
 }
 
-TEST_F(InstalledLibrary, ServesRequestsAfterAnIdleCleanup) {
-    ProviderLibrary library(file(), broker_);
+TEST_P(InstalledLibrary, ServesRequestsAfterAnIdleCleanup) {
+    ProviderLibrary library(file(), broker_, options());
     for (int round = 0; round < 3; ++round) {
         EXPECT_EQ(instancesOf("KORVA_OperatingSystem", library), 1U);
         EXPECT_EQ(instancesOf("KORVA_RunningOS", library), 1U);
@@ -107,8 +118,8 @@ TEST_F(InstalledLibrary, ServesRequestsAfterAnIdleCleanup) {
     }
 }
 
-TEST_F(InstalledLibrary, LeavesNothingBehindWhenItIsLoadedAndUnloadedAHundredTimes) {
-    ProviderLibrary library(file(), broker_);
+TEST_P(InstalledLibrary, LeavesNothingBehindWhenItIsLoadedAndUnloadedAHundredTimes) {
+    ProviderLibrary library(file(), broker_, options());
     std::size_t filesBefore = 0;
     long memoryBefore = 0;
     for (int round = 1; round <= 100; ++round) {
@@ -125,5 +136,11 @@ TEST_F(InstalledLibrary, LeavesNothingBehindWhenItIsLoadedAndUnloadedAHundredTim
     EXPECT_EQ(openFiles(), filesBefore);
     EXPECT_LT(residentKiB() - memoryBefore, 512);
 }
+
+INSTANTIATE_TEST_SUITE_P(
+    Libraries, InstalledLibrary,
+    testing::Values(Registered{"libkorvaosstatusfacade.so", "OSStatusFacade"},
+                    Registered{"libkorzbosstatusprofileprovider.so", "OperatingSystemProvider"}),
+    [](const auto& row) { return std::string(row.param.provider); });
 
 }  // namespace

@@ -117,7 +117,9 @@ set_up_machine() {
     touch "$machine/var/lib/dpkg/status" "$machine/dev/null"
     ln -s usr/bin "$machine/bin"
     ln -s ../var "$machine/usr/var"
-    for name in sh basename cat cp dirname grep id mkdir mktemp mv readlink rm sed touch; do bring $name; done
+    for name in sh basename cat cp dirname grep id ln mkdir mktemp mv od readlink rm rmdir sed touch tr; do
+        bring $name
+    done
     [ "$architecture" = "$(dpkg --print-architecture)" ] || on_machine --add-architecture "$architecture"
 }
 
@@ -153,6 +155,16 @@ sfcbrepos -f
 sfcbstage -r korva-osstatus-companion.reg
 sfcbrepos -f" "$(calls)"
     expect_text "sfcb: the broker must be restarted" "$output"
+}
+
+InstallationRegistersTheFacade() {
+    set_up_machine
+    with_sfcb
+    on_machine -i "$(package provider)"
+    expect_equal "what is staged" "location: korvaosstatusfacade
+provider: OSStatusFacade" \
+        "$(sed -n 's/^ *\(provider:\|location:\)/\1/p' "$machine/var/lib/sfcb/stage/regs/korva-osstatus.reg" | sort -u)"
+    [ -e "$machine/usr/lib/cmpi/libkorvaosstatusfacade.so" ] || fail "its library is missing"
 }
 
 InstallationNeedsNoObjectManager() {
@@ -193,6 +205,45 @@ sfcbrepos -f" "$(calls)"
         "$machine/var/log/korva-osstatus.log-20261121" "$machine/var/log/korva-osstatus-other.log-20261121.gz"
     on_machine -P korva-osstatus-provider
     expect_equal "the machine" "$(cat "$work/before")" "$(everything)"
+}
+
+# As with a package manager that has a PATH of its own.
+RemovalFindsAnObjectManagerOutsideOfPath() {
+    set_up_machine
+    everything >"$work/before"
+    install_all
+    mkdir -p "$machine/opt/sfcb/bin" "$machine/opt/sfcb/fail"
+    for name in sfcbstage sfcbunstage sfcbrepos; do cp stand-in "$machine/opt/sfcb/bin/$name"; done
+    expect_success as_root env PATH="$PATH:/opt/sfcb/bin" chroot "$machine" /usr/sbin/korva-osstatus-register register
+    regs=$machine/opt/sfcb/var/lib/sfcb/stage/regs
+    expect_equal "what is staged" "korva-osstatus-companion.reg
+korva-osstatus.reg" "$(ls "$regs")"
+    on_machine -P korva-osstatus-tools korva-osstatus-dev korva-osstatus-companion korva-osstatus-provider
+    expect_equal "what is staged" "" "$(ls "$regs")"
+    [ ! -e "$machine/var/lib/korva-osstatus" ] || fail "$(ls "$machine/var/lib/korva-osstatus") is left"
+    rm -r "$machine/opt"
+    expect_equal "the machine" "$(cat "$work/before")" "$(everything)"
+}
+
+PurgeForgetsWhereObjectManagersWere() {
+    set_up_machine
+    on_machine -i "$(package provider)"
+    mkdir "$machine/var/lib/korva-osstatus"
+    ln -s /opt/gone "$machine/var/lib/korva-osstatus/sfcb"
+    on_machine -r korva-osstatus-provider
+    expect_text "sfcbunstage -n root/cimv2 -r korva-osstatus.reg" "$output"
+    on_machine -P korva-osstatus-provider
+    [ ! -e "$machine/var/lib/korva-osstatus" ] || fail "$(ls "$machine/var/lib/korva-osstatus") is left"
+}
+
+UpgradeKeepsTheBareProvider() {
+    set_up_machine
+    with_sfcb
+    on_machine -i "$(package provider)"
+    register_on_machine --bare
+    later_provider
+    on_machine -i "$work/later.deb"
+    expect_text "provider: OperatingSystemProvider" "$(cat "$machine/var/lib/sfcb/stage/regs/korva-osstatus.reg")"
 }
 
 RemovalOfTheCompanionKeepsTheProviderRegistered() {

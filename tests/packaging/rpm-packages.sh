@@ -18,6 +18,12 @@ PackagesHoldTheSameFilesAsThoseOfDebian() {
     sed 's/^[^ ]* //; /share\/doc\/korva-osstatus/d' package-files.txt | LC_ALL=C sort >"$work/expected-files"
     expect_equal "the packages" "$(cat "$work/expected-files")" "$(cat "$work/found")"
 
+    isa=x86-64
+    [ "$KORVA_WORD_SIZE" = 64 ] || isa=x86-32
+    expect_equal "what is recommended" "systemd-libs($isa)" \
+        "$(rpm -qp --recommends "$packages/korva-osstatus-provider-1.0.0-1.$architecture.rpm")"
+    expect_equal "what is suggested" "korva-osstatus-companion
+logrotate" "$(rpm -qp --suggests "$packages/korva-osstatus-provider-1.0.0-1.$architecture.rpm")"
     expect_equal "what configures" /etc/logrotate.d/korva-osstatus \
         "$(rpm -qpc "$packages/korva-osstatus-provider-1.0.0-1.$architecture.rpm")"
     scripts=$(rpm -qp --scripts "$packages/korva-osstatus-provider-1.0.0-1.$architecture.rpm")
