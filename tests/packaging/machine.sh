@@ -1,0 +1,225 @@
+# What becomes of a machine that the Debian packages are installed on. That machine is a folder, with the
+# few commands in it that the packages' scripts need.
+# shellcheck shell=sh
+# shellcheck source=packed.sh
+. ./packed.sh
+machine=$work/machine
+
+as_root() { if [ "$(id -u)" -eq 0 ]; then "$@"; else unshare --user --map-root-user "$@"; fi; }
+
+on_machine() {
+    expect_success as_root dpkg --root="$machine" --force-depends --no-pager "$@"
+}
+
+# Copies a command and the libraries that it needs.
+bring() {
+    file=$(command -v "$1")
+    cp -L "$file" "$machine/usr/bin/"
+    ldd "$file" | grep -o '/[^ ]*' | while read -r library; do
+        mkdir -p "$machine$(dirname "$library")"
+        cp -Ln "$library" "$machine$library"
+    done
+}
+
+set_up_machine() {
+    mkdir -p "$machine/usr/bin" "$machine/dev" "$machine/tmp" "$machine/var/log"
+    mkdir -p "$machine/var/lib/dpkg/info" "$machine/var/lib/dpkg/updates" "$machine/var/lib/dpkg/triggers"
+    touch "$machine/var/lib/dpkg/status" "$machine/dev/null"
+    ln -s usr/bin "$machine/bin"
+    ln -s ../var "$machine/usr/var"
+    for name in sh basename cat cp dirname grep id ln mkdir mktemp mv od readlink rm rmdir sed touch tr; do
+        bring $name
+    done
+    [ "$architecture" = "$(dpkg --print-architecture)" ] || on_machine --add-architecture "$architecture"
+}
+
+with_sfcb() {
+    for name in sfcbstage sfcbunstage sfcbrepos; do cp stand-in "$machine/usr/bin/$name"; done
+    mkdir -p "$machine/usr/fail"
+}
+
+# What sfcb was told, by the names of the files.
+calls() { sed 's| /[^ ]*/| |g; s| -n root/cimv2||; s| KORVA.*||' "$machine/usr/calls"; }
+forget_calls() { rm -f "$machine/usr/calls"; }
+
+# All that is on the machine, except what dpkg and the stand-ins remember.
+everything() {
+    (cd "$machine" && find . ! -path './var/lib/*' ! -path ./usr/calls | LC_ALL=C sort)
+}
+
+install_all() {
+    on_machine -i "$(package provider)" "$(package companion)" "$(package dev)" "$(package tools)"
+}
+
+state_of() { dpkg-query --admindir="$machine/var/lib/dpkg" -W -f '${db:Status-Status}' "korva-osstatus-$1"; }
+
+InstallationRegistersProviderAndCompanion() {
+    set_up_machine
+    with_sfcb
+    install_all
+    for name in provider companion dev tools; do
+        expect_equal "the state of $name" installed "$(state_of $name)"
+    done
+    expect_equal "what sfcb was told" "sfcbstage -r korva-osstatus.reg
+sfcbrepos -f
+sfcbstage -r korva-osstatus-companion.reg
+sfcbrepos -f" "$(calls)"
+    expect_text "sfcb: the broker must be restarted" "$output"
+}
+
+InstallationRegistersTheFacade() {
+    set_up_machine
+    with_sfcb
+    on_machine -i "$(package provider)"
+    expect_equal "what is staged" "location: korvaosstatusfacade
+provider: OSStatusFacade" \
+        "$(sed -n 's/^ *\(provider:\|location:\)/\1/p' "$machine/var/lib/sfcb/stage/regs/korva-osstatus.reg" | sort -u)"
+    [ -e "$machine/usr/lib/cmpi/libkorvaosstatusfacade.so" ] || fail "its library is missing"
+}
+
+InstallationNeedsNoObjectManager() {
+    set_up_machine
+    install_all
+    expect_equal "the state of the provider" installed "$(state_of provider)"
+    expect_text "no object manager was found" "$output"
+}
+
+InstallationSurvivesAFailingObjectManager() {
+    set_up_machine
+    with_sfcb
+    echo "the schema is missing" >"$machine/usr/fail/sfcbrepos"
+    install_all
+    expect_equal "the state of the provider" installed "$(state_of provider)"
+    expect_text "the schema is missing" "$output"
+}
+
+InstalledHostReportsTheOperatingSystem() {
+    set_up_machine
+    install_all
+    expect_success env -i "$machine/usr/bin/cmpihost" ein KORVA_OperatingSystem
+    expect_text 'KORVA_OperatingSystem.CSCreationClassName="KORVA_ComputerSystem"' "$output"
+}
+
+RemovalUnregistersAndLeavesNothing() {
+    set_up_machine
+    with_sfcb
+    everything >"$work/before"
+    install_all
+    forget_calls
+    on_machine -r korva-osstatus-tools korva-osstatus-dev korva-osstatus-companion korva-osstatus-provider
+    expect_equal "what sfcb was told" "sfcbunstage -r korva-osstatus-companion.reg
+sfcbrepos -f
+sfcbunstage -r korva-osstatus.reg
+sfcbrepos -f" "$(calls)"
+    touch "$machine/var/log/korva-osstatus.log" "$machine/var/log/korva-osstatus.log.1.gz" \
+        "$machine/var/log/korva-osstatus.log-20261121" "$machine/var/log/korva-osstatus-other.log-20261121.gz"
+    on_machine -P korva-osstatus-provider
+    expect_equal "the machine" "$(cat "$work/before")" "$(everything)"
+}
+
+# As with a package manager that has a PATH of its own.
+RemovalFindsAnObjectManagerOutsideOfPath() {
+    set_up_machine
+    everything >"$work/before"
+    install_all
+    mkdir -p "$machine/opt/sfcb/bin" "$machine/opt/sfcb/fail"
+    for name in sfcbstage sfcbunstage sfcbrepos; do cp stand-in "$machine/opt/sfcb/bin/$name"; done
+    expect_success as_root env PATH="$PATH:/opt/sfcb/bin" chroot "$machine" /usr/sbin/korva-osstatus-register register
+    regs=$machine/opt/sfcb/var/lib/sfcb/stage/regs
+    expect_equal "what is staged" "korva-osstatus-companion.reg
+korva-osstatus.reg" "$(ls "$regs")"
+    on_machine -P korva-osstatus-tools korva-osstatus-dev korva-osstatus-companion korva-osstatus-provider
+    expect_equal "what is staged" "" "$(ls "$regs")"
+    [ ! -e "$machine/var/lib/korva-osstatus" ] || fail "$(ls "$machine/var/lib/korva-osstatus") is left"
+    rm -r "$machine/opt"
+    expect_equal "the machine" "$(cat "$work/before")" "$(everything)"
+}
+
+PurgeForgetsWhereObjectManagersWere() {
+    set_up_machine
+    on_machine -i "$(package provider)"
+    mkdir "$machine/var/lib/korva-osstatus"
+    ln -s /opt/gone "$machine/var/lib/korva-osstatus/sfcb"
+    on_machine -r korva-osstatus-provider
+    expect_text "sfcbunstage -n root/cimv2 -r korva-osstatus.reg" "$output"
+    on_machine -P korva-osstatus-provider
+    [ ! -e "$machine/var/lib/korva-osstatus" ] || fail "$(ls "$machine/var/lib/korva-osstatus") is left"
+}
+
+UpgradeKeepsTheBareProvider() {
+    set_up_machine
+    with_sfcb
+    on_machine -i "$(package provider)"
+    register_on_machine --bare
+    later_provider
+    on_machine -i "$work/later.deb"
+    expect_text "provider: OperatingSystemProvider" "$(cat "$machine/var/lib/sfcb/stage/regs/korva-osstatus.reg")"
+}
+
+RemovalOfTheCompanionKeepsTheProviderRegistered() {
+    set_up_machine
+    with_sfcb
+    install_all
+    forget_calls
+    on_machine -r korva-osstatus-companion
+    expect_equal "what sfcb was told" "sfcbunstage -r korva-osstatus-companion.reg
+sfcbrepos -f" "$(calls)"
+    expect_equal "what is staged" korva-osstatus.reg "$(ls "$machine/var/lib/sfcb/stage/regs")"
+}
+
+RemovalSurvivesAFailingObjectManager() {
+    set_up_machine
+    with_sfcb
+    install_all
+    echo "disk full" >"$machine/usr/fail/sfcbunstage"
+    on_machine -P korva-osstatus-tools korva-osstatus-dev korva-osstatus-companion korva-osstatus-provider
+    expect_text "sfcbunstage failed with exit status 3" "$output"
+    [ ! -e "$machine/usr/sbin/korva-osstatus-register" ] || fail "the command is still there"
+}
+
+# The provider's package as a later version.
+later_provider() {
+    dpkg-deb -R "$(package provider)" "$work/later"
+    sed -i 's/^Version: .*/Version: 1.0.1-1/' "$work/later/DEBIAN/control"
+    dpkg-deb --root-owner-group -b "$work/later" "$work/later.deb" >/dev/null
+}
+
+UpgradeRegistersAgainAndUnregistersNothing() {
+    set_up_machine
+    with_sfcb
+    on_machine -i "$(package provider)"
+    forget_calls
+    later_provider
+    on_machine -i "$work/later.deb"
+    expect_equal "what sfcb was told" "sfcbstage -r korva-osstatus.reg
+sfcbrepos -f" "$(calls)"
+    expect_equal "the state of the provider" installed "$(state_of provider)"
+}
+
+# register_on_machine OPTION...
+register_on_machine() { expect_success as_root chroot "$machine" /usr/sbin/korva-osstatus-register "$@" register; }
+
+UpgradeKeepsTheNamespaceThatTheClassesAreIn() {
+    set_up_machine
+    with_sfcb
+    on_machine -i "$(package provider)"
+    register_on_machine --namespace root/other
+    forget_calls
+    later_provider
+    on_machine -i "$work/later.deb"
+    expect_equal "what sfcb was told" "sfcbstage -n root/other -r korva-osstatus.reg
+sfcbrepos -f" "$(calls)"
+    forget_calls
+    on_machine -r korva-osstatus-provider
+    expect_equal "what sfcb was told" "sfcbunstage -n root/other -r korva-osstatus.reg
+sfcbrepos -f" "$(calls)"
+}
+
+UpgradeKeepsAChangedRotation() {
+    set_up_machine
+    on_machine -i "$(package provider)"
+    echo "# ours" >>"$machine/etc/logrotate.d/korva-osstatus"
+    later_provider
+    on_machine -i "$work/later.deb"
+    expect_text "# ours" "$(cat "$machine/etc/logrotate.d/korva-osstatus")"
+}

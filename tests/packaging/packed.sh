@@ -1,0 +1,8 @@
+# Sourced by the cases about the Debian packages: where they are.
+# shellcheck shell=sh
+: "${work:?}" "${KORVA_BINARY_DIR:?}" "${KORVA_WORD_SIZE:?}"
+packages=$KORVA_BINARY_DIR/packages
+architecture=amd64
+[ "$KORVA_WORD_SIZE" = 64 ] || architecture=i386
+
+package() { echo "$packages/korva-osstatus-$1_1.0.0-1_$architecture.deb"; }
