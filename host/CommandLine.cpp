@@ -58,7 +58,8 @@ constexpr const char* pathHelp =
     "  root/cimv2:KORVA_OperatingSystem\n"
     "  'KORVA_OperatingSystem.CSName=\"myhost\",Name=\"Debian GNU/Linux\"'\n"
     "  The namespace is root/cimv2 when a path names none. In a text key, \\\" and \\\\ stand for\n"
-    "  \" and \\. Single quotes around the path keep the shell away from it.\n";
+    "  \" and \\. Single quotes around the path keep the shell away from it.\n"
+    "  The path of an instance can lack keys when only one instance has those that it gives.\n";
 
 constexpr const char* statusHelp =
     "\n"
@@ -170,7 +171,8 @@ class Parser {
   private:
     static ParsedCommandLine refused(const std::string& complaint) {
         return {std::nullopt,
-                terminalText(complaint) + "\nRun cmpihost --help for more information.\n",
+                "cmpihost: " + terminalText(complaint) +
+                    "\nRun cmpihost --help for more information.\n",
                 exitUsage};
     }
     std::string withoutOperation(const CLI::ParseError& error) const;
@@ -201,9 +203,12 @@ std::string Parser::withoutOperation(const CLI::ParseError& error) const {
 
 void Parser::addHostOptions() {
     app_.add_option("--provider", result_.provider,
-                    "Library of the provider; without it the one beside this program")
+                    "Library of the provider; without it the facade beside this program,\n"
+                    "which asks the provider")
         ->type_name("FILE")
         ->check(notEmpty());
+    app_.add_flag("--bare", result_.bare,
+                  "Ask the provider itself, and complete no path that lacks keys");
     app_.add_option_function<std::string>(
             "--format", [this](const std::string& word) { result_.format = formatNamed(word); },
             "How results are printed: table (the default), mof or json;\n"

@@ -9,8 +9,16 @@ namespace fs = std::filesystem;
 
 namespace {
 
-constexpr const char* providerName = "libkorzbosstatusprofileprovider.so";
-constexpr const char* companionName = "libkorvacomputersystemprovider.so";
+std::string fileName(Library library) {
+    switch (library) {
+        case Library::Facade:
+            return "libkorvaosstatusfacade.so";
+        case Library::Companion:
+            return "libkorvacomputersystemprovider.so";
+        default:
+            return "libkorzbosstatusprofileprovider.so";
+    }
+}
 
 /// The folders that object managers load providers from, below a prefix: the one that the providers
 /// are installed in, then the usual ones.
@@ -20,32 +28,6 @@ std::vector<fs::path> cmpiFolders(const fs::path& installed) {
         folders.push_back(fs::path(libraries) / "cmpi");
     }
     return folders;
-}
-
-std::vector<fs::path> candidatesFor(const std::string& name, const fs::path& programFolder,
-                                    const fs::path& installed) {
-    const std::string soname = name + ".1";
-    const fs::path prefix = programFolder.parent_path();
-    std::vector<fs::path> candidates = {prefix / "lib" / soname, programFolder / soname};
-    for (const fs::path& folder : cmpiFolders(installed)) {
-        for (const std::string& file : {name, soname}) {
-            fs::path candidate = prefix / folder / file;
-            if (std::find(candidates.begin(), candidates.end(), candidate) == candidates.end()) {
-                candidates.push_back(std::move(candidate));
-            }
-        }
-    }
-    return candidates;
-}
-
-fs::path firstFile(const std::vector<fs::path>& candidates) {
-    for (const fs::path& candidate : candidates) {
-        std::error_code error;
-        if (fs::is_regular_file(candidate, error)) {
-            return candidate;
-        }
-    }
-    return {};
 }
 
 }  // namespace
@@ -69,16 +51,36 @@ fs::path installedProviderFolder() {
     return KORVA_CMPI_FOLDER;
 }
 
-std::vector<fs::path> providerCandidates(const fs::path& programFolder, const fs::path& installed) {
-    return candidatesFor(providerName, programFolder, installed);
+std::vector<fs::path> candidates(Library library, const fs::path& programFolder,
+                                 const fs::path& installed) {
+    const std::string name = fileName(library);
+    const std::string soname = name + ".1";
+    const fs::path prefix = programFolder.parent_path();
+    std::vector<fs::path> result = {prefix / "lib" / soname, programFolder / soname};
+    for (const fs::path& folder : cmpiFolders(installed)) {
+        for (const std::string& file : {name, soname}) {
+            fs::path candidate = prefix / folder / file;
+            if (std::find(result.begin(), result.end(), candidate) == result.end()) {
+                result.push_back(std::move(candidate));
+            }
+        }
+    }
+    return result;
 }
 
-fs::path findProvider(const fs::path& programFolder, const fs::path& installed) {
-    return firstFile(providerCandidates(programFolder, installed));
+fs::path findLibrary(Library library, const fs::path& programFolder, const fs::path& installed) {
+    for (const fs::path& candidate : candidates(library, programFolder, installed)) {
+        std::error_code error;
+        if (fs::is_regular_file(candidate, error)) {
+            return candidate;
+        }
+    }
+    return {};
 }
 
-fs::path findCompanion(const fs::path& programFolder, const fs::path& installed) {
-    return firstFile(candidatesFor(companionName, programFolder, installed));
+std::string providerName(const fs::path& file) {
+    const bool facade = file.filename().string().rfind(fileName(Library::Facade), 0) == 0;
+    return facade ? "OSStatusFacade" : "OperatingSystemProvider";
 }
 
 }  // namespace cmpihost

@@ -49,9 +49,14 @@ class OwnComputerSystems final : public ComputerSystems {
     ComputerSystemService service_;
 };
 
-LoadOptions companionOptions() {
+LoadOptions loadOptions(const std::string& providerName) {
     LoadOptions options;
-    options.providerName = "ComputerSystemProvider";
+    options.providerName = providerName;
+    return options;
+}
+
+LoadOptions companionOptions() {
+    LoadOptions options = loadOptions("ComputerSystemProvider");
     options.association = false;
     return options;
 }
@@ -106,11 +111,11 @@ OperationResult guarded(Call call) {
 
 }  // namespace
 
-ProviderHost::ProviderHost(const std::string& file, const ClassCatalogue& catalogue,
+ProviderHost::ProviderHost(const ProviderSource& provider, const ClassCatalogue& catalogue,
                            const ComputerSystemSource& computerSystems)
     : broker_(&catalogue),
       computerSystems_(routed(computerSystems, broker_)),
-      library_(file, broker_) {}
+      library_(provider.library, broker_, loadOptions(provider.name)) {}
 
 ProviderHost::~ProviderHost() = default;
 

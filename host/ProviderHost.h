@@ -10,6 +10,13 @@
 
 namespace cmpihost {
 
+/// The provider that is asked.
+struct ProviderSource {
+    std::string library;
+    /// The provider's name, which the library's factories carry.
+    std::string name;
+};
+
 /// Who serves the computer system, beside the provider.
 struct ComputerSystemSource {
     /// The library of its provider; empty: the host serves it itself.
@@ -26,7 +33,7 @@ class ComputerSystems;
 class ProviderHost {
   public:
     /// Loads the libraries; throws LoadError. `catalogue` outlives the host.
-    ProviderHost(const std::string& file, const ClassCatalogue& catalogue,
+    ProviderHost(const ProviderSource& provider, const ClassCatalogue& catalogue,
                  const ComputerSystemSource& computerSystems = {});
     ~ProviderHost();
 

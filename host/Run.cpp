@@ -5,6 +5,7 @@
 #include <type_traits>
 
 #include "host/Notes.h"
+#include "host/PathCompletion.h"
 #include "host/PathText.h"
 #include "host/Places.h"
 #include "host/ProviderHost.h"
@@ -44,14 +45,16 @@ class NoProvider : public std::runtime_error {
     using std::runtime_error::runtime_error;
 };
 
-std::string providerFile(const std::string& given, const fs::path& programFolder) {
-    if (!given.empty()) {
-        return loadable(given);
+std::string providerFile(const CommandLine& commandLine, const fs::path& programFolder) {
+    if (!commandLine.provider.empty()) {
+        return loadable(commandLine.provider);
     }
-    const fs::path found = findProvider(programFolder);
+    const Library wanted = commandLine.bare ? Library::Provider : Library::Facade;
+    const fs::path found = findLibrary(wanted, programFolder);
     if (found.empty()) {
-        std::string text = "no provider library was found; looked for";
-        for (const fs::path& candidate : providerCandidates(programFolder)) {
+        std::string text = std::string("no library of the ") +
+                           (commandLine.bare ? "provider" : "facade") + " was found; looked for";
+        for (const fs::path& candidate : candidates(wanted, programFolder)) {
             text += "\n  " + terminalText(candidate.string());
         }
         throw NoProvider(text + "\n(--provider FILE names one)");
@@ -96,17 +99,14 @@ class Run {
         try {
             return execute();
         } catch (const NoProvider& error) {
-            err_ << error.what() << '\n';
-            return exitNotLoaded;
+            return failed(error.what(), exitNotLoaded);
         } catch (const LoadError& error) {
-            err_ << terminalText(error.what()) << '\n';
-            return exitNotLoaded;
+            return failed(terminalText(error.what()), exitNotLoaded);
         } catch (const PathError& error) {
-            err_ << error.what() << '\n';
+            return failed(error.what(), exitUsage);
         } catch (const UsageError& error) {
-            err_ << error.what() << '\n';
+            return failed(error.what(), exitUsage);
         }
-        return exitUsage;
     }
 
   private:
@@ -117,17 +117,30 @@ class Run {
     }
 
     ExitStatus runOperation(const Schema& schema, const SchemaCatalogue& catalogue) {
-        const OperationRequest request = buildRequest(commandLine_, schema, catalogue);
-        const OperationResult result =
-            hosted(catalogue, [&](ProviderHost& host) { return host.run(request); });
+        OperationRequest request = buildRequest(commandLine_, schema, catalogue);
+        const OperationResult result = hosted(catalogue, [&](ProviderHost& host) {
+            return commandLine_.bare || !lacksKeys(request, catalogue) ? host.run(request)
+                                                                       : completed(host, request);
+        });
         if (result.rc != CMPI_RC_OK) {
-            const ExitStatus status = failed(result);
+            failed(failureText(result), exitCimStatus);
             err_ << hintFor(request, result, schema);
-            return status;
+            return exitCimStatus;
         }
         printResult(request, result, schema, *makePrinter(commandLine_.format, out_, schema));
         err_ << notesOn(request, result, schema);
         return written();
+    }
+
+    /// Has the request answered once its path has all keys.
+    OperationResult completed(ProviderHost& host, OperationRequest& request) {
+        const OperationResult names = host.ask(namesRequest(request.path));
+        if (names.rc != CMPI_RC_OK) {
+            return names;
+        }
+        request.path = completedPath(request.path, names.paths);
+        err_ << "cmpihost: completed the path: " << terminalText(writePath(request.path)) << '\n';
+        return host.run(request);
     }
 
     ExitStatus drawHost(const Schema& schema, const SchemaCatalogue& catalogue) {
@@ -143,20 +156,19 @@ class Run {
                 drawTree(root, out_);
             }
         } catch (const TreeFailure& failure) {
-            return failed(failure.result);
+            return failed(failureText(failure.result), exitCimStatus);
         }
         return written();
     }
 
-    ExitStatus failed(const OperationResult& result) {
-        err_ << failureText(result) << '\n';
-        return exitCimStatus;
+    ExitStatus failed(const std::string& complaint, ExitStatus status) {
+        err_ << "cmpihost: " << complaint << '\n';
+        return status;
     }
 
     ExitStatus written() {
         if (!out_.flush()) {
-            err_ << "the results cannot be written\n";
-            return exitCimStatus;
+            return failed("the results cannot be written", exitCimStatus);
         }
         return exitDone;
     }
@@ -168,8 +180,8 @@ class Run {
         if (commandLine_.log) {
             records.emplace();
         }
-        ProviderHost host(providerFile(commandLine_.provider, programFolder_), catalogue,
-                          computerSystems());
+        const std::string provider = providerFile(commandLine_, programFolder_);
+        ProviderHost host({provider, providerName(provider)}, catalogue, computerSystems());
         auto result = work(host);
         for (const std::string& violation : host.unload()) {
             err_ << "caught: " << terminalText(violation) << '\n';
@@ -182,7 +194,7 @@ class Run {
             return {{}, *commandLine_.computerSystems};
         }
         const std::string companion = commandLine_.companion.empty()
-                                          ? findCompanion(programFolder_).string()
+                                          ? findLibrary(Library::Companion, programFolder_).string()
                                           : loadable(commandLine_.companion);
         return {companion};
     }

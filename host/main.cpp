@@ -12,7 +12,7 @@ namespace {
 cmpihost::ExitStatus show(const cmpihost::ParsedCommandLine& parsed) {
     std::ostream& stream = parsed.status == cmpihost::exitDone ? std::cout : std::cerr;
     if (!(stream << parsed.text).flush()) {
-        std::cerr << "the text cannot be written\n";
+        std::cerr << "cmpihost: the text cannot be written\n";
         return parsed.status == cmpihost::exitDone ? cmpihost::exitCimStatus : parsed.status;
     }
     return parsed.status;

@@ -43,16 +43,19 @@ TEST(CommandLine, HasQuietDefaults) {
     EXPECT_EQ(line.schema, "");
     EXPECT_EQ(line.format, Format::Table);
     EXPECT_FALSE(line.log);
+    EXPECT_FALSE(line.bare);
 }
 
 TEST(CommandLine, TakesOptionsBeforeAndAfterTheOperation) {
     for (const auto& words : std::vector<std::vector<const char*>>{
-             {"--provider", "p.so", "--format", "json", "--log", "--schema=d", "ei", "X"},
-             {"ei", "X", "--format=json", "--log", "--schema", "d", "--provider", "p.so"}}) {
+             {"--provider", "p.so", "--format", "json", "--log", "--bare", "--schema=d", "ei", "X"},
+             {"ei", "X", "--format=json", "--log", "--bare", "--schema", "d", "--provider",
+              "p.so"}}) {
         const CommandLine line = accepted(words);
         EXPECT_EQ(line.provider, "p.so");
         EXPECT_EQ(line.format, Format::Json);
         EXPECT_TRUE(line.log);
+        EXPECT_TRUE(line.bare);
         EXPECT_EQ(line.schema, "d");
     }
     EXPECT_EQ(accepted({"--format", "mof", "ei", "X"}).format, Format::Mof);
@@ -78,7 +81,7 @@ TEST(CommandLine, RefusesAnotherFormOfThePicture) {
             EXPECT_FALSE(result.commandLine.has_value());
             EXPECT_EQ(result.status, exitUsage);
             EXPECT_EQ(result.text,
-                      "--format: tree draws a picture, it has no other form\n"
+                      "cmpihost: --format: tree draws a picture, it has no other form\n"
                       "Run cmpihost --help for more information.\n");
         }
     }
@@ -142,8 +145,8 @@ TEST(CommandLine, RefusesWhatItDoesNotKnow) {
         const ParsedCommandLine result = parsed(row.words);
         EXPECT_FALSE(result.commandLine.has_value()) << row.text;
         EXPECT_EQ(result.status, exitUsage) << row.text;
-        EXPECT_EQ(result.text,
-                  std::string(row.text) + "Run cmpihost --help for more information.\n");
+        EXPECT_EQ(result.text, std::string("cmpihost: ") + row.text +
+                                   "Run cmpihost --help for more information.\n");
     }
 }
 
@@ -164,13 +167,13 @@ TEST(CommandLine, RefusesAnEmptyValueHoweverItIsWritten) {
             const ParsedCommandLine result = parsed(words);
             EXPECT_FALSE(result.commandLine.has_value()) << option;
             EXPECT_EQ(result.status, exitUsage);
-            EXPECT_EQ(result.text, std::string(option) +
+            EXPECT_EQ(result.text, std::string("cmpihost: ") + option +
                                        ": the value is empty\n"
                                        "Run cmpihost --help for more information.\n");
         }
     }
     EXPECT_EQ(parsed({"xq", ""}).text,
-              "QUERY: the value is empty\nRun cmpihost --help for more information.\n");
+              "cmpihost: QUERY: the value is empty\nRun cmpihost --help for more information.\n");
     for (const char* option : {"--format=", "--computer-systems=", "--log="}) {
         EXPECT_EQ(parsed({option, "ei", "X"}).status, exitUsage) << option;
         EXPECT_FALSE(parsed({option, "ei", "X"}).commandLine.has_value()) << option;
@@ -204,6 +207,7 @@ TEST(CommandLine, DescribesEverythingInItsHelp) {
                              "--provider FILE",
                              "--format FORMAT",
                              "--log",
+                             "--bare",
                              "--schema DIR",
                              "--version",
                              "\nei\n",

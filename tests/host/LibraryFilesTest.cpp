@@ -12,6 +12,7 @@
 namespace {
 
 namespace fs = std::filesystem;
+using testing::EndsWith;
 using testing::HasSubstr;
 using testing::StartsWith;
 
@@ -68,7 +69,8 @@ TEST_F(LibraryFile, ThatIsNoLibraryExitsWithThree) {
 TEST_F(LibraryFile, ThatIsANamedPipeExitsWithThree) {
     const std::string pipe = (folder_ / "pipe\x1b[31m").string();
     ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0);
-    const std::string complaint = (folder_ / "pipe\\x1b[31m: not a regular file\n").string();
+    const std::string complaint =
+        "cmpihost: " + (folder_ / "pipe\\x1b[31m: not a regular file\n").string();
     EXPECT_EQ(load(pipe).status, 3);
     EXPECT_EQ(load(pipe).err, complaint);
     const ProgramRun companion =
@@ -88,7 +90,7 @@ TEST_F(LibraryFile, ThatIsCutOffExitsWithThree) {
         fs::resize_file(cut, size);
         const ProgramRun run = load(cut.string());
         EXPECT_EQ(run.status, 3) << size;
-        EXPECT_EQ(run.err, cut.string() + ": the file is cut off\n") << size;
+        EXPECT_EQ(run.err, "cmpihost: " + cut.string() + ": the file is cut off\n") << size;
     }
 }
 
@@ -97,8 +99,8 @@ TEST_F(LibraryFile, NamedLikeASchemaFileButAPipeExitsWithTwo) {
     const ProgramRun run = runProgram(
         KORVA_CMPIHOST, {"--provider", KORVA_STAND_IN, "--schema", folder_.string(), "ei", "X"});
     EXPECT_EQ(run.status, 2);
-    EXPECT_EQ(run.err,
-              "the schema file " + (folder_ / "x.mof").string() + " is not a regular file\n");
+    EXPECT_EQ(run.err, "cmpihost: the schema file " + (folder_ / "x.mof").string() +
+                           " is not a regular file\n");
 }
 
 TEST_F(LibraryFile, OfTheOtherWordSizeExitsWithThreeAndSaysSo) {
@@ -131,28 +133,56 @@ TEST_F(LibraryFile, WithoutFolderIsTakenFromTheCurrentOne) {
     EXPECT_THAT(run.out, HasSubstr(moonName));
 }
 
-TEST_F(LibraryFile, ThatIsNowhereAroundTheProgramExitsWithThreeAndTellsThePlaces) {
-    fs::create_directories(folder_ / "bin");
-    fs::copy_file(KORVA_CMPIHOST, folder_ / "bin/cmpihost");
-    fs::create_directories(folder_ / "share/korva-osstatus");
-    fs::copy(KORVA_SOURCE_DIR "/schema", folder_ / "share/korva-osstatus/schema");
-    const ProgramRun run = runProgram((folder_ / "bin/cmpihost").string(), {"ei", "X"});
-    EXPECT_EQ(run.status, 3);
-    EXPECT_THAT(run.err, StartsWith("no provider library was found; looked for\n"));
-    EXPECT_THAT(run.err,
-                HasSubstr((folder_ / "lib/libkorzbosstatusprofileprovider.so.1").string()));
+/// The program in a folder of its own, with the schema and nothing else around it.
+class ProgramElsewhere : public LibraryFile {
+  protected:
+    void SetUp() override {
+        LibraryFile::SetUp();
+        for (const char* folder : {"bin", "lib", "share/korva-osstatus"}) {
+            fs::create_directories(folder_ / folder);
+        }
+        fs::copy_file(KORVA_CMPIHOST, folder_ / "bin/cmpihost");
+        fs::copy(KORVA_SOURCE_DIR "/schema", folder_ / "share/korva-osstatus/schema");
+    }
+    ProgramRun cmpihost(const std::vector<std::string>& arguments) const {
+        return runProgram((folder_ / "bin/cmpihost").string(), arguments);
+    }
+    void install(const char* name) const { fs::copy_file(KORVA_STAND_IN, folder_ / "lib" / name); }
+};
+
+TEST_F(ProgramElsewhere, WithoutItsLibraryExitsWithThreeAndTellsThePlaces) {
+    const struct {
+        std::vector<std::string> arguments;
+        const char* complaint;
+        const char* place;
+    } rows[] = {{{"ei", "X"},
+                 "cmpihost: no library of the facade was found; looked for\n",
+                 "lib/libkorvaosstatusfacade.so.1\n"},
+                {{"--bare", "ei", "X"},
+                 "cmpihost: no library of the provider was found; looked for\n",
+                 "lib/libkorzbosstatusprofileprovider.so.1\n"}};
+    for (const auto& row : rows) {
+        const ProgramRun run = cmpihost(row.arguments);
+        EXPECT_EQ(run.status, 3);
+        EXPECT_THAT(run.err, StartsWith(row.complaint + ("  " + (folder_ / row.place).string())));
+        EXPECT_THAT(run.err, EndsWith("\n(--provider FILE names one)\n"));
+    }
 }
 
-TEST_F(LibraryFile, BesideTheProgramIsTakenWithoutBeingNamed) {
-    fs::create_directories(folder_ / "bin");
-    fs::create_directories(folder_ / "lib");
-    fs::copy_file(KORVA_CMPIHOST, folder_ / "bin/cmpihost");
-    fs::copy_file(KORVA_STAND_IN, folder_ / "lib/libkorzbosstatusprofileprovider.so.1");
-    const ProgramRun run =
-        runProgram((folder_ / "bin/cmpihost").string(),
-                   {"--schema", KORVA_SOURCE_DIR "/schema", "ein", "KORVA_OperatingSystem"});
+TEST_F(ProgramElsewhere, LoadsTheFacadeBesideItself) {
+    install("libkorvaosstatusfacade.so.1");
+    const ProgramRun run = cmpihost({"ein", "KORVA_OperatingSystem"});
     EXPECT_EQ(run.status, 0) << run.err;
     EXPECT_THAT(run.out, HasSubstr(moonName));
+    EXPECT_EQ(cmpihost({"--bare", "ein", "KORVA_OperatingSystem"}).status, 3);
+}
+
+TEST_F(ProgramElsewhere, LoadsTheProviderBesideItselfWhenItIsToAskThat) {
+    install("libkorzbosstatusprofileprovider.so.1");
+    const ProgramRun run = cmpihost({"--bare", "ein", "KORVA_OperatingSystem"});
+    EXPECT_EQ(run.status, 0) << run.err;
+    EXPECT_THAT(run.out, HasSubstr(moonName));
+    EXPECT_EQ(cmpihost({"ein", "KORVA_OperatingSystem"}).status, 3);
 }
 
 }  // namespace

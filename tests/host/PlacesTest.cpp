@@ -22,7 +22,7 @@ class Places : public testing::Test {
     }
     void TearDown() override { fs::remove_all(prefix_); }
     void touch(const char* file) { std::ofstream(prefix_ / file) << ""; }
-    fs::path found() { return findProvider(prefix_ / "bin"); }
+    fs::path found() { return findLibrary(Library::Provider, prefix_ / "bin"); }
 
     fs::path prefix_;
 };
@@ -47,17 +47,35 @@ TEST_F(Places, KnowTheFolderThatTheProvidersAreInstalledIn) {
     fs::create_directories(prefix_ / "agents");
     touch("lib/cmpi/libkorzbosstatusprofileprovider.so");
     touch("lib/cmpi/libkorvacomputersystemprovider.so");
-    EXPECT_EQ(findProvider(prefix_ / "bin", "agents"),
+    EXPECT_EQ(findLibrary(Library::Provider, prefix_ / "bin", "agents"),
               prefix_ / "lib/cmpi/libkorzbosstatusprofileprovider.so");
     touch("agents/libkorzbosstatusprofileprovider.so");
     touch("agents/libkorvacomputersystemprovider.so");
     for (const fs::path& installed : {fs::path("agents"), prefix_ / "agents"}) {
-        EXPECT_EQ(findProvider(prefix_ / "bin", installed),
+        EXPECT_EQ(findLibrary(Library::Provider, prefix_ / "bin", installed),
                   prefix_ / "agents/libkorzbosstatusprofileprovider.so");
-        EXPECT_EQ(findCompanion(prefix_ / "bin", installed),
+        EXPECT_EQ(findLibrary(Library::Companion, prefix_ / "bin", installed),
                   prefix_ / "agents/libkorvacomputersystemprovider.so");
     }
     EXPECT_EQ(installedProviderFolder(), KORVA_CMPI_FOLDER);
+}
+
+TEST_F(Places, HoldTheFacadeBesideTheProvider) {
+    touch("lib/libkorzbosstatusprofileprovider.so.1");
+    EXPECT_EQ(findLibrary(Library::Facade, prefix_ / "bin"), "");
+    touch("lib/libkorvaosstatusfacade.so.1");
+    EXPECT_EQ(findLibrary(Library::Facade, prefix_ / "bin"),
+              prefix_ / "lib/libkorvaosstatusfacade.so.1");
+}
+
+TEST_F(Places, TellTheNameOfAProviderByTheFileOfItsLibrary) {
+    for (const char* file : {"libkorvaosstatusfacade.so", "/x/libkorvaosstatusfacade.so.1"}) {
+        EXPECT_EQ(providerName(file), "OSStatusFacade") << file;
+    }
+    for (const char* file :
+         {"libkorzbosstatusprofileprovider.so.1", "/libkorvaosstatusfacade.so/other.so", "x.so"}) {
+        EXPECT_EQ(providerName(file), "OperatingSystemProvider") << file;
+    }
 }
 
 TEST_F(Places, DoNotTakeAFolderForALibrary) {

@@ -76,8 +76,48 @@ TEST(Program, PrintsAnEmptyResult) {
     EXPECT_EQ(withStandIn({"ei", "Unknown"}).status, 0);
 }
 
+TEST(Program, CompletesAPathThatOneInstanceFits) {
+    for (const char* given : {"KORVA_OperatingSystem", "KORVA_OperatingSystem.CSName=\"moon\""}) {
+        const ProgramRun run = withStandIn({"gi", given});
+        EXPECT_EQ(run.status, 0);
+        EXPECT_THAT(run.out, StartsWith(moonPath));
+        EXPECT_EQ(run.err, "cmpihost: completed the path: " + std::string(moonPath) + "\n");
+    }
+}
+
+TEST(Program, CompletesNoPathThatNoneOrSeveralInstancesFit) {
+    const ProgramRun none = withStandIn({"gi", "KORVA_OperatingSystem.CSName=\"sun\""});
+    EXPECT_EQ(none.status, 2);
+    EXPECT_EQ(none.out, "");
+    EXPECT_EQ(none.err,
+              "cmpihost: the path lacks keys, and no instance of KORVA_OperatingSystem has those "
+              "that it gives; there is\n  " +
+                  std::string(moonPath) + "\n");
+    const ProgramRun several =
+        withStandIn({"--computer-systems", "2", "ain", "KORVA_ComputerSystem"});
+    EXPECT_EQ(several.status, 2);
+    EXPECT_EQ(several.out, "");
+    EXPECT_THAT(several.err, StartsWith("cmpihost: the path lacks keys, and 2 instances of "
+                                        "KORVA_ComputerSystem have those that it gives:\n"
+                                        "  root/cimv2:KORVA_ComputerSystem."));
+}
+
+TEST(Program, ThatCannotLookForKeysTellsWhy) {
+    const ProgramRun run = withStandIn({"gi", "KORVA_OSElementCapabilities"});
+    EXPECT_EQ(run.status, 1);
+    EXPECT_EQ(run.err, "cmpihost: CIM_ERR_ACCESS_DENIED (2)\n");
+}
+
+TEST(Program, LeavesPathsAsTheyAreWhenToldSo) {
+    for (const char* operation : {"gi", "ain"}) {
+        const ProgramRun run = withStandIn({"--bare", operation, "KORVA_OperatingSystem"});
+        EXPECT_EQ(run.status, 0);
+        EXPECT_THAT(run.err, testing::Not(HasSubstr("completed")));
+    }
+}
+
 TEST(Program, NotesThatNoInstanceWasReturned) {
-    const ProgramRun run = withStandIn({"gi", "KORVA_OperatingSystem.CSName=\"sun\""});
+    const ProgramRun run = withStandIn({"--bare", "gi", "KORVA_OperatingSystem.CSName=\"sun\""});
     EXPECT_EQ(run.status, 0);
     EXPECT_EQ(run.out, "");
     EXPECT_EQ(run.err,
@@ -91,30 +131,30 @@ struct Failure {
 };
 
 const Failure failures[] = {
-    {"DeleteInstance", {"di", "X.A=1"}, "CIM_ERR_NOT_SUPPORTED (7)\n"},
+    {"DeleteInstance", {"di", "X.A=1"}, "cmpihost: CIM_ERR_NOT_SUPPORTED (7)\n"},
     {"ModifyInstance",
      {"mi", "KORVA_OperatingSystem.Name=\"x\"", "Version=2", "OSType=36"},
-     "CIM_ERR_NOT_SUPPORTED (7): properties Version,OSType\n"},
+     "cmpihost: CIM_ERR_NOT_SUPPORTED (7): properties Version,OSType\n"},
     {"CreateInstance",
      {"ci", "KORVA_OperatingSystem", "OSType=36"},
-     "CMPI status 150: OSType 36\n"},
+     "cmpihost: CMPI status 150: OSType 36\n"},
     {"ExecQuery",
      {"xq", "SELECT * FROM Thing", "--lang", "CQL", "--namespace", "interop"},
-     "CIM_ERR_INVALID_QUERY (15): CQL|SELECT * FROM Thing|interop|Thing\n"},
+     "cmpihost: CIM_ERR_INVALID_QUERY (15): CQL|SELECT * FROM Thing|interop|Thing\n"},
     {"Associators",
      {"ai", "X.A=1", "P", "--assoc-class", "a", "--result-class", "b", "--role", "c",
       "--result-role", "d"},
-     "CIM_ERR_FAILED (1): a|b|c|d|P\n"},
-    {"AssociatorsWithoutFilters", {"ai", "X.A=1"}, "CIM_ERR_FAILED (1): -|-|-|-|all\n"},
+     "cmpihost: CIM_ERR_FAILED (1): a|b|c|d|P\n"},
+    {"AssociatorsWithoutFilters", {"ai", "X.A=1"}, "cmpihost: CIM_ERR_FAILED (1): -|-|-|-|all\n"},
     {"References",
      {"ri", "X.A=1", "--result-class", "b", "--role", "c", "--properties", "P,Q"},
-     "CIM_ERR_FAILED (1): b|c|P,Q\n"},
+     "cmpihost: CIM_ERR_FAILED (1): b|c|P,Q\n"},
     {"ResultsBeforeAFailureAreDropped",
      {"ei", "KORVA_OperatingSystemCapabilities"},
-     "CIM_ERR_FAILED (1): properties all\\x1b[31m\n"},
+     "cmpihost: CIM_ERR_FAILED (1): properties all\\x1b[31m\n"},
     {"Exception",
      {"ei", "KORVA_RunningOS"},
-     "CIM_ERR_FAILED (1): an exception left the provider: the moon is down\n"},
+     "cmpihost: CIM_ERR_FAILED (1): an exception left the provider: the moon is down\n"},
 };
 
 class ProgramFailure : public testing::TestWithParam<Failure> {};
@@ -159,24 +199,27 @@ TEST(Program, ShowsAMalformedNamespaceWithACaret) {
         const ProgramRun run = withStandIn(words);
         EXPECT_EQ(run.status, 2);
         EXPECT_EQ(run.out, "");
-        EXPECT_EQ(run.err,
-                  "expected a name before '/' in the namespace\n  root//cimv2\n       ^\n");
+        EXPECT_EQ(
+            run.err,
+            "cmpihost: expected a name before '/' in the namespace\n  root//cimv2\n       ^\n");
     }
 }
 
 TEST(Program, RefusesWrongUsage) {
     EXPECT_EQ(cmpihost({}).status, 2);
     EXPECT_EQ(cmpihost({}).err,
-              "An operation is required\nRun cmpihost --help for more information.\n");
+              "cmpihost: An operation is required\nRun cmpihost --help for more information.\n");
     const ProgramRun unknown = withStandIn({"ci", "KORVA_OperatingSystem", "Colour=red"});
     EXPECT_EQ(unknown.status, 2);
-    EXPECT_EQ(unknown.err, "the class 'KORVA_OperatingSystem' has no property 'Colour'\n");
+    EXPECT_EQ(unknown.err,
+              "cmpihost: the class 'KORVA_OperatingSystem' has no property 'Colour'\n");
 }
 
 TEST(Program, RefusesASchemaFolderWithoutClasses) {
     const ProgramRun run = withStandIn({"--schema", "/nowhere", "ei", "X"});
     EXPECT_EQ(run.status, 2);
-    EXPECT_EQ(run.err, "the schema folder /nowhere cannot be read: No such file or directory\n");
+    EXPECT_EQ(run.err,
+              "cmpihost: the schema folder /nowhere cannot be read: No such file or directory\n");
 }
 
 TEST(Program, TakesAnotherSchemaFolder) {
@@ -200,7 +243,7 @@ TEST(Program, SaysThatResultsCannotBeWritten) {
         "/bin/sh", {"-c", "exec \"$0\" --provider \"$1\" ein KORVA_OperatingSystem > /dev/full",
                     KORVA_CMPIHOST, KORVA_STAND_IN});
     EXPECT_EQ(run.status, 1);
-    EXPECT_EQ(run.err, "the results cannot be written\n");
+    EXPECT_EQ(run.err, "cmpihost: the results cannot be written\n");
 }
 
 TEST(Program, SaysThatHelpAndVersionCannotBeWritten) {
@@ -208,7 +251,7 @@ TEST(Program, SaysThatHelpAndVersionCannotBeWritten) {
         const ProgramRun run = runProgram(
             "/bin/sh", {"-c", std::string("exec \"$0\" ") + redirection, KORVA_CMPIHOST});
         EXPECT_EQ(run.status, 1) << redirection;
-        EXPECT_EQ(run.err, "the text cannot be written\n") << redirection;
+        EXPECT_EQ(run.err, "cmpihost: the text cannot be written\n") << redirection;
     }
 }
 

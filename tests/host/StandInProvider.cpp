@@ -87,6 +87,8 @@ CMPIStatus EnumInstanceNames(CMPIInstanceMI*, const CMPIContext* context, const 
         returnComputerSystems(context, result, path);
     } else if (asksFor(path, "KORVA_OperatingSystem")) {
         CMReturnObjectPath(result, operatingSystemPath(path));
+    } else if (asksFor(path, "KORVA_OSElementCapabilities")) {
+        return status(CMPI_RC_ERR_ACCESS_DENIED);
     }
     return done(result);
 }
@@ -182,3 +184,5 @@ CMPIStatus ReferenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResu
 
 CMInstanceMIStub(, OperatingSystemProvider, broker, CMNoHook)
     CMAssociationMIStub(, OperatingSystemProvider, broker, CMNoHook)
+        CMInstanceMIStub(, OSStatusFacade, broker, CMNoHook)
+            CMAssociationMIStub(, OSStatusFacade, broker, CMNoHook)

@@ -1,0 +1,23 @@
+#pragma once
+
+#include <vector>
+
+#include "host/broker/ClassCatalogue.h"
+#include "host/broker/Operation.h"
+
+namespace cmpihost {
+
+/// Whether a request is about one instance, to get it or to start from it, and its path does not
+/// give every key that the catalogue declares for the class.
+bool lacksKeys(const OperationRequest& request, const ClassCatalogue& catalogue);
+
+/// The request for the names of all instances of the path's class.
+OperationRequest namesRequest(const ObjectPathValue& path);
+
+/// The one of `names` that has the keys which the path gives. Texts compare without case and stay
+/// as the path gives them: whether that is the same is for those to decide who answer. Throws
+/// UsageError, with the names that there are, when none or several have the keys.
+ObjectPathValue completedPath(const ObjectPathValue& path,
+                              const std::vector<ObjectPathValue>& names);
+
+}  // namespace cmpihost
