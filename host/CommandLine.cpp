@@ -51,7 +51,8 @@ constexpr OperationWord words[] = {
 
 constexpr const char* description =
     "Embedded CIM host: loads a CMPI provider library as an object manager does, runs one\n"
-    "operation on it and prints what it returns.";
+    "operation on it and prints what it returns. It loads the facade, which asks the provider\n"
+    "and has the manners that WBEM clients expect.";
 
 constexpr const char* pathHelp =
     "Paths:\n"
@@ -67,7 +68,7 @@ constexpr const char* statusHelp =
     "  0  done\n"
     "  1  the provider answered a CIM status other than OK, named on the standard error, or the\n"
     "     results cannot be written\n"
-    "  2  wrong usage\n"
+    "  2  wrong usage, or a path that lacks keys and that none or several instances fit\n"
     "  3  the library does not load\n"
     "\n"
     "What the host catches the provider at (a null result, an undeclared property, an object used\n"
