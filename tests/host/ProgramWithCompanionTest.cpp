@@ -6,6 +6,7 @@
 
 namespace {
 
+using testing::EndsWith;
 using testing::HasSubstr;
 using testing::Not;
 using testing::StartsWith;
@@ -41,7 +42,6 @@ TEST(ProgramWithCompanion, AnswersUpCallsWithTheComputerSystem) {
     const ProgramRun run =
         cmpihost({"ai", "KORVA_OperatingSystem", "--assoc-class", "KORVA_InstalledOS"});
     EXPECT_EQ(run.status, 0);
-    EXPECT_EQ(run.err, "");
     EXPECT_THAT(run.out, HasSubstr("  Name               " + nodeName() + "\n"));
     EXPECT_THAT(run.out, HasSubstr("  NameFormat         Other\n"));
 }
@@ -67,14 +67,47 @@ TEST(ProgramWithCompanion, WithoutAComputerSystemAssociationsAreEmpty) {
                 StartsWith("no KORVA_ComputerSystem, so nothing is associated\n"));
 }
 
-TEST(ProgramWithCompanion, OfSeveralComputerSystemsTheLastIsNotReported) {
-    const ProgramRun run = cmpihost({"--computer-systems", "3", "ain", "KORVA_OperatingSystem",
-                                     "--assoc-class", "KORVA_RunningOS"});
+TEST(ProgramWithCompanion, OfSeveralComputerSystemsTheLastIsNotReportedByTheProvider) {
+    const ProgramRun run = cmpihost({"--bare", "--computer-systems", "3", "ain",
+                                     "KORVA_OperatingSystem", "--assoc-class", "KORVA_RunningOS"});
     EXPECT_EQ(run.status, 0);
     EXPECT_EQ(count("root/cimv2:KORVA_ComputerSystem.", run.out), 2U);
     EXPECT_THAT(run.out, HasSubstr("Name=\"" + nodeName() + "-2\""));
-    EXPECT_EQ(count(" (KORVA_ComputerSystem)\n", cmpihost({"--computer-systems", "3", "tree"}).out),
-              3U);
+}
+
+TEST(ProgramWithCompanion, OfSeveralComputerSystemsOnlyThePairedOneIsAnAssociator) {
+    const ProgramRun run = cmpihost({"--computer-systems", "3", "ain", "KORVA_OperatingSystem",
+                                     "--assoc-class", "KORVA_RunningOS"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_EQ(run.out,
+              "root/cimv2:KORVA_ComputerSystem.CreationClassName=\"KORVA_ComputerSystem\",Name=\"" +
+                  nodeName() + "\"\n");
+}
+
+TEST(ProgramWithCompanion, DrawsTheSameWithTheFacadeAsWithout) {
+    for (const char* number : {"0", "1", "3"}) {
+        const ProgramRun run = cmpihost({"--computer-systems", number, "tree"});
+        EXPECT_EQ(run.status, 0);
+        EXPECT_EQ(run.out, cmpihost({"--bare", "--computer-systems", number, "tree"}).out);
+        EXPECT_EQ(count(" (KORVA_ComputerSystem)\n", run.out), std::stoul(number));
+    }
+}
+
+TEST(ProgramWithCompanion, CompletesThePathOfAComputerSystemFromTheCompanionsNames) {
+    const ProgramRun run =
+        cmpihost({"ain", "KORVA_ComputerSystem", "--assoc-class", "KORVA_RunningOS"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_THAT(run.out, StartsWith("root/cimv2:KORVA_OperatingSystem."));
+    EXPECT_EQ(run.err,
+              "cmpihost: completed the path: root/cimv2:KORVA_ComputerSystem.CreationClassName="
+              "\"KORVA_ComputerSystem\",Name=\"" +
+                  nodeName() + "\"\n");
+    const ProgramRun several =
+        cmpihost({"--computer-systems", "12", "ain", "KORVA_ComputerSystem"});
+    EXPECT_EQ(several.status, 2);
+    EXPECT_EQ(several.out, "");
+    EXPECT_THAT(several.err, HasSubstr("and 12 instances of KORVA_ComputerSystem have those"));
+    EXPECT_THAT(several.err, EndsWith("\n  and 2 more\n"));
 }
 
 TEST(ProgramWithCompanion, CompanionThatDoesNotLoadExitsWithThree) {

@@ -75,26 +75,29 @@ TEST(ProgramWithProvider, WalksAnAssociation) {
 }
 
 TEST(ProgramWithProvider, NamesTheStatusOfARefusal) {
-    const ProgramRun references = cmpihost({"ri", "KORVA_OperatingSystem.Name=\"x\""});
-    EXPECT_EQ(references.status, 1);
-    EXPECT_EQ(references.err, "CIM_ERR_NOT_SUPPORTED (7)\n");
-    const ProgramRun unknown = cmpihost({"ei", "KORVA_Unknown"});
+    for (const char* operation : {"ri", "rin"}) {
+        const ProgramRun references =
+            cmpihost({"--bare", operation, "KORVA_OperatingSystem.Name=\"x\""});
+        EXPECT_EQ(references.status, 1);
+        EXPECT_EQ(references.err, "cmpihost: CIM_ERR_NOT_SUPPORTED (7)\n");
+    }
+    const ProgramRun unknown = cmpihost({"--bare", "ei", "KORVA_Unknown"});
     EXPECT_EQ(unknown.status, 1);
-    EXPECT_EQ(unknown.err, "CIM_ERR_INVALID_CLASS (5)\n");
+    EXPECT_EQ(unknown.err, "cmpihost: CIM_ERR_INVALID_CLASS (5)\n");
 }
 
-TEST(ProgramWithProvider, TellsHowToNameTheAssociation) {
+TEST(ProgramWithProvider, TellsHowToNameTheAssociationThatTheProviderNeeds) {
     for (const char* operation : {"ai", "ain"}) {
-        const ProgramRun run = cmpihost({operation, "KORVA_OperatingSystem"});
+        const ProgramRun run = cmpihost({"--bare", operation, "KORVA_OperatingSystem"});
         EXPECT_EQ(run.status, 1);
         EXPECT_EQ(run.err,
-                  "CIM_ERR_INVALID_CLASS (5)\n"
+                  "cmpihost: CIM_ERR_INVALID_CLASS (5)\n"
                   "hint: name the association with --assoc-class, one of KORVA_InstalledOS, "
                   "KORVA_OSElementCapabilities, KORVA_RunningOS\n");
     }
     const ProgramRun named =
-        cmpihost({"ain", "KORVA_OperatingSystem", "--assoc-class", "CIM_RunningOS"});
-    EXPECT_EQ(named.err, "CIM_ERR_INVALID_CLASS (5)\n");
+        cmpihost({"--bare", "ain", "KORVA_OperatingSystem", "--assoc-class", "CIM_RunningOS"});
+    EXPECT_EQ(named.err, "cmpihost: CIM_ERR_INVALID_CLASS (5)\n");
 }
 
 TEST(ProgramWithProvider, ShowsTheRecordsOnlyWhenAskedTo) {
