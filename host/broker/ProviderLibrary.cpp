@@ -6,6 +6,7 @@
 #include "host/broker/Request.h"
 
 #include <dlfcn.h>
+#include <utility>
 
 namespace cmpihost {
 
@@ -141,20 +142,17 @@ void ProviderLibrary::load() {
 bool ProviderLibrary::unload(bool terminating) {
     if (!loaded()) return true;
     // The library goes even if cleanup throws.
-    LibraryHandle handle(handle_);
-    {
-        Request request(broker_);
-        const CMPIContext* const context = request.makeContext({}, {});
-        const bool instanceGoes = cleanUp(interfaces_.instance, broker_, context, terminating);
-        const bool associationGoes =
-            cleanUp(interfaces_.association, broker_, context, terminating);
-        if (!terminating && !(instanceGoes && associationGoes)) {
-            handle.release();
-            return false;
-        }
+    LibraryHandle handle(std::exchange(handle_, nullptr));
+    const ManagementInterfaces going = std::exchange(interfaces_, {});
+    Request request(broker_);
+    const CMPIContext* const context = request.makeContext({}, {});
+    const bool instanceGoes = cleanUp(going.instance, broker_, context, terminating);
+    const bool associationGoes = cleanUp(going.association, broker_, context, terminating);
+    if (!terminating && !(instanceGoes && associationGoes)) {
+        interfaces_ = going;
+        handle_ = handle.release();
+        return false;
     }
-    interfaces_ = {};
-    handle_ = nullptr;
     return true;
 }
 

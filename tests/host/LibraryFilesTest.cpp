@@ -2,6 +2,7 @@
 #include <gmock/gmock.h>
 #include <link.h>
 #include <sys/stat.h>
+#include <sys/utsname.h>
 
 #include <algorithm>
 #include <filesystem>
@@ -175,6 +176,20 @@ TEST_F(ProgramElsewhere, LoadsTheFacadeBesideItself) {
     EXPECT_EQ(run.status, 0) << run.err;
     EXPECT_THAT(run.out, HasSubstr(moonName));
     EXPECT_EQ(cmpihost({"--bare", "ein", "KORVA_OperatingSystem"}).status, 3);
+}
+
+TEST_F(ProgramElsewhere, ServesComputerSystemsItselfWithoutACompanion) {
+    install("libkorvaosstatusfacade.so.1");
+    utsname names{};
+    ASSERT_EQ(uname(&names), 0);
+    const std::string start =
+        "root/cimv2:KORVA_ComputerSystem.CreationClassName=\"KORVA_ComputerSystem\",Name=\"" +
+        std::string(names.nodename);
+    const std::string first = start + "\"\n";
+    EXPECT_EQ(cmpihost({"ein", "KORVA_ComputerSystem"}).out, first);
+    EXPECT_EQ(cmpihost({"--computer-systems", "0", "ein", "KORVA_ComputerSystem"}).out, "");
+    EXPECT_EQ(cmpihost({"--computer-systems", "3", "ein", "KORVA_ComputerSystem"}).out,
+              first + start + "-2\"\n" + start + "-3\"\n");
 }
 
 TEST_F(ProgramElsewhere, LoadsTheProviderBesideItselfWhenItIsToAskThat) {

@@ -43,6 +43,13 @@ TEST(PathParser, TakesNamespaceAndHost) {
     EXPECT_EQ(path.keys.at(0).value, Value("a"));
 }
 
+TEST(PathParser, TakesNamesOfLettersDigitsAndUnderlines) {
+    for (const char* name : {"azAZ_09", "_x", "Zebra", "\xC4\x80pfel", "x\xC4\x80"}) {
+        EXPECT_EQ(parsed(name).className, name);
+        EXPECT_EQ(parsed(std::string("X.") + name + "=1").keys.at(0).name, name);
+    }
+}
+
 TEST(PathParser, KeepsTheOrderAndTheSpellingOfKeys) {
     const ObjectPathValue path = parsed("x.zeta=\"1\",Alpha=\"2\"");
     ASSERT_EQ(path.keys.size(), 2U);

@@ -155,6 +155,9 @@ const Failure failures[] = {
     {"Exception",
      {"ei", "KORVA_RunningOS"},
      "cmpihost: CIM_ERR_FAILED (1): an exception left the provider: the moon is down\n"},
+    {"ExceptionOfAnyType",
+     {"ei", "KORVA_OSElementCapabilities"},
+     "cmpihost: CIM_ERR_FAILED (1): an exception left the provider: of an unknown type\n"},
 };
 
 class ProgramFailure : public testing::TestWithParam<Failure> {};
@@ -168,6 +171,48 @@ TEST_P(ProgramFailure, NamesTheStatusAndExitsWithOne) {
 
 INSTANTIATE_TEST_SUITE_P(Program, ProgramFailure, testing::ValuesIn(failures),
                          [](const auto& row) { return std::string(row.param.name); });
+
+TEST(Program, PrintsThePathOfWhatItCreated) {
+    const ProgramRun run = withStandIn({"--format", "json", "ci", "Changeable", "A=1"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_EQ(run.out,
+              "[\n  {\n    \"class\": \"Changeable\",\n"
+              "    \"path\": \"root/cimv2:Changeable\"\n  }\n]\n");
+}
+
+TEST(Program, PrintsNothingOfWhatItChanged) {
+    for (const std::vector<std::string>& change :
+         {std::vector<std::string>{"mi", "Changeable.A=1", "B=2"}, {"di", "Changeable.A=1"}}) {
+        const ProgramRun run = withStandIn(change);
+        EXPECT_EQ(run.status, 0);
+        EXPECT_EQ(run.out, "");
+        EXPECT_EQ(withStandIn({"--format", "json", change[0], change[1]}).out, "");
+    }
+}
+
+TEST(Program, TellsHowTheLibrariesCleanedUp) {
+    const std::vector<std::string> request = {"--provider",  KORVA_STAND_IN,
+                                              "--companion", KORVA_STAND_IN,
+                                              "ein",         "KORVA_OperatingSystem"};
+    const ProgramRun failing = runProgram(KORVA_CMPIHOST, request, {"STAND_IN_CLEANUP=fails"});
+    EXPECT_EQ(failing.status, 0);
+    EXPECT_EQ(failing.err,
+              "caught: cleanup answered status 1\n"
+              "caught: cleanup answered status 1\n"
+              "caught: cleanup answered status 1\n");
+    const ProgramRun throwing = runProgram(KORVA_CMPIHOST, request, {"STAND_IN_CLEANUP=throws"});
+    EXPECT_EQ(throwing.status, 0);
+    EXPECT_THAT(throwing.err, StartsWith("caught: an exception left cleanup\n"));
+}
+
+TEST(Program, SaysWhyRecordsCannotBeShown) {
+    const ProgramRun run =
+        runProgram("/bin/sh", {"-c",
+                               "(trap '' XFSZ; ulimit -f 0; \"$0\" --provider \"$1\" --log ein X; "
+                               "echo \"status $?\") 2>&1 | cat",
+                               KORVA_CMPIHOST, KORVA_STAND_IN});
+    EXPECT_EQ(run.out, "cmpihost: the records cannot be shown: File too large\nstatus 2\n");
+}
 
 TEST(Program, ServesTheComputerSystemToTheProvidersUpCalls) {
     utsname names{};
@@ -253,6 +298,9 @@ TEST(Program, SaysThatHelpAndVersionCannotBeWritten) {
         EXPECT_EQ(run.status, 1) << redirection;
         EXPECT_EQ(run.err, "cmpihost: the text cannot be written\n") << redirection;
     }
+    EXPECT_EQ(
+        runProgram("/bin/sh", {"-c", "exec \"$0\" unknown 2> /dev/full", KORVA_CMPIHOST}).status,
+        2);
 }
 
 TEST(Program, NotesListedNamesThatTheClassDoesNotDeclare) {

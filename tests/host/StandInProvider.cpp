@@ -2,6 +2,7 @@
 // is asked for, and what it was asked comes back in the message of a failure.
 #include <cmpi/cmpimacs.h>
 
+#include <cstdlib>
 #include <stdexcept>
 #include <string>
 
@@ -77,8 +78,17 @@ void returnComputerSystems(const CMPIContext* context, const CMPIResult* result,
     }
 }
 
+/// Cleans up as the environment says: with a failure, an exception, or well.
+CMPIStatus cleanedUp() {
+    const char* const manner = std::getenv("STAND_IN_CLEANUP");
+    if (manner != nullptr && std::string(manner) == "throws") {
+        throw std::runtime_error("not now");
+    }
+    return status(manner == nullptr ? CMPI_RC_OK : CMPI_RC_ERR_FAILED);
+}
+
 CMPIStatus Cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
-    return status(CMPI_RC_OK);
+    return cleanedUp();
 }
 
 CMPIStatus EnumInstanceNames(CMPIInstanceMI*, const CMPIContext* context, const CMPIResult* result,
@@ -97,6 +107,9 @@ CMPIStatus EnumInstances(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* 
                          const CMPIObjectPath* path, const char** properties) {
     if (asksFor(path, "KORVA_RunningOS")) {
         throw std::runtime_error("the moon is down");
+    }
+    if (asksFor(path, "KORVA_OSElementCapabilities")) {
+        throw 5;
     }
     if (asksFor(path, "KORVA_InstalledOS")) {
         CMReturnInstance(result, nullptr);
@@ -124,8 +137,12 @@ CMPIStatus GetInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* re
     return done(result);
 }
 
-CMPIStatus CreateInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
-                          const CMPIObjectPath*, const CMPIInstance* instance) {
+CMPIStatus CreateInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
+                          const CMPIObjectPath* path, const CMPIInstance* instance) {
+    if (asksFor(path, "Changeable")) {
+        CMReturnObjectPath(result, path);
+        return done(result);
+    }
     CMPIStatus found = status(CMPI_RC_OK);
     const CMPIData type = CMGetProperty(instance, "OSType", &found);
     const std::string seen =
@@ -133,14 +150,18 @@ CMPIStatus CreateInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*
     return failure(static_cast<CMPIrc>(150), "OSType " + seen);
 }
 
-CMPIStatus ModifyInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
-                          const CMPIObjectPath*, const CMPIInstance*, const char** properties) {
+CMPIStatus ModifyInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
+                          const CMPIObjectPath* path, const CMPIInstance*,
+                          const char** properties) {
+    if (asksFor(path, "Changeable")) {
+        return done(result);
+    }
     return failure(CMPI_RC_ERR_NOT_SUPPORTED, "properties " + joined(properties));
 }
 
-CMPIStatus DeleteInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
-                          const CMPIObjectPath*) {
-    return status(CMPI_RC_ERR_NOT_SUPPORTED);
+CMPIStatus DeleteInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
+                          const CMPIObjectPath* path) {
+    return asksFor(path, "Changeable") ? done(result) : status(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 CMPIStatus ExecQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
@@ -150,7 +171,7 @@ CMPIStatus ExecQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
 }
 
 CMPIStatus AssociationCleanup(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) {
-    return status(CMPI_RC_OK);
+    return cleanedUp();
 }
 
 CMPIStatus Associators(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
@@ -186,3 +207,4 @@ CMInstanceMIStub(, OperatingSystemProvider, broker, CMNoHook)
     CMAssociationMIStub(, OperatingSystemProvider, broker, CMNoHook)
         CMInstanceMIStub(, OSStatusFacade, broker, CMNoHook)
             CMAssociationMIStub(, OSStatusFacade, broker, CMNoHook)
+                CMInstanceMIStub(, ComputerSystemProvider, broker, CMNoHook)

@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include "host/Utf8.h"
+
 namespace {
 
 using cmpihost::terminalText;
@@ -20,10 +22,22 @@ TEST(TerminalText, WritesControlCharactersOut) {
               "\\x9b31m");
 }
 
-TEST(TerminalText, WritesOutWhatTurnsTheDirectionOfWriting) {
-    EXPECT_EQ(terminalText("a\xE2\x80\xAE"
-                           "b"),
-              "a\\u202eb");
+TEST(TerminalText, WritesOutWhatSteersTheTerminalOrTheLayoutAndNoNeighbourOfIt) {
+    const struct {
+        std::uint32_t code;
+        const char* written;  // null: the character itself
+    } rows[] = {{0x1F, "\\x1f"},     {0x20, nullptr},     {0x7E, nullptr},     {0x7F, "\\x7f"},
+                {0x80, "\\x80"},     {0x9F, "\\x9f"},     {0xA0, nullptr},     {0x200D, nullptr},
+                {0x200E, "\\u200e"}, {0x200F, "\\u200f"}, {0x2010, nullptr},   {0x2027, nullptr},
+                {0x2028, "\\u2028"}, {0x202A, "\\u202a"}, {0x202E, "\\u202e"}, {0x202F, nullptr},
+                {0x2065, nullptr},   {0x2066, "\\u2066"}, {0x2069, "\\u2069"}, {0x206A, nullptr}};
+    for (const auto& row : rows) {
+        std::string character;
+        cmpihost::appendUtf8(character, row.code);
+        EXPECT_EQ(terminalText("a" + character + "b"),
+                  "a" + (row.written == nullptr ? character : row.written) + "b")
+            << row.code;
+    }
 }
 
 TEST(TerminalText, WritesOutBytesThatAreNoCharacters) {

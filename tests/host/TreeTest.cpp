@@ -1,6 +1,8 @@
 #include "host/Tree.h"
 
 #include <gtest/gtest.h>
+#include <stdlib.h>
+#include <time.h>
 
 #include <sstream>
 
@@ -21,11 +23,7 @@ class FakeHost {
             if (hasComputer)
                 result.instances = {instance("KORVA_ComputerSystem", {{"Name", "vm"}})};
         } else if (wanted == "KORVA_OSElementCapabilities") {
-            result.instances = {
-                instance("KORVA_OperatingSystemCapabilities",
-                         {{"InstanceID", "Linux"},
-                          {"ElementNameEditSupported", Value::fromBoolean(false)},
-                          {"HostShutdownBehavior", Value::fromUnsigned(3, CMPI_uint16)}})};
+            result.instances = {instance("KORVA_OperatingSystemCapabilities", capabilities)};
         } else {
             result.instances = {instance("KORVA_OperatingSystem", system)};
         }
@@ -38,6 +36,10 @@ class FakeHost {
                                       {"Version", "12"},
                                       {"EnabledState", Value::fromUnsigned(2, CMPI_uint16)},
                                       {"HealthState", Value::fromUnsigned(5, CMPI_uint16)}};
+    std::vector<NamedValue> capabilities = {
+        {"InstanceID", "Linux"},
+        {"ElementNameEditSupported", Value::fromBoolean(false)},
+        {"HostShutdownBehavior", Value::fromUnsigned(3, CMPI_uint16)}};
 
   private:
     static InstanceValue instance(const std::string& className,
@@ -66,6 +68,30 @@ TEST(Tree, ShowsWhatIsInstalledAndRunningOnTheComputer) {
 └── KORVA_RunningOS
     └── Linux 12 (KORVA_OperatingSystem): Enabled, health OK, up since (not known)
 )");
+}
+
+TEST(Tree, NamesWhatItKnowsAndNumbersWhatItCannotName) {
+    FakeHost host;
+    host.system = {{"Name", "Linux"},
+                   {"InstallDate", "20240102030405.000000+000"},
+                   {"EnabledState", Value::fromUnsigned(40000, CMPI_uint16)},
+                   {"HealthState", Value::null(CMPI_uint16)},
+                   {"LastBootUpTime", "not a date"}};
+    host.capabilities = {{"ElementNameEditSupported", Value::fromBoolean(true)},
+                         {"HostShutdownBehavior", Value::fromUnsigned(65000, CMPI_uint16)}};
+    setenv("TZ", "UTC0", 1);
+    tzset();
+    EXPECT_EQ(drawn(host), R"(vm (KORVA_ComputerSystem)
+├── KORVA_InstalledOS
+│   └── Linux (not known) (KORVA_OperatingSystem): installed 2024-01-02 03:04:05 +00:00
+│       └── KORVA_OSElementCapabilities
+│           └── (not known) (KORVA_OperatingSystemCapabilities): name editable, shutdown of the host: 65000
+└── KORVA_RunningOS
+    └── Linux (not known) (KORVA_OperatingSystem): Vendor Reserved, health (not known), up since not a date
+)");
+    host.capabilities = {};
+    EXPECT_NE(drawn(host).find("name not known, shutdown of the host: (not known)\n"),
+              std::string::npos);
 }
 
 TEST(Tree, WithoutAComputerShowsTheOperatingSystemsAlone) {
