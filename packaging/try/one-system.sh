@@ -137,6 +137,7 @@ asks_the_host() {
     path=$(inside cmpihost ein KORVA_OperatingSystem 2>>"$log") || true
     check "cmpihost ai from it to the computer system" \
         shows '^  CreationClassName  +KORVA_ComputerSystem$' ai "$path" --assoc-class KORVA_RunningOS
+    check "cmpihost rin from it, which the facade answers" shows '^root/cimv2:KORVA_RunningOS[.]' rin "$path"
     check "cmpihost tree" shows 'Debian GNU/Linux 12 .KORVA_OperatingSystem.: Enabled' tree
 }
 
