@@ -7,6 +7,7 @@
 # Whether cimserver runs, and what is found here for the caller.
 answers=
 repository_folder=
+namespaces_known=no
 server=
 server_bits=
 library=
@@ -58,7 +59,10 @@ pegasus_find_repository() {
 }
 
 # Fails for a namespace that is known to be missing: a compiler would make it, and then fail all the same.
+# Sets namespaces_known.
+# shellcheck disable=SC2034
 pegasus_need_namespace() {
+    namespaces_known=no
     if [ "$answers" = yes ]; then
         installed cimcli && cimcli ns >"$work/namespaces" 2>/dev/null </dev/null || return 0
     else
@@ -67,7 +71,9 @@ pegasus_need_namespace() {
     fi
     sed 's/^[[:space:]]*//; s/[[:space:]]*$//' "$work/namespaces" >"$work/names"
     # Without the root namespace this is no list of them.
-    ! grep -qix root "$work/names" || grep -qix "$1" "$work/names" || {
+    grep -qix root "$work/names" || return 0
+    namespaces_known=yes
+    grep -qix "$1" "$work/names" || {
         complain "OpenPegasus has no namespace $1"
         complain "make it, or name another one (--namespace for the classes, --interop for registrations)"
         return 1

@@ -5,7 +5,8 @@
 # Set by the commands that source this.
 registration=
 : "${default_namespace:?}" "${interop:?}" "${schema_dir:?}" "${parts:?}" "${work:?}" "${dry_run:?}"
-: "${repository?}" "${answer?}" "${repository_folder?}" "${server_bits?}" "${library?}" "${agent?}" "${loader_bits?}"
+: "${repository?}" "${answer?}" "${repository_folder?}" "${namespaces_known?}"
+: "${server_bits?}" "${library?}" "${agent?}" "${loader_bits?}"
 classes_namespace=${namespace:-$default_namespace}
 
 pegasus_present() { installed cimprovider && { installed cimmof || installed cimmofl; }; }
@@ -32,7 +33,10 @@ pegasus_compile() {
         say "OpenPegasus: $into holds this already, and it stays as it is"
         return 0
     fi
-    failed "$compiler" "$(pegasus_way_out)"
+    failed "$compiler" "$(pegasus_way_out)" || true
+    [ "$namespaces_known" = yes ] || complain "if there was no namespace $into before and there is one now," \
+        "delete it; whether there was one could not be asked without cimcli"
+    return 1
 }
 
 # What to do about the output of a compiler that failed.

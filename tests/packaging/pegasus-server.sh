@@ -187,6 +187,13 @@ RefusesANamespaceThatIsMissing() {
     expect_text "make it, or name another one (--namespace for the classes, --interop for registrations)" "$output"
 }
 
+TellsThatAFailureMayHaveMadeANamespace() {
+    echo "CIM_ERR_INVALID_SUPERCLASS" >"$managers/fail/cimmof"
+    registers --namespace root/other
+    expect_code 1
+    expect_text "if there was no namespace root/other before and there is one now, delete it" "$output"
+}
+
 RefusesANamespaceThatIsMissingInAStoppedServer() {
     server_is_stopped
     make_repository "$work/data/repository" root root#cimv2 root#PG_InterOp

@@ -67,6 +67,8 @@ EOF
 }
 
 SpeaksOfTheNamespaceOnlyWhereItIsTheCause() {
+    stand_in cimcli
+    printf '%s\n' root root/cimv2 root/PG_InterOp >"$managers/namespaces"
     failures_of_the_compiler >"$work/failures"
     while IFS='|' read -r said way_out; do
         echo "$said" >"$managers/fail/cimmof"
