@@ -78,6 +78,7 @@ TellsCommandsThatAreThereWhenThePackageIsGone() {
     cimprovider -r -m KorvaComputerSystemModule
     cimprovider -d -m KorvaOSStatusModule
     cimprovider -r -m KorvaOSStatusModule" "$output"
+    expect_no_text "run: korva-osstatus-register" "$output"
 }
 
 TellsTheCommandsOfTheManagerThatFailed() {
