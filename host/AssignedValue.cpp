@@ -41,7 +41,9 @@ Value typed(const mof::Scalar& scalar, CMPIType type, const ClassCatalogue* cata
             if (type == CMPI_real32 || type == CMPI_real64) {
                 return Value::fromReal(static_cast<double>(number), type);
             }
-            return isSigned() ? Value::fromSigned(number, type) : Value::fromUnsigned(0, type);
+            // An unsigned type takes none but "-0" of these.
+            return isSigned() ? Value::fromSigned(number, type)
+                              : Value::fromUnsigned(static_cast<std::uint64_t>(number), type);
         }
         Value operator()(double real) const { return Value::fromReal(real, type); }
         Value operator()(mof::Character character) const {

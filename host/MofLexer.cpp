@@ -126,7 +126,7 @@ Token Lexer::next() {
     if (isDigit(c) || c == '+' || c == '-' || c == '.') {
         return number(start);
     }
-    if (c != '\0' && punctuation.find(c) != std::string_view::npos) {
+    if (punctuation.find(c) != std::string_view::npos) {
         return {TokenKind::Punctuation, start, std::string(1, take()), {}};
     }
     fail(start, "the character '" + validUtf8(std::string(1, c)) + "' has no meaning here");
@@ -182,7 +182,7 @@ void Lexer::appendEscape(std::string& to, char delimiter) {
         appendUtf8(to, hexadecimalEscape());
         return;
     }
-    const std::size_t index = c == '\0' ? std::string_view::npos : letters.find(c);
+    const std::size_t index = letters.find(c);
     if (index == std::string_view::npos) {
         fail(start, std::string("expected one of \\b \\t \\n \\f \\r \\\" \\' \\\\ \\x in the ") +
                         (delimiter == '"' ? "string" : "character"));

@@ -10,22 +10,18 @@ namespace {
 
 struct Digits {
     std::string_view text;
-    int base = 10;
+    int base;
 };
 
 Digits split(std::string_view unsignedText) {
-    const std::size_t length = unsignedText.size();
-    if (length > 2 && unsignedText[0] == '0' &&
-        (unsignedText[1] == 'x' || unsignedText[1] == 'X')) {
+    const std::string_view start = unsignedText.substr(0, 2);
+    if (start == "0x" || start == "0X") {
         return {unsignedText.substr(2), 16};
     }
-    if (length > 1 && (unsignedText.back() == 'b' || unsignedText.back() == 'B')) {
-        return {unsignedText.substr(0, length - 1), 2};
+    if (!unsignedText.empty() && (unsignedText.back() == 'b' || unsignedText.back() == 'B')) {
+        return {unsignedText.substr(0, unsignedText.size() - 1), 2};
     }
-    if (length > 1 && unsignedText[0] == '0') {
-        return {unsignedText.substr(1), 8};
-    }
-    return {unsignedText, 10};
+    return {unsignedText, start.substr(0, 1) == "0" ? 8 : 10};
 }
 
 bool isReal(std::string_view unsignedText) {
@@ -39,42 +35,44 @@ std::errc convert(std::string_view text, Number& number, Base... base) {
     return result.ec == std::errc() && result.ptr != end ? std::errc::invalid_argument : result.ec;
 }
 
-bool readInteger(Digits digits, bool negative, Scalar& value, std::errc& error) {
-    std::uint64_t magnitude = 0;
-    error = convert(digits.text, magnitude, digits.base);
+std::errc readInteger(std::string_view unsignedText, bool negative, Scalar& value) {
+    const Digits digits = split(unsignedText);
+    std::uint64_t magnitude{};
+    const std::errc error = convert(digits.text, magnitude, digits.base);
     if (error != std::errc()) {
-        return false;
+        return error;
     }
     constexpr std::uint64_t mostNegative = std::uint64_t{1} << 63U;
     if (!negative) {
         value = magnitude;
     } else if (magnitude > mostNegative) {
-        error = std::errc::result_out_of_range;
-        return false;
+        return std::errc::result_out_of_range;
     } else if (magnitude == mostNegative) {
         value = std::numeric_limits<std::int64_t>::min();
     } else {
         value = -static_cast<std::int64_t>(magnitude);
     }
-    return true;
+    return {};
+}
+
+std::errc readReal(std::string_view unsignedText, bool negative, Scalar& value) {
+    double number{};
+    const std::errc error = convert(unsignedText, number);
+    value = negative ? -number : number;
+    return error;
 }
 
 }  // namespace
 
 bool readNumber(const std::string& written, Scalar& value, std::string& complaint) {
     std::string_view text = written;
-    const bool negative = !text.empty() && text.front() == '-';
-    if (!text.empty() && (negative || text.front() == '+')) {
+    const std::string_view sign = text.substr(0, 1);
+    const bool negative = sign == "-";
+    if (negative || sign == "+") {
         text.remove_prefix(1);
     }
-    std::errc error{};
-    if (isReal(text)) {
-        double number = 0;
-        error = convert(text, number);
-        value = negative ? -number : number;
-    } else {
-        readInteger(split(text), negative, value, error);
-    }
+    const std::errc error =
+        isReal(text) ? readReal(text, negative, value) : readInteger(text, negative, value);
     if (error == std::errc::result_out_of_range) {
         complaint = "the number " + written + " does not fit 64 bits";
     } else if (error != std::errc()) {

@@ -1,5 +1,8 @@
 #include "host/MofTypes.h"
 
+#include <algorithm>
+#include <iterator>
+
 #include "host/broker/Value.h"
 
 namespace cmpihost::mof {
@@ -9,29 +12,33 @@ namespace {
 struct TypeRow {
     Type type;
     const char* name;
-    /// Width of an integer in bits; 0 for every other type.
-    unsigned bits;
-    bool isSigned;
+    /// Of an integer.
+    unsigned bits{};
+    bool isSigned{};
 };
 
 constexpr TypeRow types[] = {
-    {Type::Boolean, "boolean", 0, false}, {Type::String, "string", 0, false},
-    {Type::Char16, "char16", 0, false},   {Type::DateTime, "datetime", 0, false},
-    {Type::UInt8, "uint8", 8, false},     {Type::SInt8, "sint8", 8, true},
-    {Type::UInt16, "uint16", 16, false},  {Type::SInt16, "sint16", 16, true},
-    {Type::UInt32, "uint32", 32, false},  {Type::SInt32, "sint32", 32, true},
-    {Type::UInt64, "uint64", 64, false},  {Type::SInt64, "sint64", 64, true},
-    {Type::Real32, "real32", 0, false},   {Type::Real64, "real64", 0, false},
-    {Type::Reference, "ref", 0, false},
+    {Type::Boolean, "boolean"},
+    {Type::String, "string"},
+    {Type::Char16, "char16"},
+    {Type::DateTime, "datetime"},
+    {Type::UInt8, "uint8", 8, false},
+    {Type::SInt8, "sint8", 8, true},
+    {Type::UInt16, "uint16", 16, false},
+    {Type::SInt16, "sint16", 16, true},
+    {Type::UInt32, "uint32", 32, false},
+    {Type::SInt32, "sint32", 32, true},
+    {Type::UInt64, "uint64", 64, false},
+    {Type::SInt64, "sint64", 64, true},
+    {Type::Real32, "real32"},
+    {Type::Real64, "real64"},
+    {Type::Reference, "ref"},
 };
 
+/// Every type has a row.
 const TypeRow& rowOf(Type type) {
-    for (const TypeRow& row : types) {
-        if (row.type == type) {
-            return row;
-        }
-    }
-    return types[0];
+    return *std::find_if(std::begin(types), std::end(types),
+                         [type](const TypeRow& row) { return row.type == type; });
 }
 
 bool fitsInteger(const Scalar& scalar, const TypeRow& row) {

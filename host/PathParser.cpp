@@ -118,11 +118,9 @@ std::string PathParser::host() {
 }
 
 std::string PathParser::nameSpace(const std::string& word, std::size_t start) const {
-    for (std::size_t index = 0; index < word.size(); ++index) {
-        const bool segmentStart = index == 0 || word[index - 1] == '/';
-        if (segmentStart && word[index] == '/') {
-            fail(start + index, "expected a name before '/' in the namespace");
-        }
+    const std::size_t doubled = ("/" + word).find("//");
+    if (doubled != std::string::npos) {
+        fail(start + doubled, "expected a name before '/' in the namespace");
     }
     if (word.back() == '/') {
         fail(start + word.size(), "expected a name after '/' in the namespace");
@@ -134,14 +132,13 @@ std::string PathParser::className(const std::string& word, std::size_t start) co
     if (word.empty() || !isNameStart(word.front())) {
         fail(start, "expected the name of a class");
     }
-    for (std::size_t index = 0; index < word.size(); ++index) {
-        if (word[index] == '/') {
-            fail(start + word.size(),
-                 "expected ':' and the name of a class after the namespace '" + word + "'");
-        }
-        if (word[index] == '-') {
-            fail(start + index, "the name of a class holds letters, digits and '_' only");
-        }
+    if (word.find('/') != std::string::npos) {
+        fail(start + word.size(),
+             "expected ':' and the name of a class after the namespace '" + word + "'");
+    }
+    const std::size_t dash = word.find('-');
+    if (dash != std::string::npos) {
+        fail(start + dash, "the name of a class holds letters, digits and '_' only");
     }
     return word;
 }
@@ -269,8 +266,8 @@ Value PathParser::number() {
     if (digits.empty() || isNamePart(peek())) {
         fail(offset_, "expected the digits of an integer");
     }
-    std::int64_t whenNegative = 0;
-    std::uint64_t whenPositive = 0;
+    std::int64_t whenNegative{};
+    std::uint64_t whenPositive{};
     const bool read =
         negative ? readWhole("-" + digits, whenNegative) : readWhole(digits, whenPositive);
     if (!read) {

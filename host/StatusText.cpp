@@ -7,47 +7,47 @@ namespace cmpihost {
 namespace {
 
 struct StatusRow {
-    unsigned rc;
+    CMPIrc rc;
     const char* name;
 };
 
 constexpr StatusRow statuses[] = {
-    {0, "CIM_ERR_SUCCESS"},
-    {1, "CIM_ERR_FAILED"},
-    {2, "CIM_ERR_ACCESS_DENIED"},
-    {3, "CIM_ERR_INVALID_NAMESPACE"},
-    {4, "CIM_ERR_INVALID_PARAMETER"},
-    {5, "CIM_ERR_INVALID_CLASS"},
-    {6, "CIM_ERR_NOT_FOUND"},
-    {7, "CIM_ERR_NOT_SUPPORTED"},
-    {8, "CIM_ERR_CLASS_HAS_CHILDREN"},
-    {9, "CIM_ERR_CLASS_HAS_INSTANCES"},
-    {10, "CIM_ERR_INVALID_SUPERCLASS"},
-    {11, "CIM_ERR_ALREADY_EXISTS"},
-    {12, "CIM_ERR_NO_SUCH_PROPERTY"},
-    {13, "CIM_ERR_TYPE_MISMATCH"},
-    {14, "CIM_ERR_QUERY_LANGUAGE_NOT_SUPPORTED"},
-    {15, "CIM_ERR_INVALID_QUERY"},
-    {16, "CIM_ERR_METHOD_NOT_AVAILABLE"},
-    {17, "CIM_ERR_METHOD_NOT_FOUND"},
-    {50, "CMPI_RC_DO_NOT_UNLOAD"},
-    {51, "CMPI_RC_NEVER_UNLOAD"},
-    {60, "CMPI_RC_ERR_INVALID_HANDLE"},
-    {61, "CMPI_RC_ERR_INVALID_DATA_TYPE"},
-    {100, "CMPI_RC_ERROR_SYSTEM"},
-    {200, "CMPI_RC_ERROR"},
+    {CMPI_RC_OK, "CIM_ERR_SUCCESS"},
+    {CMPI_RC_ERR_FAILED, "CIM_ERR_FAILED"},
+    {CMPI_RC_ERR_ACCESS_DENIED, "CIM_ERR_ACCESS_DENIED"},
+    {CMPI_RC_ERR_INVALID_NAMESPACE, "CIM_ERR_INVALID_NAMESPACE"},
+    {CMPI_RC_ERR_INVALID_PARAMETER, "CIM_ERR_INVALID_PARAMETER"},
+    {CMPI_RC_ERR_INVALID_CLASS, "CIM_ERR_INVALID_CLASS"},
+    {CMPI_RC_ERR_NOT_FOUND, "CIM_ERR_NOT_FOUND"},
+    {CMPI_RC_ERR_NOT_SUPPORTED, "CIM_ERR_NOT_SUPPORTED"},
+    {CMPI_RC_ERR_CLASS_HAS_CHILDREN, "CIM_ERR_CLASS_HAS_CHILDREN"},
+    {CMPI_RC_ERR_CLASS_HAS_INSTANCES, "CIM_ERR_CLASS_HAS_INSTANCES"},
+    {CMPI_RC_ERR_INVALID_SUPERCLASS, "CIM_ERR_INVALID_SUPERCLASS"},
+    {CMPI_RC_ERR_ALREADY_EXISTS, "CIM_ERR_ALREADY_EXISTS"},
+    {CMPI_RC_ERR_NO_SUCH_PROPERTY, "CIM_ERR_NO_SUCH_PROPERTY"},
+    {CMPI_RC_ERR_TYPE_MISMATCH, "CIM_ERR_TYPE_MISMATCH"},
+    {CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED, "CIM_ERR_QUERY_LANGUAGE_NOT_SUPPORTED"},
+    {CMPI_RC_ERR_INVALID_QUERY, "CIM_ERR_INVALID_QUERY"},
+    {CMPI_RC_ERR_METHOD_NOT_AVAILABLE, "CIM_ERR_METHOD_NOT_AVAILABLE"},
+    {CMPI_RC_ERR_METHOD_NOT_FOUND, "CIM_ERR_METHOD_NOT_FOUND"},
+    {CMPI_RC_DO_NOT_UNLOAD, "CMPI_RC_DO_NOT_UNLOAD"},
+    {CMPI_RC_NEVER_UNLOAD, "CMPI_RC_NEVER_UNLOAD"},
+    {CMPI_RC_ERR_INVALID_HANDLE, "CMPI_RC_ERR_INVALID_HANDLE"},
+    {CMPI_RC_ERR_INVALID_DATA_TYPE, "CMPI_RC_ERR_INVALID_DATA_TYPE"},
+    {CMPI_RC_ERROR_SYSTEM, "CMPI_RC_ERROR_SYSTEM"},
+    {CMPI_RC_ERROR, "CMPI_RC_ERROR"},
 };
 
 }  // namespace
 
 std::string statusText(CMPIrc rc) {
-    const auto number = static_cast<unsigned>(rc);
+    const std::string number = std::to_string(static_cast<unsigned>(rc));
     for (const StatusRow& row : statuses) {
-        if (row.rc == number) {
-            return std::string(row.name) + " (" + std::to_string(number) + ")";
+        if (row.rc == rc) {
+            return std::string(row.name) + " (" + number + ")";
         }
     }
-    return "CMPI status " + std::to_string(number);
+    return "CMPI status " + number;
 }
 
 std::string failureText(const OperationResult& result) {

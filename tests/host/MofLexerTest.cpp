@@ -27,6 +27,9 @@ TEST(MofLexer, ReadsNumbersOfEveryBase) {
     EXPECT_EQ(only("101b").value, Scalar(std::uint64_t{5}));
     EXPECT_EQ(only("0").value, Scalar(std::uint64_t{0}));
     EXPECT_EQ(only("0x1e").value, Scalar(std::uint64_t{30}));
+    EXPECT_EQ(only("0X1F").value, Scalar(std::uint64_t{31}));
+    EXPECT_EQ(only("11B").value, Scalar(std::uint64_t{3}));
+    EXPECT_EQ(only("-0").value, Scalar(std::int64_t{0}));
 }
 
 TEST(MofLexer, ReadsTheLargestAndTheLeastInteger) {
@@ -38,6 +41,36 @@ TEST(MofLexer, ReadsReals) {
     EXPECT_EQ(only("1.5").value, Scalar(1.5));
     EXPECT_EQ(only("-2.5e+3").value, Scalar(-2500.0));
     EXPECT_EQ(only(".25").value, Scalar(0.25));
+    EXPECT_EQ(only("2.5E-1").value, Scalar(0.25));
+}
+
+TEST(MofLexer, EndsANumberBeforeASignThatIsNotOfItsExponent) {
+    for (const char* text : {"0x1e+2", "0X1E+2", "30+2", "30.5+2"}) {
+        Lexer lexer(text, "x.mof");
+        lexer.next();
+        EXPECT_EQ(lexer.next().value, Scalar(std::uint64_t{2})) << text;
+    }
+}
+
+TEST(MofLexer, TakesLettersDigitsUnderscoresAndAllBeyondAsciiForNames) {
+    for (const char* name : {"azAZ09_", "zA", "_", "ZeA", "\xC2\x80"}) {
+        EXPECT_EQ(only(name).kind, TokenKind::Identifier) << name;
+        EXPECT_EQ(only(name).text, name);
+    }
+    for (const std::string text : {"a[", "a`", "a@", "a{", "a/", "a:"}) {
+        Lexer lexer(text, "x.mof");
+        EXPECT_EQ(lexer.next().text, "a") << text;
+    }
+}
+
+TEST(MofLexer, ReadsNoFurtherThanItsText) {
+    const std::string_view text = "a/*b";
+    Lexer name(text.substr(0, 1), "x.mof");
+    EXPECT_EQ(name.next().text, "a");
+    EXPECT_EQ(name.next().kind, TokenKind::End);
+    Lexer slash(text.substr(0, 2), "x.mof");
+    slash.next();
+    EXPECT_THROW(slash.next(), MofError);
 }
 
 TEST(MofLexer, ResolvesEscapesInStrings) {
@@ -57,6 +90,7 @@ TEST(MofLexer, ReadsCharacters) {
 }
 
 TEST(MofLexer, PassesOverCommentsBlanksAndTheByteOrderMark) {
+    EXPECT_EQ(only(" \t\r\n\f\v/*/ one */ name").text, "name");
     const Token token = only("\xEF\xBB\xBF // one\n /* two\n ** */ name /**/ // end");
     EXPECT_EQ(token.text, "name");
     EXPECT_EQ(token.position.line, 3U);

@@ -27,6 +27,12 @@ TEST(MofText, WritesCharacters) {
     EXPECT_EQ(mofCharacter('\''), R"('\'')");
     EXPECT_EQ(mofCharacter(0x20AC), R"('\x20AC')");
     EXPECT_EQ(mofCharacter(0), R"('\x0000')");
+    EXPECT_EQ(mofCharacter(0x1F), R"('\x001F')");
+    EXPECT_EQ(mofCharacter(' '), "' '");
+    EXPECT_EQ(mofCharacter('~'), "'~'");
+    EXPECT_EQ(mofCharacter(0x7F), R"('\x007F')");
+    EXPECT_EQ(mofCharacter(0x80), R"('\x0080')");
+    EXPECT_EQ(mofString("\xC2\x9F\xC2\xA0"), "\"\\x009F\xC2\xA0\"");
 }
 
 TEST(MofText, IsReadBackByTheLexer) {

@@ -146,6 +146,10 @@ const PathErrorRow errors[] = {
      "the name of a class holds letters, digits and '_' only\n"
      "  My-Class.A=1\n"
      "    ^"},
+    {"NamespaceWithDashWithoutColon", "my-root/x",
+     "expected ':' and the name of a class after the namespace 'my-root/x'\n"
+     "  my-root/x\n"
+     "           ^"},
     {"BlankInClass", "My Class",
      "expected '.' and keys, or the end, after the class 'My'\n"
      "  My Class\n"

@@ -58,7 +58,7 @@ TEST_F(ReadableDateTime, ShowsIntervals) {
 TEST_F(ReadableDateTime, SaysNothingAboutATextThatIsNone) {
     for (const char* text :
          {"", "yesterday", "   00000000000.000000+000", "20241302030405.000000+000",
-          "2024010203****.000000+000", "20240102030405.000000"}) {
+          "2024010203****.000000+000", "20240102030405.000000", "19691231235959.000000+000"}) {
         EXPECT_EQ(readableDateTime(text), "") << text;
     }
 }

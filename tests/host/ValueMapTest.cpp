@@ -42,6 +42,7 @@ TEST(ValueMap, PrefersTheNarrowerRange) {
     EXPECT_EQ(nameOf(map, 21), "rest");
     EXPECT_EQ(nameOf(map, 0x7FFF), "rest");
     EXPECT_EQ(nameOf(map, 0x8000), "vendor");
+    EXPECT_EQ(nameOf(mapOf(R"(ValueMap{"1","1"}, Values{"first","second"})"), 1), "first");
 }
 
 TEST(ValueMap, TakesNegativeNumbersAndRangesWithoutABeginning) {
@@ -55,6 +56,10 @@ TEST(ValueMap, IsEmptyForTextsAndForPropertiesWithoutValues) {
     EXPECT_TRUE(mapOf(R"(ValueMap{"OK"}, Values{"fine"})", "string").empty());
     EXPECT_TRUE(mapOf(R"(ValueMap{"1"})").empty());
     EXPECT_TRUE(mapOf("Key").empty());
+    for (const char* integer : {"uint8", "sint8", "uint64", "sint64"})
+        EXPECT_FALSE(mapOf(R"(Values{"a"})", integer).empty()) << integer;
+    for (const char* other : {"boolean", "datetime", "char16", "real32", "real64"})
+        EXPECT_TRUE(mapOf(R"(Values{"a"})", other).empty()) << other;
 }
 
 TEST(ValueMap, RefusesListsOfDifferentLength) {
