@@ -6,6 +6,15 @@
 
 namespace cmpihost {
 
+namespace {
+
+/// Of a block without bytes, null and a pointer would both be right; providers expect the pointer.
+std::size_t notNothing(std::size_t size) noexcept {
+    return std::max<std::size_t>(size, 1);
+}
+
+}  // namespace
+
 Arena::~Arena() {
     for (void* block : blocks_) std::free(block);
 }
@@ -56,7 +65,7 @@ Shells Arena::retireAll(std::size_t kept) noexcept {
 }
 
 void* Arena::allocate(std::size_t size) {
-    void* block = std::malloc(size == 0 ? 1 : size);
+    void* block = std::malloc(notNothing(size));
     if (block == nullptr) throw std::bad_alloc();
     try {
         blocks_.insert(block);
@@ -70,9 +79,8 @@ void* Arena::allocate(std::size_t size) {
 void* Arena::reallocate(void* block, std::size_t size) {
     const auto found = blocks_.find(block);
     if (found == blocks_.end()) return nullptr;
-    blocks_.reserve(blocks_.size() + 1);
-    void* grown = std::realloc(block, size == 0 ? 1 : size);
-    if (grown == nullptr || grown == block) return grown;
+    void* grown = std::realloc(block, notNothing(size));
+    if (grown == nullptr) return nullptr;
     auto node = blocks_.extract(found);
     node.value() = grown;
     blocks_.insert(std::move(node));

@@ -6,7 +6,7 @@
 #include <cstddef>
 #include <memory>
 #include <mutex>
-#include <unordered_set>
+#include <set>
 #include <vector>
 
 namespace cmpihost {
@@ -42,7 +42,7 @@ class Arena {
   private:
     Shells shells_;
     std::vector<std::unique_ptr<std::size_t>> marks_;
-    std::unordered_set<void*> blocks_;
+    std::set<void*> blocks_;
 };
 
 /// Shells of ended objects, the oldest given up first. Any thread.

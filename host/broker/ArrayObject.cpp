@@ -33,7 +33,7 @@ CMPIStatus setElementAt(Array& array, const CallName& call, CMPICount index, con
                             " set to a " + cimTypeName(type));
         return statusOf(CMPI_RC_ERR_TYPE_MISMATCH);
     }
-    if (elements.use_count() > 1) elements = std::make_shared<std::vector<Value>>(*elements);
+    if (elements.use_count() != 1) elements = std::make_shared<std::vector<Value>>(*elements);
     (*elements)[index] = std::move(read);
     return statusOf(CMPI_RC_OK);
 }

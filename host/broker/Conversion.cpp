@@ -131,7 +131,7 @@ void writeSigned(CMPIValue& target, std::int64_t value, CMPIType type) noexcept 
 void writeScalar(CMPIValue& target, const Value& value) {
     switch (value.type()) {
         case CMPI_boolean:
-            target.boolean = value.boolean() ? 1 : 0;
+            target.boolean = value.boolean();
             break;
         case CMPI_real32:
             target.real32 = static_cast<CMPIReal32>(value.real());

@@ -111,24 +111,23 @@ std::optional<DateTimeBinary> parseInterval(std::string_view text) {
 }
 
 struct Date {
-    std::int64_t year = 1970;
-    std::int64_t month = 1;
-    std::int64_t day = 1;
+    std::int64_t year;
+    std::int64_t month;
+    std::int64_t day;
 };
 
 Date dateOf(std::int64_t daysAfter1970) {
     const std::int64_t days = daysAfter1970 + daysBeforeYear(1970);
-    Date date;
-    date.year = days * 400 / 146097 + 1;
-    while (daysBeforeYear(date.year) > days) --date.year;
-    while (daysBeforeYear(date.year + 1) <= days) ++date.year;
-    std::int64_t rest = days - daysBeforeYear(date.year);
-    while (rest >= daysInMonth(date.year, date.month)) {
-        rest -= daysInMonth(date.year, date.month);
-        ++date.month;
+    // At most the true year, and not far before it.
+    std::int64_t year = days / 366 + 1;
+    while (daysBeforeYear(year + 1) <= days) ++year;
+    std::int64_t rest = days - daysBeforeYear(year);
+    std::int64_t month = 1;
+    while (rest >= daysInMonth(year, month)) {
+        rest -= daysInMonth(year, month);
+        ++month;
     }
-    date.day = rest + 1;
-    return date;
+    return {year, month, rest + 1};
 }
 
 }  // namespace

@@ -24,7 +24,7 @@ CMPIData getNext(Enumeration& enumeration, CMPIStatus* status) {
 }
 
 CMPIBoolean hasNext(Enumeration& enumeration, CMPIStatus*) {
-    return enumeration.body.position < enumeration.body.items.size() ? 1 : 0;
+    return enumeration.body.position < enumeration.body.items.size();
 }
 
 CMPIArray* toArray(Enumeration& enumeration, CMPIStatus*) {

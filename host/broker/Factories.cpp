@@ -113,7 +113,7 @@ CMPIBoolean classPathIsA(BrokerCore& core, const CallName& call, const CMPIObjec
     const ObjectPathValue& given = *fromHandle(path, call).body;
     const Kinship kin =
         kinship(core.catalogue(), given.className, required(core, className, call, "class name"));
-    return kin == Kinship::Same || kin == Kinship::Below ? 1 : 0;
+    return kin == Kinship::Same || kin == Kinship::Below;
 }
 
 CMPIString* objectText(BrokerCore& core, const CallName& call, const void* object, CMPIStatus*) {

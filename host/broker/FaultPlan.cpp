@@ -4,11 +4,9 @@ namespace cmpihost {
 
 namespace {
 
-bool names(std::string_view entry, std::string_view table, std::string_view slot) {
-    if (entry.empty() || entry == slot) return true;
-    return entry.size() == table.size() + 1 + slot.size() &&
-           entry.substr(0, table.size()) == table && entry[table.size()] == '.' &&
-           entry.substr(table.size() + 1) == slot;
+/// `call` is "table.slot".
+bool names(std::string_view entry, std::string_view call) {
+    return entry.empty() || entry == call || entry == call.substr(call.find('.') + 1);
 }
 
 }  // namespace
@@ -39,9 +37,7 @@ unsigned FaultPlan::calls(std::string_view entry) const {
     const std::lock_guard<std::mutex> lock(mutex_);
     unsigned sum = 0;
     for (const auto& [name, count] : calls_) {
-        const std::size_t dot = name.find('.');
-        const std::string_view whole = name;
-        if (names(entry, whole.substr(0, dot), whole.substr(dot + 1))) sum += count;
+        if (names(entry, name)) sum += count;
     }
     return sum;
 }
@@ -70,7 +66,7 @@ std::optional<PlannedFailure> FaultPlan::onCall(const char* table, const char* s
     std::optional<PlannedFailure> answer;
     for (Planned& planned : faults_) {
         const Fault& fault = planned.fault;
-        if (!names(fault.entry, table, slot)) continue;
+        if (!names(fault.entry, call)) continue;
         ++planned.seen;
         const bool reached = planned.seen >= fault.nth;
         const bool past = fault.times != 0 && planned.seen - fault.nth >= fault.times;

@@ -11,7 +11,7 @@ using Instance = const Object<CMPIInstance>;
 /// The content for a change: a copy if somebody else shares it.
 InstanceValue& altered(Instance& instance) {
     auto& value = instance.body.value;
-    if (value.use_count() > 1) value = std::make_shared<InstanceValue>(*value);
+    if (value.use_count() != 1) value = std::make_shared<InstanceValue>(*value);
     return *value;
 }
 

@@ -45,9 +45,7 @@ bool isWhole(std::istream& stream, std::uint64_t fileSize) {
     for (std::uint64_t index = 0; index < header.e_phnum; ++index) {
         ElfW(Phdr) segment{};
         const std::uint64_t offset = header.e_phoff + index * sizeof segment;
-        if (!liesWithin(offset, sizeof segment, fileSize) || !readAt(stream, offset, segment)) {
-            return false;
-        }
+        if (!readAt(stream, offset, segment)) return false;
         if (segment.p_type == PT_LOAD &&
             !liesWithin(segment.p_offset, segment.p_filesz, fileSize)) {
             return false;

@@ -9,7 +9,7 @@ using Path = const Object<CMPIObjectPath>;
 
 /// The content for a change: a copy if somebody else shares it.
 ObjectPathValue& altered(Path& path) {
-    if (path.body.use_count() > 1) path.body = std::make_shared<ObjectPathValue>(*path.body);
+    if (path.body.use_count() != 1) path.body = std::make_shared<ObjectPathValue>(*path.body);
     return *path.body;
 }
 

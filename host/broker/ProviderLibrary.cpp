@@ -95,7 +95,7 @@ class Factory {
 template <class MI>
 bool cleanUp(MI* interface, Broker& broker, const CMPIContext* context, bool terminating) {
     if (interface == nullptr || interface->ft->cleanup == nullptr) return true;
-    const CMPIStatus status = interface->ft->cleanup(interface, context, terminating ? 1 : 0);
+    const CMPIStatus status = interface->ft->cleanup(interface, context, terminating);
     const bool refuses = status.rc == CMPI_RC_DO_NOT_UNLOAD || status.rc == CMPI_RC_NEVER_UNLOAD;
     if (!refuses && status.rc != CMPI_RC_OK) {
         broker.core().report("cleanup answered status " + std::to_string(status.rc) +

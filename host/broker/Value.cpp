@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <array>
 #include <cstdio>
+#include <iterator>
 
 namespace cmpihost {
 
@@ -15,24 +16,25 @@ char lowerCase(char letter) noexcept {
 struct TypeRow {
     CMPIType type;
     const char* name;
-    unsigned bits;
+    /// Of an unsigned number narrower than 64 bits.
+    unsigned bits{};
 };
 
-constexpr std::array<TypeRow, 20> typeRows = {{
-    {CMPI_null, "null", 0},       {CMPI_boolean, "boolean", 1},   {CMPI_char16, "char16", 16},
-    {CMPI_real32, "real32", 32},  {CMPI_real64, "real64", 64},    {CMPI_uint8, "uint8", 8},
-    {CMPI_uint16, "uint16", 16},  {CMPI_uint32, "uint32", 32},    {CMPI_uint64, "uint64", 64},
-    {CMPI_sint8, "sint8", 8},     {CMPI_sint16, "sint16", 16},    {CMPI_sint32, "sint32", 32},
-    {CMPI_sint64, "sint64", 64},  {CMPI_instance, "instance", 0}, {CMPI_ref, "ref", 0},
-    {CMPI_string, "string", 0},   {CMPI_chars, "string", 0},      {CMPI_dateTime, "datetime", 0},
-    {CMPI_charsptr, "string", 0}, {CMPI_ptr, "pointer", 0},
-}};
+constexpr TypeRow typeRows[] = {
+    {CMPI_null, "null"},         {CMPI_boolean, "boolean"},   {CMPI_char16, "char16", 16},
+    {CMPI_real32, "real32"},     {CMPI_real64, "real64"},     {CMPI_uint8, "uint8", 8},
+    {CMPI_uint16, "uint16", 16}, {CMPI_uint32, "uint32", 32}, {CMPI_uint64, "uint64"},
+    {CMPI_sint8, "sint8"},       {CMPI_sint16, "sint16"},     {CMPI_sint32, "sint32"},
+    {CMPI_sint64, "sint64"},     {CMPI_instance, "instance"}, {CMPI_ref, "ref"},
+    {CMPI_string, "string"},     {CMPI_chars, "string"},      {CMPI_dateTime, "datetime"},
+    {CMPI_charsptr, "string"},   {CMPI_ptr, "pointer"},
+};
 
 const TypeRow* typeRow(CMPIType elementType) noexcept {
     const auto row =
-        std::find_if(typeRows.begin(), typeRows.end(),
+        std::find_if(std::begin(typeRows), std::end(typeRows),
                      [elementType](const TypeRow& r) { return r.type == elementType; });
-    return row == typeRows.end() ? nullptr : &*row;
+    return row == std::end(typeRows) ? nullptr : row;
 }
 
 unsigned bitsOf(CMPIType type) noexcept {

@@ -26,6 +26,7 @@ TEST(DateTimeText, AnInstantBefore1970HasNoBinaryForm) {
     ASSERT_TRUE(binary);
     EXPECT_FALSE(binary->microseconds);
     EXPECT_FALSE(binary->interval);
+    EXPECT_TRUE(parseDateTime("00010101000000.000000+000"));
 }
 
 TEST(DateTimeText, AnIntervalIsCountedInDays) {
@@ -34,6 +35,7 @@ TEST(DateTimeText, AnIntervalIsCountedInDays) {
     EXPECT_TRUE(binary->interval);
     EXPECT_EQ(binary->microseconds, 93784000005u);
     EXPECT_EQ(microseconds("99999999235959.999999:000"), 8639999999999999999u);
+    EXPECT_EQ(microseconds("00000000000000.000000:000"), 0u);
 }
 
 TEST(DateTimeText, AsterisksStandForWholeFields) {
@@ -47,7 +49,8 @@ TEST(DateTimeText, WhatIsNoDateTimeIsRefused) {
           "20000101120000.000000 000", "20001301120000.000000+000", "20000100120000.000000+000",
           "20000230120000.000000+000", "19000229120000.000000+000", "20000101240000.000000+000",
           "20000101126000.000000+000", "20000101120060.000000+000", "2000010112000x.000000+000",
-          "00000101120000.000000+000", "00000001020304.000005:001", "00000001240304.000005:000"}) {
+          "00000101120000.000000+000", "00000001020304.000005:001", "00000001240304.000005:000",
+          "2000010112000:.000000+000", "200001011/0000.000000+000"}) {
         EXPECT_FALSE(parseDateTime(text)) << text;
     }
 }

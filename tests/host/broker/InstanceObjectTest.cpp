@@ -71,6 +71,18 @@ TEST_F(InstanceObject, KeepsObjectsAsCopies) {
     EXPECT_EQ(get(instance, "array").type, CMPI_uint16A);
 }
 
+TEST_F(InstanceObject, AnArrayIsTakenAsTheTypeOfItsElementsOnly) {
+    CMPIInstance* const instance = newInstance();
+    CMPIArray* const numbers = CMNewArray(mb, 1, CMPI_uint16, nullptr);
+    CMPIArray* const texts = CMNewArray(mb, 1, CMPI_string, nullptr);
+    EXPECT_EQ(set(instance, "Texts", texts, CMPI_charsA).rc, CMPI_RC_OK);
+    EXPECT_EQ(get(instance, "Texts").type, CMPI_stringA);
+    EXPECT_EQ(set(instance, "A", numbers, CMPI_stringA).rc, CMPI_RC_ERR_TYPE_MISMATCH);
+    EXPECT_EQ(set(instance, "A", texts, CMPI_uint16A).rc, CMPI_RC_ERR_TYPE_MISMATCH);
+    EXPECT_EQ(set(instance, "A", numbers, CMPI_uint32A).rc, CMPI_RC_ERR_TYPE_MISMATCH);
+    EXPECT_EQ(CMGetPropertyCount(instance, nullptr), 1u);
+}
+
 TEST_F(InstanceObject, ANullValueIsAProperty) {
     CMPIInstance* const instance = newInstance();
     CMPIString* const none = nullptr;

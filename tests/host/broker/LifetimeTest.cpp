@@ -281,6 +281,21 @@ TEST_F(Lifetime, TheQuarantineKeepsTheYoungestShellsUpToItsLimit) {
                                                 "TEST_24 used after its request ended"));
 }
 
+TEST_F(Lifetime, AnObjectGivenBackEarlyTakesOnePlaceOfTheQuarantine) {
+    BrokerOptions options;
+    options.quarantine = 3;
+    Broker small(nullptr, options);
+    {
+        Request request(small);
+        CMPIObjectPath* paths[3];
+        for (CMPIObjectPath*& path : paths)
+            path = CMNewObjectPath(small.cmpi(), "", "TEST_Thing", nullptr);
+        small.cmpi()->mft->freeObjectPath(small.cmpi(), paths[0]);
+        EXPECT_EQ(small.quarantined(), 1u);
+    }
+    EXPECT_EQ(small.quarantined(), 3u);
+}
+
 TEST_F(Lifetime, AQuarantineOfNoSizeKeepsNothing) {
     BrokerOptions options;
     options.quarantine = 0;
@@ -337,6 +352,7 @@ TEST_F(Memory, BlocksBelongToTheRequest) {
     mft->cmpiFree(mb, nullptr);
     EXPECT_NE(mft->cmpiMalloc(mb, 0), nullptr);
     EXPECT_NE(mft->cmpiRealloc(mb, nullptr, 10), nullptr);
+    EXPECT_NE(mft->cmpiCalloc(mb, 4, 0), nullptr);
     EXPECT_EQ(mft->cmpiCalloc(mb, ~std::size_t{0}, 2), nullptr);
     EXPECT_THAT(broker.violations(), IsEmpty());
 }

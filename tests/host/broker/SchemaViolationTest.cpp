@@ -87,6 +87,7 @@ TEST_F(SchemaViolations, ValuesOfTheDeclaredTypesPass) {
     EXPECT_EQ(set(instance, "Owner", otherPath(), CMPI_ref), CMPI_RC_OK);
     EXPECT_EQ(CMSetProperty(instance, "Size", nullptr, CMPI_uint32).rc, CMPI_RC_OK);
     EXPECT_EQ(CMSetProperty(instance, "Size", nullptr, CMPI_null).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMSetProperty(instance, "Owner", nullptr, CMPI_ref).rc, CMPI_RC_OK);
     EXPECT_EQ(CMReturnInstance(collector.cmpi(), instance).rc, CMPI_RC_OK);
     EXPECT_THAT(broker.violations(), IsEmpty());
 }

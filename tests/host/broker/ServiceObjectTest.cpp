@@ -119,6 +119,14 @@ TEST_F(Messages, TakeArgumentsOfEveryKind) {
     EXPECT_EQ(status.rc, CMPI_RC_OK);
 }
 
+TEST_F(Messages, TakeTenArguments) {
+    CMPIString* const text = mb->eft->getMessage(
+        mb, "ID", "$0$1$2$3$4$5$6 $7 $8 $9", &status, 10, CMPI_uint8, 1, CMPI_sint8, -2,
+        CMPI_uint16, 3, CMPI_sint16, -4, CMPI_char16, 5, CMPI_real32, 0.5, CMPI_boolean, 0,
+        CMPI_uint8, 7, CMPI_uint8, 8, CMPI_uint8, 9);
+    EXPECT_EQ(textOf(text), "1-23-450.5false 7 8 9");
+}
+
 TEST_F(Messages, LeaveAloneWhatIsNoArgument) {
     CMPIString* const text =
         mb->eft->getMessage(mb, "ID", "$1 costs 5$, $$0 $", &status, 1, CMPI_chars, "x");

@@ -136,8 +136,9 @@ TEST_F(ThreadTable, CallsOfARequestCountForItsFaults) {
     xft->lockMutex(mutex);
     xft->unlockMutex(mutex);
     xft->destroyMutex(mutex);
+    xft->destroyCondition(nullptr);
     EXPECT_EQ(plan.calls("CMPIBrokerExtFT.lockMutex"), 1u);
-    EXPECT_EQ(plan.calls(), 5u);
+    EXPECT_EQ(plan.calls(), 6u);
     broker.setFaultPlan(nullptr);
 }
 

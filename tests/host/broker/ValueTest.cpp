@@ -10,6 +10,7 @@ namespace {
 TEST(Names, CompareWithoutCaseAndOnlyInFullLength) {
     EXPECT_TRUE(equalNames("CSName", "csNAME"));
     EXPECT_TRUE(equalNames("", ""));
+    EXPECT_TRUE(equalNames("AZ", "az"));
     EXPECT_FALSE(equalNames("CSName", "CSNam"));
     EXPECT_FALSE(equalNames("[", "{"));
     EXPECT_FALSE(equalNames("\xC3\x84", "\xC3\xA4"));
@@ -34,6 +35,8 @@ TEST(ValueModel, ANullKeepsItsType) {
 TEST(ValueModel, IntegersAreCutToTheWidthOfTheirType) {
     EXPECT_EQ(Value::fromUnsigned(0x1FF, CMPI_uint8).unsignedInteger(), 0xFFu);
     EXPECT_EQ(Value::fromUnsigned(0x12345, CMPI_char16).unsignedInteger(), 0x2345u);
+    EXPECT_EQ(Value::fromUnsigned(0x3FFFF, CMPI_uint16).unsignedInteger(), 0xFFFFu);
+    EXPECT_EQ(Value::fromUnsigned(0x3FFFFFFFF, CMPI_uint32).unsignedInteger(), 0xFFFFFFFFu);
     EXPECT_EQ(Value::fromUnsigned(~std::uint64_t{0}).unsignedInteger(), 18446744073709551615u);
     EXPECT_EQ(Value::fromSigned(0xFF, CMPI_sint8).signedInteger(), -1);
     EXPECT_EQ(Value::fromSigned(-9223372036854775807 - 1).toText(), "-9223372036854775808");
@@ -53,11 +56,16 @@ TEST(ValueModel, ValuesAreEqualByTypeAndContent) {
     EXPECT_NE(Value::null(CMPI_uint16), Value::fromUnsigned(0, CMPI_uint16));
     EXPECT_EQ(Value::fromArray(CMPI_string, {"a", "b"}), Value::fromArray(CMPI_chars, {"a", "b"}));
     EXPECT_NE(Value::fromArray(CMPI_string, {"a", "b"}), Value::fromArray(CMPI_string, {"b", "a"}));
+    char bytes[] = "ab";
+    EXPECT_EQ(Value::fromPointer({bytes, 2}), Value::fromPointer({bytes, 2}));
+    EXPECT_NE(Value::fromPointer({bytes, 2}), Value::fromPointer({bytes, 1}));
+    EXPECT_NE(Value::fromPointer({bytes, 1}), Value::fromPointer({bytes + 1, 1}));
 }
 
 TEST(ValueModel, TextFormsAreThoseThatPeopleRead) {
     EXPECT_EQ(Value::fromBoolean(false).toText(), "false");
-    EXPECT_EQ(Value::fromReal(0.5).toText(), "0.5");
+    EXPECT_EQ(Value::fromReal(0.1).toText(), "0.10000000000000001");
+    EXPECT_EQ(Value::fromReal(0.1, CMPI_real32).toText(), "0.100000001");
     EXPECT_EQ(Value::fromArray(CMPI_uint16,
                                {Value::fromUnsigned(5, CMPI_uint16), Value::null(CMPI_uint16)})
                   .toText(),
@@ -85,6 +93,7 @@ TEST(ObjectPaths, AreEqualWhateverTheOrderAndCaseOfTheirKeys) {
     EXPECT_EQ(path, (ObjectPathValue{"ROOT/cimv2", "test_thing", {{"b", "2"}, {"a", "1"}}}));
     EXPECT_NE(path, (ObjectPathValue{"root/cimv2", "TEST_Thing", {{"A", "1"}, {"B", "3"}}}));
     EXPECT_NE(path, (ObjectPathValue{"root/cimv2", "TEST_Thing", {{"A", "1"}}}));
+    EXPECT_NE((ObjectPathValue{"root/cimv2", "TEST_Thing", {{"A", "1"}}}), path);
     EXPECT_NE(path, (ObjectPathValue{"root/interop", "TEST_Thing", {{"A", "1"}, {"B", "2"}}}));
 }
 
