@@ -61,6 +61,9 @@ TEST_F(Companion, ServesTheOneComputerSystemByTheFrameworksName) {
 TEST_F(Companion, GetsTheInstanceThatThePathNames) {
     EXPECT_THAT(texts(run(Operation::GetInstance, computerSystemPath("host1")).instances),
                 ElementsAre(host1));
+    EXPECT_THAT(texts(run(Operation::GetInstance, path("KORVA_ComputerSystem", {{"Name", "host1"}}))
+                          .instances),
+                ElementsAre(host1));
     EXPECT_EQ(run(Operation::GetInstance, computerSystemPath("host2")).rc, CMPI_RC_ERR_NOT_FOUND);
     EXPECT_EQ(run(Operation::GetInstance,
                   path("KORVA_ComputerSystem", {{"Name", "host1"}, {"CreationClassName", "x"}}))
