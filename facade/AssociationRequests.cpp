@@ -61,7 +61,6 @@ struct Pair {
 // whose far end has no keys, ties the source to nothing.
 void addPair(std::vector<Pair>& pairs, const Request& request, const Hop& hop,
              const Identity& source, const CMPIObjectPath* path, const CMPIInstance* instance) {
-    if (path == nullptr) return;
     const CMPIObjectPath* const near = referenceOf(path, hop.near.role);
     const CMPIObjectPath* const far = referenceOf(path, hop.far.role);
     if (near == nullptr || far == nullptr || keysOf(far).empty()) return;
@@ -84,8 +83,7 @@ std::vector<Pair> pairsOf(const Request& request, const Filter& filter, Ask ask)
         for (const CMPIObjectPath* path : answer.paths())
             addPair(pairs, request, hop, source, path, nullptr);
         for (const CMPIInstance* instance : answer.instances())
-            addPair(pairs, request, hop, source, instance->ft->getObjectPath(instance, nullptr),
-                    instance);
+            addPair(pairs, request, hop, source, pathOf(instance), instance);
     }
     return pairs;
 }
@@ -135,8 +133,7 @@ class InstanceIndex {
     const CMPIInstance* find(const Identity& identity, const Class& itsClass) {
         if (fetched_.insert(&itsClass).second)
             for (const CMPIInstance* instance : instancesOf(request_, itsClass))
-                instances_.emplace(
-                    request_.identityOf(instance->ft->getObjectPath(instance, nullptr)), instance);
+                instances_.emplace(request_.identityOf(pathOf(instance)), instance);
         const auto found = instances_.find(identity);
         return found == instances_.end() ? nullptr : found->second;
     }

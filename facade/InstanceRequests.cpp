@@ -78,7 +78,7 @@ void getInstance(const Request& request, const char** properties) {
     requireServed(answer, request.className());
     Identities candidates;
     for (const CMPIInstance* instance : answer.instances()) {
-        candidates.push_back(request.identityOf(instance->ft->getObjectPath(instance, nullptr)));
+        candidates.push_back(request.identityOf(pathOf(instance)));
         if (candidates.back() == wanted) return request.deliver({instance}, properties);
     }
     // The provider tells of elements only those that have some of the keys.

@@ -10,13 +10,12 @@ namespace VA::OSStatusFacade {
 
 namespace {
 
+// What associations refer to has no references itself; that also limits the depth.
 std::string referenceProblem(const CMPIObjectPath* reference) {
-    if (const Class* const known = findClass(classNameOf(reference)))
-        return keyProblem(*known, reference);
-    // Of a class that is not known here only the depth is limited: elements have no references.
     for (const KeyBinding& key : keysOf(reference))
         if (key.reference() != nullptr) return "key " + printable(key.name) + " is a reference";
-    return {};
+    const Class* const known = findClass(classNameOf(reference));
+    return known == nullptr ? "" : keyProblem(*known, reference);
 }
 
 std::string valueProblem(const Key& key, const KeyBinding& binding) {

@@ -5,6 +5,7 @@
 #include <algorithm>
 
 #include "Names.h"
+#include "Refusal.h"
 
 namespace VA::OSStatusFacade {
 
@@ -100,16 +101,28 @@ std::vector<KeyBinding> keysOf(const CMPIObjectPath* path) {
         CMPIStatus status = {CMPI_RC_OK, nullptr};
         CMPIString* name = nullptr;
         const CMPIData data = path->ft->getKeyAt(path, index, &name, &status);
-        if (status.rc == CMPI_RC_OK && !isAbsent(data)) keys.push_back({charactersOf(name), data});
+        if (status.rc != CMPI_RC_OK)
+            throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not tell a key");
+        if (!isAbsent(data)) keys.push_back({charactersOf(name), data});
     }
     return keys;
+}
+
+const CMPIObjectPath* pathOf(const CMPIInstance* instance) {
+    const CMPIObjectPath* const path = instance->ft->getObjectPath(instance, nullptr);
+    if (path == nullptr)
+        throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not tell a path");
+    return path;
 }
 
 const CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* role) {
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     const CMPIData data = path->ft->getKey(path, role, &status);
-    if (status.rc != CMPI_RC_OK || data.type != CMPI_ref || isAbsent(data)) return nullptr;
-    return data.value.ref;
+    if (status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY || status.rc == CMPI_RC_ERR_NOT_FOUND)
+        return nullptr;
+    if (status.rc != CMPI_RC_OK)
+        throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not tell a reference");
+    return data.type == CMPI_ref && !isAbsent(data) ? data.value.ref : nullptr;
 }
 
 Identity identityOf(const CMPIObjectPath* path, std::string_view nameSpace) {

@@ -12,7 +12,8 @@
 
 namespace VA::OSStatusFacade {
 
-// Reading object paths of any broker. Null paths are accepted: they have no class and no keys.
+// Reading object paths of any broker. Null paths are accepted: they have no class and no keys. What
+// the object manager has but fails to tell ends the request: these functions throw Refusal then.
 
 /// The characters of a broker's string, empty when there are none.
 std::string charactersOf(const CMPIString* string);
@@ -34,6 +35,9 @@ struct KeyBinding {
 };
 
 std::vector<KeyBinding> keysOf(const CMPIObjectPath* path);
+
+/// The path of an instance, never null.
+const CMPIObjectPath* pathOf(const CMPIInstance* instance);
 
 /// The path that an association's path refers to under `role`; null if there is none.
 const CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* role);

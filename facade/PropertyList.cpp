@@ -32,8 +32,9 @@ void copyProperties(const CMPIInstance* from, const std::vector<const char*>& na
         CMPIStatus status = {CMPI_RC_OK, nullptr};
         CMPIString* name = nullptr;
         const CMPIData data = from->ft->getPropertyAt(from, index, &name, &status);
-        if (status.rc != CMPI_RC_OK || (data.state & (CMPI_nullValue | CMPI_badValue)) != 0)
-            continue;
+        if (status.rc != CMPI_RC_OK)
+            throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not tell a property");
+        if ((data.state & CMPI_nullValue) != 0) continue;
         const std::string property = charactersOf(name);
         if (contains(names, property))
             to->ft->setProperty(to, property.c_str(), argument(data), data.type);
@@ -45,9 +46,8 @@ void copyProperties(const CMPIInstance* from, const std::vector<const char*>& na
 const CMPIInstance* narrowed(const CMPIBroker* broker, const CMPIInstance* instance,
                              const char** properties) {
     if (properties == nullptr) return instance;
-    const CMPIObjectPath* const path = instance->ft->getObjectPath(instance, nullptr);
-    CMPIInstance* const result =
-        path == nullptr ? nullptr : broker->eft->newInstance(broker, path, nullptr);
+    const CMPIObjectPath* const path = pathOf(instance);
+    CMPIInstance* const result = broker->eft->newInstance(broker, path, nullptr);
     if (result == nullptr)
         throw Refusal(CMPI_RC_ERR_FAILED, "the object manager makes no instance");
 

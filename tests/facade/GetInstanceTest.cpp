@@ -127,6 +127,9 @@ TEST_F(GetInstance, SaysWhichKeyIsNotAsItMustBe) {
         {installed(path("Other_ComputerSystem", {{"Itself", to(system)}}), part),
          "4 GroupComponent: key Itself is a reference"},
 
+        {installed(installed(system, part), part),
+         "4 GroupComponent: key GroupComponent is a reference"},
+
         {operatingSystemPath("host1", "Linux2"),
          "6 no instance of KORVA_OperatingSystem has this Name"},
         {operatingSystemPath("host2", "Linux"),

@@ -61,4 +61,22 @@ TEST_F(FacadeUpcalls, OfRequestsForInstancesAreTheProviders) {
     }
 }
 
+// What an enumeration costs beyond the provider: the class and the namespace of its path are read.
+TEST_F(FacadeUpcalls, EnumerationsTakeTwoLooksAtTheirPathMoreThanTheProvider) {
+    OperationRequest request;
+    request.path = path("KORVA_OperatingSystem");
+    for (const Operation operation :
+         {Operation::EnumerateInstances, Operation::EnumerateInstanceNames}) {
+        request.operation = operation;
+        const auto calls = [&](const ProviderLibrary& asked) {
+            FaultPlan plan;
+            broker.setFaultPlan(&plan);
+            cmpihost::invoke(asked, broker, request);
+            broker.setFaultPlan(nullptr);
+            return plan.calls();
+        };
+        EXPECT_EQ(calls(facade), calls(library) + 4);
+    }
+}
+
 }  // namespace
