@@ -3,7 +3,6 @@
 #include <charconv>
 #include <cstdio>
 #include <ctime>
-#include <limits>
 
 #include "host/Utf8.h"
 #include "host/broker/DateTimeText.h"
@@ -22,9 +21,7 @@ std::string formatted(const char* format, Arguments... arguments) {
 }
 
 std::string instantText(std::uint64_t seconds) {
-    if (seconds > static_cast<std::uint64_t>(std::numeric_limits<std::time_t>::max())) {
-        return {};
-    }
+    static_assert(sizeof(std::time_t) == 8, "an instant of any year is to be shown");
     const auto instant = static_cast<std::time_t>(seconds);
     std::tm local{};
     if (localtime_r(&instant, &local) == nullptr) {
