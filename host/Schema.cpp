@@ -73,9 +73,7 @@ void Schema::check(const mof::Class& added) const {
                             "class '" + added.name + "' is declared twice, first at " +
                                 earlier->file + ":" + std::to_string(earlier->position.line));
     }
-    const bool circular = !added.superclass.empty() && (equalNames(added.superclass, added.name) ||
-                                                        isA(added.superclass, added.name));
-    if (circular) {
+    if (isA(added.superclass, added.name)) {
         throw mof::MofError(added.file, added.position,
                             "class '" + added.name + "' descends from itself");
     }

@@ -106,6 +106,19 @@ TEST_F(Printers, ShowAnInstanceAsATable) {
               "  Part     instance of Part\n");
 }
 
+TEST_F(Printers, ShowSizesAndNamesFromTheirBoundsOn) {
+    InstanceValue machine{machinePath(), {}};
+    const auto shown = [&](const char* name, std::uint64_t number) {
+        machine.properties = {{name, Value::fromUnsigned(number)}};
+        const std::string text = printed(Format::Table, std::vector{machine});
+        return text.substr(text.find("\n  ") + 3);
+    };
+    EXPECT_EQ(shown("Memory", 1023), "Memory  1023\n");
+    EXPECT_EQ(shown("Memory", 1024), "Memory  1024 (1.0 MiB)\n");
+    EXPECT_EQ(shown("Kind", INT64_MAX), "Kind  9223372036854775807 (Rest)\n");
+    EXPECT_EQ(shown("Kind", std::uint64_t{INT64_MAX} + 1), "Kind  9223372036854775808\n");
+}
+
 TEST_F(Printers, ShowAnInstanceAsMof) {
     EXPECT_EQ(printed(Format::Mof, std::vector{machine()}),
               "instance of Machine {\n"

@@ -21,6 +21,8 @@ TEST(ReadableSize, ChoosesTheLargestUnitThatLeavesAtLeastOne) {
 TEST(ReadableSize, RoundsIntoTheNextUnit) {
     EXPECT_EQ(readableSize(1024 * 1024 - 1), "1.0 GiB");
     EXPECT_EQ(readableSize(1023 * 1024), "1023.0 MiB");
+    EXPECT_EQ(readableSize(1024 + 972), "1.9 MiB");
+    EXPECT_EQ(readableSize(1024 + 973), "2.0 MiB");
 }
 
 class ReadableDateTime : public testing::Test {

@@ -6,6 +6,7 @@
 #include <fstream>
 
 #include "host/MofParser.h"
+#include "host/Names.h"
 #include "host/SchemaCatalogue.h"
 
 namespace {
@@ -130,9 +131,24 @@ TEST_F(SchemaFolder, WithABrokenFileSaysWhichOne) {
     }
 }
 
+TEST_F(SchemaFolder, WithAFileThatLeadsNowhereSaysWhichOne) {
+    fs::create_symlink(folder_ / "missing", folder_ / "a.mof");
+    try {
+        Schema::load(folder_);
+        FAIL() << "no error";
+    } catch (const std::runtime_error& error) {
+        EXPECT_EQ(error.what(),
+                  "the schema file " + (folder_ / "a.mof").string() + " cannot be read");
+    }
+}
+
 TEST_F(SchemaFolder, WithoutAClassIsRefused) {
     EXPECT_THROW(Schema::load(folder_), std::runtime_error);
     EXPECT_THROW(Schema::load(folder_ / "missing"), std::runtime_error);
+}
+
+TEST(Names, CompareWithTheirAsciiLettersInLowerCase) {
+    EXPECT_EQ(cmpihost::lowered("@AZ[`az{_09\xC3\x89"), "@az[`az{_09\xC3\x89");
 }
 
 TEST(SchemaCatalogue, ShowsTheBrokerWhatTheSchemaDeclares) {

@@ -45,6 +45,27 @@ TEST(ValueMap, PrefersTheNarrowerRange) {
     EXPECT_EQ(nameOf(mapOf(R"(ValueMap{"1","1"}, Values{"first","second"})"), 1), "first");
 }
 
+TEST(ValueMap, PrefersTheFirstOfTwoEqualRanges) {
+    EXPECT_EQ(nameOf(mapOf(R"(ValueMap{"1..2","2..3"}, Values{"first","second"})"), 2), "first");
+}
+
+TEST(ValueMap, IsForIntegersOfEverySize) {
+    for (const char* type :
+         {"uint8", "sint8", "uint16", "sint16", "uint32", "sint32", "uint64", "sint64"}) {
+        EXPECT_EQ(nameOf(mapOf(R"(Values{"zero"})", type), 0), "zero") << type;
+    }
+    for (const char* type : {"boolean", "char16", "datetime", "real32", "real64"}) {
+        EXPECT_TRUE(mapOf(R"(Values{"zero"})", type).empty()) << type;
+    }
+}
+
+TEST(ValueMap, TakesNumbersUpToTheLargestSignedOne) {
+    const ValueMap map = mapOf(R"(ValueMap{"9223372036854775807"}, Values{"most"})", "uint64");
+    EXPECT_EQ(nameOf(map, INT64_MAX), "most");
+    EXPECT_THROW(mapOf(R"(ValueMap{"9223372036854775808"}, Values{"more"})", "uint64"),
+                 std::runtime_error);
+}
+
 TEST(ValueMap, TakesNegativeNumbersAndRangesWithoutABeginning) {
     const ValueMap map = mapOf(R"(ValueMap{"..-5","-1"}, Values{"low","minus one"})", "sint16");
     EXPECT_EQ(nameOf(map, -6), "low");
