@@ -192,6 +192,15 @@ TEST(CommandLine, LeavesWhatStandsBehindTwoDashesAsItIs) {
     EXPECT_THAT(accepted({"ci", "X", "--", "--a="}).assignments, ElementsAre("--a="));
 }
 
+TEST(CommandLine, TakesANumberOfComputerSystemsFromNoneToAThousand) {
+    EXPECT_EQ(accepted({"--computer-systems", "0", "tree"}).computerSystems, 0U);
+    EXPECT_EQ(accepted({"tree", "--computer-systems", "1000"}).computerSystems, 1000U);
+    EXPECT_EQ(accepted({"tree"}).computerSystems, std::nullopt);
+    for (const char* number : {"-1", "1001", "x"}) {
+        EXPECT_EQ(parsed({"--computer-systems", number, "tree"}).status, exitUsage) << number;
+    }
+}
+
 TEST(CommandLine, TellsItsVersion) {
     const ParsedCommandLine result = parsed({"--version"});
     EXPECT_FALSE(result.commandLine.has_value());
@@ -208,7 +217,10 @@ TEST(CommandLine, DescribesEverythingInItsHelp) {
                              "--format FORMAT",
                              "--log",
                              "--bare",
-                             "--schema DIR",
+                             "\n  --schema DIR                    Folder of",
+                             "\nOperations:\n",
+                             "\nPictures:\n",
+                             "\nPaths:\n",
                              "--version",
                              "\nei\n",
                              "\nein\n",
@@ -238,7 +250,12 @@ TEST(CommandLine, DescribesOneOperation) {
     EXPECT_EQ(result.status, exitDone);
     EXPECT_THAT(result.text, HasSubstr("Usage: cmpihost ai [OPTIONS] PATH [PROPERTY...]"));
     EXPECT_THAT(result.text, HasSubstr("--assoc-class CLASS"));
+    EXPECT_THAT(result.text, HasSubstr("\nPaths:\n"));
     EXPECT_THAT(result.text, testing::Not(HasSubstr("--lang")));
+    EXPECT_THAT(parsed({"xq", "--help"}).text, HasSubstr("--lang NAME=WQL"));
+    for (const char* word : {"xq", "tree"}) {
+        EXPECT_THAT(parsed({word, "--help"}).text, HasSubstr("--namespace NAME=root/cimv2"));
+    }
 }
 
 }  // namespace
