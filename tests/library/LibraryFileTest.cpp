@@ -23,6 +23,7 @@ using testing::UnorderedElementsAre;
 
 const std::string folder = KORVA_BINARY_DIR "/lib/";
 const std::string provider = folder + "libkorzbosstatusprofileprovider.so.1";
+const std::string facade = folder + "libkorvaosstatusfacade.so.1";
 
 std::string output(const std::string& command) {
     const std::unique_ptr<std::FILE, int (*)(std::FILE*)> pipe(popen(command.c_str(), "r"), pclose);
@@ -48,6 +49,13 @@ std::vector<std::string> dynamicEntries(const std::string& file, const std::stri
     return names;
 }
 
+std::vector<std::string> definedSymbols(const std::string& file) {
+    std::vector<std::string> names;
+    for (const std::string& line : lines(output("nm -D --defined-only " + file)))
+        names.push_back(line.substr(line.rfind(' ') + 1));
+    return names;
+}
+
 std::vector<std::string> undefinedSymbols(const std::string& file) {
     std::vector<std::string> names;
     for (const std::string& line : lines(output("nm -D --undefined-only " + file))) {
@@ -67,6 +75,8 @@ bool mapped(const std::string& name) {
 TEST(LibraryFile, BearsItsSoname) {
     EXPECT_EQ(dynamicEntries(provider, "SONAME"),
               (std::vector<std::string>{"libkorzbosstatusprofileprovider.so.1"}));
+    EXPECT_EQ(dynamicEntries(facade, "SONAME"),
+              (std::vector<std::string>{"libkorvaosstatusfacade.so.1"}));
     EXPECT_EQ(dynamicEntries(folder + "libvaprovider.so.1", "SONAME"),
               (std::vector<std::string>{"libvaprovider.so.1"}));
     EXPECT_EQ(dynamicEntries(folder + "libvainstrumentation.so.1", "SONAME"),
@@ -76,12 +86,21 @@ TEST(LibraryFile, BearsItsSoname) {
 }
 
 TEST(LibraryFile, ExportsTheTwoFactoriesAndTheNotice) {
-    std::vector<std::string> names;
-    for (const std::string& line : lines(output("nm -D --defined-only " + provider)))
-        names.push_back(line.substr(line.rfind(' ') + 1));
-    EXPECT_THAT(names, UnorderedElementsAre("OperatingSystemProvider_Create_InstanceMI",
-                                            "OperatingSystemProvider_Create_AssociationMI",
-                                            "_ZN2VA16OSStatusProvider9COPYRIGHTE"));
+    EXPECT_THAT(definedSymbols(provider),
+                UnorderedElementsAre("OperatingSystemProvider_Create_InstanceMI",
+                                     "OperatingSystemProvider_Create_AssociationMI",
+                                     "_ZN2VA16OSStatusProvider9COPYRIGHTE"));
+}
+
+TEST(LibraryFile, OfTheFacadeExportsItsFactoriesAndNeedsProviderAndLog) {
+    EXPECT_THAT(definedSymbols(facade),
+                UnorderedElementsAre("OSStatusFacade_Create_InstanceMI",
+                                     "OSStatusFacade_Create_AssociationMI"));
+    const std::vector<std::string> needed = dynamicEntries(facade, "NEEDED");
+    EXPECT_THAT(needed, Contains("libkorzbosstatusprofileprovider.so.1"));
+    EXPECT_THAT(needed, Contains("libzblog.so.1"));
+    for (const char* library : {"libvaprovider.so.1", "libvainstrumentation.so.1"})
+        EXPECT_THAT(needed, Not(Contains(library)));
 }
 
 // The sections of the provider's objects whose names contain `part`, by name.
@@ -127,8 +146,8 @@ TEST(LibraryFile, NeedsTheFrameworkAndTheLanguagesLibrariesOnly) {
 }
 
 TEST(LibraryFile, IsHardened) {
-    for (const char* name : {"libkorzbosstatusprofileprovider.so.1", "libvaprovider.so.1",
-                             "libvainstrumentation.so.1", "libzblog.so.1"}) {
+    for (const char* name : {"libkorvaosstatusfacade.so.1", "libkorzbosstatusprofileprovider.so.1",
+                             "libvaprovider.so.1", "libvainstrumentation.so.1", "libzblog.so.1"}) {
         const std::string segments = output("readelf -lW " + folder + name);
         EXPECT_THAT(segments, HasSubstr("GNU_RELRO")) << name;
         for (const std::string& line : lines(segments))
@@ -146,8 +165,8 @@ TEST(LibraryFile, IsHardened) {
 }
 
 TEST(LibraryFile, StartsNoProcessAndTouchesNoProcessWideState) {
-    for (const char* name : {"libkorzbosstatusprofileprovider.so.1", "libvaprovider.so.1",
-                             "libvainstrumentation.so.1", "libzblog.so.1"})
+    for (const char* name : {"libkorvaosstatusfacade.so.1", "libkorzbosstatusprofileprovider.so.1",
+                             "libvaprovider.so.1", "libvainstrumentation.so.1", "libzblog.so.1"})
         for (const char* forbidden :
              {"fork",          "vfork",     "execve",   "execv",      "execl",
               "posix_spawn",   "system",    "popen",    "tzset",      "localtime",
@@ -158,18 +177,22 @@ TEST(LibraryFile, StartsNoProcessAndTouchesNoProcessWideState) {
             EXPECT_THAT(undefinedSymbols(folder + name), Not(Contains(forbidden))) << name;
 }
 
-TEST(LibraryFile, IsGoneFromTheProcessAfterUnloading) {
+void expectGoneAfterUnloading(const std::string& file, const char* factory) {
     for (int round = 0; round < 100; ++round) {
-        void* handle = dlopen(provider.c_str(), RTLD_NOW | RTLD_GLOBAL);
+        void* handle = dlopen(file.c_str(), RTLD_NOW | RTLD_GLOBAL);
         ASSERT_NE(handle, nullptr) << dlerror();
-        EXPECT_NE(dlsym(handle, "OperatingSystemProvider_Create_InstanceMI"), nullptr);
+        EXPECT_NE(dlsym(handle, factory), nullptr);
         EXPECT_TRUE(mapped("libkorzbosstatusprofileprovider"));
         EXPECT_EQ(dlclose(handle), 0);
-        EXPECT_FALSE(mapped("libkorzbosstatusprofileprovider"));
-        EXPECT_FALSE(mapped("libvaprovider"));
-        EXPECT_FALSE(mapped("libvainstrumentation"));
-        EXPECT_FALSE(mapped("libzblog"));
+        for (const char* library : {"libkorvaosstatusfacade", "libkorzbosstatusprofileprovider",
+                                    "libvaprovider", "libvainstrumentation", "libzblog"})
+            EXPECT_FALSE(mapped(library));
     }
+}
+
+TEST(LibraryFile, IsGoneFromTheProcessAfterUnloading) {
+    expectGoneAfterUnloading(provider, "OperatingSystemProvider_Create_InstanceMI");
+    expectGoneAfterUnloading(facade, "OSStatusFacade_Create_InstanceMI");
 }
 
 }  // namespace
