@@ -16,7 +16,7 @@ class CallerState {
         ::pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &cancellation_);
     }
     ~CallerState() {
-        int ours = 0;
+        int ours{};
         ::pthread_setcancelstate(cancellation_, &ours);
         errno = error_;
     }

@@ -12,10 +12,6 @@ namespace ZBLog {
 
 namespace {
 
-bool sameTime(const timespec& one, const timespec& other) {
-    return one.tv_sec == other.tv_sec && one.tv_nsec == other.tv_nsec;
-}
-
 /// Appends up to `limit` bytes from the start of an open file; 0 or an error number.
 int readUpTo(std::size_t limit, int descriptor, std::string& text) {
     char block[4096];
@@ -37,11 +33,10 @@ ConfigurationFile::ConfigurationFile(ConfigurationSource source, Surroundings& s
     : source_(std::move(source)), surroundings_(surroundings) {}
 
 bool ConfigurationFile::Stamp::operator==(const Stamp& other) const {
-    if (error != 0 || other.error != 0) return error == other.error;
-    return FileIdentity::of(status) == FileIdentity::of(other.status) &&
+    return error == other.error && FileIdentity::of(status) == FileIdentity::of(other.status) &&
            status.st_size == other.status.st_size &&
-           sameTime(status.st_mtim, other.status.st_mtim) &&
-           sameTime(status.st_ctim, other.status.st_ctim);
+           status.st_ctim.tv_sec == other.status.st_ctim.tv_sec &&
+           status.st_ctim.tv_nsec == other.status.st_ctim.tv_nsec;
 }
 
 std::optional<ParsedConfiguration> ConfigurationFile::news() {
@@ -57,7 +52,6 @@ std::optional<ParsedConfiguration> ConfigurationFile::news() {
     if (content_ && content.text == content_->text && content.problem == content_->problem) {
         return std::nullopt;
     }
-    content_.reset();  // should parsing run out of memory, the file is news again
     ParsedConfiguration parsed = parseConfiguration(content.text);
     if (!content.problem.empty()) parsed.errors.push_back({0, content.problem});
     content_ = std::move(content);
@@ -74,7 +68,6 @@ ConfigurationFile::Stamp ConfigurationFile::stamp() const {
 /// times advance in steps. Its content is then looked at once more.
 bool ConfigurationFile::isSettled(const Stamp& stamp) const {
     constexpr int settlingSeconds = 2;
-    if (stamp.error != 0) return true;
     const auto age = surroundings_.utc().tv_sec - stamp.status.st_ctim.tv_sec;
     return age < 0 || age > settlingSeconds;
 }

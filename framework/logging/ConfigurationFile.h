@@ -20,17 +20,18 @@ class ConfigurationFile {
     /// What the file says, if that is news: at the first call, and when its content or the reason
     /// why it cannot be read is another one than before. Costs one stat while the file rests.
     /// A file that is missing says nothing (the defaults), and is an error if it is required; so is
-    /// one that cannot be read. Throws std::bad_alloc.
+    /// one that cannot be read. Throws std::bad_alloc; the object is of no use then.
     std::optional<ParsedConfiguration> news();
 
     const std::string& path() const { return source_.path; }
 
   private:
     /// What stat tells; equal stamps mean that the file was not touched in between, unless the two
-    /// touches were too close in time to be told apart.
+    /// touches were too close in time to be told apart. Who sets the time of the last modification
+    /// sets that of the last change, too.
     struct Stamp {
         int error;
-        struct stat status;
+        struct stat status;  // zeros where there is an error
         bool operator==(const Stamp& other) const;
     };
 

@@ -35,7 +35,7 @@ std::string quoted(std::string_view text) {
 
 bool isControl(char character) {
     const auto byte = static_cast<unsigned char>(character);
-    return byte == 0x7F || (byte < 0x20 && blanks.find(character) == std::string_view::npos);
+    return byte == 0x7F || (byte < 0x20 && character != '\t');
 }
 
 constexpr const char* sinkForm = "off, stderr, syslog or file:/PATH";

@@ -11,7 +11,7 @@ namespace {
 
 /// The same file under a number that is none of the standard streams'; -1 with errno if that fails.
 int beyondStandardStreams(int number) {
-    if (number < 0 || number > STDERR_FILENO) return number;
+    if (number == -1 || number > STDERR_FILENO) return number;
     const int moved = ::fcntl(number, F_DUPFD_CLOEXEC, STDERR_FILENO + 1);
     const int error = errno;
     ::close(number);
@@ -24,12 +24,7 @@ int beyondStandardStreams(int number) {
 int Descriptor::open(const char* path, int flags, mode_t mode) noexcept {
     close();
     number_ = beyondStandardStreams(::open(path, flags | O_CLOEXEC | O_NONBLOCK | O_NOCTTY, mode));
-    if (number_ < 0) return errno;
-    if (::fstat(number_, &status_) == 0) return 0;
-    const int error = errno;
-    ::close(number_);
-    number_ = -1;
-    return error;
+    return number_ != -1 && ::fstat(number_, &status_) == 0 ? 0 : errno;
 }
 
 void Descriptor::close() noexcept {
@@ -39,7 +34,7 @@ void Descriptor::close() noexcept {
 
 bool Descriptor::isOpen() const noexcept {
     struct stat now {};
-    return number_ >= 0 && ::fstat(number_, &now) == 0 &&
+    return number_ != -1 && ::fstat(number_, &now) == 0 &&
            FileIdentity::of(now) == FileIdentity::of(status_);
 }
 

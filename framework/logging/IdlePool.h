@@ -22,7 +22,6 @@ class IdlePool {
         const std::size_t start = startOfThisThread();
         for (std::size_t step = 0; step < Places; ++step) {
             std::atomic<Object*>& place = places_[(start + step) % Places].object;
-            if (place.load(std::memory_order_relaxed) == nullptr) continue;
             if (Object* const found = place.exchange(nullptr, std::memory_order_acquire)) {
                 return std::unique_ptr<Object>(found);
             }
@@ -37,7 +36,6 @@ class IdlePool {
         for (std::size_t step = 0; step < Places; ++step) {
             std::atomic<Object*>& place = places_[(start + step) % Places].object;
             Object* expected = nullptr;
-            if (place.load(std::memory_order_relaxed) != nullptr) continue;
             if (place.compare_exchange_strong(expected, object.get(), std::memory_order_release)) {
                 static_cast<void>(object.release());
                 return;

@@ -34,20 +34,14 @@ void Logger::deliver(const Record& record) noexcept {
     if (Sink* const sink = setup->sinks[index].get()) sink->write(record);
 }
 
-bool Logger::isReady() noexcept {
+void Logger::keepUp() noexcept {
     constexpr std::uint32_t interval = 1000;
-    const State state = state_.load(std::memory_order_acquire);
-    if (state == State::closed) return false;
+    if (state_.load(std::memory_order_acquire) == State::unread) return readConfiguration(patience);
     const std::uint32_t now = surroundings_.milliseconds();
-    if (state == State::unread) {
-        readConfiguration(patience);
-        return true;
-    }
     std::uint32_t last = lookedAt_.load(std::memory_order_relaxed);
     if (now - last >= interval && lookedAt_.compare_exchange_strong(last, now)) {
         readConfiguration(std::chrono::milliseconds::zero());
     }
-    return true;
 }
 
 void Logger::readConfiguration(std::chrono::milliseconds longest) noexcept {
@@ -97,23 +91,22 @@ void Logger::putInForce(const Configuration& configuration) {
     next->older.reset(former);
     Setup* const current = next.release();
     setup_ = current;
-    for (std::size_t index = 0; index < channelCount; ++index) {
-        gates_[index].set(current->configuration.channels[index]);
+    for (const Channel channel : allChannels) {
+        gates_[indexOf(channel)].set(current->configuration.of(channel));
     }
 }
 
 void Logger::freeOlder() noexcept {
-    Setup* const current = setup_;
-    if (current != nullptr && readers_ == 0) current->older.reset();
+    if (readers_ == 0) setup_.load()->older.reset();
 }
 
 void Logger::use(const Configuration& configuration) {
     const auto lock = lockPatiently(mutex_, patience);
     if (!lock.owns_lock() || state_ == State::closed) return;
-    file_ = std::make_unique<ConfigurationFile>(ConfigurationSource{}, surroundings_);
-    static_cast<void>(file_->news());
     putInForce(configuration);
     freeOlder();
+    file_ = std::make_unique<ConfigurationFile>(ConfigurationSource{}, surroundings_);
+    static_cast<void>(file_->news());
     state_ = State::running;
 }
 

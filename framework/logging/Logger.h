@@ -39,9 +39,8 @@ class Logger {
 
     /// Writes a record to its channel, if it passes. errno is left alone.
     void write(const Record& record) noexcept {
-        if (isReady() && gates_[indexOf(record.channel)].passes(record.level, record.text)) {
-            deliver(record);
-        }
+        keepUp();
+        if (gates_[indexOf(record.channel)].passes(record.level, record.text)) deliver(record);
     }
 
     /// Puts a configuration in force, and lets go of the file. For tests.
@@ -58,7 +57,8 @@ class Logger {
 
     class Reading;
 
-    bool isReady() noexcept;
+    /// Looks at the configuration file when it is time to.
+    void keepUp() noexcept;
     /// Waits `longest` for another thread that is at it.
     void readConfiguration(std::chrono::milliseconds longest) noexcept;
     void follow(ConfigurationFile& file);

@@ -1,6 +1,7 @@
 #ifndef ZBLOG_RECORD_H
 #define ZBLOG_RECORD_H
 
+#include <array>
 #include <cstddef>
 #include <string_view>
 
@@ -8,7 +9,8 @@ namespace ZBLog {
 
 /// The two ways that a record takes.
 enum class Channel : std::size_t { log, trace };
-constexpr std::size_t channelCount = 2;
+constexpr std::array allChannels{Channel::log, Channel::trace};
+constexpr std::size_t channelCount = allChannels.size();
 
 constexpr std::size_t indexOf(Channel channel) {
     return static_cast<std::size_t>(channel);

@@ -14,10 +14,9 @@ bool sameDestination(const ChannelConfiguration& one, const ChannelConfiguration
 
 std::shared_ptr<Sink> existingSink(const ChannelConfiguration& wanted, const Setup* setup) {
     if (setup == nullptr) return nullptr;
-    for (std::size_t index = 0; index < channelCount; ++index) {
-        if (sameDestination(wanted, setup->configuration.channels[index]) && setup->sinks[index]) {
-            return setup->sinks[index];
-        }
+    for (const Channel channel : allChannels) {
+        const std::shared_ptr<Sink>& sink = setup->sinks[indexOf(channel)];
+        if (sink && sameDestination(wanted, setup->configuration.of(channel))) return sink;
     }
     return nullptr;
 }
@@ -25,7 +24,7 @@ std::shared_ptr<Sink> existingSink(const ChannelConfiguration& wanted, const Set
 std::shared_ptr<Sink> newSink(const ChannelConfiguration& wanted, Surroundings& surroundings) {
     switch (wanted.destination) {
         case Destination::nowhere:
-            break;
+            return nullptr;
         case Destination::standardError:
             return std::make_shared<StandardErrorSink>(surroundings);
         case Destination::systemLog:
@@ -42,11 +41,11 @@ std::unique_ptr<Setup> makeSetup(const Configuration& configuration, const Setup
                                  Surroundings& surroundings) {
     auto setup = std::make_unique<Setup>();
     setup->configuration = configuration;
-    for (std::size_t index = 0; index < channelCount; ++index) {
-        const ChannelConfiguration& wanted = configuration.channels[index];
+    for (const Channel channel : allChannels) {
+        const ChannelConfiguration& wanted = configuration.of(channel);
         std::shared_ptr<Sink> sink = existingSink(wanted, former);
         if (!sink) sink = existingSink(wanted, setup.get());
-        setup->sinks[index] = sink ? std::move(sink) : newSink(wanted, surroundings);
+        setup->sinks[indexOf(channel)] = sink ? std::move(sink) : newSink(wanted, surroundings);
     }
     return setup;
 }

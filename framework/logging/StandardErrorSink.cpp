@@ -19,7 +19,7 @@ LineSink::Output StandardErrorSink::output(bool wait) noexcept {
     for (;;) {
         const auto rest =
             std::chrono::duration_cast<std::chrono::milliseconds>(deadline - Clock::now()).count();
-        pollfd output{STDERR_FILENO, POLLOUT, 0};
+        pollfd output{STDERR_FILENO, POLLOUT, {}};
         const int ready = ::poll(&output, 1, rest > 0 ? static_cast<int>(rest) : 0);
         // A stream in error is written to all the same: the write names the reason.
         if (ready > 0) return {STDERR_FILENO, 0};

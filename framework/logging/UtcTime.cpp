@@ -23,7 +23,6 @@ long long floorDivide(long long value, long long divisor) {
 Date dateOf(long long day) {
     constexpr long long firstOfMarch2000 = 11017;
     constexpr long long per400Years = 146097, perCentury = 36524, per4Years = 1461, perYear = 365;
-    constexpr int daysOfMonth[] = {31, 30, 31, 30, 31, 31, 30, 31, 30, 31, 31, 29};
 
     const long long cycle = floorDivide(day - firstOfMarch2000, per400Years);
     long long rest = day - firstOfMarch2000 - cycle * per400Years;
@@ -34,8 +33,9 @@ Date dateOf(long long day) {
     const long long single = std::min(rest / perYear, 3LL);
     rest -= single * perYear;
 
-    int month = 0;
-    while (rest >= daysOfMonth[month]) rest -= daysOfMonth[month++];
+    // From March on, every five months have 153 days, and their lengths alternate.
+    const auto month = static_cast<int>((5 * rest + 2) / 153);
+    rest -= (153 * month + 2) / 5;
     const bool afterNewYear = month >= 10;
     const long long year = 2000 + 400 * cycle + 100 * century + 4 * fours + single;
     return {year + (afterNewYear ? 1 : 0), month + (afterNewYear ? -9 : 3),

@@ -31,17 +31,20 @@ class WriteSignals {
     /// Takes back the signal that a write raised with this error; one that was pending before
     /// stays.
     void discardSignalOf(int error) const noexcept {
-        const int signal = error == EPIPE ? SIGPIPE : error == EFBIG ? SIGXFSZ : 0;
-        if (signal == 0 || ::sigismember(&pending_, signal) == 1) return;
+        if (error == EPIPE) discard(SIGPIPE);
+        if (error == EFBIG) discard(SIGXFSZ);
+    }
+
+  private:
+    void discard(int signal) const noexcept {
+        if (::sigismember(&pending_, signal) == 1) return;
         sigset_t raised;
         ::sigemptyset(&raised);
         ::sigaddset(&raised, signal);
         const timespec noWait{};
-        while (::sigtimedwait(&raised, nullptr, &noWait) < 0 && errno == EINTR) {
-        }
+        ::sigtimedwait(&raised, nullptr, &noWait);
     }
 
-  private:
     sigset_t set_{};
     sigset_t former_{};
     sigset_t pending_{};

@@ -1,5 +1,6 @@
 #include "ZBMessageBuffer.h"
 
+#include <algorithm>
 #include <locale>
 
 #include "Gatherer.h"
@@ -71,7 +72,8 @@ void ZBMessageBuffer::Gatherer::resetStream() noexcept {
 
 /// A huge text must not hold on to its memory for months.
 bool ZBMessageBuffer::Gatherer::isWorthKeeping() const noexcept {
-    return texts_[0].capacity() <= keptCapacity && texts_[1].capacity() <= keptCapacity;
+    return std::all_of(texts_.begin(), texts_.end(),
+                       [](const std::string& text) { return text.capacity() <= keptCapacity; });
 }
 
 ZBMessageBuffer::ZBMessageBuffer() : gatherer_(Gatherer::obtain().release()) {}

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <limits>
 
 namespace VA {
 namespace {
@@ -13,19 +14,21 @@ struct Field {
     int most;
 };
 
+constexpr int any = std::numeric_limits<int>::max();
+
 constexpr Field pointInTime[] = {
-    {0, 4, 0, 9999},     // year
-    {4, 2, 1, 12},       // month
-    {6, 2, 1, 31},       // day
-    {8, 2, 0, 23},       // hour
-    {10, 2, 0, 59},      // minute
-    {12, 2, 0, 60},      // second, a leap second included
-    {15, 6, 0, 999999},  // microseconds
+    {0, 4, 0, any},   // year
+    {4, 2, 1, 12},    // month
+    {6, 2, 1, 31},    // day
+    {8, 2, 0, 23},    // hour
+    {10, 2, 0, 59},   // minute
+    {12, 2, 0, 60},   // second, a leap second included
+    {15, 6, 0, any},  // microseconds
 };
 constexpr Field interval[] = {
-    {0, 8, 0, 99999999}, {8, 2, 0, 23}, {10, 2, 0, 59}, {12, 2, 0, 59}, {15, 6, 0, 999999},
+    {0, 8, 0, any}, {8, 2, 0, 23}, {10, 2, 0, 59}, {12, 2, 0, 59}, {15, 6, 0, any},
 };
-constexpr Field offset = {22, 3, 0, 999};
+constexpr Field offset = {22, 3, 0, any};
 
 bool isDigit(char character) {
     return character >= '0' && character <= '9';

@@ -129,7 +129,7 @@ void ProviderUtilities::setProperty(const CMPIBroker* broker, CMPIInstance* inst
                                     const char* name, std::string& text, bool isDateTime) {
     if (!isDateTime) return setProperty(instance, name, text);
     // Brokers differ in what they make of a text that is no datetime; none may get the chance.
-    if (broker == nullptr || !isCimDateTime(text)) return;
+    if (broker == nullptr || instance == nullptr || !isCimDateTime(text)) return;
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     CMPIDateTime* moment = broker->eft->newDateTimeFromChars(broker, text.c_str(), &status);
     if (moment != nullptr && status.rc == CMPI_RC_OK)

@@ -70,7 +70,7 @@ void ProviderUtilities::transformMonikerToObjectPath(Moniker& moniker, CMPIObjec
     if (path == nullptr) return;
     const unsigned int count = moniker.getKeyCount();
     for (unsigned int index = 0; index < count; ++index) {
-        if (!moniker.selectKey(index)) continue;
+        moniker.selectKey(index);
         std::string name;
         std::string value;
         moniker.getName(name);

@@ -5,7 +5,9 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <chrono>
 #include <filesystem>
+#include <thread>
 
 #include "tests/logging/LoggingSupport.h"
 
@@ -40,6 +42,38 @@ class ConfigurationFileTest : public testing::Test {
     ConfigurationFile file_{{path_, true}, surroundings_};
 };
 
+/// "log.level = 1" in a mapped file, where a store changes the content and nothing that stat tells.
+class UnnoticedChanges {
+  public:
+    UnnoticedChanges() : memory_(::memfd_create("zblog.conf", MFD_CLOEXEC)) {
+        constexpr char content[] = "log.level = 1";
+        constexpr std::size_t size = sizeof content - 1;
+        EXPECT_EQ(::pwrite(memory_, content, size, 0), static_cast<ssize_t>(size));
+        content_ = static_cast<char*>(
+            ::mmap(nullptr, size, PROT_READ | PROT_WRITE, MAP_SHARED, memory_, 0));
+        EXPECT_NE(content_, MAP_FAILED);
+        setLevel('1');  // only the first store into a page is noticed
+    }
+    ~UnnoticedChanges() {
+        ::munmap(content_, 1);
+        ::close(memory_);
+    }
+    UnnoticedChanges(const UnnoticedChanges&) = delete;
+    UnnoticedChanges& operator=(const UnnoticedChanges&) = delete;
+
+    void setLevel(char digit) { content_[12] = digit; }
+    std::string path() const { return "/proc/self/fd/" + std::to_string(memory_); }
+    time_t changedAt() const {
+        struct stat status {};
+        EXPECT_EQ(::fstat(memory_, &status), 0);
+        return status.st_ctim.tv_sec;
+    }
+
+  private:
+    int memory_;
+    char* content_ = nullptr;
+};
+
 TEST_F(ConfigurationFileTest, IsNewsOnceAndAgainWhenItsContentChanges) {
     writeLongAgo("log.level = 1\n");
     EXPECT_EQ(newsOf(file_), "1");
@@ -67,29 +101,37 @@ TEST_F(ConfigurationFileTest, IsNewsWhenAnotherFileTakesItsPlace) {
     EXPECT_EQ(newsOf(file_), "2");
 }
 
-TEST_F(ConfigurationFileTest, SeesASecondChangeInTheSameMoment) {
-    // A store into a mapped file changes the content and nothing that stat tells.
-    const int memory = ::memfd_create("zblog.conf", MFD_CLOEXEC);
-    const std::string content = "log.level = 1\n";
-    ASSERT_EQ(::pwrite(memory, content.data(), content.size(), 0),
-              static_cast<ssize_t>(content.size()));
-    void* const mapped =
-        ::mmap(nullptr, content.size(), PROT_READ | PROT_WRITE, MAP_SHARED, memory, 0);
-    ASSERT_NE(mapped, MAP_FAILED);
-    char& level = static_cast<char*>(mapped)[content.size() - 2];
-    level = '1';  // only the first store into a page is noticed
-    struct stat status {};
-    ASSERT_EQ(::fstat(memory, &status), 0);
+TEST_F(ConfigurationFileTest, SeesAChangeThatKeepsItsSizeAndItsTimeOfModification) {
+    writeLongAgo("log.level = 1\n");
+    EXPECT_EQ(newsOf(file_), "1");
+    const auto modified = std::filesystem::last_write_time(path_);
+    std::this_thread::sleep_for(std::chrono::milliseconds(20));  // file times advance in steps
+    logging_test::writeFile(path_, "log.level = 2\n");
+    std::filesystem::last_write_time(path_, modified);
+    EXPECT_EQ(newsOf(file_), "2");
+}
 
-    ConfigurationFile file({"/proc/self/fd/" + std::to_string(memory), true}, surroundings_);
-    surroundings_.stopUtcAt(status.st_ctim.tv_sec);
+TEST_F(ConfigurationFileTest, SeesASecondChangeInTheSameMoment) {
+    UnnoticedChanges changes;
+    ConfigurationFile file({changes.path(), true}, surroundings_);
+    surroundings_.stopUtcAt(changes.changedAt());
     EXPECT_EQ(newsOf(file), "1");
-    level = '2';
-    surroundings_.stopUtcAt(status.st_ctim.tv_sec + 2);
+    changes.setLevel('2');
+    surroundings_.stopUtcAt(changes.changedAt() + 2);
     EXPECT_EQ(newsOf(file), "2");
     EXPECT_EQ(newsOf(file), "no news");
-    ::munmap(mapped, content.size());
-    ::close(memory);
+}
+
+TEST_F(ConfigurationFileTest, IsNotReadWhileItRests) {
+    UnnoticedChanges changes;
+    for (const time_t age : {3, -1}) {
+        changes.setLevel('1');
+        ConfigurationFile file({changes.path(), true}, surroundings_);
+        surroundings_.stopUtcAt(changes.changedAt() + age);
+        EXPECT_EQ(newsOf(file), "1");
+        changes.setLevel('2');
+        EXPECT_EQ(newsOf(file), "no news") << age;
+    }
 }
 
 TEST_F(ConfigurationFileTest, MissingFileIsAnErrorOnlyIfItIsRequired) {
@@ -100,6 +142,13 @@ TEST_F(ConfigurationFileTest, MissingFileIsAnErrorOnlyIfItIsRequired) {
     EXPECT_EQ(newsOf(optional), "no news");
     ConfigurationFile beneathAFile({"/etc/passwd/zblog.conf", false}, surroundings_);
     EXPECT_EQ(newsOf(beneathAFile), "3000");
+}
+
+TEST_F(ConfigurationFileTest, FileThatIsThereAndCannotBeReadIsAnErrorInAnyCase) {
+    std::filesystem::create_symlink(path_, path_);
+    ConfigurationFile optional({path_, false}, surroundings_);
+    EXPECT_EQ(newsOf(optional), "3000 [0: cannot be read: Too many levels of symbolic links]");
+    EXPECT_EQ(newsOf(optional), "no news");
 }
 
 TEST_F(ConfigurationFileTest, ComesAndGoes) {

@@ -122,6 +122,8 @@ const BadRow badRows[] = {
      "1: log.level must be a number from 0 to 999999, not \"0000001\"\n"},
     {"level with more behind it", "trace.level = 4000 # fine\n",
      "1: trace.level must be a number from 0 to 999999, not \"4000 # fine\"\n"},
+    {"level with a letter behind it", "log.level = 1x\n",
+     "1: log.level must be a number from 0 to 999999, not \"1x\"\n"},
     {"empty level", "trace.level =\n",
      "1: trace.level must be a number from 0 to 999999, not \"\"\n"},
     {"unknown records", "log.records = some\n",

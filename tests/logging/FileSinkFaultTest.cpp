@@ -1,3 +1,4 @@
+#include <fcntl.h>
 #include <gmock/gmock.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
@@ -188,6 +189,22 @@ TEST_F(FileSinkFaultTest, LimitOnFileSizesRaisesNoSignal) {
     EXPECT_EQ(status, 0);
 }
 
+TEST_F(FileSinkFaultTest, LimitOnFileSizesLeavesASignalPendingThatWasPendingBefore) {
+    const int status = logging_test::inChildProcess([&] {
+        sigset_t set, pending;
+        ::sigemptyset(&set);
+        ::sigaddset(&set, SIGXFSZ);
+        ::pthread_sigmask(SIG_BLOCK, &set, nullptr);
+        ::raise(SIGXFSZ);
+        ZBLog::FileSink sink(folder_ / "korva.log", surroundings_);
+        const FileSizeLimit limit(0);
+        sink.write(record("lost"));
+        ::sigpending(&pending);
+        return ::sigismember(&pending, SIGXFSZ) == 1 ? 0 : 1;
+    });
+    EXPECT_EQ(status, 0);
+}
+
 TEST_F(FileSinkFaultTest, SymbolicLinkIsRefused) {
     const std::string victim = folder_ / "victim";
     const std::string path = folder_ / "korva.log";
@@ -209,6 +226,21 @@ TEST_F(FileSinkFaultTest, FifoIsRefusedWithoutWaitingForItsReader) {
     sink.write(record("one"));
     EXPECT_THAT(surroundings_.takeSystemLog(),
                 ElementsAre(testing::StartsWith(warning + path + ": No such device or address")));
+}
+
+TEST_F(FileSinkFaultTest, FifoThatSomebodyReadsIsRefusedToo) {
+    const std::string path = folder_ / "fifo";
+    ASSERT_EQ(::mkfifo(path.c_str(), 0600), 0);
+    const int reader = ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
+    const std::size_t before = logging_test::openDescriptors();
+    ZBLog::FileSink sink(path, surroundings_);
+    for (int count = 0; count < 2; ++count) sink.write(record("one"));
+    char byte = 0;
+    EXPECT_EQ(::read(reader, &byte, 1), 0);
+    EXPECT_EQ(logging_test::openDescriptors(), before);
+    EXPECT_THAT(surroundings_.takeSystemLog(),
+                ElementsAre(testing::StartsWith(warning + path + ": Invalid argument")));
+    ::close(reader);
 }
 
 TEST_F(FileSinkFaultTest, FolderInPlaceOfTheFileIsRefused) {

@@ -1,5 +1,6 @@
 #include <dlfcn.h>
 #include <gmock/gmock.h>
+#include <malloc.h>
 #include <sys/mman.h>
 #include <unistd.h>
 
@@ -155,6 +156,7 @@ TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
                                               "trace.sink = file:" +
                                               (folder / "trace") + "\n");
     std::size_t descriptors = 0;
+    std::size_t bytes = 0;
     for (int round = 0; round < 100; ++round) {
         ASSERT_FALSE(isMapped());
         {
@@ -173,7 +175,9 @@ TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
         ASSERT_FALSE(isMapped());
         if (round == 0) descriptors = logging_test::openDescriptors();
         ASSERT_EQ(logging_test::openDescriptors(), descriptors);
+        if (round == 50) bytes = ::mallinfo2().uordblks;
     }
+    EXPECT_LT(::mallinfo2().uordblks, bytes + 2000);
     const auto texts = textsOf(readFile(folder / "log"));
     ASSERT_EQ(texts.size(), 200u);
     EXPECT_EQ(texts.front(), "round 0");

@@ -55,7 +55,7 @@ TEST(LineBuffer, EscapesWhatCouldLeaveItsLine) {
 }
 
 TEST(LineBuffer, EscapesBlanksWhereAsked) {
-    EXPECT_EQ(escaped("a b", 100, LineBuffer::Blanks::escaped), "a\\x20b");
+    EXPECT_EQ(escaped("a b", 6, LineBuffer::Blanks::escaped), "a\\x20b");
 }
 
 TEST(LineBuffer, CutsBetweenCharactersAndMarksTheCut) {
@@ -69,6 +69,8 @@ TEST(LineBuffer, CutsBetweenCharactersAndMarksTheCut) {
     EXPECT_EQ(escaped("01234\n56", 10), "01234\\...");
     EXPECT_EQ(escaped("0123\\\\\\\\", 10), "0123\\\\\\...");
     EXPECT_EQ(escaped("\n\n\n", 4), "\\...");
+    EXPECT_EQ(escaped("\n", 4), "\\x0A");
+    EXPECT_EQ(escaped("\\", 2), "\\\\");
     EXPECT_EQ(escaped("abc", 2), "\\.");
 }
 
@@ -109,6 +111,7 @@ TEST(LineBuffer, EndsItsLineAndBeginsOneAfterATornOne) {
     EXPECT_EQ(line.line(), "text\n");
     EXPECT_EQ(line.lineAfterTornLine(), "\ntext\n");
     EXPECT_EQ(line.text(), "text");
+    EXPECT_STREQ(line.nulTerminated(), "text");
 }
 
 }  // namespace

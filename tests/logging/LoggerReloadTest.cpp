@@ -167,8 +167,10 @@ TEST_F(LoggerReloadTest, SaysNothingAboutAMissingFileOfTheSystem) {
 
 TEST_F(LoggerReloadTest, LetsGoOfItsFileWhenAConfigurationIsPutInForce) {
     configure(toFirst_);
+    const std::size_t before = logging_test::openDescriptors();
     write("one");
     logger_.use(ZBLog::Configuration());
+    EXPECT_EQ(logging_test::openDescriptors(), before);
     configure(toSecond_);
     surroundings_.advance(1000);
     write("two");

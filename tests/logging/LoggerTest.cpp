@@ -109,6 +109,18 @@ TEST_F(LoggerTest, WritesToStandardError) {
     EXPECT_THAT(textsOf(testing::internal::GetCapturedStderr()), ElementsAre("one"));
 }
 
+TEST_F(LoggerTest, SendsEachChannelToItsOwnSink) {
+    Configuration configuration;
+    configuration.of(Channel::log) = everythingTo(Destination::standardError);
+    configuration.of(Channel::trace) = everythingTo(Destination::systemLog);
+    logger_.use(configuration);
+    testing::internal::CaptureStderr();
+    write("one", 3000, Channel::log);
+    write("two", 3000, Channel::trace);
+    EXPECT_THAT(textsOf(testing::internal::GetCapturedStderr()), ElementsAre("one"));
+    EXPECT_THAT(surroundings_.takeSystemLog(), ElementsAre(testing::EndsWith(" two")));
+}
+
 TEST_F(LoggerTest, WritesNothingWhereTheSinkIsOff) {
     Configuration configuration;
     configuration.of(Channel::log) = everythingTo(Destination::nowhere);
@@ -138,6 +150,8 @@ TEST_F(LoggerTest, LeavesErrnoAloneWhenItReadsItsConfiguration) {
 TEST_F(LoggerTest, ClosesItsFilesAndDropsRecordsAfterItsEnd) {
     Configuration configuration;
     configuration.of(Channel::log) = everythingTo(Destination::file, log_);
+    surroundings_.source = {folder_ / "zblog.conf", true};
+    logging_test::writeFile(surroundings_.source.path, "log.sink = file:" + log_ + "\n");
     const std::size_t before = logging_test::openDescriptors();
     logger_.use(configuration);
     write("one", 3000);
@@ -147,6 +161,8 @@ TEST_F(LoggerTest, ClosesItsFilesAndDropsRecordsAfterItsEnd) {
     write("two", 3000);
     logger_.use(configuration);
     write("three", 3000);
+    surroundings_.advance(1000);
+    write("four", 3000);
     logger_.close();
     EXPECT_THAT(logged(), ElementsAre("one"));
 }

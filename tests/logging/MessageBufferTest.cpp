@@ -118,6 +118,23 @@ TEST(MessageBuffer, ForgetsFormatWithTheTextAndWithTheBuffer) {
     }
 }
 
+TEST(MessageBuffer, GivesItsStreamBackAsNewWithTheText) {
+    const std::ostringstream fresh;
+    std::ostringstream tied;
+    ZBMessageBuffer buffer;
+    std::ostream& stream = buffer;
+    stream << std::hex << std::setfill('*') << std::setprecision(2) << std::setw(9);
+    stream.tie(&tied);
+    stream.exceptions(std::ios::badbit);
+    buffer.str(stream);
+    EXPECT_EQ(stream.flags(), fresh.flags());
+    EXPECT_EQ(stream.fill(), fresh.fill());
+    EXPECT_EQ(stream.precision(), fresh.precision());
+    EXPECT_EQ(stream.width(), fresh.width());
+    EXPECT_EQ(stream.tie(), fresh.tie());
+    EXPECT_EQ(stream.exceptions(), fresh.exceptions());
+}
+
 TEST(MessageBuffer, ForgetsAFailedInsertion) {
     ZBMessageBuffer buffer;
     std::ostream& stream = buffer;

@@ -76,6 +76,7 @@ TEST(RecordLine, RanksFailuresAboveEverythingElseInTheSystemsLog) {
     EXPECT_EQ(priority(3000, "MESSAGE [File: A, Line: 9]: B"), LOG_DAEMON | LOG_ERR);
     EXPECT_EQ(priority(4000, "MESSAGE [File: A, Line: 9]: B"), LOG_DAEMON | LOG_WARNING);
     EXPECT_EQ(priority(3000, "ENTERING: G() in A [Line: 3]"), LOG_DAEMON | LOG_INFO);
+    EXPECT_EQ(priority(3001, "ENTERING: G() in A [Line: 3]"), LOG_DAEMON | LOG_DEBUG);
     EXPECT_EQ(priority(4000, "ENTERING: G() in A [Line: 3]"), LOG_DAEMON | LOG_DEBUG);
     EXPECT_EQ(priority(3000, " MESSAGE ["), LOG_DAEMON | LOG_INFO);
     EXPECT_EQ(priority(3000, "MESSAGE"), LOG_DAEMON | LOG_INFO);

@@ -99,9 +99,16 @@ TEST_F(StandardErrorSinkTest, WritesEachRecordAtOnce) {
     EXPECT_EQ(datagrams.receive(), "");
 }
 
-TEST_F(StandardErrorSinkTest, SurvivesAPipeThatNobodyReadsAnyMore) {
+class BrokenPipe : public StandardErrorSinkTest,
+                   public testing::WithParamInterface<void (*)(int)> {};
+
+INSTANTIATE_TEST_SUITE_P(Of, BrokenPipe, testing::Values(SIG_DFL, SIG_IGN), [](const auto& each) {
+    return each.param == SIG_IGN ? "AProcessThatIgnoresIt" : "AProcessThatItEnds";
+});
+
+TEST_P(BrokenPipe, RaisesNoSignal) {
     const int status = logging_test::inChildProcess([&] {
-        std::signal(SIGPIPE, SIG_DFL);
+        std::signal(SIGPIPE, GetParam());
         Pipe pipe;
         pipe.closeEnd(0);
         const StandardErrorAs standardError(pipe.ends[1]);
@@ -169,6 +176,25 @@ TEST_F(StandardErrorSinkTest, LosesPatienceWithAFullPipeOnceAndGoesOnWhenItIsRea
         EXPECT_THAT(textsOf(pipe.receive()),
                     ElementsAre("50 records were dropped: Connection timed out", "one"));
     }
+}
+
+TEST_F(StandardErrorSinkTest, WaitsOnWhenASignalInterruptsIt) {
+    std::signal(SIGUSR1, [](int) {});
+    Pipe pipe;
+    pipe.fill();
+    {
+        const StandardErrorAs standardError(pipe.ends[1]);
+        std::thread writer([&] { sink_.write(record("one")); });
+        for (int count = 0; count < 10; ++count) {
+            std::this_thread::sleep_for(std::chrono::milliseconds(20));
+            ::pthread_kill(writer.native_handle(), SIGUSR1);
+        }
+        pipe.drain();
+        writer.join();
+    }
+    std::signal(SIGUSR1, SIG_DFL);
+    EXPECT_THAT(textsOf(pipe.receive()), ElementsAre("one"));
+    EXPECT_TRUE(surroundings_.takeSystemLog().empty());
 }
 
 TEST_F(StandardErrorSinkTest, ChildOfAForkInTheMiddleOfAWriteIsNotHeldUpForLong) {

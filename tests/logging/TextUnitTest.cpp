@@ -50,6 +50,7 @@ const Row rows[] = {
     {"after the byte order mark", "\xEF\xBC\x80", 3, true},
     {"last of three bytes", "\xEF\xBF\xBF", 3, true},
     {"first of four bytes", "\xF0\x90\x80\x80", 4, true},
+    {"of the middle of four bytes", "\xF1\x80\x80\x80", 4, true},
     {"last of all", "\xF4\x8F\xBF\xBF", 4, true},
     {"continuation alone", "\x80", 1, false},
     {"overlong two bytes", "\xC0\x8A", 1, false},

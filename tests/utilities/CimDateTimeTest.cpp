@@ -16,6 +16,7 @@ TEST(CimDateTime, PointsInTimeAreRecognised) {
 TEST(CimDateTime, IntervalsAreRecognised) {
     EXPECT_TRUE(VA::isCimDateTime("00000011132312.125000:000"));
     EXPECT_TRUE(VA::isCimDateTime("99999999235959.999999:000"));
+    EXPECT_TRUE(VA::isCimDateTime("00000000000000.000000:000"));
 }
 
 TEST(CimDateTime, AnythingElseIsNone) {
@@ -36,6 +37,8 @@ TEST(CimDateTime, AnythingElseIsNone) {
                              "2009031708154x.000000+000",
                              "2009*317081542.000000+000",
                              "00000011242312.125000:000",
+                             "00000011136012.125000:000",
+                             "00000011132360.125000:000",
                              "00000011132312.125000:001",
                              "20090317081542.00000-+000",
                              "20090317081542.000000+ 12"})

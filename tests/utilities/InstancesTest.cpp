@@ -174,10 +174,13 @@ TEST_P(Instances, NullArgumentsDoNothing) {
     std::vector<unsigned short> numbers = {1};
     std::vector<std::string> words = {"a"};
     const std::size_t before = cmpihost::valueOf(instance).properties.size();
+    CMPIObjectPath* const end = path("C");
+    cmpihost::FaultPlan plan;  // of no faults: it counts
+    broker.setFaultPlan(&plan);
     Utilities::setProperty(nullptr, "x", true);
     Utilities::setProperty(nullptr, "x", 1U);
     Utilities::setProperty(nullptr, "x", text);
-    Utilities::setProperty(nullptr, "x", path("C"));
+    Utilities::setProperty(nullptr, "x", end);
     Utilities::setProperty(nullptr, "x", "text");
     Utilities::setProperty(instance, "x", static_cast<const char*>(nullptr));
     Utilities::setProperty(instance, "x", static_cast<CMPIObjectPath*>(nullptr));
@@ -186,6 +189,8 @@ TEST_P(Instances, NullArgumentsDoNothing) {
     Utilities::setProperty(broker.cmpi(), nullptr, "x", text, true);
     Utilities::setProperty(nullptr, instance, "x", numbers);
     Utilities::setProperty(nullptr, instance, "x", text, true);
+    broker.setFaultPlan(nullptr);
+    EXPECT_EQ(plan.calls(), 0U);
     EXPECT_EQ(cmpihost::valueOf(instance).properties.size(), before);
 }
 

@@ -55,6 +55,22 @@ CMPIInstanceFT instanceTable() {
     return table;
 }
 
+/// What a broker answers when it is asked for an instance; hdl of the broker.
+struct NewInstance {
+    CMPIInstance* instance;
+    CMPIrc rc;
+};
+
+CMPIBrokerEncFT brokerTable() {
+    CMPIBrokerEncFT table = {};
+    table.newInstance = [](const CMPIBroker* self, const CMPIObjectPath*, CMPIStatus* status) {
+        const NewInstance& made = *static_cast<const NewInstance*>(self->hdl);
+        *status = {made.rc, nullptr};
+        return made.instance;
+    };
+    return table;
+}
+
 class Keys : public testing::Test {
   protected:
     /// The ways in which the key is read: as a text or a reference by its name, by the index into
@@ -69,14 +85,8 @@ class Keys : public testing::Test {
         EXPECT_EQ(reference != nullptr, found == "reference ");
         VA::Moniker moniker;
         Utilities::transformObjectPathToMoniker(&path, moniker);
-        if (moniker.getKeyCount() != 0) found += "moniker ";
-        CMPIBrokerEncFT services = {};
-        services.newInstance = [](const CMPIBroker* self, const CMPIObjectPath*, CMPIStatus*) {
-            return static_cast<CMPIInstance*>(self->hdl);
-        };
-        std::vector<std::string> properties;
-        CMPIInstance instance = {&properties, &instances};
-        const CMPIBroker broker = {&instance, nullptr, &services, nullptr, nullptr};
+        for (unsigned int keys = moniker.getKeyCount(); keys > 0; --keys) found += "moniker ";
+        properties.clear();
         EXPECT_EQ(Utilities::createInstance(&broker, &path), &instance);
         for (const std::string& property : properties) found += "property " + property;
         return found;
@@ -106,6 +116,11 @@ class Keys : public testing::Test {
     CMPIString value = {valueText, &strings};
     Key key = {{}, CMPI_RC_OK, &name};
     CMPIObjectPath path = {&key, &paths};
+    std::vector<std::string> properties;
+    CMPIInstance instance = {&properties, &instances};
+    CMPIBrokerEncFT services = brokerTable();
+    NewInstance made = {&instance, CMPI_RC_OK};
+    CMPIBroker broker = {&made, nullptr, &services, nullptr, nullptr};
 };
 
 TEST_F(Keys, WithAValueAreReadInEveryWay) {
@@ -142,6 +157,13 @@ TEST_F(Keys, WithoutANameAreNotReadByTheirIndex) {
         setText();
         EXPECT_EQ(readers(), "text ");
     }
+}
+
+TEST_F(Keys, AreNotSetOnAnInstanceThatComesWithAnError) {
+    setText();
+    made.rc = CMPI_RC_ERR_FAILED;
+    EXPECT_EQ(Utilities::createInstance(&broker, &path), nullptr);
+    EXPECT_TRUE(properties.empty());
 }
 
 TEST_F(Keys, WithANullPointerForAValueHaveNoTextAndAreNoReference) {

@@ -64,8 +64,13 @@ TEST(Moniker, CopiesAreIndependent) {
     EXPECT_EQ(original.getKeyCount(), 1U);
     original = copy;
     EXPECT_EQ(original.getKeyCount(), 2U);
+    copy.selectKey(0);
     const VA::Moniker moved(std::move(copy));
     EXPECT_EQ(moved.getKeyCount(), 2U);
+    std::string text = "untouched";
+    copy.getName(text);
+    copy.getValue(text);
+    EXPECT_EQ(text, "untouched");
 }
 
 }  // namespace
