@@ -35,8 +35,6 @@ CMPIOSElementCapabilities::CMPIOSElementCapabilities(const CMPIBroker* _broker,
         case operatingSystemId:
             capabilities.setObjectPath(locateCapabilities(objectPath));
             break;
-        default:
-            break;
     }
     records.exiting(parameters);
 }
@@ -146,10 +144,8 @@ CMPIOSElementCapabilities::operator bool() {
     return hasCurrent;
 }
 
-bool CMPIOSElementCapabilities::movesOn() const {
-    return requestedClassId == operatingSystemId ||
-           requestedClassId == operatingSystemCapabilitiesId ||
-           requestedClassId == elementCapabilitiesId;
+bool CMPIOSElementCapabilities::enumerates() const {
+    return requestedClassId == elementCapabilitiesId;
 }
 
 CMPIOSElementCapabilities& CMPIOSElementCapabilities::operator++() {
@@ -168,8 +164,6 @@ CMPIOSElementCapabilities& CMPIOSElementCapabilities::operator++() {
                 hasCurrent = false;
             else
                 advancePair();
-            break;
-        default:
             break;
     }
     records.exiting();

@@ -53,9 +53,8 @@ class CMPIOSElementCapabilities {
     /// a further result.
     operator bool();
 
-    /// False when the path that the adapter was built from is of none of the classes that it walks:
-    /// operator++ then changes nothing, and operator bool stays true.
-    bool movesOn() const;
+    /// Whether the adapter was built from a path of the association itself.
+    bool enumerates() const;
 
     /// Moves to the next result.
     CMPIOSElementCapabilities& operator++();
@@ -68,18 +67,13 @@ class CMPIOSElementCapabilities {
     const CMPIBroker* broker;
     const CMPIContext* context;
     std::string nameSpace;
-    unsigned short requestedClassId = 0;
+    unsigned short requestedClassId = {};
     CMPIOperatingSystemCapabilities capabilities;
     CMPIOperatingSystem operatingSystem;
     OSElementCapabilities elementCapabilities;
     bool hasCurrent = true;
     bool singleInstance = false;
 };
-
-/// The broker may tell the adapter another class of its path than it told the handler.
-inline bool movesOn(const CMPIOSElementCapabilities& adapter) {
-    return adapter.movesOn();
-}
 
 }  // namespace VA::OSStatusProvider
 

@@ -44,6 +44,9 @@ class ComputerSystemAssociation {
     /// CMPIOSComputerSystem.
     operator bool();
 
+    /// Whether the adapter was built from a path of the association itself.
+    bool enumerates() const;
+
     /// Moves to the next result.
     ComputerSystemAssociation& operator++();
 
@@ -70,7 +73,7 @@ class ComputerSystemAssociation {
     const CMPIBroker* broker;
     const CMPIContext* context;
     std::string nameSpace;
-    unsigned short requestedClassId = 0;
+    unsigned short requestedClassId = {};
     CMPIOperatingSystem operatingSystem;
     CMPIOSComputerSystem computerSystem;
     Mapping mapping;

@@ -36,8 +36,6 @@ ComputerSystemAssociation<Design>::ComputerSystemAssociation(const CMPIBroker* _
         case computerSystemId:
             operatingSystem.setObjectPath(locateOperatingSystem(objectPath));
             break;
-        default:
-            break;
     }
     Design::records().exiting(parameters, Caller::named(Design::constructor));
 }
@@ -61,11 +59,14 @@ ComputerSystemAssociation<Design>::operator bool() {
         case computerSystemId:
             current = operatingSystem;
             break;
-        default:
-            break;
     }
     Design::records().exiting();
     return current;
+}
+
+template <class Design>
+bool ComputerSystemAssociation<Design>::enumerates() const {
+    return requestedClassId == Design::classId;
 }
 
 template <class Design>
@@ -81,8 +82,6 @@ ComputerSystemAssociation<Design>& ComputerSystemAssociation<Design>::operator++
             break;
         case computerSystemId:
             ++operatingSystem;
-            break;
-        default:
             break;
     }
     Design::records().exiting();

@@ -58,6 +58,9 @@ class ElementAdapter {
     /// True while the adapter stands on an element.
     operator bool();
 
+    /// Whether the adapter was built to enumerate the class itself, as one of elements always is.
+    bool enumerates() const { return true; }
+
     /// Moves to the next element.
     ElementAdapter& operator++();
 

@@ -29,25 +29,19 @@ inline bool handOver(const Request& request, const CMPIInstance* instance) {
     return true;
 }
 
-/// Whether the adapter comes to another element or to its end. One that may stand on one and the
-/// same element for ever has an overload.
-template <class Adapter>
-bool movesOn(const Adapter&) {
-    return true;
-}
-
-/// The operations: what each takes from an adapter for its current element.
+/// The operations: what each takes from an adapter for its current element. Requests for instances
+/// take nothing where the broker told the adapter another class of its path than the handler.
 struct ObjectPaths {
     template <class Adapter>
     static CMPIObjectPath* take(Adapter& adapter, const Request&) {
-        return movesOn(adapter) ? adapter.getObjectPath() : nullptr;
+        return adapter.enumerates() ? adapter.getObjectPath() : nullptr;
     }
 };
 
 struct Instances {
     template <class Adapter>
     static CMPIInstance* take(Adapter& adapter, const Request& request) {
-        return movesOn(adapter) ? adapter.getCMPIInstance(request.properties) : nullptr;
+        return adapter.enumerates() ? adapter.getCMPIInstance(request.properties) : nullptr;
     }
 };
 

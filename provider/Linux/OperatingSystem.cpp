@@ -2,7 +2,6 @@
 
 #include <cstdio>
 #include <cstdlib>
-#include <cstring>
 #include <ctime>
 #include <utility>
 
@@ -114,15 +113,16 @@ bool OperatingSystem::getDateTime(Properties id, std::string& value) {
     const auto minutes = static_cast<unsigned int>(std::labs(zone / 60));
     // What the text does not reach stays 0.
     unsigned int year = 0, month = 0, day = 0, hour = 0, minute = 0, second = 0;
-    char separator = 0;
+    char separator;
     std::sscanf(value.c_str(), "%4u %1c %2u %1c %2u %1c %2u %1c %2u %1c %2u", &year, &separator,
                 &month, &separator, &day, &separator, &hour, &separator, &minute, &separator,
                 &second);
-    std::memset(dateTimeBuffer, 0, sizeof dateTimeBuffer);
-    if (std::snprintf(dateTimeBuffer, sizeof dateTimeBuffer, "%4u%02u%02u%02u%02u%02u.%06u%1c%03u",
-                      year, month, day, hour, minute, second, 0U, sign, minutes) == 0)
+    dateTimeBuffer = {};
+    if (std::snprintf(dateTimeBuffer.data(), dateTimeBuffer.size(),
+                      "%4u%02u%02u%02u%02u%02u.%06u%1c%03u", year, month, day, hour, minute, second,
+                      0U, sign, minutes) == 0)
         return false;
-    value = dateTimeBuffer;
+    value = dateTimeBuffer.data();
     return true;
 }
 

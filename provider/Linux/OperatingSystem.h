@@ -1,6 +1,7 @@
 #ifndef OSSTATUS_LINUX_OPERATING_SYSTEM_H
 #define OSSTATUS_LINUX_OPERATING_SYSTEM_H
 
+#include <array>
 #include <string>
 #include <vector>
 
@@ -129,7 +130,7 @@ class OperatingSystem {
     bool filterSet = false;
     std::vector<Filter> filters;
     VA::Instrumentation instrumentation;
-    char dateTimeBuffer[26] = {};  // of a CIM datetime: 25 characters and the NUL
+    std::array<char, 26> dateTimeBuffer = {};  // of a CIM datetime: 25 characters and the NUL
 };
 
 /// State changes of the operating system, which offers none: both do nothing and return false.

@@ -105,6 +105,31 @@ TEST_F(ClassIds, AreAskedForOnceTheEntryMarkerIsWritten) {
     }
 }
 
+// The handler and the adapter each ask for the class of the path.
+TEST_F(ClassIds, PathThatTellsTheAdapterAnotherClassYieldsNothingAndDone) {
+    const std::pair<unsigned short, const char*> associations[] = {
+        {57, "KORVA_InstalledOS"}, {64, "KORVA_RunningOS"}, {65, "KORVA_OSElementCapabilities"}};
+    const unsigned short others[] = {0, 1, 55, 56, 57, 64, 65, 66};
+    for (const auto& [id, className] : associations) {
+        for (const unsigned short other : others) {
+            if (other == id) continue;
+            for (const bool names : {true, false}) {
+                answered = id;
+                int questions = 0;
+                onQuestion = [&questions, told = other] {
+                    if (++questions == 2) answered = told;
+                };
+                const Outcome outcome = names ? enumerateNames(className) : enumerate(className);
+                EXPECT_EQ(outcome.rc, CMPI_RC_OK) << id << ' ' << other;
+                EXPECT_TRUE(outcome.paths.empty()) << id << ' ' << other;
+                EXPECT_TRUE(outcome.instances.empty()) << id << ' ' << other;
+                EXPECT_EQ(outcome.doneCount, 1U) << id << ' ' << other;
+            }
+        }
+    }
+    onQuestion = [] {};
+}
+
 TEST_F(ClassIds, LargestIdIsRecordedUncut) {
     answered = 65535;
     enumerateNames("KORVA_OperatingSystem");

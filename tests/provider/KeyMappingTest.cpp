@@ -113,6 +113,50 @@ TYPED_TEST(HostMapping, FirstOfSeveralKeysOfOneNameWins) {
     EXPECT_EQ(this->operatingSystem({{"Name", "one"}, {"Name", "two"}}), (Keys{{"CSName", "one"}}));
 }
 
+/// Counts the selections of keys while it lives; that of the key at `failing` fails.
+struct Selections {
+    explicit Selections(unsigned int failingIndex = 99) : failing(failingIndex) { current = this; }
+    ~Selections() { current = nullptr; }
+    Selections(const Selections&) = delete;
+    Selections& operator=(const Selections&) = delete;
+
+    static inline Selections* current = nullptr;
+    unsigned int failing;
+    unsigned int count = 0;
+};
+
+TYPED_TEST(HostMapping, EmptyMonikerThrowsWithoutASelection) {
+    VA::Moniker empty;
+    const Selections selections;
+    EXPECT_THROW(this->mapping.getComputerSystemMoniker(empty), VA::FrameworkException);
+    EXPECT_THROW(this->mapping.getOperatingSystemMoniker(empty), VA::FrameworkException);
+    EXPECT_EQ(selections.count, 0U);
+}
+
+TYPED_TEST(HostMapping, SearchSelectsEachKeyOnceUntilItFindsTheOneSought) {
+    VA::Moniker source = moniker({{"Other", "x"}, {"Name", "n"}, {"Name", "later"}});
+    {
+        const Selections selections;
+        this->mapping.getOperatingSystemMoniker(source);
+        EXPECT_EQ(selections.count, 2U);
+    }
+    VA::Moniker without = moniker({{"Other", "x"}, {"Another", "y"}});
+    const Selections selections;
+    EXPECT_THROW(this->mapping.getOperatingSystemMoniker(without), VA::FrameworkException);
+    EXPECT_EQ(selections.count, 2U);
+}
+
+TYPED_TEST(HostMapping, KeyThatCannotBeSelectedIsPassedOver) {
+    VA::Moniker source = moniker({{"Name", "one"}, {"Name", "two"}, {"Name", "three"}});
+    source.selectKey(2);
+    VA::Moniker mapped;
+    {
+        const Selections selections(0);
+        mapped = this->mapping.getOperatingSystemMoniker(source);
+    }
+    EXPECT_EQ(keysOf(mapped), (Keys{{"CSName", "two"}}));
+}
+
 TEST(InstalledOSRecords, MappingIsFramedByRecordsWithTheMonikersAddress) {
     InstalledOS mapping;
     VA::Moniker source = moniker({{"CSName", "h"}, {"Name", "n"}});
@@ -237,3 +281,15 @@ TEST(CapabilitiesMapping, NoExitingRecordIsWrittenWhenTheMappingThrows) {
 }
 
 }  // namespace
+
+// The linker binds every call of Moniker::selectKey to the first, and the second to the function
+// itself.
+extern "C" {
+bool __real__ZN2VA7Moniker9selectKeyEj(VA::Moniker* self, unsigned int index);
+bool __wrap__ZN2VA7Moniker9selectKeyEj(VA::Moniker* self, unsigned int index) {
+    Selections* const selections = Selections::current;
+    if (selections != nullptr) ++selections->count;
+    if (selections != nullptr && index == selections->failing) return false;
+    return __real__ZN2VA7Moniker9selectKeyEj(self, index);
+}
+}

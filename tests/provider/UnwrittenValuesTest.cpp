@@ -56,6 +56,7 @@ TEST_F(UnwrittenValues, OfTheOperatingSystemAreThoseOfTheRowsBefore) {
         {"CSName", "KORVA_ComputerSystem"},
         {"Name", "Linux"},
         {"Version", "Linux"},
+        {"OSType", "0"},
         {"NumberOfLicensedUsers", "7"},
         {"NumberOfUsers", "7"},
         {"NumberOfProcesses", "7"},
