@@ -54,7 +54,7 @@ constexpr Row<bool> flags[] = {
 // The walk over the one node that a Linux host has.
 class LinuxCursor final : public NodeCursor {
   public:
-    explicit LinuxCursor(HostParts parts) : snapshot_(std::move(parts)) {}
+    explicit LinuxCursor(const HostParts& parts) : snapshot_(parts) {}
 
     bool select(NodeLexicon::NodeType type) override {
         onNode_ = type == NodeLexicon::OperatingSystemNode;

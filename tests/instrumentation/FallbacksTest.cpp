@@ -124,15 +124,28 @@ TEST_F(Fallbacks, UtmpStandsInForSessions) {
     EXPECT_EQ(host.number(NumberOfUsers), 1u);
     tree().write("var/run/utmp", "broken too");
     EXPECT_EQ(host.number(NumberOfUsers), std::nullopt);
+    tree().write("var/run/utmp", std::string(384 * 3000, '\0'));  // more than is read of a file
+    EXPECT_EQ(host.number(NumberOfUsers), std::nullopt);
 }
 
-TEST_F(Fallbacks, UsersWhoseProcessHasGoneCountOnlyWhereProcessesAreUnknown) {
+TEST_F(Fallbacks, UsersAreThoseWhoseProcessTheKernelKnowsWhateverProcHides) {
     tree().remove("run/systemd");
     tree().write("run/utmp",
                  utmpRecord(utmpUserProcess, 20, "ada") + utmpRecord(utmpUserProcess, 21, "bob"));
     EXPECT_EQ(host.number(NumberOfUsers), 1u);
     tree().remove("proc");
+    EXPECT_EQ(host.number(NumberOfUsers), 1u);
+    host.kernel->livingPids.insert(21);
     EXPECT_EQ(host.number(NumberOfUsers), 2u);
+}
+
+TEST_F(Fallbacks, UsersAreNotKnownFromTheUtmpOfAnotherPidNamespace) {
+    tree().remove("run/systemd");
+    tree().write("run/utmp",
+                 utmpRecord(utmpUserProcess, 21, "ada") + utmpRecord(utmpUserProcess, 22, "bob"));
+    EXPECT_EQ(host.number(NumberOfUsers), std::nullopt);
+    tree().write("var/run/utmp", utmpRecord(utmpUserProcess, 20, "ada"));
+    EXPECT_EQ(host.number(NumberOfUsers), 1u);
 }
 
 TEST_F(Fallbacks, SessionFileThatIsBeingWrittenDoesNotCount) {

@@ -3,23 +3,33 @@
 #include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-#include <sys/inotify.h>
+#include <signal.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
+#include <sys/sysmacros.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
-#include <ctime>
+#include <functional>
 
 #include "tests/instrumentation/FixtureTree.h"
 
 namespace {
 
 using testing::UnorderedElementsAre;
+using VA::Linux::FileState;
 using VA::Linux::HostFiles;
 
 struct HostFilesTest : testing::Test {
     FixtureTree tree;
     HostFiles files{tree.root()};
+
+    std::optional<std::vector<std::string>> namesIn(const std::string& folder) const {
+        std::vector<std::string> names;
+        const bool whole =
+            files.forEachName(folder, [&](std::string_view name) { names.emplace_back(name); });
+        return whole ? std::optional(names) : std::nullopt;
+    }
 };
 
 TEST_F(HostFilesTest, TextIsTheWholeContentByteForByte) {
@@ -62,23 +72,6 @@ TEST_F(HostFilesTest, WhatIsNoRegularFileHasNoTextAndDoesNotBlock) {
     }
 }
 
-TEST_F(HostFilesTest, FifoIsNotEvenOpened) {
-    tree.makeFifo("fifo");
-    tree.write("file", "x");
-    const int watch = ::inotify_init1(IN_NONBLOCK | IN_CLOEXEC);
-    const auto opened = [&] {
-        struct inotify_event event;
-        return ::read(watch, &event, sizeof event) == sizeof event;
-    };
-    ASSERT_GE(::inotify_add_watch(watch, tree.path("fifo").c_str(), IN_OPEN), 0);
-    ASSERT_GE(::inotify_add_watch(watch, tree.path("file").c_str(), IN_OPEN), 0);
-    EXPECT_EQ(files.text("fifo"), std::nullopt);
-    EXPECT_FALSE(opened());
-    EXPECT_EQ(files.text("file"), "x");
-    EXPECT_TRUE(opened());
-    ::close(watch);
-}
-
 TEST_F(HostFilesTest, LinksAreFollowed) {
     tree.write("usr/lib/os-release", "NAME=x\n");
     tree.makeLink("etc/os-release", "../usr/lib/os-release");
@@ -106,7 +99,7 @@ TEST_F(HostFilesTest, FileWithoutReadPermissionHasNoText) {
         ASSERT_EQ(::seteuid(65534), 0);
     }
     const auto secret = files.text("secret");
-    const auto closed = files.names("closed");
+    const auto closed = namesIn("closed");
     if (user == 0) {
         ASSERT_EQ(::seteuid(0), 0);
     }
@@ -123,7 +116,7 @@ TEST_F(HostFilesTest, ProcessWithoutFreeDescriptorsReadsNothing) {
     none.rlim_cur = 0;
     ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &none), 0);
     const auto text = files.text("file");
-    const auto names = files.names("");
+    const auto names = namesIn("");
     ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &before), 0);
     EXPECT_EQ(text, std::nullopt);
     EXPECT_EQ(names, std::nullopt);
@@ -136,11 +129,11 @@ TEST_F(HostFilesTest, NamesAreThoseInAFolder) {
     tree.makeFifo("folder/.hidden");
     tree.makeLink("link", "folder");
     tree.makeFolder("empty");
-    const auto names = files.names("folder");
+    const auto names = namesIn("folder");
     ASSERT_TRUE(names);
     EXPECT_THAT(*names, UnorderedElementsAre("b", "a b)", ".hidden"));
-    EXPECT_TRUE(files.names("link"));
-    EXPECT_EQ(files.names("empty"), std::vector<std::string>());
+    EXPECT_TRUE(namesIn("link"));
+    EXPECT_EQ(namesIn("empty"), std::vector<std::string>());
 }
 
 TEST_F(HostFilesTest, WhatIsNoFolderHasNoNames) {
@@ -148,24 +141,80 @@ TEST_F(HostFilesTest, WhatIsNoFolderHasNoNames) {
     tree.makeFifo("fifo");
     tree.makeLink("loop", "loop");
     for (const char* name : {"missing", "file", "fifo", "loop"}) {
-        EXPECT_EQ(files.names(name), std::nullopt) << name;
-        EXPECT_FALSE(files.isFolder(name)) << name;
+        EXPECT_EQ(namesIn(name), std::nullopt) << name;
     }
-    EXPECT_TRUE(files.isFolder(""));
 }
 
-TEST_F(HostFilesTest, DatesAreThoseOfTheInode) {
-    const std::time_t before = std::time(nullptr) - 1;
-    tree.write("file", "x");
+TEST_F(HostFilesTest, LongFileOfProcIsReadToItsEndThoughItsSizeIsZero) {
+    const std::string longName(100000, 'x');
+    const pid_t child = ::fork();
+    if (child == 0) {
+        ::execl("/bin/sh", "sh", "-c", "kill -STOP $$", longName.c_str(), nullptr);
+        ::_exit(1);
+    }
+    int status = 0;
+    ASSERT_EQ(::waitpid(child, &status, WUNTRACED), child);
+    const auto text = HostFiles("/").text("proc/" + std::to_string(child) + "/cmdline");
+    ::kill(child, SIGKILL);
+    ::waitpid(child, nullptr, 0);
+    ASSERT_TRUE(WIFSTOPPED(status));
+    EXPECT_EQ(text, std::string("sh\0-c\0kill -STOP $$\0", 20) + longName + '\0');
+}
+
+TEST_F(HostFilesTest, StateIsThatOfTheInode) {
+    tree.write("file", "four");
+    tree.makeLink("link", "file");
     // An old modification date does not make the inode older.
-    const struct timespec old[2] = {{1000000000, 0}, {1000000000, 0}};
+    const struct timespec old[2] = {{1000000000, 1}, {1000000000, 23}};
     ASSERT_EQ(::utimensat(AT_FDCWD, tree.path("file").c_str(), old, 0), 0);
-    const auto dates = files.dates("file");
-    ASSERT_TRUE(dates);
-    EXPECT_GE(dates->change, before);
-    EXPECT_LE(dates->change, std::time(nullptr));
-    EXPECT_TRUE(files.dates(""));
-    EXPECT_EQ(files.dates("missing"), std::nullopt);
+    struct stat info;
+    ASSERT_EQ(::stat(tree.path("file").c_str(), &info), 0);
+    const auto content = files.read("file");
+    ASSERT_TRUE(content);
+    for (const auto& state : {files.state("file"), files.state("link"), {content->state}}) {
+        ASSERT_TRUE(state);
+        EXPECT_EQ(state->kind, FileState::Kind::Regular);
+        EXPECT_EQ(state->device >> 32, major(info.st_dev));
+        EXPECT_EQ(state->device & 0xffffffff, minor(info.st_dev));
+        EXPECT_EQ(state->inode, info.st_ino);
+        EXPECT_EQ(state->size, 4u);
+        EXPECT_EQ(state->modified.seconds, 1000000000);
+        EXPECT_EQ(state->modified.nanoseconds, 23u);
+        EXPECT_EQ(state->changed.seconds, info.st_ctim.tv_sec);
+        EXPECT_EQ(state->changed.nanoseconds, info.st_ctim.tv_nsec);
+        if (!state->birth) continue;
+        EXPECT_LE(*state->birth, info.st_ctim.tv_sec);
+        EXPECT_GE(*state->birth, info.st_ctim.tv_sec - 2);
+    }
+}
+
+TEST_F(HostFilesTest, StateTellsFilesFromFoldersAndFromOthers) {
+    tree.makeFifo("fifo");
+    EXPECT_EQ(files.state("")->kind, FileState::Kind::Folder);
+    EXPECT_EQ(files.state("fifo")->kind, FileState::Kind::Other);
+    EXPECT_EQ(files.state("missing"), std::nullopt);
+}
+
+TEST(FileStates, AreEqualWhereEverythingIsThatAChangeWouldChange) {
+    FileState state;
+    EXPECT_TRUE(state == FileState());
+    state.birth = 1;
+    EXPECT_TRUE(state == FileState());
+    const std::function<void(FileState&)> changes[] = {
+        [](FileState& each) { each.kind = FileState::Kind::Folder; },
+        [](FileState& each) { each.device = 1; },
+        [](FileState& each) { each.inode = 1; },
+        [](FileState& each) { each.size = 1; },
+        [](FileState& each) { each.modified.seconds = 1; },
+        [](FileState& each) { each.modified.nanoseconds = 1; },
+        [](FileState& each) { each.changed.seconds = 1; },
+        [](FileState& each) { each.changed.nanoseconds = 1; },
+    };
+    for (const auto& change : changes) {
+        FileState other;
+        change(other);
+        EXPECT_FALSE(state == other) << &change - changes;
+    }
 }
 
 TEST(HostFilesRoot, MayBeWrittenWithAndWithoutSlashes) {

@@ -6,44 +6,66 @@
 #include <memory>
 #include <mutex>
 #include <optional>
+#include <set>
 #include <string>
 
 #include "FixtureTree.h"
 #include "framework/instrumentation/Linux/Snapshot.h"
 #include "framework/instrumentation/LinuxHost.h"
 
-/// Files of a fixture tree that count each look, by path, and can be given other dates.
+/// Files of a fixture tree that count each look ("look at /etc/os-release"), and each file or
+/// folder that is read, by path. Those that date an installation have the dates that they are
+/// given.
 class CountingFiles final : public VA::Linux::HostFiles {
   public:
+    struct Dates {
+        std::optional<std::int64_t> birth;
+        std::int64_t change = 0;
+    };
+
     using HostFiles::HostFiles;
 
-    std::optional<VA::Linux::FileContent> read(const std::string& path) const override {
-        count(path);
-        return HostFiles::read(path);
-    }
-    std::optional<std::vector<std::string>> names(const std::string& path) const override {
-        count(path);
-        return HostFiles::names(path);
-    }
-    std::optional<VA::Linux::FileDates> dates(const std::string& path) const override {
-        count("dates of /" + path);
+    std::optional<VA::Linux::FileState> state(const std::string& path) const override {
+        count("look at /" + path);
+        if (path != "" && path != "var/log/installer" && path != "etc/machine-id")
+            return sized(path, HostFiles::state(path));
         const auto found = fixedDates.find(path);
         if (found == fixedDates.end()) return std::nullopt;
-        return found->second;
+        VA::Linux::FileState state;
+        state.birth = found->second.birth;
+        state.changed.seconds = found->second.change;
+        return state;
     }
-    bool isFolder(const std::string& path) const override {
+    std::optional<VA::Linux::FileContent> read(const std::string& path) const override {
         count(path);
-        return HostFiles::isFolder(path);
+        auto content = HostFiles::read(path);
+        if (content) content->state = *sized(path, content->state);
+        return content;
+    }
+    bool forEachName(const std::string& path, const NameVisitor& visit) const override {
+        count(path);
+        return HostFiles::forEachName(path, visit);
     }
 
     std::map<std::string, int> counts() const {
         const std::lock_guard<std::mutex> lock(mutex_);
         return counts_;
     }
+    void resetCounts() {
+        const std::lock_guard<std::mutex> lock(mutex_);
+        counts_.clear();
+    }
 
-    std::map<std::string, VA::Linux::FileDates> fixedDates;  ///< of all files that have dates
+    std::map<std::string, Dates> fixedDates;
+    std::set<std::string> sizeless;  ///< these have the size 0, as the kernel's own files do
 
   private:
+    std::optional<VA::Linux::FileState> sized(const std::string& path,
+                                              std::optional<VA::Linux::FileState> state) const {
+        if (state && sizeless.count(path) != 0) state->size = 0;
+        return state;
+    }
+
     void count(const std::string& path) const {
         const std::lock_guard<std::mutex> lock(mutex_);
         ++counts_[path];
@@ -61,12 +83,15 @@ class FixedKernel final : public VA::Linux::Kernel {
         return fixedNames;
     }
     std::int64_t now() const override { return fixedNow; }
-    std::optional<std::int64_t> bootTime() const override { return fixedBootTime; }
+    VA::Linux::ClockedBoot bootTime() const override { return {fixedBootTime, bootTimeIsExact}; }
+    bool isAlive(std::int32_t pid) const override { return livingPids.count(pid) != 0; }
     std::optional<std::uint64_t> addressSpaceLimit() const override { return fixedLimit; }
 
     std::optional<VA::Linux::KernelNames> fixedNames{{"Linux", "node.example", "6.1.0-18"}};
     std::int64_t fixedNow = 1700100000;
     std::optional<std::int64_t> fixedBootTime = 1699999999;
+    bool bootTimeIsExact = true;
+    std::set<std::int32_t> livingPids{1, 20, 300, 512, 513};
     std::optional<std::uint64_t> fixedLimit = unlimited;
     mutable std::atomic<int> namesCalls{0};
 };

@@ -40,7 +40,7 @@ class InstallDateOrder : public testing::Test {
 
 TEST_F(InstallDateOrder, BirthOfTheRootFolderComesFirst) {
     EXPECT_EQ(host.text(InstallDate), "2022-04-15-05:20:00");
-    EXPECT_EQ(host.files->counts().count("dates of /etc/machine-id"), 0u);
+    EXPECT_EQ(host.files->counts().count("look at /etc/machine-id"), 0u);
 }
 
 TEST_F(InstallDateOrder, ImplausibleBirthGivesWayToTheChangeOfTheInstallerFolder) {

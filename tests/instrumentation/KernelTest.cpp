@@ -1,8 +1,12 @@
 #include "framework/instrumentation/Linux/Kernel.h"
 
 #include <gtest/gtest.h>
+#include <signal.h>
 #include <sys/resource.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
+#include <cerrno>
 #include <ctime>
 #include <fstream>
 #include <string>
@@ -20,13 +24,49 @@ TEST(KernelClock, BootTimeAgreesWithTheKernelsOwnToASecond) {
     const std::string text{std::istreambuf_iterator<char>(file), {}};
     const auto expected = VA::Linux::parseBootTime(text);
     ASSERT_TRUE(expected);
-    const auto actual = Kernel().bootTime();
-    ASSERT_TRUE(actual);
-    EXPECT_NEAR(static_cast<double>(*actual), static_cast<double>(*expected), 1.0);
+    const auto clocked = Kernel().bootTime();
+    ASSERT_TRUE(clocked.seconds);
+    EXPECT_NEAR(static_cast<double>(*clocked.seconds), static_cast<double>(*expected), 1.0);
+}
+
+TEST(KernelClock, BootTimeThatIsExactIsTheKernelsOwn) {
+    int exact = 0;
+    for (int i = 0; i < 1000; ++i) {
+        std::ifstream file("/proc/stat");
+        const std::string text{std::istreambuf_iterator<char>(file), {}};
+        const auto clocked = Kernel().bootTime();
+        if (!clocked.exact) continue;
+        ++exact;
+        ASSERT_EQ(clocked.seconds, VA::Linux::parseBootTime(text));
+    }
+    // A second ends within the two readings of a clock on one host of millions.
+    EXPECT_GT(exact, 0);
 }
 
 TEST(KernelClock, NowIsTheTimeOfDay) {
     EXPECT_NEAR(static_cast<double>(Kernel().now()), static_cast<double>(std::time(nullptr)), 1.0);
+}
+
+TEST(KernelProcesses, AreAliveUntilTheyAreWaitedFor) {
+    EXPECT_TRUE(Kernel().isAlive(::getpid()));
+    const pid_t child = ::fork();
+    if (child == 0) ::_exit(0);
+    ASSERT_EQ(::waitpid(child, nullptr, 0), child);
+    EXPECT_FALSE(Kernel().isAlive(child));
+}
+
+// In a process of no rights, for which the one that runs this test may be another user's.
+TEST(KernelProcesses, OfOtherUsersAreAliveToo) {
+    const pid_t child = ::fork();
+    if (child == 0) {
+        if (::getuid() == 0 && ::setresuid(65534, 65534, 65534) != 0) ::_exit(2);
+        const bool forbidden = ::kill(1, 0) != 0 && errno == EPERM;
+        ::_exit(forbidden && Kernel().isAlive(1) ? 0 : 1);
+    }
+    int status = 0;
+    ASSERT_EQ(::waitpid(child, &status, 0), child);
+    EXPECT_TRUE(WIFEXITED(status));
+    EXPECT_EQ(WEXITSTATUS(status), 0);
 }
 
 // The soft limit as the kernel reports it while it is `soft`; it is put back before this returns.

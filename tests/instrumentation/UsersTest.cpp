@@ -9,17 +9,24 @@ namespace {
 using VA::Linux::countUtmpUsers;
 using VA::Linux::isUserSession;
 
-bool everyPidLives(std::uint64_t) {
+bool everyPidLives(std::int32_t) {
     return true;
+}
+
+bool noPidLives(std::int32_t) {
+    return false;
 }
 
 TEST(UserSessions, AreThoseOfClassUserThatAreNotClosing) {
     EXPECT_TRUE(isUserSession("UID=0\nCLASS=user\n"));
     EXPECT_TRUE(isUserSession("UID=0\nSTATE=active\nCLASS=user\n"));
     EXPECT_TRUE(isUserSession("STATE=online\nCLASS=user\n"));
-    EXPECT_TRUE(isUserSession("STATE=active\nCLASS=user-early\n"));
-    EXPECT_FALSE(isUserSession("STATE=closing\nCLASS=user\n"));
-    for (const char* other : {"greeter", "lock-screen", "background", "manager", "USER", ""}) {
+    for (const char* kind : {"user", "user-early", "user-light", "user-early-light"}) {
+        EXPECT_TRUE(isUserSession(std::string("STATE=active\nCLASS=") + kind + "\n")) << kind;
+        EXPECT_FALSE(isUserSession(std::string("STATE=closing\nCLASS=") + kind + "\n")) << kind;
+    }
+    for (const char* other : {"greeter", "lock-screen", "background", "background-light", "manager",
+                              "manager-early", "user-incomplete", "light", "USER", ""}) {
         EXPECT_FALSE(isUserSession(std::string("STATE=active\nCLASS=") + other + "\n")) << other;
     }
     EXPECT_FALSE(isUserSession("STATE=active\n"));
@@ -37,12 +44,22 @@ TEST(UtmpUsers, AreTheUserProcessRecords) {
 TEST(UtmpUsers, ThoseWhoseProcessHasGoneDoNotCount) {
     const std::string utmp =
         utmpRecord(utmpUserProcess, 1200, "ada") + utmpRecord(utmpUserProcess, 1201, "bob");
-    EXPECT_EQ(countUtmpUsers(utmp, [](std::uint64_t pid) { return pid == 1201; }), 1u);
+    EXPECT_EQ(countUtmpUsers(utmp, [](std::int32_t pid) { return pid == 1201; }), 1u);
+}
+
+TEST(UtmpUsers, AreNotKnownWhereRecordsAreThereAndNoneOfTheirProcesses) {
+    const std::string ada = utmpRecord(utmpUserProcess, 1200, "ada");
+    EXPECT_EQ(countUtmpUsers(ada, noPidLives), std::nullopt);
+    EXPECT_EQ(countUtmpUsers(ada + ada, noPidLives), std::nullopt);
+    EXPECT_EQ(countUtmpUsers(utmpRecord(utmpDeadProcess, 1200, "ada"), noPidLives), 0u);
 }
 
 TEST(UtmpUsers, RecordWithoutAProcessDoesNotCount) {
-    EXPECT_EQ(countUtmpUsers(utmpRecord(utmpUserProcess, 0, "ada"), everyPidLives), 0u);
-    EXPECT_EQ(countUtmpUsers(utmpRecord(utmpUserProcess, -1, "ada"), everyPidLives), 0u);
+    for (const std::int32_t none : {0, -1}) {
+        EXPECT_EQ(countUtmpUsers(utmpRecord(utmpUserProcess, none, "ada"), everyPidLives), 0u);
+        EXPECT_EQ(countUtmpUsers(utmpRecord(utmpUserProcess, none, "ada"), noPidLives), 0u);
+    }
+    EXPECT_EQ(countUtmpUsers(utmpRecord(utmpUserProcess, 1, "ada"), everyPidLives), 1u);
 }
 
 TEST(UtmpUsers, EmptyFileTellsOfNobody) {

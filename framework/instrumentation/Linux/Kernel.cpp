@@ -1,11 +1,22 @@
 #include "Kernel.h"
 
+#include <signal.h>
 #include <sys/resource.h>
 #include <sys/utsname.h>
 
+#include <cerrno>
 #include <ctime>
 
 namespace VA::Linux {
+
+namespace {
+
+// From `start` to `end`, cut as the kernel cuts its own boot time.
+std::int64_t wholeSeconds(const struct timespec& end, const struct timespec& start) {
+    return end.tv_sec - start.tv_sec - (end.tv_nsec < start.tv_nsec ? 1 : 0);
+}
+
+}  // namespace
 
 std::optional<KernelNames> Kernel::names() const {
     struct utsname names;
@@ -19,14 +30,22 @@ std::int64_t Kernel::now() const {
     return now.tv_sec;
 }
 
-std::optional<std::int64_t> Kernel::bootTime() const {
+ClockedBoot Kernel::bootTime() const {
+    struct timespec before {};
     struct timespec now {};
-    struct timespec sinceBoot {};
-    if (::clock_gettime(CLOCK_REALTIME, &now) != 0) return std::nullopt;
-    if (::clock_gettime(CLOCK_BOOTTIME, &sinceBoot) != 0) return std::nullopt;
-    // Cut to whole seconds as the kernel cuts its own boot time.
-    const std::int64_t borrowed = now.tv_nsec < sinceBoot.tv_nsec ? 1 : 0;
-    return now.tv_sec - sinceBoot.tv_sec - borrowed;
+    struct timespec after {};
+    if (::clock_gettime(CLOCK_BOOTTIME, &before) != 0 ||
+        ::clock_gettime(CLOCK_REALTIME, &now) != 0 ||
+        ::clock_gettime(CLOCK_BOOTTIME, &after) != 0) {
+        return {};
+    }
+    const std::int64_t latest = wholeSeconds(now, before);
+    return {latest, latest == wholeSeconds(now, after)};
+}
+
+// Asked of the kernel, not of proc, which may hide the processes of other users.
+bool Kernel::isAlive(std::int32_t pid) const {
+    return ::kill(pid, 0) == 0 || errno == EPERM;
 }
 
 std::optional<std::uint64_t> Kernel::addressSpaceLimit() const {

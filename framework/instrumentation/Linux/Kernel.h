@@ -13,6 +13,12 @@ struct KernelNames {
     std::string system, node, release;
 };
 
+/// When the host was booted, by its clocks, in seconds since the epoch, UTC.
+struct ClockedBoot {
+    std::optional<std::int64_t> seconds;  ///< nothing where a clock fails
+    bool exact = false;  ///< false where a second ended too near to tell, or nothing is told
+};
+
 /// What the running kernel tells without a file. Tests derive from it to replace answers.
 class Kernel {
   public:
@@ -25,8 +31,10 @@ class Kernel {
     /// Seconds since the epoch, UTC.
     virtual std::int64_t now() const;
 
-    /// When the host was booted, by its clocks, in seconds since the epoch, UTC.
-    virtual std::optional<std::int64_t> bootTime() const;
+    virtual ClockedBoot bootTime() const;
+
+    /// True for a process of any user's that this process can name by `pid`.
+    virtual bool isAlive(std::int32_t pid) const;
 
     /// Soft limit of a process's address space in bytes, or `unlimited`.
     virtual std::optional<std::uint64_t> addressSpaceLimit() const;

@@ -4,8 +4,6 @@
 #include <ctime>
 #include <utility>
 
-#include "Assignments.h"
-#include "BootTime.h"
 #include "CivilDate.h"
 #include "InstallDate.h"
 #include "Numbers.h"
@@ -34,7 +32,7 @@ std::optional<unsigned int> sum(std::optional<std::uint32_t> first,
 
 }  // namespace
 
-Snapshot::Snapshot(HostParts parts) : parts_(std::move(parts)) {}
+Snapshot::Snapshot(const HostParts& parts) : parts_(parts) {}
 
 // Names and versions
 
@@ -53,22 +51,14 @@ std::optional<std::string> Snapshot::version() {
     return kernelNames() ? plain(kernelNames()->release) : std::nullopt;
 }
 
-const Snapshot::OsRelease& Snapshot::osRelease() {
-    return osRelease_.value([this] { return readOsRelease(); });
+const OsRelease& Snapshot::osRelease() {
+    return *osRelease_.value([this] {
+        return parts_.kept->osRelease.value(*parts_.files, *parts_.kernel, readOsRelease);
+    });
 }
 
 const std::optional<KernelNames>& Snapshot::kernelNames() {
     return kernelNames_.value([this] { return parts_.kernel->names(); });
-}
-
-// The first file that can be opened is the only one that counts, whatever it lacks.
-Snapshot::OsRelease Snapshot::readOsRelease() const {
-    auto file = parts_.files->read("etc/os-release");
-    if (!file) file = parts_.files->read("usr/lib/os-release");
-    if (!file) return {};
-    return {plain(assignedValue(file->text, "NAME")),
-            plain(assignedValue(file->text, "VERSION_ID")),
-            plain(assignedValue(file->text, "BUILD_ID"))};
 }
 
 // Dates
@@ -82,27 +72,24 @@ std::optional<std::string> Snapshot::lastBootUpTime() {
 }
 
 std::optional<std::int64_t> Snapshot::bootInstant() {
-    return bootInstant_.value([this] { return readBootInstant(); });
+    return bootInstant_.value(
+        [this] { return parts_.kept->bootTime.read(*parts_.files, *parts_.kernel); });
 }
 
 std::optional<std::int64_t> Snapshot::installInstant() {
     return installInstant_.value([this] { return findInstallInstant(); });
 }
 
-std::optional<std::int64_t> Snapshot::readBootInstant() const {
-    const auto text = parts_.files->text("proc/stat");
-    const auto boot = text ? parseBootTime(*text) : std::nullopt;
-    return boot ? boot : parts_.kernel->bootTime();
-}
-
 std::optional<std::int64_t> Snapshot::findInstallInstant() {
     const auto boot = bootInstant();
     const auto now = parts_.kernel->now();
-    const auto root = parts_.files->dates("");
+    const auto root = parts_.files->state("");
     if (root && root->birth && isPlausibleInstallDate(*root->birth, boot, now)) return root->birth;
     for (const char* path : {"var/log/installer", "etc/machine-id"}) {
-        const auto dates = parts_.files->dates(path);
-        if (dates && isPlausibleInstallDate(dates->change, boot, now)) return dates->change;
+        const auto file = parts_.files->state(path);
+        if (!file) continue;
+        const auto changed = file->changed.seconds;
+        if (isPlausibleInstallDate(changed, boot, now)) return changed;
     }
     return std::nullopt;
 }
@@ -118,19 +105,11 @@ std::optional<unsigned int> Snapshot::maxProcessMemoryKiB() {
 }
 
 std::optional<unsigned int> Snapshot::processes() {
-    if (!processList()) return std::nullopt;
-    return processList()->count();
+    return processes_.value([this] { return countProcesses(); });
 }
 
 std::optional<unsigned int> Snapshot::users() {
     return users_.value([this] { return countUsers(); });
-}
-
-const std::optional<Processes>& Snapshot::processList() {
-    return processList_.value([this] {
-        const auto names = parts_.files->names("proc");
-        return names ? Processes::among(*names) : std::nullopt;
-    });
 }
 
 std::optional<unsigned int> Snapshot::readMaxProcesses() const {
@@ -151,30 +130,29 @@ std::optional<unsigned int> Snapshot::readMaxProcessMemoryKiB() const {
     return std::max(1u, saturated(*bytes / 1024));  // 0 would mean that there is no limit
 }
 
-std::optional<unsigned int> Snapshot::countUsers() {
-    if (const auto sessions = countSessions()) return sessions;
-    for (const char* path : {"run/utmp", "var/run/utmp"}) {
-        const auto text = parts_.files->text(path);
-        if (!text) continue;
-        const auto& listed = processList();
-        const auto users = countUtmpUsers(
-            *text, [&](std::uint64_t pid) { return !listed || listed->contains(pid); });
-        if (users) return users;
-    }
-    return std::nullopt;
+// A host has at least the process that asks: a proc that lists none is not that of this host.
+std::optional<unsigned int> Snapshot::countProcesses() const {
+    std::uint64_t count = 0;
+    const bool whole = parts_.files->forEachName("proc", [&](std::string_view name) {
+        if (isAllDigits(name)) ++count;
+    });
+    if (!whole || count == 0) return std::nullopt;
+    return saturated(count);
 }
 
-std::optional<unsigned int> Snapshot::countSessions() const {
-    const std::string folder = "run/systemd/sessions";
-    const auto names = parts_.files->names(folder);
-    if (!names) return std::nullopt;
-    unsigned int count = 0;
-    for (const std::string& name : *names) {
-        if (name.front() == '.') continue;  // a session file that is being written
-        const auto text = parts_.files->text(folder + '/' + name);
-        if (text && isUserSession(*text)) ++count;
-    }
-    return count;
+std::optional<unsigned int> Snapshot::countUsers() const {
+    const auto sessions =
+        parts_.kept->userSessions.value(*parts_.files, *parts_.kernel, countUserSessions);
+    if (*sessions) return *sessions;
+    const auto users = countUtmpUsers("run/utmp");
+    return users ? users : countUtmpUsers("var/run/utmp");
+}
+
+std::optional<unsigned int> Snapshot::countUtmpUsers(const char* path) const {
+    const auto file = SourceFiles(*parts_.files, parts_.kernel->now()).read(path);
+    if (!file || !file->whole) return std::nullopt;
+    return Linux::countUtmpUsers(file->text,
+                                 [this](std::int32_t pid) { return parts_.kernel->isAlive(pid); });
 }
 
 // Memory
@@ -233,7 +211,8 @@ unsigned int Snapshot::nodeStatus() {
 
 unsigned int Snapshot::askNodeStatus() const {
     // Where no systemd runs nobody knows better than this code, which is running.
-    if (!parts_.files->isFolder("run/systemd/system")) return nodeStatusOf("running");
+    const auto folder = parts_.files->state("run/systemd/system");
+    if (!folder || folder->kind != FileState::Kind::Folder) return nodeStatusOf("running");
     const auto state = parts_.systemManager->systemState();
     return state ? nodeStatusOf(*state) : 0;
 }

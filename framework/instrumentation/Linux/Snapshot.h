@@ -6,29 +6,40 @@
 #include <optional>
 #include <string>
 
+#include "BootTime.h"
 #include "HostFiles.h"
+#include "Kept.h"
 #include "Kernel.h"
 #include "Lazy.h"
 #include "MemoryInfo.h"
-#include "Processes.h"
+#include "OsRelease.h"
 #include "SystemState.h"
 
 namespace VA::Linux {
+
+/// What is known of a host from one snapshot to the next.
+struct KeptValues {
+    Kept<OsRelease> osRelease;
+    Kept<std::optional<std::uint32_t>> userSessions;
+    BootTime bootTime;
+};
 
 /// What a Linux host is read through. None is null.
 struct HostParts {
     std::shared_ptr<const HostFiles> files;
     std::shared_ptr<const Kernel> kernel;
     std::shared_ptr<SystemManager> systemManager;
+    std::shared_ptr<KeptValues> kept = std::make_shared<KeptValues>();
 };
 
 /// The values of one host at one time. Each source behind them is read once, when the first value
-/// that needs it is asked for. What is not known is nothing. One thread uses it at a time.
+/// that needs it is asked for. What is not known is nothing. One thread uses it at a time; it must
+/// not outlive the parts that it reads through.
 ///
 /// Memory is in kilobytes of 1024 bytes; numbers too large for 32 bits are 4294967295.
 class Snapshot {
   public:
-    explicit Snapshot(HostParts parts);
+    explicit Snapshot(const HostParts& parts);
 
     std::optional<std::string> computerName();
     std::optional<std::string> name();
@@ -56,34 +67,27 @@ class Snapshot {
     unsigned int nodeStatus();
 
   private:
-    // The values of os-release that are plain text.
-    struct OsRelease {
-        std::optional<std::string> name, versionId, buildId;
-    };
-
     const OsRelease& osRelease();
     const std::optional<KernelNames>& kernelNames();
     std::optional<std::int64_t> bootInstant();
     std::optional<std::int64_t> installInstant();
     const std::optional<MemoryInfo>& memory();
-    const std::optional<Processes>& processList();
 
-    OsRelease readOsRelease() const;
-    std::optional<std::int64_t> readBootInstant() const;
     std::optional<std::int64_t> findInstallInstant();
     std::optional<unsigned int> readMaxProcesses() const;
     std::optional<unsigned int> readMaxProcessMemoryKiB() const;
-    std::optional<unsigned int> countUsers();
-    std::optional<unsigned int> countSessions() const;
+    std::optional<unsigned int> countProcesses() const;
+    std::optional<unsigned int> countUsers() const;
+    std::optional<unsigned int> countUtmpUsers(const char* path) const;
     unsigned int askNodeStatus() const;
 
-    const HostParts parts_;
-    Lazy<OsRelease> osRelease_;
+    const HostParts& parts_;
+    Lazy<std::shared_ptr<const OsRelease>> osRelease_;
     Lazy<std::optional<KernelNames>> kernelNames_;
     Lazy<std::optional<std::int64_t>> bootInstant_;
     Lazy<std::optional<std::int64_t>> installInstant_;
     Lazy<std::optional<MemoryInfo>> memory_;
-    Lazy<std::optional<Processes>> processList_;
+    Lazy<std::optional<unsigned int>> processes_;
     Lazy<std::optional<unsigned int>> maxProcesses_;
     Lazy<std::optional<unsigned int>> maxProcessMemoryKiB_;
     Lazy<std::optional<unsigned int>> users_;

@@ -6,16 +6,23 @@
 #include <optional>
 #include <string_view>
 
+#include "SourceFiles.h"
+
 namespace VA::Linux {
 
-/// True for a session file of systemd that describes a session of a user (CLASS=user, or
-/// user-early), be it active or not, that is not being closed (STATE=closing): its user has left.
+/// True for a session file of systemd that describes a session of a user (CLASS=user, user-early,
+/// user-light or user-early-light), be it active or not, that is not being closed (STATE=closing):
+/// its user has left.
 bool isUserSession(std::string_view sessionFile);
 
+/// The number of such files in run/systemd/sessions; nothing where that folder cannot be read.
+std::optional<std::uint32_t> countUserSessions(SourceFiles& files);
+
 /// The number of user sessions in a utmp file: its USER_PROCESS records whose process passes
-/// `isAlive`. Nothing for a file that is not a whole number of records.
+/// `isAlive`. Nothing for a file that is not a whole number of records, and for one with such
+/// records of which none is alive: it may tell of the processes of another pid namespace.
 std::optional<std::uint32_t> countUtmpUsers(std::string_view utmp,
-                                            const std::function<bool(std::uint64_t)>& isAlive);
+                                            const std::function<bool(std::int32_t pid)>& isAlive);
 
 }  // namespace VA::Linux
 
