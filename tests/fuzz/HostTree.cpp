@@ -1,6 +1,7 @@
 // A whole Linux host whose files, kernel and service manager say anything.
 #include <fuzzer/FuzzedDataProvider.h>
 
+#include <algorithm>
 #include <ctime>
 #include <map>
 
@@ -42,29 +43,39 @@ class AnyFiles final : public Linux::HostFiles {
         for (const char* path : filePaths)
             if (input.ConsumeBool()) {
                 const bool whole = input.ConsumeIntegralInRange(0, 7) != 0;
-                contents_[path] = {whole ? input.ConsumeRandomLengthString() : "", whole};
+                Linux::FileContent& content = contents_[path];
+                content = {whole ? input.ConsumeRandomLengthString() : "", whole, {}};
+                content.state.kind = Linux::FileState::Kind::Regular;
+                content.state.size = content.text.size();
             }
         for (const char* path : folderPaths)
             if (input.ConsumeBool()) addFolder(path, input);
         for (const char* path : datedPaths)
             if (input.ConsumeBool()) {
-                Linux::FileDates& dates = dates_[path];
-                if (input.ConsumeBool()) dates.birth = instant(input);
-                dates.change = instant(input);
+                Linux::FileState& state = states_[path];
+                if (input.ConsumeBool()) state.birth = instant(input);
+                state.changed.seconds = instant(input);
             }
-        hasSystemd_ = input.ConsumeBool();
+        if (input.ConsumeBool())
+            states_["run/systemd/system"].kind = Linux::FileState::Kind::Folder;
+        for (const auto& [path, content] : contents_) states_[path] = content.state;
+        for (const auto& [path, names] : folders_)
+            states_[path].kind = Linux::FileState::Kind::Folder;
     }
 
     std::optional<Linux::FileContent> read(const std::string& path) const override {
         return found(contents_, path);
     }
-    std::optional<std::vector<std::string>> names(const std::string& path) const override {
-        return found(folders_, path);
+    std::optional<Linux::FileState> forEachName(const std::string& path,
+                                                const NameVisitor& visit) const override {
+        const auto names = found(folders_, path);
+        if (!names) return std::nullopt;
+        std::for_each(names->begin(), names->end(), visit);
+        return state(path);
     }
-    std::optional<Linux::FileDates> dates(const std::string& path) const override {
-        return found(dates_, path);
+    std::optional<Linux::FileState> state(const std::string& path) const override {
+        return found(states_, path);
     }
-    bool isFolder(const std::string&) const override { return hasSystemd_; }
 
   private:
     template <class T>
@@ -85,8 +96,7 @@ class AnyFiles final : public Linux::HostFiles {
 
     std::map<std::string, Linux::FileContent> contents_;
     std::map<std::string, std::vector<std::string>> folders_;
-    std::map<std::string, Linux::FileDates> dates_;
-    bool hasSystemd_ = false;
+    std::map<std::string, Linux::FileState> states_;
 };
 
 class AnyKernel final : public Linux::Kernel {
@@ -104,9 +114,11 @@ class AnyKernel final : public Linux::Kernel {
 
     std::optional<Linux::KernelNames> names() const override { return names_; }
     std::int64_t now() const override { return now_; }
-    std::optional<std::int64_t> bootTime() const override {
-        return hasBoot_ ? std::optional<std::int64_t>(boot_) : std::nullopt;
+    Linux::ClockedBoot bootTime() const override {
+        if (!hasBoot_) return {};
+        return {boot_, true};
     }
+    bool isAlive(std::int32_t pid) const override { return pid % 2 != 0; }
     std::optional<std::uint64_t> addressSpaceLimit() const override {
         return hasLimit_ ? std::optional<std::uint64_t>(limit_) : std::nullopt;
     }

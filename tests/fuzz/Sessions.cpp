@@ -15,12 +15,15 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     fuzz::expect(!VA::Linux::isUserSession(text + "\nSTATE=closing\n"),
                  "a session that is being closed does not count");
 
-    const auto users = VA::Linux::countUtmpUsers(text, [](std::uint64_t) { return true; });
+    const auto users = VA::Linux::countUtmpUsers(text, [](std::int32_t) { return true; });
     fuzz::expect(users.has_value() == (size % sizeof(utmpx) == 0), "utmp is made of whole records");
-    const auto even = VA::Linux::countUtmpUsers(text, [](std::uint64_t pid) { return pid % 2; });
+    const auto even =
+        VA::Linux::countUtmpUsers(text, [](std::int32_t pid) { return pid % 2 == 0; });
     if (users) {
         fuzz::expect(*users <= size / sizeof(utmpx), "a record is one user at most");
-        fuzz::expect(*even <= *users, "a user's process is alive");
+        fuzz::expect(even.has_value() == (*users == 0 || even > 0U),
+                     "who has a record, and no process that is known, is not known");
+        fuzz::expect(even.value_or(0) <= *users, "a user's process is alive");
     }
     return 0;
 }

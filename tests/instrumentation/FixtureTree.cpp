@@ -1,5 +1,6 @@
 #include "FixtureTree.h"
 
+#include <fcntl.h>
 #include <sys/stat.h>
 
 #include <cstdlib>
@@ -45,6 +46,13 @@ void FixtureTree::makeLink(const std::string& name, const std::string& target) c
 
 void FixtureTree::remove(const std::string& name) const {
     fs::remove_all(path(name));
+}
+
+void FixtureTree::dateAhead(const std::string& name) const {
+    constexpr struct timespec year2096 { 4000000000, 0 };
+    const struct timespec dates[2] = {year2096, year2096};
+    if (::utimensat(AT_FDCWD, path(name).c_str(), dates, 0) != 0)
+        throw std::runtime_error("cannot date " + path(name));
 }
 
 void FixtureTree::writeCompleteHost() const {

@@ -26,9 +26,11 @@ struct HostFilesTest : testing::Test {
 
     std::optional<std::vector<std::string>> namesIn(const std::string& folder) const {
         std::vector<std::string> names;
-        const bool whole =
+        const auto listed =
             files.forEachName(folder, [&](std::string_view name) { names.emplace_back(name); });
-        return whole ? std::optional(names) : std::nullopt;
+        if (!listed) return std::nullopt;
+        EXPECT_TRUE(listed == files.state(folder));
+        return names;
     }
 };
 

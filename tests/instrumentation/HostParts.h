@@ -42,7 +42,8 @@ class CountingFiles final : public VA::Linux::HostFiles {
         if (content) content->state = *sized(path, content->state);
         return content;
     }
-    bool forEachName(const std::string& path, const NameVisitor& visit) const override {
+    std::optional<VA::Linux::FileState> forEachName(const std::string& path,
+                                                    const NameVisitor& visit) const override {
         count(path);
         return HostFiles::forEachName(path, visit);
     }

@@ -122,8 +122,9 @@ std::optional<std::string> takeMessage(Client& client) {
 
 }  // namespace
 
-MiniBus::MiniBus(const std::string& path, Behaviour behaviour, std::string state)
-    : behaviour_(behaviour), state_(std::move(state)) {
+MiniBus::MiniBus(const std::string& path, Behaviour behaviour, std::string state,
+                 std::chrono::milliseconds delay)
+    : behaviour_(behaviour), state_(std::move(state)), delay_(delay) {
     struct sockaddr_un address {};
     address.sun_family = AF_UNIX;
     if (path.size() >= sizeof address.sun_path) throw std::runtime_error("long path " + path);
@@ -158,9 +159,19 @@ void MiniBus::serve() {
     }
 }
 
+// Lets the delay pass; true when the bus is to stop.
+bool MiniBus::waitForStop() const {
+    struct pollfd stop = {stopPipe_[0], POLLIN, 0};
+    return ::poll(&stop, 1, static_cast<int>(delay_.count())) != 0;
+}
+
 void MiniBus::serveClient(int socket) {
+    constexpr const char* garbage = "HTTP/1.1 400 Bad Request\r\nContent-Length: 0\r\n\r\n";
     Client client(socket, stopPipe_[0]);
-    if (behaviour_ == Behaviour::SilentFromTheStart) return client.ignoreUntilGone();
+    if (behaviour_ == Behaviour::GarbageAtTheDoor) client.send(garbage);
+    if (behaviour_ == Behaviour::SilentFromTheStart || behaviour_ == Behaviour::GarbageAtTheDoor) {
+        return client.ignoreUntilGone();
+    }
     if (!authenticate(client)) return;
     const auto hello = takeMessage(client);
     if (!hello) return;
@@ -170,9 +181,17 @@ void MiniBus::serveClient(int socket) {
     if (!question) return;
     messages_.push_back(*question);
     const std::uint32_t serial = uint32At(*question, 8);
+    const std::string state = std::string("\x01s\0\0", 4) + stringBody(state_);
+    if (waitForStop()) return;
     switch (behaviour_) {
         case Behaviour::Answer:
-            client.send(reply(2, serial, "v", std::string("\x01s\0\0", 4) + stringBody(state_)));
+            client.send(reply(2, serial, "v", state));
+            break;
+        case Behaviour::OtherReply:
+            client.send(reply(2, serial + 1000, "v", state));
+            break;
+        case Behaviour::Garbage:
+            client.send(garbage);
             break;
         case Behaviour::ErrorReply:
             client.send(reply(3, serial, "s", stringBody("no such property")));
@@ -183,6 +202,7 @@ void MiniBus::serveClient(int socket) {
         case Behaviour::HangsUp:
             return;
         case Behaviour::SilentFromTheStart:
+        case Behaviour::GarbageAtTheDoor:
         case Behaviour::SilentAfterGreeting:
             break;
     }

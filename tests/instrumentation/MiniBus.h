@@ -1,7 +1,7 @@
 #ifndef TESTS_INSTRUMENTATION_MINI_BUS_H
 #define TESTS_INSTRUMENTATION_MINI_BUS_H
 
-#include <atomic>
+#include <chrono>
 #include <string>
 #include <thread>
 #include <vector>
@@ -11,16 +11,20 @@
 class MiniBus {
   public:
     enum class Behaviour {
-        Answer,              ///< replies with the state
+        Answer,              ///< replies with the state, after the delay
         ErrorReply,          ///< replies with an error
         OtherType,           ///< replies with a number
+        OtherReply,          ///< replies with the state to a question that nobody asked
+        Garbage,             ///< replies with bytes that are no message
+        GarbageAtTheDoor,    ///< the same, to the first bytes of the client
         SilentFromTheStart,  ///< accepts, and says nothing ever
         SilentAfterGreeting,
         HangsUp,  ///< ends the connection when asked
     };
 
     /// Listens on a socket at `path`, whose folder exists.
-    MiniBus(const std::string& path, Behaviour behaviour, std::string state);
+    MiniBus(const std::string& path, Behaviour behaviour, std::string state = "running",
+            std::chrono::milliseconds delay = {});
     ~MiniBus();
     MiniBus(const MiniBus&) = delete;
     MiniBus& operator=(const MiniBus&) = delete;
@@ -32,9 +36,11 @@ class MiniBus {
   private:
     void serve();
     void serveClient(int client);
+    bool waitForStop() const;
 
     const Behaviour behaviour_;
     const std::string state_;
+    const std::chrono::milliseconds delay_;
     int listener_ = -1;
     int stopPipe_[2] = {-1, -1};
     std::vector<std::string> messages_;

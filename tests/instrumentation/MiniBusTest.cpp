@@ -8,6 +8,7 @@
 #include <chrono>
 #include <filesystem>
 
+#include "framework/instrumentation/Linux/Snapshot.h"
 #include "framework/instrumentation/Linux/SystemdBus.h"
 #include "framework/instrumentation/LinuxHost.h"
 #include "tests/instrumentation/FixtureTree.h"
@@ -36,8 +37,23 @@ class MiniBusTest : public testing::Test {
 
     std::string socket() const { return tree.path("run/dbus/system_bus_socket"); }
 
-    std::optional<std::string> state(std::chrono::milliseconds deadline = patience) const {
-        return SystemdBus(socket(), SystemdBus::defaultLibrary, {}, deadline).systemState();
+    // What a host under the tree says of its state while `bus` answers, or nobody does.
+    unsigned int status(std::chrono::milliseconds deadline = patience) const {
+        auto systemd = std::make_shared<SystemdBus>(socket(), SystemdBus::defaultLibrary,
+                                                    SystemdBus::Lookup(), deadline);
+        VA::LinuxHost host(VA::Linux::HostParts{std::make_shared<VA::Linux::HostFiles>(tree.root()),
+                                                std::make_shared<VA::Linux::Kernel>(),
+                                                std::move(systemd)});
+        const auto cursor = host.openCursor();
+        cursor->select(VA::NodeLexicon::OperatingSystemNode);
+        return cursor->nodeStatus();
+    }
+
+    unsigned int statusWith(Behaviour behaviour, const std::string& state) const {
+        const MiniBus bus(socket(), behaviour, state);
+        const unsigned int found = status();
+        std::filesystem::remove(socket());
+        return found;
     }
 
     FixtureTree tree;
@@ -46,12 +62,17 @@ class MiniBusTest : public testing::Test {
     void* library_ = nullptr;
 };
 
-TEST_F(MiniBusTest, TellsTheStateOfTheManager) {
-    for (const char* expected : {"running", "degraded", "maintenance"}) {
-        MiniBus bus(socket(), Behaviour::Answer, expected);
-        EXPECT_EQ(state(), expected);
-        std::filesystem::remove(socket());
+TEST_F(MiniBusTest, EachStateOfTheManagerHasItsCodeAndAnyOtherWordHasNone) {
+    const std::pair<const char*, unsigned int> states[] = {
+        {"running", 1},   {"initializing", 2}, {"starting", 2}, {"degraded", 21},
+        {"stopping", 16}, {"maintenance", 8},  {"offline", 12}, {"unknown", 0},
+        {"", 0},          {"RUNNING", 0},      {"running\n", 0}};
+    for (const auto& [state, code] : states) {
+        EXPECT_EQ(statusWith(Behaviour::Answer, state), code) << state;
     }
+    // What is read of a word ends after 31 bytes: neither more nor less may be taken for a state.
+    EXPECT_EQ(statusWith(Behaviour::Answer, std::string(5000, 'r')), 0u);
+    EXPECT_EQ(statusWith(Behaviour::Answer, "running" + std::string(5000, ' ')), 0u);
 }
 
 TEST_F(MiniBusTest, BusOfALinuxHostIsTheOneUnderItsRoot) {
@@ -69,7 +90,7 @@ TEST_F(MiniBusTest, BusOfALinuxHostIsTheOneUnderItsRoot) {
 
 TEST_F(MiniBusTest, ClientGreetsAsksOnePropertyAndLeaves) {
     MiniBus bus(socket(), Behaviour::Answer, "running");
-    EXPECT_EQ(state(), "running");
+    EXPECT_EQ(status(), 1u);
     const auto& messages = bus.stop();
     ASSERT_EQ(messages.size(), 2u);
     EXPECT_THAT(messages[0], HasSubstr("Hello"));
@@ -79,21 +100,35 @@ TEST_F(MiniBusTest, ClientGreetsAsksOnePropertyAndLeaves) {
     }
 }
 
-TEST_F(MiniBusTest, ErrorOrOtherTypeOrLostConnectionIsNoAnswerAtOnce) {
-    for (const auto behaviour : {Behaviour::ErrorReply, Behaviour::OtherType, Behaviour::HangsUp}) {
-        MiniBus bus(socket(), behaviour, "running");
+TEST_F(MiniBusTest, GarbageIsNoAnswerAtOnce) {
+    for (const auto behaviour : {Behaviour::ErrorReply, Behaviour::OtherType, Behaviour::HangsUp,
+                                 Behaviour::Garbage, Behaviour::GarbageAtTheDoor}) {
         const auto start = std::chrono::steady_clock::now();
-        EXPECT_EQ(state(), std::nullopt);
+        EXPECT_EQ(statusWith(behaviour, "running"), 0u) << static_cast<int>(behaviour);
         EXPECT_LT(std::chrono::steady_clock::now() - start, patience / 2);
-        std::filesystem::remove(socket());
     }
 }
 
-TEST_F(MiniBusTest, BusThatDiedWithItsSocketOpenCostsTheDeadlineAndNoMore) {
-    for (const auto behaviour : {Behaviour::SilentFromTheStart, Behaviour::SilentAfterGreeting}) {
-        MiniBus bus(socket(), behaviour, "running");
+TEST_F(MiniBusTest, LateAnswerCountsBeforeTheDeadlineAndNotAfterIt) {
+    {
+        const MiniBus bus(socket(), Behaviour::Answer, "degraded", 400ms);
         const auto start = std::chrono::steady_clock::now();
-        EXPECT_EQ(state(SystemdBus::defaultDeadline), std::nullopt);
+        EXPECT_EQ(status(), 21u);
+        EXPECT_GE(std::chrono::steady_clock::now() - start, 395ms);
+    }
+    std::filesystem::remove(socket());
+    const MiniBus bus(socket(), Behaviour::Answer, "degraded", patience);
+    const auto start = std::chrono::steady_clock::now();
+    EXPECT_EQ(status(SystemdBus::defaultDeadline), 0u);
+    EXPECT_LT(std::chrono::steady_clock::now() - start, 3000ms);
+}
+
+TEST_F(MiniBusTest, BusThatDoesNotAnswerCostsTheDeadlineAndNoMore) {
+    for (const auto behaviour :
+         {Behaviour::SilentFromTheStart, Behaviour::SilentAfterGreeting, Behaviour::OtherReply}) {
+        const MiniBus bus(socket(), behaviour);
+        const auto start = std::chrono::steady_clock::now();
+        EXPECT_EQ(status(SystemdBus::defaultDeadline), 0u);
         const auto time = std::chrono::steady_clock::now() - start;
         EXPECT_GE(time, 295ms);
         EXPECT_LT(time, 3000ms);
@@ -103,7 +138,9 @@ TEST_F(MiniBusTest, BusThatDiedWithItsSocketOpenCostsTheDeadlineAndNoMore) {
 
 TEST_F(MiniBusTest, HostWithoutABusHasNoAnswerAtOnce) {
     const auto start = std::chrono::steady_clock::now();
-    EXPECT_EQ(state(), std::nullopt);
+    EXPECT_EQ(status(), 0u);
+    tree.write("run/dbus/system_bus_socket", "a file is no socket");
+    EXPECT_EQ(status(), 0u);
     EXPECT_LT(std::chrono::steady_clock::now() - start, patience / 2);
 }
 

@@ -1,4 +1,5 @@
 // This machine, read a second time by other means: a shell, the C library, sysinfo.
+#include <dlfcn.h>
 #include <glob.h>
 #include <gtest/gtest.h>
 #include <sys/resource.h>
@@ -15,6 +16,7 @@
 #include <sstream>
 #include <variant>
 
+#include "framework/instrumentation/Linux/SystemdBus.h"
 #include "framework/instrumentation/LinuxHost.h"
 
 namespace {
@@ -166,11 +168,12 @@ void checkProcesses(const Reading& actual) {
 
 void checkUsers(const Reading& actual) {
     if (::access("/run/systemd/sessions", R_OK | X_OK) == 0) {
-        expectNear(actual,
-                   shellNumber("cd /run/systemd/sessions; for s in *; do "
-                               "if [ -f \"$s\" ] && grep -qxE 'CLASS=user(-early)?' \"$s\" && "
-                               "! grep -qx STATE=closing \"$s\"; then echo x; fi; done | wc -l"),
-                   0.0);
+        expectNear(
+            actual,
+            shellNumber("cd /run/systemd/sessions; for s in *; do "
+                        "if [ -f \"$s\" ] && grep -qxE 'CLASS=user(-early)?(-light)?' \"$s\" && "
+                        "! grep -qx STATE=closing \"$s\"; then echo x; fi; done | wc -l"),
+            0.0);
     } else if (::access("/run/utmp", R_OK) == 0 || ::access("/var/run/utmp", R_OK) == 0) {
         expectNear(actual, shellNumber("who | wc -l"), 10.0);
     } else {
@@ -302,22 +305,34 @@ TEST_F(RealMachine, ComputerNameIsTheHostName) {
     EXPECT_EQ(name, expected);
 }
 
-TEST_F(RealMachine, StatusIsRunningUnlessSystemdSaysOtherwise) {
-    const unsigned int status = cursor->nodeStatus();
-    if (::access("/run/systemd/system", F_OK) != 0) {
-        EXPECT_EQ(status, 1u);
-        return;
-    }
-    // Without the library, or without a bus, nobody answers.
+// The code that the host's own tool gives reason for; nothing where it says something else.
+std::optional<unsigned int> statusBySystemctl() {
     const std::map<std::string, unsigned int> codes{
         {"running", 1},     {"initializing", 2}, {"starting", 2}, {"degraded", 21},
         {"maintenance", 8}, {"stopping", 16},    {"offline", 12}};
-    const auto expected = codes.find(shell("systemctl is-system-running 2>/dev/null"));
-    if (expected != codes.end() && status != 0) {
-        EXPECT_EQ(status, expected->second);
-    } else {
-        EXPECT_EQ(status, 0u);
+    const auto found = codes.find(shell("systemctl is-system-running 2>/dev/null"));
+    return found == codes.end() ? std::nullopt : std::optional(found->second);
+}
+
+bool canAskSystemd() {
+    void* const library = ::dlopen(VA::Linux::SystemdBus::defaultLibrary, RTLD_NOW | RTLD_LOCAL);
+    if (library) ::dlclose(library);
+    return library && ::access("/run/dbus/system_bus_socket", R_OK | W_OK) == 0;
+}
+
+TEST_F(RealMachine, StatusIsWhatSystemdSaysOrRunningWhereNoneRuns) {
+    if (::access("/run/systemd/system", F_OK) != 0) {
+        EXPECT_EQ(cursor->nodeStatus(), 1u);
+        return;
     }
+    if (!canAskSystemd()) {
+        EXPECT_EQ(cursor->nodeStatus(), 0u);
+        return;
+    }
+    const auto before = statusBySystemctl();
+    const unsigned int status = cursor->nodeStatus();
+    if (!before || before != statusBySystemctl()) GTEST_SKIP() << "the state is changing";
+    EXPECT_EQ(status, before);
 }
 
 }  // namespace

@@ -62,7 +62,7 @@ TEST_F(SnapshotTest, EachSourceIsReadAtMostOnce) {
             Pair("look at /etc/os-release", 1), Pair("etc/os-release", 1), Pair("proc/stat", 1),
             Pair("proc/meminfo", 1), Pair("proc/sys/kernel/pid_max", 1),
             Pair("proc/sys/kernel/threads-max", 1), Pair("proc", 1),
-            Pair("look at /run/systemd/sessions", 2), Pair("run/systemd/sessions", 1),
+            Pair("look at /run/systemd/sessions", 1), Pair("run/systemd/sessions", 1),
             Pair("look at /run/systemd/sessions/1", 1), Pair("run/systemd/sessions/1", 1),
             Pair("look at /run/systemd/sessions/c2", 1), Pair("run/systemd/sessions/c2", 1),
             Pair("look at /run/systemd/system", 1), Pair("look at /", 1),
@@ -110,7 +110,7 @@ TEST_F(SnapshotTest, EachPropertyReadsItsOwnSourcesOnly) {
         {MaxProcessMemorySize, {}},
         {NumberOfProcesses, {"proc"}},
         {NumberOfUsers,
-         {"look at /run/systemd/sessions", "look at /run/systemd/sessions", "run/systemd/sessions",
+         {"look at /run/systemd/sessions", "run/systemd/sessions",
           "look at /run/systemd/sessions/1", "run/systemd/sessions/1",
           "look at /run/systemd/sessions/c2", "run/systemd/sessions/c2"}},
         {NumberOfLicensedUsers, {}},
@@ -130,7 +130,7 @@ TEST_F(SnapshotTest, EachPropertyReadsItsOwnSourcesOnly) {
         fresh.flag(id);
         std::map<std::string, int> opened;
         // Three walks, of which one reads: the type of a property is known without its source.
-        for (const auto& path : expected) ++opened[path];
+        for (const auto& path : expected) opened[path] = 1;
         EXPECT_EQ(fresh.files->counts(), opened) << id;
     }
 }

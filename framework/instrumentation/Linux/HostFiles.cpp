@@ -124,14 +124,16 @@ std::optional<std::string> HostFiles::text(const std::string& path) const {
     return std::move(content->text);
 }
 
-bool HostFiles::forEachName(const std::string& path, const NameVisitor& visit) const {
+std::optional<FileState> HostFiles::forEachName(const std::string& path,
+                                                const NameVisitor& visit) const {
     // opendir sets O_CLOEXEC and opens nothing but folders.
     const std::unique_ptr<DIR, CloseFolder> folder(::opendir(absolute(path).c_str()));
-    if (!folder) return false;
+    if (!folder) return std::nullopt;
+    const auto state = stateAt(::dirfd(folder.get()), "", AT_EMPTY_PATH);
     for (;;) {
         errno = 0;
         const struct dirent* entry = ::readdir(folder.get());
-        if (!entry) return errno == 0;
+        if (!entry) return errno == 0 ? state : std::nullopt;
         const std::string_view name = entry->d_name;
         if (name != "." && name != "..") visit(name);
     }

@@ -63,9 +63,11 @@ class HostFiles {
     /// The content where it is whole, else nothing.
     std::optional<std::string> text(const std::string& path) const;
 
-    /// Visits the names in a folder, without "." and "..", in no order. False where not all of them
-    /// could be read, so that those that were visited are not to be used.
-    virtual bool forEachName(const std::string& path, const NameVisitor& visit) const;
+    /// Visits the names in a folder, without "." and "..", in no order; tells the state of the
+    /// folder before the first one. Nothing where not all of them could be read, so that those that
+    /// were visited are not to be used.
+    virtual std::optional<FileState> forEachName(const std::string& path,
+                                                 const NameVisitor& visit) const;
 
     /// The path as the kernel takes it.
     std::string absolute(const std::string& path) const;

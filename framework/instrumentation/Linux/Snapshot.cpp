@@ -133,10 +133,10 @@ std::optional<unsigned int> Snapshot::readMaxProcessMemoryKiB() const {
 // A host has at least the process that asks: a proc that lists none is not that of this host.
 std::optional<unsigned int> Snapshot::countProcesses() const {
     std::uint64_t count = 0;
-    const bool whole = parts_.files->forEachName("proc", [&](std::string_view name) {
+    const auto listed = parts_.files->forEachName("proc", [&](std::string_view name) {
         if (isAllDigits(name)) ++count;
     });
-    if (!whole || count == 0) return std::nullopt;
+    if (!listed || count == 0) return std::nullopt;
     return saturated(count);
 }
 

@@ -27,11 +27,10 @@ std::optional<std::vector<std::string>> SourceFiles::names(const std::string& fo
     const auto state = lookAt(folder);
     if (!state || state->kind != FileState::Kind::Folder) return std::nullopt;
     std::vector<std::string> names;
-    const bool whole =
+    const auto listed =
         files_->forEachName(folder, [&](std::string_view name) { names.emplace_back(name); });
-    // The same before and after: what was listed is what that state stands for.
-    readWhole_ = readWhole_ && whole && files_->state(folder) == state;
-    if (!whole) return std::nullopt;
+    readWhole_ = readWhole_ && listed == state;
+    if (!listed) return std::nullopt;
     return names;
 }
 
