@@ -55,6 +55,24 @@ TEST_F(ComputerSystems, FailedLaterElementLeavesItsReferenceOut) {
     EXPECT_EQ(broker.takeViolations(), Texts(2, "path of KORVA_RunningOS without key Dependent"));
 }
 
+TEST_F(ComputerSystems, StatusBesideTheirEnumerationEndsWithAMessage) {
+    FaultPlan plan(Fault{"enumerateInstances", 1, 0, CMPI_RC_ERR_FAILED, true});
+    broker.setFaultPlan(&plan);
+    EXPECT_THAT(pairs(installed, noComputerSystem), IsEmpty());
+    EXPECT_THAT(farEnds(operatingSystemPath("host1", "Linux"), running, noComputerSystem),
+                IsEmpty());
+    broker.setFaultPlan(nullptr);
+    EXPECT_EQ(plan.fired(), 4U);
+}
+
+TEST_F(ComputerSystems, StatusBesideTheirPathLeavesTheirReferenceOut) {
+    FaultPlan plan(Fault{"getObjectPath", 1, 0, CMPI_RC_ERR_FAILED, true});
+    broker.setFaultPlan(&plan);
+    EXPECT_THAT(pairsWithGaps(running), ElementsAre("Linux+(absent)"));
+    broker.setFaultPlan(nullptr);
+    EXPECT_EQ(broker.takeViolations(), Texts(2, "path of KORVA_RunningOS without key Dependent"));
+}
+
 TEST_F(ComputerSystems, AreDeliveredAsTheBrokerHasThem) {
     const Outcome outcome = associators(operatingSystemPath("host1", "Linux"), "KORVA_InstalledOS");
     ASSERT_EQ(outcome.instances.size(), 1U);
