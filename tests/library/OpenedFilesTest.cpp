@@ -82,6 +82,11 @@ TEST_F(OpenedFiles, NamesNeedTheReleaseFileAlone) {
     EXPECT_THAT(files, Each(Pair("/etc/os-release", 1)));
 }
 
+TEST_F(OpenedFiles, NamesOfTheNextRequestNeedNone) {
+    openedBy(Operation::EnumerateInstanceNames, "KORVA_OperatingSystem");
+    EXPECT_THAT(openedBy(Operation::EnumerateInstanceNames, "KORVA_OperatingSystem"), SizeIs(0));
+}
+
 TEST_F(OpenedFiles, AnInstanceOpensEachSourceOnce) {
     const auto files = openedBy(Operation::EnumerateInstances, "KORVA_OperatingSystem");
     for (const char* source : {"/proc/stat", "/proc/meminfo", "/proc"})

@@ -1,0 +1,77 @@
+#include <sys/syscall.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <filesystem>
+#include <thread>
+
+#include "framework/instrumentation/HostSource.h"
+#include "framework/instrumentation/LinuxHost.h"
+#include "instrumentation/FixtureTree.h"
+#include "library/LibraryFixture.h"
+#include "support/SystemCalls.h"
+
+// How many system calls a request takes that is not the first one.
+
+namespace {
+
+using namespace std::chrono_literals;
+
+class SystemCalls : public LibraryFixture {
+  protected:
+    void SetUp() override {
+        if (!systemCallsOf([] {})) GTEST_SKIP() << "this process may not trace another";
+    }
+
+    std::size_t callsOf(Operation operation) {
+        const auto calls = systemCallsOf([&] {
+            if (operation == Operation::EnumerateInstances)
+                enumerate("KORVA_OperatingSystem");
+            else
+                enumerateNames("KORVA_OperatingSystem");
+        });
+        return calls.value_or(std::vector<long>(1000)).size();
+    }
+};
+
+TEST_F(SystemCalls, AreCountedHere) {
+    EXPECT_THAT(*systemCallsOf([] {
+        ::syscall(SYS_gettid);
+        ::close(-1);
+        ::syscall(SYS_gettid);
+    }),
+                testing::ElementsAre(SYS_gettid, SYS_close, SYS_gettid));
+}
+
+TEST_F(SystemCalls, OfThisHostAreFew) {
+    VA::setHostSource(nullptr);
+    if (std::filesystem::is_regular_file("/etc/os-release")) {
+        EXPECT_EQ(callsOf(Operation::EnumerateInstanceNames), 2U);
+    }
+    if (std::filesystem::is_directory("/run/systemd/system")) {
+        GTEST_SKIP() << "the state is asked of systemd, over a socket";
+    }
+    std::size_t sessions = 0;
+    if (std::filesystem::is_directory("/run/systemd/sessions")) {
+        const std::filesystem::directory_iterator all("/run/systemd/sessions"), end;
+        sessions = static_cast<std::size_t>(std::distance(all, end));
+    }
+    EXPECT_LE(callsOf(Operation::EnumerateInstances), 30U + sessions);
+}
+
+// The files of this one are all on a disk, so that the boot time is read each time.
+TEST_F(SystemCalls, OfAHostOnWhichNothingChangedAreALookForEachFileThatIsKept) {
+    FixtureTree tree;
+    tree.writeCompleteHost();
+    VA::setHostSource(std::make_shared<VA::LinuxHost>(tree.root()));
+    const std::size_t young = callsOf(Operation::EnumerateInstanceNames);
+    std::this_thread::sleep_for(3s);
+    EXPECT_EQ(young, 6U);
+    EXPECT_EQ(callsOf(Operation::EnumerateInstanceNames), 2U);
+    // A call each: the names of the kernel, os-release, three dates, a folder of systemd's, that of
+    // the sessions and its two files, the limit of memory; four each: proc/stat, meminfo and two
+    // limits; six: the names in proc.
+    EXPECT_EQ(callsOf(Operation::EnumerateInstances), 10U + 16U + 6U);
+}
+
+}  // namespace
