@@ -7,7 +7,10 @@ namespace VA::OSStatusFacade {
 // The functions of the result. The provider calls them: nothing may be thrown into it, where it
 // would count as a walk that broke off.
 struct Answer::Table {
-    static Answer& answerOf(const CMPIResult* result) { return *static_cast<Answer*>(result->hdl); }
+    // Headers of a later level have the handle const; the object behind it is not.
+    static Answer& answerOf(const CMPIResult* result) {
+        return *static_cast<Answer*>(const_cast<void*>(result->hdl));
+    }
 
     template <class Element>
     static CMPIStatus take(const CMPIResult* result, std::vector<const Element*> Answer::*elements,

@@ -1,5 +1,5 @@
-// The provider and its companion as they are built with a distribution's CMPI headers of a later
-// level, under the broker, which is of this level.
+// The provider, the facade and the companion as they are built with a distribution's CMPI headers
+// of a later level, under the broker, which is of this level.
 #include <gmock/gmock.h>
 
 #include <cstdlib>
@@ -17,14 +17,23 @@ using testing::ElementsAre;
 
 constexpr const char* folder = KORVA_DISTRIBUTION_BUILD "/lib/";
 
-LoadOptions companionOptions() {
+struct Library {
+    const char* file;
+    const char* name;  ///< of the provider in it
+};
+
+void PrintTo(const Library& library, std::ostream* out) {
+    *out << library.name;
+}
+
+LoadOptions optionsFor(const char* name, bool association) {
     LoadOptions options;
-    options.providerName = "ComputerSystemProvider";
-    options.association = false;
+    options.providerName = name;
+    options.association = association;
     return options;
 }
 
-class DistributionHeaders : public testing::Test {
+class DistributionHeaders : public testing::TestWithParam<Library> {
   protected:
     DistributionHeaders() {
         setenv("ZBLOG_CONF", "", 1);
@@ -43,13 +52,20 @@ class DistributionHeaders : public testing::Test {
 
     SchemaCatalogue catalogue{Schema::load(KORVA_SOURCE_DIR "/schema")};
     Broker broker{&catalogue};
-    ProviderLibrary provider{std::string(folder) + "libkorzbosstatusprofileprovider.so.1", broker};
+    ProviderLibrary provider{std::string(folder) + GetParam().file, broker,
+                             optionsFor(GetParam().name, true)};
     ProviderLibrary companion{std::string(folder) + "libkorvacomputersystemprovider.so.1", broker,
-                              companionOptions()};
+                              optionsFor("ComputerSystemProvider", false)};
     LibraryService computerSystems{companion};
 };
 
-TEST_F(DistributionHeaders, LeaveTheProviderAtItsLevel) {
+INSTANTIATE_TEST_SUITE_P(Of, DistributionHeaders,
+                         testing::Values(Library{"libkorzbosstatusprofileprovider.so.1",
+                                                 "OperatingSystemProvider"},
+                                         Library{"libkorvaosstatusfacade.so.1", "OSStatusFacade"}),
+                         [](const auto& each) { return each.param.name; });
+
+TEST_P(DistributionHeaders, LeaveTheLibraryAtItsLevel) {
     const CMPIInstanceMIFT& instance = *provider.instanceMI()->ft;
     EXPECT_EQ(instance.ftVersion, 200);
     EXPECT_EQ(instance.miVersion, 200);
@@ -58,7 +74,7 @@ TEST_F(DistributionHeaders, LeaveTheProviderAtItsLevel) {
     EXPECT_EQ(association.miVersion, 200);
 }
 
-TEST_F(DistributionHeaders, LeaveTheAnswersAsTheyAre) {
+TEST_P(DistributionHeaders, LeaveTheAnswersAsTheyAre) {
     const std::vector<ObjectPathValue> computers =
         ask(companion, Operation::EnumerateInstanceNames, {"root/cimv2", "KORVA_ComputerSystem"})
             .paths;

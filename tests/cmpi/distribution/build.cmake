@@ -20,4 +20,4 @@ if(NOT output MATCHES "CMPI headers: ${usr}/include/cmpi")
     message(FATAL_ERROR "not with the distribution's headers: ${output}")
 endif()
 run("${CMAKE_COMMAND}" --build "${BUILD}" --target
-    korzbosstatusprofileprovider korvacomputersystemprovider)
+    korvaosstatusfacade korzbosstatusprofileprovider korvacomputersystemprovider)
