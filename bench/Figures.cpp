@@ -32,7 +32,11 @@ std::string describe(const nlohmann::json& context) {
 
 }  // namespace
 
-Figures::Figures(const std::string& file) {
+Figures::Figures(const std::vector<std::string>& files) {
+    for (const std::string& file : files) add(file);
+}
+
+void Figures::add(const std::string& file) {
     std::ifstream stream = opened(file);
     const nlohmann::json all = nlohmann::json::parse(withoutNaN(stream));
     machine_ = describe(all.at("context"));
@@ -46,7 +50,7 @@ Figures::Figures(const std::string& file) {
         if (isNew) places.emplace(each.at("family_index").get<int>(), name);
         Figure& figure = place->second;
         figure.nanoseconds = std::min(figure.nanoseconds, time);
-        for (const char* count : {"allocations", "opened", "peakBytes"})
+        for (const char* count : {"allocations", "opened", "peakBytes", "systemCalls"})
             if (each.contains(count)) figure.counts[count] = each.at(count).get<double>();
     }
     for (const auto& [place, name] : places) names_.push_back(name);

@@ -16,15 +16,19 @@ struct Figure {
 /// Benchmarks by name, in the order of the list.
 class Figures {
   public:
-    /// Reads the JSON of Google Benchmark; throws std::runtime_error.
-    explicit Figures(const std::string& file);
+    /// Reads files of Google Benchmark's JSON, as repetitions of one run; throws
+    /// std::runtime_error.
+    explicit Figures(const std::vector<std::string>& files);
 
     const std::vector<std::string>& names() const noexcept { return names_; }
+    bool has(const std::string& name) const { return figures_.count(name) != 0; }
     /// The benchmark of that name, which must be there.
     const Figure& at(const std::string& name) const { return figures_.at(name); }
     const std::string& machine() const noexcept { return machine_; }
 
   private:
+    void add(const std::string& file);
+
     std::vector<std::string> names_;
     std::map<std::string, Figure> figures_;
     std::string machine_;

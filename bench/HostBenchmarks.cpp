@@ -6,6 +6,7 @@
 #include "bench/Counts.h"
 #include "bench/Requests.h"
 #include "framework/instrumentation/LinuxHost.h"
+#include "tests/support/SystemCalls.h"
 
 namespace bench {
 namespace {
@@ -73,7 +74,11 @@ void measureRequest(benchmark::State& state, Setting& setting, Answerer answerer
         static_cast<void>(iteration);
         benchmark::DoNotOptimize(setting.run(answerer, request));
     }
-    countOpened(state, [&] { setting.run(answerer, request); });
+    const auto once = [&] { setting.run(answerer, request); };
+    countOpened(state, once);
+    // Nothing where one process may not trace another.
+    if (const auto calls = systemCallsOf(once))
+        state.counters["systemCalls"] = static_cast<double>(calls->size());
     setting.useSimulatedHost();
 }
 

@@ -1,7 +1,9 @@
-// Writes the figures of a run as Markdown: korva_bench_report TIMES.json INSTRUCTIONS.txt
+// Writes the figures of a run as Markdown:
+// korva_bench_report INSTRUCTIONS.txt TIMES.json... [--before TIMES.json...]
 
 #include "bench/Figures.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <exception>
 #include <iostream>
@@ -36,9 +38,6 @@ double limitOf(const std::string& request) {
     if (request == "EnumerateInstances KORVA_OperatingSystem" ||
         request == "GetInstance KORVA_OperatingSystem")
         return 2;
-    if (beginsWith(request, "EnumerateInstanceNames ") || beginsWith(request, "Associators ") ||
-        beginsWith(request, "AssociatorNames "))
-        return 4;
     return 0;
 }
 
@@ -46,12 +45,12 @@ double limitOf(const std::string& request) {
 class Verdict {
   public:
     /// A cell: the limit, in bold when it is passed.
-    std::string cell(double value, double limit) {
+    std::string cell(double value, double limit, int digits = 1) {
         if (limit == 0) return "";
         ++limits_;
         const bool holds = value <= limit;
         if (holds) ++held_;
-        return holds ? fixed(limit, 1) : "**" + fixed(limit, 1) + " missed**";
+        return holds ? fixed(limit, digits) : "**" + fixed(limit, digits) + " missed**";
     }
     void print() const { std::cout << "\n" << held_ << " of " << limits_ << " limits hold.\n"; }
 
@@ -76,9 +75,52 @@ const bench::Figure& figureOf(const Figures& figures, const std::string& group,
     return figures.at(group + request + "/" + std::to_string(nodes) + "/" + who);
 }
 
+/// What a request on the machine's own host is to keep to.
+struct HostLimit {
+    const char* request;
+    double ratio;  ///< to the state before
+    double systemCalls;
+};
+
+constexpr HostLimit hostLimits[] = {
+    {"EnumerateInstances KORVA_OperatingSystem", 0.75, 30},
+    {"EnumerateInstanceNames KORVA_OperatingSystem", 2.0 / 3, 2},
+};
+
+void printHostRequests(const Figures& figures, const Figures& before, Verdict& verdict) {
+    std::cout << "## Requests on this machine's Linux host\n\nThe provider, with the host source "
+                 "as it is now and, in the same run, as it was before. System calls are those of a "
+                 "request that is not the first.\n\n"
+                 "| request | time (µs) | before | ratio | limit | system calls | before | limit "
+                 "|\n|---|--:|--:|--:|--:|--:|--:|--:|\n";
+    const auto calls = [](const bench::Figure& figure) {
+        const auto found = figure.counts.find("systemCalls");
+        return found == figure.counts.end() ? -1 : found->second;
+    };
+    const auto cell = [&](const bench::Figure& figure) {
+        return calls(figure) < 0 ? "" : fixed(calls(figure), 0);
+    };
+    for (const HostLimit& row : hostLimits) {
+        const std::string name = std::string("host/") + row.request + ", provider";
+        const bench::Figure& now = figures.at(name);
+        std::cout << "| " << row.request << " | " << microseconds(now.nanoseconds) << " | ";
+        const bool compared = before.has(name);
+        if (compared) {
+            const double ratio = now.nanoseconds / before.at(name).nanoseconds;
+            std::cout << microseconds(before.at(name).nanoseconds) << " | " << fixed(ratio, 2)
+                      << " | " << verdict.cell(ratio, row.ratio, 2);
+        } else {
+            std::cout << " | | ";
+        }
+        std::cout << " | " << cell(now) << " | " << (compared ? cell(before.at(name)) : "") << " | "
+                  << (calls(now) < 0 ? "" : verdict.cell(calls(now), row.systemCalls, 0)) << " |\n";
+    }
+}
+
 void printRequests(const Figures& figures, const std::map<std::string, double>& instructions,
                    Verdict& verdict) {
-    std::cout << "## Requests\n\nOne node. Times in microseconds, instructions in thousands.\n\n"
+    std::cout << "\n## Requests on a simulated host\n\nOne node. Times in microseconds, "
+                 "instructions in thousands.\n\n"
                  "| request | time | floor | ratio | limit | instructions | floor | ratio | "
                  "allocations | floor | opened |\n|---|--:|--:|--:|--:|--:|--:|--:|--:|--:|--:|\n";
     for (const std::string& request : requestsOf(figures, "request/")) {
@@ -145,20 +187,25 @@ void printGroup(const Figures& figures, const char* title, const char* group, co
 }  // namespace
 
 int main(int argc, char** argv) try {
-    if (argc != 3) {
-        std::cerr << "usage: korva_bench_report TIMES.json INSTRUCTIONS.txt\n";
+    const std::vector<std::string> arguments(argv + 1, argv + argc);
+    const auto before = std::find(arguments.begin(), arguments.end(), "--before");
+    if (before - arguments.begin() < 2) {
+        std::cerr << "usage: korva_bench_report INSTRUCTIONS.txt TIMES.json... "
+                     "[--before TIMES.json...]\n";
         return 2;
     }
-    const Figures figures(argv[1]);
-    const std::map<std::string, double> instructions = bench::readInstructions(argv[2]);
+    const Figures figures({arguments.begin() + 1, before});
+    const Figures figuresBefore({before == arguments.end() ? before : before + 1, arguments.end()});
+    const std::map<std::string, double> instructions = bench::readInstructions(arguments[0]);
     std::cout << "# Benchmark figures\n\nWritten by `bench/run`; [benchmarks.md](benchmarks.md) "
                  "says what is measured and how. Processor time, the quickest of several "
                  "repetitions, on "
               << figures.machine() << ".\n\n";
     Verdict verdict;
+    printHostRequests(figures, figuresBefore, verdict);
     printRequests(figures, instructions, verdict);
     printNodes(figures, verdict);
-    printGroup(figures, "The Linux host", "host/", "opened");
+    printGroup(figures, "The parts of the Linux host", "host/snapshot: ", "opened");
     printGroup(figures, "A record", "logging/", "allocations");
     verdict.print();
     return 0;

@@ -1,5 +1,10 @@
 #include <gtest/gtest.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
+#include <atomic>
+#include <chrono>
+#include <ctime>
 #include <filesystem>
 #include <thread>
 #include <vector>
@@ -50,6 +55,70 @@ TEST(LinuxHostThreads, EachWithItsCursorReadTheSameHost) {
     }
     for (auto& thread : threads) thread.join();
     EXPECT_EQ(host.files->counts()["etc/os-release"], 80);
+}
+
+TEST(LinuxHostThreads, ShareWhatIsKeptWhileItChanges) {
+    FixtureHost host;
+    host.tree().writeCompleteHost();
+    host.kernel->fixedNow = std::time(nullptr) + 1000;
+    std::atomic<bool> done{false};
+    std::vector<std::thread> threads;
+    for (int i = 0; i < 4; ++i) {
+        threads.emplace_back([&] {
+            while (!done) {
+                const auto name = host.text(Name);
+                EXPECT_TRUE(name == "Test Linux" || name == "Other Linux")
+                    << testing::PrintToString(name);
+                const auto users = host.number(NumberOfUsers);
+                EXPECT_TRUE(users == 2u || users == 3u) << testing::PrintToString(users);
+            }
+        });
+    }
+    for (int round = 0; round < 20; ++round) {
+        const std::string name = round % 2 ? "Test" : "Other";
+        host.tree().write("new", "NAME='" + name + " Linux'\n");
+        std::filesystem::rename(host.tree().path("new"), host.tree().path("etc/os-release"));
+        if (round % 2)
+            host.tree().remove("run/systemd/sessions/new");
+        else
+            host.tree().write("run/systemd/sessions/new", "CLASS=user\n");
+        std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    }
+    done = true;
+    for (auto& thread : threads) thread.join();
+    EXPECT_EQ(host.text(Name), "Test Linux");
+    EXPECT_EQ(host.number(NumberOfUsers), 2u);
+}
+
+// Whatever the threads had in their hands when their process was forked, the child has to answer.
+TEST(LinuxHostThreads, LeaveAForkedChildAbleToRead) {
+    VA::LinuxHost machine;
+    const auto nameOf = [&] {
+        const auto cursor = machine.openCursor();
+        cursor->select(OperatingSystemNode);
+        std::string name;
+        return cursor->readProperty(Name, name) ? name : "none";
+    };
+    const std::string expected = nameOf();
+    std::atomic<bool> done{false};
+    std::vector<std::thread> threads;
+    for (int i = 0; i < 3; ++i) {
+        threads.emplace_back([&] {
+            while (!done) nameOf();
+        });
+    }
+    for (int round = 0; round < 100; ++round) {
+        const pid_t child = ::fork();
+        if (child == 0) {
+            ::alarm(30);
+            ::_exit(nameOf() == expected ? 0 : 1);
+        }
+        int status = 0;
+        EXPECT_EQ(::waitpid(child, &status, 0), child);
+        EXPECT_EQ(status, 0);
+    }
+    done = true;
+    for (auto& thread : threads) thread.join();
 }
 
 std::ptrdiff_t openDescriptors() {

@@ -96,10 +96,11 @@ bool operator==(const FileState& one, const FileState& other) {
 
 HostFiles::HostFiles(std::string root) : root_(std::move(root)) {
     root_.erase(root_.find_last_not_of('/') + 1);
+    root_ += '/';
 }
 
 std::string HostFiles::absolute(const std::string& path) const {
-    return root_ + '/' + path;
+    return root_ + path;
 }
 
 std::optional<FileState> HostFiles::state(const std::string& path) const {

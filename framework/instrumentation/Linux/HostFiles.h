@@ -73,7 +73,7 @@ class HostFiles {
     std::string absolute(const std::string& path) const;
 
   private:
-    std::string root_;  // without a slash at its end
+    std::string root_;  // with one slash at its end
 };
 
 }  // namespace VA::Linux
