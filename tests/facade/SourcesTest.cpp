@@ -182,7 +182,7 @@ class SourcesAmongMany : public Sources {
         const OperationRequest request =
             associationRequest(Operation::AssociatorNames, source, associationClass);
         for (const ObjectPathValue& end : ask(request).paths)
-            result.push_back(end.keys.back().value.toText());
+            result.push_back(end.keys.empty() ? "(no keys)" : end.keys.back().value.toText());
         EXPECT_EQ(ask(associationRequest(Operation::Associators, source, associationClass))
                       .instances.size(),
                   result.size());
