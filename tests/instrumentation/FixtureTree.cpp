@@ -49,8 +49,9 @@ void FixtureTree::remove(const std::string& name) const {
 }
 
 void FixtureTree::dateAhead(const std::string& name) const {
-    constexpr struct timespec year2096 { 4000000000, 0 };
-    const struct timespec dates[2] = {year2096, year2096};
+    // The last second that a 32-bit time holds: so much of it the standard library reads.
+    constexpr struct timespec year2038 { 2147483647, 0 };
+    const struct timespec dates[2] = {year2038, year2038};
     if (::utimensat(AT_FDCWD, path(name).c_str(), dates, 0) != 0)
         throw std::runtime_error("cannot date " + path(name));
 }
