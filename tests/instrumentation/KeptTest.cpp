@@ -2,6 +2,7 @@
 #include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/resource.h>
 #include <sys/stat.h>
 
 #include <filesystem>
@@ -185,6 +186,21 @@ TEST_F(KeptTest, FileThatIsNotReadWholeOrHasNoSizeIsReadEachTime) {
     }
 }
 
+TEST_F(KeptTest, WhatCouldNotBeOpenedIsTriedAgain) {
+    struct rlimit before;
+    ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &before), 0);
+    struct rlimit none = before;
+    none.rlim_cur = 0;
+    ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &none), 0);
+    const auto name = host.text(Name);
+    const auto users = host.number(NumberOfUsers);
+    ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &before), 0);
+    EXPECT_EQ(name, "Linux");
+    EXPECT_EQ(users, std::nullopt);
+    EXPECT_EQ(host.text(Name), "Test Linux");
+    EXPECT_EQ(host.number(NumberOfUsers), 2u);
+}
+
 TEST_F(KeptTest, NothingIsMixedUpBetweenTwoRoots) {
     FixtureHost second;
     second.kernel->fixedNow = host.kernel->fixedNow;
@@ -314,7 +330,7 @@ TEST_F(KeptBootTime, IsReadAgainFromAnotherFile) {
     EXPECT_EQ(host.text(LastBootUpTime), "2027-01-15-08:00:00");
 }
 
-TEST_F(KeptBootTime, IsReadEachTimeWhereTheClocksDifferOrDoubtOrTheFileIsNotTheKernels) {
+TEST_F(KeptBootTime, IsNotKeptWhileTheClocksDifferOrDoubt) {
     host.kernel->fixedBootTime = 1699999999;
     EXPECT_TRUE(isReadAgain());
     EXPECT_TRUE(isReadAgain());
@@ -322,6 +338,11 @@ TEST_F(KeptBootTime, IsReadEachTimeWhereTheClocksDifferOrDoubtOrTheFileIsNotTheK
     host.kernel->bootTimeIsExact = false;
     EXPECT_TRUE(isReadAgain());
     host.kernel->bootTimeIsExact = true;
+    EXPECT_TRUE(isReadAgain());
+    EXPECT_FALSE(isReadAgain());
+}
+
+TEST_F(KeptBootTime, OfAFileThatIsNotTheKernelsIsNotKept) {
     host.files->sizeless.clear();
     EXPECT_TRUE(isReadAgain());
     EXPECT_TRUE(isReadAgain());

@@ -44,7 +44,8 @@ class SystemdBusTest : public testing::Test {
 };
 
 TEST_F(SystemdBusTest, TellsTheStateThatTheManagerTells) {
-    for (const char* state : {"running", "degraded", "initializing", "a state of the future"}) {
+    for (const char* state :
+         {"running", "degraded", "initializing", "a state of the future", "r"}) {
         control->state = state;
         EXPECT_EQ(bus.systemState(), state);
     }
@@ -138,8 +139,7 @@ TEST_F(SystemdBusTest, StateOfAnyLengthIsSafe) {
     const std::string state(5000, 's');
     control->state = state.c_str();
     const auto answer = bus.systemState();
-    ASSERT_TRUE(answer);
-    EXPECT_EQ(VA::Linux::nodeStatusOf(*answer), 0u);
+    EXPECT_EQ(answer, std::string(31, 's'));
 }
 
 TEST_F(SystemdBusTest, HasNoAnswerWithoutTheLibrary) {

@@ -11,9 +11,10 @@ namespace VA::Linux {
 
 namespace {
 
-// From `start` to `end`, cut as the kernel cuts its own boot time.
-std::int64_t wholeSeconds(const struct timespec& end, const struct timespec& start) {
-    return end.tv_sec - start.tv_sec - (end.tv_nsec < start.tv_nsec ? 1 : 0);
+constexpr std::int64_t nanosecondsPerSecond = 1000000000;
+
+std::int64_t nanoseconds(const struct timespec& time) {
+    return time.tv_sec * nanosecondsPerSecond + time.tv_nsec;
 }
 
 }  // namespace
@@ -39,8 +40,10 @@ ClockedBoot Kernel::bootTime() const {
         ::clock_gettime(CLOCK_BOOTTIME, &after) != 0) {
         return {};
     }
-    const std::int64_t latest = wholeSeconds(now, before);
-    return {latest, latest == wholeSeconds(now, after)};
+    // Cut to whole seconds as the kernel cuts its own boot time.
+    const auto latest = (nanoseconds(now) - nanoseconds(before)) / nanosecondsPerSecond;
+    const auto earliest = (nanoseconds(now) - nanoseconds(after)) / nanosecondsPerSecond;
+    return {latest, latest == earliest};
 }
 
 // Asked of the kernel, not of proc, which may hide the processes of other users.
