@@ -109,11 +109,12 @@ Instances computerSystems(const Request& request, const Class& itsClass) {
         request.broker(), request.context(), request.newPath(itsClass.name), nullptr, &status);
     if (enumeration == nullptr || status.rc != CMPI_RC_OK) throw failure;
     Instances instances;
-    while (enumeration->ft->hasNext(enumeration, nullptr) != 0) {
+    while (enumeration->ft->hasNext(enumeration, &status) != 0) {
         const CMPIData data = enumeration->ft->getNext(enumeration, &status);
         if (status.rc != CMPI_RC_OK || data.value.inst == nullptr) throw failure;
         instances.push_back(data.value.inst);
     }
+    if (status.rc != CMPI_RC_OK) throw failure;
     return instances;
 }
 

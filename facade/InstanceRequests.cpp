@@ -21,12 +21,15 @@ CMPIObjectPath* pathToAskFor(const Request& request, const Class& itsClass) {
     CMPIObjectPath* const path = request.newPath(itsClass.name);
     const std::vector<KeyBinding> bindings = keysOf(request.path());
     for (const Key& key : itsClass.keys)
-        for (const KeyBinding& binding : bindings)
-            if (!key.isReference && equalNames(binding.name, key.name))
-                // Of characters, brokers take the pointer itself, not the address of one.
-                path->ft->addKey(path, key.name,
-                                 reinterpret_cast<const CMPIValue*>(binding.text()->c_str()),
-                                 CMPI_chars);
+        for (const KeyBinding& binding : bindings) {
+            if (key.isReference || !equalNames(binding.name, key.name)) continue;
+            // Of characters, brokers take the pointer itself, not the address of one.
+            const CMPIStatus status = path->ft->addKey(
+                path, key.name, reinterpret_cast<const CMPIValue*>(binding.text()->c_str()),
+                CMPI_chars);
+            if (status.rc != CMPI_RC_OK)
+                throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not take a key");
+        }
     return path;
 }
 
@@ -44,7 +47,9 @@ Refusal notFound(const Class& itsClass, const Identity& wanted, const Identities
         const auto wantedKey =
             std::find_if(wanted.keys.begin(), wanted.keys.end(),
                          [&key](const auto& each) { return equalNames(each.first, key.name); });
-        if (std::none_of(candidates.begin(), candidates.end(),
+        // An object manager may tell other keys the second time that it is asked.
+        if (wantedKey == wanted.keys.end() ||
+            std::none_of(candidates.begin(), candidates.end(),
                          [&](const Identity& candidate) { return hasKey(candidate, *wantedKey); }))
             unknown += std::string(unknown.empty() ? "" : ", ") + key.name;
     }

@@ -11,6 +11,11 @@ namespace VA::OSStatusFacade {
 
 namespace {
 
+void requireTold(const CMPIStatus& status, const char* what) {
+    if (status.rc != CMPI_RC_OK)
+        throw Refusal(CMPI_RC_ERR_FAILED, std::string("the object manager does not tell ") + what);
+}
+
 bool isAbsent(const CMPIData& data) {
     if ((data.state & (CMPI_nullValue | CMPI_notFound | CMPI_badValue)) != 0) return true;
     switch (data.type) {
@@ -46,16 +51,28 @@ std::string comparable(const KeyBinding& key, std::string_view nameSpace) {
 
 std::string charactersOf(const CMPIString* string) {
     if (string == nullptr || string->hdl == nullptr) return {};
-    const char* const characters = string->ft->getCharPtr(string, nullptr);
-    return characters == nullptr ? "" : characters;
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    const char* const characters = string->ft->getCharPtr(string, &status);
+    if (characters == nullptr) status.rc = CMPI_RC_ERR_FAILED;
+    requireTold(status, "a text");
+    return characters;
 }
 
 std::string classNameOf(const CMPIObjectPath* path) {
-    return path == nullptr ? "" : charactersOf(path->ft->getClassName(path, nullptr));
+    if (path == nullptr) return {};
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    const CMPIString* const name = path->ft->getClassName(path, &status);
+    if (name == nullptr) status.rc = CMPI_RC_ERR_FAILED;
+    requireTold(status, "a class");
+    return charactersOf(name);
 }
 
 std::string nameSpaceOf(const CMPIObjectPath* path) {
-    return path == nullptr ? "" : charactersOf(path->ft->getNameSpace(path, nullptr));
+    if (path == nullptr) return {};
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    const CMPIString* const nameSpace = path->ft->getNameSpace(path, &status);
+    requireTold(status, "a namespace");
+    return charactersOf(nameSpace);
 }
 
 const CMPIObjectPath* KeyBinding::reference() const {
@@ -96,13 +113,13 @@ std::optional<std::string> KeyBinding::text() const {
 
 std::vector<KeyBinding> keysOf(const CMPIObjectPath* path) {
     std::vector<KeyBinding> keys;
-    const CMPICount count = path == nullptr ? 0 : path->ft->getKeyCount(path, nullptr);
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    const CMPICount count = path == nullptr ? 0 : path->ft->getKeyCount(path, &status);
+    requireTold(status, "how many keys there are");
     for (CMPICount index = 0; index < count; ++index) {
-        CMPIStatus status = {CMPI_RC_OK, nullptr};
         CMPIString* name = nullptr;
         const CMPIData data = path->ft->getKeyAt(path, index, &name, &status);
-        if (status.rc != CMPI_RC_OK)
-            throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not tell a key");
+        requireTold(status, "a key");
         if (!isAbsent(data)) keys.push_back({charactersOf(name), data});
     }
     return keys;
@@ -120,8 +137,7 @@ const CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* role) 
     const CMPIData data = path->ft->getKey(path, role, &status);
     if (status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY || status.rc == CMPI_RC_ERR_NOT_FOUND)
         return nullptr;
-    if (status.rc != CMPI_RC_OK)
-        throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not tell a reference");
+    requireTold(status, "a reference");
     return data.type == CMPI_ref && !isAbsent(data) ? data.value.ref : nullptr;
 }
 

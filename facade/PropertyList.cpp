@@ -27,17 +27,21 @@ const CMPIValue* argument(const CMPIData& data) {
 
 void copyProperties(const CMPIInstance* from, const std::vector<const char*>& names,
                     const CMPIInstance* to) {
-    const CMPICount count = from->ft->getPropertyCount(from, nullptr);
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    const CMPICount count = from->ft->getPropertyCount(from, &status);
+    if (status.rc != CMPI_RC_OK)
+        throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not count properties");
     for (CMPICount index = 0; index < count; ++index) {
-        CMPIStatus status = {CMPI_RC_OK, nullptr};
         CMPIString* name = nullptr;
         const CMPIData data = from->ft->getPropertyAt(from, index, &name, &status);
         if (status.rc != CMPI_RC_OK)
             throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not tell a property");
         if ((data.state & CMPI_nullValue) != 0) continue;
         const std::string property = charactersOf(name);
-        if (contains(names, property))
-            to->ft->setProperty(to, property.c_str(), argument(data), data.type);
+        if (!contains(names, property)) continue;
+        status = to->ft->setProperty(to, property.c_str(), argument(data), data.type);
+        if (status.rc != CMPI_RC_OK)
+            throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not take a property");
     }
 }
 

@@ -20,14 +20,14 @@ struct Range {
     bool holds(std::uintptr_t address) const { return address >= begin && address < end; }
 };
 
-constexpr const char* libraries[] = {"libkorzbosstatusprofileprovider", "libvainstrumentation",
-                                     "libvaprovider", "libzblog"};
+constexpr const char* libraries[] = {"libkorvaosstatusfacade", "libkorzbosstatusprofileprovider",
+                                     "libvainstrumentation", "libvaprovider", "libzblog"};
 
 enum class Purpose { None, Fail, Measure };
 
 // Nothing here may allocate.
 struct State {
-    std::array<Range, 4> libraries{};
+    std::array<Range, 5> libraries{};
     Range program{};
     Purpose purpose = Purpose::None;
     bool andLater = false;

@@ -3,10 +3,10 @@
 
 #include <cstddef>
 
-/// The program's own operator new: lets allocations fail, or measures them, that the provider or
-/// one of the framework's libraries asks for, in its own code or through the C++ library. Those
-/// that the broker, the log of the test and the test itself ask for, never fail and are not
-/// measured. All for one thread, and either of the two at a time.
+/// The program's own operator new: lets allocations fail, or measures them, that the facade, the
+/// provider or one of the framework's libraries asks for, in its own code or through the C++
+/// library. Those that the broker, the log of the test and the test itself ask for, never fail and
+/// are not measured. All for one thread, and either of the two at a time.
 namespace allocations {
 
 /// From now on until release(), the n-th allocation (from 1) of the libraries throws

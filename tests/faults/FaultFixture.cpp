@@ -73,7 +73,7 @@ Answer FaultFixture::answerTo(const NamedRequest& asked) {
     recording::clear();
     recordsLeft = mostRecords;
     Answer answer;
-    answer.outcome = invoke(asked.request);
+    answer.outcome = cmpihost::invoke(*answering, broker, asked.request);
     answer.records = recording::take();
     for (const ObjectPathValue& path : answer.outcome.paths)
         answer.elements.push_back(toString(path));

@@ -28,7 +28,7 @@ class FaultFixture : public LibraryFixture {
     /// test that sets a hook of its own for the records turns it on again.
     void limitRecords();
 
-    /// Forgets the records so far and runs the request; exceptions of the provider pass through.
+    /// Forgets the records so far and runs the request; exceptions of the library pass through.
     Answer answerTo(const NamedRequest& asked);
 
     /// Checks what holds for each request that was served, whatever failed on the way: every record
@@ -38,6 +38,9 @@ class FaultFixture : public LibraryFixture {
 
     /// Checks that the answer is the reference: status, elements, and every record.
     static void expectSame(const Answer& reference, const Answer& answer);
+
+    /// The library that answers: the provider, unless a test names another.
+    const cmpihost::ProviderLibrary* answering = &library;
 
   private:
     std::size_t recordsLeft = 0;
@@ -52,8 +55,7 @@ class EachRequestFixture : public FaultFixture {
     /// at the end the request is to be answered again as if nothing had happened.
     template <class Body>
     void forEachRequestOf(const std::string& handler, Body body) {
-        for (const NamedRequest& each : servedRequests()) {
-            if (each.handler != handler) continue;
+        for (const NamedRequest& each : requestsOf(handler)) {
             SCOPED_TRACE(each.name);
             asked = each;
             reference = answerTo(asked);

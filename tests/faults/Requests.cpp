@@ -104,6 +104,42 @@ std::vector<NamedRequest> refused() {
     return std::move(table.rows);
 }
 
+constexpr Kind references[] = {{Operation::ReferenceNames, "ReferenceNames"},
+                               {Operation::References, "References"}};
+
+// What only the facade answers: references, associators through any class, property lists.
+std::vector<NamedRequest> answeredByFacade() {
+    const ObjectPathValue sources[] = {operatingSystemPath("host1", "Linux"),
+                                       computerSystemPath("host1"), capabilitiesPath("other")};
+    Table table;
+    for (const ObjectPathValue& source : sources) {
+        const std::string from = "From" + shortName(source.className);
+        for (const Kind& kind : walks) table.add(kind, from, source);
+        for (const Kind& kind : references)
+            for (const char* association : {"", installed, running, element}) {
+                table.add(kind, from + association, source);
+                if (*association != '\0') table.rows.back().request.resultClass = association;
+            }
+    }
+    for (const Kind& kind : {get, enumerations[1], walks[1], references[1]}) {
+        const ObjectPathValue& source = sources[0];
+        table.add(kind, "WithAPropertyList", source);
+        table.rows.back().request.properties = std::vector<std::string>{"OSType", "InstanceID"};
+    }
+    return std::move(table.rows);
+}
+
+std::vector<NamedRequest> ofFacade() {
+    std::vector<NamedRequest> all = answeredByFacade();
+    for (const auto* rows : {&servedRequests(), &refusedRequests()})
+        all.insert(all.end(), rows->begin(), rows->end());
+    for (NamedRequest& row : all) {
+        row.handler.replace(0, row.handler.find('_'), "OSStatusFacade");
+        row.message.clear();
+    }
+    return all;
+}
+
 std::vector<NamedRequest> strange() {
     Table table;
     const ObjectPathValue computer = computerSystemPath("host1");
@@ -143,4 +179,28 @@ const std::vector<NamedRequest>& refusedRequests() {
 const std::vector<NamedRequest>& strangeRequests() {
     static const std::vector<NamedRequest> all = strange();
     return all;
+}
+
+const std::vector<NamedRequest>& facadeRequests() {
+    static const std::vector<NamedRequest> all = ofFacade();
+    return all;
+}
+
+const std::vector<std::string>& facadeHandlers() {
+    static const std::vector<std::string> all = {
+        "OSStatusFacade_EnumInstanceNames", "OSStatusFacade_EnumInstances",
+        "OSStatusFacade_GetInstance",       "OSStatusFacade_AssociatorNames",
+        "OSStatusFacade_Associators",       "OSStatusFacade_ReferenceNames",
+        "OSStatusFacade_References",        "OSStatusFacade_CreateInstance",
+        "OSStatusFacade_ModifyInstance",    "OSStatusFacade_DeleteInstance",
+        "OSStatusFacade_ExecQuery"};
+    return all;
+}
+
+std::vector<NamedRequest> requestsOf(const std::string& handler) {
+    std::vector<NamedRequest> found;
+    for (const auto* rows : {&servedRequests(), &facadeRequests()})
+        for (const NamedRequest& row : *rows)
+            if (row.handler == handler) found.push_back(row);
+    return found;
 }

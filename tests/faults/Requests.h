@@ -24,6 +24,14 @@ const std::vector<NamedRequest>& servedRequests();
 /// The names of their handlers, each once.
 const std::vector<std::string>& servingHandlers();
 
+/// The requests for the facade: those that the provider serves or refuses, and those that it alone
+/// answers; and the names of its handlers. Their messages are empty.
+const std::vector<NamedRequest>& facadeRequests();
+const std::vector<std::string>& facadeHandlers();
+
+/// The requests of a handler of the provider that serves, or of the facade.
+std::vector<NamedRequest> requestsOf(const std::string& handler);
+
 /// Those that it refuses by CMPI_RC_ERR_NOT_SUPPORTED: each operation on each class.
 const std::vector<NamedRequest>& refusedRequests();
 
