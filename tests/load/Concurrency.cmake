@@ -10,7 +10,7 @@ korva_test(concurrency_tests
             ../instrumentation/FixtureTree.cpp
     LIBRARIES korva_load korva::vainstrumentation korva::schema_reader
     PROPERTIES ${load_properties})
-add_dependencies(concurrency_tests korzbosstatusprofileprovider)
+add_dependencies(concurrency_tests korvaosstatusfacade)
 
 # The same without the list: reports must come, and about nothing else.
 if(KORVA_SANITIZE MATCHES "thread")

@@ -7,6 +7,7 @@
 #include <memory>
 #include <ostream>
 #include <sstream>
+#include <tuple>
 #include <utility>
 
 #include "framework/instrumentation/LinuxHost.h"
@@ -17,7 +18,8 @@
 #include "load/RecordShapes.h"
 #include "load/Requests.h"
 
-// Many threads in the provider at once, through the built library and the real logging.
+// Many threads in the provider at once, through the built library and the real logging, with the
+// facade in front of it and without.
 
 namespace {
 
@@ -79,6 +81,23 @@ constexpr Host hosts[] = {
     {"LinuxHost", linuxHost, "Test Linux"},
 };
 
+/// Who is asked what.
+struct Way {
+    const char* name;
+    Server server;
+    std::vector<MixedRequest> (*requests)(const std::string& computer, const std::string& system);
+    std::size_t fruitfulOneIn;  ///< at least
+};
+
+void PrintTo(const Way& way, std::ostream* out) {
+    *out << way.server.name;
+}
+
+constexpr Way ways[] = {
+    {"", provider, mixedRequests, 6},
+    {"ThroughTheFacade", facade, facadeRequests, 12},
+};
+
 /// The computer's name as the host source tells it: with a fixture tree it is the machine's.
 std::string computerName() {
     std::string name = "host1";
@@ -86,11 +105,12 @@ std::string computerName() {
     return name;
 }
 
-class EightThreads : public testing::TestWithParam<Host> {
+class EightThreads : public testing::TestWithParam<std::tuple<Host, Way>> {
   protected:
     EightThreads() {
-        VA::setHostSource(GetParam().make(tree_));
-        requests_ = mixedRequests(computerName(), GetParam().systemName);
+        const Host& host = std::get<Host>(GetParam());
+        VA::setHostSource(host.make(tree_));
+        requests_ = way_.requests(computerName(), host.systemName);
     }
     ~EightThreads() override {
         ::unsetenv("ZBLOG_CONF");
@@ -116,10 +136,10 @@ class EightThreads : public testing::TestWithParam<Host> {
         for (const MixedRequest& each : requests_) {
             alone_.push_back(loaded.answer(each.request));
             if (!alone_.back().paths.empty() || !alone_.back().instances.empty()) ++fruitful;
-            EXPECT_EQ(alone_.back().rc, each.status) << describe(each.request);
+            EXPECT_TRUE(each.allows(alone_.back().rc)) << describe(each.request);
             shapes_.push_back(shapesByThread(log_.news())[::getpid()]);
         }
-        EXPECT_GE(fruitful, requests_.size() / 6) << "requests that give anything";
+        EXPECT_GE(fruitful, requests_.size() / way_.fruitfulOneIn) << "requests that give anything";
     }
 
     // Asks every request on every thread while the entry points are called again.
@@ -142,6 +162,7 @@ class EightThreads : public testing::TestWithParam<Host> {
         return result;
     }
 
+    const Way way_ = std::get<Way>(GetParam());
     FixtureTree tree_;
     const std::string logFile_ = tree_.path("log");
     GrowingFile log_{logFile_};
@@ -153,7 +174,7 @@ class EightThreads : public testing::TestWithParam<Host> {
 
 TEST_P(EightThreads, GetTheAnswersOfEachRequestAsWhenItIsAlone) {
     configureLog("log.level = 0\n");
-    Loaded loaded;
+    Loaded loaded(way_.server);
     askAlone(loaded);
     askAtOnce(loaded, 2);
     EXPECT_EQ(log_.news(), "");
@@ -162,7 +183,7 @@ TEST_P(EightThreads, GetTheAnswersOfEachRequestAsWhenItIsAlone) {
 TEST_P(EightThreads, WriteTheRecordsOfTheirOwnRequestsEachALineOfItsOwn) {
     configureLog("log.level = 4000\ntrace.sink = file:" + logFile_ + "\n");
     keepOneRequestIn(3);
-    Loaded loaded;
+    Loaded loaded(way_.server);
     askAlone(loaded);
     askAtOnce(loaded, 1);
     std::map<long, Shapes> written = shapesByThread(log_.news());
@@ -177,7 +198,11 @@ TEST_P(EightThreads, WriteTheRecordsOfTheirOwnRequestsEachALineOfItsOwn) {
     EXPECT_THAT(written, IsEmpty());
 }
 
-INSTANTIATE_TEST_SUITE_P(On, EightThreads, testing::ValuesIn(hosts),
-                         [](const auto& row) { return std::string(row.param.name); });
+INSTANTIATE_TEST_SUITE_P(On, EightThreads,
+                         testing::Combine(testing::ValuesIn(hosts), testing::ValuesIn(ways)),
+                         [](const auto& row) {
+                             return std::string(std::get<Host>(row.param).name) +
+                                    std::get<Way>(row.param).name;
+                         });
 
 }  // namespace

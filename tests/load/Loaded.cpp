@@ -17,20 +17,25 @@ const ClassCatalogue& catalogue() {
 // Calls the factory of one kind and cleanup of what it returns; true when both answer as they
 // should.
 template <class MI>
-bool callAgain(const ProviderLibrary& library, const Broker& broker, const char* factory,
+bool callAgain(const ProviderLibrary& library, const Broker& broker, const std::string& factory,
                MI* interface) {
     using Factory = MI* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     MI* const made =
-        reinterpret_cast<Factory>(library.symbol(factory))(broker.cmpi(), nullptr, &status);
+        reinterpret_cast<Factory>(library.symbol(factory.c_str()))(broker.cmpi(), nullptr, &status);
     return made == interface && made->ft->cleanup(made, nullptr, 0).rc == CMPI_RC_OK;
+}
+
+LoadOptions byName(const std::string& name) {
+    LoadOptions options;
+    options.providerName = name;
+    return options;
 }
 
 }  // namespace
 
-Loaded::Loaded()
-    : broker_(&catalogue()),
-      library_(KORVA_BINARY_DIR "/lib/libkorzbosstatusprofileprovider.so.1", broker_) {
+Loaded::Loaded(const Server& server)
+    : name_(server.name), broker_(&catalogue()), library_(server.file, broker_, byName(name_)) {
     broker_.route(ComputerSystemService::className, computers_);
 }
 
@@ -39,11 +44,9 @@ Outcome Loaded::answer(const OperationRequest& request) {
 }
 
 std::string Loaded::callEntryPointsAgain() {
-    if (!callAgain(library_, broker_, "OperatingSystemProvider_Create_InstanceMI",
-                   library_.instanceMI()))
+    if (!callAgain(library_, broker_, name_ + "_Create_InstanceMI", library_.instanceMI()))
         return "instance interface";
-    if (!callAgain(library_, broker_, "OperatingSystemProvider_Create_AssociationMI",
-                   library_.associationMI()))
+    if (!callAgain(library_, broker_, name_ + "_Create_AssociationMI", library_.associationMI()))
         return "association interface";
     return {};
 }

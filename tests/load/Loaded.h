@@ -5,14 +5,15 @@
 
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
+#include "load/Requests.h"
 
 namespace load {
 
-/// The built provider with the framework's own logging, under a strict broker with the schema that
+/// A built library with the framework's own logging, under a strict broker with the schema that
 /// serves one computer system, "host1". Several threads may ask at once.
 class Loaded {
   public:
-    Loaded();
+    explicit Loaded(const Server& server);
 
     cmpihost::Outcome answer(const cmpihost::OperationRequest& request);
 
@@ -21,6 +22,7 @@ class Loaded {
     std::string callEntryPointsAgain();
 
   private:
+    std::string name_;
     cmpihost::ComputerSystemService computers_{"host1"};
     cmpihost::Broker broker_;
     cmpihost::ProviderLibrary library_;

@@ -67,12 +67,12 @@ TEST(SoakOptions, EachSetsWhatItNames) {
 TEST(SoakOptions, WithoutAnyTwoHundredThousandRequestsAndMemoryCompared) {
     const SoakOptions options = parsed({});
     EXPECT_EQ(options.requests, 200000U);
-    EXPECT_EQ(options.settle, 1000U);
+    EXPECT_EQ(options.settle, 2000U);
     EXPECT_TRUE(options.memory);
 }
 
 TEST(SoakOptions, OneLoadMoreThanThoseBeforeTheFirstReadingIsEnough) {
-    EXPECT_EQ(parsed({"--requests", "1001"}).requests, 1001U);
+    EXPECT_EQ(parsed({"--requests", "2001"}).requests, 2001U);
     EXPECT_EQ(parsed({"--settle", "0", "--requests", "1"}).settle, 0U);
 }
 
@@ -84,7 +84,7 @@ TEST(SoakOptions, MistakesAreRefusedWithTheUsage) {
                                                   {"--threads", "0"},
                                                   {"--per-load", "0"},
                                                   {"--requests", "500"},
-                                                  {"--requests", "1000"},
+                                                  {"--requests", "2000"},
                                                   {"--per-load", "600", "--requests", "1200"},
                                                   {"--settle", "200000"},
                                                   {"--per-load", "200000"}})

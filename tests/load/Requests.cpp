@@ -1,5 +1,7 @@
 #include "load/Requests.h"
 
+#include <algorithm>
+#include <iterator>
 #include <optional>
 #include <utility>
 
@@ -112,6 +114,21 @@ MixedRequest associationRequest(Operation operation, const ObjectPathValue& sour
     return result;
 }
 
+bool ofInstances(Operation operation) {
+    return std::any_of(std::begin(instanceOperations), std::end(instanceOperations),
+                       [&](const InstanceOperation& row) { return row.operation == operation; });
+}
+
+// What the facade answers where the provider has a status of its own.
+void judgeAsFacade(MixedRequest& each) {
+    const ObjectPathValue& source = each.request.path;
+    if (!ofInstances(each.request.operation)) each.status = CMPI_RC_OK;
+    if (each.request.operation != Operation::GetInstance || !isServed(source)) return;
+    const bool keysAreRight = !source.keys.empty() && source.keys[0].name != "Other";
+    each.status = keysAreRight ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_PARAMETER;
+    each.mayBeNotFound = keysAreRight;
+}
+
 MixedRequest referenceRequest(Operation operation, const ObjectPathValue& source) {
     MixedRequest result;
     result.request.operation = operation;
@@ -134,6 +151,25 @@ std::vector<MixedRequest> mixedRequests(const std::string& computer, const std::
         for (const Operation operation : {Operation::ReferenceNames, Operation::References})
             result.push_back(referenceRequest(operation, source));
     }
+    return result;
+}
+
+std::vector<MixedRequest> facadeRequests(const std::string& computer, const std::string& system) {
+    std::vector<MixedRequest> result = mixedRequests(computer, system);
+    for (MixedRequest& each : result) judgeAsFacade(each);
+    for (const Operation operation : {Operation::AssociatorNames, Operation::Associators,
+                                      Operation::ReferenceNames, Operation::References})
+        for (const ObjectPathValue& source :
+             {capabilitiesPath(system), systemPath(computer, system), computerPath(computer)}) {
+            MixedRequest each = {{}, CMPI_RC_OK};
+            each.request.operation = operation;
+            each.request.path = source;
+            each.request.role = "partcomponent";
+            each.request.properties = std::vector<std::string>{"OSType", "PrimaryOS"};
+            result.push_back(each);
+            each.request.role.reset();
+            result.push_back(each);
+        }
     return result;
 }
 

@@ -1,15 +1,14 @@
-# The soak loads and unloads the provider: nothing of the provider or of the framework may be in the
-# program itself. What chooses the host comes and goes with them.
+# The soak loads and unloads the facade and the provider: nothing of them or of the framework may be in
+# the program itself. What chooses the host comes and goes with them.
 add_library(load_hosts MODULE Hosts.cpp)
 target_link_libraries(load_hosts PRIVATE korva::options korva::vainstrumentation)
 target_include_directories(load_hosts PRIVATE "${PROJECT_SOURCE_DIR}")
 korva_shared_library(load_hosts)
 
 add_executable(soak ProcessState.cpp Soak.cpp SoakOptions.cpp Workload.cpp)
-target_compile_definitions(soak PRIVATE
-    KORVA_BINARY_DIR="${CMAKE_BINARY_DIR}" KORVA_LOAD_HOSTS="$<TARGET_FILE:load_hosts>")
+target_compile_definitions(soak PRIVATE KORVA_LOAD_HOSTS="$<TARGET_FILE:load_hosts>")
 target_link_libraries(soak PRIVATE korva_load korva::broker)
-add_dependencies(soak load_hosts korzbosstatusprofileprovider)
+add_dependencies(soak load_hosts korvaosstatusfacade)
 
 korva_test(soak_tests SOURCES ProcessState.cpp ProcessStateTest.cpp SoakOptions.cpp)
 

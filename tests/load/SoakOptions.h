@@ -5,7 +5,7 @@ namespace load {
 
 struct SoakOptions {
     unsigned long requests = 200000;  ///< in all; rounded up to whole loads, more than `settle`
-    unsigned long settle = 1000;      ///< of them before the first reading; rounded up as well
+    unsigned long settle = 2000;      ///< of them before the first reading; rounded up as well
     unsigned long perLoad = 250;      ///< between loading and unloading
     unsigned long threads = 1;
     bool memory = true;  ///< whether resident memory is compared
