@@ -109,13 +109,13 @@ bool isHarmless(const std::string& violation, bool oddComputers) {
                             holds(", not ") || holds(", in the path "));
 }
 
+}  // namespace
+
 void checkManners(const Scene& scene, cmpihost::Broker& broker) {
     for (const std::string& violation : broker.takeViolations())
         if (!isHarmless(violation, scene.oddComputers)) broken("good manners: " + violation);
     expect(broker.unreleasedClones() == 0, "clones are released");
 }
-
-}  // namespace
 
 void checkEnding(const Scene& scene, const Ending& ending, cmpihost::Broker& broker) {
     const bool faultless = ending.faultsFired == 0 && scene.logThrowsFrom == 0;

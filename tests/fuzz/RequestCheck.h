@@ -17,7 +17,11 @@ struct Ending {
     unsigned faultsFired = 0;
 };
 
-/// Ends the program where the request broke a rule; the records are those of StrictLog.
+/// Ends the program where the broker has something to complain of.
+void checkManners(const Scene& scene, cmpihost::Broker& broker);
+
+/// Ends the program where the request to the provider broke a rule; the records are those of
+/// StrictLog.
 void checkEnding(const Scene& scene, const Ending& ending, cmpihost::Broker& broker);
 
 }  // namespace fuzz
