@@ -137,10 +137,10 @@ TEST_P(InstalledLibrary, LeavesNothingBehindWhenItIsLoadedAndUnloadedAHundredTim
     EXPECT_LT(residentKiB() - memoryBefore, 512);
 }
 
-INSTANTIATE_TEST_SUITE_P(
-    Libraries, InstalledLibrary,
-    testing::Values(Registered{"libkorvaosstatusfacade.so", "OSStatusFacade"},
-                    Registered{"libkorzbosstatusprofileprovider.so", "OperatingSystemProvider"}),
-    [](const auto& row) { return std::string(row.param.provider); });
+INSTANTIATE_TEST_SUITE_P(Libraries, InstalledLibrary,
+                         testing::Values(Registered{"libkorvaosstatusfacade.so", "OSStatusFacade"},
+                                         Registered{"libkorzbosstatusprofileprovider.so",
+                                                    "OperatingSystemProvider"}),
+                         [](const auto& row) { return std::string(row.param.provider); });
 
 }  // namespace
