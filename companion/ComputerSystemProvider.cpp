@@ -113,7 +113,31 @@ static CMPIStatus ComputerSystem_ExecQuery(CMPIInstanceMI*, const CMPIContext*, 
     return status(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
-// Headers of a later level may have more slots at the end of the table: these stay null.
+// Headers of a later level may have more slots at the end of the table: these stay null, and the
+// version tells that they are none of this library's.
+#pragma GCC diagnostic push
 #pragma GCC diagnostic ignored "-Wmissing-field-initializers"
 
-CMInstanceMIStub(ComputerSystem_, ComputerSystemProvider, broker, CMNoHook)
+static const CMPIInstanceMIFT instanceTable = {
+    CMPIVersion200,
+    CMPIVersion200,
+    "instanceComputerSystemProvider",
+    ComputerSystem_Cleanup,
+    ComputerSystem_EnumInstanceNames,
+    ComputerSystem_EnumInstances,
+    ComputerSystem_GetInstance,
+    ComputerSystem_CreateInstance,
+    ComputerSystem_ModifyInstance,
+    ComputerSystem_DeleteInstance,
+    ComputerSystem_ExecQuery,
+};
+
+#pragma GCC diagnostic pop
+
+// The record points to the table as if it could be written; object managers only read it.
+extern "C" [[gnu::visibility("default")]] CMPIInstanceMI* ComputerSystemProvider_Create_InstanceMI(
+    const CMPIBroker* cmpiBroker, const CMPIContext*, CMPIStatus*) {
+    static CMPIInstanceMI mi = {nullptr, const_cast<CMPIInstanceMIFT*>(&instanceTable)};
+    broker = cmpiBroker;
+    return &mi;
+}

@@ -66,9 +66,11 @@ INSTANTIATE_TEST_SUITE_P(Of, DistributionHeaders,
                          [](const auto& each) { return each.param.name; });
 
 TEST_P(DistributionHeaders, LeaveTheLibraryAtItsLevel) {
-    const CMPIInstanceMIFT& instance = *provider.instanceMI()->ft;
-    EXPECT_EQ(instance.ftVersion, 200);
-    EXPECT_EQ(instance.miVersion, 200);
+    for (const ProviderLibrary* library : {&provider, &companion}) {
+        const CMPIInstanceMIFT& instance = *library->instanceMI()->ft;
+        EXPECT_EQ(instance.ftVersion, 200) << instance.miName;
+        EXPECT_EQ(instance.miVersion, 200) << instance.miName;
+    }
     const CMPIAssociationMIFT& association = *provider.associationMI()->ft;
     EXPECT_EQ(association.ftVersion, 200);
     EXPECT_EQ(association.miVersion, 200);
