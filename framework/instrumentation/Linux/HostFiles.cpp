@@ -17,7 +17,9 @@ namespace {
 class Descriptor {
   public:
     explicit Descriptor(int number) : number_(number) {}
-    ~Descriptor() { ::close(number_); }  // of none, where it is -1
+    ~Descriptor() {
+        if (number_ >= 0) ::close(number_);
+    }
     Descriptor(const Descriptor&) = delete;
     Descriptor& operator=(const Descriptor&) = delete;
     int number() const { return number_; }
@@ -109,7 +111,7 @@ std::optional<FileContent> HostFiles::read(const std::string& path) const {
     const std::string name = absolute(path);
     const Descriptor file(retried(
         [&] { return ::open(name.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY); }));
-    // A file that could not be opened has none.
+    if (file.number() < 0) return std::nullopt;
     const auto state = stateAt(file.number(), "", AT_EMPTY_PATH);
     if (!state || state->kind != FileState::Kind::Regular) return std::nullopt;
     auto text = readAll(file, state->size);
