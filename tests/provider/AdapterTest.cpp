@@ -131,6 +131,54 @@ TEST_F(Adapters, OfAssociationsSetEachReferenceByACallOfTheirOwn) {
               (Texts{"ManagedElement", "Capabilities"}));
 }
 
+/// A path with keys that notes the names that it is asked for.
+class AskedPath {
+  public:
+    AskedPath(const CMPIObjectPath* path, Texts& notes) : path_(path), notes_(notes) {
+        calls_.getKeyCount = [](const CMPIObjectPath* self, CMPIStatus* status) {
+            const CMPIObjectPath* const asked = of(self).path_;
+            return asked->ft->getKeyCount(asked, status);
+        };
+        calls_.getKey = [](const CMPIObjectPath* self, const char* name, CMPIStatus* status) {
+            of(self).notes_.push_back(std::string("key ") + name);
+            const CMPIObjectPath* const asked = of(self).path_;
+            return asked->ft->getKey(asked, name, status);
+        };
+    }
+    const CMPIObjectPath* cmpi() const { return &asking_; }
+
+  private:
+    static AskedPath& of(const CMPIObjectPath* self) { return *static_cast<AskedPath*>(self->hdl); }
+
+    const CMPIObjectPath* path_;
+    Texts& notes_;
+    CMPIObjectPathFT calls_ = {};
+    CMPIObjectPath asking_ = {this, &calls_};
+};
+
+TEST_F(Adapters, OfCapabilitiesReadApplyAndMapCapabilitiesBeforeTheyReadManagedElement) {
+    CMPIOSElementCapabilities adapter(broker.cmpi(), context, made("KORVA_Unknown"));
+    const CMPIObjectPath* const system = made("KORVA_OperatingSystem", {{"Name", "a"}});
+    const CMPIObjectPath* const capabilities =
+        made("KORVA_OperatingSystemCapabilities", {{"InstanceID", "a"}});
+    Texts sequence;
+    recording::setHook([&](const recording::Record& record) {
+        if (record.channel == "log" && record.text.rfind("ENTERING: ", 0) == 0)
+            sequence.push_back(record.file + ' ' + record.function);
+    });
+    const AskedPath path(made("KORVA_OSElementCapabilities",
+                              {{"ManagedElement", Value::fromReference(valueOf(system))},
+                               {"Capabilities", Value::fromReference(valueOf(capabilities))}}),
+                         sequence);
+    EXPECT_TRUE(adapter.setObjectPath(path.cmpi()));
+    recording::setHook({});
+    EXPECT_EQ(sequence, (Texts{"CMPIElementCapabilities.cpp setObjectPath", "key Capabilities",
+                               "CMPIOperatingSystemCapabilities.cpp setObjectPath",
+                               "CMPIElementCapabilities.cpp locateOperatingSystem",
+                               "Linux/ElementCapabilities.cpp getOperatingSystemMoniker",
+                               "key ManagedElement", "CMPIOperatingSystem.cpp setObjectPath"}));
+}
+
 /// What InstalledOS::isPrimaryOS is to answer in place of its own; none: its own answer.
 std::optional<bool> primaryAnswer;
 
