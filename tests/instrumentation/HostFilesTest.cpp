@@ -4,6 +4,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <signal.h>
+#include <sys/inotify.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
 #include <sys/sysmacros.h>
@@ -12,6 +13,7 @@
 
 #include <functional>
 
+#include "framework/instrumentation/Linux/SourceFiles.h"
 #include "tests/instrumentation/FixtureTree.h"
 
 namespace {
@@ -72,6 +74,24 @@ TEST_F(HostFilesTest, WhatIsNoRegularFileHasNoTextAndDoesNotBlock) {
                              "fifo/below", "missing/below"}) {
         EXPECT_EQ(files.text(name), std::nullopt) << name;
     }
+}
+
+TEST_F(HostFilesTest, FifoInPlaceOfASourceIsNotEvenOpened) {
+    tree.makeFifo("fifo");
+    tree.write("file", "x");
+    const int watch = ::inotify_init1(IN_NONBLOCK | IN_CLOEXEC);
+    const auto opened = [&] {
+        struct inotify_event event;
+        return ::read(watch, &event, sizeof event) == sizeof event;
+    };
+    ASSERT_GE(::inotify_add_watch(watch, tree.path("fifo").c_str(), IN_OPEN), 0);
+    ASSERT_GE(::inotify_add_watch(watch, tree.path("file").c_str(), IN_OPEN), 0);
+    VA::Linux::SourceFiles sources(files, 0);
+    EXPECT_FALSE(sources.read("fifo"));
+    EXPECT_FALSE(opened());
+    EXPECT_TRUE(sources.read("file"));
+    EXPECT_TRUE(opened());
+    ::close(watch);
 }
 
 TEST_F(HostFilesTest, LinksAreFollowed) {
