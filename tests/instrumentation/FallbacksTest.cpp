@@ -105,6 +105,12 @@ TEST_F(Fallbacks, MostProcessesIsTheSmallerLimitOrTheOneThatIsThere) {
     EXPECT_EQ(host.number(MaxNumberOfProcesses), std::nullopt);
 }
 
+TEST_F(Fallbacks, ProcessesAreTheNamesOfDigitsAlone) {
+    for (const char* name : {"proc/4a", "proc/a4", "proc/-7", "proc/ 9", "proc/9 "})
+        tree().makeFolder(name);
+    EXPECT_EQ(host.number(NumberOfProcesses), 3u);
+}
+
 TEST_F(Fallbacks, ProcessesAreAbsentWhereProcListsNone) {
     EXPECT_EQ(host.number(NumberOfProcesses), 3u);
     for (const char* name : {"proc/1", "proc/20", "proc/300"}) tree().remove(name);
