@@ -2,6 +2,7 @@
 #include <fuzzer/FuzzedDataProvider.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <ctime>
 #include <map>
 
@@ -81,6 +82,7 @@ class AnyFiles final : public Linux::HostFiles {
     template <class T>
     static std::optional<T> found(const std::map<std::string, T>& items, const std::string& path) {
         const auto item = items.find(path);
+        if (item == items.end()) errno = ENOENT;
         return item == items.end() ? std::nullopt : std::optional<T>(item->second);
     }
 

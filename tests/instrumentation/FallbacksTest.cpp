@@ -159,6 +159,27 @@ TEST_F(Fallbacks, SessionFileThatIsBeingWrittenDoesNotCount) {
     EXPECT_EQ(host.number(NumberOfUsers), 2u);
 }
 
+TEST_F(Fallbacks, UsersAreNeverTooFewByMistakeWhereASessionCannotBeRead) {
+    tree().write("run/utmp", "");
+    tree().write("large", std::string(1024 * 1024 + 1, '\n'));
+    struct Case {
+        const char* target;  // of the link in the session's place
+        std::optional<unsigned int> users;
+    };
+    const Case cases[] = {
+        {"/proc/self/mem", std::nullopt},  // opens, but cannot be read
+        {"1", std::nullopt},               // a loop, which cannot be opened
+        {"../../../large", std::nullopt},
+        {"nowhere", 1u},
+        {"/dev/null", 1u},
+    };
+    for (const Case& each : cases) {
+        tree().remove("run/systemd/sessions/1");
+        tree().makeLink("run/systemd/sessions/1", each.target);
+        EXPECT_EQ(host.number(NumberOfUsers), each.users) << each.target;
+    }
+}
+
 TEST_F(Fallbacks, FolderWithoutSessionsMeansNobodyWhateverUtmpSays) {
     tree().write("run/utmp", utmpRecord(utmpUserProcess, 20, "ada"));
     tree().remove("run/systemd/sessions");

@@ -52,12 +52,13 @@ class HostFiles {
     explicit HostFiles(std::string root);
     virtual ~HostFiles() = default;
 
-    /// A look at a file or folder, without opening it; the empty path is the root.
+    /// A look at a file or folder, without opening it; the empty path is the root. Where it gives
+    /// nothing, errno tells why.
     virtual std::optional<FileState> state(const std::string& path) const;
 
     /// The content of a regular file, which the files of proc are too; nothing where there is none,
-    /// or where it cannot be opened. Anything else at the path is opened and left, without waiting
-    /// and without reading: where that could matter, look at its state first.
+    /// or where it cannot be opened: errno tells which. Anything else at the path is opened and
+    /// left, without waiting and without reading: where that could matter, look at its state first.
     virtual std::optional<FileContent> read(const std::string& path) const;
 
     /// The content where it is whole, else nothing.

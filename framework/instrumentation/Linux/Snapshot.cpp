@@ -8,7 +8,6 @@
 #include "InstallDate.h"
 #include "Numbers.h"
 #include "PlainText.h"
-#include "Users.h"
 
 namespace VA::Linux {
 
@@ -143,7 +142,7 @@ std::optional<unsigned int> Snapshot::countProcesses() const {
 std::optional<unsigned int> Snapshot::countUsers() const {
     const auto sessions =
         parts_.kept->userSessions.value(*parts_.files, *parts_.kernel, countUserSessions);
-    if (*sessions) return *sessions;
+    if (sessions->listed) return sessions->number;
     const auto users = countUtmpUsers("run/utmp");
     return users ? users : countUtmpUsers("var/run/utmp");
 }

@@ -14,13 +14,14 @@
 #include "MemoryInfo.h"
 #include "OsRelease.h"
 #include "SystemState.h"
+#include "Users.h"
 
 namespace VA::Linux {
 
 /// What is known of a host from one snapshot to the next.
 struct KeptValues {
     Kept<OsRelease> osRelease;
-    Kept<std::optional<std::uint32_t>> userSessions;
+    Kept<UserSessions> userSessions;
     BootTime bootTime;
 };
 

@@ -1,6 +1,7 @@
 #include "SourceFiles.h"
 
 #include <algorithm>
+#include <cerrno>
 
 namespace VA::Linux {
 
@@ -17,6 +18,7 @@ std::optional<FileContent> SourceFiles::read(const std::string& path) {
     const auto state = lookAt(path);
     if (!state || state->kind != FileState::Kind::Regular) return std::nullopt;
     auto content = files_->read(path);
+    metFailure_ = metFailure_ || (content ? !content->whole : errno != ENOENT);
     // A size that is not that of the content, as in proc, goes with times that tell nothing.
     readWhole_ = readWhole_ && content && content->whole && content->text.size() == state->size &&
                  content->state == *state;
@@ -29,6 +31,7 @@ std::optional<std::vector<std::string>> SourceFiles::names(const std::string& fo
     std::vector<std::string> names;
     const auto listed =
         files_->forEachName(folder, [&](std::string_view name) { names.emplace_back(name); });
+    metFailure_ = metFailure_ || !listed;
     readWhole_ = readWhole_ && listed == state;
     if (!listed) return std::nullopt;
     return names;
@@ -36,6 +39,7 @@ std::optional<std::vector<std::string>> SourceFiles::names(const std::string& fo
 
 std::optional<FileState> SourceFiles::lookAt(const std::string& path) {
     auto state = files_->state(path);
+    metFailure_ = metFailure_ || (!state && errno != ENOENT);
     looks_.push_back({path, state});
     return state;
 }

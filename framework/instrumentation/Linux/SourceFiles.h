@@ -26,6 +26,10 @@ class SourceFiles {
     std::optional<FileContent> read(const std::string& path);
     std::optional<std::vector<std::string>> names(const std::string& folder);
 
+    /// True when a file or folder that was not simply missing could not be looked at, opened or
+    /// read whole.
+    bool metFailure() const { return metFailure_; }
+
     /// True when a later look can tell whether the value still holds: every file was read whole and
     /// none was changed so short a time before that another change could bear the same time.
     bool canBeKept() const;
@@ -44,6 +48,7 @@ class SourceFiles {
     const HostFiles* files_;
     std::int64_t now_;
     bool readWhole_ = true;
+    bool metFailure_ = false;
     std::vector<Look> looks_;
 };
 

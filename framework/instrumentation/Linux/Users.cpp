@@ -21,17 +21,19 @@ bool isUserSession(std::string_view sessionFile) {
            assignedValue(sessionFile, "STATE") != "closing";
 }
 
-std::optional<std::uint32_t> countUserSessions(SourceFiles& files) {
+UserSessions countUserSessions(SourceFiles& files) {
     const std::string folder = "run/systemd/sessions";
     const auto names = files.names(folder);
-    if (!names) return std::nullopt;
+    if (!names) return {false, std::nullopt};
     std::uint64_t count = 0;
     for (const std::string& name : *names) {
         if (name.front() == '.') continue;  // a session file that is being written
         const auto file = files.read(folder + '/' + name);
         if (file && isUserSession(file->text)) ++count;
     }
-    return saturated(count);
+    // A session that cannot be read may be one more.
+    if (files.metFailure()) return {true, std::nullopt};
+    return {true, saturated(count)};
 }
 
 std::optional<std::uint32_t> countUtmpUsers(std::string_view utmp,

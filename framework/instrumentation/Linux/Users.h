@@ -15,8 +15,13 @@ namespace VA::Linux {
 /// its user has left.
 bool isUserSession(std::string_view sessionFile);
 
-/// The number of such files in run/systemd/sessions; nothing where that folder cannot be read.
-std::optional<std::uint32_t> countUserSessions(SourceFiles& files);
+struct UserSessions {
+    bool listed = false;                  ///< false where run/systemd/sessions cannot be read
+    std::optional<std::uint32_t> number;  ///< nothing, too, where a file in it cannot be read
+};
+
+/// Counts such files in run/systemd/sessions. One that has gone since it was listed does not count.
+UserSessions countUserSessions(SourceFiles& files);
 
 /// The number of user sessions in a utmp file: its USER_PROCESS records whose process passes
 /// `isAlive`. Nothing for a file that is not a whole number of records, and for one with such
