@@ -26,16 +26,22 @@ bool isAboutOneInstance(Operation operation) {
     }
 }
 
+/// Names of systems compare without case, as the provider compares them; other texts do not.
+bool sameText(const std::string& key, const std::string& given, const std::string& other) {
+    const bool withoutCase = equalNames(key, "CSName") || equalNames(key, "Name");
+    return withoutCase ? equalNames(given, other) : given == other;
+}
+
 /// A number in a path has a type of its own, whatever the class declares.
-bool sameValue(const Value& given, const Value& other) {
-    return given == other ||
-           (given.isText() == other.isText() && equalNames(given.toText(), other.toText()));
+bool sameValue(const KeyBinding& given, const Value& other) {
+    return given.value == other || (given.value.isText() == other.isText() &&
+                                    sameText(given.name, given.value.toText(), other.toText()));
 }
 
 bool hasKeys(const ObjectPathValue& name, const std::vector<KeyBinding>& given) {
     return std::all_of(given.begin(), given.end(), [&](const KeyBinding& key) {
         const Value* value = name.key(key.name);
-        return value != nullptr && sameValue(key.value, *value);
+        return value != nullptr && sameValue(key, *value);
     });
 }
 

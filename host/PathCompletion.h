@@ -14,9 +14,10 @@ bool lacksKeys(const OperationRequest& request, const ClassCatalogue& catalogue)
 /// The request for the names of all instances of the path's class.
 OperationRequest namesRequest(const ObjectPathValue& path);
 
-/// The one of `names` that has the keys which the path gives. Texts compare without case and stay
-/// as the path gives them: whether that is the same is for those to decide who answer. Throws
-/// UsageError, with the names that there are, when none or several have the keys.
+/// The one of `names` that has the keys which the path gives. Texts compare with case, but for
+/// those of CSName and Name, and stay as the path gives them: whether that is the same is for those
+/// to decide who answer. Throws UsageError, with the names that there are, when none or several
+/// have the keys.
 ObjectPathValue completedPath(const ObjectPathValue& path,
                               const std::vector<ObjectPathValue>& names);
 

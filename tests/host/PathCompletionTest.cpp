@@ -1,6 +1,6 @@
 #include "host/PathCompletion.h"
 
-#include <gtest/gtest.h>
+#include <gmock/gmock.h>
 
 #include "host/MofParser.h"
 #include "host/PathText.h"
@@ -10,6 +10,7 @@
 namespace {
 
 using namespace cmpihost;
+using testing::StartsWith;
 
 class PathCompletion : public testing::Test {
   protected:
@@ -18,6 +19,7 @@ class PathCompletion : public testing::Test {
             mof::parse("class Thing { [Key] string Name; [Key] uint16 Number; [Key] boolean On;"
                        " string Colour; };"
                        "class Keyless { string Name; };"
+                       "class Seat { [Key] string CSName; [Key] string Row; [Key] uint8 No; };"
                        "[Association] class Link { [Key] Thing REF One; [Key] Thing REF Two; };",
                        "x.mof"));
     }
@@ -112,6 +114,18 @@ TEST_F(PathCompletion, ComparesReferencesAsPaths) {
 
 TEST_F(PathCompletion, KeepsAGivenTextAsItIsWritten) {
     EXPECT_EQ(completed("Thing.Name=\"B\"", two_), "root/cimv2:Thing.Name=\"B\",Number=2,On=FALSE");
+}
+
+TEST_F(PathCompletion, ComparesTextsWithCaseButForThoseOfCSNameAndName) {
+    const ObjectPathValue seat = {"root/cimv2",
+                                  "Seat",
+                                  {{"CSName", Value::fromText("Hall", CMPI_chars)},
+                                   {"Row", Value::fromText("K", CMPI_chars)},
+                                   {"No", Value::fromUnsigned(7, CMPI_uint8)}}};
+    EXPECT_EQ(completed("Seat.csname=\"hALL\",row=\"K\"", {seat}),
+              "root/cimv2:Seat.CSName=\"hALL\",Row=\"K\",No=7");
+    EXPECT_THAT(completed("Seat.Row=\"k\"", {seat}),
+                StartsWith("the path lacks keys, and no instance of Seat has those"));
 }
 
 TEST_F(PathCompletion, StaysInTheNamespaceOfThePath) {
