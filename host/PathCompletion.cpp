@@ -63,8 +63,8 @@ std::string complaint(const std::string& className, const std::vector<ObjectPath
         return start + "there is no instance of " + className;
     }
     if (matching.empty()) {
-        return start + "no instance of " + className + " has those that it gives; there is" +
-               list(names);
+        return start + "no instance of " + className +
+               " has those that it gives; the instances are:" + list(names);
     }
     return start + std::to_string(matching.size()) + " instances of " + className +
            " have those that it gives:" + list(matching);
@@ -80,8 +80,14 @@ bool lacksKeys(const OperationRequest& request, const ClassCatalogue& catalogue)
     const auto isLacking = [&](const PropertyDeclaration& property) {
         return property.key && request.path.key(property.name) == nullptr;
     };
+    const auto isDeclared = [&](const KeyBinding& given) {
+        const PropertyDeclaration* property = declaration->property(given.name);
+        return property != nullptr && property->key;
+    };
     const auto& properties = declaration->properties;
-    return std::any_of(properties.begin(), properties.end(), isLacking);
+    const auto& given = request.path.keys;
+    return std::any_of(properties.begin(), properties.end(), isLacking) &&
+           std::all_of(given.begin(), given.end(), isDeclared);
 }
 
 OperationRequest namesRequest(const ObjectPathValue& path) {

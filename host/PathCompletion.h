@@ -8,7 +8,8 @@
 namespace cmpihost {
 
 /// Whether a request is about one instance, to get it or to start from it, and its path does not
-/// give every key that the catalogue declares for the class.
+/// give every key that the catalogue declares for the class. Not when it gives one that is not
+/// declared, as a misspelt one: that path is wrong, whatever else it lacks.
 bool lacksKeys(const OperationRequest& request, const ClassCatalogue& catalogue);
 
 /// The request for the names of all instances of the path's class.

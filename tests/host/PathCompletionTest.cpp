@@ -60,7 +60,8 @@ TEST_F(PathCompletion, IsForPathsOfInstancesThatLackAKey) {
         EXPECT_TRUE(lacking(text)) << text;
     }
     for (const char* text : {"Thing.on=TRUE,number=1,name=\"a\"", "Keyless", "Stranger",
-                             "Thing.Name=\"a\",Number=1,On=TRUE,Extra=1"}) {
+                             "Thing.Name=\"a\",Number=1,On=TRUE,Extra=1", "Thing.Nam=\"a\"",
+                             "Thing.Name=\"a\",Colour=\"red\""}) {
         EXPECT_FALSE(lacking(text)) << text;
     }
 }
@@ -135,11 +136,11 @@ TEST_F(PathCompletion, StaysInTheNamespaceOfThePath) {
 }
 
 TEST_F(PathCompletion, ListsTheNamesWhenNoneHasTheGivenKeys) {
-    for (const char* given : {"Thing.Name=\"c\"", "Thing.Name=\"a\",Number=2", "Thing.Number=\"1\"",
-                              "Thing.On=1", "Thing.Colour=\"red\""}) {
+    for (const char* given :
+         {"Thing.Name=\"c\"", "Thing.Name=\"a\",Number=2", "Thing.Number=\"1\"", "Thing.On=1"}) {
         EXPECT_EQ(completed(given, two_),
-                  "the path lacks keys, and no instance of Thing has those that it gives; there "
-                  "is\n"
+                  "the path lacks keys, and no instance of Thing has those that it gives; the "
+                  "instances are:\n"
                   "  root/cimv2:Thing.Name=\"a\",Number=1,On=TRUE\n"
                   "  root/cimv2:Thing.Name=\"b\",Number=2,On=FALSE")
             << given;

@@ -91,7 +91,7 @@ TEST(Program, CompletesNoPathThatNoneOrSeveralInstancesFit) {
     EXPECT_EQ(none.out, "");
     EXPECT_EQ(none.err,
               "cmpihost: the path lacks keys, and no instance of KORVA_OperatingSystem has those "
-              "that it gives; there is\n  " +
+              "that it gives; the instances are:\n  " +
                   std::string(moonPath) + "\n");
     const ProgramRun several =
         withStandIn({"--computer-systems", "2", "ain", "KORVA_ComputerSystem"});

@@ -164,6 +164,13 @@ TEST_F(ProgramWithFacade, CompletesThePathOfTheOperatingSystem) {
     }
 }
 
+TEST_F(ProgramWithFacade, TellsAMisspeltKeyFromAMissingOne) {
+    const ProgramRun run = cmpihost({"gi", "KORVA_OperatingSystem.Foo=\"x\""});
+    EXPECT_EQ(run.status, 1);
+    EXPECT_EQ(run.out, "");
+    EXPECT_THAT(run.err, HasSubstr("has no key Foo"));
+}
+
 TEST_F(ProgramWithFacade, AnswersNothingAboutObjectsOfOthers) {
     for (const char* operation : {"ai", "ain", "ri", "rin"}) {
         const ProgramRun run = cmpihost({operation, "CIM_Elsewhere.Name=\"x\""});
