@@ -1,6 +1,7 @@
 #include "host/Notes.h"
 
 #include <algorithm>
+#include <optional>
 #include <vector>
 
 #include "host/StatusText.h"
@@ -60,6 +61,56 @@ std::string notesOnNames(const OperationRequest& request, const OperationResult&
     return notes;
 }
 
+bool startsFromAnInstance(Operation operation) {
+    return operation == Operation::Associators || operation == Operation::AssociatorNames ||
+           operation == Operation::References || operation == Operation::ReferenceNames;
+}
+
+/// The classes of the CIM schema are ancestors that no file needs to declare.
+bool mayBeClass(const Schema& schema, const std::string& name) {
+    return schema.find(name) != nullptr || equalNames(name.substr(0, 4), "CIM_");
+}
+
+bool isRole(const Schema& schema, const std::string& name) {
+    const std::vector<std::string> classes = schema.classNames();
+    return std::any_of(classes.begin(), classes.end(), [&](const std::string& className) {
+        const mof::Feature* property = schema.findProperty(className, name);
+        return schema.isAssociation(className) && property != nullptr &&
+               property->type == mof::Type::Reference;
+    });
+}
+
+/// A line that begins with `start` for each name of an association request that is most likely
+/// misspelt.
+std::string linesOnUnknownNames(const std::string& start, const OperationRequest& request,
+                                const Schema& schema) {
+    std::string lines;
+    const auto tell = [&](const std::string& what, const std::string& name) {
+        lines += start + what + " '" + terminalText(name) + "'\n";
+    };
+    const std::string& source = request.path.className;
+    for (const auto& name : {std::optional(source), request.assocClass, request.resultClass}) {
+        if (name && !mayBeClass(schema, *name)) {
+            tell("the schema has no class", *name);
+        }
+    }
+    for (const auto& name : {request.role, request.resultRole}) {
+        if (name && !isRole(schema, *name)) {
+            tell("no association of the schema has a role", *name);
+        }
+    }
+    for (const KeyBinding& key : request.path.keys) {
+        if (schema.find(source) != nullptr && !schema.isKey(source, key.name)) {
+            tell("the class " + schema.find(source)->name + " declares no key", key.name);
+        }
+    }
+    return lines;
+}
+
+bool isEmpty(const OperationResult& result) {
+    return result.paths.empty() && result.instances.empty();
+}
+
 bool yieldsInstances(Operation operation) {
     return operation == Operation::EnumerateInstances || operation == Operation::GetInstance ||
            operation == Operation::Associators || operation == Operation::References;
@@ -73,6 +124,9 @@ std::string notesOn(const OperationRequest& request, const OperationResult& resu
     if (request.operation == Operation::GetInstance) {
         notes = noteOnCount(result);
     }
+    if (startsFromAnInstance(request.operation) && isEmpty(result)) {
+        notes += linesOnUnknownNames("note: ", request, schema);
+    }
     if (yieldsInstances(request.operation)) {
         notes += notesOnNames(request, result, schema);
     }
@@ -83,8 +137,12 @@ std::string hintFor(const OperationRequest& request, const OperationResult& fail
                     const Schema& schema) {
     const bool associators = request.operation == Operation::Associators ||
                              request.operation == Operation::AssociatorNames;
-    if (!associators || request.assocClass || failure.rc != CMPI_RC_ERR_INVALID_CLASS) {
+    if (!associators || failure.rc != CMPI_RC_ERR_INVALID_CLASS) {
         return {};
+    }
+    const std::string unknown = linesOnUnknownNames("hint: ", request, schema);
+    if (request.assocClass) {
+        return unknown;
     }
     std::string names;
     for (const std::string& name : schema.classNames()) {
@@ -92,7 +150,7 @@ std::string hintFor(const OperationRequest& request, const OperationResult& fail
             names += (names.empty() ? "" : ", ") + name;
         }
     }
-    return "hint: name the association with --assoc-class" +
+    return unknown + "hint: name the association with --assoc-class" +
            (names.empty() ? "" : ", one of " + names) + "\n";
 }
 

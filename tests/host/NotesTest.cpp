@@ -30,9 +30,14 @@ class Notes : public testing::Test {
         }
         return notesOn(request, result, schema_);
     }
-    std::string hint(Operation operation, CMPIrc rc) {
+    static OperationRequest association(Operation operation) {
         OperationRequest request;
         request.operation = operation;
+        request.path.className = "Thing";
+        return request;
+    }
+    std::string hint(Operation operation, CMPIrc rc) {
+        OperationRequest request = association(operation);
         OperationResult failure;
         failure.rc = rc;
         return hintFor(request, failure, schema_);
@@ -73,6 +78,48 @@ TEST_F(Notes, HintAtTheAssociationThatARequestDoesNotName) {
               "hint: name the association with --assoc-class, one of Link\n");
     EXPECT_EQ(hint(Operation::Associators, CMPI_RC_ERR_FAILED), "");
     EXPECT_EQ(hint(Operation::EnumerateInstances, CMPI_RC_ERR_INVALID_CLASS), "");
+}
+
+TEST_F(Notes, TellWhichNamesOfAnAssociationRequestWithoutAnAnswerTheSchemaDoesNotHave) {
+    OperationRequest request = association(Operation::AssociatorNames);
+    const auto answered = [&](const OperationResult& result) {
+        return notesOn(request, result, schema_);
+    };
+    request.path.keys = {{"name", Value::fromText("x", CMPI_chars)}};
+    request.assocClass = "lINK";
+    request.resultClass = "cim_Thing";
+    request.role = "one";
+    EXPECT_EQ(answered({}), "");
+    request.path.keys.push_back({"On", Value::fromBoolean(true)});
+    request.assocClass = "Lnik\n";
+    request.resultClass = "Prat";
+    request.role = "Name";
+    request.resultRole = "Two";
+    EXPECT_EQ(answered({}),
+              "note: the schema has no class 'Lnik\\n'\n"
+              "note: the schema has no class 'Prat'\n"
+              "note: no association of the schema has a role 'Name'\n"
+              "note: no association of the schema has a role 'Two'\n"
+              "note: the class Thing declares no key 'On'\n");
+    OperationResult found;
+    found.paths.push_back({"ns", "Part", {}});
+    EXPECT_EQ(answered(found), "");
+    for (const Operation operation :
+         {Operation::Associators, Operation::References, Operation::ReferenceNames}) {
+        request = association(operation);
+        request.path.className = "Thnig";
+        EXPECT_EQ(answered({}), "note: the schema has no class 'Thnig'\n");
+    }
+}
+
+TEST_F(Notes, HintAtTheAssociationThatARequestMisspells) {
+    OperationRequest request = association(Operation::AssociatorNames);
+    request.assocClass = "Lnik";
+    OperationResult failure;
+    failure.rc = CMPI_RC_ERR_INVALID_CLASS;
+    EXPECT_EQ(hintFor(request, failure, schema_), "hint: the schema has no class 'Lnik'\n");
+    request.assocClass = "Link";
+    EXPECT_EQ(hintFor(request, failure, schema_), "");
 }
 
 }  // namespace

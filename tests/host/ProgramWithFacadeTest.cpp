@@ -169,6 +169,27 @@ TEST_F(ProgramWithFacade, TellsAMisspeltKeyFromAMissingOne) {
     EXPECT_EQ(run.status, 1);
     EXPECT_EQ(run.out, "");
     EXPECT_THAT(run.err, HasSubstr("has no key Foo"));
+    EXPECT_EQ(cmpihost({"ain", "KORVA_OperatingSystem.Foo=\"x\""}).err,
+              "note: the class KORVA_OperatingSystem declares no key 'Foo'\n");
+}
+
+TEST_F(ProgramWithFacade, NotesTheMisspeltNamesOfAnAssociationRequest) {
+    const struct {
+        std::vector<std::string> arguments;
+        const char* note;
+    } rows[] = {
+        {{"ain", "KORVA_OperatingSytem"}, "the schema has no class 'KORVA_OperatingSytem'"},
+        {{"ain", system_, "--assoc-class", "Foo"}, "the schema has no class 'Foo'"},
+        {{"rin", system_, "--result-class", "Foo"}, "the schema has no class 'Foo'"},
+        {{"ri", system_, "--role", "Foo"}, "no association of the schema has a role 'Foo'"},
+        {{"ai", system_, "--result-role", "Foo"}, "no association of the schema has a role 'Foo'"},
+    };
+    for (const auto& row : rows) {
+        const ProgramRun run = cmpihost(row.arguments);
+        EXPECT_EQ(run.status, 0) << row.note;
+        EXPECT_EQ(run.out, "") << row.note;
+        EXPECT_EQ(run.err, "note: " + std::string(row.note) + "\n");
+    }
 }
 
 TEST_F(ProgramWithFacade, AnswersNothingAboutObjectsOfOthers) {

@@ -98,6 +98,11 @@ TEST(ProgramWithProvider, TellsHowToNameTheAssociationThatTheProviderNeeds) {
     const ProgramRun named =
         cmpihost({"--bare", "ain", "KORVA_OperatingSystem", "--assoc-class", "CIM_RunningOS"});
     EXPECT_EQ(named.err, "cmpihost: CIM_ERR_INVALID_CLASS (5)\n");
+    const ProgramRun misspelt =
+        cmpihost({"--bare", "ain", "KORVA_OperatingSystem", "--assoc-class", "KORVA_RunninOS"});
+    EXPECT_EQ(misspelt.err,
+              "cmpihost: CIM_ERR_INVALID_CLASS (5)\n"
+              "hint: the schema has no class 'KORVA_RunninOS'\n");
 }
 
 TEST(ProgramWithProvider, ShowsTheRecordsOnlyWhenAskedTo) {
