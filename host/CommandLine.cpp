@@ -203,13 +203,15 @@ std::string Parser::withoutOperation(const CLI::ParseError& error) const {
 }
 
 void Parser::addHostOptions() {
-    app_.add_option("--provider", result_.provider,
-                    "Library of the provider; without it the facade beside this program,\n"
-                    "which asks the provider")
-        ->type_name("FILE")
-        ->check(notEmpty());
+    CLI::Option* provider =
+        app_.add_option("--provider", result_.provider,
+                        "Library of the provider; without it the facade beside this program,\n"
+                        "which asks the provider")
+            ->type_name("FILE")
+            ->check(notEmpty());
     app_.add_flag("--bare", result_.bare,
-                  "Ask the provider itself, and complete no path that lacks keys");
+                  "Ask the provider itself, and complete no path that lacks keys")
+        ->excludes(provider);
     app_.add_option_function<std::string>(
             "--format", [this](const std::string& word) { result_.format = formatNamed(word); },
             "How results are printed: table (the default), mof or json;\n"

@@ -15,9 +15,9 @@ enum ExitStatus { exitDone = 0, exitCimStatus = 1, exitUsage = 2, exitNotLoaded 
 
 /// What the user asks for, as written: no text is looked into yet.
 struct CommandLine {
-    /// The provider's library; empty: the facade beside this program.
+    /// The provider's library; empty: the facade beside this program, or what `bare` says.
     std::string provider;
-    /// Ask the provider itself, without the facade, and leave paths as they are.
+    /// Ask the provider beside this program, without the facade, and leave paths as they are.
     bool bare = false;
     /// The folder of the MOF files; empty: the one beside this program.
     std::string schema;

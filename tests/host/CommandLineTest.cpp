@@ -48,16 +48,16 @@ TEST(CommandLine, HasQuietDefaults) {
 
 TEST(CommandLine, TakesOptionsBeforeAndAfterTheOperation) {
     for (const auto& words : std::vector<std::vector<const char*>>{
-             {"--provider", "p.so", "--format", "json", "--log", "--bare", "--schema=d", "ei", "X"},
-             {"ei", "X", "--format=json", "--log", "--bare", "--schema", "d", "--provider",
-              "p.so"}}) {
+             {"--provider", "p.so", "--format", "json", "--log", "--schema=d", "ei", "X"},
+             {"ei", "X", "--format=json", "--log", "--schema", "d", "--provider", "p.so"}}) {
         const CommandLine line = accepted(words);
         EXPECT_EQ(line.provider, "p.so");
         EXPECT_EQ(line.format, Format::Json);
         EXPECT_TRUE(line.log);
-        EXPECT_TRUE(line.bare);
         EXPECT_EQ(line.schema, "d");
     }
+    EXPECT_TRUE(accepted({"--bare", "ei", "X"}).bare);
+    EXPECT_TRUE(accepted({"ei", "X", "--bare"}).bare);
     EXPECT_EQ(accepted({"--format", "mof", "ei", "X"}).format, Format::Mof);
     EXPECT_EQ(accepted({"--format", "table", "ei", "X"}).format, Format::Table);
 }
@@ -138,6 +138,7 @@ TEST(CommandLine, RefusesWhatItDoesNotKnow) {
         {{"--format", "mof", "--format", "json", "ei", "X"},
          "--format: At Most 1 required but received 2\n"},
         {{"--colour", "ei", "X"}, "The following argument was not expected: --colour\n"},
+        {{"--provider", "p.so", "--bare", "ei", "X"}, "--provider excludes --bare\n"},
         {{"--companion", "c.so", "--computer-systems", "2", "tree"},
          "--companion excludes --computer-systems\n"},
     };

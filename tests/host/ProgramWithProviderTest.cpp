@@ -86,6 +86,17 @@ TEST(ProgramWithProvider, NamesTheStatusOfARefusal) {
     EXPECT_EQ(unknown.err, "cmpihost: CIM_ERR_INVALID_CLASS (5)\n");
 }
 
+TEST(ProgramWithProvider, IsAskedWithPathsAsTheyAre) {
+    for (const std::vector<std::string>& request :
+         {std::vector<std::string>{"--bare", "gi", "KORVA_OperatingSystem"},
+          {"--bare", "ain", "KORVA_OperatingSystem", "--assoc-class", "KORVA_RunningOS"}}) {
+        const ProgramRun run = cmpihost(request);
+        EXPECT_EQ(run.status, 0);
+        EXPECT_NE(run.out, "");
+        EXPECT_EQ(run.err, "");
+    }
+}
+
 TEST(ProgramWithProvider, TellsHowToNameTheAssociationThatTheProviderNeeds) {
     for (const char* operation : {"ai", "ain"}) {
         const ProgramRun run = cmpihost({"--bare", operation, "KORVA_OperatingSystem"});
