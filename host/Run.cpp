@@ -57,7 +57,8 @@ std::string providerFile(const CommandLine& commandLine, const fs::path& program
         for (const fs::path& candidate : candidates(wanted, programFolder)) {
             text += "\n  " + terminalText(candidate.string());
         }
-        throw NoProvider(text + "\n(--provider FILE names one)");
+        throw NoProvider(text + "\n(--provider FILE names one" +
+                         (commandLine.bare ? ", without --bare)" : ")"));
     }
     return found.string();
 }

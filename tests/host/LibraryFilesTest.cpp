@@ -156,17 +156,20 @@ TEST_F(ProgramElsewhere, WithoutItsLibraryExitsWithThreeAndTellsThePlaces) {
         std::vector<std::string> arguments;
         const char* complaint;
         const char* place;
+        const char* hint;
     } rows[] = {{{"ei", "X"},
                  "cmpihost: no library of the facade was found; looked for\n",
-                 "lib/libkorvaosstatusfacade.so.1\n"},
+                 "lib/libkorvaosstatusfacade.so.1\n",
+                 "\n(--provider FILE names one)\n"},
                 {{"--bare", "ei", "X"},
                  "cmpihost: no library of the provider was found; looked for\n",
-                 "lib/libkorzbosstatusprofileprovider.so.1\n"}};
+                 "lib/libkorzbosstatusprofileprovider.so.1\n",
+                 "\n(--provider FILE names one, without --bare)\n"}};
     for (const auto& row : rows) {
         const ProgramRun run = cmpihost(row.arguments);
         EXPECT_EQ(run.status, 3);
         EXPECT_THAT(run.err, StartsWith(row.complaint + ("  " + (folder_ / row.place).string())));
-        EXPECT_THAT(run.err, EndsWith("\n(--provider FILE names one)\n"));
+        EXPECT_THAT(run.err, EndsWith(row.hint));
     }
 }
 
