@@ -86,9 +86,11 @@ void getInstance(const Request& request, const char** properties) {
         candidates.push_back(request.identityOf(pathOf(instance)));
         if (candidates.back() == wanted) return request.deliver({instance}, properties);
     }
+    requireWhole(answer, known->name);
     // The provider tells of elements only those that have some of the keys.
     if (!known->isAssociation()) {
         const Answer names = request.enumerateInstanceNames(request.newPath(known->name));
+        requireWhole(names, known->name);
         for (const CMPIObjectPath* path : names.paths())
             candidates.push_back(request.identityOf(path));
     }

@@ -92,13 +92,20 @@ TEST_F(BrokenWalks, OfTheInstancesAtTheFarEndsFailTheRequest) {
     EXPECT_THAT(delivered(toComputers), ElementsAre(computerSystem));
 }
 
-TEST_F(BrokenWalks, OfGetInstanceMeanThatItIsNotFound) {
-    host->throwFromCall(HostOperation::Select, 1, std::runtime_error("x"));
-    OperationRequest get = request(Operation::GetInstance, "KORVA_OperatingSystem");
-    get.path = operatingSystemPath("host1", "Linux");
-    EXPECT_EQ(refusal(get),
-              "6 no instance of KORVA_OperatingSystem has this CSCreationClassName, CSName, "
-              "CreationClassName, Name");
+// What is there must not look as if it were gone.
+TEST_F(BrokenWalks, OfGetInstanceFailTheRequest) {
+    const auto get = [this](const ObjectPathValue& path, HostOperation operation, unsigned call) {
+        host->throwFromCall(operation, host->calls(operation) + call, std::runtime_error("x"));
+        OperationRequest result = request(Operation::GetInstance, path.className);
+        result.path = path;
+        return refusal(result);
+    };
+    const std::string brokeOff = "1 the answer about KORVA_OperatingSystem broke off";
+    EXPECT_EQ(get(operatingSystemPath("host1", "Linux"), HostOperation::Select, 1), brokeOff);
+    EXPECT_EQ(get(capabilitiesPath("Linux"), HostOperation::Select, 1),
+              "1 the answer about KORVA_OperatingSystemCapabilities broke off");
+    // The names that tell which key is unknown.
+    EXPECT_EQ(get(operatingSystemPath("host1", "other"), HostOperation::Select, 2), brokeOff);
 }
 
 TEST_F(BrokenWalks, ThatThrowWhatTheProviderDoesNotCatchFailTheRequest) {

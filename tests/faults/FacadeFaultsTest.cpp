@@ -58,14 +58,15 @@ class FacadeFaults : public FaultsOfHandler {
         }
     }
 
-    // As due, or because something failed, or because the provider broke off where it tells of an
-    // instance that there is none.
+    // As due, or because something failed, or because the provider broke off where it tells of a
+    // pair that there is none.
     void expectRefused(const Answer& answer) const {
         EXPECT_EQ(answer.outcome.doneCount, 0U);
         EXPECT_TRUE(answer.elements.empty());
         const CMPIrc rc = answer.outcome.rc;
-        const bool notFound =
-            rc == CMPI_RC_ERR_NOT_FOUND && asked.request.operation == Operation::GetInstance;
+        const bool notFound = rc == CMPI_RC_ERR_NOT_FOUND &&
+                              asked.request.operation == Operation::GetInstance &&
+                              contains(associations, asked.request.path.className);
         EXPECT_TRUE(rc == CMPI_RC_ERR_FAILED || rc == reference.outcome.rc || notFound) << rc;
     }
 
