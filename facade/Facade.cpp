@@ -14,7 +14,7 @@
 
 namespace VA::OSStatusFacade {
 
-// Not guarded: factories run before requests.
+// Of several factory calls the last one wins.
 static Provider provider;
 
 // Serves a request; whatever goes wrong becomes a status. No exception but the end of a thread that
@@ -51,7 +51,8 @@ static CMPIStatus passedOn(const char* operation, const CMPIObjectPath* path, Pa
 
 static CMPIStatus OSStatusFacade_Cleanup(CMPIInstanceMI*, const CMPIContext* context,
                                          CMPIBoolean terminating) {
-    return provider.instances->ft->cleanup(provider.instances, context, terminating);
+    CMPIInstanceMI* const mi = provider.instances;
+    return mi->ft->cleanup(mi, context, terminating);
 }
 
 static CMPIStatus OSStatusFacade_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext* context,
@@ -109,7 +110,8 @@ static CMPIStatus OSStatusFacade_ExecQuery(CMPIInstanceMI*, const CMPIContext* c
 
 static CMPIStatus OSStatusFacade_AssociationCleanup(CMPIAssociationMI*, const CMPIContext* context,
                                                     CMPIBoolean terminating) {
-    return provider.associations->ft->cleanup(provider.associations, context, terminating);
+    CMPIAssociationMI* const mi = provider.associations;
+    return mi->ft->cleanup(mi, context, terminating);
 }
 
 static CMPIStatus OSStatusFacade_Associators(CMPIAssociationMI*, const CMPIContext* context,

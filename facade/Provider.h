@@ -4,6 +4,8 @@
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
 
+#include <atomic>
+
 /// The factories of the provider behind the facade, as an object manager would call them: each
 /// returns its one record, with the broker that it was given last in use.
 extern "C" {
@@ -18,11 +20,12 @@ CMPIAssociationMI* OperatingSystemProvider_Create_AssociationMI(const CMPIBroker
 
 namespace VA::OSStatusFacade {
 
-/// What the factories leave for the requests.
+/// What the factories leave for the requests. An object manager may call a factory again, for
+/// another class, while threads serve requests.
 struct Provider {
-    const CMPIBroker* broker = nullptr;
-    CMPIInstanceMI* instances = nullptr;
-    CMPIAssociationMI* associations = nullptr;
+    std::atomic<const CMPIBroker*> broker = nullptr;
+    std::atomic<CMPIInstanceMI*> instances = nullptr;
+    std::atomic<CMPIAssociationMI*> associations = nullptr;
 };
 
 }  // namespace VA::OSStatusFacade
