@@ -36,7 +36,7 @@ bool admits(const char* filter, const char* role) {
 std::vector<Hop> hopsFrom(const Request& request, const Filter& filter) {
     std::vector<Hop> hops;
     const Class* const source = request.knownClass();
-    if (source == nullptr || !keyProblem(*source, request.path()).empty()) return hops;
+    if (source == nullptr || !keyProblem(*source, keysOf(request.path())).empty()) return hops;
     for (const Association& association : associations())
         for (const int near : {0, 1}) {
             const Hop hop = {association.itself, association.ends[near],

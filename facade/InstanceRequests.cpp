@@ -14,12 +14,12 @@ namespace {
 
 using Identities = std::vector<Identity>;
 
-// The path of a request for an instance as the provider is asked for it: its text keys in their
-// order, which has a meaning to the provider, and the references left out, which keeps the provider
-// from judging them. What comes back is compared anyway.
-CMPIObjectPath* pathToAskFor(const Request& request, const Class& itsClass) {
+// The path of a request for an instance as the provider is asked for it, from keys without a
+// problem: its text keys in their order, which has a meaning to the provider, and the references
+// left out, which keeps the provider from judging them. What comes back is compared anyway.
+CMPIObjectPath* pathToAskFor(const Request& request, const Class& itsClass,
+                             const std::vector<KeyBinding>& bindings) {
     CMPIObjectPath* const path = request.newPath(itsClass.name);
-    const std::vector<KeyBinding> bindings = keysOf(request.path());
     for (const Key& key : itsClass.keys)
         for (const KeyBinding& binding : bindings) {
             if (key.isReference || !equalNames(binding.name, key.name)) continue;
@@ -47,7 +47,7 @@ Refusal notFound(const Class& itsClass, const Identity& wanted, const Identities
         const auto wantedKey =
             std::find_if(wanted.keys.begin(), wanted.keys.end(),
                          [&key](const auto& each) { return equalNames(each.first, key.name); });
-        // An object manager may tell other keys the second time that it is asked.
+        // The identity is of a reading of its own.
         if (wantedKey == wanted.keys.end() ||
             std::none_of(candidates.begin(), candidates.end(),
                          [&](const Identity& candidate) { return hasKey(candidate, *wantedKey); }))
@@ -75,11 +75,13 @@ void getInstance(const Request& request, const char** properties) {
     const Class* const known = request.knownClass();
     if (known == nullptr || !known->isOfProvider)
         return requireServed(request.getInstance(request.path()), request.className());
-    const std::string problem = keyProblem(*known, request.path());
+    // Read once: an object manager may tell other keys the second time that it is asked.
+    const std::vector<KeyBinding> bindings = keysOf(request.path());
+    const std::string problem = keyProblem(*known, bindings);
     if (!problem.empty()) throw Refusal(CMPI_RC_ERR_INVALID_PARAMETER, problem);
 
     const Identity wanted = request.identityOf(request.path());
-    const Answer answer = request.getInstance(pathToAskFor(request, *known));
+    const Answer answer = request.getInstance(pathToAskFor(request, *known, bindings));
     requireServed(answer, request.className());
     Identities candidates;
     for (const CMPIInstance* instance : answer.instances()) {

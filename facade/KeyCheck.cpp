@@ -1,10 +1,8 @@
 #include "KeyCheck.h"
 
 #include <algorithm>
-#include <vector>
 
 #include "Names.h"
-#include "ObjectPath.h"
 
 namespace VA::OSStatusFacade {
 
@@ -12,10 +10,11 @@ namespace {
 
 // What associations refer to has no references itself; that also limits the depth.
 std::string referenceProblem(const CMPIObjectPath* reference) {
-    for (const KeyBinding& key : keysOf(reference))
+    const std::vector<KeyBinding> bindings = keysOf(reference);
+    for (const KeyBinding& key : bindings)
         if (key.reference() != nullptr) return "key " + printable(key.name) + " is a reference";
     const Class* const known = findClass(classNameOf(reference));
-    return known == nullptr ? "" : keyProblem(*known, reference);
+    return known == nullptr ? "" : keyProblem(*known, bindings);
 }
 
 std::string valueProblem(const Key& key, const KeyBinding& binding) {
@@ -28,9 +27,8 @@ std::string valueProblem(const Key& key, const KeyBinding& binding) {
 
 }  // namespace
 
-std::string keyProblem(const Class& itsClass, const CMPIObjectPath* path) {
+std::string keyProblem(const Class& itsClass, const std::vector<KeyBinding>& bindings) {
     const std::string of = std::string(" of ") + itsClass.name;
-    const std::vector<KeyBinding> bindings = keysOf(path);
     for (const KeyBinding& binding : bindings)
         if (itsClass.key(binding.name) == nullptr)
             return std::string(itsClass.name) + " has no key " + printable(binding.name);

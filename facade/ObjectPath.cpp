@@ -3,6 +3,8 @@
 #include <cmpi/cmpift.h>
 
 #include <algorithm>
+#include <array>
+#include <cstdio>
 
 #include "Names.h"
 #include "Refusal.h"
@@ -25,26 +27,53 @@ bool isAbsent(const CMPIData& data) {
             return data.value.chars == nullptr;
         case CMPI_ref:
             return data.value.ref == nullptr;
+        case CMPI_dateTime:
+            return data.value.dateTime == nullptr;
         default:
             return data.type == CMPI_null;
     }
 }
 
+// With its length in front a text cannot pass for another one and what follows it.
+std::string withLength(const std::string& text) {
+    return std::to_string(text.size()) + ":" + text;
+}
+
 // One text that stands for an identity and for no other.
 std::string textOf(const Identity& identity) {
-    std::string text = identity.classPath;
-    for (const auto& [name, value] : identity.keys)
-        text.append("\n").append(name).append("=").append(std::to_string(value.size()) + ":" +
-                                                          value);
+    std::string text = withLength(identity.classPath);
+    for (const auto& [name, value] : identity.keys) text += withLength(name) + withLength(value);
     return text;
+}
+
+std::string hexadecimal(double value) {
+    std::array<char, 40> text{};
+    std::snprintf(text.data(), text.size(), "%a", value);
+    return text.data();
+}
+
+// The value of a key that is neither text nor reference; empty for types that no key can have.
+std::string otherValue(const CMPIData& data) {
+    switch (data.type) {
+        case CMPI_real32:
+            return hexadecimal(static_cast<double>(data.value.real32));
+        case CMPI_real64:
+            return hexadecimal(data.value.real64);
+        case CMPI_dateTime:
+            return charactersOf(
+                data.value.dateTime->ft->getStringFormat(data.value.dateTime, nullptr));
+        default:
+            return {};
+    }
 }
 
 std::string comparable(const KeyBinding& key, std::string_view nameSpace) {
     if (const CMPIObjectPath* reference = key.reference())
         return "reference " + textOf(identityOf(reference, nameSpace));
-    const std::string text = key.text().value_or("");
+    const std::optional<std::string> text = key.text();
+    if (!text) return "type " + std::to_string(key.data.type) + " " + otherValue(key.data);
     const bool withoutCase = equalNames(key.name, "CSName") || equalNames(key.name, "Name");
-    return "text " + (withoutCase ? lowered(text) : text);
+    return "text " + (withoutCase ? lowered(*text) : *text);
 }
 
 }  // namespace

@@ -151,6 +151,63 @@ TEST_F(ObjectManagers, FacadesObjectsAreAnsweredBesideAnotherProvider) {
     EXPECT_THAT(everyClass(filtered), ElementsAre(capabilities));
 }
 
+/// Serves computer systems of any paths.
+class Systems final : public UpcallService {
+  public:
+    UpcallAnswer perform(Broker&, const OperationRequest&) override {
+        UpcallAnswer answer;
+        for (const ObjectPathValue& path : paths) answer.instances.push_back({path, {}});
+        answer.paths = paths;
+        return answer;
+    }
+
+    std::vector<ObjectPathValue> paths;
+};
+
+TEST_F(ObjectManagers, ComputerSystemsAreTheSameExactlyIfTheirKeysAre) {
+    struct Row {
+        const char* what;
+        std::vector<KeyBinding> keys, others;
+        std::size_t systems;
+    };
+    const auto dateTime = [](const char* text) { return Value::fromText(text, CMPI_dateTime); };
+    const Value day = dateTime("20260101000000.000000+000");
+    const Row rows[] = {
+        {"equal reals", {{"Name", Value::fromReal(1)}}, {{"Name", Value::fromReal(1)}}, 1},
+        {"reals", {{"Name", Value::fromReal(1)}}, {{"Name", Value::fromReal(2)}}, 2},
+        {"short reals",
+         {{"Name", Value::fromReal(1, CMPI_real32)}},
+         {{"Name", Value::fromReal(2, CMPI_real32)}},
+         2},
+        {"a real and nothing", {{"Name", Value::fromReal(0)}}, {{"Name", ""}}, 2},
+        {"equal dates", {{"Name", day}}, {{"Name", day}}, 1},
+        {"dates", {{"Name", day}}, {{"Name", dateTime("20260102000000.000000+000")}}, 2},
+        {"a date and a real", {{"Name", day}}, {{"Name", Value::fromReal(1)}}, 2},
+        {"a date and its text", {{"Name", day}}, {{"Name", "20260101000000.000000+000"}}, 2},
+        {"two keys and a name that looks like them",
+         {{"a", "x"}, {"b", "y"}},
+         {{"a=6:text x\nb", "y"}},
+         2},
+    };
+    registerProviders(inFront);
+    setNodes({"Linux", "Linux"});  // each with one of the two computer systems
+    Systems systems;
+    plainBroker.route(ComputerSystemService::className, systems);
+    for (const Row& row : rows) {
+        systems.paths = {path(ComputerSystemService::className, row.keys),
+                         path(ComputerSystemService::className, row.others),
+                         computerSystemPath("last")};  // in no pair, as the last of several
+        for (const Operation operation : {Operation::ReferenceNames, Operation::AssociatorNames})
+            EXPECT_EQ(
+                everyProvider(associationRequest(operation, operatingSystemPath("host1", "Linux"),
+                                                 "KORVA_InstalledOS"))
+                    .size(),
+                row.systems)
+                << row.what;
+    }
+    plainBroker.route(ComputerSystemService::className, computers);
+}
+
 // Why there is a facade.
 TEST_F(ObjectManagers, ProviderAloneBreaksTheRequestsOfAnother) {
     registerProviders(bareProvider);
