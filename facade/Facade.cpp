@@ -18,21 +18,29 @@ namespace VA::OSStatusFacade {
 static Provider provider;
 
 // Serves a request; whatever goes wrong becomes a status. No exception but the end of a thread that
-// the object manager cancels passes here.
+// the object manager cancels passes here. It may come while the refusal is recorded, too, and that
+// is done outside of the handlers: within one, nobody may catch it.
 template <class Serve>
 static CMPIStatus guarded(Serve serve, Handler handler = Handler::here()) {
+    CMPIrc rc = CMPI_RC_ERR_FAILED;
+    const char* text = "unknown exception";
+    std::exception_ptr ownerOfText;
     try {
         serve();
         return {CMPI_RC_OK, nullptr};
     } catch (const Refusal& refusal) {
-        return refuse(provider.broker, refusal.rc(), refusal.what(), handler);
+        rc = refusal.rc();
+        text = refusal.what();
+        ownerOfText = std::current_exception();
     } catch (const abi::__forced_unwind&) {
         throw;
     } catch (const std::exception& unexpected) {
-        return refuse(provider.broker, CMPI_RC_ERR_FAILED, unexpected.what(), handler);
+        text = unexpected.what();
+        ownerOfText = std::current_exception();
     } catch (...) {
-        return refuse(provider.broker, CMPI_RC_ERR_FAILED, "unknown exception", handler);
+        // Of a type that tells nothing.
     }
+    return refuse(provider.broker, rc, text, handler);
 }
 
 // Passes an operation on that is none of a reader's; the provider refuses it.

@@ -1,6 +1,7 @@
 #include "Refusal.h"
 
 #include <cmpi/cmpift.h>
+#include <cxxabi.h>
 
 #include "Names.h"
 #include "Trace.h"
@@ -23,12 +24,14 @@ void record(const std::string& text, Handler handler) {
 
 }  // namespace
 
-CMPIStatus refuse(const CMPIBroker* broker, CMPIrc rc, const char* text, Handler handler) noexcept {
+CMPIStatus refuse(const CMPIBroker* broker, CMPIrc rc, const char* text, Handler handler) {
     CMPIStatus status = {rc, nullptr};
     try {
         const std::string safe = printable(text, 400);
         status.msg = broker->eft->newString(broker, safe.c_str(), nullptr);
         record(safe, handler);
+    } catch (const abi::__forced_unwind&) {
+        throw;
     } catch (...) {
         // The status alone tells it then.
     }

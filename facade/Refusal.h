@@ -32,8 +32,8 @@ struct Handler {
 };
 
 /// Writes the one record of a refused request, and makes its status. Without memory for record or
-/// message, those are left out.
-CMPIStatus refuse(const CMPIBroker* broker, CMPIrc rc, const char* text, Handler handler) noexcept;
+/// message, those are left out. Nothing but the end of a cancelled thread passes here.
+CMPIStatus refuse(const CMPIBroker* broker, CMPIrc rc, const char* text, Handler handler);
 
 }  // namespace VA::OSStatusFacade
 

@@ -1,4 +1,7 @@
+#include <pthread.h>
+
 #include <fstream>
+#include <functional>
 #include <sstream>
 
 #include "facade/FacadeFixture.h"
@@ -45,6 +48,28 @@ TEST_F(FacadeRecords, OfARefusedOperation) {
 TEST_F(FacadeRecords, OfASourceOfAnotherClassAreNone) {
     ask(associationRequest(Operation::AssociatorNames, path("TEST_Thing", {{"Name", "x"}})));
     EXPECT_EQ(recording::takeRendered(), "");
+}
+
+// A thread that ends while a refusal is recorded, at a cancellation point of the log.
+TEST_F(FacadeRecords, OfARefusalLetACancelledThreadEnd) {
+    recording::setHook([](const recording::Record& record) {
+        if (record.category != "Zumbrel.OSStatusFacade") return;
+        ::pthread_cancel(::pthread_self());
+        ::pthread_testcancel();
+    });
+    std::function<void()> askForNothing = [this] {
+        ask(Operation::EnumerateInstances, path("Nothing"));
+    };
+    const auto run = [](void* function) -> void* {
+        (*static_cast<std::function<void()>*>(function))();
+        return nullptr;
+    };
+    pthread_t thread{};
+    ASSERT_EQ(::pthread_create(&thread, nullptr, run, &askForNothing), 0);
+    void* result = nullptr;
+    ::pthread_join(thread, &result);
+    recording::setHook({});
+    EXPECT_EQ(result, PTHREAD_CANCELED);
 }
 
 }  // namespace
