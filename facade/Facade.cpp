@@ -23,6 +23,7 @@ static Provider provider;
 template <class Serve>
 static CMPIStatus guarded(Serve serve, Handler handler = Handler::here()) {
     CMPIrc rc = CMPI_RC_ERR_FAILED;
+    Recorded recorded = Recorded::yes;
     const char* text = "unknown exception";
     std::exception_ptr ownerOfText;
     try {
@@ -30,6 +31,7 @@ static CMPIStatus guarded(Serve serve, Handler handler = Handler::here()) {
         return {CMPI_RC_OK, nullptr};
     } catch (const Refusal& refusal) {
         rc = refusal.rc();
+        recorded = refusal.recorded();
         text = refusal.what();
         ownerOfText = std::current_exception();
     } catch (const abi::__forced_unwind&) {
@@ -40,19 +42,21 @@ static CMPIStatus guarded(Serve serve, Handler handler = Handler::here()) {
     } catch (...) {
         // Of a type that tells nothing.
     }
-    return refuse(provider.broker, rc, text, handler);
+    return refuse(provider.broker, rc, text, handler, recorded);
 }
 
 // Passes an operation on that is none of a reader's; the provider refuses it.
 template <class Pass>
 static CMPIStatus passedOn(const char* operation, const CMPIObjectPath* path, Pass pass,
-                           Handler handler = Handler::here()) {
+                           Recorded recorded = Recorded::yes, Handler handler = Handler::here()) {
     return guarded(
         [&] {
             const CMPIStatus status = pass(provider.instances);
             if (status.rc != CMPI_RC_OK)
-                throw Refusal(status.rc, std::string(operation) + " is not supported for " +
-                                             printable(classNameOf(path)));
+                throw Refusal(status.rc,
+                              std::string(operation) + " is not supported for " +
+                                  printable(classNameOf(path)),
+                              recorded);
         },
         handler);
 }
@@ -108,12 +112,17 @@ static CMPIStatus OSStatusFacade_DeleteInstance(CMPIInstanceMI*, const CMPIConte
     });
 }
 
+// An object manager may ask for each query before it evaluates it itself: no record, or the log
+// would have one for each query that succeeds.
 static CMPIStatus OSStatusFacade_ExecQuery(CMPIInstanceMI*, const CMPIContext* context,
                                            const CMPIResult* result, const CMPIObjectPath* path,
                                            const char* query, const char* language) {
-    return passedOn("ExecQuery", path, [&](CMPIInstanceMI* mi) {
-        return mi->ft->execQuery(mi, context, result, path, query, language);
-    });
+    return passedOn(
+        "ExecQuery", path,
+        [&](CMPIInstanceMI* mi) {
+            return mi->ft->execQuery(mi, context, result, path, query, language);
+        },
+        Recorded::no);
 }
 
 static CMPIStatus OSStatusFacade_AssociationCleanup(CMPIAssociationMI*, const CMPIContext* context,

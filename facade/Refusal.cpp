@@ -24,12 +24,13 @@ void record(const std::string& text, Handler handler) {
 
 }  // namespace
 
-CMPIStatus refuse(const CMPIBroker* broker, CMPIrc rc, const char* text, Handler handler) {
+CMPIStatus refuse(const CMPIBroker* broker, CMPIrc rc, const char* text, Handler handler,
+                  Recorded recorded) {
     CMPIStatus status = {rc, nullptr};
     try {
         const std::string safe = printable(text, 400);
         status.msg = broker->eft->newString(broker, safe.c_str(), nullptr);
-        record(safe, handler);
+        if (recorded == Recorded::yes) record(safe, handler);
     } catch (const abi::__forced_unwind&) {
         throw;
     } catch (...) {

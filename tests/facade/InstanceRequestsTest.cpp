@@ -45,13 +45,12 @@ TEST_F(InstanceRequests, OfOtherClassesAreRefusedByTheirName) {
     }
 }
 
-TEST_F(InstanceRequests, ThatWriteOrQueryAreRefusedByTheirOperation) {
+TEST_F(InstanceRequests, ThatWriteAreRefusedByTheirOperation) {
     OperationRequest request;
     request.path = operatingSystemPath("host1", "Linux");
     request.instance.path = request.path;
-    request.query = "SELECT * FROM KORVA_OperatingSystem";
-    for (const Operation operation : {Operation::CreateInstance, Operation::ModifyInstance,
-                                      Operation::DeleteInstance, Operation::ExecQuery}) {
+    for (const Operation operation :
+         {Operation::CreateInstance, Operation::ModifyInstance, Operation::DeleteInstance}) {
         request.operation = operation;
         EXPECT_EQ(refusal(request), std::string("7 ") + operationName(operation) +
                                         " is not supported for KORVA_OperatingSystem");

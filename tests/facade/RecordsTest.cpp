@@ -50,6 +50,18 @@ TEST_F(FacadeRecords, OfASourceOfAnotherClassAreNone) {
     EXPECT_EQ(recording::takeRendered(), "");
 }
 
+// Object managers evaluate the query themselves then, and the request succeeds.
+TEST_F(FacadeRecords, OfARefusedQueryAreTheProvidersAlone) {
+    OperationRequest request;
+    request.operation = Operation::ExecQuery;
+    request.path = path("KORVA_OperatingSystem");
+    request.query = "SELECT * FROM KORVA_OperatingSystem";
+    const Outcome outcome = ask(request);
+    EXPECT_EQ(outcome.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(outcome.message, "ExecQuery is not supported for KORVA_OperatingSystem");
+    expectRecords(request, "ExecQuery");
+}
+
 // A thread that ends while a refusal is recorded, at a cancellation point of the log.
 TEST_F(FacadeRecords, OfARefusalLetACancelledThreadEnd) {
     recording::setHook([](const recording::Record& record) {
