@@ -9,36 +9,55 @@ namespace {
 using namespace facade;
 using testing::ElementsAre;
 using testing::IsEmpty;
+using testing::StartsWith;
 
 const CMPIBroker* linkBroker;
 
-// The other provider: TEST_Link ties each TEST_Thing to the computer system. It looks at nothing
-// but association class and source class, as simple providers do.
-CMPIStatus linkAnswer(const CMPIResult* result, const CMPIObjectPath* source,
-                      const char* associationClass, const char* answer, const char* name) {
-    const bool asked = associationClass == nullptr || equalNames(associationClass, "TEST_Link") ||
-                       equalNames(associationClass, "CIM_Dependency");
-    const CMPIString* const sourceClass = source->ft->getClassName(source, nullptr);
-    if (asked && equalNames(sourceClass->ft->getCharPtr(sourceClass, nullptr), "TEST_Thing")) {
-        CMPIObjectPath* const path =
-            linkBroker->eft->newObjectPath(linkBroker, "root/cimv2", answer, nullptr);
-        path->ft->addKey(path, "Name", reinterpret_cast<const CMPIValue*>(name), CMPI_chars);
-        result->ft->returnObjectPath(result, path);
-    }
+// The other provider: TEST_Link ties TEST_Thing to the computer system. It looks at nothing but
+// association class and source class, as simple providers do.
+bool isTied(const char* associationClass) {
+    return associationClass == nullptr || equalNames(associationClass, "TEST_Link") ||
+           equalNames(associationClass, "CIM_Dependency");
+}
+
+CMPIObjectPath* linkPath(const char* className, const char* name) {
+    CMPIObjectPath* const path =
+        linkBroker->eft->newObjectPath(linkBroker, "root/cimv2", className, nullptr);
+    path->ft->addKey(path, "Name", reinterpret_cast<const CMPIValue*>(name), CMPI_chars);
+    return path;
+}
+
+enum class Give { paths, instances };
+
+CMPIStatus give(const CMPIResult* result, const CMPIObjectPath* path, Give what) {
+    if (path != nullptr && what == Give::paths) result->ft->returnObjectPath(result, path);
+    if (path != nullptr && what == Give::instances)
+        result->ft->returnInstance(result, linkBroker->eft->newInstance(linkBroker, path, nullptr));
     result->ft->returnDone(result);
     return {CMPI_RC_OK, nullptr};
 }
 
-CMPIStatus linkAssociatorNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
-                               const CMPIObjectPath* source, const char* associationClass,
-                               const char*, const char*, const char*) {
-    return linkAnswer(result, source, associationClass, "KORVA_ComputerSystem", "host1");
+CMPIObjectPath* farEnd(const CMPIObjectPath* source, const char* associationClass) {
+    const CMPIString* const sourceClass = source->ft->getClassName(source, nullptr);
+    const char* const name = sourceClass->ft->getCharPtr(sourceClass, nullptr);
+    if (isTied(associationClass) && equalNames(name, "TEST_Thing"))
+        return linkPath("KORVA_ComputerSystem", "host1");
+    if (isTied(associationClass) && equalNames(name, "KORVA_ComputerSystem"))
+        return linkPath("TEST_Thing", "thing");
+    return nullptr;
 }
 
-CMPIStatus linkReferenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
-                              const CMPIObjectPath* source, const char* associationClass,
-                              const char*) {
-    return linkAnswer(result, source, associationClass, "TEST_Link", "link");
+template <Give what>
+CMPIStatus linkEnds(const CMPIResult* result, const CMPIObjectPath* source,
+                    const char* associationClass) {
+    return give(result, farEnd(source, associationClass), what);
+}
+
+template <Give what>
+CMPIStatus links(const CMPIResult* result, const CMPIObjectPath* source,
+                 const char* associationClass) {
+    const bool any = farEnd(source, associationClass) != nullptr;
+    return give(result, any ? linkPath("TEST_Link", "link") : nullptr, what);
 }
 
 class ObjectManagers : public FacadeFixture {
@@ -63,6 +82,11 @@ class ObjectManagers : public FacadeFixture {
                      {{nullptr, &link}, {{"TEST_Link", {"TEST_Thing", "KORVA_ComputerSystem"}}}}};
     }
 
+    static void append(Texts& all, const Outcome& outcome) {
+        for (const std::string& text : texts(outcome.paths)) all.push_back(text);
+        for (const std::string& text : texts(outcome.instances)) all.push_back(text);
+    }
+
     // As sfcb: every association provider gets the client's filters, and the first failure is the
     // answer.
     Texts everyProvider(const OperationRequest& request) {
@@ -70,7 +94,7 @@ class ObjectManagers : public FacadeFixture {
         for (const Registered& provider : providers) {
             const Outcome outcome = cmpihost::invoke(provider.interfaces, plainBroker, request);
             if (outcome.rc != CMPI_RC_OK) return {"failed: " + std::to_string(outcome.rc)};
-            for (const std::string& text : texts(outcome.paths)) result.push_back(text);
+            append(result, outcome);
         }
         return result;
     }
@@ -89,14 +113,30 @@ class ObjectManagers : public FacadeFixture {
                 const Outcome outcome = cmpihost::invoke(provider.interfaces, plainBroker, request);
                 if (outcome.rc == CMPI_RC_ERR_NOT_SUPPORTED) continue;
                 if (outcome.rc != CMPI_RC_OK) return {"failed: " + std::to_string(outcome.rc)};
-                for (const std::string& text : texts(outcome.paths)) result.push_back(text);
+                append(result, outcome);
             }
         return result;
     }
 
     static constexpr CMPIAssociationMIFT linkTable = {
-        CMPIVersion200,      CMPIVersion200, "associationTestLink", nullptr, nullptr,
-        linkAssociatorNames, nullptr,        linkReferenceNames};
+        CMPIVersion200,
+        CMPIVersion200,
+        "associationTestLink",
+        nullptr,
+        [](CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
+           const CMPIObjectPath* source, const char* association, const char*, const char*,
+           const char*,
+           const char**) { return linkEnds<Give::instances>(result, source, association); },
+        [](CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
+           const CMPIObjectPath* source, const char* association, const char*, const char*,
+           const char*) { return linkEnds<Give::paths>(result, source, association); },
+        [](CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
+           const CMPIObjectPath* source, const char* association, const char*,
+           const char**) { return links<Give::instances>(result, source, association); },
+        [](CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
+           const CMPIObjectPath* source, const char* association,
+           const char*) { return links<Give::paths>(result, source, association); },
+    };
     CMPIAssociationMI link = {nullptr, const_cast<CMPIAssociationMIFT*>(&linkTable)};
     Broker plainBroker;  // knows no schema, so that there may be other classes
     ProviderLibrary bareProvider{providerFile, plainBroker};
@@ -110,20 +150,43 @@ const std::string linkOfThing = R"(root/cimv2:TEST_Link.Name="link")";
 
 TEST_F(ObjectManagers, AnotherProvidersObjectsAreAnsweredAsIfTheFacadeWereNotThere) {
     registerProviders(inFront);
-    for (const char* associationClass : {"", "TEST_Link", "CIM_Dependency"}) {
-        EXPECT_THAT(
-            everyProvider(associationRequest(Operation::AssociatorNames, thing, associationClass)),
-            ElementsAre(farOfThing));
-        EXPECT_THAT(
-            everyProvider(associationRequest(Operation::ReferenceNames, thing, associationClass)),
-            ElementsAre(linkOfThing));
+    for (const Operation operation : associationOperations) {
+        const std::string expected = ofReferences(operation) ? linkOfThing : farOfThing;
+        for (const char* associationClass : {"", "TEST_Link", "CIM_Dependency"})
+            EXPECT_THAT(everyProvider(associationRequest(operation, thing, associationClass)),
+                        ElementsAre(expected));
+        EXPECT_THAT(everyClass(associationRequest(operation, thing)), ElementsAre(expected));
+        EXPECT_THAT(everyProvider(associationRequest(operation, thing, "CIM_Other")), IsEmpty());
     }
-    EXPECT_THAT(everyClass(associationRequest(Operation::AssociatorNames, thing)),
-                ElementsAre(farOfThing));
-    EXPECT_THAT(everyClass(associationRequest(Operation::ReferenceNames, thing)),
-                ElementsAre(linkOfThing));
-    EXPECT_THAT(everyProvider(associationRequest(Operation::AssociatorNames, thing, "CIM_Other")),
-                IsEmpty());
+}
+
+// Both providers know it.
+TEST_F(ObjectManagers, ComputerSystemIsAnsweredByBothProviders) {
+    registerProviders(inFront);
+    const ObjectPathValue source = computerSystemPath("host1");
+    for (const Operation operation : {Operation::AssociatorNames, Operation::Associators}) {
+        const auto request = [&](const char* associationClass) {
+            return associationRequest(operation, source, associationClass);
+        };
+        const std::string far = R"(root/cimv2:TEST_Thing.Name="thing")";
+        EXPECT_THAT(everyProvider(request("")), ElementsAre(operatingSystem, far));
+        EXPECT_THAT(everyProvider(request("CIM_Dependency")), ElementsAre(operatingSystem, far));
+        EXPECT_THAT(everyProvider(request("KORVA_InstalledOS")), ElementsAre(operatingSystem));
+        EXPECT_THAT(everyProvider(request("TEST_Link")), ElementsAre(far));
+        EXPECT_THAT(everyClass(request("")), ElementsAre(operatingSystem, operatingSystem, far));
+    }
+    for (const Operation operation : {Operation::ReferenceNames, Operation::References}) {
+        const auto request = [&](const char* associationClass) {
+            return associationRequest(operation, source, associationClass);
+        };
+        const auto installed = StartsWith("root/cimv2:KORVA_InstalledOS.");
+        const auto running = StartsWith("root/cimv2:KORVA_RunningOS.");
+        EXPECT_THAT(everyProvider(request("")), ElementsAre(installed, running, linkOfThing));
+        EXPECT_THAT(everyProvider(request("CIM_Dependency")), ElementsAre(running, linkOfThing));
+        EXPECT_THAT(everyProvider(request("KORVA_InstalledOS")), ElementsAre(installed));
+        EXPECT_THAT(everyProvider(request("TEST_Link")), ElementsAre(linkOfThing));
+        EXPECT_THAT(everyClass(request("")), ElementsAre(installed, running, linkOfThing));
+    }
 }
 
 TEST_F(ObjectManagers, WithoutComputerSystemsAnotherProvidersObjectsAreAnsweredToo) {
@@ -211,10 +274,9 @@ TEST_F(ObjectManagers, ComputerSystemsAreTheSameExactlyIfTheirKeysAre) {
 // Why there is a facade.
 TEST_F(ObjectManagers, ProviderAloneBreaksTheRequestsOfAnother) {
     registerProviders(bareProvider);
-    EXPECT_THAT(everyProvider(associationRequest(Operation::AssociatorNames, thing)),
-                ElementsAre("failed: 5"));
-    EXPECT_THAT(everyProvider(associationRequest(Operation::ReferenceNames, thing)),
-                ElementsAre("failed: 7"));
+    for (const Operation operation : associationOperations)
+        EXPECT_THAT(everyProvider(associationRequest(operation, thing)),
+                    ElementsAre(ofReferences(operation) ? "failed: 7" : "failed: 5"));
 }
 
 }  // namespace
