@@ -145,14 +145,19 @@ class InstanceIndex {
     std::map<Identity, const CMPIInstance*> instances_;
 };
 
-}  // namespace
-
-void associatorNames(const Request& request, const Filter& filter) {
+/// Delivers one path of each pair, what it stands for but once.
+void deliverPaths(const Request& request, const Filter& filter, const CMPIObjectPath* Pair::*path) {
     Paths paths;
     Seen seen;
     for (const Pair& pair : pairsOf(request, filter, Ask::names))
-        if (seen.isNew(request.identityOf(pair.far))) paths.push_back(pair.far);
+        if (seen.isNew(request.identityOf(pair.*path))) paths.push_back(pair.*path);
     request.deliver(paths);
+}
+
+}  // namespace
+
+void associatorNames(const Request& request, const Filter& filter) {
+    deliverPaths(request, filter, &Pair::far);
 }
 
 void associators(const Request& request, const Filter& filter, const char** properties) {
@@ -169,11 +174,7 @@ void associators(const Request& request, const Filter& filter, const char** prop
 }
 
 void referenceNames(const Request& request, const Filter& filter) {
-    Paths paths;
-    Seen seen;
-    for (const Pair& pair : pairsOf(request, filter, Ask::names))
-        if (seen.isNew(request.identityOf(pair.path))) paths.push_back(pair.path);
-    request.deliver(paths);
+    deliverPaths(request, filter, &Pair::path);
 }
 
 void references(const Request& request, const Filter& filter, const char** properties) {
