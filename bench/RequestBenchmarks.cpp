@@ -1,5 +1,5 @@
-// Every request of the list, answered by the provider and by the floor; and what a growing number
-// of nodes costs.
+// Every request of the list, answered by the provider and by the floor; what a growing number of
+// nodes costs; and what the facade costs beyond the provider.
 
 #include <benchmark/benchmark.h>
 
@@ -17,6 +17,11 @@ constexpr const char* growing[] = {
     "EnumerateInstances KORVA_OperatingSystemCapabilities",
     "Associators KORVA_ComputerSystem KORVA_InstalledOS",
     "AssociatorNames KORVA_ComputerSystem KORVA_InstalledOS",
+};
+
+constexpr const char* throughFacade[] = {
+    "EnumerateInstances KORVA_OperatingSystem",
+    "EnumerateInstanceNames KORVA_OperatingSystem",
 };
 
 // One more request, for what is counted and not timed.
@@ -41,8 +46,9 @@ void measure(benchmark::State& state, Setting& setting, Answerer answerer,
 }
 
 void add(Setting& setting, const std::string& group, const std::string& name,
-         const cmpihost::OperationRequest& request, unsigned nodes) {
-    for (const Answerer answerer : {Answerer::Provider, Answerer::Floor}) {
+         const cmpihost::OperationRequest& request, unsigned nodes,
+         Answerer against = Answerer::Floor) {
+    for (const Answerer answerer : {Answerer::Provider, against}) {
         benchmark::RegisterBenchmark(
             (group + "/" + name + "/" + std::to_string(nodes) + "/" + nameOf(answerer)).c_str(),
             [&setting, answerer, &request, nodes](benchmark::State& state) {
@@ -58,6 +64,8 @@ void addRequestBenchmarks(Setting& setting) {
     for (const char* name : growing)
         for (const unsigned nodes : nodeCounts)
             add(setting, "nodes", name, requestNamed(name), nodes);
+    for (const char* name : throughFacade)
+        add(setting, "facade", name, requestNamed(name), 1, Answerer::Facade);
 }
 
 }  // namespace bench

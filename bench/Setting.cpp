@@ -27,7 +27,15 @@ LoadOptions optionsOf(const char* providerName) {
 }  // namespace
 
 const char* nameOf(Answerer answerer) noexcept {
-    return answerer == Answerer::Provider ? "provider" : "floor";
+    switch (answerer) {
+        case Answerer::Provider:
+            return "provider";
+        case Answerer::Facade:
+            return "facade";
+        case Answerer::Floor:
+            break;
+    }
+    return "floor";
 }
 
 Setting::Setting()
@@ -35,6 +43,8 @@ Setting::Setting()
       broker_(&schemaCatalogue()),
       computers_("simulated.example"),
       provider_(KORVA_BINARY_DIR "/lib/libkorzbosstatusprofileprovider.so.1", broker_),
+      facade_(KORVA_BINARY_DIR "/lib/libkorvaosstatusfacade.so.1", broker_,
+              optionsOf("OSStatusFacade")),
       floor_(KORVA_BINARY_DIR "/lib/libkorvafloor.so", broker_, optionsOf("FloorProvider")) {
     broker_.route(ComputerSystemService::className, computers_);
     useSimulatedHost();
@@ -44,8 +54,20 @@ Setting::~Setting() {
     VA::setHostSource(nullptr);
 }
 
+const ProviderLibrary& Setting::library(Answerer answerer) const {
+    switch (answerer) {
+        case Answerer::Provider:
+            return provider_;
+        case Answerer::Facade:
+            return facade_;
+        case Answerer::Floor:
+            break;
+    }
+    return floor_;
+}
+
 Outcome Setting::run(Answerer answerer, const OperationRequest& request) {
-    Outcome outcome = invoke(answerer == Answerer::Provider ? provider_ : floor_, broker_, request);
+    Outcome outcome = invoke(library(answerer), broker_, request);
     if (!outcome.violations.empty()) throw std::runtime_error(outcome.violations.front());
     return outcome;
 }

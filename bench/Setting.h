@@ -1,4 +1,5 @@
-// Where requests are measured: one broker, the provider on a simulated host, and the floor.
+// Where requests are measured: one broker, the provider on a simulated host, the facade in front of
+// it, and the floor.
 #pragma once
 
 #include "framework/instrumentation/SimulatedHost.h"
@@ -10,9 +11,9 @@
 namespace bench {
 
 /// Who answers.
-enum class Answerer { Provider, Floor };
+enum class Answerer { Provider, Floor, Facade };
 
-/// "provider" or "floor".
+/// "provider", "floor" or "facade".
 const char* nameOf(Answerer answerer) noexcept;
 
 /// The built libraries under the strict broker with the schema. The provider sees a simulated host
@@ -34,14 +35,18 @@ class Setting {
     void useRealHost();
     void useSimulatedHost();
 
-    /// Throws std::runtime_error, naming the request, unless both answer every request alike.
+    /// Throws std::runtime_error, naming the request, unless provider and floor answer every
+    /// request alike.
     void compareAnswers();
 
   private:
+    const cmpihost::ProviderLibrary& library(Answerer answerer) const;
+
     std::shared_ptr<VA::SimulatedHost> host_;
     cmpihost::Broker broker_;
     cmpihost::ComputerSystemService computers_;
     cmpihost::ProviderLibrary provider_;
+    cmpihost::ProviderLibrary facade_;
     cmpihost::ProviderLibrary floor_;
 };
 

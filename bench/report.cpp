@@ -138,6 +138,21 @@ void printRequests(const Figures& figures, const std::map<std::string, double>& 
     }
 }
 
+/// How much longer than the provider's own the facade's answer may take, in nanoseconds.
+constexpr double mostOfFacade = 5000;
+
+void printFacade(const Figures& figures, Verdict& verdict) {
+    std::cout << "\n## The facade\n\nOne node of a simulated host. Times in microseconds.\n\n"
+                 "| request | facade | provider | beyond | limit |\n|---|--:|--:|--:|--:|\n";
+    for (const std::string& request : requestsOf(figures, "facade/")) {
+        const double facade = figureOf(figures, "facade/", request, 1, "facade").nanoseconds;
+        const double provider = figureOf(figures, "facade/", request, 1, "provider").nanoseconds;
+        std::cout << "| " << request << " | " << microseconds(facade) << " | "
+                  << microseconds(provider) << " | " << microseconds(facade - provider) << " | "
+                  << verdict.cell((facade - provider) / 1000, mostOfFacade / 1000) << " |\n";
+    }
+}
+
 /// What one more node costs, from the requests with `nodes` nodes and with none.
 double costOfNode(const Figures& figures, const std::string& request, const char* who,
                   unsigned nodes) {
@@ -205,6 +220,7 @@ int main(int argc, char** argv) try {
     printHostRequests(figures, figuresBefore, verdict);
     printRequests(figures, instructions, verdict);
     printNodes(figures, verdict);
+    printFacade(figures, verdict);
     printGroup(figures, "The parts of the Linux host", "host/snapshot: ", "opened");
     printGroup(figures, "A record", "logging/", "allocations");
     verdict.print();
