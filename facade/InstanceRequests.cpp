@@ -75,7 +75,8 @@ void getInstance(const Request& request, const char** properties) {
     const Class* const known = request.knownClass();
     if (known == nullptr || !known->isOfProvider)
         return requireServed(request.getInstance(request.path()), request.className());
-    // Read once: an object manager may tell other keys the second time that it is asked.
+    // An object manager may tell other keys the second time that it is asked: the provider gets
+    // those that were checked.
     const std::vector<KeyBinding> bindings = keysOf(request.path());
     const std::string problem = keyProblem(*known, bindings);
     if (!problem.empty()) throw Refusal(CMPI_RC_ERR_INVALID_PARAMETER, problem);

@@ -52,6 +52,13 @@ std::string hexadecimal(double value) {
     return text.data();
 }
 
+std::string textOf(const CMPIDateTime* dateTime) {
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    const CMPIString* const text = dateTime->ft->getStringFormat(dateTime, &status);
+    requireTold(status, "a date");
+    return charactersOf(text);
+}
+
 // The value of a key that is neither text nor reference; empty for types that no key can have.
 std::string otherValue(const CMPIData& data) {
     switch (data.type) {
@@ -60,8 +67,7 @@ std::string otherValue(const CMPIData& data) {
         case CMPI_real64:
             return hexadecimal(data.value.real64);
         case CMPI_dateTime:
-            return charactersOf(
-                data.value.dateTime->ft->getStringFormat(data.value.dateTime, nullptr));
+            return textOf(data.value.dateTime);
         default:
             return {};
     }
