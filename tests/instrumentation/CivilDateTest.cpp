@@ -71,6 +71,9 @@ TEST(CivilDate, ZoneMayLeadAcrossTheEndOfTheCalendar) {
     EXPECT_EQ(zonedDateText(253402300799, -60), "9999-12-31-23:58:59");
     EXPECT_EQ(zonedDateText(std::numeric_limits<std::int64_t>::max(), 3600), std::nullopt);
     EXPECT_EQ(zonedDateText(std::numeric_limits<std::int64_t>::min(), -3600), std::nullopt);
+    // An instant out of range stays out, even where the zone would bring it back.
+    EXPECT_EQ(zonedDateText(253402300800, -60), std::nullopt);
+    EXPECT_EQ(zonedDateText(-62167219201, 60), std::nullopt);
 }
 
 }  // namespace
