@@ -7,6 +7,7 @@
 
 #include <cstdio>
 #include <memory>
+#include <sstream>
 
 namespace {
 
@@ -62,4 +63,13 @@ ProgramRun runProgram(const std::string& file, const std::vector<std::string>& a
     run.out = contentOf(out.get());
     run.err = contentOf(err.get());
     return run;
+}
+
+std::vector<std::string> lines(const std::string& text) {
+    std::vector<std::string> result;
+    std::istringstream stream(text);
+    for (std::string line; std::getline(stream, line);) {
+        result.push_back(line);
+    }
+    return result;
 }

@@ -15,3 +15,6 @@ struct ProgramRun {
 /// process's environment.
 ProgramRun runProgram(const std::string& file, const std::vector<std::string>& arguments,
                       const std::vector<std::string>& environment = {});
+
+/// The lines of what a program wrote, without their ends.
+std::vector<std::string> lines(const std::string& text);

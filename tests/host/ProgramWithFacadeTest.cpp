@@ -4,7 +4,6 @@
 #include <sys/utsname.h>
 
 #include <nlohmann/json.hpp>
-#include <sstream>
 
 #include "host/ProgramRun.h"
 
@@ -14,15 +13,6 @@ using nlohmann::json;
 using testing::HasSubstr;
 using testing::StartsWith;
 using testing::UnorderedElementsAre;
-
-std::vector<std::string> lines(const std::string& text) {
-    std::vector<std::string> result;
-    std::istringstream stream(text);
-    for (std::string line; std::getline(stream, line);) {
-        result.push_back(line);
-    }
-    return result;
-}
 
 /// A text in quotes, as MOF and paths write it.
 std::string quoted(const std::string& text) {

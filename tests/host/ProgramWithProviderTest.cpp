@@ -5,7 +5,6 @@
 
 #include <cstdio>
 #include <fstream>
-#include <sstream>
 
 #include "host/ProgramRun.h"
 
@@ -23,15 +22,6 @@ std::string nodeName() {
     utsname names{};
     uname(&names);
     return names.nodename;
-}
-
-std::vector<std::string> lines(const std::string& text) {
-    std::vector<std::string> result;
-    std::istringstream stream(text);
-    for (std::string line; std::getline(stream, line);) {
-        result.push_back(line);
-    }
-    return result;
 }
 
 TEST(ProgramWithProvider, FindsTheLibraryOfItsOwnBuild) {
