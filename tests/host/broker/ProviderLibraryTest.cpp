@@ -4,6 +4,7 @@
 
 #include <dlfcn.h>
 #include <elf.h>
+#include <unistd.h>
 
 #include <fstream>
 
@@ -127,10 +128,16 @@ TEST_F(Library, AMissingFileIsTold) {
                 HasSubstr("libNoSuchProvider.so: cannot open shared object file"));
 }
 
+/// A file with a name of its own: the tests run beside each other.
 class FakeFile {
   public:
-    explicit FakeFile(const std::string& content) : name_(::testing::TempDir() + "broker_fake.so") {
-        std::ofstream(name_, std::ios::binary) << content;
+    explicit FakeFile(const std::string& content)
+        : name_(::testing::TempDir() + "broker_fake_XXXXXX.so") {
+        const int file = mkstemps(name_.data(), 3);
+        EXPECT_NE(file, -1);
+        EXPECT_EQ(write(file, content.data(), content.size()),
+                  static_cast<ssize_t>(content.size()));
+        close(file);
     }
     ~FakeFile() { std::remove(name_.c_str()); }
     const std::string& name() const { return name_; }
