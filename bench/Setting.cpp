@@ -2,8 +2,8 @@
 
 #include "bench/Requests.h"
 #include "framework/instrumentation/HostSource.h"
-#include "host/Schema.h"
-#include "host/SchemaCatalogue.h"
+#include "host/mof/Schema.h"
+#include "host/mof/SchemaCatalogue.h"
 
 #include <stdexcept>
 

@@ -4,11 +4,11 @@
 
 #include <cstdlib>
 
-#include "host/Schema.h"
-#include "host/SchemaCatalogue.h"
 #include "host/broker/Invoke.h"
 #include "host/broker/LibraryService.h"
 #include "host/broker/ProviderLibrary.h"
+#include "host/mof/Schema.h"
+#include "host/mof/SchemaCatalogue.h"
 
 namespace {
 

@@ -2,12 +2,12 @@
 #include <algorithm>
 
 #include "fuzz/Invariant.h"
-#include "host/MofLexer.h"
-#include "host/MofParser.h"
-#include "host/MofText.h"
-#include "host/Schema.h"
-#include "host/SchemaCatalogue.h"
-#include "host/Utf8.h"
+#include "host/cli/MofText.h"
+#include "host/mof/MofLexer.h"
+#include "host/mof/MofParser.h"
+#include "host/mof/Schema.h"
+#include "host/mof/SchemaCatalogue.h"
+#include "host/mof/Utf8.h"
 
 using namespace cmpihost;
 

@@ -2,9 +2,9 @@
 #include <algorithm>
 
 #include "fuzz/Invariant.h"
-#include "host/PathText.h"
-#include "host/Schema.h"
-#include "host/SchemaCatalogue.h"
+#include "host/cli/PathText.h"
+#include "host/mof/Schema.h"
+#include "host/mof/SchemaCatalogue.h"
 
 using namespace cmpihost;
 

@@ -4,9 +4,9 @@
 #include <cstdlib>
 
 #include "fuzz/StrictLog.h"
-#include "host/Schema.h"
-#include "host/SchemaCatalogue.h"
 #include "host/broker/ResultCollector.h"
+#include "host/mof/Schema.h"
+#include "host/mof/SchemaCatalogue.h"
 
 namespace fuzz {
 

@@ -1,7 +1,7 @@
 // What the reader says about texts that are no MOF.
 #include <gmock/gmock.h>
 
-#include "host/MofParser.h"
+#include "host/mof/MofParser.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "host/MofLexer.h"
+#include "host/mof/MofLexer.h"
 
 #include <gmock/gmock.h>
 

@@ -1,8 +1,8 @@
-#include "host/MofParser.h"
+#include "host/mof/MofParser.h"
 
 #include <gmock/gmock.h>
 
-#include "host/MofTypes.h"
+#include "host/mof/MofTypes.h"
 
 namespace {
 

@@ -1,8 +1,8 @@
-#include "host/MofText.h"
+#include "host/cli/MofText.h"
 
 #include <gtest/gtest.h>
 
-#include "host/MofLexer.h"
+#include "host/mof/MofLexer.h"
 
 namespace {
 

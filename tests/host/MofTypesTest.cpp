@@ -1,4 +1,4 @@
-#include "host/MofTypes.h"
+#include "host/mof/MofTypes.h"
 
 #include <gtest/gtest.h>
 

@@ -1,8 +1,8 @@
-#include "host/Notes.h"
+#include "host/cli/Notes.h"
 
 #include <gtest/gtest.h>
 
-#include "host/MofParser.h"
+#include "host/mof/MofParser.h"
 
 namespace {
 

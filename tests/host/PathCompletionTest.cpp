@@ -1,11 +1,11 @@
-#include "host/PathCompletion.h"
+#include "host/cli/PathCompletion.h"
 
 #include <gmock/gmock.h>
 
-#include "host/MofParser.h"
-#include "host/PathText.h"
-#include "host/SchemaCatalogue.h"
-#include "host/UsageError.h"
+#include "host/cli/PathText.h"
+#include "host/cli/UsageError.h"
+#include "host/mof/MofParser.h"
+#include "host/mof/SchemaCatalogue.h"
 
 namespace {
 

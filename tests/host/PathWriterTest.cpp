@@ -1,8 +1,8 @@
 #include <gmock/gmock.h>
 
-#include "host/MofParser.h"
-#include "host/PathText.h"
-#include "host/SchemaCatalogue.h"
+#include "host/cli/PathText.h"
+#include "host/mof/MofParser.h"
+#include "host/mof/SchemaCatalogue.h"
 
 namespace {
 

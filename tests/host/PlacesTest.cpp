@@ -1,4 +1,4 @@
-#include "host/Places.h"
+#include "host/cli/Places.h"
 
 #include <gmock/gmock.h>
 #include <stdlib.h>

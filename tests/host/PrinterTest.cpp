@@ -1,4 +1,4 @@
-#include "host/Printer.h"
+#include "host/cli/Printer.h"
 
 #include <gmock/gmock.h>
 #include <stdlib.h>
@@ -7,7 +7,7 @@
 #include <cmath>
 #include <sstream>
 
-#include "host/MofParser.h"
+#include "host/mof/MofParser.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "host/ReadableText.h"
+#include "host/cli/ReadableText.h"
 
 #include <gtest/gtest.h>
 #include <stdlib.h>

@@ -1,4 +1,4 @@
-#include "host/RecordsOnStderr.h"
+#include "host/cli/RecordsOnStderr.h"
 
 #include <gmock/gmock.h>
 #include <signal.h>

@@ -1,10 +1,10 @@
-#include "host/RequestBuilder.h"
+#include "host/cli/RequestBuilder.h"
 
 #include <gmock/gmock.h>
 
-#include "host/MofParser.h"
-#include "host/SchemaCatalogue.h"
-#include "host/UsageError.h"
+#include "host/cli/UsageError.h"
+#include "host/mof/MofParser.h"
+#include "host/mof/SchemaCatalogue.h"
 
 namespace {
 

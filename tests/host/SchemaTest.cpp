@@ -1,13 +1,13 @@
-#include "host/Schema.h"
+#include "host/mof/Schema.h"
 
 #include <gmock/gmock.h>
 #include <stdlib.h>
 
 #include <fstream>
 
-#include "host/MofParser.h"
-#include "host/Names.h"
-#include "host/SchemaCatalogue.h"
+#include "host/mof/MofParser.h"
+#include "host/mof/Names.h"
+#include "host/mof/SchemaCatalogue.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "host/StatusText.h"
+#include "host/cli/StatusText.h"
 
 #include <gtest/gtest.h>
 

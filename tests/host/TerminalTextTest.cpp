@@ -1,8 +1,8 @@
-#include "host/TerminalText.h"
+#include "host/cli/TerminalText.h"
 
 #include <gtest/gtest.h>
 
-#include "host/Utf8.h"
+#include "host/mof/Utf8.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "host/Tree.h"
+#include "host/cli/Tree.h"
 
 #include <gtest/gtest.h>
 #include <stdlib.h>

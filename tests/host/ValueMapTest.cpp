@@ -1,8 +1,8 @@
-#include "host/ValueMap.h"
+#include "host/mof/ValueMap.h"
 
 #include <gmock/gmock.h>
 
-#include "host/MofParser.h"
+#include "host/mof/MofParser.h"
 
 namespace {
 

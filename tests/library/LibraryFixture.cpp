@@ -1,8 +1,8 @@
 #include "library/LibraryFixture.h"
 
 #include "framework/instrumentation/HostSource.h"
-#include "host/Schema.h"
-#include "host/SchemaCatalogue.h"
+#include "host/mof/Schema.h"
+#include "host/mof/SchemaCatalogue.h"
 
 using namespace cmpihost;
 

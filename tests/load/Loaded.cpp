@@ -1,7 +1,7 @@
 #include "load/Loaded.h"
 
-#include "host/Schema.h"
-#include "host/SchemaCatalogue.h"
+#include "host/mof/Schema.h"
+#include "host/mof/SchemaCatalogue.h"
 
 namespace load {
 

@@ -7,11 +7,11 @@
 #include <fstream>
 #include <iterator>
 
-#include "host/Schema.h"
-#include "host/SchemaCatalogue.h"
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
 #include "host/broker/ProviderLibrary.h"
+#include "host/mof/Schema.h"
+#include "host/mof/SchemaCatalogue.h"
 
 namespace {
 

@@ -5,9 +5,9 @@
 
 #include "CMPIOperatingSystem.h"
 #include "CMPIOperatingSystemCapabilities.h"
-#include "host/Schema.h"
-#include "host/SchemaCatalogue.h"
 #include "host/broker/Value.h"
+#include "host/mof/Schema.h"
+#include "host/mof/SchemaCatalogue.h"
 
 // The tables of the adapters, held against the classes that schema/ declares.
 

@@ -4,8 +4,8 @@
 #include <algorithm>
 #include <set>
 
-#include "host/MofTypes.h"
-#include "host/Schema.h"
+#include "host/mof/MofTypes.h"
+#include "host/mof/Schema.h"
 
 namespace {
 

@@ -1,0 +1,108 @@
+#include <charconv>
+#include <nlohmann/json.hpp>
+
+#include "host/cli/PathText.h"
+#include "host/cli/Printer.h"
+#include "host/cli/ReadableText.h"
+#include "host/cli/ValueKind.h"
+
+namespace cmpihost {
+
+namespace {
+
+using Json = nlohmann::ordered_json;
+
+/// A real of single precision is printed with its own digits, not with those of its double.
+double shownReal(const Value& value) {
+    const std::string text = realText(value.real(), value.type());
+    double shown = value.real();
+    std::from_chars(text.data(), text.data() + text.size(), shown);
+    return shown;
+}
+
+Json valueJson(const Value& value);
+
+Json propertiesJson(const InstanceValue& instance) {
+    Json properties = Json::object();
+    for (const PropertyValue& property : instance.properties) {
+        properties[property.name] = valueJson(property.value);
+    }
+    return properties;
+}
+
+Json listJson(const std::vector<Value>& elements) {
+    Json list = Json::array();
+    for (const Value& element : elements) {
+        list.push_back(valueJson(element));
+    }
+    return list;
+}
+
+Json valueJson(const Value& value) {
+    switch (kindOf(value)) {
+        case ValueKind::Unsigned:
+            return value.unsignedInteger();
+        case ValueKind::Signed:
+            return value.signedInteger();
+        case ValueKind::Boolean:
+            return value.boolean();
+        case ValueKind::Real:
+            return shownReal(value);
+        case ValueKind::Character:
+            return characterText(value.unsignedInteger());
+        case ValueKind::Text:
+        case ValueKind::DateTime:
+            return value.text();
+        case ValueKind::Reference:
+            return writePath(value.reference());
+        case ValueKind::Instance:
+            return {{"class", value.instance().path.className},
+                    {"properties", propertiesJson(value.instance())}};
+        case ValueKind::Array:
+            return listJson(value.elements());
+        default:
+            return nullptr;
+    }
+}
+
+Json pathJson(const ObjectPathValue& path) {
+    return {{"class", path.className}, {"path", writePath(path)}};
+}
+
+class JsonPrinter final : public Printer {
+  public:
+    explicit JsonPrinter(std::ostream& stream) : stream_(stream) {}
+
+    void print(const std::vector<InstanceValue>& instances) override {
+        Json list = Json::array();
+        for (const InstanceValue& instance : instances) {
+            Json element = pathJson(instance.path);
+            element["properties"] = propertiesJson(instance);
+            list.push_back(std::move(element));
+        }
+        write(list);
+    }
+
+    void print(const std::vector<ObjectPathValue>& paths) override {
+        Json list = Json::array();
+        for (const ObjectPathValue& path : paths) {
+            list.push_back(pathJson(path));
+        }
+        write(list);
+    }
+
+  private:
+    void write(const Json& list) {
+        stream_ << list.dump(2, ' ', false, Json::error_handler_t::replace) << '\n';
+    }
+
+    std::ostream& stream_;
+};
+
+}  // namespace
+
+std::unique_ptr<Printer> makeJsonPrinter(std::ostream& stream) {
+    return std::make_unique<JsonPrinter>(stream);
+}
+
+}  // namespace cmpihost

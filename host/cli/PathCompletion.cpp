@@ -1,0 +1,119 @@
+#include "host/cli/PathCompletion.h"
+
+#include <algorithm>
+
+#include "host/cli/PathText.h"
+#include "host/cli/TerminalText.h"
+#include "host/cli/UsageError.h"
+
+namespace cmpihost {
+
+namespace {
+
+/// How many paths a complaint lists.
+constexpr std::size_t listed = 10;
+
+bool isAboutOneInstance(Operation operation) {
+    switch (operation) {
+        case Operation::GetInstance:
+        case Operation::Associators:
+        case Operation::AssociatorNames:
+        case Operation::References:
+        case Operation::ReferenceNames:
+            return true;
+        default:
+            return false;
+    }
+}
+
+/// Names of systems compare without case, as the provider compares them; other texts do not.
+bool sameText(const std::string& key, const std::string& given, const std::string& other) {
+    const bool withoutCase = equalNames(key, "CSName") || equalNames(key, "Name");
+    return withoutCase ? equalNames(given, other) : given == other;
+}
+
+/// A number in a path has a type of its own, whatever the class declares.
+bool sameValue(const KeyBinding& given, const Value& other) {
+    return given.value == other || (given.value.isText() == other.isText() &&
+                                    sameText(given.name, given.value.toText(), other.toText()));
+}
+
+bool hasKeys(const ObjectPathValue& name, const std::vector<KeyBinding>& given) {
+    return std::all_of(given.begin(), given.end(), [&](const KeyBinding& key) {
+        const Value* value = name.key(key.name);
+        return value != nullptr && sameValue(key, *value);
+    });
+}
+
+std::string list(const std::vector<ObjectPathValue>& paths) {
+    std::string text;
+    for (std::size_t index = 0; index < std::min(paths.size(), listed); ++index) {
+        text += "\n  " + terminalText(writePath(paths[index]));
+    }
+    if (paths.size() > listed) {
+        text += "\n  and " + std::to_string(paths.size() - listed) + " more";
+    }
+    return text;
+}
+
+std::string complaint(const std::string& className, const std::vector<ObjectPathValue>& names,
+                      const std::vector<ObjectPathValue>& matching) {
+    const std::string start = "the path lacks keys, and ";
+    if (names.empty()) {
+        return start + "there is no instance of " + className;
+    }
+    if (matching.empty()) {
+        return start + "no instance of " + className +
+               " has those that it gives; the instances are:" + list(names);
+    }
+    return start + std::to_string(matching.size()) + " instances of " + className +
+           " have those that it gives:" + list(matching);
+}
+
+}  // namespace
+
+bool lacksKeys(const OperationRequest& request, const ClassCatalogue& catalogue) {
+    const ClassDeclaration* declaration = catalogue.find(request.path.className);
+    if (!isAboutOneInstance(request.operation) || declaration == nullptr) {
+        return false;
+    }
+    const auto isLacking = [&](const PropertyDeclaration& property) {
+        return property.key && request.path.key(property.name) == nullptr;
+    };
+    const auto isDeclared = [&](const KeyBinding& given) {
+        const PropertyDeclaration* property = declaration->property(given.name);
+        return property != nullptr && property->key;
+    };
+    const auto& properties = declaration->properties;
+    const auto& given = request.path.keys;
+    return std::any_of(properties.begin(), properties.end(), isLacking) &&
+           std::all_of(given.begin(), given.end(), isDeclared);
+}
+
+OperationRequest namesRequest(const ObjectPathValue& path) {
+    OperationRequest request;
+    request.operation = Operation::EnumerateInstanceNames;
+    request.path.nameSpace = path.nameSpace;
+    request.path.className = path.className;
+    return request;
+}
+
+ObjectPathValue completedPath(const ObjectPathValue& path,
+                              const std::vector<ObjectPathValue>& names) {
+    std::vector<ObjectPathValue> matching;
+    std::copy_if(names.begin(), names.end(), std::back_inserter(matching),
+                 [&](const ObjectPathValue& name) { return hasKeys(name, path.keys); });
+    if (matching.size() != 1) {
+        throw UsageError(complaint(path.className, names, matching));
+    }
+    ObjectPathValue result = std::move(matching.front());
+    result.nameSpace = path.nameSpace;
+    for (KeyBinding& key : result.keys) {
+        if (const Value* given = path.key(key.name)) {
+            key.value = *given;
+        }
+    }
+    return result;
+}
+
+}  // namespace cmpihost

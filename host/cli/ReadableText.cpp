@@ -1,0 +1,93 @@
+#include "host/cli/ReadableText.h"
+
+#include <charconv>
+#include <cstdio>
+#include <ctime>
+
+#include "host/broker/DateTimeText.h"
+#include "host/mof/Utf8.h"
+
+namespace cmpihost {
+
+namespace {
+
+constexpr std::uint64_t microsecondsPerSecond = 1000000;
+
+template <typename... Arguments>
+std::string formatted(const char* format, Arguments... arguments) {
+    char text[80];
+    const int length = std::snprintf(text, sizeof text, format, arguments...);
+    return length > 0 ? std::string(text, static_cast<std::size_t>(length)) : std::string();
+}
+
+std::string instantText(std::uint64_t seconds) {
+    static_assert(sizeof(std::time_t) == 8, "an instant of any year is to be shown");
+    const auto instant = static_cast<std::time_t>(seconds);
+    std::tm local{};
+    if (localtime_r(&instant, &local) == nullptr) {
+        return {};
+    }
+    const long offset = local.tm_gmtoff / 60;
+    const long minutes = offset < 0 ? -offset : offset;
+    return formatted("%04d-%02d-%02d %02d:%02d:%02d %c%02ld:%02ld", local.tm_year + 1900,
+                     local.tm_mon + 1, local.tm_mday, local.tm_hour, local.tm_min, local.tm_sec,
+                     offset < 0 ? '-' : '+', minutes / 60, minutes % 60);
+}
+
+std::string intervalText(std::uint64_t seconds) {
+    const unsigned days = static_cast<unsigned>(seconds / 86400);
+    const unsigned rest = static_cast<unsigned>(seconds % 86400);
+    return formatted("%u %s %02u:%02u:%02u", days, days == 1 ? "day" : "days", rest / 3600,
+                     rest / 60 % 60, rest % 60);
+}
+
+template <typename Real>
+std::string shortest(Real real) {
+    char text[64];
+    const auto result = std::to_chars(text, text + sizeof text, real);
+    return std::string(text, result.ptr);
+}
+
+}  // namespace
+
+std::string readableSize(std::uint64_t kibibytes) {
+    constexpr const char* units[] = {"KiB", "MiB", "GiB", "TiB", "PiB", "EiB", "ZiB"};
+    std::size_t unit = 0;
+    std::uint64_t whole = kibibytes;
+    std::uint64_t rest = 0;
+    while (whole >= 1024) {
+        rest = whole % 1024;
+        whole /= 1024;
+        ++unit;
+    }
+    if (unit == 0) {
+        return std::to_string(whole) + " KiB";
+    }
+    std::uint64_t tenths = whole * 10 + (rest * 10 + 512) / 1024;
+    if (tenths >= 10240) {
+        tenths = 10;
+        ++unit;
+    }
+    return std::to_string(tenths / 10) + "." + std::to_string(tenths % 10) + " " + units[unit];
+}
+
+std::string readableDateTime(const std::string& cimText) {
+    const auto parsed = parseDateTime(cimText);
+    if (!parsed || !parsed->microseconds || cimText.find('*') != std::string::npos) {
+        return {};
+    }
+    const std::uint64_t seconds = *parsed->microseconds / microsecondsPerSecond;
+    return parsed->interval ? intervalText(seconds) : instantText(seconds);
+}
+
+std::string realText(double real, CMPIType type) {
+    return type == CMPI_real32 ? shortest(static_cast<float>(real)) : shortest(real);
+}
+
+std::string characterText(std::uint64_t code) {
+    std::string text;
+    appendUtf8(text, static_cast<std::uint32_t>(code));
+    return text;
+}
+
+}  // namespace cmpihost

@@ -1,0 +1,20 @@
+#pragma once
+
+#include "host/broker/ClassCatalogue.h"
+#include "host/broker/Operation.h"
+#include "host/cli/CommandLine.h"
+#include "host/mof/Schema.h"
+
+namespace cmpihost {
+
+/// Reads the texts of a command line: the path, the values, the names. Values take the types that
+/// the schema declares; those of a class that it does not know are texts. Throws UsageError, and
+/// PathError for a path that is none.
+OperationRequest buildRequest(const CommandLine& commandLine, const Schema& schema,
+                              const ClassCatalogue& catalogue);
+
+/// The instance without the properties that the list does not name. Keys stay, as clients expect.
+InstanceValue withoutUnlisted(InstanceValue instance, const std::vector<std::string>& list,
+                              const Schema& schema);
+
+}  // namespace cmpihost

@@ -1,0 +1,216 @@
+#include "host/cli/Run.h"
+
+#include <optional>
+#include <stdexcept>
+#include <type_traits>
+
+#include "host/cli/Notes.h"
+#include "host/cli/PathCompletion.h"
+#include "host/cli/PathText.h"
+#include "host/cli/Places.h"
+#include "host/cli/ProviderHost.h"
+#include "host/cli/RecordsOnStderr.h"
+#include "host/cli/RequestBuilder.h"
+#include "host/cli/StatusText.h"
+#include "host/cli/TerminalText.h"
+#include "host/cli/Tree.h"
+#include "host/cli/UsageError.h"
+#include "host/mof/SchemaCatalogue.h"
+
+namespace cmpihost {
+
+namespace {
+
+namespace fs = std::filesystem;
+
+Schema loadSchema(const std::string& given, const fs::path& programFolder) {
+    try {
+        return Schema::load(given.empty() ? schemaFolder(programFolder) : fs::path(given));
+    } catch (const std::runtime_error& error) {
+        const char* hint = given.empty() ? " (--schema DIR names another folder)" : "";
+        throw UsageError(terminalText(error.what()) + hint);
+    }
+}
+
+/// The loader looks for a bare name in its own folders only, not in the current one.
+std::string loadable(const std::string& given) {
+    std::error_code error;
+    const bool bare = given.find('/') == std::string::npos;
+    return bare && fs::exists(given, error) ? "./" + given : given;
+}
+
+/// There is no library to load; what() is safe to print on a terminal.
+class NoProvider : public std::runtime_error {
+  public:
+    using std::runtime_error::runtime_error;
+};
+
+std::string providerFile(const CommandLine& commandLine, const fs::path& programFolder) {
+    if (!commandLine.provider.empty()) {
+        return loadable(commandLine.provider);
+    }
+    const Library wanted = commandLine.bare ? Library::Provider : Library::Facade;
+    const fs::path found = findLibrary(wanted, programFolder);
+    if (found.empty()) {
+        std::string text = std::string("no library of the ") +
+                           (commandLine.bare ? "provider" : "facade") + " was found; looked for";
+        for (const fs::path& candidate : candidates(wanted, programFolder)) {
+            text += "\n  " + terminalText(candidate.string());
+        }
+        throw NoProvider(text + "\n(--provider FILE names one" +
+                         (commandLine.bare ? ", without --bare)" : ")"));
+    }
+    return found.string();
+}
+
+bool yieldsPaths(Operation operation) {
+    return operation == Operation::EnumerateInstanceNames ||
+           operation == Operation::AssociatorNames || operation == Operation::ReferenceNames ||
+           operation == Operation::CreateInstance;
+}
+
+bool yieldsNothing(Operation operation) {
+    return operation == Operation::ModifyInstance || operation == Operation::DeleteInstance;
+}
+
+void printResult(const OperationRequest& request, OperationResult result, const Schema& schema,
+                 Printer& printer) {
+    if (yieldsNothing(request.operation)) {
+        return;
+    }
+    if (yieldsPaths(request.operation)) {
+        printer.print(result.paths);
+        return;
+    }
+    if (request.properties) {
+        for (InstanceValue& instance : result.instances) {
+            instance = withoutUnlisted(std::move(instance), *request.properties, schema);
+        }
+    }
+    printer.print(result.instances);
+}
+
+class Run {
+  public:
+    Run(const CommandLine& commandLine, const fs::path& programFolder, std::ostream& out,
+        std::ostream& err)
+        : commandLine_(commandLine), programFolder_(programFolder), out_(out), err_(err) {}
+
+    ExitStatus guarded() {
+        try {
+            return execute();
+        } catch (const NoProvider& error) {
+            return failed(error.what(), exitNotLoaded);
+        } catch (const LoadError& error) {
+            return failed(terminalText(error.what()), exitNotLoaded);
+        } catch (const PathError& error) {
+            return failed(error.what(), exitUsage);
+        } catch (const UsageError& error) {
+            return failed(error.what(), exitUsage);
+        }
+    }
+
+  private:
+    ExitStatus execute() {
+        const Schema schema = loadSchema(commandLine_.schema, programFolder_);
+        const SchemaCatalogue catalogue(schema);
+        return commandLine_.tree ? drawHost(schema, catalogue) : runOperation(schema, catalogue);
+    }
+
+    ExitStatus runOperation(const Schema& schema, const SchemaCatalogue& catalogue) {
+        OperationRequest request = buildRequest(commandLine_, schema, catalogue);
+        const OperationResult result = hosted(catalogue, [&](ProviderHost& host) {
+            return commandLine_.bare || !lacksKeys(request, catalogue) ? host.run(request)
+                                                                       : completed(host, request);
+        });
+        if (result.rc != CMPI_RC_OK) {
+            failed(failureText(result), exitCimStatus);
+            err_ << hintFor(request, result, schema);
+            return exitCimStatus;
+        }
+        printResult(request, result, schema, *makePrinter(commandLine_.format, out_, schema));
+        err_ << notesOn(request, result, schema);
+        return written();
+    }
+
+    /// Has the request answered once its path has all keys.
+    OperationResult completed(ProviderHost& host, OperationRequest& request) {
+        const OperationResult names = host.ask(namesRequest(request.path));
+        if (names.rc != CMPI_RC_OK) {
+            return names;
+        }
+        request.path = completedPath(request.path, names.paths);
+        err_ << "cmpihost: completed the path: " << terminalText(writePath(request.path)) << '\n';
+        return host.run(request);
+    }
+
+    ExitStatus drawHost(const Schema& schema, const SchemaCatalogue& catalogue) {
+        const std::string nameSpace = parseNamespace(commandLine_.nameSpace);
+        try {
+            const std::vector<TreeNode> roots = hosted(catalogue, [&](ProviderHost& host) {
+                const Ask ask = [&host](const OperationRequest& request) {
+                    return host.ask(request);
+                };
+                return hostTree(ask, nameSpace, schema);
+            });
+            for (const TreeNode& root : roots) {
+                drawTree(root, out_);
+            }
+        } catch (const TreeFailure& failure) {
+            return failed(failureText(failure.result), exitCimStatus);
+        }
+        return written();
+    }
+
+    ExitStatus failed(const std::string& complaint, ExitStatus status) {
+        err_ << "cmpihost: " << complaint << '\n';
+        return status;
+    }
+
+    ExitStatus written() {
+        if (!out_.flush()) {
+            return failed("the results cannot be written", exitCimStatus);
+        }
+        return exitDone;
+    }
+
+    /// Has the host do its work, and tells what it caught the provider at.
+    template <class Work>
+    std::invoke_result_t<Work, ProviderHost&> hosted(const SchemaCatalogue& catalogue, Work work) {
+        std::optional<RecordsOnStderr> records;
+        if (commandLine_.log) {
+            records.emplace();
+        }
+        const std::string provider = providerFile(commandLine_, programFolder_);
+        ProviderHost host({provider, providerName(provider)}, catalogue, computerSystems());
+        auto result = work(host);
+        for (const std::string& violation : host.unload()) {
+            err_ << "caught: " << terminalText(violation) << '\n';
+        }
+        return result;
+    }
+
+    ComputerSystemSource computerSystems() const {
+        if (commandLine_.computerSystems) {
+            return {{}, *commandLine_.computerSystems};
+        }
+        const std::string companion = commandLine_.companion.empty()
+                                          ? findLibrary(Library::Companion, programFolder_).string()
+                                          : loadable(commandLine_.companion);
+        return {companion};
+    }
+
+    const CommandLine& commandLine_;
+    const fs::path& programFolder_;
+    std::ostream& out_;
+    std::ostream& err_;
+};
+
+}  // namespace
+
+ExitStatus run(const CommandLine& commandLine, const fs::path& programFolder, std::ostream& out,
+               std::ostream& err) {
+    return Run(commandLine, programFolder, out, err).guarded();
+}
+
+}  // namespace cmpihost

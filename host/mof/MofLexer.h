@@ -1,0 +1,54 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include "host/mof/MofSyntax.h"
+
+namespace cmpihost::mof {
+
+enum class TokenKind { End, Identifier, Alias, Pragma, Number, Text, Character, Punctuation };
+
+struct Token {
+    TokenKind kind = TokenKind::End;
+    Position position;
+    /// The token as it is written; for a text its content without quotes and escapes.
+    std::string text;
+    /// The value of a number or a character; NULL for every other kind.
+    Scalar value;
+
+    /// The token in words, for "found ...": "'}'", "the string \"x\"", "the end of the file".
+    std::string described() const;
+};
+
+/// Cuts a MOF text into tokens; comments and blanks fall out. Throws MofError.
+class Lexer {
+  public:
+    /// text must outlive the lexer; file is only named in errors.
+    Lexer(std::string_view text, std::string file);
+
+    /// The next token; after the last one End, again and again.
+    Token next();
+
+    [[noreturn]] void fail(Position position, const std::string& complaint) const;
+
+  private:
+    char peek(std::size_t ahead = 0) const;
+    char take();
+    bool atEnd() const { return offset_ >= text_.size(); }
+    void skipBlanksAndComments();
+    void skipBlockComment();
+    Token word(TokenKind kind, Position start);
+    Token number(Position start);
+    Token quotedText(Position start);
+    Token character(Position start);
+    void appendEscape(std::string& to, char delimiter);
+    std::uint32_t hexadecimalEscape();
+
+    std::string_view text_;
+    std::string file_;
+    std::size_t offset_ = 0;
+    Position position_;
+};
+
+}  // namespace cmpihost::mof

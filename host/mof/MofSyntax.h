@@ -1,0 +1,101 @@
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <variant>
+#include <vector>
+
+#include "host/mof/MofError.h"
+
+/// What a MOF text says, piece by piece and unjudged: plain data, copied freely.
+namespace cmpihost::mof {
+
+enum class Type {
+    Boolean,
+    String,
+    Char16,
+    DateTime,
+    UInt8,
+    SInt8,
+    UInt16,
+    SInt16,
+    UInt32,
+    SInt32,
+    UInt64,
+    SInt64,
+    Real32,
+    Real64,
+    Reference
+};
+
+/// A character constant, as the number of its code point.
+struct Character {
+    std::uint32_t code = 0;
+
+    bool operator==(const Character& other) const { return code == other.code; }
+};
+
+/// One constant. monostate is NULL; a number without '-' is unsigned, one with '-' signed.
+using Scalar =
+    std::variant<std::monostate, bool, std::uint64_t, std::int64_t, double, Character, std::string>;
+
+/// A constant or a list of constants in braces; without braces there is exactly one item.
+struct Value {
+    bool array = false;
+    std::vector<Scalar> items;
+};
+
+struct Qualifier {
+    std::string name;
+    Position position;
+    /// Absent where the qualifier stands alone, which says "true".
+    std::optional<Value> value;
+};
+
+/// A property, a reference or the parameter of a method.
+struct Feature {
+    std::string name;
+    Position position;
+    Type type = Type::String;
+    /// The class that a reference points to; empty for every other type.
+    std::string referenceClass;
+    bool array = false;
+    std::optional<Value> defaultValue;
+    std::vector<Qualifier> qualifiers;
+};
+
+struct Method {
+    Feature result;
+    std::vector<Feature> parameters;
+};
+
+struct Class {
+    std::string name;
+    std::string superclass;
+    std::string file;
+    Position position;
+    std::vector<Qualifier> qualifiers;
+    std::vector<Feature> properties;
+    std::vector<Method> methods;
+};
+
+/// The classes of one text in their order, and the files that its include pragmas name.
+struct Document {
+    std::vector<Class> classes;
+    std::vector<std::string> includes;
+};
+
+/// The qualifier of that name (without case), or null.
+const Qualifier* findQualifier(const std::vector<Qualifier>& qualifiers, const std::string& name);
+
+/// Whether a boolean qualifier is there and true.
+bool isSet(const std::vector<Qualifier>& qualifiers, const std::string& name);
+
+/// The texts of a qualifier: one for a string, many for a list; empty when absent or no strings.
+std::vector<std::string> texts(const std::vector<Qualifier>& qualifiers, const std::string& name);
+
+/// The text of a string qualifier; empty when absent.
+std::string text(const std::vector<Qualifier>& qualifiers, const std::string& name);
+
+}  // namespace cmpihost::mof

@@ -1,0 +1,70 @@
+#pragma once
+
+#include <filesystem>
+#include <map>
+#include <string>
+#include <vector>
+
+#include "host/mof/MofSyntax.h"
+#include "host/mof/ValueMap.h"
+
+namespace cmpihost {
+
+/// The classes that the host knows, read from MOF files. Names compare without case. A superclass
+/// that no file declares (those of the CIM schema) is known by its name alone. Immutable once
+/// loaded, so any thread may read it.
+class Schema {
+  public:
+    Schema() = default;
+    Schema(Schema&&) = default;
+    Schema& operator=(Schema&&) = default;
+    Schema(const Schema&) = delete;
+    Schema& operator=(const Schema&) = delete;
+    ~Schema() = default;
+
+    /// Reads every *.mof file of the folder, in the order of their names. An include pragma adds
+    /// nothing, for all files of the folder are read anyway. Throws mof::MofError for a file that
+    /// is no MOF, std::runtime_error when the folder or a file in it cannot be read, a *.mof is
+    /// no regular file, or there is no class.
+    static Schema load(const std::filesystem::path& folder);
+
+    /// Adds the classes of one text. Throws mof::MofError, also for a class that is there already,
+    /// one that descends from itself, and ValueMap and Values that do not match.
+    void add(const mof::Document& document);
+
+    /// The class, or null.
+    const mof::Class* find(const std::string& className) const;
+
+    /// The property of the class as its nearest declaration in the line of superclasses has it,
+    /// or null.
+    const mof::Feature* findProperty(const std::string& className,
+                                     const std::string& propertyName) const;
+
+    /// All properties of the class: its own in the order of their declaration, then those that
+    /// only a superclass declares. Empty for an unknown class.
+    std::vector<const mof::Feature*> properties(const std::string& className) const;
+
+    /// Whether the class is the other one or descends from it.
+    bool isA(const std::string& className, const std::string& ancestor) const;
+
+    /// Whether the property is a key, by its own declaration or one that it overrides.
+    bool isKey(const std::string& className, const std::string& propertyName) const;
+
+    /// Whether the class or one that it descends from is declared as an association.
+    bool isAssociation(const std::string& className) const;
+
+    /// The names of the numbers of a property; empty for one that has none or is unknown.
+    const ValueMap& valueMap(const std::string& className, const std::string& propertyName) const;
+
+    /// The names of all classes as declared, in alphabetical order.
+    std::vector<std::string> classNames() const;
+
+  private:
+    void check(const mof::Class& added) const;
+    void keepValueMaps(const mof::Class& added);
+
+    std::map<std::string, mof::Class> classes_;
+    std::map<const mof::Feature*, ValueMap> valueMaps_;
+};
+
+}  // namespace cmpihost
