@@ -71,17 +71,17 @@ endfunction()
 
 # korva_framework_library(<name> SOURCES ... [LIBRARIES ...]): the shared library lib<name>.so.1 that
 # exports what exports.map lists, and <name>_static with the same code for unit tests of what it does
-# not export.
+# not export. Each has its own copy of what it uses of base.
 function(korva_framework_library name)
     cmake_parse_arguments(ARG "" "" "SOURCES;LIBRARIES" ${ARGN})
     add_library(${name}_objects OBJECT ${ARG_SOURCES})
-    target_link_libraries(${name}_objects PRIVATE korva::options ${ARG_LIBRARIES})
+    target_link_libraries(${name}_objects PRIVATE korva::options korva::base ${ARG_LIBRARIES})
     add_library(${name} SHARED $<TARGET_OBJECTS:${name}_objects>)
     add_library(${name}_static STATIC EXCLUDE_FROM_ALL $<TARGET_OBJECTS:${name}_objects>)
     foreach(library ${name} ${name}_static)
         add_library(korva::${library} ALIAS ${library})
         target_include_directories(${library} PUBLIC "$<BUILD_INTERFACE:${KORVA_CONTRACT_INCLUDE_DIR}>")
-        target_link_libraries(${library} PUBLIC ${ARG_LIBRARIES})
+        target_link_libraries(${library} PUBLIC ${ARG_LIBRARIES} PRIVATE korva::base)
         target_compile_features(${library} PUBLIC cxx_std_17)
     endforeach()
     korva_shared_library(${name})
