@@ -1,3 +1,5 @@
+// A list, not a map: keys keep the order in which a path has them, and a path may have a name
+// twice.
 #include "Moniker.h"
 
 namespace VA {
