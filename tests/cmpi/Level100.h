@@ -1,4 +1,5 @@
-#pragma once
+#ifndef TESTS_CMPI_LEVEL100_H
+#define TESTS_CMPI_LEVEL100_H
 
 #include <stddef.h>
 
@@ -25,4 +26,6 @@ int level100StubVersion(void);
 
 #ifdef __cplusplus
 }
+#endif
+
 #endif

@@ -1,4 +1,5 @@
-// Macros on objects: each calls its slot with all arguments in order and hands the result through.
+// The macros are what providers are written with: each calls its slot with all arguments in order
+// and hands the result through. Macros on objects, on queries and errors, and on the broker.
 #include <cmpi/cmpimacs.h>
 
 #include "RecordingTables.h"
@@ -6,6 +7,10 @@
 namespace {
 
 using cmpi_test::CmpiMacros;
+
+CMPIData noProperty(const char*, void*) {
+    return {CMPI_null, CMPI_notFound, {0}};
+}
 
 TEST_F(CmpiMacros, NewObjectsComeFromTheEncapsulatedFunctions) {
     CMPIArray* projection = nullptr;
@@ -150,6 +155,159 @@ TEST_F(CmpiMacros, ResultMacrosYieldTheStatusAndDoNotReturn) {
     expectCall("CMPIResultFT.returnObjectPath", CMReturnObjectPath(rslt, path), rslt, path);
     expectCall("CMPIResultFT.returnError", CMReturnError(rslt, err), rslt, err);
     expectCall("CMPIResultFT.returnDone", CMReturnDone(rslt), rslt);
+}
+
+TEST_F(CmpiMacros, QueryMacrosCallTheirSlots) {
+    const CMPISelectExp* const query = &queryObject;
+    expectCall("CMPISelectExpFT.evaluate", CMEvaluateSelExp(query, inst, rc), query, inst, rc);
+    expectCall("CMPISelectExpFT.evaluateUsingAccessor",
+               CMEvaluateSelExpUsingAccessor(query, noProperty, &number, rc), query, &noProperty,
+               &number, rc);
+    expectCall("CMPISelectExpFT.getString", CMGetSelExpString(query, rc), query, rc);
+    expectCall("CMPISelectExpFT.getDOC", CMGetDoc(query, rc), query, rc);
+    expectCall("CMPISelectExpFT.getCOD", CMGetCod(query, rc), query, rc);
+}
+
+TEST_F(CmpiMacros, ConditionMacrosCallTheirSlots) {
+    const CMPISelectCond* const condition = &conditionObject;
+    const CMPISubCond* const term = &subConditionObject;
+    int kind = 0;
+    expectCall("CMPISelectCondFT.getCountAndType", CMGetSubCondCountAndType(condition, &kind, rc),
+               condition, &kind, rc);
+    expectCall("CMPISelectCondFT.getSubCondAt", CMGetSubCondAt(condition, 2, rc), condition, 2, rc);
+    expectCall("CMPISubCondFT.getCount", CMGetPredicateCount(term, rc), term, rc);
+    expectCall("CMPISubCondFT.getPredicateAt", CMGetPredicateAt(term, 1, rc), term, 1, rc);
+    expectCall("CMPISubCondFT.getPredicate", CMGetPredicate(term, name, rc), term, name, rc);
+}
+
+TEST_F(CmpiMacros, PredicateMacrosCallTheirSlots) {
+    const CMPIPredicate* const predicate = &predicateObject;
+    CMPIType type = 0;
+    CMPIPredOp operation = CMPI_PredOp_Equals;
+    CMPIString* lhs = nullptr;
+    CMPIString* rhs = nullptr;
+    expectCall("CMPIPredicateFT.getData",
+               CMGetPredicateData(predicate, &type, &operation, &lhs, &rhs), predicate, &type,
+               &operation, &lhs, &rhs);
+    expectCall("CMPIPredicateFT.evaluateUsingAccessor",
+               CMEvaluatePredicateUsingAccessor(predicate, noProperty, &number, rc), predicate,
+               &noProperty, &number, rc);
+}
+
+TEST_F(CmpiMacros, AnErrorIsMadeByTheBroker) {
+    expectCall(
+        "CMPIBrokerEncFT.newCMPIError",
+        CMNewCMPIError(mb, origin, name, text, ErrorSevHigh, Disk_Failure, CMPI_RC_ERR_FAILED, rc),
+        mb, origin, name, text, 4, 86, 1, rc);
+}
+
+TEST_F(CmpiMacros, ErrorGettersCallTheirSlots) {
+    expectCall("CMPIErrorFT.getErrorType", CMGetErrorType(err, rc), err, rc);
+    expectCall("CMPIErrorFT.getOtherErrorType", CMGetOtherErrorType(err, rc), err, rc);
+    expectCall("CMPIErrorFT.getOwningEntity", CMGetOwningEntity(err, rc), err, rc);
+    expectCall("CMPIErrorFT.getMessageID", CMGetMessageID(err, rc), err, rc);
+    expectCall("CMPIErrorFT.getMessage", CMGetErrorMessage(err, rc), err, rc);
+    expectCall("CMPIErrorFT.getPerceivedSeverity", CMGetPerceivedSeverity(err, rc), err, rc);
+    expectCall("CMPIErrorFT.getProbableCause", CMGetProbableCause(err, rc), err, rc);
+    expectCall("CMPIErrorFT.getProbableCauseDescription", CMGetProbableCauseDescription(err, rc),
+               err, rc);
+    expectCall("CMPIErrorFT.getRecommendedActions", CMGetRecommendedActions(err, rc), err, rc);
+    expectCall("CMPIErrorFT.getErrorSource", CMGetErrorSource(err, rc), err, rc);
+    expectCall("CMPIErrorFT.getErrorSourceFormat", CMGetErrorSourceFormat(err, rc), err, rc);
+    expectCall("CMPIErrorFT.getOtherErrorSourceFormat", CMGetOtherErrorSourceFormat(err, rc), err,
+               rc);
+    expectCall("CMPIErrorFT.getCIMStatusCode", CMGetCIMStatusCode(err, rc), err, rc);
+    expectCall("CMPIErrorFT.getCIMStatusCodeDescription", CMGetCIMStatusCodeDescription(err, rc),
+               err, rc);
+    expectCall("CMPIErrorFT.getMessageArguments", CMGetMessageArguments(err, rc), err, rc);
+}
+
+TEST_F(CmpiMacros, ErrorSettersCallTheirSlots) {
+    CMPIArray* const array = &arrayObject;
+    expectCall("CMPIErrorFT.setErrorType", CMSetErrorType(err, SecurityError), err, 7);
+    expectCall("CMPIErrorFT.setOtherErrorType", CMSetOtherErrorType(err, text), err, text);
+    expectCall("CMPIErrorFT.setProbableCauseDescription", CMSetProbableCauseDescription(err, text),
+               err, text);
+    expectCall("CMPIErrorFT.setRecommendedActions", CMSetRecommendedActions(err, array), err,
+               array);
+    expectCall("CMPIErrorFT.setErrorSource", CMSetErrorSource(err, text), err, text);
+    expectCall("CMPIErrorFT.setErrorSourceFormat", CMSetErrorSourceFormat(err, CIMObjectHandle),
+               err, 2);
+    expectCall("CMPIErrorFT.setOtherErrorSourceFormat", CMSetOtherErrorSourceFormat(err, text), err,
+               text);
+    expectCall("CMPIErrorFT.setCIMStatusCodeDescription", CMSetCIMStatusCodeDescription(err, text),
+               err, text);
+    expectCall("CMPIErrorFT.setMessageArguments", CMSetMessageArguments(err, array), err, array);
+}
+
+TEST_F(CmpiMacros, EnumerationsReachTheBroker) {
+    expectCall("CMPIBrokerFT.enumerateInstanceNames", CBEnumInstanceNames(mb, ctx, path, rc), mb,
+               ctx, path, rc);
+    expectCall("CMPIBrokerFT.enumerateInstances", CBEnumInstances(mb, ctx, path, list, rc), mb, ctx,
+               path, list, rc);
+    expectCall("CMPIBrokerFT.execQuery", CBExecQuery(mb, ctx, path, text, name, rc), mb, ctx, path,
+               text, name, rc);
+}
+
+TEST_F(CmpiMacros, InstanceOperationsReachTheBroker) {
+    expectCall("CMPIBrokerFT.getInstance", CBGetInstance(mb, ctx, path, list, rc), mb, ctx, path,
+               list, rc);
+    expectCall("CMPIBrokerFT.createInstance", CBCreateInstance(mb, ctx, path, inst, rc), mb, ctx,
+               path, inst, rc);
+    expectCall("CMPIBrokerFT.modifyInstance", CBModifyInstance(mb, ctx, path, inst, list), mb, ctx,
+               path, inst, list);
+    expectCall("CMPIBrokerFT.modifyInstance", CBSetInstance(mb, ctx, path, inst, list), mb, ctx,
+               path, inst, list);
+    expectCall("CMPIBrokerFT.deleteInstance", CBDeleteInstance(mb, ctx, path), mb, ctx, path);
+}
+
+TEST_F(CmpiMacros, AssociationOperationsReachTheBroker) {
+    const char* const role = "Antecedent";
+    const char* const resultRole = "Dependent";
+    expectCall("CMPIBrokerFT.associators",
+               CBAssociators(mb, ctx, path, cn, text, role, resultRole, list, rc), mb, ctx, path,
+               cn, text, role, resultRole, list, rc);
+    expectCall("CMPIBrokerFT.associatorNames",
+               CBAssociatorNames(mb, ctx, path, cn, text, role, resultRole, rc), mb, ctx, path, cn,
+               text, role, resultRole, rc);
+    expectCall("CMPIBrokerFT.references", CBReferences(mb, ctx, path, cn, role, list, rc), mb, ctx,
+               path, cn, role, list, rc);
+    expectCall("CMPIBrokerFT.referenceNames", CBReferenceNames(mb, ctx, path, cn, role, rc), mb,
+               ctx, path, cn, role, rc);
+}
+
+TEST_F(CmpiMacros, MethodsAndPropertiesReachTheBroker) {
+    expectCall("CMPIBrokerFT.invokeMethod",
+               CBInvokeMethod(mb, ctx, path, name, &argsObject, &outArgsObject, rc), mb, ctx, path,
+               name, &argsObject, &outArgsObject, rc);
+    expectCall("CMPIBrokerFT.setProperty", CBSetProperty(mb, ctx, path, name, text, CMPI_chars), mb,
+               ctx, path, name, text, 0x1700);
+    expectCall("CMPIBrokerFT.getProperty", CBGetProperty(mb, ctx, path, name, rc), mb, ctx, path,
+               name, rc);
+}
+
+TEST_F(CmpiMacros, ThreadsAndIndicationsReachTheBroker) {
+    expectCall("CMPIBrokerFT.prepareAttachThread", CBPrepareAttachThread(mb, ctx), mb, ctx);
+    expectCall("CMPIBrokerFT.attachThread", CBAttachThread(mb, ctx), mb, ctx);
+    expectCall("CMPIBrokerFT.detachThread", CBDetachThread(mb, ctx), mb, ctx);
+    expectCall("CMPIBrokerFT.deliverIndication", CBDeliverIndication(mb, ctx, ns, inst), mb, ctx,
+               ns, inst);
+}
+
+TEST_F(CmpiMacros, MessageFilesReachTheBroker) {
+    CMPIMsgFileHandle file = &number;
+    expectCall("CMPIBrokerEncFT.openMessageFile", CMOpenMessageFile(mb, text, &file), mb, text,
+               &file);
+    expectCall("CMPIBrokerEncFT.closeMessageFile", CMCloseMessageFile(mb, file), mb, &number);
+}
+
+TEST_F(CmpiMacros, FactsAboutTheBrokerAreItsFirstMembers) {
+    brokerObject.bft->brokerCapabilities = CMPI_MB_BasicRead | CMPI_MB_AssociationTraversal;
+    brokerObject.bft->brokerVersion = 200;
+    brokerObject.bft->brokerName = text;
+    EXPECT_EQ(CBGetClassification(mb), 9u);
+    EXPECT_EQ(CBBrokerVersion(mb), 200u);
+    EXPECT_STREQ(CBBrokerName(mb), "localhost");
 }
 
 }  // namespace

@@ -1,4 +1,6 @@
-#pragma once
+// A broker whose every slot notes how it was called, for tests of the macros.
+#ifndef TESTS_CMPI_RECORDING_TABLES_H
+#define TESTS_CMPI_RECORDING_TABLES_H
 
 #include <cmpi/cmpift.h>
 #include <gtest/gtest.h>
@@ -79,11 +81,11 @@ using Tables =
                CMPIArrayFT, CMPIEnumerationFT, CMPIDateTimeFT, CMPIInstanceMIFT,
                CMPIAssociationMIFT, CMPIMethodMIFT, CMPIPropertyMIFT, CMPIIndicationMIFT>;
 
-// tagAndMember is such as "_CMPIArgsFT.addArg"; calls note it without the underscore.
+// Calls of the slot are noted by its name, such as "CMPIArgsFT.addArg".
 template <auto Slot>
-void install([[maybe_unused]] Tables& tables, [[maybe_unused]] const char* tagAndMember) {
+void install([[maybe_unused]] Tables& tables, [[maybe_unused]] const char* name) {
     if constexpr (Recorder<Slot>::exists) {
-        Recorder<Slot>::name = tagAndMember + 1;
+        Recorder<Slot>::name = name;
         std::get<typename Recorder<Slot>::TableType>(tables).*Slot = &Recorder<Slot>::call;
     }
 }
@@ -93,9 +95,13 @@ void install([[maybe_unused]] Tables& tables, [[maybe_unused]] const char* tagAn
 class CmpiMacros : public testing::Test {
   protected:
     CmpiMacros() {
-#define FIELD(tag, member, ...) install<&tag::member>(tables, #tag "." #member);
-#include "FieldFacts.inc"
-#undef FIELD
+#define RECORD(...)
+#define UNION(...)
+#define MEMBER(type, member, ...) install<&type::member>(tables, #type "." #member);
+#include "Records.inc"
+#undef RECORD
+#undef UNION
+#undef MEMBER
         lastCall = {};
     }
 
@@ -160,3 +166,5 @@ class CmpiMacros : public testing::Test {
 };
 
 }  // namespace cmpi_test
+
+#endif

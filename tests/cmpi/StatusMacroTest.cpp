@@ -1,4 +1,5 @@
-// Macros that return or fill a status, examine values, and pass variable lists.
+// Macros that do more than call a slot: they return or fill a status, examine values, and pass
+// variable lists.
 #include <cmpi/cmpimacs.h>
 
 #include <cstdarg>
