@@ -5,7 +5,7 @@
 #include "bench/Benchmarks.h"
 #include "bench/Counts.h"
 #include "bench/Requests.h"
-#include "framework/instrumentation/LinuxHost.h"
+#include "framework/instrumentation/HostSource.h"
 #include "tests/support/SystemCalls.h"
 
 namespace bench {
@@ -59,12 +59,12 @@ void countOpened(benchmark::State& state, Work work) {
 }
 
 void measurePart(benchmark::State& state, const Part& part) {
-    VA::LinuxHost host;
+    const std::shared_ptr<VA::HostSource> host = VA::makeLinuxHost();
     for (auto iteration : state) {
         static_cast<void>(iteration);
-        readPart(host, part);
+        readPart(*host, part);
     }
-    countOpened(state, [&] { readPart(host, part); });
+    countOpened(state, [&] { readPart(*host, part); });
 }
 
 void measureRequest(benchmark::State& state, Setting& setting, Answerer answerer,

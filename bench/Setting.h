@@ -2,9 +2,9 @@
 // it, and the floor.
 #pragma once
 
-#include "framework/instrumentation/SimulatedHost.h"
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
+#include "support/SimulatedHost.h"
 
 #include <memory>
 

@@ -3,8 +3,6 @@
 #include <mutex>
 #include <utility>
 
-#include "LinuxHost.h"
-
 namespace VA {
 
 NodeCursor::NodeCursor() = default;
@@ -40,7 +38,7 @@ void setHostSource(std::shared_ptr<HostSource> source) {
 
 std::shared_ptr<HostSource> currentHostSource() {
     const std::lock_guard<std::mutex> lock(current.mutex);
-    if (!current.source) current.source = std::make_shared<LinuxHost>();
+    if (!current.source) current.source = makeLinuxHost();
     return current.source;
 }
 

@@ -23,10 +23,10 @@ class [[gnu::visibility("default")]] NodeCursor {
     virtual bool select(NodeLexicon::NodeType type) = 0;
 
     /// True while the walk stands on a node.
-    virtual bool standsOnNode() = 0;
+    virtual bool valid() = 0;
 
     /// Moves to the next node. Moving past the last one is final.
-    virtual void advance() = 0;
+    virtual void next() = 0;
 
     /// Reads a property of the current node. False, with `value` untouched, when the node has no
     /// such value of that type.
@@ -59,9 +59,14 @@ class [[gnu::visibility("default")]] HostSource {
 };
 
 /// Makes `source` the one that every Instrumentation constructed from now on reads; null restores
-/// the default, a LinuxHost over the root folder. Objects that exist keep the source they have, and
+/// the default, makeLinuxHost(). Objects that exist keep the source they have, and
 /// keep it alive. Any thread may call.
 [[gnu::visibility("default")]] void setHostSource(std::shared_ptr<HostSource> source);
+
+/// The Linux host that this code runs on, never null. `root` is the folder under which all files
+/// are looked for; what the kernel tells without a file (its names, its clocks, the limits of the
+/// process) is that of the running kernel.
+[[gnu::visibility("default")]] std::shared_ptr<HostSource> makeLinuxHost(std::string root = "/");
 
 /// The source that an Instrumentation constructed now would read; never null. Any thread may call.
 [[gnu::visibility("default")]] std::shared_ptr<HostSource> currentHostSource();

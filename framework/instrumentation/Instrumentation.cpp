@@ -20,11 +20,11 @@ bool Instrumentation::selectNode(NodeLexicon::NodeType type) {
 }
 
 Instrumentation::operator bool() {
-    return state_->cursor->standsOnNode();
+    return state_->cursor->valid();
 }
 
 Instrumentation& Instrumentation::operator++() {
-    state_->cursor->advance();
+    state_->cursor->next();
     return *this;
 }
 

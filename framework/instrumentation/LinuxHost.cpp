@@ -61,8 +61,8 @@ class LinuxCursor final : public NodeCursor {
         return onNode_;
     }
 
-    bool standsOnNode() override { return onNode_; }
-    void advance() override { onNode_ = false; }
+    bool valid() override { return onNode_; }
+    void next() override { onNode_ = false; }
 
     bool readProperty(Properties id, std::string& value) override { return read(texts, id, value); }
     bool readProperty(Properties id, unsigned int& value) override {
@@ -120,6 +120,10 @@ LinuxHost::~LinuxHost() = default;
 
 std::unique_ptr<NodeCursor> LinuxHost::openCursor() {
     return std::make_unique<LinuxCursor>(*parts_);
+}
+
+std::shared_ptr<HostSource> makeLinuxHost(std::string root) {
+    return std::make_shared<LinuxHost>(std::move(root));
 }
 
 }  // namespace VA

@@ -15,7 +15,7 @@ struct HostParts;
 /// The Linux host that this code runs on: one operating system node. A walk takes one snapshot of
 /// it, reads each source at most once, and only when a value that it has to tell is asked for.
 /// Starts no process, asks no network, throws nothing but std::bad_alloc.
-class [[gnu::visibility("default")]] LinuxHost final : public HostSource {
+class LinuxHost final : public HostSource {
   public:
     /// `root` is the folder under which all files are looked for. What the kernel tells without a
     /// file (its names, its clocks, the limits of the process) is that of the running kernel.

@@ -57,7 +57,7 @@ TEST_F(BrokenWalks, AfterSomeElementsFailTheRequest) {
     setNodes({"a", "b", "c"});
     computers.setNames({"host1", "host2", "host3", "host4"});
     const auto breakOff = [this] {
-        host->throwFromCall(HostOperation::Advance, 1, std::runtime_error("late"));
+        host->throwFromCall(HostOperation::Next, 1, std::runtime_error("late"));
     };
     for (const char* name : {"KORVA_OperatingSystem", "KORVA_OperatingSystemCapabilities",
                              "KORVA_InstalledOS", "KORVA_OSElementCapabilities"})

@@ -5,7 +5,6 @@
 #include "faults/Allocations.h"
 #include "faults/FaultFixture.h"
 #include "framework/instrumentation/HostSource.h"
-#include "framework/instrumentation/LinuxHost.h"
 #include "instrumentation/FixtureTree.h"
 
 namespace {
@@ -101,7 +100,7 @@ TEST_P(AllocationFaults, OnALinuxHostAreReportedAndLeaveNothingBehind) {
     tree.writeCompleteHost();
     // However long the test takes, a request leaves nothing for the next.
     for (const char* name : {"etc/os-release", "run/systemd/sessions"}) tree.dateAhead(name);
-    VA::setHostSource(std::make_shared<VA::LinuxHost>(tree.root()));
+    VA::setHostSource(VA::makeLinuxHost(tree.root()));
     forEachRequest([this] { countUp(false); });
 }
 

@@ -8,7 +8,6 @@
 #include "faults/FaultFixture.h"
 #include "faults/FileFaults.h"
 #include "framework/instrumentation/HostSource.h"
-#include "framework/instrumentation/LinuxHost.h"
 #include "instrumentation/FixtureTree.h"
 
 namespace {
@@ -85,7 +84,7 @@ std::ostream& operator<<(std::ostream& out, const Row& row) {
 class HostFiles : public FaultFixture, public testing::WithParamInterface<Row> {
   protected:
     HostFiles() {
-        VA::setHostSource(std::make_shared<VA::LinuxHost>(tree.root()));
+        VA::setHostSource(VA::makeLinuxHost(tree.root()));
         writeHost();
     }
     ~HostFiles() override { fileFaults::release(); }

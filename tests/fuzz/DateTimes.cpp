@@ -9,9 +9,9 @@
 #include "Linux/OperatingSystem.h"
 #include "base/CimDateTime.h"
 #include "framework/instrumentation/Linux/CivilDate.h"
-#include "framework/instrumentation/SimulatedHost.h"
 #include "fuzz/Invariant.h"
 #include "host/broker/DateTimeText.h"
+#include "support/SimulatedHost.h"
 
 namespace {
 

@@ -165,7 +165,7 @@ void checkProperty(NodeCursor& cursor, NodeLexicon::Properties id) {
 }
 
 void checkCursor(NodeCursor& cursor) {
-    fuzz::expect(cursor.select(NodeLexicon::OperatingSystemNode) && cursor.standsOnNode(),
+    fuzz::expect(cursor.select(NodeLexicon::OperatingSystemNode) && cursor.valid(),
                  "a host has an operating system");
     for (unsigned number = 100; number < 160; ++number) {
         const auto id = static_cast<NodeLexicon::Properties>(number);
@@ -179,8 +179,8 @@ void checkCursor(NodeCursor& cursor) {
     std::string name;
     if (cursor.readComputerName(name))
         fuzz::expect(Linux::isPlainText(name), "every text of the host is plain");
-    cursor.advance();
-    fuzz::expect(!cursor.standsOnNode(), "a host has one operating system");
+    cursor.next();
+    fuzz::expect(!cursor.valid(), "a host has one operating system");
 }
 
 }  // namespace

@@ -5,12 +5,12 @@
 #include <string>
 #include <vector>
 
-#include "framework/instrumentation/SimulatedHost.h"
 #include "fuzz/Decoder.h"
 #include "host/broker/BrokerOptions.h"
 #include "host/broker/FaultPlan.h"
 #include "host/broker/Invoke.h"
 #include "host/broker/UpcallService.h"
+#include "support/SimulatedHost.h"
 
 namespace fuzz {
 

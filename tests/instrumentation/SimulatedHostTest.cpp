@@ -1,4 +1,4 @@
-#include "framework/instrumentation/SimulatedHost.h"
+#include "support/SimulatedHost.h"
 
 #include <Instrumentation.h>
 #include <gtest/gtest.h>
@@ -183,11 +183,10 @@ void callEverything() {
     cursor.getComputerName(text);
 }
 
-const Operation everyOperation[] = {Operation::Construct,    Operation::Select,
-                                    Operation::StandsOnNode, Operation::Advance,
-                                    Operation::ReadText,     Operation::ReadNumber,
-                                    Operation::ReadFlag,     Operation::ReadOnlyQuery,
-                                    Operation::NodeStatus,   Operation::ComputerName};
+const Operation everyOperation[] = {
+    Operation::Construct,  Operation::Select,      Operation::Valid,    Operation::Next,
+    Operation::ReadText,   Operation::ReadNumber,  Operation::ReadFlag, Operation::ReadOnlyQuery,
+    Operation::NodeStatus, Operation::ComputerName};
 
 TEST_F(SimulatedHostTest, EachCallIsCountedOnceByOperationAndByProperty) {
     callEverything();
@@ -262,7 +261,7 @@ TEST_F(SimulatedHostTest, ExceptionsOfAnyTypeComeThrough) {
 TEST_F(SimulatedHostTest, HookMayUseTheHost) {
     host->setHook([&](const SimulatedHost::Call& call) {
         if (call.operation == Operation::Select) host->clearNodes();
-        if (call.operation == Operation::Advance) host->setHook({});
+        if (call.operation == Operation::Next) host->setHook({});
     });
     Instrumentation cursor;
     EXPECT_FALSE(cursor.selectNode(OperatingSystemNode));

@@ -164,8 +164,8 @@ TEST_F(SnapshotTest, ValuesOfOneWalkBelongTogetherWhateverTheHostDoesMeanwhile) 
 }
 
 TEST_F(SnapshotTest, NothingIsReadOnceTheWalkIsOver) {
-    cursor->advance();
-    EXPECT_FALSE(cursor->standsOnNode());
+    cursor->next();
+    EXPECT_FALSE(cursor->valid());
     EXPECT_EQ(text(Name), "absent");
     EXPECT_EQ(number(OSType), 4711u);
     bool flag = true;
@@ -173,8 +173,8 @@ TEST_F(SnapshotTest, NothingIsReadOnceTheWalkIsOver) {
     EXPECT_FALSE(cursor->readOnlyProperty(Name, flag));
     EXPECT_EQ(cursor->nodeStatus(), 0u);
     EXPECT_THAT(host.files->counts(), IsEmpty());
-    cursor->advance();
-    EXPECT_FALSE(cursor->standsOnNode());
+    cursor->next();
+    EXPECT_FALSE(cursor->valid());
 }
 
 TEST_F(SnapshotTest, PropertyHasOneTypeOnly) {
@@ -205,9 +205,9 @@ TEST(LinuxNodes, AreOfTheOperatingSystemTypeAlone) {
     VA::LinuxHost linuxHost(host.tree().root());
     for (unsigned int type = 0; type < 40; ++type) {
         auto cursor = linuxHost.openCursor();
-        EXPECT_FALSE(cursor->standsOnNode());
+        EXPECT_FALSE(cursor->valid());
         EXPECT_EQ(cursor->select(NodeType(type)), type == 17) << type;
-        EXPECT_EQ(cursor->standsOnNode(), type == 17) << type;
+        EXPECT_EQ(cursor->valid(), type == 17) << type;
     }
 }
 

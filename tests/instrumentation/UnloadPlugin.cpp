@@ -1,8 +1,8 @@
 // Uses the library in every way, on behalf of UnloadTest.
 #include <Instrumentation.h>
 
-#include "framework/instrumentation/LinuxHost.h"
-#include "framework/instrumentation/SimulatedHost.h"
+#include "framework/instrumentation/HostSource.h"
+#include "support/SimulatedHost.h"
 
 namespace {
 
@@ -32,6 +32,6 @@ int useLibrary(const char* root) {
     bool good = readEverything();
     VA::setHostSource(VA::SimulatedHost::withOneNode());
     good = readEverything() && good;
-    VA::setHostSource(std::make_shared<VA::LinuxHost>(root));
+    VA::setHostSource(VA::makeLinuxHost(root));
     return readEverything() && good ? 1 : 0;
 }

@@ -65,10 +65,10 @@ class Exceptions : public LibraryFixture {
 };
 
 TEST_F(Exceptions, StandardOneFromAnyPlaceLeavesOneMessageAndTheStatusOK) {
-    for (const HostOperation operation : {HostOperation::Select, HostOperation::StandsOnNode,
-                                          HostOperation::ReadText, HostOperation::Advance}) {
+    for (const HostOperation operation : {HostOperation::Select, HostOperation::Valid,
+                                          HostOperation::ReadText, HostOperation::Next}) {
         for (const Request& each : requests()) {
-            if (operation == HostOperation::StandsOnNode &&
+            if (operation == HostOperation::Valid &&
                 each.request.path.className == "KORVA_OperatingSystemCapabilities")
                 continue;  // without an element to filter, its first test is the walk's end
             host->throwFromCall(operation, 1, std::runtime_error("from the instrumentation"));
@@ -100,7 +100,7 @@ TEST_F(Exceptions, EachFrameworkClassIsReportedByItsText) {
 
 TEST_F(Exceptions, ElementsBeforeTheExceptionHaveBeenReturned) {
     setNodes({"a", "b", "c"});
-    host->throwFromCall(HostOperation::Advance, 2, std::runtime_error("late"));
+    host->throwFromCall(HostOperation::Next, 2, std::runtime_error("late"));
     const Outcome outcome = enumerateNames("KORVA_OperatingSystem");
     EXPECT_EQ(outcome.rc, CMPI_RC_OK);
     EXPECT_EQ(outcome.paths.size(), 2U);
@@ -123,7 +123,7 @@ TEST_F(Exceptions, ForeignTypeLeavesTheHandlerWithoutMessageOrExitMarker) {
 // The last records of the request are those of its destructors.
 TEST_F(Exceptions, ForeignTypeLeavesTheHandlerOnceTheAdapterIsDestroyed) {
     struct Foreign {};
-    host->throwFromCall(HostOperation::Advance, 1, Foreign{});
+    host->throwFromCall(HostOperation::Next, 1, Foreign{});
     for (Request each : requests()) {
         const bool association = each.request.assocClass.has_value();
         each.request.path.keys.clear();

@@ -9,10 +9,10 @@
 #include <string>
 #include <vector>
 
-#include "framework/instrumentation/SimulatedHost.h"
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
 #include "support/RecordingLog.h"
+#include "support/SimulatedHost.h"
 
 /// The file of the built provider.
 extern const char* const providerFile;

@@ -24,7 +24,8 @@ add_library(minimal_log_fixture OBJECT EXCLUDE_FROM_ALL LibraryFixture.cpp)
 target_compile_definitions(minimal_log_fixture PRIVATE
     KORVA_SOURCE_DIR="${PROJECT_SOURCE_DIR}" KORVA_BINARY_DIR="${CMAKE_BINARY_DIR}/minimal-log")
 target_include_directories(minimal_log_fixture PUBLIC "${PROJECT_SOURCE_DIR}/tests")
-target_link_libraries(minimal_log_fixture PUBLIC korva::vainstrumentation korva::schema_reader GTest::gmock)
+target_link_libraries(minimal_log_fixture
+    PUBLIC korva_simulated_host korva::vainstrumentation korva::schema_reader GTest::gmock)
 
 korva_test(minimal_log_tests
     SOURCES RecordsTest.cpp

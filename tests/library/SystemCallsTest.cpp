@@ -6,7 +6,6 @@
 #include <thread>
 
 #include "framework/instrumentation/HostSource.h"
-#include "framework/instrumentation/LinuxHost.h"
 #include "instrumentation/FixtureTree.h"
 #include "library/LibraryFixture.h"
 #include "support/SystemCalls.h"
@@ -67,7 +66,7 @@ TEST_F(SystemCalls, OfThisHostAreFew) {
 TEST_F(SystemCalls, OfAHostOnWhichNothingChangedAreALookForEachFileThatIsKept) {
     FixtureTree tree;
     tree.writeCompleteHost();
-    VA::setHostSource(std::make_shared<VA::LinuxHost>(tree.root()));
+    VA::setHostSource(VA::makeLinuxHost(tree.root()));
     std::this_thread::sleep_for(3s);
     EXPECT_THAT(callsOf(Operation::EnumerateInstanceNames), SizeIs(2));
     // A call each: the names of the kernel, os-release, three dates, a folder of systemd's, that of
@@ -80,7 +79,7 @@ TEST_F(SystemCalls, OfAHostThatMayHaveChangedInTheSameInstantReadTheFileAgain) {
     FixtureTree tree;
     tree.writeCompleteHost();
     tree.dateAhead("etc/os-release");
-    VA::setHostSource(std::make_shared<VA::LinuxHost>(tree.root()));
+    VA::setHostSource(VA::makeLinuxHost(tree.root()));
     EXPECT_THAT(callsOf(Operation::EnumerateInstanceNames), SizeIs(6));
 }
 

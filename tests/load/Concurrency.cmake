@@ -8,7 +8,7 @@ endif()
 korva_test(concurrency_tests
     SOURCES ConcurrencyTest.cpp Crowd.cpp Loaded.cpp RecordShapes.cpp
             ../instrumentation/FixtureTree.cpp
-    LIBRARIES korva_load korva::vainstrumentation korva::schema_reader
+    LIBRARIES korva_load korva_simulated_host korva::vainstrumentation korva::schema_reader
     PROPERTIES ${load_properties})
 add_dependencies(concurrency_tests korvaosstatusfacade)
 

@@ -10,13 +10,13 @@
 #include <tuple>
 #include <utility>
 
-#include "framework/instrumentation/LinuxHost.h"
-#include "framework/instrumentation/SimulatedHost.h"
+#include "framework/instrumentation/HostSource.h"
 #include "instrumentation/FixtureTree.h"
 #include "load/Crowd.h"
 #include "load/Loaded.h"
 #include "load/RecordShapes.h"
 #include "load/Requests.h"
+#include "support/SimulatedHost.h"
 
 // Many threads in the provider at once, through the built library and the real logging, with the
 // facade in front of it and without.
@@ -73,7 +73,7 @@ std::shared_ptr<VA::HostSource> simulatedHost(const FixtureTree&) {
 std::shared_ptr<VA::HostSource> linuxHost(const FixtureTree& tree) {
     tree.writeCompleteHost();
     tree.makeFolder("run/systemd/system");  // so that libsystemd is asked where there is one
-    return std::make_shared<VA::LinuxHost>(tree.root());
+    return VA::makeLinuxHost(tree.root());
 }
 
 constexpr Host hosts[] = {

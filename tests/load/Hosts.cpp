@@ -3,7 +3,16 @@
 #include <memory>
 #include <string>
 
-#include "framework/instrumentation/SimulatedHost.h"
+#include "support/SimulatedHost.h"
+
+namespace {
+
+// The host's code goes with this library: the instrumentation must not keep a host longer.
+struct Restore {
+    ~Restore() { VA::setHostSource(nullptr); }
+} restore;
+
+}  // namespace
 
 extern "C" [[gnu::visibility("default")]] void showNodes(unsigned int count);
 

@@ -1,8 +1,7 @@
 # The soak loads and unloads the facade and the provider: nothing of them or of the framework may be in
 # the program itself. What chooses the host comes and goes with them.
 add_library(load_hosts MODULE Hosts.cpp)
-target_link_libraries(load_hosts PRIVATE korva::options korva::vainstrumentation)
-target_include_directories(load_hosts PRIVATE "${PROJECT_SOURCE_DIR}")
+target_link_libraries(load_hosts PRIVATE korva_simulated_host korva::vainstrumentation)
 korva_shared_library(load_hosts)
 
 add_executable(soak ProcessState.cpp Soak.cpp SoakOptions.cpp Workload.cpp)

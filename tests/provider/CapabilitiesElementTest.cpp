@@ -33,7 +33,7 @@ TEST_F(CapabilitiesElement, FilterChangesNothing) {
     ++element;
     EXPECT_TRUE(element.getInstanceID(identifier));
     EXPECT_EQ(identifier, "b");
-    EXPECT_EQ(host->calls(Operation::Advance), 1U);
+    EXPECT_EQ(host->calls(Operation::Next), 1U);
 }
 
 /// Capabilities that a derived class has narrowed, as setFilter does not.

@@ -96,7 +96,7 @@ TEST_F(OperatingSystemElement, FilterThatTheCurrentNodeSatisfiesDoesNotMoveTheCu
     addNodes({"a", "a"});
     OperatingSystem element;
     element.setFilter(OperatingSystem::NameFilter, "A");
-    EXPECT_EQ(host->calls(Operation::Advance), 0U);
+    EXPECT_EQ(host->calls(Operation::Next), 0U);
     EXPECT_EQ(walked(element), (Names{"a", "a"}));
 }
 

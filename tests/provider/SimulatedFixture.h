@@ -8,8 +8,8 @@
 #include <utility>
 
 #include "framework/instrumentation/HostSource.h"
-#include "framework/instrumentation/SimulatedHost.h"
 #include "support/RecordingLog.h"
+#include "support/SimulatedHost.h"
 
 /// A test on a simulated host that has no node yet and whose computer is called "Host1"; starts
 /// without records.

@@ -15,8 +15,8 @@ using namespace VA::OSStatusProvider;
 class TaciturnCursor final : public VA::NodeCursor {
   public:
     bool select(NodeType) override { return true; }
-    bool standsOnNode() override { return true; }
-    void advance() override {}
+    bool valid() override { return true; }
+    void next() override {}
     bool readProperty(Properties id, std::string& value) override {
         if (id == Name && ++namesRead_ <= 2) value = "Linux";
         return true;

@@ -1,5 +1,5 @@
-#ifndef VA_SIMULATED_HOST_H
-#define VA_SIMULATED_HOST_H
+#ifndef TESTS_SUPPORT_SIMULATED_HOST_H
+#define TESTS_SUPPORT_SIMULATED_HOST_H
 
 #include <cstddef>
 #include <cstdint>
@@ -10,7 +10,7 @@
 #include <string>
 #include <variant>
 
-#include "HostSource.h"
+#include "framework/instrumentation/HostSource.h"
 
 namespace VA {
 
@@ -19,15 +19,15 @@ namespace VA {
 /// All its nodes are operating system nodes; a walk over another type finds none. Any number of
 /// threads may use one host, and change it: a walk keeps the nodes and the computer name as they
 /// stood when it was selected.
-class [[gnu::visibility("default")]] SimulatedHost final : public HostSource {
+class SimulatedHost final : public HostSource {
   public:
     /// What this host can be asked: the operations of VA::Instrumentation, its construction
     /// included.
     enum class Operation {
         Construct,
         Select,
-        StandsOnNode,
-        Advance,
+        Valid,
+        Next,
         ReadText,
         ReadNumber,
         ReadFlag,

@@ -1,4 +1,4 @@
-#include "SimulatedHost.h"
+#include "support/SimulatedHost.h"
 
 #include <algorithm>
 #include <array>
@@ -101,13 +101,13 @@ class SimulatedHost::Cursor final : public NodeCursor {
         return node() != nullptr;
     }
 
-    bool standsOnNode() override {
-        state_->enter(Operation::StandsOnNode);
+    bool valid() override {
+        state_->enter(Operation::Valid);
         return node() != nullptr;
     }
 
-    void advance() override {
-        state_->enter(Operation::Advance);
+    void next() override {
+        state_->enter(Operation::Next);
         ++position_;
     }
 
