@@ -3,7 +3,6 @@
 #include "bench/Requests.h"
 #include "framework/instrumentation/HostSource.h"
 #include "host/mof/Schema.h"
-#include "host/mof/SchemaCatalogue.h"
 
 #include <stdexcept>
 

@@ -1,52 +1,74 @@
+// Commands, their arguments and their help stand in tables; CLI11 reads the words and prints the
+// help from the same description, so that the two cannot differ.
 #include "host/cli/CommandLine.h"
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
-#include <map>
 
-#include "host/cli/TerminalText.h"
+#include "base/Utf8.h"
 
 namespace cmpihost {
 
 namespace {
 
-enum class Takes { Nothing, Properties, Assignments };
+/// What stands behind a command beside its path.
+enum class Takes { Nothing, Properties, Assignments, Query, Namespace };
 enum class Filters { None, References, Associators };
 
-struct OperationWord {
-    const char* word;
-    Operation operation;
-    const char* description;
-    const char* pathDescription;
+struct Command {
+    const char* name;
+    const char* help;
+    /// None draws the host.
+    std::optional<Operation> operation;
+    /// The help on PATH; null: it takes none.
+    const char* path;
     Takes takes;
-    Filters filters;
+    Filters filters = Filters::None;
 };
 
 constexpr const char* classPath = "Path of the class: [NAMESPACE:]CLASS";
 constexpr const char* instancePath = "Path of the instance: [NAMESPACE:]CLASS.KEY=VALUE,...";
 constexpr const char* sourcePath = "Path of the instance to start from";
 
-constexpr OperationWord words[] = {
-    {"ei", Operation::EnumerateInstances, "Enumerate the instances of a class", classPath,
-     Takes::Properties, Filters::None},
-    {"ein", Operation::EnumerateInstanceNames, "Enumerate the names of the instances of a class",
-     classPath, Takes::Nothing, Filters::None},
-    {"gi", Operation::GetInstance, "Get one instance", instancePath, Takes::Properties,
-     Filters::None},
-    {"ci", Operation::CreateInstance, "Create an instance", classPath, Takes::Assignments,
-     Filters::None},
-    {"mi", Operation::ModifyInstance, "Modify an instance", instancePath, Takes::Assignments,
-     Filters::None},
-    {"di", Operation::DeleteInstance, "Delete an instance", instancePath, Takes::Nothing,
-     Filters::None},
-    {"ai", Operation::Associators, "Get the instances that are associated with an instance",
+constexpr Command commands[] = {
+    {"ei", "Enumerate the instances of a class", Operation::EnumerateInstances, classPath,
+     Takes::Properties},
+    {"ein", "Enumerate the names of the instances of a class", Operation::EnumerateInstanceNames,
+     classPath, Takes::Nothing},
+    {"gi", "Get one instance", Operation::GetInstance, instancePath, Takes::Properties},
+    {"ci", "Create an instance", Operation::CreateInstance, classPath, Takes::Assignments},
+    {"mi", "Modify an instance", Operation::ModifyInstance, instancePath, Takes::Assignments},
+    {"di", "Delete an instance", Operation::DeleteInstance, instancePath, Takes::Nothing},
+    {"ai", "Get the instances that are associated with an instance", Operation::Associators,
      sourcePath, Takes::Properties, Filters::Associators},
-    {"ain", Operation::AssociatorNames, "Get the names of the associated instances", sourcePath,
+    {"ain", "Get the names of the associated instances", Operation::AssociatorNames, sourcePath,
      Takes::Nothing, Filters::Associators},
-    {"ri", Operation::References, "Get the association instances that refer to an instance",
+    {"ri", "Get the association instances that refer to an instance", Operation::References,
      sourcePath, Takes::Properties, Filters::References},
-    {"rin", Operation::ReferenceNames, "Get the names of those association instances", sourcePath,
+    {"rin", "Get the names of those association instances", Operation::ReferenceNames, sourcePath,
      Takes::Nothing, Filters::References},
+    {"xq", "Execute a query", Operation::ExecQuery, nullptr, Takes::Query},
+    {"tree", "Draw the host, what is installed and running on it", std::nullopt, nullptr,
+     Takes::Namespace},
+};
+
+struct Filter {
+    const char* name;
+    std::optional<std::string> CommandLine::*value;
+    const char* typeName;
+    const char* helpOnAssociators;
+    /// Null: references have no such filter.
+    const char* helpOnReferences;
+};
+
+constexpr Filter filters[] = {
+    {"--assoc-class", &CommandLine::assocClass, "CLASS", "Class of the association", nullptr},
+    {"--result-class", &CommandLine::resultClass, "CLASS", "Class of the far end",
+     "Class of the association"},
+    {"--role", &CommandLine::role, "NAME", "Reference that points to the source",
+     "Reference that points to the source"},
+    {"--result-role", &CommandLine::resultRole, "NAME", "Reference that points to the far end",
+     nullptr},
 };
 
 constexpr const char* description =
@@ -88,28 +110,28 @@ void addNames(const std::string& list, std::vector<std::string>& to) {
     while (start < list.size()) {
         const std::size_t comma = std::min(list.find(',', start), list.size());
         const std::string name = withoutBlanksAround(list.substr(start, comma - start));
-        if (!name.empty()) {
-            to.push_back(name);
-        }
+        if (!name.empty()) to.push_back(name);
         start = comma + 1;
     }
 }
 
 Format formatNamed(const std::string& word) {
-    const std::map<std::string, Format> formats = {
-        {"table", Format::Table}, {"mof", Format::Mof}, {"json", Format::Json}};
-    const auto found = formats.find(word);
-    if (found == formats.end()) {
-        throw CLI::ValidationError("--format", "expected table, mof or json, found '" + word + "'");
-    }
-    return found->second;
+    if (word == "table") return Format::Table;
+    if (word == "mof") return Format::Mof;
+    if (word == "json") return Format::Json;
+    throw CLI::ValidationError("--format", "expected table, mof or json, found '" + word + "'");
 }
 
-CLI::Validator notEmpty() {
-    return {[](const std::string& value) {
-                return value.empty() ? std::string("the value is empty") : std::string();
-            },
-            {}};
+/// An option or argument with a text that is not empty.
+template <class Text>
+CLI::Option* addText(CLI::App& to, const char* name, const char* typeName, Text& value,
+                     const char* help) {
+    const auto complaint = [](const std::string& given) {
+        return given.empty() ? std::string("the value is empty") : std::string();
+    };
+    return to.add_option(name, value, help)
+        ->type_name(typeName)
+        ->check(CLI::Validator(complaint, {}));
 }
 
 /// The arguments behind the program's name, last one first. An empty value that stands behind a
@@ -122,13 +144,9 @@ std::vector<std::string> separated(int argumentCount, const char* const* argumen
         options = options && argument != "--";
         const bool emptyValue = options && argument.compare(0, 2, "--") == 0 &&
                                 argument.find('=') == argument.size() - 1;
-        if (emptyValue) {
-            argument.pop_back();
-        }
+        if (emptyValue) argument.pop_back();
         result.push_back(std::move(argument));
-        if (emptyValue) {
-            result.emplace_back();
-        }
+        if (emptyValue) result.emplace_back();
     }
     std::reverse(result.begin(), result.end());
     return result;
@@ -137,52 +155,16 @@ std::vector<std::string> separated(int argumentCount, const char* const* argumen
 /// The command line as CLI11 fills it, and the description of it all.
 class Parser {
   public:
-    Parser() : app_(description, "cmpihost") {
-        app_.set_version_flag("--version", "cmpihost " KORVA_VERSION, "Print the version");
-        app_.set_help_flag("-h,--help", "Print this help");
-        app_.footer(std::string(pathHelp) + statusHelp);
-        app_.require_subcommand(1);
-        app_.get_formatter()->column_width(34);
-        app_.get_formatter()->label("SUBCOMMAND", "OPERATION ARGUMENT...");
-        addHostOptions();
-        for (const OperationWord& word : words) {
-            addOperation(word);
-        }
-        addQuery();
-        addTree();
-    }
-
-    ParsedCommandLine parse(int argumentCount, const char* const* arguments) {
-        try {
-            app_.parse(separated(argumentCount, arguments));
-        } catch (const CLI::CallForVersion& version) {
-            return {std::nullopt, std::string(version.what()) + "\n", exitDone};
-        } catch (const CLI::CallForHelp&) {
-            return {std::nullopt, help(), exitDone};
-        } catch (const CLI::ParseError& error) {
-            return refused(app_.get_subcommands().empty() ? withoutOperation(error) : error.what());
-        }
-        if (result_.tree && result_.format != Format::Table) {
-            return refused("--format: tree draws a picture, it has no other form");
-        }
-        collectProperties();
-        return {result_, {}, exitDone};
-    }
+    Parser();
+    ParsedCommandLine parse(int argumentCount, const char* const* arguments);
 
   private:
-    static ParsedCommandLine refused(const std::string& complaint) {
-        return {std::nullopt,
-                "cmpihost: " + terminalText(complaint) +
-                    "\nRun cmpihost --help for more information.\n",
-                exitUsage};
-    }
-    std::string withoutOperation(const CLI::ParseError& error) const;
+    static ParsedCommandLine refused(const std::string& complaint);
+    std::string withoutCommand(const CLI::ParseError& error) const;
     void addHostOptions();
-    CLI::App* addWord(const char* word, const char* purpose, Operation operation);
-    void addOperation(const OperationWord& word);
-    void addFilters(CLI::App& operation, Filters filters);
-    void addQuery();
-    void addTree();
+    void addCommand(const Command& command);
+    void addArguments(CLI::App& to, Takes takes);
+    void addFilters(CLI::App& to, Filters which);
     void collectProperties();
     std::string help();
 
@@ -192,11 +174,43 @@ class Parser {
     std::optional<std::string> propertyOption_;
 };
 
-/// The complaint about arguments among which there is no operation.
-std::string Parser::withoutOperation(const CLI::ParseError& error) const {
-    if (dynamic_cast<const CLI::RequiredError*>(&error) == nullptr) {
-        return error.what();
+Parser::Parser() : app_(description, "cmpihost") {
+    app_.set_version_flag("--version", "cmpihost " KORVA_VERSION, "Print the version");
+    app_.set_help_flag("-h,--help", "Print this help");
+    app_.footer(std::string(pathHelp) + statusHelp);
+    app_.require_subcommand(1);
+    app_.get_formatter()->column_width(34);
+    app_.get_formatter()->label("SUBCOMMAND", "OPERATION ARGUMENT...");
+    addHostOptions();
+    for (const Command& command : commands) addCommand(command);
+}
+
+ParsedCommandLine Parser::parse(int argumentCount, const char* const* arguments) {
+    try {
+        app_.parse(separated(argumentCount, arguments));
+    } catch (const CLI::CallForVersion& version) {
+        return {std::nullopt, std::string(version.what()) + "\n", exitDone};
+    } catch (const CLI::CallForHelp&) {
+        return {std::nullopt, help(), exitDone};
+    } catch (const CLI::ParseError& error) {
+        return refused(app_.get_subcommands().empty() ? withoutCommand(error) : error.what());
     }
+    if (result_.tree && result_.format != Format::Table)
+        return refused("--format: tree draws a picture, it has no other form");
+    collectProperties();
+    return {result_, {}, exitDone};
+}
+
+ParsedCommandLine Parser::refused(const std::string& complaint) {
+    return {std::nullopt,
+            "cmpihost: " + base::escapeForTerminal(complaint) +
+                "\nRun cmpihost --help for more information.\n",
+            exitUsage};
+}
+
+/// The complaint about arguments among which there is no command.
+std::string Parser::withoutCommand(const CLI::ParseError& error) const {
+    if (dynamic_cast<const CLI::RequiredError*>(&error) == nullptr) return error.what();
     const std::vector<std::string> unknown = app_.remaining();
     return unknown.empty() ? "An operation is required"
                            : "There is no operation '" + unknown.front() + "'";
@@ -204,11 +218,9 @@ std::string Parser::withoutOperation(const CLI::ParseError& error) const {
 
 void Parser::addHostOptions() {
     CLI::Option* provider =
-        app_.add_option("--provider", result_.provider,
-                        "Library of the provider; without it the facade beside this program,\n"
-                        "which asks the provider")
-            ->type_name("FILE")
-            ->check(notEmpty());
+        addText(app_, "--provider", "FILE", result_.provider,
+                "Library of the provider; without it the facade beside this program,\n"
+                "which asks the provider");
     app_.add_flag("--bare", result_.bare,
                   "Ask the provider itself, and complete no path that lacks keys")
         ->excludes(provider);
@@ -218,16 +230,12 @@ void Parser::addHostOptions() {
             "not for tree")
         ->type_name("FORMAT");
     app_.add_flag("--log", result_.log, "Show the records of the provider on the standard error");
-    app_.add_option("--schema", result_.schema,
-                    "Folder of the MOF files; without it the one beside this program")
-        ->type_name("DIR")
-        ->check(notEmpty());
+    addText(app_, "--schema", "DIR", result_.schema,
+            "Folder of the MOF files; without it the one beside this program");
     CLI::Option* companion =
-        app_.add_option("--companion", result_.companion,
-                        "Library that serves the computer system; without it the one beside this\n"
-                        "program, else this program itself")
-            ->type_name("FILE")
-            ->check(notEmpty());
+        addText(app_, "--companion", "FILE", result_.companion,
+                "Library that serves the computer system; without it the one beside this\n"
+                "program, else this program itself");
     app_.add_option("--computer-systems", result_.computerSystems,
                     "Answer for so many computer systems without that library, 0 to 1000, to see\n"
                     "what then happens")
@@ -236,97 +244,64 @@ void Parser::addHostOptions() {
         ->type_name("N");
 }
 
-CLI::App* Parser::addWord(const char* word, const char* purpose, Operation operation) {
-    CLI::App* added = app_.add_subcommand(word, purpose);
-    added->fallthrough();
-    added->group("Operations");
-    added->footer(pathHelp);
-    added->callback([this, operation] { result_.operation = operation; });
-    return added;
+void Parser::addCommand(const Command& command) {
+    CLI::App& added = *app_.add_subcommand(command.name, command.help);
+    added.fallthrough();
+    added.group(command.operation ? "Operations" : "Pictures");
+    if (command.operation) added.footer(pathHelp);
+    added.callback([this, operation = command.operation] {
+        result_.tree = !operation;
+        result_.operation = operation.value_or(result_.operation);
+    });
+    if (command.path != nullptr)
+        added.add_option("PATH", result_.path, command.path)->required()->type_name("");
+    addArguments(added, command.takes);
+    addFilters(added, command.filters);
 }
 
-void Parser::addOperation(const OperationWord& word) {
-    CLI::App* operation = addWord(word.word, word.description, word.operation);
-    operation->add_option("PATH", result_.path, word.pathDescription)->required()->type_name("");
-    if (word.takes == Takes::Properties) {
-        operation
-            ->add_option("PROPERTY", propertyArguments_, "Print these properties and the keys only")
-            ->type_name("");
-        operation
-            ->add_option("--properties", propertyOption_,
-                         "The same as a list with commas; an empty list prints the keys only")
-            ->type_name("LIST");
-    } else if (word.takes == Takes::Assignments) {
-        operation
-            ->add_option("NAME=VALUE", result_.assignments,
-                         "Values of properties; a list stands in braces: NAME={1, 2}")
-            ->type_name("");
+void Parser::addArguments(CLI::App& to, Takes takes) {
+    switch (takes) {
+        case Takes::Nothing:
+            return;
+        case Takes::Properties:
+            to.add_option("PROPERTY", propertyArguments_,
+                          "Print these properties and the keys only")
+                ->type_name("");
+            to.add_option("--properties", propertyOption_,
+                          "The same as a list with commas; an empty list prints the keys only")
+                ->type_name("LIST");
+            return;
+        case Takes::Assignments:
+            to.add_option("NAME=VALUE", result_.assignments,
+                          "Values of properties; a list stands in braces: NAME={1, 2}")
+                ->type_name("");
+            return;
+        case Takes::Query:
+            addText(to, "QUERY", "", result_.query, "Text of the query")->required();
+            addText(to, "--lang", "NAME", result_.queryLanguage, "Language of the query")
+                ->capture_default_str();
+            break;
+        case Takes::Namespace:
+            break;
     }
-    addFilters(*operation, word.filters);
-}
-
-void Parser::addFilters(CLI::App& operation, Filters filters) {
-    if (filters == Filters::None) {
-        return;
-    }
-    if (filters == Filters::Associators) {
-        operation.add_option("--assoc-class", result_.assocClass, "Class of the association")
-            ->type_name("CLASS")
-            ->check(notEmpty());
-    }
-    operation
-        .add_option(
-            "--result-class", result_.resultClass,
-            filters == Filters::Associators ? "Class of the far end" : "Class of the association")
-        ->type_name("CLASS")
-        ->check(notEmpty());
-    operation.add_option("--role", result_.role, "Reference that points to the source")
-        ->type_name("NAME")
-        ->check(notEmpty());
-    if (filters == Filters::Associators) {
-        operation
-            .add_option("--result-role", result_.resultRole, "Reference that points to the far end")
-            ->type_name("NAME")
-            ->check(notEmpty());
-    }
-}
-
-void Parser::addQuery() {
-    CLI::App* query = addWord("xq", "Execute a query", Operation::ExecQuery);
-    query->add_option("QUERY", result_.query, "Text of the query")
-        ->required()
-        ->check(notEmpty())
-        ->type_name("");
-    query->add_option("--lang", result_.queryLanguage, "Language of the query")
-        ->type_name("NAME")
-        ->check(notEmpty())
-        ->capture_default_str();
-    query->add_option("--namespace", result_.nameSpace, "Namespace of the query")
-        ->type_name("NAME")
-        ->check(notEmpty())
+    addText(to, "--namespace", "NAME", result_.nameSpace,
+            takes == Takes::Query ? "Namespace of the query" : "Namespace of the classes")
         ->capture_default_str();
 }
 
-void Parser::addTree() {
-    CLI::App* tree =
-        app_.add_subcommand("tree", "Draw the host, what is installed and running on it");
-    tree->fallthrough();
-    tree->group("Pictures");
-    tree->callback([this] { result_.tree = true; });
-    tree->add_option("--namespace", result_.nameSpace, "Namespace of the classes")
-        ->type_name("NAME")
-        ->check(notEmpty())
-        ->capture_default_str();
+void Parser::addFilters(CLI::App& to, Filters which) {
+    if (which == Filters::None) return;
+    for (const Filter& filter : filters) {
+        const char* help =
+            which == Filters::Associators ? filter.helpOnAssociators : filter.helpOnReferences;
+        if (help != nullptr) addText(to, filter.name, filter.typeName, result_.*filter.value, help);
+    }
 }
 
 void Parser::collectProperties() {
-    if (!propertyOption_ && propertyArguments_.empty()) {
-        return;
-    }
+    if (!propertyOption_ && propertyArguments_.empty()) return;
     result_.properties.emplace();
-    for (const std::string& argument : propertyArguments_) {
-        addNames(argument, *result_.properties);
-    }
+    for (const std::string& argument : propertyArguments_) addNames(argument, *result_.properties);
     addNames(propertyOption_.value_or(std::string()), *result_.properties);
 }
 

@@ -1,11 +1,12 @@
-#pragma once
+#ifndef HOST_CLI_COMMAND_LINE_H
+#define HOST_CLI_COMMAND_LINE_H
 
 #include <optional>
 #include <string>
 #include <vector>
 
 #include "host/broker/Operation.h"
-#include "host/cli/PathText.h"
+#include "host/cli/PathParser.h"
 #include "host/cli/Printer.h"
 
 namespace cmpihost {
@@ -60,3 +61,5 @@ struct ParsedCommandLine {
 ParsedCommandLine parseCommandLine(int argumentCount, const char* const* arguments);
 
 }  // namespace cmpihost
+
+#endif

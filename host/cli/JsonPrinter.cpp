@@ -1,10 +1,9 @@
 #include <charconv>
 #include <nlohmann/json.hpp>
 
-#include "host/cli/PathText.h"
+#include "host/cli/PathParser.h"
 #include "host/cli/Printer.h"
-#include "host/cli/ReadableText.h"
-#include "host/cli/ValueKind.h"
+#include "host/cli/ValueText.h"
 
 namespace cmpihost {
 
@@ -32,33 +31,31 @@ Json propertiesJson(const InstanceValue& instance) {
 
 Json listJson(const std::vector<Value>& elements) {
     Json list = Json::array();
-    for (const Value& element : elements) {
-        list.push_back(valueJson(element));
-    }
+    for (const Value& element : elements) list.push_back(valueJson(element));
     return list;
 }
 
 Json valueJson(const Value& value) {
-    switch (kindOf(value)) {
-        case ValueKind::Unsigned:
+    switch (categoryOf(value)) {
+        case TypeCategory::Unsigned:
             return value.unsignedInteger();
-        case ValueKind::Signed:
+        case TypeCategory::Signed:
             return value.signedInteger();
-        case ValueKind::Boolean:
+        case TypeCategory::Boolean:
             return value.boolean();
-        case ValueKind::Real:
+        case TypeCategory::Real:
             return shownReal(value);
-        case ValueKind::Character:
+        case TypeCategory::Character:
             return characterText(value.unsignedInteger());
-        case ValueKind::Text:
-        case ValueKind::DateTime:
+        case TypeCategory::Text:
+        case TypeCategory::DateTime:
             return value.text();
-        case ValueKind::Reference:
+        case TypeCategory::Reference:
             return writePath(value.reference());
-        case ValueKind::Instance:
+        case TypeCategory::Instance:
             return {{"class", value.instance().path.className},
                     {"properties", propertiesJson(value.instance())}};
-        case ValueKind::Array:
+        case TypeCategory::Array:
             return listJson(value.elements());
         default:
             return nullptr;
@@ -85,9 +82,7 @@ class JsonPrinter final : public Printer {
 
     void print(const std::vector<ObjectPathValue>& paths) override {
         Json list = Json::array();
-        for (const ObjectPathValue& path : paths) {
-            list.push_back(pathJson(path));
-        }
+        for (const ObjectPathValue& path : paths) list.push_back(pathJson(path));
         write(list);
     }
 

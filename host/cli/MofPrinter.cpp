@@ -1,11 +1,10 @@
 #include <algorithm>
 #include <cmath>
 
-#include "host/cli/MofText.h"
-#include "host/cli/PathText.h"
+#include "host/cli/PathParser.h"
 #include "host/cli/Printer.h"
-#include "host/cli/ReadableText.h"
-#include "host/cli/ValueKind.h"
+#include "host/cli/ValueText.h"
+#include "host/mof/MofLexer.h"
 
 namespace cmpihost {
 
@@ -13,9 +12,7 @@ namespace {
 
 /// A real constant of MOF always has a point with a digit after it.
 std::string mofReal(const Value& value) {
-    if (!std::isfinite(value.real())) {
-        return "NULL";
-    }
+    if (!std::isfinite(value.real())) return "NULL";
     std::string text = realText(value.real(), value.type());
     if (text.find('.') == std::string::npos) {
         text.insert(std::min(text.find('e'), text.size()), ".0");
@@ -42,24 +39,24 @@ std::string instanceText(const InstanceValue& instance) {
 }
 
 std::string valueText(const Value& value) {
-    switch (kindOf(value)) {
-        case ValueKind::Unsigned:
-        case ValueKind::Signed:
+    switch (categoryOf(value)) {
+        case TypeCategory::Unsigned:
+        case TypeCategory::Signed:
             return value.toText();
-        case ValueKind::Boolean:
+        case TypeCategory::Boolean:
             return value.boolean() ? "TRUE" : "FALSE";
-        case ValueKind::Real:
+        case TypeCategory::Real:
             return mofReal(value);
-        case ValueKind::Character:
-            return mofCharacter(static_cast<std::uint32_t>(value.unsignedInteger()));
-        case ValueKind::Text:
-        case ValueKind::DateTime:
-            return mofString(value.text());
-        case ValueKind::Reference:
-            return mofString(writePath(value.reference()));
-        case ValueKind::Instance:
-            return mofString(instanceText(value.instance()));
-        case ValueKind::Array:
+        case TypeCategory::Character:
+            return mof::characterLiteral(static_cast<char32_t>(value.unsignedInteger()));
+        case TypeCategory::Text:
+        case TypeCategory::DateTime:
+            return mof::stringLiteral(value.text());
+        case TypeCategory::Reference:
+            return mof::stringLiteral(writePath(value.reference()));
+        case TypeCategory::Instance:
+            return mof::stringLiteral(instanceText(value.instance()));
+        case TypeCategory::Array:
             return listText(value.elements());
         default:
             return "NULL";

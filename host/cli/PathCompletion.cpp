@@ -1,10 +1,13 @@
+// A path that lacks keys is completed by asking for the names of all instances, as a user would do
+// by hand; a path that is merely wrong goes to the provider as it is, which knows best what to
+// answer.
 #include "host/cli/PathCompletion.h"
 
 #include <algorithm>
 
-#include "host/cli/PathText.h"
-#include "host/cli/TerminalText.h"
-#include "host/cli/UsageError.h"
+#include "base/Ascii.h"
+#include "base/Utf8.h"
+#include "host/cli/PathParser.h"
 
 namespace cmpihost {
 
@@ -28,8 +31,9 @@ bool isAboutOneInstance(Operation operation) {
 
 /// Names of systems compare without case, as the provider compares them; other texts do not.
 bool sameText(const std::string& key, const std::string& given, const std::string& other) {
-    const bool withoutCase = equalNames(key, "CSName") || equalNames(key, "Name");
-    return withoutCase ? equalNames(given, other) : given == other;
+    const bool withoutCase =
+        base::equalsIgnoreCase(key, "CSName") || base::equalsIgnoreCase(key, "Name");
+    return withoutCase ? base::equalsIgnoreCase(given, other) : given == other;
 }
 
 /// A number in a path has a type of its own, whatever the class declares.
@@ -48,20 +52,16 @@ bool hasKeys(const ObjectPathValue& name, const std::vector<KeyBinding>& given) 
 std::string list(const std::vector<ObjectPathValue>& paths) {
     std::string text;
     for (std::size_t index = 0; index < std::min(paths.size(), listed); ++index) {
-        text += "\n  " + terminalText(writePath(paths[index]));
+        text += "\n  " + base::escapeForTerminal(writePath(paths[index]));
     }
-    if (paths.size() > listed) {
-        text += "\n  and " + std::to_string(paths.size() - listed) + " more";
-    }
+    if (paths.size() > listed) text += "\n  and " + std::to_string(paths.size() - listed) + " more";
     return text;
 }
 
 std::string complaint(const std::string& className, const std::vector<ObjectPathValue>& names,
                       const std::vector<ObjectPathValue>& matching) {
     const std::string start = "the path lacks keys, and ";
-    if (names.empty()) {
-        return start + "there is no instance of " + className;
-    }
+    if (names.empty()) return start + "there is no instance of " + className;
     if (matching.empty()) {
         return start + "no instance of " + className +
                " has those that it gives; the instances are:" + list(names);
@@ -74,9 +74,7 @@ std::string complaint(const std::string& className, const std::vector<ObjectPath
 
 bool lacksKeys(const OperationRequest& request, const ClassCatalogue& catalogue) {
     const ClassDeclaration* declaration = catalogue.find(request.path.className);
-    if (!isAboutOneInstance(request.operation) || declaration == nullptr) {
-        return false;
-    }
+    if (!isAboutOneInstance(request.operation) || declaration == nullptr) return false;
     const auto isLacking = [&](const PropertyDeclaration& property) {
         return property.key && request.path.key(property.name) == nullptr;
     };
@@ -103,15 +101,11 @@ ObjectPathValue completedPath(const ObjectPathValue& path,
     std::vector<ObjectPathValue> matching;
     std::copy_if(names.begin(), names.end(), std::back_inserter(matching),
                  [&](const ObjectPathValue& name) { return hasKeys(name, path.keys); });
-    if (matching.size() != 1) {
-        throw UsageError(complaint(path.className, names, matching));
-    }
+    if (matching.size() != 1) throw UsageError(complaint(path.className, names, matching));
     ObjectPathValue result = std::move(matching.front());
     result.nameSpace = path.nameSpace;
     for (KeyBinding& key : result.keys) {
-        if (const Value* given = path.key(key.name)) {
-            key.value = *given;
-        }
+        if (const Value* given = path.key(key.name)) key.value = *given;
     }
     return result;
 }

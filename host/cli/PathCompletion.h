@@ -1,4 +1,5 @@
-#pragma once
+#ifndef HOST_CLI_PATH_COMPLETION_H
+#define HOST_CLI_PATH_COMPLETION_H
 
 #include <vector>
 
@@ -23,3 +24,5 @@ ObjectPathValue completedPath(const ObjectPathValue& path,
                               const std::vector<ObjectPathValue>& names);
 
 }  // namespace cmpihost
+
+#endif

@@ -1,26 +1,25 @@
+// Reads object paths by hand, character by character, because a complaint is worth as much as a
+// result: it points at the character where the path as the user wrote it goes wrong, also within
+// references in quotes.
+#include "host/cli/PathParser.h"
+
 #include <charconv>
+#include <unordered_set>
 #include <utility>
 
-#include "host/cli/PathText.h"
-#include "host/cli/TerminalText.h"
-#include "host/mof/Names.h"
-#include "host/mof/Utf8.h"
+#include "base/Ascii.h"
+#include "base/Utf8.h"
 
 namespace cmpihost {
 
 namespace {
 
-bool isDigit(char c) {
-    return c >= '0' && c <= '9';
-}
-
 bool isNameStart(char c) {
-    return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_' ||
-           static_cast<unsigned char>(c) >= 0x80;
+    return base::isAlpha(c) || c == '_' || static_cast<unsigned char>(c) >= 0x80;
 }
 
 bool isNamePart(char c) {
-    return isNameStart(c) || isDigit(c);
+    return isNameStart(c) || base::isDigit(c);
 }
 
 bool isNamespacePart(char c) {
@@ -36,9 +35,7 @@ struct Source {
 
 Source wholeText(const std::string& text) {
     Source source{text, {}};
-    for (std::size_t offset = 0; offset <= text.size(); ++offset) {
-        source.origins.push_back(offset);
-    }
+    for (std::size_t offset = 0; offset <= text.size(); ++offset) source.origins.push_back(offset);
     return source;
 }
 
@@ -86,16 +83,14 @@ bool PathParser::accept(char c) {
 
 std::string PathParser::takeWhile(bool (*belongs)(char)) {
     const std::size_t start = offset_;
-    while (!atEnd() && belongs(peek())) {
-        ++offset_;
-    }
+    while (!atEnd() && belongs(peek())) ++offset_;
     return source_.text.substr(start, offset_ - start);
 }
 
 void PathParser::refuseServerAddress() const {
     for (const char* scheme : {"http://", "https://"}) {
         const std::string start = source_.text.substr(0, std::string(scheme).size());
-        if (equalNames(start, scheme)) {
+        if (base::equalsIgnoreCase(start, scheme)) {
             fail(0, std::string("a path begins with its namespace or class: leave out '") + scheme +
                         "...', the request stays on this machine");
         }
@@ -103,17 +98,11 @@ void PathParser::refuseServerAddress() const {
 }
 
 std::string PathParser::host() {
-    if (source_.text.compare(0, 2, "//") != 0) {
-        return {};
-    }
+    if (source_.text.compare(0, 2, "//") != 0) return {};
     offset_ = 2;
     std::string name = takeWhile([](char c) { return c != '/' && c != '"'; });
-    if (name.empty()) {
-        fail(2, "expected the name of a host after '//'");
-    }
-    if (!accept('/')) {
-        fail(offset_, "expected '/' and a namespace after the host '" + name + "'");
-    }
+    if (name.empty()) fail(2, "expected the name of a host after '//'");
+    if (!accept('/')) fail(offset_, "expected '/' and a namespace after the host '" + name + "'");
     return name;
 }
 
@@ -122,16 +111,12 @@ std::string PathParser::nameSpace(const std::string& word, std::size_t start) co
     if (doubled != std::string::npos) {
         fail(start + doubled, "expected a name before '/' in the namespace");
     }
-    if (word.back() == '/') {
-        fail(start + word.size(), "expected a name after '/' in the namespace");
-    }
+    if (word.back() == '/') fail(start + word.size(), "expected a name after '/' in the namespace");
     return word;
 }
 
 std::string PathParser::className(const std::string& word, std::size_t start) const {
-    if (word.empty() || !isNameStart(word.front())) {
-        fail(start, "expected the name of a class");
-    }
+    if (word.empty() || !isNameStart(word.front())) fail(start, "expected the name of a class");
     if (word.find('/') != std::string::npos) {
         fail(start + word.size(),
              "expected ':' and the name of a class after the namespace '" + word + "'");
@@ -167,9 +152,7 @@ ObjectPathValue PathParser::parse(const std::string& outerNamespace) {
 
 std::string PathParser::parseNamespace() {
     const std::string word = takeWhile(isNamespacePart);
-    if (word.empty()) {
-        fail(0, "expected the name of a namespace");
-    }
+    if (word.empty()) fail(0, "expected the name of a namespace");
     if (!atEnd()) {
         fail(offset_, "the name of a namespace holds letters, digits, '_', '-' and '/' only");
     }
@@ -179,11 +162,11 @@ std::string PathParser::parseNamespace() {
 void PathParser::keys(ObjectPathValue& path) {
     const ClassDeclaration* declaration =
         catalogue_ == nullptr ? nullptr : catalogue_->find(path.className);
-    NameSet seen;
+    std::unordered_set<std::string> seen;
     do {
         const std::size_t start = offset_;
         path.keys.push_back(key(declaration));
-        if (!seen.add(path.keys.back().name)) {
+        if (!seen.insert(base::toLower(path.keys.back().name)).second) {
             fail(start, "the key '" + path.keys.back().name + "' stands twice");
         }
     } while (accept(','));
@@ -193,29 +176,21 @@ void PathParser::keys(ObjectPathValue& path) {
 }
 
 KeyBinding PathParser::key(const ClassDeclaration* declaration) {
-    if (!isNameStart(peek())) {
-        fail(offset_, "expected the name of a key");
-    }
+    if (!isNameStart(peek())) fail(offset_, "expected the name of a key");
     const std::string name = takeWhile(isNamePart);
-    if (!accept('=')) {
-        fail(offset_, "expected '=' after the key '" + name + "'");
-    }
+    if (!accept('=')) fail(offset_, "expected '=' after the key '" + name + "'");
     const PropertyDeclaration* property =
         declaration == nullptr ? nullptr : declaration->property(name);
     return {name, value(property == nullptr ? CMPI_string : property->type, name)};
 }
 
 Value PathParser::value(CMPIType declared, const std::string& keyName) {
-    if (peek() == '"') {
-        return quotedValue(declared);
-    }
-    if (isDigit(peek()) || peek() == '-' || peek() == '+') {
-        return number();
-    }
+    if (peek() == '"') return quotedValue(declared);
+    if (base::isDigit(peek()) || peek() == '-' || peek() == '+') return number();
     const std::size_t start = offset_;
     const std::string word = takeWhile(isNamePart);
-    if (equalNames(word, "TRUE") || equalNames(word, "FALSE")) {
-        return Value::fromBoolean(equalNames(word, "TRUE"));
+    if (base::equalsIgnoreCase(word, "TRUE") || base::equalsIgnoreCase(word, "FALSE")) {
+        return Value::fromBoolean(base::equalsIgnoreCase(word, "TRUE"));
     }
     fail(start, "expected the value of '" + keyName +
                     "': a text in quotes, an integer, TRUE or FALSE (a shell keeps the quotes "
@@ -240,9 +215,7 @@ Source PathParser::quotedText() {
         if (accept('\\') && !atEnd() && peek() != '"' && peek() != '\\') {
             fail(at, "in a text '\\' stands before '\"' or '\\' only");
         }
-        if (atEnd()) {
-            fail(start, "the text that begins here is not closed by '\"'");
-        }
+        if (atEnd()) fail(start, "the text that begins here is not closed by '\"'");
         content.text += peek();
         content.origins.push_back(source_.origins[at]);
         ++offset_;
@@ -262,32 +235,26 @@ Value PathParser::number() {
     const std::size_t start = offset_;
     const bool negative = peek() == '-';
     offset_ += negative || peek() == '+' ? 1 : 0;
-    const std::string digits = takeWhile(isDigit);
-    if (digits.empty() || isNamePart(peek())) {
-        fail(offset_, "expected the digits of an integer");
-    }
+    const std::string digits = takeWhile(base::isDigit);
+    if (digits.empty() || isNamePart(peek())) fail(offset_, "expected the digits of an integer");
     std::int64_t whenNegative{};
     std::uint64_t whenPositive{};
     const bool read =
         negative ? readWhole("-" + digits, whenNegative) : readWhole(digits, whenPositive);
-    if (!read) {
-        fail(start, "the integer does not fit 64 bits");
-    }
+    if (!read) fail(start, "the integer does not fit 64 bits");
     return whenNegative < 0 ? Value::fromSigned(whenNegative) : Value::fromUnsigned(whenPositive);
 }
 
 std::string withCaret(const std::string& text, std::size_t offset, const std::string& complaint) {
-    const std::size_t column = countCharacters(terminalText(text.substr(0, offset)));
-    return terminalText(complaint) + "\n  " + terminalText(text) + "\n  " +
+    const std::size_t column = base::countUtf8(base::escapeForTerminal(text.substr(0, offset)));
+    return base::escapeForTerminal(complaint) + "\n  " + base::escapeForTerminal(text) + "\n  " +
            std::string(column, ' ') + "^";
 }
 
 }  // namespace
 
 PathError::PathError(const std::string& text, std::size_t offset, const std::string& complaint)
-    : std::runtime_error(withCaret(text, offset, complaint)),
-      offset_(offset),
-      complaint_(complaint) {}
+    : UsageError(withCaret(text, offset, complaint)), offset_(offset), complaint_(complaint) {}
 
 ObjectPathValue parsePath(const std::string& text, const ClassCatalogue* catalogue) {
     return PathParser(text, wholeText(text), catalogue).parse(defaultNamespace);

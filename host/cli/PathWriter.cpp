@@ -1,6 +1,5 @@
-#include "host/cli/PathText.h"
-#include "host/cli/ReadableText.h"
-#include "host/cli/ValueKind.h"
+#include "host/cli/PathParser.h"
+#include "host/cli/ValueText.h"
 
 namespace cmpihost {
 
@@ -9,28 +8,26 @@ namespace {
 std::string quoted(const std::string& text) {
     std::string result = "\"";
     for (const char c : text) {
-        if (c == '"' || c == '\\') {
-            result += '\\';
-        }
+        if (c == '"' || c == '\\') result += '\\';
         result += c;
     }
     return result + '"';
 }
 
 std::string keyValue(const Value& value) {
-    switch (kindOf(value)) {
-        case ValueKind::Null:
+    switch (categoryOf(value)) {
+        case TypeCategory::Null:
             return "\"\"";
-        case ValueKind::Boolean:
+        case TypeCategory::Boolean:
             return value.boolean() ? "TRUE" : "FALSE";
-        case ValueKind::Unsigned:
-        case ValueKind::Signed:
+        case TypeCategory::Unsigned:
+        case TypeCategory::Signed:
             return value.toText();
-        case ValueKind::Real:
+        case TypeCategory::Real:
             return realText(value.real(), value.type());
-        case ValueKind::Reference:
+        case TypeCategory::Reference:
             return quoted(writePath(value.reference()));
-        case ValueKind::Character:
+        case TypeCategory::Character:
             return quoted(characterText(value.unsignedInteger()));
         default:
             return quoted(value.toText());
@@ -41,12 +38,8 @@ std::string keyValue(const Value& value) {
 
 std::string writePath(const ObjectPathValue& path) {
     std::string result;
-    if (!path.hostName.empty()) {
-        result += "//" + path.hostName + "/";
-    }
-    if (!path.nameSpace.empty()) {
-        result += path.nameSpace + ":";
-    }
+    if (!path.hostName.empty()) result += "//" + path.hostName + "/";
+    if (!path.nameSpace.empty()) result += path.nameSpace + ":";
     result += path.className;
     char separator = '.';
     for (const KeyBinding& key : path.keys) {

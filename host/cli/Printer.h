@@ -1,4 +1,5 @@
-#pragma once
+#ifndef HOST_CLI_PRINTER_H
+#define HOST_CLI_PRINTER_H
 
 #include <memory>
 #include <ostream>
@@ -39,3 +40,5 @@ std::unique_ptr<Printer> makeJsonPrinter(std::ostream& stream);
 std::unique_ptr<Printer> makePrinter(Format format, std::ostream& stream, const Schema& schema);
 
 }  // namespace cmpihost
+
+#endif

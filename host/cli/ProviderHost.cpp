@@ -1,7 +1,16 @@
+// The provider of the computer system is loaded and routed before the provider that is asked: that
+// one may make its first up-call while it is being loaded.
 #include "host/cli/ProviderHost.h"
 
+#include <sys/mman.h>
 #include <sys/utsname.h>
+#include <unistd.h>
 
+#include <cerrno>
+#include <cstdlib>
+#include <system_error>
+
+#include "base/Ascii.h"
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/LibraryService.h"
 
@@ -21,6 +30,15 @@ class ComputerSystems {
 };
 
 namespace {
+
+constexpr const char* logVariable = "ZBLOG_CONF";
+
+/// The log channel alone: the trace channel carries the same records once more.
+constexpr std::string_view logConfiguration =
+    "log.sink = stderr\n"
+    "log.level = 4000\n"
+    "log.records = all\n"
+    "trace.sink = off\n";
 
 std::string nodeName() {
     utsname names{};
@@ -111,6 +129,21 @@ OperationResult guarded(Call call) {
 
 }  // namespace
 
+ScopedStderrLog::ScopedStderrLog() : configuration_(::memfd_create("cmpihost-log", MFD_CLOEXEC)) {
+    const int file = configuration_.number();
+    const bool written = configuration_.isOpen() &&
+                         ::write(file, logConfiguration.data(), logConfiguration.size()) ==
+                             static_cast<ssize_t>(logConfiguration.size());
+    const std::string name = "/proc/self/fd/" + std::to_string(file);
+    if (!written || ::setenv(logVariable, name.c_str(), 1) != 0) {
+        throw std::system_error(errno, std::generic_category(), "the records cannot be shown");
+    }
+}
+
+ScopedStderrLog::~ScopedStderrLog() {
+    ::unsetenv(logVariable);
+}
+
 ProviderHost::ProviderHost(const ProviderSource& provider, const ClassCatalogue& catalogue,
                            const ComputerSystemSource& computerSystems)
     : broker_(&catalogue),
@@ -125,7 +158,7 @@ OperationResult ProviderHost::run(const OperationRequest& request) {
 
 OperationResult ProviderHost::ask(const OperationRequest& request) {
     if (request.assocClass ||
-        !equalNames(request.path.className, ComputerSystemService::className)) {
+        !base::equalsIgnoreCase(request.path.className, ComputerSystemService::className)) {
         return run(request);
     }
     return guarded([&] { return computerSystems_->run(broker_, request); });
@@ -140,9 +173,7 @@ std::vector<std::string> ProviderHost::unload() {
         escapes = true;
     }
     std::vector<std::string> caught = broker_.takeViolations();
-    if (escapes) {
-        caught.push_back("an exception left cleanup");
-    }
+    if (escapes) caught.push_back("an exception left cleanup");
     return caught;
 }
 

@@ -1,16 +1,100 @@
+// Values are read as MOF writes them and take the type that the class declares, because a provider
+// is entitled to get from the host what an object manager would hand it.
 #include "host/cli/RequestBuilder.h"
 
 #include <algorithm>
+#include <unordered_set>
 
-#include "host/cli/AssignedValue.h"
-#include "host/cli/PathText.h"
-#include "host/cli/TerminalText.h"
-#include "host/cli/UsageError.h"
-#include "host/mof/Names.h"
+#include "base/Ascii.h"
+#include "base/Utf8.h"
+#include "host/broker/DateTimeText.h"
+#include "host/cli/PathParser.h"
+#include "host/mof/MofParser.h"
 
 namespace cmpihost {
 
 namespace {
+
+/// Names that CIM compares without case, in lower case.
+using NameSet = std::unordered_set<std::string>;
+
+/// number fits the type: an unsigned one takes none but "-0" of the negative numbers.
+template <class Number>
+Value numberOf(Number number, CMPIType type) {
+    if (type == CMPI_real32 || type == CMPI_real64)
+        return Value::fromReal(static_cast<double>(number), type);
+    if ((type & CMPI_SINT) == CMPI_SINT)
+        return Value::fromSigned(static_cast<std::int64_t>(number), type);
+    return Value::fromUnsigned(static_cast<std::uint64_t>(number), type);
+}
+
+/// scalar fits the type of the property.
+Value typed(const mof::Scalar& scalar, CMPIType type, const ClassCatalogue* catalogue) {
+    if (const auto* boolean = std::get_if<bool>(&scalar)) return Value::fromBoolean(*boolean);
+    if (const auto* number = std::get_if<std::uint64_t>(&scalar)) return numberOf(*number, type);
+    if (const auto* number = std::get_if<std::int64_t>(&scalar)) return numberOf(*number, type);
+    if (const auto* real = std::get_if<double>(&scalar)) return Value::fromReal(*real, type);
+    if (const auto* character = std::get_if<mof::Character>(&scalar))
+        return Value::fromUnsigned(character->code, CMPI_char16);
+    if (const auto* text = std::get_if<std::string>(&scalar)) {
+        return type == CMPI_ref ? Value::fromReference(parsePath(*text, catalogue))
+                                : Value::fromText(*text, type);
+    }
+    return Value::null(type);
+}
+
+bool isWrittenBare(const mof::Feature& property) {
+    return property.type == mof::Type::String || property.type == mof::Type::DateTime ||
+           property.type == mof::Type::Reference;
+}
+
+/// MOF takes any text for a datetime.
+bool isDateTimeOrNull(const mof::Scalar& scalar) {
+    const auto* text = std::get_if<std::string>(&scalar);
+    return text == nullptr || parseDateTime(*text).has_value();
+}
+
+/// A single text without quotes, as one gives it to a scalar: "{" begins a list instead.
+mof::Initializer constantOrText(const std::string& text, const mof::Feature& property) {
+    const bool list = property.array && text.substr(0, 1) == "{";
+    const bool absent =
+        property.type == mof::Type::DateTime && base::equalsIgnoreCase(text, "NULL");
+    const bool bare = isWrittenBare(property) && !list && !absent;
+    return bare ? mof::Initializer{false, {text}} : mof::parseInitializer(text, property.name);
+}
+
+/// The value that a user gives to a property as text, in the type that the class declares. Texts
+/// and datetimes are taken as they stand, a reference is a path, every other value and the list of
+/// an array (in braces) is a constant as MOF writes it, NULL included. A single constant given to
+/// an array is a list of one.
+Value assignedValue(const std::string& text, const mof::Feature& property,
+                    const ClassCatalogue* catalogue) {
+    const auto refuse = [&](const std::string& why) {
+        throw UsageError("'" + base::escapeForTerminal(text) + "' is " + why +
+                         " for the property '" + property.name + "'");
+    };
+    mof::Initializer value;
+    try {
+        value = constantOrText(text, property);
+    } catch (const mof::MofError& error) {
+        throw UsageError("the value of '" + property.name +
+                         "': " + base::escapeForTerminal(error.complaint()));
+    }
+    if (value.array && !property.array) refuse("a list, no single value,");
+    const CMPIType type = cmpiType(property);
+    const auto elementType = static_cast<CMPIType>(type & ~CMPI_ARRAY);
+    std::vector<Value> elements;
+    for (const mof::Scalar& item : value.items) {
+        const bool wrongDate = property.type == mof::Type::DateTime && !isDateTimeOrNull(item);
+        if (wrongDate || !mof::fits(item, property.type)) {
+            refuse(std::string("no value of type ") + mof::nameOf(property.type));
+        }
+        elements.push_back(typed(item, elementType, catalogue));
+    }
+    const bool nullArray = property.array && !value.array && elements.front().isNull();
+    if (nullArray) return Value::null(type);
+    return property.array ? Value::fromArray(elementType, std::move(elements)) : elements.front();
+}
 
 struct Assignment {
     std::string name;
@@ -20,20 +104,19 @@ struct Assignment {
 Assignment split(const std::string& assignment) {
     const std::size_t sign = assignment.find('=');
     if (sign == 0 || sign == std::string::npos) {
-        throw UsageError("expected NAME=VALUE, found '" + terminalText(assignment) + "'");
+        throw UsageError("expected NAME=VALUE, found '" + base::escapeForTerminal(assignment) +
+                         "'");
     }
     return {assignment.substr(0, sign), assignment.substr(sign + 1)};
 }
 
 PropertyValue property(const Assignment& assignment, const std::string& className,
                        const Schema& schema, const ClassCatalogue& catalogue) {
-    if (schema.find(className) == nullptr) {
-        return {assignment.name, Value(assignment.text)};
-    }
+    if (schema.find(className) == nullptr) return {assignment.name, Value(assignment.text)};
     const mof::Feature* declared = schema.findProperty(className, assignment.name);
     if (declared == nullptr) {
         throw UsageError("the class '" + className + "' has no property '" +
-                         terminalText(assignment.name) + "'");
+                         base::escapeForTerminal(assignment.name) + "'");
     }
     return {declared->name, assignedValue(assignment.text, *declared, &catalogue)};
 }
@@ -45,18 +128,17 @@ InstanceValue instance(const CommandLine& commandLine, const ObjectPathValue& pa
     NameSet seen;
     for (const std::string& text : commandLine.assignments) {
         PropertyValue value = property(split(text), path.className, schema, catalogue);
-        if (!seen.add(value.name)) {
-            throw UsageError("the property '" + terminalText(value.name) + "' stands twice");
+        if (!seen.insert(base::toLower(value.name)).second) {
+            throw UsageError("the property '" + base::escapeForTerminal(value.name) +
+                             "' stands twice");
         }
         const bool newKey = schema.isKey(path.className, value.name) &&
                             result.path.key(value.name) == nullptr && !value.value.isNull();
-        if (newKey) {
-            result.path.keys.push_back({value.name, value.value});
-        }
+        if (newKey) result.path.keys.push_back({value.name, value.value});
         result.properties.push_back(std::move(value));
     }
     for (const KeyBinding& key : path.keys) {
-        if (seen.add(key.name)) {
+        if (seen.insert(base::toLower(key.name)).second) {
             result.properties.push_back({key.name, key.value});
         }
     }
@@ -70,10 +152,8 @@ std::string selectedClass(const std::string& query) {
     for (std::size_t start = query.find_first_not_of(blanks); start != std::string::npos;) {
         const std::size_t end = query.find_first_of(blanks, start);
         const std::string word = query.substr(start, end - start);
-        if (afterFrom) {
-            return word;
-        }
-        afterFrom = equalNames(word, "FROM");
+        if (afterFrom) return word;
+        afterFrom = base::equalsIgnoreCase(word, "FROM");
         start = query.find_first_not_of(blanks, end);
     }
     return {};
@@ -111,23 +191,17 @@ OperationRequest buildRequest(const CommandLine& commandLine, const Schema& sche
         request.instance = instance(commandLine, request.path, schema, catalogue);
         request.path = request.instance.path;
     }
-    if (modifies) {
-        request.properties = assignedNames(request.instance, commandLine);
-    }
+    if (modifies) request.properties = assignedNames(request.instance, commandLine);
     return request;
 }
 
 InstanceValue withoutUnlisted(InstanceValue instance, const std::vector<std::string>& list,
                               const Schema& schema) {
     NameSet kept;
-    for (const std::string& name : list) {
-        kept.add(name);
-    }
-    for (const KeyBinding& key : instance.path.keys) {
-        kept.add(key.name);
-    }
+    for (const std::string& name : list) kept.insert(base::toLower(name));
+    for (const KeyBinding& key : instance.path.keys) kept.insert(base::toLower(key.name));
     const auto unlisted = [&](const PropertyValue& property) {
-        return !kept.contains(property.name) &&
+        return kept.count(base::toLower(property.name)) == 0 &&
                !schema.isKey(instance.path.className, property.name);
     };
     auto& properties = instance.properties;

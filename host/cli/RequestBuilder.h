@@ -1,4 +1,5 @@
-#pragma once
+#ifndef HOST_CLI_REQUEST_BUILDER_H
+#define HOST_CLI_REQUEST_BUILDER_H
 
 #include "host/broker/ClassCatalogue.h"
 #include "host/broker/Operation.h"
@@ -18,3 +19,5 @@ InstanceValue withoutUnlisted(InstanceValue instance, const std::vector<std::str
                               const Schema& schema);
 
 }  // namespace cmpihost
+
+#endif

@@ -1,21 +1,20 @@
+// One run is one process: everything is loaded for a single request and unloaded before the exit,
+// so that what the broker catches while the provider cleans up is told too.
 #include "host/cli/Run.h"
 
 #include <optional>
 #include <stdexcept>
 #include <type_traits>
 
-#include "host/cli/Notes.h"
+#include "base/Utf8.h"
+#include "host/cli/Diagnostics.h"
+#include "host/cli/InstallPaths.h"
 #include "host/cli/PathCompletion.h"
-#include "host/cli/PathText.h"
-#include "host/cli/Places.h"
+#include "host/cli/PathParser.h"
 #include "host/cli/ProviderHost.h"
-#include "host/cli/RecordsOnStderr.h"
 #include "host/cli/RequestBuilder.h"
-#include "host/cli/StatusText.h"
-#include "host/cli/TerminalText.h"
 #include "host/cli/Tree.h"
-#include "host/cli/UsageError.h"
-#include "host/mof/SchemaCatalogue.h"
+#include "host/mof/Schema.h"
 
 namespace cmpihost {
 
@@ -28,7 +27,7 @@ Schema loadSchema(const std::string& given, const fs::path& programFolder) {
         return Schema::load(given.empty() ? schemaFolder(programFolder) : fs::path(given));
     } catch (const std::runtime_error& error) {
         const char* hint = given.empty() ? " (--schema DIR names another folder)" : "";
-        throw UsageError(terminalText(error.what()) + hint);
+        throw UsageError(base::escapeForTerminal(error.what()) + hint);
     }
 }
 
@@ -46,16 +45,14 @@ class NoProvider : public std::runtime_error {
 };
 
 std::string providerFile(const CommandLine& commandLine, const fs::path& programFolder) {
-    if (!commandLine.provider.empty()) {
-        return loadable(commandLine.provider);
-    }
+    if (!commandLine.provider.empty()) return loadable(commandLine.provider);
     const Library wanted = commandLine.bare ? Library::Provider : Library::Facade;
     const fs::path found = findLibrary(wanted, programFolder);
     if (found.empty()) {
         std::string text = std::string("no library of the ") +
                            (commandLine.bare ? "provider" : "facade") + " was found; looked for";
         for (const fs::path& candidate : candidates(wanted, programFolder)) {
-            text += "\n  " + terminalText(candidate.string());
+            text += "\n  " + base::escapeForTerminal(candidate.string());
         }
         throw NoProvider(text + "\n(--provider FILE names one" +
                          (commandLine.bare ? ", without --bare)" : ")"));
@@ -75,9 +72,7 @@ bool yieldsNothing(Operation operation) {
 
 void printResult(const OperationRequest& request, OperationResult result, const Schema& schema,
                  Printer& printer) {
-    if (yieldsNothing(request.operation)) {
-        return;
-    }
+    if (yieldsNothing(request.operation)) return;
     if (yieldsPaths(request.operation)) {
         printer.print(result.paths);
         return;
@@ -102,9 +97,7 @@ class Run {
         } catch (const NoProvider& error) {
             return failed(error.what(), exitNotLoaded);
         } catch (const LoadError& error) {
-            return failed(terminalText(error.what()), exitNotLoaded);
-        } catch (const PathError& error) {
-            return failed(error.what(), exitUsage);
+            return failed(base::escapeForTerminal(error.what()), exitNotLoaded);
         } catch (const UsageError& error) {
             return failed(error.what(), exitUsage);
         }
@@ -136,11 +129,10 @@ class Run {
     /// Has the request answered once its path has all keys.
     OperationResult completed(ProviderHost& host, OperationRequest& request) {
         const OperationResult names = host.ask(namesRequest(request.path));
-        if (names.rc != CMPI_RC_OK) {
-            return names;
-        }
+        if (names.rc != CMPI_RC_OK) return names;
         request.path = completedPath(request.path, names.paths);
-        err_ << "cmpihost: completed the path: " << terminalText(writePath(request.path)) << '\n';
+        err_ << "cmpihost: completed the path: " << base::escapeForTerminal(writePath(request.path))
+             << '\n';
         return host.run(request);
     }
 
@@ -153,9 +145,7 @@ class Run {
                 };
                 return hostTree(ask, nameSpace, schema);
             });
-            for (const TreeNode& root : roots) {
-                drawTree(root, out_);
-            }
+            for (const TreeNode& root : roots) drawTree(root, out_);
         } catch (const TreeFailure& failure) {
             return failed(failureText(failure.result), exitCimStatus);
         }
@@ -168,32 +158,26 @@ class Run {
     }
 
     ExitStatus written() {
-        if (!out_.flush()) {
-            return failed("the results cannot be written", exitCimStatus);
-        }
+        if (!out_.flush()) return failed("the results cannot be written", exitCimStatus);
         return exitDone;
     }
 
     /// Has the host do its work, and tells what it caught the provider at.
     template <class Work>
     std::invoke_result_t<Work, ProviderHost&> hosted(const SchemaCatalogue& catalogue, Work work) {
-        std::optional<RecordsOnStderr> records;
-        if (commandLine_.log) {
-            records.emplace();
-        }
+        std::optional<ScopedStderrLog> log;
+        if (commandLine_.log) log.emplace();
         const std::string provider = providerFile(commandLine_, programFolder_);
         ProviderHost host({provider, providerName(provider)}, catalogue, computerSystems());
         auto result = work(host);
         for (const std::string& violation : host.unload()) {
-            err_ << "caught: " << terminalText(violation) << '\n';
+            err_ << "caught: " << base::escapeForTerminal(violation) << '\n';
         }
         return result;
     }
 
     ComputerSystemSource computerSystems() const {
-        if (commandLine_.computerSystems) {
-            return {{}, *commandLine_.computerSystems};
-        }
+        if (commandLine_.computerSystems) return {{}, *commandLine_.computerSystems};
         const std::string companion = commandLine_.companion.empty()
                                           ? findLibrary(Library::Companion, programFolder_).string()
                                           : loadable(commandLine_.companion);

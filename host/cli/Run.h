@@ -1,4 +1,5 @@
-#pragma once
+#ifndef HOST_CLI_RUN_H
+#define HOST_CLI_RUN_H
 
 #include <filesystem>
 #include <ostream>
@@ -14,3 +15,5 @@ ExitStatus run(const CommandLine& commandLine, const std::filesystem::path& prog
                std::ostream& out, std::ostream& err);
 
 }  // namespace cmpihost
+
+#endif

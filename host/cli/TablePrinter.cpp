@@ -1,12 +1,11 @@
 #include <algorithm>
 #include <limits>
 
-#include "host/cli/PathText.h"
+#include "base/Ascii.h"
+#include "base/Utf8.h"
+#include "host/cli/PathParser.h"
 #include "host/cli/Printer.h"
-#include "host/cli/ReadableText.h"
-#include "host/cli/TerminalText.h"
-#include "host/cli/ValueKind.h"
-#include "host/mof/Utf8.h"
+#include "host/cli/ValueText.h"
 
 namespace cmpihost {
 
@@ -33,26 +32,26 @@ std::string unsignedText(std::uint64_t number, const Hints& hints) {
         return signedText(static_cast<std::int64_t>(number), hints);
     }
     const bool sized = hints.kilobytes && number >= 1024;
-    return withNote(std::to_string(number), sized ? readableSize(number) : "");
+    return withNote(std::to_string(number), sized ? humanReadableSize(number) : "");
 }
 
 std::string scalarText(const Value& value, const Hints& hints) {
-    switch (kindOf(value)) {
-        case ValueKind::Unsigned:
+    switch (categoryOf(value)) {
+        case TypeCategory::Unsigned:
             return unsignedText(value.unsignedInteger(), hints);
-        case ValueKind::Signed:
+        case TypeCategory::Signed:
             return signedText(value.signedInteger(), hints);
-        case ValueKind::Boolean:
+        case TypeCategory::Boolean:
             return value.boolean() ? "TRUE" : "FALSE";
-        case ValueKind::Real:
+        case TypeCategory::Real:
             return realText(value.real(), value.type());
-        case ValueKind::Character:
+        case TypeCategory::Character:
             return characterText(value.unsignedInteger());
-        case ValueKind::DateTime:
-            return withNote(value.text(), readableDateTime(value.text()));
-        case ValueKind::Reference:
+        case TypeCategory::DateTime:
+            return withNote(value.text(), humanReadableDateTime(value.text()));
+        case TypeCategory::Reference:
             return writePath(value.reference());
-        case ValueKind::Text:
+        case TypeCategory::Text:
             return value.text().empty() ? "\"\"" : value.text();
         default:
             return value.toText();
@@ -62,12 +61,10 @@ std::string scalarText(const Value& value, const Hints& hints) {
 /// The elements of an array with commas between; those of a list of texts in quotes, for they may
 /// hold commas themselves.
 std::string valueText(const Value& value, const Hints& hints) {
-    if (kindOf(value) != ValueKind::Array) {
-        return scalarText(value, hints);
-    }
+    if (categoryOf(value) != TypeCategory::Array) return scalarText(value, hints);
     std::string result;
     for (const Value& element : value.elements()) {
-        const bool bare = kindOf(element) != ValueKind::Text || element.text().empty();
+        const bool bare = categoryOf(element) != TypeCategory::Text || element.text().empty();
         const std::string text = scalarText(element, hints);
         result += (result.empty() ? "" : ", ") + (bare ? text : '"' + text + '"');
     }
@@ -89,7 +86,7 @@ class TablePrinter final : public Printer {
 
     void print(const std::vector<ObjectPathValue>& paths) override {
         for (const ObjectPathValue& path : paths) {
-            stream_ << terminalText(writePath(path)) << '\n';
+            stream_ << base::escapeForTerminal(writePath(path)) << '\n';
         }
     }
 
@@ -97,21 +94,22 @@ class TablePrinter final : public Printer {
     void print(const InstanceValue& instance) {
         std::size_t width = 0;
         for (const PropertyValue& property : instance.properties) {
-            width = std::max(width, countCharacters(terminalText(property.name)));
+            width = std::max(width, base::countUtf8(base::escapeForTerminal(property.name)));
         }
-        stream_ << terminalText(writePath(instance.path)) << '\n';
+        stream_ << base::escapeForTerminal(writePath(instance.path)) << '\n';
         for (const PropertyValue& property : instance.properties) {
-            const std::string name = terminalText(property.name);
+            const std::string name = base::escapeForTerminal(property.name);
             const Hints hints = hintsOf(instance.path.className, property.name);
-            stream_ << "  " << name << std::string(width - countCharacters(name) + 2, ' ')
-                    << terminalText(valueText(property.value, hints)) << '\n';
+            stream_ << "  " << name << std::string(width - base::countUtf8(name) + 2, ' ')
+                    << base::escapeForTerminal(valueText(property.value, hints)) << '\n';
         }
     }
 
     Hints hintsOf(const std::string& className, const std::string& propertyName) const {
         const mof::Feature* property = schema_.findProperty(className, propertyName);
-        const bool kilobytes = property != nullptr &&
-                               equalNames(mof::text(property->qualifiers, "Units"), "KiloBytes");
+        const bool kilobytes =
+            property != nullptr &&
+            base::equalsIgnoreCase(mof::text(property->qualifiers, "Units"), "KiloBytes");
         return {schema_.valueMap(className, propertyName), kilobytes};
     }
 
@@ -123,6 +121,18 @@ class TablePrinter final : public Printer {
 
 std::unique_ptr<Printer> makeTablePrinter(std::ostream& stream, const Schema& schema) {
     return std::make_unique<TablePrinter>(stream, schema);
+}
+
+std::unique_ptr<Printer> makePrinter(Format format, std::ostream& stream, const Schema& schema) {
+    switch (format) {
+        case Format::Mof:
+            return makeMofPrinter(stream);
+        case Format::Json:
+            return makeJsonPrinter(stream);
+        case Format::Table:
+            break;
+    }
+    return makeTablePrinter(stream, schema);
 }
 
 }  // namespace cmpihost

@@ -1,7 +1,9 @@
+// The tree is built from the same requests that a client would send, so that it shows what the
+// provider answers and not what the host knows.
 #include "host/cli/Tree.h"
 
-#include "host/cli/ReadableText.h"
-#include "host/cli/TerminalText.h"
+#include "base/Utf8.h"
+#include "host/cli/ValueText.h"
 
 namespace cmpihost {
 
@@ -14,17 +16,17 @@ constexpr const char* runningOn = "KORVA_RunningOS";
 constexpr const char* elementCapabilities = "KORVA_OSElementCapabilities";
 
 /// Builds the branches of one host.
-class Gardener {
+class TreeBuilder {
   public:
-    Gardener(const Ask& ask, const std::string& nameSpace, const Schema& schema)
+    TreeBuilder(const Ask& ask, const std::string& nameSpace, const Schema& schema)
         : ask_(ask), nameSpace_(nameSpace), schema_(schema) {}
 
     std::vector<TreeNode> roots() const {
         std::vector<TreeNode> result;
         for (const InstanceValue& computer : enumerated(computerSystem)) {
             TreeNode root{labelled(computer, text(computer, "Name"))};
-            root.branches.push_back(associated(computer, installedOn, &Gardener::installed));
-            root.branches.push_back(associated(computer, runningOn, &Gardener::running));
+            root.branches.push_back(associated(computer, installedOn, &TreeBuilder::installed));
+            root.branches.push_back(associated(computer, runningOn, &TreeBuilder::running));
             result.push_back(std::move(root));
         }
         if (result.empty()) {
@@ -37,7 +39,7 @@ class Gardener {
     }
 
   private:
-    using Branch = TreeNode (Gardener::*)(const InstanceValue&) const;
+    using Branch = TreeNode (TreeBuilder::*)(const InstanceValue&) const;
 
     std::vector<InstanceValue> answered(const OperationRequest& request) const {
         OperationResult result = ask_(request);
@@ -68,7 +70,8 @@ class Gardener {
     TreeNode installed(const InstanceValue& system) const {
         TreeNode node{labelled(system, text(system, "Name") + " " + text(system, "Version")) +
                       ": installed " + moment(system, "InstallDate")};
-        node.branches.push_back(associated(system, elementCapabilities, &Gardener::capabilities));
+        node.branches.push_back(
+            associated(system, elementCapabilities, &TreeBuilder::capabilities));
         return node;
     }
 
@@ -107,7 +110,7 @@ class Gardener {
 
     static std::string moment(const InstanceValue& instance, const char* property) {
         const std::string cimText = text(instance, property);
-        const std::string readable = readableDateTime(cimText);
+        const std::string readable = humanReadableDateTime(cimText);
         return readable.empty() ? cimText : readable;
     }
 
@@ -120,7 +123,8 @@ void drawBranches(const TreeNode& node, const std::string& margin, std::ostream&
     for (std::size_t index = 0; index < node.branches.size(); ++index) {
         const bool last = index + 1 == node.branches.size();
         const TreeNode& branch = node.branches[index];
-        stream << margin << (last ? "└── " : "├── ") << terminalText(branch.text) << '\n';
+        stream << margin << (last ? "└── " : "├── ") << base::escapeForTerminal(branch.text)
+               << '\n';
         drawBranches(branch, margin + (last ? "    " : "│   "), stream);
     }
 }
@@ -128,12 +132,12 @@ void drawBranches(const TreeNode& node, const std::string& margin, std::ostream&
 }  // namespace
 
 void drawTree(const TreeNode& root, std::ostream& stream) {
-    stream << terminalText(root.text) << '\n';
+    stream << base::escapeForTerminal(root.text) << '\n';
     drawBranches(root, "", stream);
 }
 
 std::vector<TreeNode> hostTree(const Ask& ask, const std::string& nameSpace, const Schema& schema) {
-    return Gardener(ask, nameSpace, schema).roots();
+    return TreeBuilder(ask, nameSpace, schema).roots();
 }
 
 }  // namespace cmpihost

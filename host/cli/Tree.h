@@ -1,4 +1,5 @@
-#pragma once
+#ifndef HOST_CLI_TREE_H
+#define HOST_CLI_TREE_H
 
 #include <functional>
 #include <ostream>
@@ -33,3 +34,5 @@ struct TreeFailure {
 std::vector<TreeNode> hostTree(const Ask& ask, const std::string& nameSpace, const Schema& schema);
 
 }  // namespace cmpihost
+
+#endif

@@ -4,7 +4,7 @@
 #include <iostream>
 
 #include "host/cli/CommandLine.h"
-#include "host/cli/Places.h"
+#include "host/cli/InstallPaths.h"
 #include "host/cli/Run.h"
 
 namespace {
@@ -26,9 +26,7 @@ int main(int argumentCount, char** arguments) {
     tzset();
     try {
         const ParsedCommandLine parsed = parseCommandLine(argumentCount, arguments);
-        if (!parsed.commandLine) {
-            return show(parsed);
-        }
+        if (!parsed.commandLine) return show(parsed);
         const char* const invokedAs = argumentCount > 0 ? arguments[0] : "";
         return run(*parsed.commandLine, programFolder(invokedAs), std::cout, std::cerr);
     } catch (const std::exception& error) {

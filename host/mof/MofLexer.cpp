@@ -1,35 +1,35 @@
+// Cuts MOF into tokens by hand, byte by byte: names may hold any character beyond ASCII, and
+// positions count characters, which no generated scanner would give for free.
 #include "host/mof/MofLexer.h"
 
+#include <charconv>
+#include <limits>
 #include <utility>
 
-#include "host/mof/MofNumber.h"
-#include "host/mof/Utf8.h"
+#include "base/Ascii.h"
+#include "base/Utf8.h"
 
 namespace cmpihost::mof {
 
 namespace {
 
-bool isDigit(char c) {
-    return c >= '0' && c <= '9';
-}
-
 bool isLetter(char c) {
-    return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_' ||
-           static_cast<unsigned char>(c) >= 0x80;
+    return base::isAlpha(c) || c == '_' || static_cast<unsigned char>(c) >= 0x80;
 }
 
 bool isWordPart(char c) {
-    return isLetter(c) || isDigit(c);
+    return isLetter(c) || base::isDigit(c);
 }
 
 int hexDigit(char c) {
-    if (isDigit(c)) {
-        return c - '0';
-    }
-    const int lower = c | 0x20;
+    if (base::isDigit(c)) return c - '0';
+    const char lower = base::toLower(c);
     return lower >= 'a' && lower <= 'f' ? lower - 'a' + 10 : -1;
 }
 
+/// The escapes of strings and characters, and what they stand for.
+constexpr std::string_view escapeLetters = "btnfr\"'\\";
+constexpr std::string_view escapedCharacters = "\b\t\n\f\r\"'\\";
 constexpr std::string_view punctuation = "()[]{},;:=";
 constexpr std::string_view byteOrderMark = "\xEF\xBB\xBF";
 
@@ -49,9 +49,7 @@ std::string Token::described() const {
 }
 
 Lexer::Lexer(std::string_view text, std::string file) : text_(text), file_(std::move(file)) {
-    if (text_.substr(0, byteOrderMark.size()) == byteOrderMark) {
-        offset_ = byteOrderMark.size();
-    }
+    if (text_.substr(0, byteOrderMark.size()) == byteOrderMark) offset_ = byteOrderMark.size();
 }
 
 void Lexer::fail(Position position, const std::string& complaint) const {
@@ -67,7 +65,7 @@ char Lexer::take() {
     if (c == '\n') {
         ++position_.line;
         position_.column = 1;
-    } else if (startsCharacter(c)) {
+    } else if (base::startsUtf8(c)) {
         ++position_.column;
     }
     return c;
@@ -78,9 +76,7 @@ void Lexer::skipBlockComment() {
     take();
     take();
     while (!(peek() == '*' && peek(1) == '/')) {
-        if (atEnd()) {
-            fail(start, "the comment that begins here is never closed by '*/'");
-        }
+        if (atEnd()) fail(start, "the comment that begins here is never closed by '*/'");
         take();
     }
     take();
@@ -93,9 +89,7 @@ void Lexer::skipBlanksAndComments() {
         if (c == ' ' || c == '\t' || c == '\r' || c == '\n' || c == '\f' || c == '\v') {
             take();
         } else if (c == '/' && peek(1) == '/') {
-            while (!atEnd() && peek() != '\n') {
-                take();
-            }
+            while (!atEnd() && peek() != '\n') take();
         } else if (c == '/' && peek(1) == '*') {
             skipBlockComment();
         } else {
@@ -107,36 +101,22 @@ void Lexer::skipBlanksAndComments() {
 Token Lexer::next() {
     skipBlanksAndComments();
     const Position start = position_;
-    if (atEnd()) {
-        return {TokenKind::End, start, {}, {}};
-    }
+    if (atEnd()) return {TokenKind::End, start, {}, {}};
     const char c = peek();
-    if (c == '"') {
-        return quotedText(start);
-    }
-    if (c == '\'') {
-        return character(start);
-    }
-    if (c == '#' || c == '$') {
-        return word(c == '#' ? TokenKind::Pragma : TokenKind::Alias, start);
-    }
-    if (isLetter(c)) {
-        return word(TokenKind::Identifier, start);
-    }
-    if (isDigit(c) || c == '+' || c == '-' || c == '.') {
-        return number(start);
-    }
+    if (c == '"') return {TokenKind::Text, start, quoted(start, '"', "string"), {}};
+    if (c == '\'') return character(start);
+    if (c == '#' || c == '$') return word(c == '#' ? TokenKind::Pragma : TokenKind::Alias, start);
+    if (isLetter(c)) return word(TokenKind::Identifier, start);
+    if (base::isDigit(c) || c == '+' || c == '-' || c == '.') return number(start);
     if (punctuation.find(c) != std::string_view::npos) {
         return {TokenKind::Punctuation, start, std::string(1, take()), {}};
     }
-    fail(start, "the character '" + validUtf8(std::string(1, c)) + "' has no meaning here");
+    fail(start, "the character '" + base::toValidUtf8(std::string(1, c)) + "' has no meaning here");
 }
 
 Token Lexer::word(TokenKind kind, Position start) {
     std::string text(1, take());
-    while (isWordPart(peek())) {
-        text += take();
-    }
+    while (isWordPart(peek())) text += take();
     return {kind, start, std::move(text), {}};
 }
 
@@ -153,9 +133,7 @@ Token Lexer::number(Position start) {
     }
     Token token{TokenKind::Number, start, text, {}};
     std::string complaint;
-    if (!readNumber(text, token.value, complaint)) {
-        fail(start, complaint);
-    }
+    if (!parseNumber(text, token.value, complaint)) fail(start, complaint);
     return token;
 }
 
@@ -166,65 +144,151 @@ std::uint32_t Lexer::hexadecimalEscape() {
     for (; digits < 4 && hexDigit(peek()) >= 0; ++digits) {
         code = code * 16 + static_cast<std::uint32_t>(hexDigit(take()));
     }
-    if (digits == 0) {
-        fail(start, "expected one to four hexadecimal digits after '\\x'");
-    }
+    if (digits == 0) fail(start, "expected one to four hexadecimal digits after '\\x'");
     return code;
 }
 
-void Lexer::appendEscape(std::string& to, char delimiter) {
-    constexpr std::string_view letters = "btnfr\"'\\";
-    constexpr std::string_view meanings = "\b\t\n\f\r\"'\\";
+void Lexer::appendEscape(std::string& to, const char* within) {
     const Position start = position_;
     take();
     const char c = atEnd() ? '\0' : take();
     if (c == 'x' || c == 'X') {
-        appendUtf8(to, hexadecimalEscape());
+        base::appendUtf8(to, hexadecimalEscape());
         return;
     }
-    const std::size_t index = letters.find(c);
+    const std::size_t index = escapeLetters.find(c);
     if (index == std::string_view::npos) {
-        fail(start, std::string("expected one of \\b \\t \\n \\f \\r \\\" \\' \\\\ \\x in the ") +
-                        (delimiter == '"' ? "string" : "character"));
+        fail(start,
+             std::string("expected one of \\b \\t \\n \\f \\r \\\" \\' \\\\ \\x in the ") + within);
     }
-    to += meanings[index];
+    to += escapedCharacters[index];
 }
 
-Token Lexer::quotedText(Position start) {
+std::string Lexer::quoted(Position start, char delimiter, const char* what) {
     take();
     std::string content;
-    while (peek() != '"') {
-        if (atEnd() || peek() == '\n') {
-            fail(start, "the string that begins here is not closed by '\"' on its line");
-        }
+    while (peek() != delimiter) {
+        if (atEnd() || peek() == '\n')
+            fail(start, std::string("the ") + what + " that begins here is not closed by " +
+                            (delimiter == '"' ? "'\"'" : "'") + " on its line");
         if (peek() == '\\') {
-            appendEscape(content, '"');
+            appendEscape(content, what);
         } else {
             content += take();
         }
     }
     take();
-    return {TokenKind::Text, start, std::move(content), {}};
+    return content;
 }
 
 Token Lexer::character(Position start) {
-    take();
-    std::string content;
-    while (peek() != '\'') {
-        if (atEnd() || peek() == '\n') {
-            fail(start, "the character that begins here is not closed by ' on its line");
-        }
-        if (peek() == '\\') {
-            appendEscape(content, '\'');
-        } else {
-            content += take();
-        }
+    const std::string content = quoted(start, '\'', "character");
+    if (base::countUtf8(content) != 1) fail(start, "expected exactly one character between two '");
+    return {TokenKind::Character, start, content, Character{base::decodeUtf8(content).codePoint}};
+}
+
+namespace {
+
+struct Digits {
+    std::string_view text;
+    int base;
+};
+
+Digits split(std::string_view unsignedText) {
+    const std::string_view start = unsignedText.substr(0, 2);
+    if (start == "0x" || start == "0X") return {unsignedText.substr(2), 16};
+    if (!unsignedText.empty() && (unsignedText.back() == 'b' || unsignedText.back() == 'B')) {
+        return {unsignedText.substr(0, unsignedText.size() - 1), 2};
     }
-    take();
-    if (countCharacters(content) != 1) {
-        fail(start, "expected exactly one character between two '");
+    return {unsignedText, start.substr(0, 1) == "0" ? 8 : 10};
+}
+
+bool isReal(std::string_view unsignedText) {
+    return unsignedText.find('.') != std::string_view::npos;
+}
+
+template <typename Number, typename... Base>
+std::errc convert(std::string_view text, Number& number, Base... base) {
+    const char* end = text.data() + text.size();
+    const auto result = std::from_chars(text.data(), end, number, base...);
+    return result.ec == std::errc() && result.ptr != end ? std::errc::invalid_argument : result.ec;
+}
+
+std::errc readInteger(std::string_view unsignedText, bool negative, Scalar& value) {
+    const Digits digits = split(unsignedText);
+    std::uint64_t magnitude{};
+    const std::errc error = convert(digits.text, magnitude, digits.base);
+    if (error != std::errc()) return error;
+    constexpr std::uint64_t mostNegative = std::uint64_t{1} << 63U;
+    if (!negative) {
+        value = magnitude;
+    } else if (magnitude > mostNegative) {
+        return std::errc::result_out_of_range;
+    } else if (magnitude == mostNegative) {
+        value = std::numeric_limits<std::int64_t>::min();
+    } else {
+        value = -static_cast<std::int64_t>(magnitude);
     }
-    return {TokenKind::Character, start, content, Character{firstCodePoint(content)}};
+    return {};
+}
+
+std::errc readReal(std::string_view unsignedText, bool negative, Scalar& value) {
+    double number{};
+    const std::errc error = convert(unsignedText, number);
+    value = negative ? -number : number;
+    return error;
+}
+
+}  // namespace
+
+bool parseNumber(const std::string& written, Scalar& value, std::string& complaint) {
+    std::string_view text = written;
+    const std::string_view sign = text.substr(0, 1);
+    const bool negative = sign == "-";
+    if (negative || sign == "+") text.remove_prefix(1);
+    const std::errc error =
+        isReal(text) ? readReal(text, negative, value) : readInteger(text, negative, value);
+    if (error == std::errc::result_out_of_range) {
+        complaint = "the number " + written + " does not fit 64 bits";
+    } else if (error != std::errc()) {
+        complaint = "expected a number, found '" + written + "'";
+    }
+    return error == std::errc();
+}
+
+namespace {
+
+/// Always four digits: with fewer, a digit that follows in the text would be taken for one more.
+std::string hexadecimalEscape(char32_t code) {
+    constexpr char symbols[] = "0123456789ABCDEF";
+    std::string result = "\\x";
+    for (unsigned shift = 16; shift > 0; shift -= 4)
+        result += symbols[(code >> (shift - 4)) & 0xFU];
+    return result;
+}
+
+/// The character as it stands between two delimiters; one beyond ASCII stands for itself.
+std::string literalPart(char32_t code, char delimiter) {
+    const auto character = static_cast<char>(code < 0x80 ? code : 0);
+    const std::size_t index = escapedCharacters.find(character);
+    const bool otherDelimiter = character != delimiter && (character == '"' || character == '\'');
+    if (index != std::string_view::npos && !otherDelimiter) return {'\\', escapeLetters[index]};
+    if (base::classOf(code) == base::CharClass::control) return hexadecimalEscape(code);
+    std::string result;
+    base::appendUtf8(result, code);
+    return result;
+}
+
+}  // namespace
+
+std::string stringLiteral(std::string_view text) {
+    std::string result = "\"";
+    while (!text.empty()) result += literalPart(base::takeUtf8(text).codePoint, '"');
+    return result + '"';
+}
+
+std::string characterLiteral(char32_t code) {
+    return "'" + (code < 0x80 ? literalPart(code, '\'') : hexadecimalEscape(code)) + "'";
 }
 
 }  // namespace cmpihost::mof

@@ -1,9 +1,10 @@
-#pragma once
+#ifndef HOST_MOF_MOF_LEXER_H
+#define HOST_MOF_MOF_LEXER_H
 
 #include <string>
 #include <string_view>
 
-#include "host/mof/MofSyntax.h"
+#include "host/mof/MofAst.h"
 
 namespace cmpihost::mof {
 
@@ -40,9 +41,9 @@ class Lexer {
     void skipBlockComment();
     Token word(TokenKind kind, Position start);
     Token number(Position start);
-    Token quotedText(Position start);
+    std::string quoted(Position start, char delimiter, const char* what);
     Token character(Position start);
-    void appendEscape(std::string& to, char delimiter);
+    void appendEscape(std::string& to, const char* within);
     std::uint32_t hexadecimalEscape();
 
     std::string_view text_;
@@ -51,4 +52,19 @@ class Lexer {
     Position position_;
 };
 
+/// Reads a number as MOF writes it: decimal, octal (leading 0), hexadecimal (0x), binary (trailing
+/// b) or real, each with an optional sign. Returns false with a complaint when it is none of these
+/// or does not fit 64 bits.
+bool parseNumber(const std::string& text, Scalar& value, std::string& complaint);
+
+/// The text as a string constant of MOF, quotes included. Control characters become escapes; bytes
+/// that are no UTF-8 become U+FFFD.
+std::string stringLiteral(std::string_view text);
+
+/// The code point as a character constant of MOF, with its quotes; one that is no printable ASCII
+/// character as an escape.
+std::string characterLiteral(char32_t code);
+
 }  // namespace cmpihost::mof
+
+#endif

@@ -1,27 +1,33 @@
+// Reads MOF by recursive descent with one token of lookahead, one function for each production of
+// the grammar, so that every complaint can name what was due at its place.
 #include "host/mof/MofParser.h"
 
+#include <unordered_set>
 #include <utility>
 
-#include "host/broker/Value.h"
-#include "host/mof/MofTokens.h"
-#include "host/mof/MofTypes.h"
-#include "host/mof/MofValues.h"
-#include "host/mof/Names.h"
+#include "base/Ascii.h"
+#include "host/mof/MofLexer.h"
 
 namespace cmpihost::mof {
 
 namespace {
 
+/// Names seen so far; CIM compares them without case.
+using NameSet = std::unordered_set<std::string>;
+
 class Parser {
   public:
     Parser(std::string_view text, const std::string& file)
-        : tokens_(text, file), values_(tokens_), file_(file) {}
+        : lexer_(text, file), next_(lexer_.next()), file_(file) {}
 
     Document document() {
         Document result;
-        while (!tokens_.atEnd()) {
-            production(result);
-        }
+        while (next_.kind != TokenKind::End) production(result);
+        return result;
+    }
+    Initializer onlyInitializer() {
+        Initializer result = initializer();
+        if (next_.kind != TokenKind::End) expected("nothing after the value");
         return result;
     }
 
@@ -41,76 +47,133 @@ class Parser {
     void nameList(const char* what);
     void instanceDeclaration();
     void alias();
+    Scalar scalar();
+    Initializer list();
+    Initializer listOrNull();
+    Initializer initializer();
 
-    Tokens tokens_;
-    Values values_;
+    /// Whether the next token is that punctuation, or that name or keyword in any case.
+    bool peekIs(const char* punctuation) const;
+    bool peekIsWord(const char* word) const;
+    /// The next token, and steps past it.
+    Token take() { return std::exchange(next_, lexer_.next()); }
+    /// Steps past the next token if it is that punctuation or word; says whether it did.
+    bool accept(const char* punctuation);
+    bool acceptWord(const char* word);
+    /// Steps past that punctuation; otherwise fails with "expected ';' after " and `after`.
+    void expect(const char* punctuation, const std::string& after);
+    /// Takes a name; otherwise fails with "expected " and `what`.
+    Token identifier(const std::string& what);
+    /// Takes one string or several that stand side by side, joined.
+    std::string joinedTexts(const std::string& what);
+    /// Fails at the next token: "expected WHAT, found ...".
+    [[noreturn]] void expected(const std::string& what) const;
+    [[noreturn]] void fail(Position position, const std::string& complaint) const {
+        lexer_.fail(position, complaint);
+    }
+
+    Lexer lexer_;
+    Token next_;
     std::string file_;
 };
 
+bool Parser::peekIs(const char* punctuation) const {
+    return next_.kind == TokenKind::Punctuation && next_.text == punctuation;
+}
+
+bool Parser::peekIsWord(const char* word) const {
+    return next_.kind == TokenKind::Identifier && base::equalsIgnoreCase(next_.text, word);
+}
+
+bool Parser::accept(const char* punctuation) {
+    const bool found = peekIs(punctuation);
+    if (found) take();
+    return found;
+}
+
+bool Parser::acceptWord(const char* word) {
+    const bool found = peekIsWord(word);
+    if (found) take();
+    return found;
+}
+
+void Parser::expect(const char* punctuation, const std::string& after) {
+    if (!accept(punctuation)) expected(std::string("'") + punctuation + "' after " + after);
+}
+
+Token Parser::identifier(const std::string& what) {
+    if (next_.kind != TokenKind::Identifier) expected(what);
+    return take();
+}
+
+std::string Parser::joinedTexts(const std::string& what) {
+    if (next_.kind != TokenKind::Text) expected(what + " as a string");
+    std::string joined;
+    while (next_.kind == TokenKind::Text) joined += take().text;
+    return joined;
+}
+
+void Parser::expected(const std::string& what) const {
+    fail(next_.position, "expected " + what + ", found " + next_.described());
+}
+
 void Parser::production(Document& to) {
-    if (tokens_.peek().kind == TokenKind::Pragma) {
+    if (next_.kind == TokenKind::Pragma) {
         pragma(to);
         return;
     }
     std::vector<Qualifier> qualifiers = qualifierList();
-    if (tokens_.acceptWord("class")) {
+    if (acceptWord("class")) {
         to.classes.push_back(classDeclaration(std::move(qualifiers)));
-    } else if (tokens_.acceptWord("instance")) {
+    } else if (acceptWord("instance")) {
         instanceDeclaration();
-    } else if (qualifiers.empty() && tokens_.acceptWord("qualifier")) {
+    } else if (qualifiers.empty() && acceptWord("qualifier")) {
         qualifierDeclaration();
     } else {
-        tokens_.expected(qualifiers.empty() ? "'class', 'instance', 'qualifier' or '#pragma'"
-                                            : "'class' or 'instance' after the qualifiers");
+        expected(qualifiers.empty() ? "'class', 'instance', 'qualifier' or '#pragma'"
+                                    : "'class' or 'instance' after the qualifiers");
     }
 }
 
 void Parser::pragma(Document& to) {
-    const Token token = tokens_.take();
-    if (!isWord(token, "#pragma")) {
-        tokens_.fail(token.position, "expected '#pragma', found '" + token.text + "'");
-    }
-    const std::string name = tokens_.identifier("the name of the pragma").text;
-    tokens_.expect("(", "the name of the pragma");
-    const std::string parameter = tokens_.texts("the parameter of the pragma");
-    tokens_.expect(")", "the parameter of the pragma");
-    if (equalNames(name, "include")) {
-        to.includes.push_back(parameter);
-    }
+    const Token token = take();
+    if (!base::equalsIgnoreCase(token.text, "#pragma"))
+        fail(token.position, "expected '#pragma', found '" + token.text + "'");
+    const std::string name = identifier("the name of the pragma").text;
+    expect("(", "the name of the pragma");
+    const std::string parameter = joinedTexts("the parameter of the pragma");
+    expect(")", "the parameter of the pragma");
+    if (base::equalsIgnoreCase(name, "include")) to.includes.push_back(parameter);
 }
 
 Class Parser::classDeclaration(std::vector<Qualifier> qualifiers) {
-    const Token name = tokens_.identifier("the name of the class");
+    const Token name = identifier("the name of the class");
     Class result;
     result.name = name.text;
     result.position = name.position;
     result.file = file_;
     result.qualifiers = std::move(qualifiers);
     alias();
-    if (tokens_.accept(":")) {
-        result.superclass = tokens_.identifier("the name of the superclass").text;
-    }
-    tokens_.expect("{", "the head of class '" + result.name + "'");
+    if (accept(":")) result.superclass = identifier("the name of the superclass").text;
+    expect("{", "the head of class '" + result.name + "'");
     NameSet seen;
-    while (!tokens_.accept("}")) {
-        member(result, seen);
-    }
-    tokens_.expect(";", "class '" + result.name + "'");
+    while (!accept("}")) member(result, seen);
+    expect(";", "class '" + result.name + "'");
     return result;
 }
 
 void Parser::member(Class& to, NameSet& seen) {
     Feature head = feature();
-    if (tokens_.accept("(")) {
+    if (accept("(")) {
         to.methods.push_back(method(std::move(head)));
         return;
     }
     arraySuffix(head);
     defaultValue(head);
-    tokens_.expect(";", "property '" + head.name + "'");
-    if (!seen.add(head.name)) {
-        tokens_.fail(head.position,
-                     "property '" + head.name + "' is declared twice in class '" + to.name + "'");
+    expect(";", "property '" + head.name + "'");
+    if (!seen.insert(base::toLower(head.name)).second) {
+        fail(head.position,
+             "property '" + head.name + "' is declared twice in class '" + to.name + "'");
     }
     to.properties.push_back(std::move(head));
 }
@@ -119,17 +182,17 @@ Feature Parser::feature() {
     Feature result;
     result.qualifiers = qualifierList();
     const Token type =
-        tokens_.identifier(result.qualifiers.empty() ? "a type, a class, qualifiers or '}'"
-                                                     : "a type or a class after the qualifiers");
-    if (tokens_.acceptWord("ref")) {
+        identifier(result.qualifiers.empty() ? "a type, a class, qualifiers or '}'"
+                                             : "a type or a class after the qualifiers");
+    if (acceptWord("ref")) {
         result.type = Type::Reference;
         result.referenceClass = type.text;
     } else if (const std::optional<Type> known = typeNamed(type.text)) {
         result.type = *known;
     } else {
-        tokens_.fail(type.position, "'" + type.text + "' is no type, and no REF follows it");
+        fail(type.position, "'" + type.text + "' is no type, and no REF follows it");
     }
-    const Token name = tokens_.identifier("a name after the type '" + type.text + "'");
+    const Token name = identifier("a name after the type '" + type.text + "'");
     result.name = name.text;
     result.position = name.position;
     return result;
@@ -137,150 +200,180 @@ Feature Parser::feature() {
 
 Method Parser::method(Feature result) {
     Method declaration{std::move(result), parameters()};
-    tokens_.expect(")", "the parameters of method '" + declaration.result.name + "'");
-    tokens_.expect(";", "method '" + declaration.result.name + "'");
+    expect(")", "the parameters of method '" + declaration.result.name + "'");
+    expect(";", "method '" + declaration.result.name + "'");
     return declaration;
 }
 
 std::vector<Feature> Parser::parameters() {
     std::vector<Feature> result;
-    if (tokens_.peekIs(")")) {
+    if (peekIs(")")) {
         return result;
     }
     do {
         Feature parameter = feature();
         arraySuffix(parameter);
         result.push_back(std::move(parameter));
-    } while (tokens_.accept(","));
+    } while (accept(","));
     return result;
 }
 
 void Parser::arraySuffix(Feature& to) {
-    if (!tokens_.accept("[")) {
-        return;
-    }
-    if (tokens_.peek().kind == TokenKind::Number) {
-        const Token size = tokens_.take();
+    if (!accept("[")) return;
+    if (next_.kind == TokenKind::Number) {
+        const Token size = take();
         if (!fits(size.value, Type::UInt32) || size.value == Scalar(std::uint64_t{0})) {
-            tokens_.fail(size.position, "expected the size of array '" + to.name +
-                                            "' as a positive integer, found '" + size.text + "'");
+            fail(size.position, "expected the size of array '" + to.name +
+                                    "' as a positive integer, found '" + size.text + "'");
         }
     }
-    tokens_.expect("]", "the size of array '" + to.name + "'");
+    expect("]", "the size of array '" + to.name + "'");
     to.array = true;
 }
 
 void Parser::defaultValue(Feature& to) {
-    if (!tokens_.accept("=")) {
-        return;
-    }
-    const Position start = tokens_.peek().position;
-    to.defaultValue = values_.value(to.array);
+    if (!accept("=")) return;
+    const Position start = next_.position;
+    to.defaultValue = to.array ? listOrNull() : Initializer{false, {scalar()}};
     for (const Scalar& item : to.defaultValue->items) {
         if (!fits(item, to.type)) {
-            tokens_.fail(start, std::string("the default of property '") + to.name +
-                                    "' is no value of type " + nameOf(to.type));
+            fail(start, std::string("the default of property '") + to.name +
+                            "' is no value of type " + nameOf(to.type));
         }
     }
 }
 
 std::vector<Qualifier> Parser::qualifierList() {
     std::vector<Qualifier> result;
-    if (!tokens_.accept("[")) {
-        return result;
-    }
+    if (!accept("[")) return result;
     NameSet seen;
     do {
         Qualifier next = qualifier();
-        if (!seen.add(next.name)) {
-            tokens_.fail(next.position, "qualifier '" + next.name + "' stands twice in one list");
+        if (!seen.insert(base::toLower(next.name)).second) {
+            fail(next.position, "qualifier '" + next.name + "' stands twice in one list");
         }
         result.push_back(std::move(next));
-    } while (tokens_.accept(","));
-    tokens_.expect("]", "the qualifiers");
+    } while (accept(","));
+    expect("]", "the qualifiers");
     return result;
 }
 
 Qualifier Parser::qualifier() {
-    const Token name = tokens_.identifier("the name of a qualifier");
+    const Token name = identifier("the name of a qualifier");
     Qualifier result{name.text, name.position, std::nullopt};
-    if (tokens_.accept("(")) {
-        result.value = values_.scalarValue();
-        tokens_.expect(")", "the value of qualifier '" + name.text + "'");
-    } else if (tokens_.peekIs("{")) {
-        result.value = values_.value(true);
+    if (accept("(")) {
+        result.value = initializer();
+        expect(")", "the value of qualifier '" + name.text + "'");
+    } else if (peekIs("{")) {
+        result.value = list();
     }
-    if (tokens_.accept(":")) {
-        tokens_.identifier("a flavor of qualifier '" + name.text + "'");
-        while (tokens_.peek().kind == TokenKind::Identifier) {
-            tokens_.take();
-        }
+    if (accept(":")) {
+        identifier("a flavor of qualifier '" + name.text + "'");
+        while (next_.kind == TokenKind::Identifier) take();
     }
     return result;
 }
 
 void Parser::nameList(const char* what) {
-    tokens_.expect("(", what);
+    expect("(", what);
     do {
-        tokens_.identifier(std::string("a name in ") + what);
-    } while (tokens_.accept(","));
-    tokens_.expect(")", what);
+        identifier(std::string("a name in ") + what);
+    } while (accept(","));
+    expect(")", what);
 }
 
 void Parser::qualifierDeclaration() {
     Feature declared;
-    declared.name = tokens_.identifier("the name of the qualifier").text;
+    declared.name = identifier("the name of the qualifier").text;
     const std::string what = "qualifier '" + declared.name + "'";
-    tokens_.expect(":", "the name of " + what);
-    const Token type = tokens_.identifier("the type of " + what);
-    if (!typeNamed(type.text)) {
-        tokens_.fail(type.position, "'" + type.text + "' is no type");
-    }
+    expect(":", "the name of " + what);
+    const Token type = identifier("the type of " + what);
+    if (!typeNamed(type.text)) fail(type.position, "'" + type.text + "' is no type");
     declared.type = *typeNamed(type.text);
     arraySuffix(declared);
     defaultValue(declared);
-    while (tokens_.accept(",")) {
-        if (tokens_.acceptWord("scope")) {
+    while (accept(",")) {
+        if (acceptWord("scope")) {
             nameList("the scope");
-        } else if (tokens_.acceptWord("flavor")) {
+        } else if (acceptWord("flavor")) {
             nameList("the flavor");
         } else {
-            tokens_.expected("'Scope' or 'Flavor'");
+            expected("'Scope' or 'Flavor'");
         }
     }
-    tokens_.expect(";", what);
+    expect(";", what);
 }
 
 void Parser::instanceDeclaration() {
-    if (!tokens_.acceptWord("of")) {
-        tokens_.expected("'of' after 'instance'");
-    }
-    const std::string name = tokens_.identifier("the class of the instance").text;
+    if (!acceptWord("of")) expected("'of' after 'instance'");
+    const std::string name = identifier("the class of the instance").text;
     alias();
-    tokens_.expect("{", "the head of the instance of '" + name + "'");
-    while (!tokens_.accept("}")) {
+    expect("{", "the head of the instance of '" + name + "'");
+    while (!accept("}")) {
         qualifierList();
-        const std::string property = tokens_.identifier("the name of a property or '}'").text;
-        tokens_.expect("=", "the name of property '" + property + "'");
-        values_.anyValue();
-        tokens_.expect(";", "the value of property '" + property + "'");
+        const std::string property = identifier("the name of a property or '}'").text;
+        expect("=", "the name of property '" + property + "'");
+        if (next_.kind == TokenKind::Alias) {
+            take();
+        } else {
+            initializer();
+        }
+        expect(";", "the value of property '" + property + "'");
     }
-    tokens_.expect(";", "the instance of '" + name + "'");
+    expect(";", "the instance of '" + name + "'");
 }
 
 void Parser::alias() {
-    if (tokens_.acceptWord("as")) {
-        if (tokens_.peek().kind != TokenKind::Alias) {
-            tokens_.expected("an alias ($name) after 'as'");
-        }
-        tokens_.take();
+    if (acceptWord("as")) {
+        if (next_.kind != TokenKind::Alias) expected("an alias ($name) after 'as'");
+        take();
     }
+}
+
+Scalar Parser::scalar() {
+    switch (next_.kind) {
+        case TokenKind::Text:
+            return joinedTexts("a value");
+        case TokenKind::Number:
+        case TokenKind::Character:
+            return take().value;
+        default:
+            break;
+    }
+    if (acceptWord("null")) return std::monostate();
+    if (acceptWord("true")) return true;
+    if (acceptWord("false")) return false;
+    expected("a value (a string, a number, a character, TRUE, FALSE or NULL)");
+}
+
+Initializer Parser::list() {
+    Initializer result{true, {}};
+    expect("{", "'='");
+    if (accept("}")) return result;
+    do {
+        result.items.push_back(scalar());
+    } while (accept(","));
+    expect("}", "the list of values");
+    return result;
+}
+
+Initializer Parser::listOrNull() {
+    return acceptWord("null") ? Initializer{false, {Scalar()}} : list();
+}
+
+/// Some writers put the list of a qualifier in parentheses, where a single constant belongs.
+Initializer Parser::initializer() {
+    return peekIs("{") ? list() : Initializer{false, {scalar()}};
 }
 
 }  // namespace
 
 Document parse(std::string_view text, const std::string& file) {
     return Parser(text, file).document();
+}
+
+Initializer parseInitializer(std::string_view text, const std::string& name) {
+    return Parser(text, name).onlyInitializer();
 }
 
 }  // namespace cmpihost::mof

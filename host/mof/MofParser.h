@@ -1,9 +1,10 @@
-#pragma once
+#ifndef HOST_MOF_MOF_PARSER_H
+#define HOST_MOF_MOF_PARSER_H
 
 #include <string>
 #include <string_view>
 
-#include "host/mof/MofSyntax.h"
+#include "host/mof/MofAst.h"
 
 namespace cmpihost::mof {
 
@@ -14,4 +15,10 @@ namespace cmpihost::mof {
 /// neither does this reader: any input costs time and memory in proportion to its length.
 Document parse(std::string_view text, const std::string& file);
 
+/// Reads one constant (NULL, TRUE, FALSE, a number, a character, a string) or a list of them in
+/// braces, and nothing else. Throws MofError; name is what it shows in place of a file.
+Initializer parseInitializer(std::string_view text, const std::string& name);
+
 }  // namespace cmpihost::mof
+
+#endif

@@ -1,13 +1,15 @@
+// The schema keeps classes as they are declared and walks up to superclasses when it is asked: a
+// superclass may be read after its subclasses, or be declared in no file at all.
 #include "host/mof/Schema.h"
 
 #include <algorithm>
 #include <fstream>
 #include <iterator>
 #include <stdexcept>
+#include <unordered_set>
 
-#include "host/broker/Value.h"
+#include "base/Ascii.h"
 #include "host/mof/MofParser.h"
-#include "host/mof/Names.h"
 
 namespace cmpihost {
 
@@ -20,9 +22,8 @@ std::vector<fs::path> mofFiles(const fs::path& folder) {
     std::error_code error;
     for (fs::directory_iterator entry(folder, error), end; !error && entry != end;
          entry.increment(error)) {
-        if (equalNames(entry->path().extension().string(), ".mof")) {
+        if (base::equalsIgnoreCase(entry->path().extension().string(), ".mof"))
             files.push_back(entry->path());
-        }
     }
     if (error) {
         throw std::runtime_error("the schema folder " + folder.string() +
@@ -41,10 +42,28 @@ std::string contentOf(const fs::path& file) {
     }
     std::ifstream stream(file, std::ios::binary);
     std::string content{std::istreambuf_iterator<char>(stream), std::istreambuf_iterator<char>()};
-    if (!stream) {
-        throw std::runtime_error("the schema file " + file.string() + " cannot be read");
-    }
+    if (!stream) throw std::runtime_error("the schema file " + file.string() + " cannot be read");
     return content;
+}
+
+/// In the order of mof::Type.
+constexpr CMPIType elementTypes[] = {CMPI_boolean, CMPI_string, CMPI_char16, CMPI_dateTime,
+                                     CMPI_uint8,   CMPI_sint8,  CMPI_uint16, CMPI_sint16,
+                                     CMPI_uint32,  CMPI_sint32, CMPI_uint64, CMPI_sint64,
+                                     CMPI_real32,  CMPI_real64, CMPI_ref};
+static_assert(std::size(elementTypes) == static_cast<std::size_t>(mof::Type::Reference) + 1);
+
+ClassDeclaration declarationOf(const Schema& schema, const mof::Class& source) {
+    ClassDeclaration result;
+    result.name = source.name;
+    result.superclass = source.superclass;
+    result.association = schema.isAssociation(source.name);
+    for (const mof::Feature* property : schema.properties(source.name)) {
+        result.properties.push_back({property->name, cmpiType(*property),
+                                     schema.isKey(source.name, property->name),
+                                     property->referenceClass});
+    }
+    return result;
 }
 
 }  // namespace
@@ -63,7 +82,7 @@ Schema Schema::load(const fs::path& folder) {
 void Schema::add(const mof::Document& document) {
     for (const mof::Class& added : document.classes) {
         check(added);
-        keepValueMaps(classes_.emplace(lowered(added.name), added).first->second);
+        keepValueMaps(classes_.emplace(base::toLower(added.name), added).first->second);
     }
 }
 
@@ -83,9 +102,7 @@ void Schema::keepValueMaps(const mof::Class& added) {
     for (const mof::Feature& property : added.properties) {
         try {
             ValueMap map = ValueMap::of(property);
-            if (!map.empty()) {
-                valueMaps_.emplace(&property, std::move(map));
-            }
+            if (!map.empty()) valueMaps_.emplace(&property, std::move(map));
         } catch (const std::runtime_error& error) {
             throw mof::MofError(added.file, property.position,
                                 "property '" + property.name + "': " + error.what());
@@ -94,7 +111,7 @@ void Schema::keepValueMaps(const mof::Class& added) {
 }
 
 const mof::Class* Schema::find(const std::string& className) const {
-    const auto found = classes_.find(lowered(className));
+    const auto found = classes_.find(base::toLower(className));
     return found == classes_.end() ? nullptr : &found->second;
 }
 
@@ -103,9 +120,7 @@ const mof::Feature* Schema::findProperty(const std::string& className,
     for (const mof::Class* level = find(className); level != nullptr;
          level = find(level->superclass)) {
         for (const mof::Feature& property : level->properties) {
-            if (equalNames(property.name, propertyName)) {
-                return &property;
-            }
+            if (base::equalsIgnoreCase(property.name, propertyName)) return &property;
         }
     }
     return nullptr;
@@ -113,13 +128,11 @@ const mof::Feature* Schema::findProperty(const std::string& className,
 
 std::vector<const mof::Feature*> Schema::properties(const std::string& className) const {
     std::vector<const mof::Feature*> result;
-    NameSet seen;
+    std::unordered_set<std::string> seen;
     for (const mof::Class* level = find(className); level != nullptr;
          level = find(level->superclass)) {
         for (const mof::Feature& property : level->properties) {
-            if (seen.add(property.name)) {
-                result.push_back(&property);
-            }
+            if (seen.insert(base::toLower(property.name)).second) result.push_back(&property);
         }
     }
     return result;
@@ -127,7 +140,7 @@ std::vector<const mof::Feature*> Schema::properties(const std::string& className
 
 bool Schema::isA(const std::string& className, const std::string& ancestor) const {
     std::string name = className;
-    while (!name.empty() && !equalNames(name, ancestor)) {
+    while (!name.empty() && !base::equalsIgnoreCase(name, ancestor)) {
         const mof::Class* level = find(name);
         name = level == nullptr ? std::string() : level->superclass;
     }
@@ -138,7 +151,8 @@ bool Schema::isKey(const std::string& className, const std::string& propertyName
     for (const mof::Class* level = find(className); level != nullptr;
          level = find(level->superclass)) {
         for (const mof::Feature& property : level->properties) {
-            if (equalNames(property.name, propertyName) && mof::isSet(property.qualifiers, "Key")) {
+            if (base::equalsIgnoreCase(property.name, propertyName) &&
+                mof::isSet(property.qualifiers, "Key")) {
                 return true;
             }
         }
@@ -164,10 +178,24 @@ const ValueMap& Schema::valueMap(const std::string& className,
 
 std::vector<std::string> Schema::classNames() const {
     std::vector<std::string> names;
-    for (const auto& entry : classes_) {
-        names.push_back(entry.second.name);
-    }
+    for (const auto& entry : classes_) names.push_back(entry.second.name);
     return names;
+}
+
+CMPIType cmpiType(const mof::Feature& property) {
+    const CMPIType type = elementTypes[static_cast<std::size_t>(property.type)];
+    return property.array ? static_cast<CMPIType>(type | CMPI_ARRAY) : type;
+}
+
+SchemaCatalogue::SchemaCatalogue(const Schema& schema) {
+    for (const std::string& name : schema.classNames()) {
+        declarations_.emplace(base::toLower(name), declarationOf(schema, *schema.find(name)));
+    }
+}
+
+const ClassDeclaration* SchemaCatalogue::find(std::string_view className) const {
+    const auto found = declarations_.find(base::toLower(className));
+    return found == declarations_.end() ? nullptr : &found->second;
 }
 
 }  // namespace cmpihost

@@ -1,11 +1,14 @@
-#pragma once
+#ifndef HOST_MOF_SCHEMA_H
+#define HOST_MOF_SCHEMA_H
 
 #include <filesystem>
 #include <map>
 #include <string>
+#include <string_view>
 #include <vector>
 
-#include "host/mof/MofSyntax.h"
+#include "host/broker/ClassCatalogue.h"
+#include "host/mof/MofAst.h"
 #include "host/mof/ValueMap.h"
 
 namespace cmpihost {
@@ -67,4 +70,20 @@ class Schema {
     std::map<const mof::Feature*, ValueMap> valueMaps_;
 };
 
+/// A schema as the broker asks for it. Takes what it needs when it is made, so the schema may go.
+class SchemaCatalogue final : public ClassCatalogue {
+  public:
+    explicit SchemaCatalogue(const Schema& schema);
+
+    const ClassDeclaration* find(std::string_view className) const override;
+
+  private:
+    std::map<std::string, ClassDeclaration> declarations_;
+};
+
+/// The CMPI type of a declared property, with CMPI_ARRAY for an array.
+CMPIType cmpiType(const mof::Feature& property);
+
 }  // namespace cmpihost
+
+#endif

@@ -1,9 +1,11 @@
+// Ranges are kept as they are written and the narrowest that holds a number wins: an entry ".." for
+// all that is not listed may stand anywhere in the list.
 #include "host/mof/ValueMap.h"
 
 #include <limits>
 #include <stdexcept>
 
-#include "host/mof/MofNumber.h"
+#include "host/mof/MofLexer.h"
 
 namespace cmpihost {
 
@@ -13,15 +15,11 @@ constexpr std::int64_t least = std::numeric_limits<std::int64_t>::min();
 constexpr std::int64_t most = std::numeric_limits<std::int64_t>::max();
 
 std::int64_t bound(const std::string& written, std::int64_t whenOpen) {
-    if (written.empty()) {
-        return whenOpen;
-    }
+    if (written.empty()) return whenOpen;
     mof::Scalar value;
     std::string complaint;
-    if (mof::readNumber(written, value, complaint)) {
-        if (const auto* number = std::get_if<std::int64_t>(&value)) {
-            return *number;
-        }
+    if (mof::parseNumber(written, value, complaint)) {
+        if (const auto* number = std::get_if<std::int64_t>(&value)) return *number;
         const auto* number = std::get_if<std::uint64_t>(&value);
         if (number != nullptr && *number <= static_cast<std::uint64_t>(most)) {
             return static_cast<std::int64_t>(*number);
@@ -39,9 +37,7 @@ bool isIntegerType(mof::Type type) {
 ValueMap::Entry ValueMap::entry(const std::string& range, const std::string& name) {
     const std::size_t dots = range.find("..");
     if (dots == std::string::npos) {
-        if (range.empty()) {
-            throw std::runtime_error("the ValueMap has an empty entry");
-        }
+        if (range.empty()) throw std::runtime_error("the ValueMap has an empty entry");
         const std::int64_t number = bound(range, 0);
         return {number, number, name};
     }
@@ -53,9 +49,7 @@ ValueMap ValueMap::of(const mof::Feature& property) {
     const std::vector<std::string> names = mof::texts(property.qualifiers, "Values");
     const std::vector<std::string> ranges = mof::texts(property.qualifiers, "ValueMap");
     const bool hasRanges = mof::findQualifier(property.qualifiers, "ValueMap") != nullptr;
-    if (names.empty() || !isIntegerType(property.type)) {
-        return result;
-    }
+    if (names.empty() || !isIntegerType(property.type)) return result;
     if (hasRanges && ranges.size() != names.size()) {
         throw std::runtime_error("ValueMap lists " + std::to_string(ranges.size()) +
                                  " entries and Values " + std::to_string(names.size()));
@@ -74,9 +68,7 @@ const std::string* ValueMap::find(std::int64_t number) const {
     };
     for (const Entry& entry : entries_) {
         const bool within = entry.lowest <= number && number <= entry.highest;
-        if (within && (best == nullptr || width(entry) < width(*best))) {
-            best = &entry;
-        }
+        if (within && (best == nullptr || width(entry) < width(*best))) best = &entry;
     }
     return best == nullptr ? nullptr : &best->name;
 }

@@ -1,10 +1,11 @@
-#pragma once
+#ifndef HOST_MOF_VALUE_MAP_H
+#define HOST_MOF_VALUE_MAP_H
 
 #include <cstdint>
 #include <string>
 #include <vector>
 
-#include "host/mof/MofSyntax.h"
+#include "host/mof/MofAst.h"
 
 namespace cmpihost {
 
@@ -35,3 +36,5 @@ class ValueMap {
 };
 
 }  // namespace cmpihost
+
+#endif

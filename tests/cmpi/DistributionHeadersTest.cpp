@@ -8,7 +8,6 @@
 #include "host/broker/LibraryService.h"
 #include "host/broker/ProviderLibrary.h"
 #include "host/mof/Schema.h"
-#include "host/mof/SchemaCatalogue.h"
 
 namespace {
 

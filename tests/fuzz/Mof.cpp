@@ -1,13 +1,11 @@
 // MOF: read, added to a schema, and its texts written and read back.
 #include <algorithm>
 
+#include "base/Utf8.h"
 #include "fuzz/Invariant.h"
-#include "host/cli/MofText.h"
 #include "host/mof/MofLexer.h"
 #include "host/mof/MofParser.h"
 #include "host/mof/Schema.h"
-#include "host/mof/SchemaCatalogue.h"
-#include "host/mof/Utf8.h"
 
 using namespace cmpihost;
 
@@ -18,7 +16,7 @@ void checkError(const mof::MofError& error, std::string_view text) {
     fuzz::expect(error.position().line >= 1 && error.position().line <= lines,
                  "an error lies on a line of the text");
     fuzz::expect(
-        error.position().column >= 1 && error.position().column <= countCharacters(text) + 1,
+        error.position().column >= 1 && error.position().column <= base::countUtf8(text) + 1,
         "an error lies on a column of the text");
     fuzz::expect(!error.complaint().empty(), "an error says what is wrong");
 }
@@ -41,9 +39,9 @@ void checkSchema(const Schema& schema) {
 }
 
 void checkText(std::string_view text) {
-    const std::string written = mofString(text);
+    const std::string written = mof::stringLiteral(text);
     mof::Lexer lexer(written, "written");
-    fuzz::expect(lexer.next().text == validUtf8(text), "a text is read back as it was written");
+    fuzz::expect(lexer.next().text == base::toValidUtf8(text), "a text is read back as it was written");
     fuzz::expect(lexer.next().kind == mof::TokenKind::End, "a text is one token");
 }
 

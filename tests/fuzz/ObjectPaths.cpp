@@ -2,9 +2,8 @@
 #include <algorithm>
 
 #include "fuzz/Invariant.h"
-#include "host/cli/PathText.h"
+#include "host/cli/PathParser.h"
 #include "host/mof/Schema.h"
-#include "host/mof/SchemaCatalogue.h"
 
 using namespace cmpihost;
 

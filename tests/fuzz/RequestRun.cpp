@@ -6,7 +6,6 @@
 #include "fuzz/StrictLog.h"
 #include "host/broker/ResultCollector.h"
 #include "host/mof/Schema.h"
-#include "host/mof/SchemaCatalogue.h"
 
 namespace fuzz {
 

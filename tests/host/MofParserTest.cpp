@@ -2,7 +2,7 @@
 
 #include <gmock/gmock.h>
 
-#include "host/mof/MofTypes.h"
+#include "host/mof/MofAst.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "host/mof/MofTypes.h"
+#include "host/mof/MofAst.h"
 
 #include <gtest/gtest.h>
 

@@ -1,4 +1,4 @@
-#include "host/cli/Notes.h"
+#include "host/cli/Diagnostics.h"
 
 #include <gtest/gtest.h>
 

@@ -2,10 +2,9 @@
 
 #include <gmock/gmock.h>
 
-#include "host/cli/PathText.h"
-#include "host/cli/UsageError.h"
+#include "host/cli/PathParser.h"
 #include "host/mof/MofParser.h"
-#include "host/mof/SchemaCatalogue.h"
+#include "host/mof/Schema.h"
 
 namespace {
 

@@ -1,8 +1,8 @@
 #include <gmock/gmock.h>
 
-#include "host/cli/PathText.h"
+#include "host/cli/PathParser.h"
 #include "host/mof/MofParser.h"
-#include "host/mof/SchemaCatalogue.h"
+#include "host/mof/Schema.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "host/cli/Places.h"
+#include "host/cli/InstallPaths.h"
 
 #include <gmock/gmock.h>
 #include <stdlib.h>

@@ -1,4 +1,4 @@
-#include "host/cli/ReadableText.h"
+#include "host/cli/ValueText.h"
 
 #include <gtest/gtest.h>
 #include <stdlib.h>
@@ -9,20 +9,20 @@ namespace {
 using namespace cmpihost;
 
 TEST(ReadableSize, ChoosesTheLargestUnitThatLeavesAtLeastOne) {
-    EXPECT_EQ(readableSize(0), "0 KiB");
-    EXPECT_EQ(readableSize(1023), "1023 KiB");
-    EXPECT_EQ(readableSize(1024), "1.0 MiB");
-    EXPECT_EQ(readableSize(1536), "1.5 MiB");
-    EXPECT_EQ(readableSize(8123456), "7.7 GiB");
-    EXPECT_EQ(readableSize(4294967295), "4.0 TiB");
-    EXPECT_EQ(readableSize(18446744073709551615U), "16.0 ZiB");
+    EXPECT_EQ(humanReadableSize(0), "0 KiB");
+    EXPECT_EQ(humanReadableSize(1023), "1023 KiB");
+    EXPECT_EQ(humanReadableSize(1024), "1.0 MiB");
+    EXPECT_EQ(humanReadableSize(1536), "1.5 MiB");
+    EXPECT_EQ(humanReadableSize(8123456), "7.7 GiB");
+    EXPECT_EQ(humanReadableSize(4294967295), "4.0 TiB");
+    EXPECT_EQ(humanReadableSize(18446744073709551615U), "16.0 ZiB");
 }
 
 TEST(ReadableSize, RoundsIntoTheNextUnit) {
-    EXPECT_EQ(readableSize(1024 * 1024 - 1), "1.0 GiB");
-    EXPECT_EQ(readableSize(1023 * 1024), "1023.0 MiB");
-    EXPECT_EQ(readableSize(1024 + 972), "1.9 MiB");
-    EXPECT_EQ(readableSize(1024 + 973), "2.0 MiB");
+    EXPECT_EQ(humanReadableSize(1024 * 1024 - 1), "1.0 GiB");
+    EXPECT_EQ(humanReadableSize(1023 * 1024), "1023.0 MiB");
+    EXPECT_EQ(humanReadableSize(1024 + 972), "1.9 MiB");
+    EXPECT_EQ(humanReadableSize(1024 + 973), "2.0 MiB");
 }
 
 class ReadableDateTime : public testing::Test {
@@ -36,32 +36,32 @@ class ReadableDateTime : public testing::Test {
 };
 
 TEST_F(ReadableDateTime, ShowsAnInstantInTheZoneOfTheReader) {
-    EXPECT_EQ(readableDateTime("20240102030405.000000+000"), "2024-01-02 03:04:05 +00:00");
+    EXPECT_EQ(humanReadableDateTime("20240102030405.000000+000"), "2024-01-02 03:04:05 +00:00");
     setZone("CET-1");
-    EXPECT_EQ(readableDateTime("20240102030405.000000+000"), "2024-01-02 04:04:05 +01:00");
+    EXPECT_EQ(humanReadableDateTime("20240102030405.000000+000"), "2024-01-02 04:04:05 +01:00");
     setZone("NST3:30");
-    EXPECT_EQ(readableDateTime("20240102030405.000000+000"), "2024-01-01 23:34:05 -03:30");
+    EXPECT_EQ(humanReadableDateTime("20240102030405.000000+000"), "2024-01-01 23:34:05 -03:30");
 }
 
 TEST_F(ReadableDateTime, TakesTheOffsetOffTheDigits) {
-    EXPECT_EQ(readableDateTime("20240102080405.000000+300"), "2024-01-02 03:04:05 +00:00");
-    EXPECT_EQ(readableDateTime("20240101213405.000000-330"), "2024-01-02 03:04:05 +00:00");
+    EXPECT_EQ(humanReadableDateTime("20240102080405.000000+300"), "2024-01-02 03:04:05 +00:00");
+    EXPECT_EQ(humanReadableDateTime("20240101213405.000000-330"), "2024-01-02 03:04:05 +00:00");
 }
 
 TEST_F(ReadableDateTime, ShowsAYearBeyondThirtyTwoBits) {
-    EXPECT_EQ(readableDateTime("21060708091011.000000+000"), "2106-07-08 09:10:11 +00:00");
+    EXPECT_EQ(humanReadableDateTime("21060708091011.000000+000"), "2106-07-08 09:10:11 +00:00");
 }
 
 TEST_F(ReadableDateTime, ShowsIntervals) {
-    EXPECT_EQ(readableDateTime("00000003040506.000000:000"), "3 days 04:05:06");
-    EXPECT_EQ(readableDateTime("00000001000000.000000:000"), "1 day 00:00:00");
+    EXPECT_EQ(humanReadableDateTime("00000003040506.000000:000"), "3 days 04:05:06");
+    EXPECT_EQ(humanReadableDateTime("00000001000000.000000:000"), "1 day 00:00:00");
 }
 
 TEST_F(ReadableDateTime, SaysNothingAboutATextThatIsNone) {
     for (const char* text :
          {"", "yesterday", "   00000000000.000000+000", "20241302030405.000000+000",
           "2024010203****.000000+000", "20240102030405.000000", "19691231235959.000000+000"}) {
-        EXPECT_EQ(readableDateTime(text), "") << text;
+        EXPECT_EQ(humanReadableDateTime(text), "") << text;
     }
 }
 

@@ -1,4 +1,4 @@
-#include "host/cli/RecordsOnStderr.h"
+#include "host/cli/ProviderHost.h"
 
 #include <gmock/gmock.h>
 #include <signal.h>
@@ -34,7 +34,7 @@ class LowLimit {
 /// The error number that making the object fails with; 0 when it does not.
 int failure() {
     try {
-        const RecordsOnStderr records;
+        const ScopedStderrLog records;
     } catch (const std::system_error& error) {
         EXPECT_THAT(error.what(), testing::StartsWith("the records cannot be shown: "));
         return error.code().value();
@@ -50,7 +50,7 @@ std::ptrdiff_t openFiles() {
 TEST(RecordsOnStderr, ConfiguresTheLogAsLongAsItLives) {
     const std::ptrdiff_t before = openFiles();
     {
-        const RecordsOnStderr records;
+        const ScopedStderrLog records;
         std::ostringstream configuration;
         configuration << std::ifstream(std::getenv("ZBLOG_CONF")).rdbuf();
         EXPECT_EQ(configuration.str(),

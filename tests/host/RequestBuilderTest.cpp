@@ -2,9 +2,8 @@
 
 #include <gmock/gmock.h>
 
-#include "host/cli/UsageError.h"
 #include "host/mof/MofParser.h"
-#include "host/mof/SchemaCatalogue.h"
+#include "host/mof/Schema.h"
 
 namespace {
 

@@ -6,8 +6,7 @@
 #include <fstream>
 
 #include "host/mof/MofParser.h"
-#include "host/mof/Names.h"
-#include "host/mof/SchemaCatalogue.h"
+#include "host/mof/Schema.h"
 
 namespace {
 
@@ -145,10 +144,6 @@ TEST_F(SchemaFolder, WithAFileThatLeadsNowhereSaysWhichOne) {
 TEST_F(SchemaFolder, WithoutAClassIsRefused) {
     EXPECT_THROW(Schema::load(folder_), std::runtime_error);
     EXPECT_THROW(Schema::load(folder_ / "missing"), std::runtime_error);
-}
-
-TEST(Names, CompareWithTheirAsciiLettersInLowerCase) {
-    EXPECT_EQ(cmpihost::lowered("@AZ[`az{_09\xC3\x89"), "@az[`az{_09\xC3\x89");
 }
 
 TEST(SchemaCatalogue, ShowsTheBrokerWhatTheSchemaDeclares) {

@@ -1,4 +1,4 @@
-#include "host/cli/StatusText.h"
+#include "host/cli/Diagnostics.h"
 
 #include <gtest/gtest.h>
 

@@ -2,7 +2,6 @@
 
 #include "framework/instrumentation/HostSource.h"
 #include "host/mof/Schema.h"
-#include "host/mof/SchemaCatalogue.h"
 
 using namespace cmpihost;
 

@@ -1,7 +1,6 @@
 #include "load/Loaded.h"
 
 #include "host/mof/Schema.h"
-#include "host/mof/SchemaCatalogue.h"
 
 namespace load {
 

@@ -11,7 +11,6 @@
 #include "host/broker/Invoke.h"
 #include "host/broker/ProviderLibrary.h"
 #include "host/mof/Schema.h"
-#include "host/mof/SchemaCatalogue.h"
 
 namespace {
 

@@ -7,7 +7,6 @@
 #include "CMPIOperatingSystemCapabilities.h"
 #include "host/broker/Value.h"
 #include "host/mof/Schema.h"
-#include "host/mof/SchemaCatalogue.h"
 
 // The tables of the adapters, held against the classes that schema/ declares.
 

@@ -4,7 +4,7 @@
 #include <algorithm>
 #include <set>
 
-#include "host/mof/MofTypes.h"
+#include "host/mof/MofAst.h"
 #include "host/mof/Schema.h"
 
 namespace {

@@ -1,4 +1,5 @@
-#pragma once
+#ifndef HOST_CLI_DIAGNOSTICS_H
+#define HOST_CLI_DIAGNOSTICS_H
 
 #include <string>
 
@@ -6,6 +7,13 @@
 #include "host/mof/Schema.h"
 
 namespace cmpihost {
+
+/// The name of a status with its number, as WBEM users know it: "CIM_ERR_NOT_FOUND (6)". A number
+/// without a name gives "CMPI status 150".
+std::string statusText(CMPIrc rc);
+
+/// A failed operation in one line: the status and, if there is one, its message.
+std::string failureText(const OperationResult& result);
 
 /// What a user should know about an answer that is no failure: that an object manager would do
 /// otherwise with it, that a name in the property list is that of no declared property, that an
@@ -21,3 +29,5 @@ std::string hintFor(const OperationRequest& request, const OperationResult& fail
                     const Schema& schema);
 
 }  // namespace cmpihost
+
+#endif

@@ -1,22 +1,55 @@
-#include "host/cli/Notes.h"
+// What goes to the standard error beside results. Statuses bear the names of the CIM standard, and
+// what the schema knows better than the provider (a misspelt name) is told as a note or a hint: the
+// provider itself answers with nothing at all.
+#include "host/cli/Diagnostics.h"
 
 #include <algorithm>
 #include <optional>
 #include <vector>
 
-#include "host/cli/StatusText.h"
-#include "host/cli/TerminalText.h"
+#include "base/Ascii.h"
+#include "base/Utf8.h"
 
 namespace cmpihost {
 
 namespace {
 
+struct StatusRow {
+    CMPIrc rc;
+    const char* name;
+};
+
+constexpr StatusRow statuses[] = {
+    {CMPI_RC_OK, "CIM_ERR_SUCCESS"},
+    {CMPI_RC_ERR_FAILED, "CIM_ERR_FAILED"},
+    {CMPI_RC_ERR_ACCESS_DENIED, "CIM_ERR_ACCESS_DENIED"},
+    {CMPI_RC_ERR_INVALID_NAMESPACE, "CIM_ERR_INVALID_NAMESPACE"},
+    {CMPI_RC_ERR_INVALID_PARAMETER, "CIM_ERR_INVALID_PARAMETER"},
+    {CMPI_RC_ERR_INVALID_CLASS, "CIM_ERR_INVALID_CLASS"},
+    {CMPI_RC_ERR_NOT_FOUND, "CIM_ERR_NOT_FOUND"},
+    {CMPI_RC_ERR_NOT_SUPPORTED, "CIM_ERR_NOT_SUPPORTED"},
+    {CMPI_RC_ERR_CLASS_HAS_CHILDREN, "CIM_ERR_CLASS_HAS_CHILDREN"},
+    {CMPI_RC_ERR_CLASS_HAS_INSTANCES, "CIM_ERR_CLASS_HAS_INSTANCES"},
+    {CMPI_RC_ERR_INVALID_SUPERCLASS, "CIM_ERR_INVALID_SUPERCLASS"},
+    {CMPI_RC_ERR_ALREADY_EXISTS, "CIM_ERR_ALREADY_EXISTS"},
+    {CMPI_RC_ERR_NO_SUCH_PROPERTY, "CIM_ERR_NO_SUCH_PROPERTY"},
+    {CMPI_RC_ERR_TYPE_MISMATCH, "CIM_ERR_TYPE_MISMATCH"},
+    {CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED, "CIM_ERR_QUERY_LANGUAGE_NOT_SUPPORTED"},
+    {CMPI_RC_ERR_INVALID_QUERY, "CIM_ERR_INVALID_QUERY"},
+    {CMPI_RC_ERR_METHOD_NOT_AVAILABLE, "CIM_ERR_METHOD_NOT_AVAILABLE"},
+    {CMPI_RC_ERR_METHOD_NOT_FOUND, "CIM_ERR_METHOD_NOT_FOUND"},
+    {CMPI_RC_DO_NOT_UNLOAD, "CMPI_RC_DO_NOT_UNLOAD"},
+    {CMPI_RC_NEVER_UNLOAD, "CMPI_RC_NEVER_UNLOAD"},
+    {CMPI_RC_ERR_INVALID_HANDLE, "CMPI_RC_ERR_INVALID_HANDLE"},
+    {CMPI_RC_ERR_INVALID_DATA_TYPE, "CMPI_RC_ERR_INVALID_DATA_TYPE"},
+    {CMPI_RC_ERROR_SYSTEM, "CMPI_RC_ERROR_SYSTEM"},
+    {CMPI_RC_ERROR, "CMPI_RC_ERROR"},
+};
+
 /// GetInstance is to return one instance.
 std::string noteOnCount(const OperationResult& result) {
     const std::size_t count = result.instances.size();
-    if (count == 1) {
-        return {};
-    }
+    if (count == 1) return {};
     return count == 0 ? "note: no instance was returned; an object manager answers " +
                             statusText(CMPI_RC_ERR_NOT_FOUND) + "\n"
                       : "note: " + std::to_string(count) +
@@ -32,10 +65,10 @@ std::vector<std::string> classesOf(const OperationRequest& request, const Operat
     }
     for (const InstanceValue& instance : result.instances) {
         const std::string& name = instance.path.className;
-        const auto isSame = [&](const std::string& other) { return equalNames(name, other); };
-        if (std::none_of(classes.begin(), classes.end(), isSame)) {
-            classes.push_back(name);
-        }
+        const auto isSame = [&](const std::string& other) {
+            return base::equalsIgnoreCase(name, other);
+        };
+        if (std::none_of(classes.begin(), classes.end(), isSame)) classes.push_back(name);
     }
     return classes;
 }
@@ -55,7 +88,7 @@ std::string notesOnNames(const OperationRequest& request, const OperationResult&
         };
         if (!classes.empty() && std::none_of(classes.begin(), classes.end(), declaresIt)) {
             notes += "note: the class " + schema.find(classes.front())->name +
-                     " declares no property '" + terminalText(name) + "'\n";
+                     " declares no property '" + base::escapeForTerminal(name) + "'\n";
         }
     }
     return notes;
@@ -68,7 +101,7 @@ bool startsFromAnInstance(Operation operation) {
 
 /// The classes of the CIM schema are ancestors that no file needs to declare.
 bool mayBeClass(const Schema& schema, const std::string& name) {
-    return schema.find(name) != nullptr || equalNames(name.substr(0, 4), "CIM_");
+    return schema.find(name) != nullptr || base::equalsIgnoreCase(name.substr(0, 4), "CIM_");
 }
 
 bool isRole(const Schema& schema, const std::string& name) {
@@ -86,18 +119,14 @@ std::string linesOnUnknownNames(const std::string& start, const OperationRequest
                                 const Schema& schema) {
     std::string lines;
     const auto tell = [&](const std::string& what, const std::string& name) {
-        lines += start + what + " '" + terminalText(name) + "'\n";
+        lines += start + what + " '" + base::escapeForTerminal(name) + "'\n";
     };
     const std::string& source = request.path.className;
     for (const auto& name : {std::optional(source), request.assocClass, request.resultClass}) {
-        if (name && !mayBeClass(schema, *name)) {
-            tell("the schema has no class", *name);
-        }
+        if (name && !mayBeClass(schema, *name)) tell("the schema has no class", *name);
     }
     for (const auto& name : {request.role, request.resultRole}) {
-        if (name && !isRole(schema, *name)) {
-            tell("no association of the schema has a role", *name);
-        }
+        if (name && !isRole(schema, *name)) tell("no association of the schema has a role", *name);
     }
     for (const KeyBinding& key : request.path.keys) {
         if (schema.find(source) != nullptr && !schema.isKey(source, key.name)) {
@@ -118,18 +147,27 @@ bool yieldsInstances(Operation operation) {
 
 }  // namespace
 
+std::string statusText(CMPIrc rc) {
+    const std::string number = std::to_string(static_cast<unsigned>(rc));
+    for (const StatusRow& row : statuses) {
+        if (row.rc == rc) return std::string(row.name) + " (" + number + ")";
+    }
+    return "CMPI status " + number;
+}
+
+std::string failureText(const OperationResult& result) {
+    const std::string message = base::escapeForTerminal(result.message.value_or(std::string()));
+    return statusText(result.rc) + (message.empty() ? "" : ": " + message);
+}
+
 std::string notesOn(const OperationRequest& request, const OperationResult& result,
                     const Schema& schema) {
     std::string notes;
-    if (request.operation == Operation::GetInstance) {
-        notes = noteOnCount(result);
-    }
+    if (request.operation == Operation::GetInstance) notes = noteOnCount(result);
     if (startsFromAnInstance(request.operation) && isEmpty(result)) {
         notes += linesOnUnknownNames("note: ", request, schema);
     }
-    if (yieldsInstances(request.operation)) {
-        notes += notesOnNames(request, result, schema);
-    }
+    if (yieldsInstances(request.operation)) notes += notesOnNames(request, result, schema);
     return notes;
 }
 
@@ -137,18 +175,12 @@ std::string hintFor(const OperationRequest& request, const OperationResult& fail
                     const Schema& schema) {
     const bool associators = request.operation == Operation::Associators ||
                              request.operation == Operation::AssociatorNames;
-    if (!associators || failure.rc != CMPI_RC_ERR_INVALID_CLASS) {
-        return {};
-    }
+    if (!associators || failure.rc != CMPI_RC_ERR_INVALID_CLASS) return {};
     const std::string unknown = linesOnUnknownNames("hint: ", request, schema);
-    if (request.assocClass) {
-        return unknown;
-    }
+    if (request.assocClass) return unknown;
     std::string names;
     for (const std::string& name : schema.classNames()) {
-        if (schema.isAssociation(name)) {
-            names += (names.empty() ? "" : ", ") + name;
-        }
+        if (schema.isAssociation(name)) names += (names.empty() ? "" : ", ") + name;
     }
     return unknown + "hint: name the association with --assoc-class" +
            (names.empty() ? "" : ", one of " + names) + "\n";

@@ -1,4 +1,5 @@
-#pragma once
+#ifndef HOST_CLI_PATH_PARSER_H
+#define HOST_CLI_PATH_PARSER_H
 
 #include <stdexcept>
 #include <string>
@@ -11,9 +12,15 @@ namespace cmpihost {
 /// The namespace of a path that names none.
 constexpr const char* defaultNamespace = "root/cimv2";
 
+/// What the user asked for makes no sense; what() says why, safe to print on a terminal.
+class UsageError : public std::runtime_error {
+  public:
+    using std::runtime_error::runtime_error;
+};
+
 /// A text that is no object path. what() is three lines: the complaint, the text, and a caret under
-/// the character that the complaint is about. It is safe to print on a terminal.
-class PathError : public std::runtime_error {
+/// the character that the complaint is about.
+class PathError : public UsageError {
   public:
     /// `offset` is the byte of `text` that is meant; the size of the text means its end.
     PathError(const std::string& text, std::size_t offset, const std::string& complaint);
@@ -44,3 +51,5 @@ std::string parseNamespace(const std::string& text);
 std::string writePath(const ObjectPathValue& path);
 
 }  // namespace cmpihost
+
+#endif

@@ -1,4 +1,6 @@
-#include "host/cli/Places.h"
+// Everything is found relative to the program, so that a build tree, an installation under any
+// prefix and an unpacked package all work without configuration.
+#include "host/cli/InstallPaths.h"
 
 #include <algorithm>
 #include <string>
@@ -9,15 +11,13 @@ namespace fs = std::filesystem;
 
 namespace {
 
+/// In the order of Library.
+constexpr const char* fileNames[] = {"libkorzbosstatusprofileprovider.so",
+                                     "libkorvaosstatusfacade.so",
+                                     "libkorvacomputersystemprovider.so"};
+
 std::string fileName(Library library) {
-    switch (library) {
-        case Library::Facade:
-            return "libkorvaosstatusfacade.so";
-        case Library::Companion:
-            return "libkorvacomputersystemprovider.so";
-        default:
-            return "libkorzbosstatusprofileprovider.so";
-    }
+    return fileNames[static_cast<std::size_t>(library)];
 }
 
 /// The folders that object managers load providers from, below a prefix: the one that the providers
@@ -35,9 +35,7 @@ std::vector<fs::path> cmpiFolders(const fs::path& installed) {
 fs::path programFolder(const std::string& invokedAs, const fs::path& ownFile) {
     std::error_code error;
     fs::path file = fs::read_symlink(ownFile, error);
-    if (!error) {
-        return file.parent_path();
-    }
+    if (!error) return file.parent_path();
     const bool bare = invokedAs.find('/') == std::string::npos;
     file = bare ? fs::path() : fs::canonical(invokedAs, error);
     return file.empty() ? fs::path(KORVA_PROGRAM_FOLDER) : file.parent_path();
@@ -71,9 +69,7 @@ std::vector<fs::path> candidates(Library library, const fs::path& programFolder,
 fs::path findLibrary(Library library, const fs::path& programFolder, const fs::path& installed) {
     for (const fs::path& candidate : candidates(library, programFolder, installed)) {
         std::error_code error;
-        if (fs::is_regular_file(candidate, error)) {
-            return candidate;
-        }
+        if (fs::is_regular_file(candidate, error)) return candidate;
     }
     return {};
 }

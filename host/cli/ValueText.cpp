@@ -1,11 +1,12 @@
-#include "host/cli/ReadableText.h"
+// The parts of values that the printers, the tree and the writer of paths share.
+#include "host/cli/ValueText.h"
 
 #include <charconv>
 #include <cstdio>
 #include <ctime>
 
+#include "base/Utf8.h"
 #include "host/broker/DateTimeText.h"
-#include "host/mof/Utf8.h"
 
 namespace cmpihost {
 
@@ -24,9 +25,7 @@ std::string instantText(std::uint64_t seconds) {
     static_assert(sizeof(std::time_t) == 8, "an instant of any year is to be shown");
     const auto instant = static_cast<std::time_t>(seconds);
     std::tm local{};
-    if (localtime_r(&instant, &local) == nullptr) {
-        return {};
-    }
+    if (localtime_r(&instant, &local) == nullptr) return {};
     const long offset = local.tm_gmtoff / 60;
     const long minutes = offset < 0 ? -offset : offset;
     return formatted("%04d-%02d-%02d %02d:%02d:%02d %c%02ld:%02ld", local.tm_year + 1900,
@@ -50,7 +49,39 @@ std::string shortest(Real real) {
 
 }  // namespace
 
-std::string readableSize(std::uint64_t kibibytes) {
+TypeCategory categoryOf(const Value& value) {
+    if (value.isNull()) return TypeCategory::Null;
+    if (value.isArray()) return TypeCategory::Array;
+    switch (value.type()) {
+        case CMPI_boolean:
+            return TypeCategory::Boolean;
+        case CMPI_uint8:
+        case CMPI_uint16:
+        case CMPI_uint32:
+        case CMPI_uint64:
+            return TypeCategory::Unsigned;
+        case CMPI_sint8:
+        case CMPI_sint16:
+        case CMPI_sint32:
+        case CMPI_sint64:
+            return TypeCategory::Signed;
+        case CMPI_real32:
+        case CMPI_real64:
+            return TypeCategory::Real;
+        case CMPI_char16:
+            return TypeCategory::Character;
+        case CMPI_dateTime:
+            return TypeCategory::DateTime;
+        case CMPI_ref:
+            return TypeCategory::Reference;
+        case CMPI_instance:
+            return TypeCategory::Instance;
+        default:
+            return value.isText() ? TypeCategory::Text : TypeCategory::Opaque;
+    }
+}
+
+std::string humanReadableSize(std::uint64_t kibibytes) {
     constexpr const char* units[] = {"KiB", "MiB", "GiB", "TiB", "PiB", "EiB", "ZiB"};
     std::size_t unit = 0;
     std::uint64_t whole = kibibytes;
@@ -60,9 +91,7 @@ std::string readableSize(std::uint64_t kibibytes) {
         whole /= 1024;
         ++unit;
     }
-    if (unit == 0) {
-        return std::to_string(whole) + " KiB";
-    }
+    if (unit == 0) return std::to_string(whole) + " KiB";
     std::uint64_t tenths = whole * 10 + (rest * 10 + 512) / 1024;
     if (tenths >= 10240) {
         tenths = 10;
@@ -71,11 +100,9 @@ std::string readableSize(std::uint64_t kibibytes) {
     return std::to_string(tenths / 10) + "." + std::to_string(tenths % 10) + " " + units[unit];
 }
 
-std::string readableDateTime(const std::string& cimText) {
+std::string humanReadableDateTime(const std::string& cimText) {
     const auto parsed = parseDateTime(cimText);
-    if (!parsed || !parsed->microseconds || cimText.find('*') != std::string::npos) {
-        return {};
-    }
+    if (!parsed || !parsed->microseconds || cimText.find('*') != std::string::npos) return {};
     const std::uint64_t seconds = *parsed->microseconds / microsecondsPerSecond;
     return parsed->interval ? intervalText(seconds) : instantText(seconds);
 }
@@ -86,7 +113,7 @@ std::string realText(double real, CMPIType type) {
 
 std::string characterText(std::uint64_t code) {
     std::string text;
-    appendUtf8(text, static_cast<std::uint32_t>(code));
+    base::appendUtf8(text, static_cast<char32_t>(code));
     return text;
 }
 

@@ -1,4 +1,5 @@
-#pragma once
+#ifndef HOST_CLI_INSTALL_PATHS_H
+#define HOST_CLI_INSTALL_PATHS_H
 
 #include <filesystem>
 #include <string>
@@ -39,3 +40,5 @@ std::filesystem::path findLibrary(
 std::string providerName(const std::filesystem::path& file);
 
 }  // namespace cmpihost
+
+#endif

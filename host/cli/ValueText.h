@@ -1,4 +1,5 @@
-#pragma once
+#ifndef HOST_CLI_VALUE_TEXT_H
+#define HOST_CLI_VALUE_TEXT_H
 
 #include <cstdint>
 #include <string>
@@ -7,14 +8,34 @@
 
 namespace cmpihost {
 
+/// The ways in which a value is written: types that are written alike are of one category.
+enum class TypeCategory {
+    Null,
+    Boolean,
+    Unsigned,
+    Signed,
+    Real,
+    Text,
+    DateTime,
+    Character,
+    Reference,
+    Instance,
+    Array,
+    /// Bytes that only their provider understands.
+    Opaque
+};
+
+/// Null for a null of any type; the accessor of Value that belongs to the category never throws.
+TypeCategory categoryOf(const Value& value);
+
 /// A size in the largest binary unit that leaves at least one: 8123456 gives "7.7 GiB", 512 gives
 /// "512 KiB". One digit after the point, rounded half up.
-std::string readableSize(std::uint64_t kibibytes);
+std::string humanReadableSize(std::uint64_t kibibytes);
 
 /// A CIM datetime for people: an instant in the time zone of this process ("2024-01-02 04:04:05
 /// +01:00"), an interval as "3 days 04:05:06". Empty for a text that is neither, and for one that
 /// leaves digits open with '*'.
-std::string readableDateTime(const std::string& cimText);
+std::string humanReadableDateTime(const std::string& cimText);
 
 /// The shortest decimal that gives the real back, in the precision of its type.
 std::string realText(double real, CMPIType type);
@@ -23,3 +44,5 @@ std::string realText(double real, CMPIType type);
 std::string characterText(std::uint64_t code);
 
 }  // namespace cmpihost
+
+#endif

@@ -1,15 +1,36 @@
-#pragma once
+#ifndef HOST_MOF_MOF_AST_H
+#define HOST_MOF_MOF_AST_H
 
+#include <cstddef>
 #include <cstdint>
 #include <optional>
+#include <stdexcept>
 #include <string>
 #include <variant>
 #include <vector>
 
-#include "host/mof/MofError.h"
-
 /// What a MOF text says, piece by piece and unjudged: plain data, copied freely.
 namespace cmpihost::mof {
+
+/// A place in a text; both count from 1, columns in characters (not bytes) of UTF-8.
+struct Position {
+    std::size_t line = 1;
+    std::size_t column = 1;
+};
+
+/// A MOF text that cannot be read. what() is "FILE:LINE:COLUMN: what was expected".
+class MofError : public std::runtime_error {
+  public:
+    MofError(const std::string& file, Position position, const std::string& complaint);
+
+    /// What was expected, without the place.
+    const std::string& complaint() const { return complaint_; }
+    Position position() const { return position_; }
+
+  private:
+    std::string complaint_;
+    Position position_;
+};
 
 enum class Type {
     Boolean,
@@ -41,7 +62,7 @@ using Scalar =
     std::variant<std::monostate, bool, std::uint64_t, std::int64_t, double, Character, std::string>;
 
 /// A constant or a list of constants in braces; without braces there is exactly one item.
-struct Value {
+struct Initializer {
     bool array = false;
     std::vector<Scalar> items;
 };
@@ -50,7 +71,7 @@ struct Qualifier {
     std::string name;
     Position position;
     /// Absent where the qualifier stands alone, which says "true".
-    std::optional<Value> value;
+    std::optional<Initializer> value;
 };
 
 /// A property, a reference or the parameter of a method.
@@ -61,7 +82,7 @@ struct Feature {
     /// The class that a reference points to; empty for every other type.
     std::string referenceClass;
     bool array = false;
-    std::optional<Value> defaultValue;
+    std::optional<Initializer> defaultValue;
     std::vector<Qualifier> qualifiers;
 };
 
@@ -86,6 +107,16 @@ struct Document {
     std::vector<std::string> includes;
 };
 
+/// The type of that name (without case); absent for a name that is no intrinsic type.
+std::optional<Type> typeNamed(const std::string& name);
+
+/// The name as MOF writes it; "ref" for a reference.
+const char* nameOf(Type type);
+
+/// Whether a constant can stand for a value of the type: its kind is right and it is in range.
+/// NULL fits every type.
+bool fits(const Scalar& scalar, Type type);
+
 /// The qualifier of that name (without case), or null.
 const Qualifier* findQualifier(const std::vector<Qualifier>& qualifiers, const std::string& name);
 
@@ -99,3 +130,5 @@ std::vector<std::string> texts(const std::vector<Qualifier>& qualifiers, const s
 std::string text(const std::vector<Qualifier>& qualifiers, const std::string& name);
 
 }  // namespace cmpihost::mof
+
+#endif
