@@ -1,3 +1,6 @@
+// The computer system belongs to another provider: it is asked of the object manager, in a call
+// from within the request, and handed on as it came.
+
 #include "CMPIComputerSystem.h"
 
 #include <utility>
@@ -8,7 +11,7 @@
 namespace VA::OSStatusProvider {
 
 static const std::string loggerCMPIOSComputerSystem("Zumbrel.OperatingSystemProvider");
-static constexpr UnitLog records("CMPIComputerSystem.cpp", loggerCMPIOSComputerSystem);
+static constexpr UnitLog log("CMPIComputerSystem.cpp", loggerCMPIOSComputerSystem);
 
 namespace {
 
@@ -30,21 +33,21 @@ bool fetch(const CMPIEnumeration* enumeration, CMPIInstance*& instance) {
 CMPIOSComputerSystem::CMPIOSComputerSystem(const CMPIBroker* _broker, const CMPIContext* _context,
                                            std::string _nameSpace)
     : broker(_broker), context(_context), nameSpace(std::move(_nameSpace)) {
-    records.method();
+    log.method();
 }
 
 CMPIOSComputerSystem::~CMPIOSComputerSystem() noexcept(false) {
-    records.destructor();
+    log.destructor();
 }
 
 void CMPIOSComputerSystem::setObjectPath(const CMPIObjectPath* objectPath) {
     const ParameterList parameters(" objectPath=", objectPath);
-    records.entering(parameters);
+    log.entering(parameters);
     // Without a path there is nothing to ask for; a broker might not survive the question.
     if (objectPath == nullptr || !fetchFirst(objectPath))
         throw VA::ProviderException("Could not obtain an instance of Computer System");
     firstPending = true;
-    records.exiting(parameters);
+    log.exiting(parameters);
 }
 
 bool CMPIOSComputerSystem::fetchFirst(const CMPIObjectPath* objectPath) {
@@ -55,24 +58,24 @@ bool CMPIOSComputerSystem::fetchFirst(const CMPIObjectPath* objectPath) {
 }
 
 CMPIObjectPath* CMPIOSComputerSystem::getObjectPath() {
-    records.entering();
+    log.entering();
     CMPIObjectPath* path = nullptr;
     if (instance != nullptr) {
         CMPIStatus status = {CMPI_RC_OK, nullptr};
         path = instance->ft->getObjectPath(instance, &status);
         if (status.rc != CMPI_RC_OK) path = nullptr;
     }
-    records.exiting();
+    log.exiting();
     return path;
 }
 
 CMPIInstance* CMPIOSComputerSystem::getCMPIInstance(const char**) {
-    records.method();
+    log.method();
     return instance;
 }
 
 CMPIOSComputerSystem::operator bool() {
-    records.entering();
+    log.entering();
     bool current = false;
     if (firstPending) {
         firstPending = false;
@@ -80,15 +83,15 @@ CMPIOSComputerSystem::operator bool() {
     } else if (enumeration != nullptr) {
         current = hasNext(enumeration);
     }
-    records.exiting();
+    log.exiting();
     return current;
 }
 
 CMPIOSComputerSystem& CMPIOSComputerSystem::operator++() {
-    records.entering();
+    log.entering();
     instance = nullptr;
     if (enumeration != nullptr) fetch(enumeration, instance);
-    records.exiting();
+    log.exiting();
     return *this;
 }
 

@@ -1,5 +1,5 @@
-#ifndef OSSTATUS_CMPI_COMPUTER_SYSTEM_H
-#define OSSTATUS_CMPI_COMPUTER_SYSTEM_H
+#ifndef PROVIDER_CMPI_COMPUTER_SYSTEM_H
+#define PROVIDER_CMPI_COMPUTER_SYSTEM_H
 
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>

@@ -1,7 +1,11 @@
+// The association of operating systems with their capabilities has ends, records and a walk of its
+// own shape, and so is no ComputerSystemAssociation. Some of its operations leave without an
+// exiting record; whoever reads the records relies on that.
+
 #include "CMPIElementCapabilities.h"
 
+#include "AssociationPaths.h"
 #include "ClassIds.h"
-#include "FarEnd.h"
 #include "InstrumentationException.h"
 #include "ProviderUtilities.h"
 #include "UnitLog.h"
@@ -11,7 +15,7 @@ namespace VA::OSStatusProvider {
 using Utilities = VA::ProviderUtilities;
 
 static const std::string loggerCMPIOSElementCapabilities("Zumbrel.OperatingSystemProvider");
-static constexpr UnitLog records("CMPIElementCapabilities.cpp", loggerCMPIOSElementCapabilities);
+static constexpr UnitLog log("CMPIElementCapabilities.cpp", loggerCMPIOSElementCapabilities);
 
 CMPIOSElementCapabilities::CMPIOSElementCapabilities(const CMPIBroker* _broker,
                                                      const CMPIContext* _context,
@@ -22,9 +26,9 @@ CMPIOSElementCapabilities::CMPIOSElementCapabilities(const CMPIBroker* _broker,
       capabilities(broker, context, nameSpace),
       operatingSystem(broker, context, nameSpace) {
     const ParameterList parameters(broker, context, objectPath);
-    records.entering(parameters);
+    log.entering(parameters);
     requestedClassId = Utilities::getClassId(objectPath);
-    records.variable("requestedClassId", requestedClassId);
+    log.variable("requestedClassId", requestedClassId);
     switch (requestedClassId) {
         case operatingSystemCapabilitiesId:
             operatingSystem.setObjectPath(locateOperatingSystem(objectPath));
@@ -36,16 +40,16 @@ CMPIOSElementCapabilities::CMPIOSElementCapabilities(const CMPIBroker* _broker,
             capabilities.setObjectPath(locateCapabilities(objectPath));
             break;
     }
-    records.exiting(parameters);
+    log.exiting(parameters);
 }
 
 CMPIOSElementCapabilities::~CMPIOSElementCapabilities() noexcept(false) {
-    records.destructor();
+    log.destructor();
 }
 
 bool CMPIOSElementCapabilities::setObjectPath(const CMPIObjectPath* objectPath) {
     const ParameterList parameters(" objectPath=", objectPath);
-    records.entering(parameters);
+    log.entering(parameters);
     if (Utilities::getKeyCount(objectPath) == 0) {
         if (!operatingSystem) return false;
         pairWithCurrentOperatingSystem();
@@ -53,7 +57,7 @@ bool CMPIOSElementCapabilities::setObjectPath(const CMPIObjectPath* objectPath) 
         singleInstance = true;
         if (!setKeyedObjectPath(objectPath)) return false;
     }
-    records.exiting(parameters);
+    log.exiting(parameters);
     return true;
 }
 
@@ -79,40 +83,40 @@ void CMPIOSElementCapabilities::pairWithCurrentOperatingSystem() {
 }
 
 CMPIObjectPath* CMPIOSElementCapabilities::getObjectPath() {
-    records.entering();
+    log.entering();
     CMPIObjectPath* path =
         Utilities::createObjectPath(broker, "KORVA_OSElementCapabilities", nameSpace);
     if (path != nullptr) {
         Utilities::setKeyProperty(path, "ManagedElement", operatingSystem.getObjectPath());
         Utilities::setKeyProperty(path, "Capabilities", capabilities.getObjectPath());
     }
-    records.exiting();
+    log.exiting();
     return path;
 }
 
 CMPIInstance* CMPIOSElementCapabilities::getCMPIInstance(const char** properties) {
     const ParameterList parameters(" properties=", properties);
-    records.entering(parameters);
+    log.entering(parameters);
     CMPIObjectPath* path = getObjectPath();
     CMPIInstance* instance = Utilities::createInstance(broker, path);
     if (instance == nullptr) return nullptr;
     setReference(path, instance, "ManagedElement");
     setReference(path, instance, "Capabilities");
-    records.exiting(parameters);
+    log.exiting(parameters);
     return instance;
 }
 
 CMPIObjectPath* CMPIOSElementCapabilities::getAssociatorNames() {
-    records.entering();
+    log.entering();
     CMPIObjectPath* path = nullptr;
     if (requestedClassId == operatingSystemId) path = capabilities.getObjectPath();
     if (requestedClassId == operatingSystemCapabilitiesId) path = operatingSystem.getObjectPath();
-    records.exiting();
+    log.exiting();
     return path;
 }
 
 CMPIInstance* CMPIOSElementCapabilities::getAssociator(const char** properties) {
-    records.entering(ParameterList(" properties=", properties));
+    log.entering(ParameterList(" properties=", properties));
     if (requestedClassId == operatingSystemId) return capabilities.getCMPIInstance(properties);
     if (requestedClassId == operatingSystemCapabilitiesId)
         return operatingSystem.getCMPIInstance(properties);
@@ -121,26 +125,28 @@ CMPIInstance* CMPIOSElementCapabilities::getAssociator(const char** properties) 
 
 CMPIObjectPath* CMPIOSElementCapabilities::locateCapabilities(const CMPIObjectPath* objectPath) {
     const ParameterList parameters(" objectPath=", objectPath);
-    records.entering(parameters);
-    CMPIObjectPath* path =
-        locate<unsigned int>({broker, nameSpace, "KORVA_OperatingSystemCapabilities"}, objectPath,
-                             elementCapabilities, &OSElementCapabilities::getOSCapabilitiesMoniker);
-    records.exiting(parameters);
+    log.entering(parameters);
+    CMPIObjectPath* path = locateFarEnd<unsigned int>(
+        broker, nameSpace, "KORVA_OperatingSystemCapabilities", objectPath,
+        [this](VA::Moniker& os) { return elementCapabilities.getOSCapabilitiesMoniker(os); });
+    log.exiting(parameters);
     return path;
 }
 
 CMPIObjectPath* CMPIOSElementCapabilities::locateOperatingSystem(const CMPIObjectPath* objectPath) {
     const ParameterList parameters(" objectPath=", objectPath);
-    records.entering(parameters);
-    CMPIObjectPath* path = locate<unsigned int>({broker, nameSpace, "KORVA_OperatingSystem"},
-                                                objectPath, elementCapabilities,
-                                                &OSElementCapabilities::getOperatingSystemMoniker);
-    records.exiting(parameters);
+    log.entering(parameters);
+    CMPIObjectPath* path = locateFarEnd<unsigned int>(
+        broker, nameSpace, "KORVA_OperatingSystem", objectPath,
+        [this](VA::Moniker& ofCapabilities) {
+            return elementCapabilities.getOperatingSystemMoniker(ofCapabilities);
+        });
+    log.exiting(parameters);
     return path;
 }
 
 CMPIOSElementCapabilities::operator bool() {
-    records.entering();
+    log.entering();
     return hasCurrent;
 }
 
@@ -149,7 +155,7 @@ bool CMPIOSElementCapabilities::enumerates() const {
 }
 
 CMPIOSElementCapabilities& CMPIOSElementCapabilities::operator++() {
-    records.entering();
+    log.entering();
     switch (requestedClassId) {
         case operatingSystemCapabilitiesId:
             ++operatingSystem;
@@ -166,7 +172,7 @@ CMPIOSElementCapabilities& CMPIOSElementCapabilities::operator++() {
                 advancePair();
             break;
     }
-    records.exiting();
+    log.exiting();
     return *this;
 }
 

@@ -1,22 +1,36 @@
+// What KORVA_InstalledOS has of its own: names, roles, and the question for "PrimaryOS", which is
+// asked for the day when it can be answered.
+
 #include "CMPIInstalledOS.h"
 
-#include "ComputerSystemAssociationOperations.h"
+#include "ClassIds.h"
+#include "Linux/InstalledOS.h"
+#include "ProviderUtilities.h"
+#include "UnitLog.h"
 
 namespace VA::OSStatusProvider {
 
 static const std::string loggerCMPIInstalledOS("Zumbrel.OperatingSystemProvider");
-static constexpr UnitLog unitLog("CMPIInstalledOS.cpp", loggerCMPIInstalledOS);
+static constexpr UnitLog log("CMPIInstalledOS.cpp", loggerCMPIInstalledOS);
 
-const UnitLog& InstalledOSDesign::records() {
-    return unitLog;
-}
-
-void InstalledOSDesign::setOwnProperties(Mapping& mapping, CMPIInstance* instance) {
-    bool primary;
-    if (mapping.isPrimaryOS(primary))
-        VA::ProviderUtilities::setProperty(instance, "PrimaryOS", primary);
-}
-
-template class ComputerSystemAssociation<InstalledOSDesign>;
+const AssociationTraits CMPIInstalledOS::traits = {
+    "KORVA_InstalledOS",
+    installedOSId,
+    "CMPIInstalledOS",
+    "~CMPIInstalledOS",
+    {{"GroupComponent", End::computerSystem}, {"PartComponent", End::operatingSystem}},
+    [](VA::Moniker& operatingSystem) {
+        return InstalledOS().getComputerSystemMoniker(operatingSystem);
+    },
+    [](VA::Moniker& computerSystem) {
+        return InstalledOS().getOperatingSystemMoniker(computerSystem);
+    },
+    [](CMPIInstance* instance) {
+        bool primary;
+        if (InstalledOS().isPrimaryOS(primary))
+            VA::ProviderUtilities::setProperty(instance, "PrimaryOS", primary);
+    },
+    log,
+};
 
 }  // namespace VA::OSStatusProvider

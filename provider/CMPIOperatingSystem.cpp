@@ -1,79 +1,86 @@
+// What KORVA_OperatingSystem publishes: keys and properties as tables, so that a reader can hold
+// them against the class in the schema.
+
 #include "CMPIOperatingSystem.h"
 
-#include "ElementAdapterOperations.h"
+#include "ElementAdapter-inl.h"
 
 namespace VA::OSStatusProvider {
 
 static const std::string loggerCMPIOperatingSystem("Zumbrel.OperatingSystemProvider");
-static constexpr UnitLog unitLog("CMPIOperatingSystem.cpp", loggerCMPIOperatingSystem);
+static constexpr UnitLog log("CMPIOperatingSystem.cpp", loggerCMPIOperatingSystem);
 
 using OS = OperatingSystem;
 
-static constexpr Key<OS> keyTable[] = {
+static constexpr KeyFilter<OS> filters[] = {
+    {"CSName", "CSName", OS::CSNameFilter},
+    {"Name", "Name", OS::NameFilter},
+};
+
+static constexpr Key<OS> keys[] = {
     {"CSCreationClassName", &OS::getCSCreationClassName},
     {"CSName", &OS::getCSName},
     {"CreationClassName", &OS::getCreationClassName},
     {"Name", &OS::getName},
 };
 
-static constexpr Property<OS> propertyTable[] = {
-    property<&OS::getCaption>("Caption"),
-    property<&OS::getDescription>("Description"),
-    property<&OS::getElementName>("ElementName"),
-    dateTime<OS, &OS::getInstallDate>("InstallDate"),
-    property<&OS::getOperationalStatus>("OperationalStatus"),
-    property<&OS::getStatusDescriptions>("StatusDescriptions"),
-    property<&OS::getHealthState>("HealthState"),
-    property<&OS::getPrimaryStatus>("PrimaryStatus"),
-    property<&OS::getDetailedStatus>("DetailedStatus"),
-    property<&OS::getOperatingStatus>("OperatingStatus"),
-    property<&OS::getStatus>("Status"),
-    property<&OS::getCommunicationStatus>("CommunicationStatus"),
-    property<&OS::getEnabledState>("EnabledState"),
-    property<&OS::getOtherEnabledState>("OtherEnabledState"),
-    property<&OS::getRequestedState>("RequestedState"),
-    property<&OS::getEnabledDefault>("EnabledDefault"),
-    dateTime<OS, &OS::getTimeOfLastStateChange>("TimeOfLastStateChange"),
-    property<&OS::getAvailableRequestedStates>("AvailableRequestedStates"),
-    property<&OS::getTransitioningToState>("TransitioningToState"),
-    property<&OS::getCSCreationClassName>("CSCreationClassName"),
-    property<&OS::getCSName>("CSName"),
-    property<&OS::getCreationClassName>("CreationClassName"),
-    property<&OS::getName>("Name"),
-    property<&OS::getOSType>("OSType"),
-    property<&OS::getOtherTypeDescription>("OtherTypeDescription"),
-    property<&OS::getVersion>("Version"),
-    dateTime<OS, &OS::getLastBootUpTime>("LastBootUpTime"),
-    dateTime<OS, &OS::getLocalDateTime>("LocalDateTime"),
-    property<&OS::getCurrentTimeZone>("CurrentTimeZone"),
-    property<&OS::getNumberOfLicensedUsers>("NumberOfLicensedUsers"),
-    property<&OS::getNumberOfUsers>("NumberOfUsers"),
-    property<&OS::getNumberOfProcesses>("NumberOfProcesses"),
-    property<&OS::getMaxNumberOfProcesses>("MaxNumberOfProcesses"),
-    property<&OS::getTotalSwapSpaceSize>("TotalSwapSpaceSize"),
-    property<&OS::getTotalVirtualMemorySize>("TotalVirtualMemorySize"),
-    property<&OS::getFreeVirtualMemory>("FreeVirtualMemory"),
-    property<&OS::getFreePhysicalMemory>("FreePhysicalMemory"),
-    property<&OS::getTotalVisibleMemorySize>("TotalVisibleMemorySize"),
-    property<&OS::getSizeStoredInPagingFiles>("SizeStoredInPagingFiles"),
-    property<&OS::getFreeSpaceInPagingFiles>("FreeSpaceInPagingFiles"),
-    property<&OS::getMaxProcessMemorySize>("MaxProcessMemorySize"),
-    property<&OS::isDistributed>("Distributed"),
-    property<&OS::getMaxProcessesPerUser>("MaxProcessesPerUser"),
+static constexpr Property<OS> properties[] = {
+    {"Caption", &OS::getCaption},
+    {"Description", &OS::getDescription},
+    {"ElementName", &OS::getElementName},
+    {"InstallDate", &OS::getInstallDate, TextForm::dateTime},
+    {"OperationalStatus", &OS::getOperationalStatus},
+    {"StatusDescriptions", &OS::getStatusDescriptions},
+    {"HealthState", &OS::getHealthState},
+    {"PrimaryStatus", &OS::getPrimaryStatus},
+    {"DetailedStatus", &OS::getDetailedStatus},
+    {"OperatingStatus", &OS::getOperatingStatus},
+    {"Status", &OS::getStatus},
+    {"CommunicationStatus", &OS::getCommunicationStatus},
+    {"EnabledState", &OS::getEnabledState},
+    {"OtherEnabledState", &OS::getOtherEnabledState},
+    {"RequestedState", &OS::getRequestedState},
+    {"EnabledDefault", &OS::getEnabledDefault},
+    {"TimeOfLastStateChange", &OS::getTimeOfLastStateChange, TextForm::dateTime},
+    {"AvailableRequestedStates", &OS::getAvailableRequestedStates},
+    {"TransitioningToState", &OS::getTransitioningToState},
+    {"CSCreationClassName", &OS::getCSCreationClassName},
+    {"CSName", &OS::getCSName},
+    {"CreationClassName", &OS::getCreationClassName},
+    {"Name", &OS::getName},
+    {"OSType", &OS::getOSType},
+    {"OtherTypeDescription", &OS::getOtherTypeDescription},
+    {"Version", &OS::getVersion},
+    {"LastBootUpTime", &OS::getLastBootUpTime, TextForm::dateTime},
+    {"LocalDateTime", &OS::getLocalDateTime, TextForm::dateTime},
+    {"CurrentTimeZone", &OS::getCurrentTimeZone},
+    {"NumberOfLicensedUsers", &OS::getNumberOfLicensedUsers},
+    {"NumberOfUsers", &OS::getNumberOfUsers},
+    {"NumberOfProcesses", &OS::getNumberOfProcesses},
+    {"MaxNumberOfProcesses", &OS::getMaxNumberOfProcesses},
+    {"TotalSwapSpaceSize", &OS::getTotalSwapSpaceSize},
+    {"TotalVirtualMemorySize", &OS::getTotalVirtualMemorySize},
+    {"FreeVirtualMemory", &OS::getFreeVirtualMemory},
+    {"FreePhysicalMemory", &OS::getFreePhysicalMemory},
+    {"TotalVisibleMemorySize", &OS::getTotalVisibleMemorySize},
+    {"SizeStoredInPagingFiles", &OS::getSizeStoredInPagingFiles},
+    {"FreeSpaceInPagingFiles", &OS::getFreeSpaceInPagingFiles},
+    {"MaxProcessMemorySize", &OS::getMaxProcessMemorySize},
+    {"Distributed", &OS::isDistributed},
+    {"MaxProcessesPerUser", &OS::getMaxProcessesPerUser},
 };
 
-const UnitLog& OperatingSystemDesign::records() {
-    return unitLog;
-}
+const ElementTraits<OS> CMPIOperatingSystem::traits = {
+    "KORVA_OperatingSystem",
+    "CMPIOperatingSystem",
+    "~CMPIOperatingSystem",
+    filters,
+    keys,
+    properties,
+    true,  // values are shared: "Description", whose getter writes nothing, is published empty
+    log,
+};
 
-Rows<Key<OperatingSystemDesign::Element>> OperatingSystemDesign::keys() {
-    return keyTable;
-}
-
-Rows<Property<OperatingSystemDesign::Element>> OperatingSystemDesign::properties() {
-    return propertyTable;
-}
-
-template class ElementAdapter<OperatingSystemDesign>;
+template class ElementAdapter<OperatingSystem>;
 
 }  // namespace VA::OSStatusProvider

@@ -1,41 +1,27 @@
-#ifndef OSSTATUS_CMPI_OPERATING_SYSTEM_H
-#define OSSTATUS_CMPI_OPERATING_SYSTEM_H
+#ifndef PROVIDER_CMPI_OPERATING_SYSTEM_H
+#define PROVIDER_CMPI_OPERATING_SYSTEM_H
+
+#include <utility>
 
 #include "ElementAdapter.h"
 #include "Linux/OperatingSystem.h"
-#include "PropertyTable.h"
 
 namespace VA::OSStatusProvider {
 
-class UnitLog;
+extern template class ElementAdapter<OperatingSystem>;
 
-/// What is KORVA_OperatingSystem's own: four keys, 43 properties, and the keys "CSName" and "Name"
-/// as filters. The creation class names of a path are not looked at.
-struct OperatingSystemDesign {
-    using Element = OperatingSystem;
-
-    static constexpr const char* className = "KORVA_OperatingSystem";
-    static constexpr const char* constructor = "CMPIOperatingSystem";
-    static constexpr const char* destructor = "~CMPIOperatingSystem";
-    static constexpr KeyFilter<Element> filters[] = {
-        {"CSName", "CSName", OperatingSystem::CSNameFilter},
-        {"Name", "Name", OperatingSystem::NameFilter},
-    };
-    /// One value of each type serves all rows, in order: "Description", whose getter writes
-    /// nothing, is published empty because no text was written before it.
-    static constexpr bool valuesAreShared = true;
-
-    static const UnitLog& records();
-    static Rows<Key<Element>> keys();
-    static Rows<Property<Element>> properties();
-};
-
-extern template class ElementAdapter<OperatingSystemDesign>;
-
-/// Serves KORVA_OperatingSystem.
-class CMPIOperatingSystem : public ElementAdapter<OperatingSystemDesign> {
+/// Serves KORVA_OperatingSystem. The keys "CSName" and "Name" of a path narrow the walk; its
+/// creation class names are not looked at.
+class CMPIOperatingSystem : public ElementAdapter<OperatingSystem> {
   public:
-    using ElementAdapter::ElementAdapter;
+    static const ElementTraits<OperatingSystem> traits;
+
+    CMPIOperatingSystem(const CMPIBroker* _broker, const CMPIContext* _context,
+                        const CMPIObjectPath* objectPath)
+        : ElementAdapter(traits, _broker, _context, objectPath) {}
+    CMPIOperatingSystem(const CMPIBroker* _broker, const CMPIContext* _context,
+                        std::string _nameSpace)
+        : ElementAdapter(traits, _broker, _context, std::move(_nameSpace)) {}
 };
 
 }  // namespace VA::OSStatusProvider

@@ -1,41 +1,46 @@
+// What KORVA_OperatingSystemCapabilities publishes: keys and properties as tables, so that a reader
+// can hold them against the class in the schema.
+
 #include "CMPIOperatingSystemCapabilities.h"
 
-#include "ElementAdapterOperations.h"
+#include "ElementAdapter-inl.h"
 
 namespace VA::OSStatusProvider {
 
 using Capabilities = OperatingSystemCapabilities;
 
 static const std::string loggerCMPIOperatingSystemCapabilities("Zumbrel.OperatingSystemProvider");
-static constexpr UnitLog unitLog("CMPIOperatingSystemCapabilities.cpp",
-                                 loggerCMPIOperatingSystemCapabilities);
+static constexpr UnitLog log("CMPIOperatingSystemCapabilities.cpp",
+                             loggerCMPIOperatingSystemCapabilities);
 
-static constexpr Key<Capabilities> keyTable[] = {
+static constexpr KeyFilter<Capabilities> filters[] = {
+    {"InstanceID", "instanceId", Capabilities::InstanceIDFilter},
+};
+
+static constexpr Key<Capabilities> keys[] = {
     {"InstanceID", &Capabilities::getInstanceID},
 };
 
-static constexpr Property<Capabilities> propertyTable[] = {
-    property<&Capabilities::getInstanceID>("InstanceID"),
-    property<&Capabilities::getElementName>("ElementName"),
-    property<&Capabilities::getElementNameEditSupported>("ElementNameEditSupported"),
-    property<&Capabilities::getMaxElementNameLen>("MaxElementNameLen"),
-    property<&Capabilities::getRequestedStatesSupported>("RequestedStatesSupported"),
-    property<&Capabilities::getHostShutdownBehavior>("HostShutdownBehavior"),
+static constexpr Property<Capabilities> properties[] = {
+    {"InstanceID", &Capabilities::getInstanceID},
+    {"ElementName", &Capabilities::getElementName},
+    {"ElementNameEditSupported", &Capabilities::getElementNameEditSupported},
+    {"MaxElementNameLen", &Capabilities::getMaxElementNameLen},
+    {"RequestedStatesSupported", &Capabilities::getRequestedStatesSupported},
+    {"HostShutdownBehavior", &Capabilities::getHostShutdownBehavior},
 };
 
-const UnitLog& OperatingSystemCapabilitiesDesign::records() {
-    return unitLog;
-}
+const ElementTraits<Capabilities> CMPIOperatingSystemCapabilities::traits = {
+    "KORVA_OperatingSystemCapabilities",
+    "CMPIOperatingSystemCapabilities",
+    "~CMPIOperatingSystemCapabilities",
+    filters,
+    keys,
+    properties,
+    false,  // values are shared
+    log,
+};
 
-Rows<Key<OperatingSystemCapabilitiesDesign::Element>> OperatingSystemCapabilitiesDesign::keys() {
-    return keyTable;
-}
-
-Rows<Property<OperatingSystemCapabilitiesDesign::Element>>
-OperatingSystemCapabilitiesDesign::properties() {
-    return propertyTable;
-}
-
-template class ElementAdapter<OperatingSystemCapabilitiesDesign>;
+template class ElementAdapter<OperatingSystemCapabilities>;
 
 }  // namespace VA::OSStatusProvider

@@ -1,5 +1,5 @@
-#ifndef OSSTATUS_CLASS_IDS_H
-#define OSSTATUS_CLASS_IDS_H
+#ifndef PROVIDER_CLASS_IDS_H
+#define PROVIDER_CLASS_IDS_H
 
 namespace VA::OSStatusProvider {
 

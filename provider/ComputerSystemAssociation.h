@@ -1,5 +1,5 @@
-#ifndef OSSTATUS_COMPUTER_SYSTEM_ASSOCIATION_H
-#define OSSTATUS_COMPUTER_SYSTEM_ASSOCIATION_H
+#ifndef PROVIDER_COMPUTER_SYSTEM_ASSOCIATION_H
+#define PROVIDER_COMPUTER_SYSTEM_ASSOCIATION_H
 
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
@@ -8,6 +8,7 @@
 
 #include "CMPIComputerSystem.h"
 #include "CMPIOperatingSystem.h"
+#include "Moniker.h"
 
 namespace VA::OSStatusProvider {
 
@@ -20,22 +21,31 @@ struct Role {
     End end;
 };
 
-/// An adapter of an association between the computer system and its operating systems. `Design`
-/// holds what is the association's own: names, roles, key mapping, records.
+/// What one of these associations has of its own.
+struct AssociationTraits {
+    const char* className;
+    unsigned short classId;
+    const char* constructor;  ///< as records name it, and the destructor
+    const char* destructor;
+    Role roles[2];  ///< in the order in which paths and instances carry them
+    /// The identity of one end, derived from the other's. Throw VA::FrameworkException when that
+    /// lacks the key.
+    VA::Moniker (*computerSystemOf)(VA::Moniker& operatingSystem);
+    VA::Moniker (*operatingSystemOf)(VA::Moniker& computerSystem);
+    void (*setOwnProperties)(CMPIInstance* instance);  ///< beside the references; null: none
+    const UnitLog& log;
+};
+
+/// An adapter of an association between the computer system and its operating systems; the base of
+/// CMPIInstalledOS and CMPIRunningOS.
 ///
 /// The class of the path that it is built from decides what it walks. Built from a path of the
 /// association, it pairs operating systems and computer systems in step, until either runs out.
 /// Built from a path of one end, it walks the other. Built from any other path, it is empty.
 ///
 /// One object serves one request on one thread; ownership as in ElementAdapter.
-template <class Design>
 class ComputerSystemAssociation {
   public:
-    /// Throws VA::FrameworkException when the path has keys but not the one that the far end is
-    /// named by, VA::ProviderException when the broker has no computer system. The references of a
-    /// path of the association are not read: every pair is walked.
-    ComputerSystemAssociation(const CMPIBroker* _broker, const CMPIContext* _context,
-                              const CMPIObjectPath* objectPath);
     ~ComputerSystemAssociation() noexcept(false);
     ComputerSystemAssociation(const ComputerSystemAssociation&) = delete;
     ComputerSystemAssociation& operator=(const ComputerSystemAssociation&) = delete;
@@ -65,18 +75,23 @@ class ComputerSystemAssociation {
     CMPIObjectPath* locateOperatingSystem(const CMPIObjectPath* objectPath);
     CMPIObjectPath* locateComputerSystem(const CMPIObjectPath* objectPath);
 
-  private:
-    using Mapping = typename Design::Mapping;
+  protected:
+    /// Throws VA::FrameworkException when the path has keys but not the one that the far end is
+    /// named by, VA::ProviderException when the broker has no computer system. The references of a
+    /// path of the association are not read: every pair is walked. The traits outlive the adapter.
+    ComputerSystemAssociation(const AssociationTraits& _traits, const CMPIBroker* _broker,
+                              const CMPIContext* _context, const CMPIObjectPath* objectPath);
 
+  private:
     CMPIObjectPath* pathOf(End end);
 
+    const AssociationTraits& traits;
     const CMPIBroker* broker;
     const CMPIContext* context;
     std::string nameSpace;
     unsigned short requestedClassId = {};
     CMPIOperatingSystem operatingSystem;
     CMPIOSComputerSystem computerSystem;
-    Mapping mapping;
 };
 
 }  // namespace VA::OSStatusProvider

@@ -1,19 +1,16 @@
+// The face that the library shows to object managers: two factories, two function tables, and the
+// handlers behind them. A handler decides nothing itself: it names a dispatch table, and serve()
+// does what is common to all requests, their markers and their exceptions.
+
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
 
-#include <algorithm>
 #include <exception>
-#include <iostream>
+#include <iostream>  // its streams are ready before the first record needs one
 #include <string>
 
-#include "CMPIElementCapabilities.h"
-#include "CMPIInstalledOS.h"
-#include "CMPIOperatingSystem.h"
-#include "CMPIOperatingSystemCapabilities.h"
-#include "CMPIRunningOS.h"
-#include "ClassIds.h"
 #include "ProviderUtilities.h"
-#include "RequestWalk.h"
+#include "RequestDispatch.h"
 #include "Trace.h"
 #include "UnitLog.h"
 
@@ -26,61 +23,40 @@ const char COPYRIGHT[] =
 
 static const std::string loggerOperatingSystemProvider("Zumbrel.OperatingSystemProvider");
 static constexpr const char* sourceFile = "OperatingSystemProvider.cpp";
-static constexpr UnitLog records(sourceFile, loggerOperatingSystemProvider);
+static constexpr UnitLog log(sourceFile, loggerOperatingSystemProvider);
 
 // The broker that either factory was given last. Not guarded: factories run before requests.
 static const CMPIBroker* broker = nullptr;
-
-// The adapters that serve requests for instances, and those that serve associators.
-template <class Operation>
-static constexpr DispatchRow instanceDispatch[] = {
-    {operatingSystemId, walk<CMPIOperatingSystem, Operation>},
-    {operatingSystemCapabilitiesId, walk<CMPIOperatingSystemCapabilities, Operation>},
-    {installedOSId, walk<CMPIInstalledOS, Operation>},
-    {runningOSId, walk<CMPIRunningOS, Operation>},
-    {elementCapabilitiesId, walk<CMPIOSElementCapabilities, Operation>},
-};
-
-template <class Operation>
-static constexpr DispatchRow associationDispatch[] = {
-    {runningOSId, walk<CMPIRunningOS, Operation>},
-    {elementCapabilitiesId, walk<CMPIOSElementCapabilities, Operation>},
-    {installedOSId, walk<CMPIInstalledOS, Operation>},
-};
 
 // Serves a request: finds the adapter for the class that `classSource`, a path or a class name,
 // stands for, and walks it. An exception of the standard hierarchy leaves a message record and the
 // status OK; others pass through, as do those from outside the walk. All records are the handler's
 // own.
-template <class ClassSource, std::size_t rowCount>
-static CMPIStatus serve(const DispatchRow (&dispatch)[rowCount], ClassSource classSource,
-                        const Request& request, Caller handler = Caller::here()) {
+template <class ClassSource>
+static CMPIStatus serve(Dispatch dispatch, ClassSource classSource, const Request& request,
+                        SourceLocation handler = SourceLocation::current()) {
     VA::markProviderEntry(loggerOperatingSystemProvider, sourceFile, handler.function,
                           handler.line);
     const unsigned short classId = VA::ProviderUtilities::getClassId(classSource);
     CMPIStatus status = {CMPI_RC_OK, nullptr};
-    records.variable("classId", classId, handler);
-    const DispatchRow* row =
-        std::find_if(dispatch, dispatch + rowCount,
-                     [classId](const DispatchRow& each) { return each.classId == classId; });
-    if (row == dispatch + rowCount) {
-        status.rc = CMPI_RC_ERR_INVALID_CLASS;
-    } else {
+    log.variable("classId", classId, handler);
+    if (const Walk walk = findWalk(dispatch, classId)) {
         try {
-            row->walk(request);
+            walk(request);
         } catch (const std::exception& caught) {
-            records.message(caught, handler);
+            log.message(caught, handler);
         }
+    } else {
+        status.rc = CMPI_RC_ERR_INVALID_CLASS;
     }
     VA::markProviderExit(loggerOperatingSystemProvider, sourceFile, handler.function, handler.line);
     return status;
 }
 
 // Refuses an operation: the result is not touched.
-static CMPIStatus refuse(Caller handler = Caller::here()) {
-    const CMPIStatus status = {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
-    records.method(handler);
-    return status;
+static CMPIStatus refuse(SourceLocation handler = SourceLocation::current()) {
+    log.method(handler);
+    return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
 }
 
 static CMPIStatus OperatingSystem_Cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
@@ -90,13 +66,13 @@ static CMPIStatus OperatingSystem_Cleanup(CMPIInstanceMI*, const CMPIContext*, C
 static CMPIStatus OperatingSystem_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext* ctx,
                                                     const CMPIResult* rslt,
                                                     const CMPIObjectPath* op) {
-    return serve(instanceDispatch<ObjectPaths>, op, {broker, ctx, rslt, op, nullptr});
+    return serve(instanceDispatch, op, {broker, ctx, rslt, op, Wanted::objectPaths, nullptr});
 }
 
 static CMPIStatus OperatingSystem_EnumInstances(CMPIInstanceMI*, const CMPIContext* ctx,
                                                 const CMPIResult* rslt, const CMPIObjectPath* op,
                                                 const char** properties) {
-    return serve(instanceDispatch<Instances>, op, {broker, ctx, rslt, op, properties});
+    return serve(instanceDispatch, op, {broker, ctx, rslt, op, Wanted::instances, properties});
 }
 
 // The keys of the path have the adapter stand on the one element that they name; when they name
@@ -104,7 +80,7 @@ static CMPIStatus OperatingSystem_EnumInstances(CMPIInstanceMI*, const CMPIConte
 static CMPIStatus OperatingSystem_GetInstance(CMPIInstanceMI*, const CMPIContext* ctx,
                                               const CMPIResult* rslt, const CMPIObjectPath* op,
                                               const char** properties) {
-    return serve(instanceDispatch<Instances>, op, {broker, ctx, rslt, op, properties});
+    return serve(instanceDispatch, op, {broker, ctx, rslt, op, Wanted::instances, properties});
 }
 
 static CMPIStatus OperatingSystem_CreateInstance(CMPIInstanceMI*, const CMPIContext*,
@@ -139,15 +115,16 @@ static CMPIStatus OperatingSystem_Associators(CMPIAssociationMI*, const CMPICont
                                               const CMPIResult* rslt, const CMPIObjectPath* op,
                                               const char* assocClass, const char*, const char*,
                                               const char*, const char** properties) {
-    return serve(associationDispatch<Associators>, assocClass, {broker, ctx, rslt, op, properties});
+    return serve(associatorDispatch, assocClass,
+                 {broker, ctx, rslt, op, Wanted::instances, properties});
 }
 
 static CMPIStatus OperatingSystem_AssociatorNames(CMPIAssociationMI*, const CMPIContext* ctx,
                                                   const CMPIResult* rslt, const CMPIObjectPath* op,
                                                   const char* assocClass, const char*, const char*,
                                                   const char*) {
-    return serve(associationDispatch<AssociatorNames>, assocClass,
-                 {broker, ctx, rslt, op, nullptr});
+    return serve(associatorDispatch, assocClass,
+                 {broker, ctx, rslt, op, Wanted::objectPaths, nullptr});
 }
 
 static CMPIStatus OperatingSystem_References(CMPIAssociationMI*, const CMPIContext*,

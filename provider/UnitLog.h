@@ -1,30 +1,16 @@
-#ifndef OSSTATUS_UNIT_LOG_H
-#define OSSTATUS_UNIT_LOG_H
+#ifndef PROVIDER_UNIT_LOG_H
+#define PROVIDER_UNIT_LOG_H
 
 #include <exception>
 #include <ostream>
 #include <string>
 
 #include "Trace.h"
+#include "base/SourceLocation.h"
 
 namespace VA::OSStatusProvider {
 
-/// The place that writes a record: the function's unqualified name, and the line.
-struct Caller {
-    const char* function;
-    unsigned int line;
-
-    /// The caller of the function whose default argument this is.
-    static constexpr Caller here(const char* function = __builtin_FUNCTION(),
-                                 unsigned int line = __builtin_LINE()) {
-        return {function, line};
-    }
-
-    /// The caller under another name: a template's constructor bears that of the class it serves.
-    static constexpr Caller named(const char* function, unsigned int line = __builtin_LINE()) {
-        return {function, line};
-    }
-};
+using base::SourceLocation;
 
 /// The text of a parameter list, which the records on entering and on leaving share. Each parameter
 /// is a name, which brings the leading blank and the "=", and an address.
@@ -60,62 +46,73 @@ class ParameterList {
 };
 
 /// The records of one source unit: each goes to the log and to the trace, under the unit's file
-/// name and logger category.
+/// name and logger category. Every unit that writes records has one, named `log`.
 class UnitLog {
   public:
     /// `file` and `category` outlive the object.
     constexpr UnitLog(const char* file, const std::string& category)
         : file_(file), category_(category) {}
 
-    void entering(Caller caller = Caller::here()) const { plain(Entering, caller); }
-    void exiting(Caller caller = Caller::here()) const { plain(Exiting, caller); }
-    void method(Caller caller = Caller::here()) const { plain(Method, caller); }
+    void entering(SourceLocation location = SourceLocation::current()) const {
+        plain(Entering, location);
+    }
+    void exiting(SourceLocation location = SourceLocation::current()) const {
+        plain(Exiting, location);
+    }
+    void method(SourceLocation location = SourceLocation::current()) const {
+        plain(Method, location);
+    }
 
     /// The method record of a destructor. It may throw as any record may, but not while another
     /// exception is under way: then the record is given up, so that the first one gets through.
-    void destructor(Caller caller = Caller::here()) const {
-        if (std::uncaught_exceptions() == 0) return method(caller);
+    void destructor(SourceLocation location = SourceLocation::current()) const {
+        if (std::uncaught_exceptions() == 0) return method(location);
         try {
-            method(caller);
+            method(location);
         } catch (...) {
         }
     }
 
     /// The same with a parameter list.
-    void entering(const ParameterList& parameters, Caller caller = Caller::here()) const {
-        withParameters(Entering, parameters, caller);
+    void entering(const ParameterList& parameters,
+                  SourceLocation location = SourceLocation::current()) const {
+        withParameters(Entering, parameters, location);
     }
-    void exiting(const ParameterList& parameters, Caller caller = Caller::here()) const {
-        withParameters(Exiting, parameters, caller);
+    void exiting(const ParameterList& parameters,
+                 SourceLocation location = SourceLocation::current()) const {
+        withParameters(Exiting, parameters, location);
     }
 
     /// What a variable holds; `Value` is const char* or unsigned int.
     template <class Value>
-    void variable(const char* name, Value value, Caller caller = Caller::here()) const {
-        write(recordLevel, caller, [&] { return trace(name, file_, caller.line, value); });
+    void variable(const char* name, Value value,
+                  SourceLocation location = SourceLocation::current()) const {
+        write(recordLevel, location, [&] { return trace(name, file_, location.line, value); });
     }
 
     /// A caught exception.
-    void message(const std::exception& caught, Caller caller = Caller::here()) const {
-        write(parameterRecordLevel, caller,
-              [&] { return trace(file_, caught.what(), caller.line, Message); });
+    void message(const std::exception& caught,
+                 SourceLocation location = SourceLocation::current()) const {
+        write(parameterRecordLevel, location,
+              [&] { return trace(file_, caught.what(), location.line, Message); });
     }
 
   private:
-    void plain(MessageType type, Caller caller) const {
-        write(recordLevel, caller,
-              [&] { return trace(file_, caller.function, caller.line, type); });
+    void plain(MessageType type, SourceLocation location) const {
+        write(recordLevel, location,
+              [&] { return trace(file_, location.function, location.line, type); });
     }
 
-    void withParameters(MessageType type, const ParameterList& parameters, Caller caller) const {
-        write(parameterRecordLevel, caller, [&] {
-            return tracepara(file_, caller.function, caller.line, parameters.text(), type);
+    void withParameters(MessageType type, const ParameterList& parameters,
+                        SourceLocation location) const {
+        write(parameterRecordLevel, location, [&] {
+            return tracepara(file_, location.function, location.line, parameters.text(), type);
         });
     }
 
     template <class Format>
-    void write(int level, Caller caller, Format format) const {
-        writeRecord(caller.function, file_, caller.line, category_, level, format);
+    void write(int level, SourceLocation location, Format format) const {
+        writeRecord(location.function, file_, location.line, category_, level, format);
     }
 
     const char* file_;

@@ -1,3 +1,6 @@
+// Operating system and capabilities know each other by name alone; the direction decides the key
+// that holds it.
+
 #include "ElementCapabilities.h"
 
 #include "KeyMapping.h"
@@ -7,34 +10,34 @@ namespace VA::OSStatusProvider {
 
 // A category of its own: filters that single out this unit's records rely on it.
 static const std::string loggerOSElementCapabilities("Zumbrel.OSStatusProvider");
-static constexpr UnitLog records("Linux/ElementCapabilities.cpp", loggerOSElementCapabilities);
+static constexpr UnitLog log("Linux/ElementCapabilities.cpp", loggerOSElementCapabilities);
 
 OSElementCapabilities::OSElementCapabilities() {
-    records.method();
+    log.method();
 }
 
 OSElementCapabilities::~OSElementCapabilities() noexcept(false) {
-    records.destructor();
+    log.destructor();
 }
 
 VA::Moniker OSElementCapabilities::getOperatingSystemMoniker(VA::Moniker& monikerCapabilities) {
     const ParameterList parameters(" monikerCapabilities=", &monikerCapabilities);
-    records.entering(parameters);
+    log.entering(parameters);
     const std::string instanceId = valueOfFirst(monikerCapabilities, {"InstanceID"},
                                                 "Could not find 'InstanceID' Key in Moniker");
-    records.variable("InstanceID", instanceId.c_str());
+    log.variable("InstanceID", instanceId.c_str());
     VA::Moniker operatingSystem = monikerOf("Name", instanceId);
-    records.exiting(parameters);
+    log.exiting(parameters);
     return operatingSystem;
 }
 
 VA::Moniker OSElementCapabilities::getOSCapabilitiesMoniker(VA::Moniker& monikerOS) {
     const ParameterList parameters(" monikerOS=", &monikerOS);
-    records.entering(parameters);
+    log.entering(parameters);
     const std::string name =
         valueOfFirst(monikerOS, {"Name"}, "Could not find 'Name' Key in Moniker");
     VA::Moniker capabilities = monikerOf("InstanceID", name);
-    records.exiting(parameters);
+    log.exiting(parameters);
     return capabilities;
 }
 

@@ -1,3 +1,5 @@
+// The mapping itself is shared with RunningOS; this one writes records of it.
+
 #include "InstalledOS.h"
 
 #include "KeyMapping.h"
@@ -6,21 +8,21 @@
 namespace VA::OSStatusProvider {
 
 static const std::string loggerInstalledOS("Zumbrel.OperatingSystemProvider");
-static constexpr UnitLog records("Linux/InstalledOS.cpp", loggerInstalledOS);
+static constexpr UnitLog log("Linux/InstalledOS.cpp", loggerInstalledOS);
 
 VA::Moniker InstalledOS::getComputerSystemMoniker(VA::Moniker& monikerOS) {
     const ParameterList parameters(" monikerOS=", &monikerOS);
-    records.entering(parameters);
+    log.entering(parameters);
     VA::Moniker computerSystem = computerSystemMonikerOf(monikerOS);
-    records.exiting(parameters);
+    log.exiting(parameters);
     return computerSystem;
 }
 
 VA::Moniker InstalledOS::getOperatingSystemMoniker(VA::Moniker& monikerComputer) {
     const ParameterList parameters(" monikerComputer=", &monikerComputer);
-    records.entering(parameters);
+    log.entering(parameters);
     VA::Moniker operatingSystem = operatingSystemMonikerOf(monikerComputer);
-    records.exiting(parameters);
+    log.exiting(parameters);
     return operatingSystem;
 }
 

@@ -1,3 +1,6 @@
+// Far ends are named by a single key, since the near end tells no other: object managers and the
+// adapters take it as a filter.
+
 #include "KeyMapping.h"
 
 #include <algorithm>

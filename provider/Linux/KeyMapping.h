@@ -1,5 +1,5 @@
-#ifndef OSSTATUS_LINUX_KEY_MAPPING_H
-#define OSSTATUS_LINUX_KEY_MAPPING_H
+#ifndef PROVIDER_LINUX_KEY_MAPPING_H
+#define PROVIDER_LINUX_KEY_MAPPING_H
 
 #include <initializer_list>
 #include <string>

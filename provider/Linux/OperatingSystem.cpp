@@ -1,12 +1,15 @@
+// What the framework tells of an operating system, turned into the values that CIM has for it. Some
+// conversions look wrong and are not: clients know them as they are.
+
 #include "OperatingSystem.h"
+
+#include <strings.h>
 
 #include <cstdio>
 #include <cstdlib>
 #include <ctime>
 #include <utility>
 
-#include "FilteredWalk.h"
-#include "NodeStatus.h"
 #include "UnitLog.h"
 
 namespace VA::OSStatusProvider {
@@ -14,21 +17,56 @@ namespace VA::OSStatusProvider {
 using namespace VA::NodeLexicon;
 
 static const std::string loggerOperatingSystem("Zumbrel.OperatingSystemProvider");
-static constexpr UnitLog records("Linux/OperatingSystem.cpp", loggerOperatingSystem);
+static constexpr UnitLog log("Linux/OperatingSystem.cpp", loggerOperatingSystem);
+
+namespace {
+
+/// What a range of status codes means in the CIM value maps.
+struct NodeStatus {
+    unsigned int firstCode;
+    unsigned int lastCode;
+    unsigned short enabledState;
+    unsigned short healthState;
+    unsigned short operationalStatus[2];
+    unsigned int operationalStatusCount;
+};
+
+constexpr NodeStatus nodeStatuses[] = {
+    {0, 0, 0, 0, {0}, 1},        // Unknown
+    {1, 1, 2, 5, {2, 11}, 2},    // Enabled; OK; OK, In Service
+    {2, 2, 10, 0, {0}, 1},       // Starting
+    {8, 8, 9, 0, {0}, 1},        // Quiesce
+    {9, 9, 10, 0, {0}, 1},       // Starting
+    {12, 12, 6, 0, {0}, 1},      // Enabled but Offline
+    {16, 16, 3, 0, {0}, 1},      // Disabled
+    {20, 20, 5, 10, {3, 5}, 2},  // Not Applicable; Degraded/Warning; Degraded, Predictive Failure
+    {21, 26, 5, 10, {3}, 1},     // Not Applicable; Degraded/Warning; Degraded
+    {0, 4294967295U, 5, 0, {0}, 1},  // all others: Not Applicable
+};
+
+const NodeStatus& meaningOf(unsigned int code) {
+    const NodeStatus* status = nodeStatuses;
+    while (code < status->firstCode || code > status->lastCode) ++status;
+    return *status;
+}
+
+}  // namespace
 
 OperatingSystem::OperatingSystem() {
     instrumentation.selectNode(OperatingSystemNode);
 }
 
 OperatingSystem::operator bool() {
-    records.method();
+    log.method();
     return instrumentation;
 }
 
 OperatingSystem& OperatingSystem::operator++() {
-    records.entering();
-    advanceToNext(instrumentation, filterSet, [this] { return passesFilters(); });
-    records.exiting();
+    log.entering();
+    do {
+        ++instrumentation;
+    } while (filterSet && instrumentation && !passesFilters());
+    log.exiting();
     return *this;
 }
 
@@ -38,11 +76,24 @@ void OperatingSystem::setFilter(FilterType type, std::string value) {
     while (instrumentation && !passesFilters()) ++instrumentation;
 }
 
+// The first filter that fails ends the test: nothing further is read.
 bool OperatingSystem::passesFilters() {
-    // By FilterType.
-    static constexpr bool (OperatingSystem::*texts[])(std::string&) = {&OperatingSystem::getCSName,
-                                                                       &OperatingSystem::getName};
-    return passesAll(*this, filters, texts);
+    std::string text;
+    for (const Filter& filter : filters) {
+        bool known = false;
+        switch (filter.type) {
+            case CSNameFilter:
+                known = getCSName(text);
+                break;
+            case NameFilter:
+                known = getName(text);
+                break;
+            default:
+                continue;
+        }
+        if (!known || strcasecmp(filter.value.c_str(), text.c_str()) != 0) return false;
+    }
+    return true;
 }
 
 bool OperatingSystem::getOperationalStatus(std::vector<unsigned short>& value) {

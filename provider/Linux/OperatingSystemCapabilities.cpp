@@ -1,35 +1,43 @@
+// Each operating system has capabilities of its name; what they say is the same for all.
+
 #include "OperatingSystemCapabilities.h"
 
-#include "FilteredWalk.h"
+#include <strings.h>
+
 #include "UnitLog.h"
 
 namespace VA::OSStatusProvider {
 
 static const std::string loggerOperatingSystemCapabilities("Zumbrel.OperatingSystemProvider");
-static constexpr UnitLog records("Linux/OperatingSystemCapabilities.cpp",
-                                 loggerOperatingSystemCapabilities);
+static constexpr UnitLog log("Linux/OperatingSystemCapabilities.cpp",
+                             loggerOperatingSystemCapabilities);
 
 OperatingSystemCapabilities::OperatingSystemCapabilities() {
     instrumentation.selectNode(NodeLexicon::OperatingSystemNode);
 }
 
 OperatingSystemCapabilities::operator bool() {
-    records.method();
+    log.method();
     return instrumentation;
 }
 
 OperatingSystemCapabilities& OperatingSystemCapabilities::operator++() {
-    records.entering();
-    advanceToNext(instrumentation, filterSet, [this] { return passesFilters(); });
-    records.exiting();
+    log.entering();
+    do {
+        ++instrumentation;
+    } while (filterSet && instrumentation && !passesFilters());
+    log.exiting();
     return *this;
 }
 
 bool OperatingSystemCapabilities::passesFilters() {
-    // By FilterType.
-    static constexpr bool (OperatingSystemCapabilities::*texts[])(std::string&) = {
-        &OperatingSystemCapabilities::getInstanceID};
-    return passesAll(*this, filters, texts);
+    std::string identifier;
+    for (const Filter& filter : filters) {
+        if (filter.type != InstanceIDFilter) continue;
+        if (!getInstanceID(identifier)) return false;
+        if (strcasecmp(filter.value.c_str(), identifier.c_str()) != 0) return false;
+    }
+    return true;
 }
 
 bool OperatingSystemCapabilities::getInstanceID(std::string& value) {

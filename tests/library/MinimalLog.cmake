@@ -18,7 +18,7 @@ set_target_properties(minimal_log_provider PROPERTIES
 target_include_directories(minimal_log_provider
     BEFORE PRIVATE "${CMAKE_CURRENT_SOURCE_DIR}/minimal_log" "${folder}")
 target_link_libraries(minimal_log_provider
-    PRIVATE minimal_log vaprovider vainstrumentation korva::options korva::cmpi)
+    PRIVATE minimal_log vaprovider vainstrumentation korva::options korva::base korva::cmpi)
 
 add_library(minimal_log_fixture OBJECT EXCLUDE_FROM_ALL LibraryFixture.cpp)
 target_compile_definitions(minimal_log_fixture PRIVATE

@@ -1,32 +1,26 @@
-#ifndef OSSTATUS_FAR_END_H
-#define OSSTATUS_FAR_END_H
+#ifndef PROVIDER_ASSOCIATION_PATHS_H
+#define PROVIDER_ASSOCIATION_PATHS_H
 
 #include <string>
 
 #include "Moniker.h"
 #include "ProviderUtilities.h"
 
+// The paths and references that adapters of associations make.
+
 namespace VA::OSStatusProvider {
 
-/// What a far end's path is made with.
-struct FarEnd {
-    const CMPIBroker* broker;
-    const std::string& nameSpace;
-    const char* className;
-};
-
-/// A new path of the far end, null when the broker makes none. When `nearEnd` has keys, the path
-/// gets those that `mapping` derives from them; what the mapping throws passes through. Keys are
-/// counted, once there is a path, in a number of type `Count`.
-template <class Count, class Mapping>
-CMPIObjectPath* locate(const FarEnd& farEnd, const CMPIObjectPath* nearEnd, Mapping& mapping,
-                       VA::Moniker (Mapping::*map)(VA::Moniker&)) {
-    CMPIObjectPath* path =
-        VA::ProviderUtilities::createObjectPath(farEnd.broker, farEnd.className, farEnd.nameSpace);
+/// A new path of class `farClass`, null when the broker makes none. When `nearEnd` has keys, the
+/// path gets those that `map`, from moniker to moniker, derives from them; what `map` throws passes
+/// through. Keys are counted, once there is a path, in a number of type `Count`.
+template <class Count, class Map>
+CMPIObjectPath* locateFarEnd(const CMPIBroker* broker, const std::string& nameSpace,
+                             const char* farClass, const CMPIObjectPath* nearEnd, Map map) {
+    CMPIObjectPath* path = VA::ProviderUtilities::createObjectPath(broker, farClass, nameSpace);
     if (static_cast<Count>(VA::ProviderUtilities::getKeyCount(nearEnd)) == 0) return path;
     VA::Moniker moniker;
     VA::ProviderUtilities::transformObjectPathToMoniker(nearEnd, moniker);
-    VA::Moniker mapped = (mapping.*map)(moniker);
+    VA::Moniker mapped = map(moniker);
     VA::ProviderUtilities::transformMonikerToObjectPath(mapped, &path);
     return path;
 }

@@ -6,6 +6,7 @@
 #include "CMPIInstalledOS.h"
 #include "CMPIOperatingSystem.h"
 #include "CMPIRunningOS.h"
+#include "Linux/InstalledOS.h"
 #include "provider/AdapterFixture.h"
 
 namespace {
@@ -200,21 +201,6 @@ TEST_F(Adapters, OfInstalledSystemsAskForPrimaryOSAndSetItWhereItIsKnown) {
     }
     primaryAnswer.reset();
     EXPECT_EQ(propertiesOf(installed), (Texts{"GroupComponent", "PartComponent"}));
-}
-
-TEST_F(Adapters, OfTheOperatingSystemIsNarrowedByEachFurtherPath) {
-    CMPIOperatingSystem adapter(broker.cmpi(), context, "root/cimv2");
-    EXPECT_EQ(key(adapter.getObjectPath(), "Name"), "a");
-    adapter.setObjectPath(made("KORVA_OperatingSystem", {{"Name", "b"}}));
-    EXPECT_TRUE(stands(adapter));
-    EXPECT_EQ(key(adapter.getObjectPath(), "Name"), "b");
-    adapter.setObjectPath(made("KORVA_OperatingSystem", {{"CSName", "Host1"}}));
-    EXPECT_TRUE(stands(adapter));
-    EXPECT_EQ(key(adapter.getObjectPath(), "Name"), "b");
-    adapter.setObjectPath(made("KORVA_OperatingSystem"));
-    EXPECT_EQ(key(adapter.getObjectPath(), "Name"), "b");
-    adapter.setObjectPath(made("KORVA_OperatingSystem", {{"CSName", "elsewhere"}}));
-    EXPECT_FALSE(stands(adapter));
 }
 
 }  // namespace

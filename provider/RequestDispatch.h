@@ -1,0 +1,113 @@
+#ifndef PROVIDER_REQUEST_DISPATCH_H
+#define PROVIDER_REQUEST_DISPATCH_H
+
+#include <cmpi/cmpidt.h>
+#include <cmpi/cmpift.h>
+
+#include "CMPIElementCapabilities.h"
+#include "CMPIInstalledOS.h"
+#include "CMPIOperatingSystem.h"
+#include "CMPIOperatingSystemCapabilities.h"
+#include "CMPIRunningOS.h"
+#include "ClassIds.h"
+#include "base/Span.h"
+
+// How a request finds its adapter, and how an adapter is walked.
+
+namespace VA::OSStatusProvider {
+
+/// What a request is to be answered with.
+enum class Wanted { objectPaths, instances };
+
+/// What a handler was called with, as far as a walk needs it.
+struct Request {
+    const CMPIBroker* broker;
+    const CMPIContext* context;
+    const CMPIResult* result;
+    const CMPIObjectPath* objectPath;
+    Wanted wanted;
+    const char** properties;  ///< the client's list, null for object paths
+};
+
+/// Gives a path or an instance to the result; what the result says of it is ignored. False for
+/// null, which is not given: object managers do not survive it.
+inline bool returnResult(const Request& request, const CMPIObjectPath* path) {
+    if (path == nullptr) return false;
+    request.result->ft->returnObjectPath(request.result, path);
+    return true;
+}
+
+inline bool returnResult(const Request& request, const CMPIInstance* instance) {
+    if (instance == nullptr) return false;
+    request.result->ft->returnInstance(request.result, instance);
+    return true;
+}
+
+/// Fetches the current element of a class that is enumerated and returns it.
+struct Element {
+    template <class Adapter>
+    static bool fetch(Adapter& adapter, const Request& request) {
+        // The broker may tell another class of the path when it is asked again, by the adapter.
+        // CMPIOSElementCapabilities would then return pairs for ever.
+        if (!adapter.enumerates()) return false;
+        return request.wanted == Wanted::objectPaths
+                   ? returnResult(request, adapter.getObjectPath())
+                   : returnResult(request, adapter.getCMPIInstance(request.properties));
+    }
+};
+
+/// Fetches what is at the far end of an association and returns it.
+struct FarEnd {
+    template <class Adapter>
+    static bool fetch(Adapter& adapter, const Request& request) {
+        return request.wanted == Wanted::objectPaths
+                   ? returnResult(request, adapter.getAssociatorNames())
+                   : returnResult(request, adapter.getAssociator(request.properties));
+    }
+};
+
+/// Builds the adapter, returns what it stands on until it ends, and reports the end. A null ends
+/// the walk too: that of a CMPIOSElementCapabilities from a class that is no end of the association
+/// has no other end.
+template <class Adapter, class Result>
+void walk(const Request& request) {
+    Adapter adapter(request.broker, request.context, request.objectPath);
+    while (adapter && Result::fetch(adapter, request)) ++adapter;
+    request.result->ft->returnDone(request.result);
+}
+
+using Walk = void (*)(const Request& request);
+
+/// A class id, and the walk that serves requests for it.
+struct DispatchRow {
+    unsigned short classId;
+    Walk walk;
+};
+using Dispatch = base::Span<const DispatchRow>;
+
+/// By the class of the request's path.
+constexpr DispatchRow instanceDispatch[] = {
+    {operatingSystemId, walk<CMPIOperatingSystem, Element>},
+    {operatingSystemCapabilitiesId, walk<CMPIOperatingSystemCapabilities, Element>},
+    {installedOSId, walk<CMPIInstalledOS, Element>},
+    {runningOSId, walk<CMPIRunningOS, Element>},
+    {elementCapabilitiesId, walk<CMPIOSElementCapabilities, Element>},
+};
+
+/// By the association class that the request names.
+constexpr DispatchRow associatorDispatch[] = {
+    {runningOSId, walk<CMPIRunningOS, FarEnd>},
+    {elementCapabilitiesId, walk<CMPIOSElementCapabilities, FarEnd>},
+    {installedOSId, walk<CMPIInstalledOS, FarEnd>},
+};
+
+/// Null for a class that is not served.
+inline Walk findWalk(Dispatch dispatch, unsigned short classId) {
+    for (const DispatchRow& row : dispatch)
+        if (row.classId == classId) return row.walk;
+    return nullptr;
+}
+
+}  // namespace VA::OSStatusProvider
+
+#endif
