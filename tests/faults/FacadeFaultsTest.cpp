@@ -12,14 +12,6 @@ namespace {
 using namespace cmpihost;
 using Texts = std::vector<std::string>;
 
-constexpr std::size_t mostTrials = 20000;  ///< no request has so many calls or allocations
-
-BrokerOptions withoutQuarantine() {
-    BrokerOptions options;
-    options.quarantine = 0;
-    return options;
-}
-
 LoadOptions byName() {
     LoadOptions options;
     options.providerName = "OSStatusFacade";
@@ -44,6 +36,28 @@ class FacadeFaults : public FaultsOfHandler {
             wholeAnswers = answersThatCountAsWhole();
             body();
             broker.takeViolations();
+        });
+    }
+
+    // `arm` has each call of something do what it is given, until the next hooks are set.
+    template <class Arm>
+    void countExceptionsUp(Arm arm) {
+        std::size_t turn = 0;
+        forEachRequest([&] {
+            ++turn;
+            countUp("call", [&](std::size_t n) {
+                const ExceptionKind& kind = exceptionKinds[(n + turn) % std::size(exceptionKinds)];
+                SCOPED_TRACE(kind.name);
+                std::size_t calls = 0;
+                arm([&] {
+                    if (++calls == n) kind.raise();
+                });
+                const Answer answer = answerTo(asked);
+                host->setHook({});
+                limitRecords();
+                expectWholeOrRefused(answer);
+                return calls >= n;
+            });
         });
     }
 
@@ -137,8 +151,8 @@ struct Trial {
 class FacadeBrokerFaults : public FacadeFaults {
   protected:
     // False when no call failed. The provider's markers tell whose call it was.
-    bool run(Trial& trial, unsigned n, unsigned times, CMPIrc rc) {
-        trial.plan.add({"", n, times, rc});
+    bool run(Trial& trial, std::size_t n, unsigned times, CMPIrc rc) {
+        trial.plan.add({"", static_cast<unsigned>(n), times, rc});
         bool inProvider = false;
         recording::setHook([&](const recording::Record& record) {
             if (record.function != "markProviderEntry" && record.function != "markProviderExit")
@@ -173,17 +187,17 @@ class FacadeBrokerFaults : public FacadeFaults {
 
 TEST_P(FacadeBrokerFaults, OfTheNthCallGiveAWholeAnswerOrARefusal) {
     forEachRequest([this] {
-        for (unsigned n = 1;; ++n) {
-            ASSERT_LT(n, mostTrials);
+        countUp("call", [this](std::size_t n) {
             Trial trial;
-            if (!run(trial, n, 1, CMPI_RC_ERR_FAILED)) break;
+            if (!run(trial, n, 1, CMPI_RC_ERR_FAILED)) return false;
             const std::string entry = trial.plan.firedCalls().front();
-            SCOPED_TRACE(testing::Message() << "call " << n << ", " << entry);
+            SCOPED_TRACE(entry);
             expectEnded(trial);
             // What the client's result says is ignored.
             if (!trial.ofProvider && entry.rfind("CMPIResultFT.", 0) != 0)
                 expectWholeOrRefused(trial.answer);
-        }
+            return true;
+        });
     });
 }
 
@@ -191,93 +205,51 @@ TEST_P(FacadeBrokerFaults, OfEveryCallFromTheNthOnAndNullsThatPassForSuccessLetT
     forEachRequest([this] {
         for (const CMPIrc rc : {CMPI_RC_ERR_FAILED, CMPI_RC_OK})
             for (const unsigned times : {0U, 1U})
-                for (unsigned n = 1;; ++n) {
-                    ASSERT_LT(n, mostTrials);
+                countUp("call", [&](std::size_t n) {
                     Trial trial;
-                    if (!run(trial, n, times, rc)) break;
-                    SCOPED_TRACE(testing::Message() << "call " << n << ", rc " << rc);
+                    if (!run(trial, n, times, rc)) return false;
+                    SCOPED_TRACE(testing::Message() << "rc " << rc);
                     expectEnded(trial);
-                }
+                    return true;
+                });
     });
 }
 
+// Each call meets one of the kinds, in each request another one.
 TEST_P(FacadeFaults, OfTheNthCallOfTheHostGiveAWholeAnswerOrARefusal) {
-    std::size_t turn = 0;
-    forEachRequest([&] {
-        ++turn;
-        for (std::size_t n = 1;; ++n) {
-            ASSERT_LT(n, mostTrials);
-            const ExceptionKind& kind = exceptionKinds[(n + turn) % std::size(exceptionKinds)];
-            SCOPED_TRACE(testing::Message() << kind.name << " from call " << n);
-            std::size_t calls = 0;
-            host->setHook([&](const VA::SimulatedHost::Call&) {
-                if (++calls == n) kind.raise();
-            });
-            const Answer answer = answerTo(asked);
-            host->setHook({});
-            expectWholeOrRefused(answer);
-            if (calls < n) break;
-        }
+    countExceptionsUp([this](auto raise) {
+        host->setHook([raise](const VA::SimulatedHost::Call&) { raise(); });
     });
 }
 
 TEST_P(FacadeFaults, OfTheNthRecordGiveAWholeAnswerOrARefusal) {
-    std::size_t turn = 0;
-    forEachRequest([&] {
-        ++turn;
-        for (std::size_t n = 1;; ++n) {
-            ASSERT_LT(n, mostTrials);
-            const ExceptionKind& kind = exceptionKinds[(n + turn) % std::size(exceptionKinds)];
-            SCOPED_TRACE(testing::Message() << kind.name << " from record " << n);
-            std::size_t records = 0;
-            recording::setHook([&](const recording::Record&) {
-                if (++records == n) kind.raise();
-            });
-            const Answer answer = answerTo(asked);
-            limitRecords();
-            expectWholeOrRefused(answer);
-            if (records < n) break;
-        }
-    });
+    countExceptionsUp(
+        [](auto raise) { recording::setHook([raise](const recording::Record&) { raise(); }); });
 }
 
 class FacadeAllocationFaults : public FacadeFaults {
   protected:
-    // How many allocations failed.
-    std::size_t tryOnce(std::size_t n, bool andLater) {
-        allocations::failFrom(n, andLater);
-        const Answer answer = answerTo(asked);
-        const std::size_t failed = allocations::release();
-        expectWholeOrRefused(answer);
-        broker.takeViolations();
-        return failed;
-    }
-
-    void countUp(bool andLater) {
-        std::size_t before = 0;
-        for (std::size_t n = 1;; ++n) {
-            ASSERT_LT(n, mostTrials);
-            SCOPED_TRACE(testing::Message() << "allocation " << n);
-            const std::size_t failed = tryOnce(n, andLater);
-            // The first failure may have made the log keep one buffer more.
-            const std::size_t after = allocations::blocksInUse();
-            if (n > 1) {
-                EXPECT_EQ(after, before);
-            }
-            before = after;
-            if (failed != 0) continue;
-            EXPECT_GT(n, 1U);
-            break;
-        }
+    void countUpForEachRequest(bool andLater) {
+        forEachRequest([&] {
+            const std::size_t end = countAllocationsUp([&](std::size_t n) {
+                allocations::failFrom(n, andLater);
+                const Answer answer = answerTo(asked);
+                const bool failed = allocations::release() != 0;
+                expectWholeOrRefused(answer);
+                broker.takeViolations();
+                return failed;
+            });
+            EXPECT_GT(end, 1U);
+        });
     }
 };
 
 TEST_P(FacadeAllocationFaults, OfTheNthAloneGiveAWholeAnswerOrARefusalAndLeaveNothingBehind) {
-    forEachRequest([this] { countUp(false); });
+    countUpForEachRequest(false);
 }
 
 TEST_P(FacadeAllocationFaults, OfAllFromTheNthOnGiveAWholeAnswerOrARefusalAndLeaveNothingBehind) {
-    forEachRequest([this] { countUp(true); });
+    countUpForEachRequest(true);
 }
 
 INSTANTIATE_TEST_SUITE_P(Of, FacadeFaults, testing::ValuesIn(facadeHandlers()), nameOf);

@@ -1,3 +1,5 @@
+// What all faults have in common: the host that they meet, the count that goes up, and what holds
+// for a request whatever failed on its way.
 #include "faults/FaultFixture.h"
 
 #include <algorithm>
@@ -48,7 +50,31 @@ void expectBalanced(const std::vector<Record>& records) {
     for (const auto& [place, count] : open) EXPECT_EQ(count, 0) << place;
 }
 
+const HostNames names = {"host1", "Linux", "other"};
+
 }  // namespace
+
+std::vector<NamedRequest> requestsOf(const std::string& handler) {
+    std::vector<NamedRequest> found;
+    for (const auto& rows : {servedRequests(names), facadeRequests(names)})
+        for (const NamedRequest& row : rows)
+            if (row.handler == handler) found.push_back(row);
+    return found;
+}
+
+std::vector<std::string> servingHandlers() {
+    return handlersOf(servedRequests(names));
+}
+
+std::vector<std::string> facadeHandlers() {
+    return handlersOf(facadeRequests(names));
+}
+
+BrokerOptions withoutQuarantine() {
+    BrokerOptions options;
+    options.quarantine = 0;
+    return options;
+}
 
 FaultFixture::FaultFixture(BrokerOptions options) : LibraryFixture(options) {
     VA::SimulatedHost::Node bare;
@@ -83,6 +109,20 @@ Answer FaultFixture::answerTo(const NamedRequest& asked) {
         if (record.channel == "log" && startsWith(record.text, "MESSAGE "))
             answer.messages.push_back(record.text.substr(record.text.find("]: ") + 3));
     return answer;
+}
+
+Attempt FaultFixture::attempt(const NamedRequest& asked) {
+    Attempt attempt;
+    try {
+        attempt.answer = answerTo(asked);
+    } catch (const std::exception&) {
+        attempt.end = Attempt::Standard;
+    } catch (...) {
+        attempt.end = Attempt::Foreign;
+    }
+    if (attempt.end != Attempt::Answered) attempt.answer.records = recording::take();
+    broker.takeViolations();
+    return attempt;
 }
 
 void FaultFixture::expectSound(const NamedRequest& asked, const Answer& answer) {

@@ -5,8 +5,18 @@
 #include <utility>
 #include <vector>
 
-#include "faults/Requests.h"
+#include "faults/CountUp.h"
 #include "library/LibraryFixture.h"
+#include "support/Requests.h"
+
+/// The requests of a handler of the provider that serves, or of the facade, on the fixture's host;
+/// and the handlers.
+std::vector<NamedRequest> requestsOf(const std::string& handler);
+std::vector<std::string> servingHandlers();
+std::vector<std::string> facadeHandlers();
+
+/// A broker that keeps no shells of ended objects, which are blocks of memory too.
+cmpihost::BrokerOptions withoutQuarantine();
 
 /// What a request left behind.
 struct Answer {
@@ -14,6 +24,13 @@ struct Answer {
     std::vector<recording::Record> records;
     std::vector<std::string> elements;  ///< paths and instances in full, in order
     std::vector<std::string> messages;  ///< texts of the message records in the log
+};
+
+/// How a request ended: with an answer, or with an exception that left the handler. Then the
+/// records are all that there is of the answer.
+struct Attempt {
+    enum End { Answered, Standard, Foreign } end = Answered;
+    Answer answer;
 };
 
 /// The built provider on a host of two nodes, one with every property and one with a name, under a
@@ -30,6 +47,9 @@ class FaultFixture : public LibraryFixture {
 
     /// Forgets the records so far and runs the request; exceptions of the library pass through.
     Answer answerTo(const NamedRequest& asked);
+
+    /// The same, with the exceptions of the library caught. Forgets what the broker caught.
+    Attempt attempt(const NamedRequest& asked);
 
     /// Checks what holds for each request that was served, whatever failed on the way: every record
     /// stands in both channels, the handler's markers are around all others, and either there is

@@ -10,28 +10,16 @@ using VA::SimulatedHost;
 
 constexpr std::size_t counts[] = {1, 1000, 10000};
 
-struct Row {
-    const char* name;
-    Operation operation;
-    ObjectPathValue path;
-    std::optional<std::string> assocClass;
+const NamedRequest rows[] = {
+    {"EnumerateInstances", "",
+     requestFor(Operation::EnumerateInstances, path("KORVA_OperatingSystem"))},
+    {"EnumerateInstanceNames", "",
+     requestFor(Operation::EnumerateInstanceNames, path("KORVA_OperatingSystem"))},
+    {"AssociatorsOfComputer", "",
+     requestFor(Operation::Associators, computerSystemPath("host1"), "KORVA_InstalledOS")},
 };
 
-std::ostream& operator<<(std::ostream& out, const Row& row) {
-    return out << row.name;
-}
-
-const Row rows[] = {
-    {"EnumerateInstances", Operation::EnumerateInstances, path("KORVA_OperatingSystem"), {}},
-    {"EnumerateInstanceNames",
-     Operation::EnumerateInstanceNames,
-     path("KORVA_OperatingSystem"),
-     {}},
-    {"AssociatorsOfComputer", Operation::Associators, computerSystemPath("host1"),
-     "KORVA_InstalledOS"},
-};
-
-class PeakMemory : public LibraryFixture, public testing::WithParamInterface<Row> {
+class PeakMemory : public LibraryFixture, public testing::WithParamInterface<NamedRequest> {
   protected:
     PeakMemory() { recording::setRecording(false); }
     ~PeakMemory() override { allocations::measured(); }
@@ -42,19 +30,11 @@ class PeakMemory : public LibraryFixture, public testing::WithParamInterface<Row
         host->clearNodes();
         host->addNodes(node, nodes);
         allocations::measure();
-        answer(nodes);
-        return allocations::measured();
-    }
-
-  private:
-    void answer(std::size_t nodes) {
-        OperationRequest request;
-        request.operation = GetParam().operation;
-        request.path = GetParam().path;
-        request.assocClass = GetParam().assocClass;
-        const Outcome outcome = invoke(request);
+        const Outcome outcome = invoke(GetParam().request);
+        const allocations::Usage usage = allocations::measured();
         EXPECT_EQ(outcome.rc, CMPI_RC_OK);
         EXPECT_EQ(outcome.paths.size() + outcome.instances.size(), nodes);
+        return usage;
     }
 };
 
@@ -71,10 +51,7 @@ TEST_P(PeakMemory, IsTheSameForAnyNumberOfNodesAndNothingIsLeft) {
     }
 }
 
-std::string nameOfRow(const testing::TestParamInfo<Row>& info) {
-    return info.param.name;
-}
-
-INSTANTIATE_TEST_SUITE_P(Of, PeakMemory, testing::ValuesIn(rows), nameOfRow);
+INSTANTIATE_TEST_SUITE_P(Of, PeakMemory, testing::ValuesIn(rows),
+                         [](const auto& row) { return row.param.name; });
 
 }  // namespace

@@ -8,7 +8,7 @@
 #include <filesystem>
 #include <fstream>
 
-#include "host/ProgramRun.h"
+#include "support/ProgramRun.h"
 
 namespace {
 

@@ -10,7 +10,7 @@
 #include <nlohmann/json.hpp>
 #include <sstream>
 
-#include "host/ProgramRun.h"
+#include "support/ProgramRun.h"
 
 namespace {
 

@@ -2,7 +2,7 @@
 #include <gmock/gmock.h>
 #include <sys/utsname.h>
 
-#include "host/ProgramRun.h"
+#include "support/ProgramRun.h"
 
 namespace {
 

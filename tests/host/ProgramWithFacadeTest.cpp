@@ -5,7 +5,7 @@
 
 #include <nlohmann/json.hpp>
 
-#include "host/ProgramRun.h"
+#include "support/ProgramRun.h"
 
 namespace {
 

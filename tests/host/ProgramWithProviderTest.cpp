@@ -6,7 +6,7 @@
 #include <cstdio>
 #include <fstream>
 
-#include "host/ProgramRun.h"
+#include "support/ProgramRun.h"
 
 namespace {
 

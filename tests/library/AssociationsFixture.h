@@ -37,16 +37,9 @@ inline Texts briefs(const std::vector<InstanceValue>& instances) {
     return result;
 }
 
-/// What the three associations have: class, and the reference names in their order.
-struct Design {
-    const char* className;
-    const char* first;
-    const char* second;
-};
-inline constexpr Design installed = {"KORVA_InstalledOS", "GroupComponent", "PartComponent"};
-inline constexpr Design running = {"KORVA_RunningOS", "Antecedent", "Dependent"};
-inline constexpr Design capabilities = {"KORVA_OSElementCapabilities", "ManagedElement",
-                                        "Capabilities"};
+inline constexpr Association installed = installedOS;
+inline constexpr Association running = runningOS;
+inline constexpr Association capabilities = elementCapabilities;
 
 class Associations : public LibraryFixture {
   protected:
@@ -64,51 +57,52 @@ class Associations : public LibraryFixture {
 
     // The pairs of an enumeration, each as "first+second"; checks that names and instances agree,
     // and that each ends as `ends` says: with returnDone, or with a message and without.
-    Texts pairs(const Design& design, const std::string& message = "") {
+    Texts pairs(const Association& association, const std::string& message = "") {
         recording::clear();
-        const Outcome names = enumerateNames(design.className);
+        const Outcome names = enumerateNames(association.className);
         expectEnd(names, message);
-        const Outcome instances = enumerate(design.className);
+        const Outcome instances = enumerate(association.className);
         expectEnd(instances, message);
         Texts result;
         for (const ObjectPathValue& path : names.paths) {
             EXPECT_EQ(path.keys.size(), 2U);
-            EXPECT_EQ(path.keys[0].name, design.first);
-            EXPECT_EQ(path.keys[1].name, design.second);
-            result.push_back(brief(path.key(design.first)) + "+" + brief(path.key(design.second)));
+            EXPECT_EQ(path.keys[0].name, association.first);
+            EXPECT_EQ(path.keys[1].name, association.second);
+            result.push_back(brief(path.key(association.first)) + "+" +
+                             brief(path.key(association.second)));
         }
-        EXPECT_EQ(pairsOf(instances, design), result);
+        EXPECT_EQ(pairsOf(instances, association), result);
         return result;
     }
 
     // The pairs of instances, each as "first+second".
-    static Texts pairsOf(const Outcome& outcome, const Design& design) {
+    static Texts pairsOf(const Outcome& outcome, const Association& association) {
         Texts result;
         for (const InstanceValue& instance : outcome.instances) {
             EXPECT_EQ(instance.property("PrimaryOS"), nullptr);
-            result.push_back(brief(instance.property(design.first)) + "+" +
-                             brief(instance.property(design.second)));
+            result.push_back(brief(instance.property(association.first)) + "+" +
+                             brief(instance.property(association.second)));
         }
         return result;
     }
 
     // The pairs that GetInstance gives for a path; checks the end as pairs() does.
-    Texts gotten(const ObjectPathValue& asked, const Design& design,
+    Texts gotten(const ObjectPathValue& asked, const Association& association,
                  const std::string& message = "") {
         recording::clear();
         const Outcome outcome = get(asked);
         expectEnd(outcome, message);
         EXPECT_TRUE(outcome.paths.empty());
-        return pairsOf(outcome, design);
+        return pairsOf(outcome, association);
     }
 
     // The far ends from a source; checks that names and instances agree, and the end.
-    Texts farEnds(const ObjectPathValue& source, const Design& design,
+    Texts farEnds(const ObjectPathValue& source, const Association& association,
                   const std::string& message = "") {
         recording::clear();
-        const Outcome names = associatorNames(source, design.className);
+        const Outcome names = associatorNames(source, association.className);
         expectEnd(names, message);
-        const Outcome instances = associators(source, design.className);
+        const Outcome instances = associators(source, association.className);
         expectEnd(instances, message);
         EXPECT_EQ(briefs(instances.instances), briefs(names.paths));
         return briefs(names.paths);

@@ -11,11 +11,12 @@ constexpr const char* capabilitiesWithoutKey =
     "path of KORVA_OperatingSystemCapabilities without key InstanceID";
 
 // The path of an association of the computer without keys, with one and with both references.
-std::vector<ObjectPathValue> pathsOf(const Design& design) {
-    const KeyBinding first = {design.first, Value::fromReference(computerSystemPath("other"))};
-    const KeyBinding second = {design.second, Value::fromReference(operatingSystemPath("x", "y"))};
-    return {path(design.className), path(design.className, {first}),
-            path(design.className, {first, second})};
+std::vector<ObjectPathValue> pathsOf(const Association& association) {
+    const KeyBinding first = {association.first, Value::fromReference(computerSystemPath("other"))};
+    const KeyBinding second = {association.second,
+                               Value::fromReference(operatingSystemPath("x", "y"))};
+    return {path(association.className), path(association.className, {first}),
+            path(association.className, {first, second})};
 }
 
 // Enumerated, and by GetInstance: with whatever keys, it gives the pairs of an enumeration.
@@ -50,9 +51,9 @@ TEST_F(Associations, OfComputerAndSystemAreGivenInStepUntilEitherEndRunsOut) {
 TEST_F(Associations, WithoutAComputerSystemEnumerationAndGetEndWithAMessage) {
     for (const unsigned int nodes : {0U, 1U, 2U, 3U}) {
         populate(nodes, 0);
-        for (const Design& design : {installed, running})
-            for (const ObjectPathValue& asked : pathsOf(design))
-                EXPECT_THAT(gotten(asked, design, noComputerSystem), IsEmpty());
+        for (const Association& association : {installed, running})
+            for (const ObjectPathValue& asked : pathsOf(association))
+                EXPECT_THAT(gotten(asked, association, noComputerSystem), IsEmpty());
         EXPECT_THAT(pairs(installed, noComputerSystem), IsEmpty());
         EXPECT_THAT(pairs(running, noComputerSystem), IsEmpty());
     }
@@ -63,11 +64,11 @@ TEST_F(Associations, FromAnOperatingSystemToItsComputers) {
     for (const unsigned int nodes : {0U, 1U, 2U, 3U}) {
         for (const unsigned int count : {1U, 2U, 3U}) {
             populate(nodes, count);
-            for (const Design& design : {installed, running})
+            for (const Association& association : {installed, running})
                 for (const ObjectPathValue& source :
                      {operatingSystemPath("host1", "os1"), path("KORVA_OperatingSystem"),
                       operatingSystemPath("elsewhere", "unknown")})
-                    EXPECT_EQ(farEnds(source, design), byCount[count]) << nodes << count;
+                    EXPECT_EQ(farEnds(source, association), byCount[count]) << nodes << count;
         }
         populate(nodes, 0);
         EXPECT_THAT(farEnds(operatingSystemPath("host1", "os1"), installed, noComputerSystem),
@@ -82,10 +83,10 @@ TEST_F(Associations, FromAComputerToItsOperatingSystems) {
     for (const unsigned int nodes : {0U, 1U, 2U, 3U}) {
         for (const unsigned int count : {0U, 1U, 2U, 3U}) {
             populate(nodes, count);
-            for (const Design& design : {installed, running}) {
-                EXPECT_EQ(farEnds(computerSystemPath("HOST1"), design), byCount[nodes]);
-                EXPECT_EQ(farEnds(path("KORVA_ComputerSystem"), design), byCount[nodes]);
-                EXPECT_EQ(farEnds(computerSystemPath("host2"), design), Texts{});
+            for (const Association& association : {installed, running}) {
+                EXPECT_EQ(farEnds(computerSystemPath("HOST1"), association), byCount[nodes]);
+                EXPECT_EQ(farEnds(path("KORVA_ComputerSystem"), association), byCount[nodes]);
+                EXPECT_EQ(farEnds(computerSystemPath("host2"), association), Texts{});
             }
         }
     }
@@ -171,11 +172,11 @@ TEST_F(Associations, FirstOfTheKeysThatNameTheComputerDecides) {
 
 TEST_F(Associations, SourceWithKeysButNotTheOneSoughtEndsWithAMessage) {
     const std::vector<KeyBinding> keys = {{"Other", "x"}};
-    for (const Design& design : {installed, running}) {
-        EXPECT_THAT(farEnds(path("KORVA_OperatingSystem", keys), design,
+    for (const Association& association : {installed, running}) {
+        EXPECT_THAT(farEnds(path("KORVA_OperatingSystem", keys), association,
                             "Could not find 'CSName' or 'Name' Key in Moniker"),
                     IsEmpty());
-        EXPECT_THAT(farEnds(path("KORVA_ComputerSystem", keys), design,
+        EXPECT_THAT(farEnds(path("KORVA_ComputerSystem", keys), association,
                             "Could not find 'Name' Key in Moniker"),
                     IsEmpty());
     }
@@ -208,9 +209,9 @@ TEST_F(Associations, KeysOfOtherTypesAreMappedAsText) {
 }
 
 TEST_F(Associations, SourceThatIsNoEndYieldsNothingAndDone) {
-    for (const Design& design : {installed, running, capabilities})
+    for (const Association& association : {installed, running, capabilities})
         for (const char* source : {"KORVA_Unknown", "CIM_OperatingSystem", ""})
-            EXPECT_THAT(farEnds(path(source, {{"Name", "x"}}), design), IsEmpty());
+            EXPECT_THAT(farEnds(path(source, {{"Name", "x"}}), association), IsEmpty());
     EXPECT_THAT(farEnds(path("KORVA_RunningOS"), installed), IsEmpty());
     EXPECT_THAT(farEnds(path("KORVA_InstalledOS"), running), IsEmpty());
     EXPECT_THAT(farEnds(path("KORVA_OSElementCapabilities"), running), IsEmpty());
@@ -220,8 +221,8 @@ TEST_F(Associations, SourceThatIsNoEndYieldsNothingAndDone) {
 }
 
 TEST_F(Associations, SourceOfTheAssociationItselfHasNoFarEnd) {
-    for (const Design& design : {installed, running, capabilities})
-        EXPECT_THAT(farEnds(path(design.className), design), IsEmpty());
+    for (const Association& association : {installed, running, capabilities})
+        EXPECT_THAT(farEnds(path(association.className), association), IsEmpty());
     populate(1, 0);
     EXPECT_THAT(farEnds(path("KORVA_RunningOS"), running, noComputerSystem), IsEmpty());
     populate(0, 1);
@@ -285,15 +286,15 @@ TEST_F(Associations, PropertyListReachesTheFarEndAndIsNotApplied) {
 }
 
 TEST_F(Associations, ReferencesOmittedFromThePropertyListAreSetAllTheSame) {
-    for (const Design& design : {installed, running, capabilities}) {
+    for (const Association& association : {installed, running, capabilities}) {
         OperationRequest request;
         request.operation = Operation::EnumerateInstances;
-        request.path = path(design.className);
+        request.path = path(association.className);
         request.properties = std::vector<std::string>{"PrimaryOS"};
         const Outcome outcome = invoke(request);
         ASSERT_EQ(outcome.instances.size(), 1U);
-        EXPECT_NE(outcome.instances[0].property(design.first), nullptr);
-        EXPECT_NE(outcome.instances[0].property(design.second), nullptr);
+        EXPECT_NE(outcome.instances[0].property(association.first), nullptr);
+        EXPECT_NE(outcome.instances[0].property(association.second), nullptr);
         EXPECT_EQ(outcome.instances[0].property("PrimaryOS"), nullptr);
     }
 }

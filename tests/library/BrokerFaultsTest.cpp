@@ -13,12 +13,12 @@ using testing::Not;
 class BrokerFaults : public Associations {
   protected:
     // The records of an enumeration of instances in which no instance can be made.
-    std::string recordsWithoutInstance(const Design& design, CMPIrc rc) {
+    std::string recordsWithoutInstance(const Association& association, CMPIrc rc) {
         populate(3, 3);
         FaultPlan plan(Fault{"newInstance", 1, 0, rc});
         broker.setFaultPlan(&plan);
         recording::clear();
-        const Outcome outcome = enumerate(design.className);
+        const Outcome outcome = enumerate(association.className);
         broker.setFaultPlan(nullptr);
         EXPECT_EQ(outcome.rc, CMPI_RC_OK);
         EXPECT_THAT(outcome.instances, IsEmpty());
@@ -56,7 +56,7 @@ TEST_F(BrokerFaults, FailingResultStillReceivesEveryFarEndAndOneDone) {
     populate(3, 4);
     struct Case {
         ObjectPathValue source;
-        Design design;
+        Association association;
     };
     const Case cases[] = {{computerSystemPath("host1"), installed},
                           {computerSystemPath("host1"), running},
@@ -67,7 +67,7 @@ TEST_F(BrokerFaults, FailingResultStillReceivesEveryFarEndAndOneDone) {
     for (const Case& each : cases) {
         OperationRequest request;
         request.path = each.source;
-        request.assocClass = each.design.className;
+        request.assocClass = each.association.className;
         request.operation = Operation::Associators;
         const Outcome instances = invoke(request, [](ResultCollector& collector) {
             collector.failReturnInstance(1, CMPI_RC_ERR_FAILED);

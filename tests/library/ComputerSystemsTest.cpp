@@ -11,16 +11,17 @@ class ComputerSystems : public Associations {
   protected:
     // The pairs of an enumeration whose paths may lack a reference; checks that names and instances
     // agree.
-    Texts pairsWithGaps(const Design& design) {
+    Texts pairsWithGaps(const Association& association) {
         recording::clear();
-        const Outcome names = enumerateNames(design.className);
+        const Outcome names = enumerateNames(association.className);
         expectEnd(names, "");
         Texts result;
         for (const ObjectPathValue& path : names.paths)
-            result.push_back(brief(path.key(design.first)) + "+" + brief(path.key(design.second)));
-        const Outcome instances = enumerate(design.className);
+            result.push_back(brief(path.key(association.first)) + "+" +
+                             brief(path.key(association.second)));
+        const Outcome instances = enumerate(association.className);
         expectEnd(instances, "");
-        EXPECT_EQ(pairsOf(instances, design), result);
+        EXPECT_EQ(pairsOf(instances, association), result);
         return result;
     }
 };

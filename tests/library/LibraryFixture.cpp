@@ -1,40 +1,11 @@
+// The library is loaded as it ships, so that what is tested is what an object manager gets.
 #include "library/LibraryFixture.h"
 
 #include "framework/instrumentation/HostSource.h"
-#include "host/mof/Schema.h"
 
 using namespace cmpihost;
 
 const char* const providerFile = KORVA_BINARY_DIR "/lib/libkorzbosstatusprofileprovider.so.1";
-
-const ClassCatalogue& schemaCatalogue() {
-    static const SchemaCatalogue catalogue(Schema::load(KORVA_SOURCE_DIR "/schema"));
-    return catalogue;
-}
-
-ObjectPathValue path(const std::string& className, std::vector<KeyBinding> keys) {
-    ObjectPathValue result;
-    result.nameSpace = "root/cimv2";
-    result.className = className;
-    result.keys = std::move(keys);
-    return result;
-}
-
-ObjectPathValue operatingSystemPath(const std::string& csName, const std::string& name) {
-    return path("KORVA_OperatingSystem", {{"CSCreationClassName", "KORVA_ComputerSystem"},
-                                          {"CSName", csName},
-                                          {"CreationClassName", "KORVA_OperatingSystem"},
-                                          {"Name", name}});
-}
-
-ObjectPathValue capabilitiesPath(const std::string& instanceId) {
-    return path("KORVA_OperatingSystemCapabilities", {{"InstanceID", instanceId}});
-}
-
-ObjectPathValue computerSystemPath(const std::string& name) {
-    return path("KORVA_ComputerSystem",
-                {{"CreationClassName", "KORVA_ComputerSystem"}, {"Name", name}});
-}
 
 std::vector<std::string> texts(const std::vector<ObjectPathValue>& paths) {
     std::vector<std::string> result;
@@ -82,40 +53,27 @@ Outcome LibraryFixture::invoke(const OperationRequest& request, const CollectorS
 }
 
 Outcome LibraryFixture::enumerateNames(const std::string& className) {
-    OperationRequest request;
-    request.operation = Operation::EnumerateInstanceNames;
-    request.path = path(className);
-    return invoke(request);
+    return invoke(requestFor(Operation::EnumerateInstanceNames, path(className)));
 }
 
 Outcome LibraryFixture::enumerate(const std::string& className) {
-    OperationRequest request;
-    request.operation = Operation::EnumerateInstances;
-    request.path = path(className);
-    return invoke(request);
+    return invoke(requestFor(Operation::EnumerateInstances, path(className)));
 }
 
 Outcome LibraryFixture::get(const ObjectPathValue& instance) {
-    OperationRequest request;
-    request.operation = Operation::GetInstance;
-    request.path = instance;
-    return invoke(request);
+    return invoke(requestFor(Operation::GetInstance, instance));
 }
 
 Outcome LibraryFixture::associatorNames(const ObjectPathValue& source,
                                         std::optional<std::string> assocClass) {
-    OperationRequest request;
-    request.operation = Operation::AssociatorNames;
-    request.path = source;
+    OperationRequest request = requestFor(Operation::AssociatorNames, source);
     request.assocClass = std::move(assocClass);
     return invoke(request);
 }
 
 Outcome LibraryFixture::associators(const ObjectPathValue& source,
                                     std::optional<std::string> assocClass) {
-    OperationRequest request;
-    request.operation = Operation::Associators;
-    request.path = source;
+    OperationRequest request = requestFor(Operation::Associators, source);
     request.assocClass = std::move(assocClass);
     return invoke(request);
 }

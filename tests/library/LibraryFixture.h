@@ -12,22 +12,11 @@
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
 #include "support/RecordingLog.h"
+#include "support/Requests.h"
 #include "support/SimulatedHost.h"
 
 /// The file of the built provider.
 extern const char* const providerFile;
-
-/// The classes of schema/, read once.
-const cmpihost::ClassCatalogue& schemaCatalogue();
-
-/// A path of one class in root/cimv2; keys are text.
-cmpihost::ObjectPathValue path(const std::string& className,
-                               std::vector<cmpihost::KeyBinding> keys = {});
-
-/// The path of the operating system named `name` on the computer `csName`.
-cmpihost::ObjectPathValue operatingSystemPath(const std::string& csName, const std::string& name);
-cmpihost::ObjectPathValue capabilitiesPath(const std::string& instanceId);
-cmpihost::ObjectPathValue computerSystemPath(const std::string& name);
 
 /// Paths as text, in order; instances by their path.
 std::vector<std::string> texts(const std::vector<cmpihost::ObjectPathValue>& paths);

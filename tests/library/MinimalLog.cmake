@@ -22,12 +22,11 @@ target_link_libraries(minimal_log_provider
 
 add_library(minimal_log_fixture OBJECT EXCLUDE_FROM_ALL LibraryFixture.cpp)
 target_compile_definitions(minimal_log_fixture PRIVATE
-    KORVA_SOURCE_DIR="${PROJECT_SOURCE_DIR}" KORVA_BINARY_DIR="${CMAKE_BINARY_DIR}/minimal-log")
-target_include_directories(minimal_log_fixture PUBLIC "${PROJECT_SOURCE_DIR}/tests")
+    KORVA_BINARY_DIR="${CMAKE_BINARY_DIR}/minimal-log")
 target_link_libraries(minimal_log_fixture
-    PUBLIC korva_simulated_host korva::vainstrumentation korva::schema_reader GTest::gmock)
+    PUBLIC korva_requests korva_simulated_host korva::vainstrumentation GTest::gmock)
 
 korva_test(minimal_log_tests
     SOURCES RecordsTest.cpp
-    LIBRARIES minimal_log minimal_log_fixture korva::vainstrumentation korva::schema_reader)
+    LIBRARIES minimal_log minimal_log_fixture korva_requests korva::vainstrumentation)
 add_dependencies(minimal_log_tests minimal_log_provider)

@@ -65,12 +65,12 @@ class Sources : public Associations {
   protected:
     Sources() { populate(3, 1); }
 
-    Texts farEndsFiltered(Operation operation, const Row& row, const Design& design,
+    Texts farEndsFiltered(Operation operation, const Row& row, const Association& association,
                           const Filters& filters, const std::string& message) {
         OperationRequest request;
         request.operation = operation;
         request.path = row.source;
-        request.assocClass = design.className;
+        request.assocClass = association.className;
         request.resultClass = filters.resultClass;
         request.role = filters.role;
         request.resultRole = filters.resultRole;

@@ -1,3 +1,6 @@
+// Many threads in the provider at once, through the built library and the real logging, with the
+// facade in front of it and without: object managers serve clients in parallel, and nothing that a
+// thread asks may show in the answer or in the record lines of another.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <unistd.h>
@@ -11,30 +14,138 @@
 #include <utility>
 
 #include "framework/instrumentation/HostSource.h"
+#include "host/broker/ComputerSystemService.h"
+#include "host/broker/Invoke.h"
 #include "instrumentation/FixtureTree.h"
-#include "load/Crowd.h"
-#include "load/Loaded.h"
-#include "load/RecordShapes.h"
-#include "load/Requests.h"
+#include "load/ThreadGroup.h"
+#include "support/Requests.h"
 #include "support/SimulatedHost.h"
-
-// Many threads in the provider at once, through the built library and the real logging, with the
-// facade in front of it and without.
 
 namespace {
 
+using namespace cmpihost;
 using namespace load;
-using cmpihost::Outcome;
 using testing::IsEmpty;
 
 constexpr std::size_t threadCount = 8;
+
+/// Which library answers: its file, and the name of the provider in it.
+struct Server {
+    const char* file;
+    const char* name;
+};
+
+/// A built library with the framework's own logging, under a strict broker with the schema that
+/// serves one computer system, "host1". Several threads may ask at once.
+class LoadedProvider {
+  public:
+    explicit LoadedProvider(const Server& server)
+        : name_(server.name),
+          broker_(&schemaCatalogue()),
+          library_(server.file, broker_, byName(name_)) {
+        broker_.route(ComputerSystemService::className, computers_);
+    }
+
+    Outcome answer(const OperationRequest& request) { return invoke(library_, broker_, request); }
+
+    /// Calls both factories again with the same broker, and both cleanups without terminating.
+    /// Returns what is wrong with what they answered, empty when nothing is.
+    std::string callEntryPointsAgain() {
+        if (!callAgain("_Create_InstanceMI", library_.instanceMI())) return "instance interface";
+        if (!callAgain("_Create_AssociationMI", library_.associationMI()))
+            return "association interface";
+        return {};
+    }
+
+  private:
+    static LoadOptions byName(const std::string& name) {
+        LoadOptions options;
+        options.providerName = name;
+        return options;
+    }
+
+    template <class MI>
+    bool callAgain(const std::string& factory, MI* interface) {
+        using Factory = MI* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
+        CMPIStatus status = {CMPI_RC_OK, nullptr};
+        const auto make = reinterpret_cast<Factory>(library_.symbol((name_ + factory).c_str()));
+        MI* const made = make(broker_.cmpi(), nullptr, &status);
+        return made == interface && made->ft->cleanup(made, nullptr, 0).rc == CMPI_RC_OK;
+    }
+
+    std::string name_;
+    ComputerSystemService computers_{"host1"};
+    Broker broker_;
+    ProviderLibrary library_;
+};
+
+// Whether a request had the same effect twice: status, results, calls of returnDone and what the
+// broker caught.
+bool sameAnswer(const Outcome& left, const Outcome& right) {
+    return left.rc == right.rc && left.message == right.message && left.paths == right.paths &&
+           left.instances == right.instances && left.doneCount == right.doneCount &&
+           left.violations == right.violations;
+}
+
+/// Records without what threads may mix: channel, level, category, function and place, in order.
+using Shapes = std::vector<std::string>;
+
+bool isNumber(const std::string& text) {
+    return !text.empty() && text.find_first_not_of("0123456789") == std::string::npos;
+}
+
+// "TIME PROCESS THREAD CHANNEL LEVEL CATEGORY FUNCTION FILE:LINE TEXT": the fields before the text,
+// which alone may hold blanks. Fewer than eight: no record.
+std::vector<std::string> fieldsOf(const std::string& line) {
+    std::vector<std::string> fields;
+    std::size_t begin = 0;
+    while (fields.size() < 8) {
+        const std::size_t end = line.find(' ', begin);
+        if (end == std::string::npos) break;
+        fields.push_back(line.substr(begin, end - begin));
+        begin = end + 1;
+    }
+    return fields;
+}
+
+bool isTime(const std::string& text) {
+    return text.size() == std::string("2026-01-01T00:00:00.000Z").size() && text.back() == 'Z';
+}
+
+// Whether the line is one whole record, and no second one begins within it.
+bool isWhole(const std::string& line, const std::vector<std::string>& fields) {
+    if (fields.size() < 8 || !isTime(fields[0])) return false;
+    const std::string& place = fields[7];
+    return isNumber(fields[1]) && isNumber(fields[2]) &&
+           (fields[3] == "log" || fields[3] == "trace") && isNumber(fields[4]) &&
+           isNumber(place.substr(place.rfind(':') + 1)) &&
+           line.find("Z " + fields[1] + ' ', fields[0].size()) == std::string::npos;
+}
+
+// The shapes of the records of a log by the thread that wrote them. A line that is not one whole
+// record is filed under the thread -1.
+std::map<long, Shapes> shapesByThread(const std::string& log) {
+    std::map<long, Shapes> result;
+    std::istringstream stream(log);
+    for (std::string line; std::getline(stream, line);) {
+        const std::vector<std::string> fields = fieldsOf(line);
+        if (stream.eof() || !isWhole(line, fields)) {
+            result[-1].push_back(line);
+            continue;
+        }
+        std::string shape;
+        for (std::size_t field = 3; field < fields.size(); ++field) shape += fields[field] + ' ';
+        result[std::stol(fields[2])].push_back(shape);
+    }
+    return result;
+}
 
 /// A file that others append to: each call gives what came since the last one.
 class GrowingFile {
   public:
     explicit GrowingFile(std::string path) : path_(std::move(path)) {}
 
-    std::string news() {
+    std::string readNew() {
         std::ifstream file(path_, std::ios::binary);
         file.seekg(seen_);
         std::ostringstream text;
@@ -94,8 +205,14 @@ void PrintTo(const Way& way, std::ostream* out) {
 }
 
 constexpr Way ways[] = {
-    {"", provider, mixedRequests, 6},
-    {"ThroughTheFacade", facade, facadeRequests, 12},
+    {"",
+     {KORVA_BINARY_DIR "/lib/libkorzbosstatusprofileprovider.so.1", "OperatingSystemProvider"},
+     mixedRequests,
+     6},
+    {"ThroughTheFacade",
+     {KORVA_BINARY_DIR "/lib/libkorvaosstatusfacade.so.1", "OSStatusFacade"},
+     mixedFacadeRequests,
+     12},
 };
 
 /// The computer's name as the host source tells it: with a fixture tree it is the machine's.
@@ -131,25 +248,25 @@ class EightThreads : public testing::TestWithParam<std::tuple<Host, Way>> {
     }
 
     // Asks each request alone; keeps its answer, and the shapes of its records.
-    void askAlone(Loaded& loaded) {
+    void askAlone(LoadedProvider& loaded) {
         std::size_t fruitful = 0;
         for (const MixedRequest& each : requests_) {
             alone_.push_back(loaded.answer(each.request));
             if (!alone_.back().paths.empty() || !alone_.back().instances.empty()) ++fruitful;
             EXPECT_TRUE(each.allows(alone_.back().rc)) << describe(each.request);
-            shapes_.push_back(shapesByThread(log_.news())[::getpid()]);
+            shapes_.push_back(shapesByThread(log_.readNew())[::getpid()]);
         }
         EXPECT_GE(fruitful, requests_.size() / way_.fruitfulOneIn) << "requests that give anything";
     }
 
     // Asks every request on every thread while the entry points are called again.
-    void askAtOnce(Loaded& loaded, std::size_t rounds) {
+    void askAtOnce(LoadedProvider& loaded, std::size_t rounds) {
         const auto task = [&](std::size_t number) {
-            const cmpihost::OperationRequest& request = requests_[number].request;
+            const OperationRequest& request = requests_[number].request;
             return sameAnswer(loaded.answer(request), alone_[number]) ? "" : describe(request);
         };
-        members_ = runCrowd(threadCount, rounds, requests_.size(), task,
-                            [&] { return loaded.callEntryPointsAgain(); });
+        members_ = runThreadGroup(threadCount, rounds, requests_.size(), task,
+                                  [&] { return loaded.callEntryPointsAgain(); });
         for (const Member& member : members_) EXPECT_THAT(member.complaints, IsEmpty());
         EXPECT_GT(members_.back().order.size(), 1U) << "calls of the entry points meanwhile";
     }
@@ -174,19 +291,19 @@ class EightThreads : public testing::TestWithParam<std::tuple<Host, Way>> {
 
 TEST_P(EightThreads, GetTheAnswersOfEachRequestAsWhenItIsAlone) {
     configureLog("log.level = 0\n");
-    Loaded loaded(way_.server);
+    LoadedProvider loaded(way_.server);
     askAlone(loaded);
     askAtOnce(loaded, 2);
-    EXPECT_EQ(log_.news(), "");
+    EXPECT_EQ(log_.readNew(), "");
 }
 
 TEST_P(EightThreads, WriteTheRecordsOfTheirOwnRequestsEachALineOfItsOwn) {
     configureLog("log.level = 4000\ntrace.sink = file:" + logFile_ + "\n");
     keepOneRequestIn(3);
-    Loaded loaded(way_.server);
+    LoadedProvider loaded(way_.server);
     askAlone(loaded);
     askAtOnce(loaded, 1);
-    std::map<long, Shapes> written = shapesByThread(log_.news());
+    std::map<long, Shapes> written = shapesByThread(log_.readNew());
     EXPECT_THAT(written[-1], IsEmpty());
     members_.pop_back();  // factories and cleanups leave no records
     for (const Member& member : members_) {

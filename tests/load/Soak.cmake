@@ -5,11 +5,10 @@ target_link_libraries(load_hosts PRIVATE korva_simulated_host korva::vainstrumen
 korva_shared_library(load_hosts)
 
 add_executable(soak ProcessState.cpp Soak.cpp SoakOptions.cpp Workload.cpp)
-target_compile_definitions(soak PRIVATE KORVA_LOAD_HOSTS="$<TARGET_FILE:load_hosts>")
-target_link_libraries(soak PRIVATE korva_load korva::broker)
+target_compile_definitions(soak PRIVATE
+    KORVA_BINARY_DIR="${CMAKE_BINARY_DIR}" KORVA_LOAD_HOSTS="$<TARGET_FILE:load_hosts>")
+target_link_libraries(soak PRIVATE korva_requests korva::options)
 add_dependencies(soak load_hosts korvaosstatusfacade)
-
-korva_test(soak_tests SOURCES ProcessState.cpp ProcessStateTest.cpp SoakOptions.cpp)
 
 # korva_soak(<name> <option>...): a soak is one test.
 function(korva_soak name)

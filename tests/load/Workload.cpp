@@ -1,3 +1,5 @@
+// A leak shows only in what is done over and over: loading, asking and unloading, on hosts that
+// change.
 #include "load/Workload.h"
 
 #include <dlfcn.h>
@@ -47,9 +49,9 @@ LibraryHandle simulate(unsigned int nodes) {
     return hosts;
 }
 
-LoadOptions byName(const Server& server) {
+LoadOptions facadeOptions() {
     LoadOptions result;
-    result.providerName = server.name;
+    result.providerName = "OSStatusFacade";
     return result;
 }
 
@@ -58,8 +60,8 @@ LoadOptions byName(const Server& server) {
 Workload::Workload()
     : computers_("host1"),
       broker_(nullptr, options()),
-      provider_(provider.file, broker_),
-      facade_(facade.file, broker_, byName(facade)) {
+      provider_(std::string(folder) + "libkorzbosstatusprofileprovider.so.1", broker_),
+      facade_(std::string(folder) + "libkorvaosstatusfacade.so.1", broker_, facadeOptions()) {
     findOutNames();
     broker_.route(ComputerSystemService::className, computers_);
     facade_.unload();
@@ -67,17 +69,16 @@ Workload::Workload()
 }
 
 void Workload::findOutNames() {
-    OperationRequest names;
-    names.operation = Operation::EnumerateInstanceNames;
-    names.path = {"root/cimv2", "KORVA_OperatingSystem"};
-    const Outcome outcome = invoke(provider_, broker_, names);
+    const Outcome outcome =
+        invoke(provider_, broker_,
+               requestFor(Operation::EnumerateInstanceNames, path("KORVA_OperatingSystem")));
     if (outcome.paths.size() != 1) throw std::runtime_error("this machine has no one system");
     const Value* const name = outcome.paths[0].key("CSName");
     const Value* const systemName = outcome.paths[0].key("Name");
     const std::string computer = name == nullptr ? "" : name->text();
     const std::string system = systemName == nullptr ? "" : systemName->text();
     forProvider_ = {mixedRequests(computer, system), mixedRequests("host1", "os1")};
-    forFacade_ = {facadeRequests(computer, system), facadeRequests("host1", "os1")};
+    forFacade_ = {mixedFacadeRequests(computer, system), mixedFacadeRequests("host1", "os1")};
 }
 
 void Workload::runOnce(unsigned long count, unsigned int threads) {

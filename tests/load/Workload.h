@@ -7,14 +7,14 @@
 
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/ProviderLibrary.h"
-#include "load/Requests.h"
+#include "support/Requests.h"
 
 namespace load {
 
 /// What a soak does between two readings: it loads the provider or the facade, asks it, and unloads
 /// it, over and over, on this machine and on simulated hosts of 1, 20 and no nodes in turn. The
-/// requests come from mixedRequests() or facadeRequests(), each as often as any other, in an order
-/// that changes.
+/// requests come from mixedRequests() or mixedFacadeRequests(), each as often as any other, in an
+/// order that changes.
 class Workload {
   public:
     /// Finds out this machine's names by asking the provider. Throws cmpihost::LoadError.

@@ -7,6 +7,8 @@
 #include <utility>
 #include <vector>
 
+#include "support/Properties.h"
+
 namespace VA {
 
 using NodeLexicon::Properties;
@@ -180,29 +182,19 @@ std::shared_ptr<SimulatedHost> SimulatedHost::withOneNode() {
 }
 
 SimulatedHost::Node SimulatedHost::plausibleNode() {
-    using namespace NodeLexicon;
     Node node;
-    node.properties = {
-        {Name, std::string("Simulated Linux")},
-        {OSType, 35u},
-        {Version, std::string("12.5")},
-        {InstallDate, std::string("2023-06-10-09:08:07")},
-        {Distributed, false},
-        {LastBootUpTime, std::string("2024-02-29-23:59:58")},
-        {MaxNumberOfProcesses, 32768u},
-        {MaxProcessMemorySize, 67108864u},
-        {NumberOfProcesses, 211u},
-        {NumberOfUsers, 3u},
-        {NumberOfLicensedUsers, 0u},
-        {TotalVirtualMemorySize, 18874368u},
-        {FreeVirtualMemory, 13631488u},
-        {FreePhysicalMemory, 12058624u},
-        {TotalVisibleMemorySize, 16777216u},
-        {TotalSwapSpaceSize, 2097152u},
-        {SizeStoredInPagingFiles, 2097151u},
-        {FreeSpaceInPagingFiles, 1572864u},
-    };
-    node.readOnly = {{Name, true}};
+    for (const PublishedProperty& property : operatingSystemProperties) {
+        if (property.id == 0) continue;
+        const std::string told = property.told();
+        Value& value = node.properties[static_cast<Properties>(property.id)];
+        if (property.isText())
+            value = told;
+        else if (property.isFlag())
+            value = told == "true";
+        else
+            value = static_cast<unsigned int>(std::stoul(told));
+    }
+    node.readOnly = {{NodeLexicon::Name, true}};
     return node;
 }
 

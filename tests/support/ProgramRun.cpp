@@ -1,4 +1,4 @@
-#include "host/ProgramRun.h"
+#include "support/ProgramRun.h"
 
 #include <fcntl.h>
 #include <spawn.h>

@@ -1,4 +1,5 @@
-#pragma once
+#ifndef TESTS_SUPPORT_PROGRAM_RUN_H
+#define TESTS_SUPPORT_PROGRAM_RUN_H
 
 #include <string>
 #include <vector>
@@ -18,3 +19,5 @@ ProgramRun runProgram(const std::string& file, const std::vector<std::string>& a
 
 /// The lines of what a program wrote, without their ends.
 std::vector<std::string> lines(const std::string& text);
+
+#endif

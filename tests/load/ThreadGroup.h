@@ -1,5 +1,5 @@
-#ifndef TESTS_LOAD_CROWD_H
-#define TESTS_LOAD_CROWD_H
+#ifndef TESTS_LOAD_THREAD_GROUP_H
+#define TESTS_LOAD_THREAD_GROUP_H
 
 #include <cstddef>
 #include <functional>
@@ -8,7 +8,7 @@
 
 namespace load {
 
-/// What one thread of a crowd did.
+/// What one thread of a group did.
 struct Member {
     long thread;                     ///< its number in the records
     std::vector<std::size_t> order;  ///< the tasks in the order in which it did them
@@ -19,9 +19,9 @@ struct Member {
 /// starting together. `task` gets the number of a task and returns a complaint, empty for none.
 /// Until all are through, one more thread calls `meanwhile` again and again; what it complains
 /// about is in the last member, whose order is as long as it called.
-std::vector<Member> runCrowd(std::size_t threads, std::size_t rounds, std::size_t tasks,
-                             const std::function<std::string(std::size_t)>& task,
-                             const std::function<std::string()>& meanwhile);
+std::vector<Member> runThreadGroup(std::size_t threads, std::size_t rounds, std::size_t tasks,
+                                   const std::function<std::string(std::size_t)>& task,
+                                   const std::function<std::string()>& meanwhile);
 
 }  // namespace load
 

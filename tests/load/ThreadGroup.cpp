@@ -1,4 +1,6 @@
-#include "load/Crowd.h"
+// Threads that start together and each work in an order of their own, so that any two requests
+// meet.
+#include "load/ThreadGroup.h"
 
 #include <sys/syscall.h>
 #include <unistd.h>
@@ -30,9 +32,9 @@ void note(Member& member, const std::string& complaint) {
 
 }  // namespace
 
-std::vector<Member> runCrowd(std::size_t threads, std::size_t rounds, std::size_t tasks,
-                             const std::function<std::string(std::size_t)>& task,
-                             const std::function<std::string()>& meanwhile) {
+std::vector<Member> runThreadGroup(std::size_t threads, std::size_t rounds, std::size_t tasks,
+                                   const std::function<std::string(std::size_t)>& task,
+                                   const std::function<std::string()>& meanwhile) {
     std::vector<Member> members(threads + 1);
     std::atomic<std::size_t> waiting{threads};
     std::atomic<std::size_t> running{threads};
