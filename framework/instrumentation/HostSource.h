@@ -1,5 +1,5 @@
-#ifndef VA_HOST_SOURCE_H
-#define VA_HOST_SOURCE_H
+#ifndef FRAMEWORK_INSTRUMENTATION_HOST_SOURCE_H
+#define FRAMEWORK_INSTRUMENTATION_HOST_SOURCE_H
 
 #include <memory>
 #include <string>

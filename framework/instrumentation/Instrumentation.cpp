@@ -1,8 +1,51 @@
+// The contract's class, and which host it reads: the one that was set last. A host source outlives
+// those who read it, and its successor: whoever constructed an Instrumentation goes on with the
+// host that was there.
 #include "Instrumentation.h"
+
+#include <mutex>
+#include <utility>
 
 #include "HostSource.h"
 
 namespace VA {
+
+namespace {
+
+// Null until the first use: loading the library does nothing.
+struct CurrentSource {
+    std::mutex mutex;
+    std::shared_ptr<HostSource> source;
+
+    // Emptied under the lock: an object manager may exit while its worker threads still run.
+    ~CurrentSource() {
+        const std::lock_guard<std::mutex> lock(mutex);
+        source.reset();
+    }
+};
+
+CurrentSource current;
+
+}  // namespace
+
+NodeCursor::NodeCursor() = default;
+NodeCursor::~NodeCursor() = default;
+HostSource::HostSource() = default;
+HostSource::~HostSource() = default;
+
+void setHostSource(std::shared_ptr<HostSource> source) {
+    {
+        const std::lock_guard<std::mutex> lock(current.mutex);
+        current.source.swap(source);
+    }
+    // The previous source dies here, outside the lock: its destructor may be anybody's code.
+}
+
+std::shared_ptr<HostSource> currentHostSource() {
+    const std::lock_guard<std::mutex> lock(current.mutex);
+    if (!current.source) current.source = makeLinuxHost();
+    return current.source;
+}
 
 class Instrumentation::State {
   public:

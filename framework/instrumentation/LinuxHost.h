@@ -1,35 +1,40 @@
-#ifndef VA_LINUX_HOST_H
-#define VA_LINUX_HOST_H
+#ifndef FRAMEWORK_INSTRUMENTATION_LINUX_HOST_H
+#define FRAMEWORK_INSTRUMENTATION_LINUX_HOST_H
 
 #include <memory>
-#include <string>
 
 #include "HostSource.h"
+#include "Linux/Files.h"
+#include "Linux/Kernel.h"
+#include "Linux/Systemd.h"
 
 namespace VA {
 
 namespace Linux {
-struct HostParts;
-}
 
-/// The Linux host that this code runs on: one operating system node. A walk takes one snapshot of
-/// it, reads each source at most once, and only when a value that it has to tell is asked for.
-/// Starts no process, asks no network, throws nothing but std::bad_alloc.
+/// What a Linux host is read through. None is null.
+struct HostParts {
+    std::shared_ptr<const HostFiles> files;
+    std::shared_ptr<const Kernel> kernel;
+    std::shared_ptr<SystemManager> systemManager;
+};
+
+}  // namespace Linux
+
+/// A Linux host: one operating system node. A walk takes one snapshot of it, reads each source at
+/// most once, and only when a value that it has to tell is asked for. Starts no process, asks no
+/// network, throws nothing but std::bad_alloc.
 class LinuxHost final : public HostSource {
   public:
-    /// `root` is the folder under which all files are looked for. What the kernel tells without a
-    /// file (its names, its clocks, the limits of the process) is that of the running kernel.
-    explicit LinuxHost(std::string root = "/");
-
-    /// A host read through other means.
     explicit LinuxHost(Linux::HostParts parts);
-
     ~LinuxHost() override;
 
+    /// The cursor must not outlive this object.
     std::unique_ptr<NodeCursor> openCursor() override;
 
   private:
-    const std::unique_ptr<const Linux::HostParts> parts_;
+    class State;
+    const std::unique_ptr<State> state_;
 };
 
 }  // namespace VA

@@ -8,7 +8,7 @@
 
 #include "Linux/OperatingSystem.h"
 #include "base/CimDateTime.h"
-#include "framework/instrumentation/Linux/CivilDate.h"
+#include "framework/instrumentation/Linux/Dates.h"
 #include "fuzz/Invariant.h"
 #include "host/broker/DateTimeText.h"
 #include "support/SimulatedHost.h"

@@ -6,8 +6,7 @@
 #include <ctime>
 #include <map>
 
-#include "framework/instrumentation/Linux/PlainText.h"
-#include "framework/instrumentation/Linux/Snapshot.h"
+#include "framework/instrumentation/Linux/Parsing.h"
 #include "framework/instrumentation/LinuxHost.h"
 #include "fuzz/Invariant.h"
 
@@ -58,10 +57,10 @@ class AnyFiles final : public Linux::HostFiles {
                 state.changed.seconds = instant(input);
             }
         if (input.ConsumeBool())
-            states_["run/systemd/system"].kind = Linux::FileState::Kind::Folder;
+            states_["run/systemd/system"].kind = Linux::FileState::Kind::Directory;
         for (const auto& [path, content] : contents_) states_[path] = content.state;
         for (const auto& [path, names] : folders_)
-            states_[path].kind = Linux::FileState::Kind::Folder;
+            states_[path].kind = Linux::FileState::Kind::Directory;
     }
 
     std::optional<Linux::FileContent> read(const std::string& path) const override {

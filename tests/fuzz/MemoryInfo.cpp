@@ -1,5 +1,5 @@
 // proc/meminfo.
-#include "framework/instrumentation/Linux/MemoryInfo.h"
+#include "framework/instrumentation/Linux/Kernel.h"
 
 #include "fuzz/Invariant.h"
 

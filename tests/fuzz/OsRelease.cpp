@@ -1,14 +1,13 @@
 // os-release, and any file of shell-like assignments.
-#include "framework/instrumentation/Linux/Assignments.h"
-#include "framework/instrumentation/Linux/PlainText.h"
+#include "framework/instrumentation/Linux/Parsing.h"
 #include "fuzz/Invariant.h"
 
-using VA::Linux::assignedValue;
+using VA::Linux::envFileValue;
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     const std::string_view text = fuzz::textOf(data, size);
     for (const char* name : {"NAME", "VERSION_ID", "BUILD_ID"}) {
-        const auto value = assignedValue(text, name);
+        const auto value = envFileValue(text, name);
         if (!value) continue;
         fuzz::expect(value->size() < text.size(), "a value is shorter than its file");
         fuzz::expect(value->find('\n') == std::string::npos, "a value lies on one line");
@@ -18,8 +17,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         // In single quotes nothing is escaped: what was read is found again.
         if (value->find('\'') != std::string::npos) continue;
         const std::string quoted = std::string(name) + "='" + *value + "'\n";
-        fuzz::expect(assignedValue(quoted, name) == value, "a quoted value is read as it is");
-        fuzz::expect(assignedValue(std::string(text) + '\n' + quoted, name) == value,
+        fuzz::expect(envFileValue(quoted, name) == value, "a quoted value is read as it is");
+        fuzz::expect(envFileValue(std::string(text) + '\n' + quoted, name) == value,
                      "the last assignment wins");
     }
     return 0;

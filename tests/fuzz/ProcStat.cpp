@@ -1,6 +1,6 @@
 // proc/stat, and the files of proc that hold one number.
-#include "framework/instrumentation/Linux/BootTime.h"
-#include "framework/instrumentation/Linux/Numbers.h"
+#include "framework/instrumentation/Linux/Dates.h"
+#include "framework/instrumentation/Linux/Parsing.h"
 #include "fuzz/Invariant.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {

@@ -1,10 +1,10 @@
-#include "framework/instrumentation/Linux/Assignments.h"
+#include "framework/instrumentation/Linux/Parsing.h"
 
 #include <gtest/gtest.h>
 
 namespace {
 
-using VA::Linux::assignedValue;
+using VA::Linux::envFileValue;
 
 struct Case {
     const char* description;
@@ -19,7 +19,7 @@ void PrintTo(const Case& c, std::ostream* out) {
 class AssignedValue : public testing::TestWithParam<Case> {};
 
 TEST_P(AssignedValue, IsUnquotedAsAShellWould) {
-    EXPECT_EQ(assignedValue(GetParam().text, "NAME"), GetParam().value);
+    EXPECT_EQ(envFileValue(GetParam().text, "NAME"), GetParam().value);
 }
 
 const Case cases[] = {
@@ -69,13 +69,13 @@ INSTANTIATE_TEST_SUITE_P(Forms, AssignedValue, testing::ValuesIn(cases));
 
 TEST(Assignments, ZeroBytesElsewhereDoNotHideAValue) {
     const std::string text("A=\0\0\0\nNAME=B\n\0\0", 15);
-    EXPECT_EQ(assignedValue(text, "NAME"), "B");
+    EXPECT_EQ(envFileValue(text, "NAME"), "B");
 }
 
 TEST(Assignments, LineOfAMegabyteIsOneValue) {
     const std::string value(1024 * 1024, 'x');
-    EXPECT_EQ(assignedValue("NAME=\"" + value + "\"\nVERSION_ID=1\n", "NAME"), value);
-    EXPECT_EQ(assignedValue("NAME=\"" + value + "\"\nVERSION_ID=1\n", "VERSION_ID"), "1");
+    EXPECT_EQ(envFileValue("NAME=\"" + value + "\"\nVERSION_ID=1\n", "NAME"), value);
+    EXPECT_EQ(envFileValue("NAME=\"" + value + "\"\nVERSION_ID=1\n", "VERSION_ID"), "1");
 }
 
 }  // namespace

@@ -1,4 +1,4 @@
-#include "framework/instrumentation/Linux/HostFiles.h"
+#include "framework/instrumentation/Linux/Files.h"
 
 #include <fcntl.h>
 #include <gmock/gmock.h>
@@ -13,7 +13,6 @@
 
 #include <functional>
 
-#include "framework/instrumentation/Linux/SourceFiles.h"
 #include "tests/instrumentation/FixtureTree.h"
 
 namespace {
@@ -100,7 +99,7 @@ TEST_F(HostFilesTest, FifoInPlaceOfASourceIsNotEvenOpened) {
     };
     ASSERT_GE(::inotify_add_watch(watch, tree.path("fifo").c_str(), IN_OPEN), 0);
     ASSERT_GE(::inotify_add_watch(watch, tree.path("file").c_str(), IN_OPEN), 0);
-    VA::Linux::SourceFiles sources(files, 0);
+    VA::Linux::TrackedFiles sources(files, 0);
     EXPECT_FALSE(sources.read("fifo"));
     EXPECT_FALSE(opened());
     EXPECT_TRUE(sources.read("file"));
@@ -228,7 +227,7 @@ TEST_F(HostFilesTest, StateIsThatOfTheInode) {
 
 TEST_F(HostFilesTest, StateTellsFilesFromFoldersAndFromOthers) {
     tree.makeFifo("fifo");
-    EXPECT_EQ(files.state("")->kind, FileState::Kind::Folder);
+    EXPECT_EQ(files.state("")->kind, FileState::Kind::Directory);
     EXPECT_EQ(files.state("fifo")->kind, FileState::Kind::Other);
     EXPECT_EQ(files.state("missing"), std::nullopt);
 }
@@ -239,7 +238,7 @@ TEST(FileStates, AreEqualWhereEverythingIsThatAChangeWouldChange) {
     state.birth = 1;
     EXPECT_TRUE(state == FileState());
     const std::function<void(FileState&)> changes[] = {
-        [](FileState& each) { each.kind = FileState::Kind::Folder; },
+        [](FileState& each) { each.kind = FileState::Kind::Directory; },
         [](FileState& each) { each.device = 1; },
         [](FileState& each) { each.inode = 1; },
         [](FileState& each) { each.size = 1; },

@@ -10,7 +10,6 @@
 #include <string>
 
 #include "FixtureTree.h"
-#include "framework/instrumentation/Linux/Snapshot.h"
 #include "framework/instrumentation/LinuxHost.h"
 
 /// Files of a fixture tree that count each look ("look at /etc/os-release"), and each file or

@@ -1,4 +1,4 @@
-#include "framework/instrumentation/Linux/InstallDate.h"
+#include "framework/instrumentation/Linux/Dates.h"
 
 #include <gtest/gtest.h>
 

@@ -11,7 +11,7 @@
 #include <fstream>
 #include <string>
 
-#include "framework/instrumentation/Linux/BootTime.h"
+#include "framework/instrumentation/Linux/Dates.h"
 #include "tests/instrumentation/HostParts.h"
 
 namespace {

@@ -33,7 +33,7 @@ TEST(LinuxHostThreads, EachWithItsCursorReadTheSameHost) {
     FixtureHost host;
     host.tree().writeCompleteHost();
     host.tree().makeFolder("run/systemd/system");
-    VA::LinuxHost machine;
+    const auto machine = VA::makeLinuxHost();
     std::vector<std::thread> threads;
     for (int i = 0; i < 8; ++i) {
         threads.emplace_back([&] {
@@ -47,7 +47,7 @@ TEST(LinuxHostThreads, EachWithItsCursorReadTheSameHost) {
                 EXPECT_TRUE(cursor->readProperty(TotalVisibleMemorySize, memory));
                 EXPECT_EQ(memory, 16777216u);
                 EXPECT_EQ(cursor->nodeStatus(), 1u);
-                auto real = machine.openCursor();
+                auto real = machine->openCursor();
                 EXPECT_TRUE(real->select(OperatingSystemNode));
                 readEverything(*real);
             }
@@ -92,9 +92,9 @@ TEST(LinuxHostThreads, ShareWhatIsKeptWhileItChanges) {
 
 // Whatever the threads had in their hands when their process was forked, the child has to answer.
 TEST(LinuxHostThreads, LeaveAForkedChildAbleToRead) {
-    VA::LinuxHost machine;
+    const auto machine = VA::makeLinuxHost();
     const auto nameOf = [&] {
-        const auto cursor = machine.openCursor();
+        const auto cursor = machine->openCursor();
         cursor->select(OperatingSystemNode);
         std::string name;
         return cursor->readProperty(Name, name) ? name : "none";
@@ -131,11 +131,12 @@ TEST(LinuxHostResources, ReadingAThousandTimesLeavesNoDescriptorOpen) {
     host.tree().writeCompleteHost();
     host.tree().makeFifo("run/systemd/sessions/1.ref");
     host.tree().makeFolder("run/systemd/system");
-    VA::LinuxHost fixture(host.tree().root());  // its bus is a socket that does not exist
-    VA::LinuxHost machine;
+    const auto fixture =
+        VA::makeLinuxHost(host.tree().root());  // its bus is a socket that does not exist
+    const auto machine = VA::makeLinuxHost();
     const auto before = openDescriptors();
     for (int i = 0; i < 1000; ++i) {
-        for (VA::LinuxHost* each : {&fixture, &machine}) {
+        for (const auto& each : {fixture, machine}) {
             auto cursor = each->openCursor();
             cursor->select(OperatingSystemNode);
             readEverything(*cursor);

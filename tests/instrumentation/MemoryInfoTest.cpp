@@ -1,4 +1,4 @@
-#include "framework/instrumentation/Linux/MemoryInfo.h"
+#include "framework/instrumentation/Linux/Kernel.h"
 
 #include <gtest/gtest.h>
 

@@ -8,8 +8,7 @@
 #include <chrono>
 #include <filesystem>
 
-#include "framework/instrumentation/Linux/Snapshot.h"
-#include "framework/instrumentation/Linux/SystemdBus.h"
+#include "framework/instrumentation/Linux/Systemd.h"
 #include "framework/instrumentation/LinuxHost.h"
 #include "tests/instrumentation/FixtureTree.h"
 
@@ -77,11 +76,11 @@ TEST_F(MiniBusTest, EachStateOfTheManagerHasItsCodeAndAnyOtherWordHasNone) {
 
 TEST_F(MiniBusTest, BusOfALinuxHostIsTheOneUnderItsRoot) {
     MiniBus bus(socket(), Behaviour::Answer, "stopping");
-    VA::LinuxHost host(tree.root());
+    const auto host = VA::makeLinuxHost(tree.root());
     unsigned int status = 0;
     // A machine under load may miss the short deadline now and then.
     for (int attempt = 0; attempt < 20 && status == 0; ++attempt) {
-        auto cursor = host.openCursor();
+        auto cursor = host->openCursor();
         cursor->select(VA::NodeLexicon::OperatingSystemNode);
         status = cursor->nodeStatus();
     }

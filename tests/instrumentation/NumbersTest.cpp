@@ -1,8 +1,8 @@
-#include "framework/instrumentation/Linux/Numbers.h"
+#include "framework/instrumentation/Linux/Parsing.h"
 
 #include <gtest/gtest.h>
 
-#include "framework/instrumentation/Linux/BootTime.h"
+#include "framework/instrumentation/Linux/Dates.h"
 
 namespace {
 
@@ -37,14 +37,14 @@ TEST(Numbers, NumberFileThatWasCutShortGivesNoNumber) {
 }
 
 TEST(Numbers, LargeValuesSaturateAndNeverWrap) {
-    EXPECT_EQ(saturated(0), 0u);
-    EXPECT_EQ(saturated(4294967294u), 4294967294u);
-    EXPECT_EQ(saturated(4294967295u), 4294967295u);
-    EXPECT_EQ(saturated(4294967296u), 4294967295u);
-    EXPECT_EQ(saturated(18446744073709551615u), 4294967295u);
-    EXPECT_EQ(saturatedSum(4294967290u, 5u), 4294967295u);
-    EXPECT_EQ(saturatedSum(4294967290u, 6u), 4294967295u);
-    EXPECT_EQ(saturatedSum(4294967295u, 4294967295u), 4294967295u);
+    EXPECT_EQ(clampToUint32(0), 0u);
+    EXPECT_EQ(clampToUint32(4294967294u), 4294967294u);
+    EXPECT_EQ(clampToUint32(4294967295u), 4294967295u);
+    EXPECT_EQ(clampToUint32(4294967296u), 4294967295u);
+    EXPECT_EQ(clampToUint32(18446744073709551615u), 4294967295u);
+    EXPECT_EQ(clampedSum(4294967290u, 5u), 4294967295u);
+    EXPECT_EQ(clampedSum(4294967290u, 6u), 4294967295u);
+    EXPECT_EQ(clampedSum(4294967295u, 4294967295u), 4294967295u);
 }
 
 TEST(BootTime, IsTheNumberOfTheBtimeLine) {

@@ -1,4 +1,4 @@
-#include "framework/instrumentation/Linux/PlainText.h"
+#include "framework/instrumentation/Linux/Parsing.h"
 
 #include <gtest/gtest.h>
 

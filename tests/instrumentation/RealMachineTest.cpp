@@ -16,7 +16,7 @@
 #include <sstream>
 #include <variant>
 
-#include "framework/instrumentation/Linux/SystemdBus.h"
+#include "framework/instrumentation/Linux/Systemd.h"
 #include "framework/instrumentation/LinuxHost.h"
 
 namespace {
@@ -262,9 +262,9 @@ Reading readingOf(VA::NodeCursor& cursor, Properties id) {
 
 class RealMachine : public testing::Test {
   protected:
-    RealMachine() : cursor(host.openCursor()) { EXPECT_TRUE(cursor->select(OperatingSystemNode)); }
+    RealMachine() : cursor(host->openCursor()) { EXPECT_TRUE(cursor->select(OperatingSystemNode)); }
 
-    VA::LinuxHost host;
+    const std::shared_ptr<VA::HostSource> host = VA::makeLinuxHost();
     std::unique_ptr<VA::NodeCursor> cursor;
 };
 

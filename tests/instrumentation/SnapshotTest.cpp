@@ -202,9 +202,9 @@ TEST_F(SnapshotTest, OnlyTheNameIsKnownToBeReadOnly) {
 
 TEST(LinuxNodes, AreOfTheOperatingSystemTypeAlone) {
     FixtureHost host;
-    VA::LinuxHost linuxHost(host.tree().root());
+    const auto linuxHost = VA::makeLinuxHost(host.tree().root());
     for (unsigned int type = 0; type < 40; ++type) {
-        auto cursor = linuxHost.openCursor();
+        auto cursor = linuxHost->openCursor();
         EXPECT_FALSE(cursor->valid());
         EXPECT_EQ(cursor->select(NodeType(type)), type == 17) << type;
         EXPECT_EQ(cursor->valid(), type == 17) << type;

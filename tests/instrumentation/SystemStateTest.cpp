@@ -1,4 +1,4 @@
-#include "framework/instrumentation/Linux/SystemState.h"
+#include "framework/instrumentation/Linux/Systemd.h"
 
 #include <gtest/gtest.h>
 

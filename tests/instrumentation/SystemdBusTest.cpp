@@ -1,4 +1,4 @@
-#include "framework/instrumentation/Linux/SystemdBus.h"
+#include "framework/instrumentation/Linux/Systemd.h"
 
 #include <dlfcn.h>
 #include <gtest/gtest.h>

@@ -87,12 +87,12 @@ TEST_F(TimeZones, TextMinusTheZonesMinutesIsTheTrueInstant) {
 }
 
 TEST_F(TimeZones, BootTimeOfThisMachineIsTheSameInstantInEachZone) {
-    VA::LinuxHost machine;
+    const auto machine = VA::makeLinuxHost();
     std::optional<std::int64_t> first;
     for (const Zone& zone : zones) {
         const ScopedZone scoped(zone.tz);
         ::tzset();
-        auto cursor = machine.openCursor();
+        auto cursor = machine->openCursor();
         cursor->select(OperatingSystemNode);
         std::string text;
         ASSERT_TRUE(cursor->readProperty(LastBootUpTime, text));

@@ -1,4 +1,4 @@
-#include "framework/instrumentation/Linux/Users.h"
+#include "framework/instrumentation/Linux/Sessions.h"
 
 #include <gtest/gtest.h>
 
@@ -6,7 +6,7 @@
 
 namespace {
 
-using VA::Linux::countUtmpUsers;
+using VA::Linux::countUtmpSessions;
 using VA::Linux::isUserSession;
 
 bool everyPidLives(std::int32_t) {
@@ -38,39 +38,39 @@ TEST(UtmpUsers, AreTheUserProcessRecords) {
         utmpRecord(utmpBootTime, 0, "reboot") + utmpRecord(utmpLoginProcess, 700, "LOGIN") +
         utmpRecord(utmpUserProcess, 1200, "ada") + utmpRecord(utmpDeadProcess, 1300, "bob") +
         utmpRecord(utmpUserProcess, 1400, "ada") + utmpRecord(0, 0, "");
-    EXPECT_EQ(countUtmpUsers(utmp, everyPidLives), 2u);
+    EXPECT_EQ(countUtmpSessions(utmp, everyPidLives), 2u);
 }
 
 TEST(UtmpUsers, ThoseWhoseProcessHasGoneDoNotCount) {
     const std::string utmp =
         utmpRecord(utmpUserProcess, 1200, "ada") + utmpRecord(utmpUserProcess, 1201, "bob");
-    EXPECT_EQ(countUtmpUsers(utmp, [](std::int32_t pid) { return pid == 1201; }), 1u);
+    EXPECT_EQ(countUtmpSessions(utmp, [](std::int32_t pid) { return pid == 1201; }), 1u);
 }
 
 TEST(UtmpUsers, AreNotKnownWhereRecordsAreThereAndNoneOfTheirProcesses) {
     const std::string ada = utmpRecord(utmpUserProcess, 1200, "ada");
-    EXPECT_EQ(countUtmpUsers(ada, noPidLives), std::nullopt);
-    EXPECT_EQ(countUtmpUsers(ada + ada, noPidLives), std::nullopt);
-    EXPECT_EQ(countUtmpUsers(utmpRecord(utmpDeadProcess, 1200, "ada"), noPidLives), 0u);
+    EXPECT_EQ(countUtmpSessions(ada, noPidLives), std::nullopt);
+    EXPECT_EQ(countUtmpSessions(ada + ada, noPidLives), std::nullopt);
+    EXPECT_EQ(countUtmpSessions(utmpRecord(utmpDeadProcess, 1200, "ada"), noPidLives), 0u);
 }
 
 TEST(UtmpUsers, RecordWithoutAProcessDoesNotCount) {
     for (const std::int32_t none : {0, -1}) {
-        EXPECT_EQ(countUtmpUsers(utmpRecord(utmpUserProcess, none, "ada"), everyPidLives), 0u);
-        EXPECT_EQ(countUtmpUsers(utmpRecord(utmpUserProcess, none, "ada"), noPidLives), 0u);
+        EXPECT_EQ(countUtmpSessions(utmpRecord(utmpUserProcess, none, "ada"), everyPidLives), 0u);
+        EXPECT_EQ(countUtmpSessions(utmpRecord(utmpUserProcess, none, "ada"), noPidLives), 0u);
     }
-    EXPECT_EQ(countUtmpUsers(utmpRecord(utmpUserProcess, 1, "ada"), everyPidLives), 1u);
+    EXPECT_EQ(countUtmpSessions(utmpRecord(utmpUserProcess, 1, "ada"), everyPidLives), 1u);
 }
 
 TEST(UtmpUsers, EmptyFileTellsOfNobody) {
-    EXPECT_EQ(countUtmpUsers("", everyPidLives), 0u);
+    EXPECT_EQ(countUtmpSessions("", everyPidLives), 0u);
 }
 
 TEST(UtmpUsers, FileThatIsNotAWholeNumberOfRecordsTellsNothing) {
     const std::string utmp = utmpRecord(utmpUserProcess, 1200, "ada");
-    EXPECT_EQ(countUtmpUsers(utmp + "x", everyPidLives), std::nullopt);
-    EXPECT_EQ(countUtmpUsers(utmp.substr(1), everyPidLives), std::nullopt);
-    EXPECT_EQ(countUtmpUsers("not a utmp file", everyPidLives), std::nullopt);
+    EXPECT_EQ(countUtmpSessions(utmp + "x", everyPidLives), std::nullopt);
+    EXPECT_EQ(countUtmpSessions(utmp.substr(1), everyPidLives), std::nullopt);
+    EXPECT_EQ(countUtmpSessions("not a utmp file", everyPidLives), std::nullopt);
 }
 
 }  // namespace

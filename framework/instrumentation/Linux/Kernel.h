@@ -1,12 +1,16 @@
-#ifndef VA_LINUX_KERNEL_H
-#define VA_LINUX_KERNEL_H
+#ifndef FRAMEWORK_INSTRUMENTATION_LINUX_KERNEL_H
+#define FRAMEWORK_INSTRUMENTATION_LINUX_KERNEL_H
 
 #include <cstdint>
 #include <limits>
 #include <optional>
 #include <string>
+#include <string_view>
 
+/// What the kernel tells, by its calls and in proc.
 namespace VA::Linux {
+
+class HostFiles;
 
 /// What uname tells.
 struct KernelNames {
@@ -39,6 +43,33 @@ class Kernel {
     /// Soft limit of a process's address space in bytes, or `unlimited`.
     virtual std::optional<std::uint64_t> addressSpaceLimit() const;
 };
+
+/// What proc/meminfo says, in kilobytes of 1024 bytes, at most 4294967295 each.
+struct MemoryInfo {
+    std::optional<std::uint32_t> totalKiB;
+    std::optional<std::uint32_t> availableKiB;  ///< without swap
+    std::optional<std::uint32_t> swapTotalKiB;  ///< 0 on a host without swap
+    std::optional<std::uint32_t> swapFreeKiB;   ///< 0 on a host without swap
+};
+
+/// Nothing for a text that does not tell the total memory: that is no meminfo.
+///
+/// Available memory is MemAvailable or, where a kernel has none, the sum of MemFree, Buffers and
+/// Cached. A host without a SwapTotal line has no swap; a line that is malformed leaves its value
+/// out. Of two lines with one name the first counts.
+std::optional<MemoryInfo> parseMemoryInfo(std::string_view meminfo);
+
+/// The value of a file that holds one line with a positive number, such as the limits of
+/// proc/sys/kernel.
+std::optional<std::uint64_t> parseNumberFile(std::string_view text);
+
+/// The values of a host's proc, at most 4294967295; nothing where it does not tell.
+std::optional<MemoryInfo> readMemoryInfo(const HostFiles& files);
+std::optional<std::uint32_t> readMaxProcesses(const HostFiles& files);
+std::optional<std::uint32_t> countProcesses(const HostFiles& files);
+
+/// The limit of a process's address space in kilobytes, at most 4294967295; 0 where there is none.
+std::optional<std::uint32_t> maxProcessMemoryKiB(const Kernel& kernel);
 
 }  // namespace VA::Linux
 

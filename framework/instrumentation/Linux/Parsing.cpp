@@ -1,12 +1,19 @@
-#include "Assignments.h"
+// A host's files may hold anything: a text that is not wholly what it should be gives no value,
+// rather than a part of one that looks like another.
+#include "Parsing.h"
 
+#include <algorithm>
+#include <charconv>
 #include <utility>
 
-#include "Lines.h"
+#include "base/Ascii.h"
+#include "base/Utf8.h"
 
 namespace VA::Linux {
 
 namespace {
+
+constexpr std::size_t maxCharacters = 256;
 
 bool isBlank(char c) {
     return c == ' ' || c == '\t' || c == '\r';
@@ -64,6 +71,7 @@ std::optional<std::string> bare(std::string_view text) {
     return value;
 }
 
+// The value behind the equals sign.
 std::optional<std::string> unquoted(std::string_view text) {
     if (text.empty() || isBlank(text.front())) {
         return isEmptyOrComment(text) ? std::optional<std::string>("") : std::nullopt;
@@ -75,7 +83,30 @@ std::optional<std::string> unquoted(std::string_view text) {
 
 }  // namespace
 
-std::optional<std::string> assignedValue(std::string_view text, std::string_view name) {
+bool isAllDigits(std::string_view text) {
+    return !text.empty() && std::all_of(text.begin(), text.end(), base::isDigit);
+}
+
+std::optional<std::uint64_t> parseDecimal(std::string_view text) {
+    if (!isAllDigits(text)) return std::nullopt;
+    std::uint64_t value = 0;
+    const auto result = std::from_chars(text.data(), text.data() + text.size(), value);
+    if (result.ec != std::errc()) return std::nullopt;
+    return value;
+}
+
+bool isPlainText(std::string_view text) {
+    bool blank = true;
+    for (std::size_t count = 0; !text.empty(); ++count) {
+        const base::Utf8Char character = base::takeUtf8(text);
+        const bool isControl = base::classOf(character.codePoint) == base::CharClass::control;
+        if (!character.valid || isControl || count == maxCharacters) return false;
+        blank = blank && character.codePoint == ' ';
+    }
+    return !blank;
+}
+
+std::optional<std::string> envFileValue(std::string_view text, std::string_view name) {
     std::optional<std::string> value;
     forEachLine(text, [&](std::string_view line, bool) {
         skipBlanks(line);

@@ -1,15 +1,33 @@
-#ifndef VA_LINUX_SYSTEMD_BUS_H
-#define VA_LINUX_SYSTEMD_BUS_H
+#ifndef FRAMEWORK_INSTRUMENTATION_LINUX_SYSTEMD_H
+#define FRAMEWORK_INSTRUMENTATION_LINUX_SYSTEMD_H
 
 #include <chrono>
 #include <functional>
 #include <mutex>
 #include <optional>
 #include <string>
+#include <string_view>
 
-#include "SystemState.h"
+#include "Files.h"
 
 namespace VA::Linux {
+
+/// The manager of the host's services. Any number of threads may ask at the same time.
+class SystemManager {
+  public:
+    virtual ~SystemManager() = default;
+
+    /// The state that the manager says the system is in, such as "running"; nothing where it does
+    /// not answer. Never blocks for long.
+    virtual std::optional<std::string> systemState() = 0;
+};
+
+/// The node status code for a state of systemd's manager; 0 for one that has none.
+unsigned int nodeStatusOf(std::string_view systemState);
+
+/// The node status code of a host, that of its manager's state; 0 where the manager does not
+/// answer, 1 (running) where no systemd runs.
+unsigned int readNodeStatus(const HostFiles& files, SystemManager& manager);
 
 struct SdBusFunctions;
 

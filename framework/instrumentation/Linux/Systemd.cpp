@@ -1,4 +1,6 @@
-#include "SystemdBus.h"
+// The host's state is one property on the system bus. Asked through libsystemd, opened when first
+// needed: a host without it, or a container, works without it, and nothing is linked against it.
+#include "Systemd.h"
 
 #include <dlfcn.h>
 
@@ -171,6 +173,29 @@ std::optional<std::string> SystemdBus::systemState() {
     }
     if (answer.state[0] == '\0') return std::nullopt;
     return answer.state;
+}
+
+unsigned int nodeStatusOf(std::string_view systemState) {
+    struct Row {
+        std::string_view state;
+        unsigned int status;
+    };
+    constexpr Row rows[] = {
+        {"running", 1},     {"initializing", 2}, {"starting", 2}, {"degraded", 21},
+        {"maintenance", 8}, {"stopping", 16},    {"offline", 12},
+    };
+    for (const Row& row : rows) {
+        if (row.state == systemState) return row.status;
+    }
+    return 0;
+}
+
+unsigned int readNodeStatus(const HostFiles& files, SystemManager& manager) {
+    // Where no systemd runs nobody knows better than this code, which is running.
+    const auto directory = files.state("run/systemd/system");
+    if (!directory || directory->kind != FileState::Kind::Directory) return nodeStatusOf("running");
+    const auto state = manager.systemState();
+    return state ? nodeStatusOf(*state) : 0;
 }
 
 }  // namespace VA::Linux

@@ -1,13 +1,15 @@
-#ifndef VA_LINUX_USERS_H
-#define VA_LINUX_USERS_H
+#ifndef FRAMEWORK_INSTRUMENTATION_LINUX_SESSIONS_H
+#define FRAMEWORK_INSTRUMENTATION_LINUX_SESSIONS_H
 
 #include <cstdint>
 #include <functional>
 #include <optional>
 #include <string_view>
 
-#include "SourceFiles.h"
+#include "Files.h"
+#include "Kernel.h"
 
+/// Who is logged in. Counts are at most 4294967295.
 namespace VA::Linux {
 
 /// True for a session file of systemd that describes a session of a user (CLASS=user, user-early,
@@ -15,19 +17,25 @@ namespace VA::Linux {
 /// its user has left.
 bool isUserSession(std::string_view sessionFile);
 
-struct UserSessions {
+/// The sessions that systemd lists.
+struct SessionCount {
     bool listed = false;                  ///< false where run/systemd/sessions cannot be read
     std::optional<std::uint32_t> number;  ///< nothing, too, where a file in it cannot be read
 };
 
 /// Counts such files in run/systemd/sessions. One that has gone since it was listed does not count.
-UserSessions countUserSessions(SourceFiles& files);
+SessionCount countSystemdSessions(TrackedFiles& files);
 
 /// The number of user sessions in a utmp file: its USER_PROCESS records whose process passes
 /// `isAlive`. Nothing for a file that is not a whole number of records, and for one with such
 /// records of which none is alive: it may tell of the processes of another pid namespace.
-std::optional<std::uint32_t> countUtmpUsers(std::string_view utmp,
-                                            const std::function<bool(std::int32_t pid)>& isAlive);
+std::optional<std::uint32_t> countUtmpSessions(
+    std::string_view utmp, const std::function<bool(std::int32_t pid)>& isAlive);
+
+/// The user sessions of a host: those that systemd lists or, where it lists none at all, those of
+/// run/utmp or var/run/utmp. Nothing where neither is known.
+std::optional<std::uint32_t> countSessions(const HostFiles& files, const Kernel& kernel,
+                                           FileCache<SessionCount>& cache);
 
 }  // namespace VA::Linux
 
