@@ -74,6 +74,13 @@ class Snapshot {
   public:
     Snapshot(const HostParts& parts, HostCache& cache) : parts_(parts), cache_(cache) {}
 
+    // What uname tells, where it is plain text.
+    Text kernelName(std::string KernelNames::*part) {
+        const auto& names = kernelNames_.value([this] { return parts_.kernel->names(); });
+        if (!names || !isPlainText(*names.*part)) return std::nullopt;
+        return *names.*part;
+    }
+
     Text computerName() { return kernelName(&KernelNames::node); }
 
     Text name() {
@@ -131,12 +138,6 @@ class Snapshot {
     const OsRelease& osRelease() {
         return *osRelease_.value(
             [this] { return cache_.osRelease.get(*parts_.files, *parts_.kernel, readOsRelease); });
-    }
-
-    Text kernelName(std::string KernelNames::*part) {
-        const auto& names = kernelNames_.value([this] { return parts_.kernel->names(); });
-        if (!names || !isPlainText(*names.*part)) return std::nullopt;
-        return *names.*part;
     }
 
     Seconds bootTime() {
