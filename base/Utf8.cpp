@@ -139,17 +139,15 @@ bool isPrintable(const Utf8Char& character) noexcept {
 
 EscapedChar::EscapedChar(std::string_view text, EscapeStyle style) noexcept {
     const Utf8Char character = decodeUtf8(text);
-    length_ = character.length;
-    const std::string_view bytes = text.substr(0, length_);
-    if (standsForItself(character, style)) {
-        append(bytes);
-    } else if (style == EscapeStyle::terminal && character.valid) {
+    source_ = text.substr(0, character.length);
+    if (standsForItself(character, style)) return;
+    if (style == EscapeStyle::terminal && character.valid) {
         appendForTerminal(character.codePoint);
-    } else if (bytes == "\\") {
+    } else if (character.codePoint == '\\') {
         append("\\\\");
     } else {
         const Digits form = style == EscapeStyle::terminal ? Digits::lower : Digits::upper;
-        for (const char byte : bytes) {
+        for (const char byte : source_) {
             append("\\x");
             appendHex(static_cast<std::uint8_t>(byte), 2, form);
         }
@@ -157,13 +155,13 @@ EscapedChar::EscapedChar(std::string_view text, EscapeStyle style) noexcept {
 }
 
 void EscapedChar::append(std::string_view part) noexcept {
-    std::copy(part.begin(), part.end(), written_.begin() + size_);
+    std::copy(part.begin(), part.end(), escape_.begin() + size_);
     size_ += part.size();
 }
 
 void EscapedChar::appendHex(char32_t number, unsigned digits, Digits form) noexcept {
     const char* const symbols = form == Digits::upper ? "0123456789ABCDEF" : "0123456789abcdef";
-    while (digits-- > 0) written_[size_++] = symbols[(number >> (4 * digits)) & 0xFU];
+    while (digits-- > 0) escape_[size_++] = symbols[(number >> (4 * digits)) & 0xFU];
 }
 
 void EscapedChar::appendForTerminal(char32_t codePoint) noexcept {

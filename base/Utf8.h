@@ -70,14 +70,16 @@ enum class EscapeStyle {
 /// One character, written out.
 class EscapedChar {
   public:
-    /// The first character of `text`, which must not be empty.
+    /// The first character of `text`, which must not be empty and must outlive this object.
     EscapedChar(std::string_view text, EscapeStyle style) noexcept;
 
     /// The bytes of the text that it stands for.
-    std::size_t length() const noexcept { return length_; }
+    std::size_t length() const noexcept { return source_.size(); }
 
     /// Valid as long as this object.
-    std::string_view written() const noexcept { return {written_.data(), size_}; }
+    std::string_view written() const noexcept {
+        return size_ == 0 ? source_ : std::string_view(escape_.data(), size_);
+    }
 
   private:
     enum class Digits { upper, lower };
@@ -86,9 +88,9 @@ class EscapedChar {
     void appendHex(char32_t number, unsigned digits, Digits form) noexcept;
     void appendForTerminal(char32_t codePoint) noexcept;
 
-    std::size_t length_;
-    std::size_t size_ = 0;
-    std::array<char, 16> written_;  // four bytes of \xNN
+    std::string_view source_;
+    std::size_t size_ = 0;         // of the escape; none for what stands for itself
+    std::array<char, 16> escape_;  // four bytes of \xNN
 };
 
 /// A whole text, written out.

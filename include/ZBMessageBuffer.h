@@ -36,8 +36,8 @@ class __attribute__((visibility("default"))) ZBMessageBuffer {
     const std::string& str(std::ostream& inserted);
 
   private:
-    class Gatherer;
-    Gatherer* gatherer_;
+    class MessageStream;
+    MessageStream* stream_;
 };
 
 /// Inserts the address, not the content, of an object, as streams print pointers.

@@ -1,3 +1,6 @@
+// The configuration is followed without anybody telling us: a provider in an object manager has no
+// signal and no command of its own. So its file is looked at again and again, and looking must cost
+// one stat.
 #include "ConfigurationFile.h"
 
 #include <fcntl.h>
@@ -7,6 +10,8 @@
 #include <cerrno>
 #include <cstring>
 #include <utility>
+
+#include "PosixFile.h"
 
 namespace ZBLog {
 
@@ -29,8 +34,8 @@ int readUpTo(std::size_t limit, int descriptor, std::string& text) {
 
 }  // namespace
 
-ConfigurationFile::ConfigurationFile(ConfigurationSource source, Surroundings& surroundings)
-    : source_(std::move(source)), surroundings_(surroundings) {}
+ConfigurationFile::ConfigurationFile(ConfigurationSource source, Environment& environment)
+    : source_(std::move(source)), environment_(environment) {}
 
 bool ConfigurationFile::Stamp::operator==(const Stamp& other) const {
     return error == other.error && FileIdentity::of(status) == FileIdentity::of(other.status) &&
@@ -39,7 +44,7 @@ bool ConfigurationFile::Stamp::operator==(const Stamp& other) const {
            status.st_ctim.tv_nsec == other.status.st_ctim.tv_nsec;
 }
 
-std::optional<ParsedConfiguration> ConfigurationFile::news() {
+std::optional<ParsedConfiguration> ConfigurationFile::readIfChanged() {
     if (source_.path.empty()) {
         return std::exchange(content_, Content{}) ? std::nullopt
                                                   : std::optional(ParsedConfiguration{});
@@ -68,12 +73,12 @@ ConfigurationFile::Stamp ConfigurationFile::stamp() const {
 /// times advance in steps. Its content is then looked at once more.
 bool ConfigurationFile::isSettled(const Stamp& stamp) const {
     constexpr int settlingSeconds = 2;
-    const auto age = surroundings_.utc().tv_sec - stamp.status.st_ctim.tv_sec;
+    const auto age = environment_.utc().tv_sec - stamp.status.st_ctim.tv_sec;
     return age < 0 || age > settlingSeconds;
 }
 
 ConfigurationFile::Content ConfigurationFile::read() const {
-    Descriptor file;
+    PosixFile file;
     if (const int error = file.open(source_.path.c_str(), O_RDONLY)) return failure(error);
     if (!S_ISREG(file.status().st_mode)) return {"", "not a regular file"};
     Content content;

@@ -1,27 +1,26 @@
-#ifndef ZBLOG_CONFIGURATION_FILE_H
-#define ZBLOG_CONFIGURATION_FILE_H
+#ifndef FRAMEWORK_LOGGING_CONFIGURATION_FILE_H
+#define FRAMEWORK_LOGGING_CONFIGURATION_FILE_H
 
 #include <sys/stat.h>
 
 #include <optional>
 #include <string>
 
-#include "ConfigurationParser.h"
-#include "Descriptor.h"
-#include "Surroundings.h"
+#include "Configuration.h"
+#include "Environment.h"
 
 namespace ZBLog {
 
 /// A configuration in a file that may change, vanish and come back. Serves one thread at a time.
 class ConfigurationFile {
   public:
-    ConfigurationFile(ConfigurationSource source, Surroundings& surroundings);
+    ConfigurationFile(ConfigurationSource source, Environment& environment);
 
-    /// What the file says, if that is news: at the first call, and when its content or the reason
-    /// why it cannot be read is another one than before. Costs one stat while the file rests.
-    /// A file that is missing says nothing (the defaults), and is an error if it is required; so is
-    /// one that cannot be read. Throws std::bad_alloc; the object is of no use then.
-    std::optional<ParsedConfiguration> news();
+    /// What the file says: at the first call, and when its content or the reason why it cannot be
+    /// read is another one than before; else nothing. Costs one stat while the file rests. A file
+    /// that is missing says nothing (the defaults), and is an error if it is required; so is one
+    /// that cannot be read. Throws std::bad_alloc; the object is of no use then.
+    std::optional<ParsedConfiguration> readIfChanged();
 
     const std::string& path() const { return source_.path; }
 
@@ -46,7 +45,7 @@ class ConfigurationFile {
     Content failure(int error) const;
 
     ConfigurationSource source_;
-    Surroundings& surroundings_;
+    Environment& environment_;
     std::optional<Stamp> stamp_;  // none: to be read again
     std::optional<Content> content_;
 };

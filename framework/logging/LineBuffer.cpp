@@ -1,31 +1,12 @@
+// A record is put together on the stack and written with one call: a log that allocated could fail
+// just when somebody has to read why memory ran out, and two calls could be torn apart by another
+// process that appends to the same file.
 #include "LineBuffer.h"
 
 #include <algorithm>
 #include <charconv>
 
-#include "TextUnit.h"
-
 namespace ZBLog {
-
-namespace {
-
-constexpr std::string_view cutMark = "\\...";
-
-struct EscapedUnit {
-    std::size_t taken;    ///< bytes of the text
-    std::size_t written;  ///< bytes of the line
-    bool asItIs;
-};
-
-EscapedUnit measure(std::string_view text, LineBuffer::Blanks blanks) {
-    const char first = text.front();
-    if (first == '\\') return {1, 2, false};
-    if (first == ' ' && blanks == LineBuffer::Blanks::escaped) return {1, 4, false};
-    const TextUnit unit = firstUnit(text);
-    return {unit.bytes, unit.printable ? unit.bytes : 4 * unit.bytes, unit.printable};
-}
-
-}  // namespace
 
 void LineBuffer::put(char character) noexcept {
     put(std::string_view(&character, 1));
@@ -45,29 +26,19 @@ void LineBuffer::putNumber(long long value, std::size_t digits) noexcept {
     put(std::string_view(decimal.data(), length));
 }
 
-void LineBuffer::putUnit(std::string_view unit, bool asItIs) noexcept {
-    if (asItIs) return put(unit);
-    if (unit == "\\") return put("\\\\");
-    constexpr std::string_view hex = "0123456789ABCDEF";
-    for (const char character : unit) {
-        const auto byte = static_cast<unsigned char>(character);
-        put("\\x");
-        put(hex[byte / 16]);
-        put(hex[byte % 16]);
-    }
-}
-
-void LineBuffer::putEscaped(std::string_view text, std::size_t room, Blanks blanks) noexcept {
+void LineBuffer::putEscaped(std::string_view text, std::size_t room,
+                            base::EscapeStyle style) noexcept {
+    constexpr std::string_view cutMark = "\\...";
     const std::size_t limit = size_ + std::min(room, free());
     std::size_t markFitsAt = size_;
     while (!text.empty()) {
-        const EscapedUnit unit = measure(text, blanks);
-        if (size_ + unit.written > limit) {
+        const base::EscapedChar character(text, style);
+        if (size_ + character.written().size() > limit) {
             size_ = markFitsAt;
             return put(cutMark.substr(0, limit - size_));
         }
-        putUnit(text.substr(0, unit.taken), unit.asItIs);
-        text.remove_prefix(unit.taken);
+        put(character.written());
+        text.remove_prefix(character.length());
         if (size_ + cutMark.size() <= limit) markFitsAt = size_;
     }
 }

@@ -1,9 +1,11 @@
-#ifndef ZBLOG_LINE_BUFFER_H
-#define ZBLOG_LINE_BUFFER_H
+#ifndef FRAMEWORK_LOGGING_LINE_BUFFER_H
+#define FRAMEWORK_LOGGING_LINE_BUFFER_H
 
 #include <array>
 #include <cstddef>
 #include <string_view>
+
+#include "base/Utf8.h"
 
 namespace ZBLog {
 
@@ -13,8 +15,6 @@ class LineBuffer {
   public:
     /// Most bytes that are written at once: what a pipe takes whole.
     static constexpr std::size_t capacity = 4096;
-
-    enum class Blanks { kept, escaped };
 
     /// Empty. The bytes are left as they are found: clearing them would cost more than most lines.
     LineBuffer() noexcept { bytes_[0] = '\n'; }
@@ -26,12 +26,11 @@ class LineBuffer {
     /// Appends `value` in decimal, filled up with leading zeros to `digits`.
     void putNumber(long long value, std::size_t digits = 1) noexcept;
 
-    /// Appends `text` so that it stays on one line and does nothing to a terminal: the bytes of
-    /// what is not printable become \xNN, and so does the blank if `blanks` says so; a backslash
-    /// becomes two. At most `room` bytes are appended; a text that is longer is cut between two
+    /// Appends `text` so that it stays on one line and does nothing to a terminal, escaped as
+    /// `style` says. At most `room` bytes are appended; a text that is longer is cut between two
     /// characters and ends in the mark \...
     void putEscaped(std::string_view text, std::size_t room = capacity,
-                    Blanks blanks = Blanks::kept) noexcept;
+                    base::EscapeStyle style = base::EscapeStyle::logText) noexcept;
 
     /// What was appended, without an end of line; valid until the next change.
     std::string_view text() const noexcept;
@@ -48,7 +47,6 @@ class LineBuffer {
     static constexpr std::size_t contentLimit = capacity - 2;
 
     std::size_t free() const noexcept { return contentLimit - size_; }
-    void putUnit(std::string_view unit, bool asItIs) noexcept;
 
     std::array<char, capacity> bytes_;  // a newline, then the content
     std::size_t size_ = 0;

@@ -1,5 +1,5 @@
-#ifndef ZBLOG_LOGGER_H
-#define ZBLOG_LOGGER_H
+#ifndef FRAMEWORK_LOGGING_LOGGER_H
+#define FRAMEWORK_LOGGING_LOGGER_H
 
 #include <array>
 #include <atomic>
@@ -9,11 +9,41 @@
 #include <mutex>
 
 #include "ConfigurationFile.h"
-#include "Gate.h"
-#include "Setup.h"
-#include "Surroundings.h"
+#include "Environment.h"
+#include "Sinks.h"
 
 namespace ZBLog {
+
+/// What one channel lets pass, as far as one word can tell: almost every record is decided here, by
+/// one load, without a look at the configuration. Categories are none of its business.
+/// Any thread may ask and set at any time.
+class LevelFilter {
+  public:
+    /// Nothing passes.
+    constexpr LevelFilter() = default;
+
+    void set(const ChannelConfiguration& channel) noexcept;
+    void close() noexcept { word_ = closed; }
+
+    bool passes(int level, std::string_view text) const noexcept {
+        const int word = word_.load(std::memory_order_relaxed);
+        if (word == closed || level > word / 2) return false;
+        return word % 2 == 0 || isFailure(text);
+    }
+
+  private:
+    static constexpr int closed = -1;
+
+    std::atomic<int> word_{closed};  // else twice the finest level, plus one for failures only
+};
+
+/// A configuration in force: what it says, and the sinks that it needs. What readers look at never
+/// changes.
+struct ActiveConfiguration {
+    Configuration configuration;
+    std::array<std::shared_ptr<Sink>, channelCount> sinks;  ///< null: off
+    std::unique_ptr<ActiveConfiguration> older;  ///< replaced ones that somebody may still read
+};
 
 /// The two channels and the configuration that they follow.
 ///
@@ -29,9 +59,9 @@ namespace ZBLog {
 /// it then drops the records of that sink (see LineSink) or keeps the configuration that it has.
 class Logger {
   public:
-    /// `surroundings` must outlive the logger. Constant-initialised: usable before any constructor
+    /// `environment` must outlive the logger. Constant-initialised: usable before any constructor
     /// of the program has run.
-    explicit constexpr Logger(Surroundings& surroundings) noexcept : surroundings_(surroundings) {}
+    explicit constexpr Logger(Environment& environment) noexcept : environment_(environment) {}
     /// Nobody may be writing.
     ~Logger() { close(); }
     Logger(const Logger&) = delete;
@@ -39,11 +69,11 @@ class Logger {
 
     /// Writes a record to its channel, if it passes. errno is left alone.
     void write(const Record& record) noexcept {
-        keepUp();
-        if (gates_[indexOf(record.channel)].passes(record.level, record.text)) deliver(record);
+        checkConfiguration();
+        if (filters_[indexOf(record.channel)].passes(record.level, record.text)) deliver(record);
     }
 
-    /// Puts a configuration in force, and lets go of the file. For tests.
+    /// Activates a configuration, and lets go of the file. For tests.
     /// Does nothing after close. Throws std::bad_alloc.
     void use(const Configuration& configuration);
 
@@ -55,27 +85,28 @@ class Logger {
   private:
     enum class State { unread, running, closed };
 
-    class Reading;
+    class ScopedReader;
 
     /// Looks at the configuration file when it is time to.
-    void keepUp() noexcept;
-    /// Waits `longest` for another thread that is at it.
-    void readConfiguration(std::chrono::milliseconds longest) noexcept;
+    void checkConfiguration() noexcept;
+    /// Waits `limit` for another thread that is at it.
+    void readConfiguration(std::chrono::milliseconds limit) noexcept;
     void follow(ConfigurationFile& file);
     void report(const std::string& path, const ConfigurationError& error) noexcept;
-    void putInForce(const Configuration& configuration);
+    void activate(const Configuration& configuration);
     void freeOlder() noexcept;
     void deliver(const Record& record) noexcept;
 
-    Surroundings& surroundings_;
+    Environment& environment_;
     std::atomic<State> state_{State::unread};
-    std::atomic<std::uint32_t> lookedAt_{0};  // milliseconds, of the last look at the file
-    std::array<Gate, channelCount> gates_{};
-    std::atomic<Setup*> setup_{nullptr};  // owned
-    std::atomic<unsigned> readers_{0};    // threads that may hold a setup, the current or an older
-    std::timed_mutex mutex_;              // for all below, and for changes of setup_
+    std::atomic<std::uint32_t> lastCheck_{0};  // of the file, in milliseconds
+    std::array<LevelFilter, channelCount> filters_{};
+    std::atomic<ActiveConfiguration*> active_{nullptr};  // owned
+    std::atomic<unsigned> readers_{
+        0};                   // threads that may hold the active configuration or an older
+    std::timed_mutex mutex_;  // for all below, and for changes of active_
     std::unique_ptr<ConfigurationFile> file_;
-    std::unique_ptr<Setup> leftOver_;  // the last setup, should somebody still read it
+    std::unique_ptr<ActiveConfiguration> leftOver_;  // the last one, should somebody still read it
 };
 
 /// The logger behind ZBLogger.

@@ -1,3 +1,6 @@
+// The two calls of the contract, on one logger for the whole process. It has to work before main
+// and after it: other libraries write records from their own constructors and from threads that
+// nobody joins.
 #include "ZBLogger.h"
 
 #include "Logger.h"
@@ -6,25 +9,25 @@ namespace ZBLog {
 
 namespace {
 
-HostSurroundings hostSurroundings;
+HostEnvironment hostEnvironment;
 
-/// The logger's destructor is never run: threads that outlive the end of main may still call it.
-union Permanent {
-    constexpr Permanent() : logger(hostSurroundings) {}
-    ~Permanent() {}
+/// The destructor is never run: threads that outlive the end of main may still call the logger.
+union NoDestructor {
+    constexpr NoDestructor() : logger(hostEnvironment) {}
+    ~NoDestructor() {}
 
     Logger logger;
-} permanent;
+} process;
 
 /// When the library is unloaded or the process ends, all that the logger holds is given back.
 struct AtUnload {
-    ~AtUnload() { permanent.logger.close(); }
+    ~AtUnload() { process.logger.close(); }
 } const atUnload;
 
 }  // namespace
 
 Logger& processLogger() noexcept {
-    return permanent.logger;
+    return process.logger;
 }
 
 void ZBLogger::logLevelMessage(const char* function, const char* file, int line,

@@ -1,15 +1,13 @@
 // The configuration of the log and the trace.
-#include "framework/logging/ConfigurationParser.h"
-#include "framework/logging/TextUnit.h"
+#include "base/Utf8.h"
+#include "framework/logging/Configuration.h"
 #include "fuzz/Invariant.h"
 
 namespace {
 
 bool isPrintable(std::string_view text) {
     while (!text.empty()) {
-        const ZBLog::TextUnit unit = ZBLog::firstUnit(text);
-        if (!unit.printable) return false;
-        text.remove_prefix(unit.bytes);
+        if (!base::isPrintable(base::takeUtf8(text))) return false;
     }
     return true;
 }

@@ -18,8 +18,8 @@ using ZBLog::Destination;
 
 TEST(Cancellation, MayHitAThreadWhileItWrites) {
     const logging_test::TemporaryFolder folder;
-    logging_test::FakeSurroundings surroundings;
-    ZBLog::Logger logger(surroundings);
+    logging_test::FakeEnvironment environment;
+    ZBLog::Logger logger(environment);
     ZBLog::Configuration configuration;
     configuration.of(Channel::log) = everythingTo(Destination::file, folder / "log");
     logger.use(configuration);

@@ -19,7 +19,7 @@ using ZBLog::configurationSourceFrom;
 
 /// What news brings: the log's level, and the errors.
 std::string newsOf(ConfigurationFile& file) {
-    const auto news = file.news();
+    const auto news = file.readIfChanged();
     if (!news) return "no news";
     std::string text = std::to_string(news->configuration.of(Channel::log).level);
     for (const auto& error : news->errors) {
@@ -33,13 +33,13 @@ class ConfigurationFileTest : public testing::Test {
     /// Writes the file as if that had been long ago.
     void writeLongAgo(const std::string& content) {
         logging_test::writeFile(path_, content);
-        surroundings_.setAhead(60);
+        environment_.setAhead(60);
     }
 
     logging_test::TemporaryFolder folder_;
-    logging_test::FakeSurroundings surroundings_;
+    logging_test::FakeEnvironment environment_;
     const std::string path_ = folder_ / "zblog.conf";
-    ConfigurationFile file_{{path_, true}, surroundings_};
+    ConfigurationFile file_{{path_, true}, environment_};
 };
 
 /// "log.level = 1" in a mapped file, where a store changes the content and nothing that stat tells.
@@ -113,11 +113,11 @@ TEST_F(ConfigurationFileTest, SeesAChangeThatKeepsItsSizeAndItsTimeOfModificatio
 
 TEST_F(ConfigurationFileTest, SeesASecondChangeInTheSameMoment) {
     UnnoticedChanges changes;
-    ConfigurationFile file({changes.path(), true}, surroundings_);
-    surroundings_.stopUtcAt(changes.changedAt());
+    ConfigurationFile file({changes.path(), true}, environment_);
+    environment_.stopUtcAt(changes.changedAt());
     EXPECT_EQ(newsOf(file), "1");
     changes.setLevel('2');
-    surroundings_.stopUtcAt(changes.changedAt() + 2);
+    environment_.stopUtcAt(changes.changedAt() + 2);
     EXPECT_EQ(newsOf(file), "2");
     EXPECT_EQ(newsOf(file), "no news");
 }
@@ -126,8 +126,8 @@ TEST_F(ConfigurationFileTest, IsNotReadWhileItRests) {
     UnnoticedChanges changes;
     for (const time_t age : {3, -1}) {
         changes.setLevel('1');
-        ConfigurationFile file({changes.path(), true}, surroundings_);
-        surroundings_.stopUtcAt(changes.changedAt() + age);
+        ConfigurationFile file({changes.path(), true}, environment_);
+        environment_.stopUtcAt(changes.changedAt() + age);
         EXPECT_EQ(newsOf(file), "1");
         changes.setLevel('2');
         EXPECT_EQ(newsOf(file), "no news") << age;
@@ -137,22 +137,22 @@ TEST_F(ConfigurationFileTest, IsNotReadWhileItRests) {
 TEST_F(ConfigurationFileTest, MissingFileIsAnErrorOnlyIfItIsRequired) {
     EXPECT_EQ(newsOf(file_), "3000 [0: cannot be read: No such file or directory]");
     EXPECT_EQ(newsOf(file_), "no news");
-    ConfigurationFile optional({path_, false}, surroundings_);
+    ConfigurationFile optional({path_, false}, environment_);
     EXPECT_EQ(newsOf(optional), "3000");
     EXPECT_EQ(newsOf(optional), "no news");
-    ConfigurationFile beneathAFile({"/etc/passwd/zblog.conf", false}, surroundings_);
+    ConfigurationFile beneathAFile({"/etc/passwd/zblog.conf", false}, environment_);
     EXPECT_EQ(newsOf(beneathAFile), "3000");
 }
 
 TEST_F(ConfigurationFileTest, FileThatIsThereAndCannotBeReadIsAnErrorInAnyCase) {
     std::filesystem::create_symlink(path_, path_);
-    ConfigurationFile optional({path_, false}, surroundings_);
+    ConfigurationFile optional({path_, false}, environment_);
     EXPECT_EQ(newsOf(optional), "3000 [0: cannot be read: Too many levels of symbolic links]");
     EXPECT_EQ(newsOf(optional), "no news");
 }
 
 TEST_F(ConfigurationFileTest, ComesAndGoes) {
-    ConfigurationFile file({path_, false}, surroundings_);
+    ConfigurationFile file({path_, false}, environment_);
     EXPECT_EQ(newsOf(file), "3000");
     writeLongAgo("log.level = 1\n");
     EXPECT_EQ(newsOf(file), "1");
@@ -164,7 +164,7 @@ TEST_F(ConfigurationFileTest, ComesAndGoes) {
 }
 
 TEST_F(ConfigurationFileTest, NoFileMeansTheDefaults) {
-    ConfigurationFile none({"", true}, surroundings_);
+    ConfigurationFile none({"", true}, environment_);
     EXPECT_EQ(newsOf(none), "3000");
     EXPECT_EQ(newsOf(none), "no news");
 }
@@ -176,12 +176,12 @@ TEST_F(ConfigurationFileTest, IsRefusedWhenItIsTooLong) {
 }
 
 TEST_F(ConfigurationFileTest, IsRefusedWhenItIsNoRegularFile) {
-    ConfigurationFile folder({folder_.path(), true}, surroundings_);
+    ConfigurationFile folder({folder_.path(), true}, environment_);
     EXPECT_EQ(newsOf(folder), "3000 [0: not a regular file]");
     EXPECT_EQ(newsOf(folder), "no news");
     ASSERT_EQ(::mkfifo(path_.c_str(), 0600), 0);
     EXPECT_EQ(newsOf(file_), "3000 [0: not a regular file]");
-    ConfigurationFile endless({"/dev/zero", true}, surroundings_);
+    ConfigurationFile endless({"/dev/zero", true}, environment_);
     EXPECT_EQ(newsOf(endless), "3000 [0: not a regular file]");
 }
 

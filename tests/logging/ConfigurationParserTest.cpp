@@ -1,4 +1,4 @@
-#include "framework/logging/ConfigurationParser.h"
+#include "framework/logging/Configuration.h"
 
 #include <gtest/gtest.h>
 

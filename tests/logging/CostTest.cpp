@@ -134,9 +134,9 @@ class CostTest : public testing::Test {
     }
 
     logging_test::TemporaryFolder folder_;
-    logging_test::FakeSurroundings surroundings_;
+    logging_test::FakeEnvironment environment_;
     Configuration configuration_;
-    ZBLog::Logger logger_{surroundings_};
+    ZBLog::Logger logger_{environment_};
     const std::string text_ = "ENTERING: G() in A [Line: 3],Parameters List: P";
 };
 
@@ -169,16 +169,16 @@ TEST_F(CostTest, FilteredRecordOfTheProcessCostsNoSystemCall) {
 }
 
 TEST_F(CostTest, LookAtTheConfigurationFileComesOnceASecond) {
-    surroundings_.source = {folder_ / "zblog.conf", false};
-    ZBLog::Logger logger(surroundings_);
+    environment_.source = {folder_ / "zblog.conf", false};
+    ZBLog::Logger logger(environment_);
     logger.write(record(text_, 4000));
     EXPECT_EQ(withoutSystemCalls([&] {
-                  surroundings_.advance(999);
+                  environment_.advance(999);
                   for (int round = 0; round < rounds; ++round) logger.write(record(text_, 4000));
               }),
               0);
     EXPECT_EQ(withoutSystemCalls([&] {
-                  surroundings_.advance(1000);
+                  environment_.advance(1000);
                   logger.write(record(text_, 4000));
               }),
               1000 + SIGSYS);
@@ -189,13 +189,13 @@ TEST_F(CostTest, FilteredRecordCostsNoAllocation) {
 }
 
 TEST_F(CostTest, RestingConfigurationFileCostsNoAllocation) {
-    surroundings_.source = {folder_ / "zblog.conf", true};
-    logging_test::writeFile(surroundings_.source.path, "log.level = 3000\n");
-    surroundings_.setAhead(60);
-    ZBLog::Logger logger(surroundings_);
+    environment_.source = {folder_ / "zblog.conf", true};
+    logging_test::writeFile(environment_.source.path, "log.level = 3000\n");
+    environment_.setAhead(60);
+    ZBLog::Logger logger(environment_);
     logger.write(record(text_, 4000));
     EXPECT_EQ(allocationsOf([&] {
-                  surroundings_.advance(1000);
+                  environment_.advance(1000);
                   logger.write(record(text_, 4000));
               }),
               0);

@@ -8,7 +8,7 @@
 #include <csignal>
 #include <filesystem>
 
-#include "framework/logging/FileSink.h"
+#include "framework/logging/Sinks.h"
 #include "tests/logging/LoggingSupport.h"
 
 namespace {
@@ -39,13 +39,13 @@ class FileSizeLimit {
 class FileSinkFaultTest : public testing::Test {
   protected:
     logging_test::TemporaryFolder folder_;
-    logging_test::FakeSurroundings surroundings_;
+    logging_test::FakeEnvironment environment_;
 };
 
 TEST_F(FileSinkFaultTest, FullDiskIsToldOnce) {
-    ZBLog::FileSink sink("/dev/full", surroundings_);
+    ZBLog::FileSink sink("/dev/full", environment_);
     for (int count = 0; count < 100; ++count) sink.write(record("one"));
-    EXPECT_THAT(surroundings_.takeSystemLog(),
+    EXPECT_THAT(environment_.takeSystemLog(),
                 ElementsAre(warning + "/dev/full: No space left on device; records are dropped "
                                       "until it can be written again"));
 }
@@ -54,9 +54,9 @@ TEST_F(FileSinkFaultTest, LossOnAFullDiskIsToldInTheFileWhenThereIsRoomAgain) {
     const std::string disk = folder_ / "disk";
     const std::string path = disk + "/full";
     std::filesystem::create_directory_symlink("/dev", disk);
-    ZBLog::FileSink sink(path, surroundings_);
+    ZBLog::FileSink sink(path, environment_);
     for (int count = 0; count < 100; ++count) sink.write(record("lost"));
-    EXPECT_THAT(surroundings_.takeSystemLog(),
+    EXPECT_THAT(environment_.takeSystemLog(),
                 ElementsAre(warning + path +
                             ": No space left on device; records are dropped "
                             "until it can be written again"));
@@ -67,18 +67,18 @@ TEST_F(FileSinkFaultTest, LossOnAFullDiskIsToldInTheFileWhenThereIsRoomAgain) {
     sink.write(record("two"));
     EXPECT_THAT(textsOf(readFile(path)),
                 ElementsAre("100 records were dropped: No space left on device", "one", "two"));
-    EXPECT_TRUE(surroundings_.takeSystemLog().empty());
+    EXPECT_TRUE(environment_.takeSystemLog().empty());
 }
 
 TEST_F(FileSinkFaultTest, MissingFolderIsToldOnceAndTheLossIsToldInTheFileAfterwards) {
     std::filesystem::create_directory(folder_ / "var");
     const std::string path = folder_ / "var/korva.log";
-    ZBLog::FileSink sink(path, surroundings_);
+    ZBLog::FileSink sink(path, environment_);
     sink.write(record("one"));
     std::filesystem::remove_all(folder_ / "var");
     for (int count = 0; count < 12; ++count) sink.write(record("lost"));
     EXPECT_FALSE(std::filesystem::exists(folder_ / "var"));
-    EXPECT_THAT(surroundings_.takeSystemLog(),
+    EXPECT_THAT(environment_.takeSystemLog(),
                 ElementsAre(warning + path +
                             ": No such file or directory; records are dropped "
                             "until it can be written again"));
@@ -89,11 +89,11 @@ TEST_F(FileSinkFaultTest, MissingFolderIsToldOnceAndTheLossIsToldInTheFileAfterw
     EXPECT_THAT(textsOf(readFile(path)),
                 ElementsAre("12 records were dropped: No such file or directory", "two", "three"));
     EXPECT_THAT(readFile(path), testing::HasSubstr(" log 0 ZBLog - -:0 12 records were dropped"));
-    EXPECT_TRUE(surroundings_.takeSystemLog().empty());
+    EXPECT_TRUE(environment_.takeSystemLog().empty());
 
     std::filesystem::remove_all(folder_ / "var");
     sink.write(record("lost"));
-    EXPECT_EQ(surroundings_.takeSystemLog().size(), 1u);
+    EXPECT_EQ(environment_.takeSystemLog().size(), 1u);
     std::filesystem::create_directory(folder_ / "var");
     sink.write(record("four"));
     EXPECT_THAT(textsOf(readFile(path)),
@@ -105,10 +105,10 @@ TEST_F(FileSinkFaultTest, UnwritableFolderIsToldOnceAndTheFileIsUsedWhenItBecome
     const std::string path = folder_ / "korva.log";
     const int status = logging_test::inChildProcess([&] {
         if (::geteuid() == 0 && ::setresuid(65534, 65534, 0) != 0) return 1;
-        ZBLog::FileSink sink(path, surroundings_);
+        ZBLog::FileSink sink(path, environment_);
         sink.write(record("lost"));
         sink.write(record("lost"));
-        const bool told = surroundings_.takeSystemLog() ==
+        const bool told = environment_.takeSystemLog() ==
                           std::vector<std::string>{warning + path +
                                                    ": Permission denied; records are dropped "
                                                    "until it can be written again"};
@@ -124,7 +124,7 @@ TEST_F(FileSinkFaultTest, UnwritableFolderIsToldOnceAndTheFileIsUsedWhenItBecome
 
 TEST_F(FileSinkFaultTest, HalfALineIsNeverContinuedByAnotherRecord) {
     const std::string path = folder_ / "korva.log";
-    ZBLog::FileSink sink(path, surroundings_);
+    ZBLog::FileSink sink(path, environment_);
     sink.write(record("one"));
     const std::string before = readFile(path);
     {
@@ -142,12 +142,12 @@ TEST_F(FileSinkFaultTest, HalfALineIsNeverContinuedByAnotherRecord) {
     EXPECT_EQ(after[torn.size()], '\n');
     EXPECT_THAT(textsOf(after.substr(torn.size() + 1)),
                 ElementsAre("2 records were dropped: File too large", "two", "three"));
-    EXPECT_EQ(surroundings_.takeSystemLog().size(), 1u);
+    EXPECT_EQ(environment_.takeSystemLog().size(), 1u);
 }
 
 TEST_F(FileSinkFaultTest, NewFileAfterATornLineBeginsWithoutAnEmptyLine) {
     const std::string path = folder_ / "korva.log";
-    ZBLog::FileSink sink(path, surroundings_);
+    ZBLog::FileSink sink(path, environment_);
     {
         const FileSizeLimit limit(10);
         sink.write(record("torn"));
@@ -161,7 +161,7 @@ TEST_F(FileSinkFaultTest, NewFileAfterATornLineBeginsWithoutAnEmptyLine) {
 TEST_F(FileSinkFaultTest, TornLineIsRememberedWhileTheFileIsAway) {
     const std::string path = folder_ / "var/korva.log";
     std::filesystem::create_directory(folder_ / "var");
-    ZBLog::FileSink sink(path, surroundings_);
+    ZBLog::FileSink sink(path, environment_);
     {
         const FileSizeLimit limit(10);
         sink.write(record("torn"));
@@ -179,7 +179,7 @@ TEST_F(FileSinkFaultTest, LimitOnFileSizesRaisesNoSignal) {
     const std::string path = folder_ / "korva.log";
     const int status = logging_test::inChildProcess([&] {
         std::signal(SIGXFSZ, SIG_DFL);
-        ZBLog::FileSink sink(path, surroundings_);
+        ZBLog::FileSink sink(path, environment_);
         const FileSizeLimit limit(0);
         sink.write(record("lost"));
         sigset_t pending;
@@ -196,7 +196,7 @@ TEST_F(FileSinkFaultTest, LimitOnFileSizesLeavesASignalPendingThatWasPendingBefo
         ::sigaddset(&set, SIGXFSZ);
         ::pthread_sigmask(SIG_BLOCK, &set, nullptr);
         ::raise(SIGXFSZ);
-        ZBLog::FileSink sink(folder_ / "korva.log", surroundings_);
+        ZBLog::FileSink sink(folder_ / "korva.log", environment_);
         const FileSizeLimit limit(0);
         sink.write(record("lost"));
         ::sigpending(&pending);
@@ -210,10 +210,10 @@ TEST_F(FileSinkFaultTest, SymbolicLinkIsRefused) {
     const std::string path = folder_ / "korva.log";
     logging_test::writeFile(victim, "precious");
     std::filesystem::create_symlink(victim, path);
-    ZBLog::FileSink sink(path, surroundings_);
+    ZBLog::FileSink sink(path, environment_);
     sink.write(record("one"));
     EXPECT_EQ(readFile(victim), "precious");
-    EXPECT_THAT(surroundings_.takeSystemLog(),
+    EXPECT_THAT(environment_.takeSystemLog(),
                 ElementsAre(warning + path +
                             ": Too many levels of symbolic links; records are "
                             "dropped until it can be written again"));
@@ -222,9 +222,9 @@ TEST_F(FileSinkFaultTest, SymbolicLinkIsRefused) {
 TEST_F(FileSinkFaultTest, FifoIsRefusedWithoutWaitingForItsReader) {
     const std::string path = folder_ / "fifo";
     ASSERT_EQ(::mkfifo(path.c_str(), 0600), 0);
-    ZBLog::FileSink sink(path, surroundings_);
+    ZBLog::FileSink sink(path, environment_);
     sink.write(record("one"));
-    EXPECT_THAT(surroundings_.takeSystemLog(),
+    EXPECT_THAT(environment_.takeSystemLog(),
                 ElementsAre(testing::StartsWith(warning + path + ": No such device or address")));
 }
 
@@ -233,20 +233,20 @@ TEST_F(FileSinkFaultTest, FifoThatSomebodyReadsIsRefusedToo) {
     ASSERT_EQ(::mkfifo(path.c_str(), 0600), 0);
     const int reader = ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
     const std::size_t before = logging_test::openDescriptors();
-    ZBLog::FileSink sink(path, surroundings_);
+    ZBLog::FileSink sink(path, environment_);
     for (int count = 0; count < 2; ++count) sink.write(record("one"));
     char byte = 0;
     EXPECT_EQ(::read(reader, &byte, 1), 0);
     EXPECT_EQ(logging_test::openDescriptors(), before);
-    EXPECT_THAT(surroundings_.takeSystemLog(),
+    EXPECT_THAT(environment_.takeSystemLog(),
                 ElementsAre(testing::StartsWith(warning + path + ": Invalid argument")));
     ::close(reader);
 }
 
 TEST_F(FileSinkFaultTest, FolderInPlaceOfTheFileIsRefused) {
-    ZBLog::FileSink sink(folder_.path(), surroundings_);
+    ZBLog::FileSink sink(folder_.path(), environment_);
     sink.write(record("one"));
-    EXPECT_THAT(surroundings_.takeSystemLog(),
+    EXPECT_THAT(environment_.takeSystemLog(),
                 ElementsAre(testing::StartsWith(warning + folder_.path() + ": Is a directory")));
 }
 

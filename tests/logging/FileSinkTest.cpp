@@ -1,4 +1,4 @@
-#include "framework/logging/FileSink.h"
+#include "framework/logging/Sinks.h"
 
 #include <fcntl.h>
 #include <gmock/gmock.h>
@@ -34,9 +34,9 @@ class FileSinkTest : public testing::Test {
     }
 
     logging_test::TemporaryFolder folder_;
-    logging_test::FakeSurroundings surroundings_;
+    logging_test::FakeEnvironment environment_;
     const std::string path_ = folder_ / "korva.log";
-    ZBLog::FileSink sink_{path_, surroundings_};
+    ZBLog::FileSink sink_{path_, environment_};
 };
 
 TEST_F(FileSinkTest, CreatesNothingBeforeTheFirstRecord) {
@@ -61,7 +61,7 @@ TEST_F(FileSinkTest, WritesWholeLinesAtTheEnd) {
     EXPECT_THAT(textsOf(content.substr(14)), ElementsAre("one", "two\\x0Athree"));
     EXPECT_THAT(content, testing::ContainsRegex(
                              " [0-9]+ [0-9]+ log 3000 Zumbrel\\.Test work Work\\.cpp:12 one\n"));
-    EXPECT_TRUE(surroundings_.takeSystemLog().empty());
+    EXPECT_TRUE(environment_.takeSystemLog().empty());
 }
 
 TEST_F(FileSinkTest, TellsProcessAndThread) {
@@ -135,7 +135,7 @@ TEST_F(FileSinkTest, LosesNothingAndTearsNothingWhileThreadsWriteAndFilesRotate)
     }
     EXPECT_GE(found.size(), static_cast<std::size_t>(rotations));
     EXPECT_TRUE(found == expected) << found.size() << " of " << expected.size();
-    EXPECT_TRUE(surroundings_.takeSystemLog().empty());
+    EXPECT_TRUE(environment_.takeSystemLog().empty());
 }
 
 TEST_F(FileSinkTest, IsNotInheritedByChildProcesses) {

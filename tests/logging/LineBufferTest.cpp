@@ -9,9 +9,9 @@ namespace {
 using ZBLog::LineBuffer;
 
 std::string escaped(const std::string& text, std::size_t room = LineBuffer::capacity,
-                    LineBuffer::Blanks blanks = LineBuffer::Blanks::kept) {
+                    base::EscapeStyle style = base::EscapeStyle::logText) {
     LineBuffer line;
-    line.putEscaped(text, room, blanks);
+    line.putEscaped(text, room, style);
     return std::string(line.text());
 }
 
@@ -55,7 +55,7 @@ TEST(LineBuffer, EscapesWhatCouldLeaveItsLine) {
 }
 
 TEST(LineBuffer, EscapesBlanksWhereAsked) {
-    EXPECT_EQ(escaped("a b", 6, LineBuffer::Blanks::escaped), "a\\x20b");
+    EXPECT_EQ(escaped("a b", 6, base::EscapeStyle::logField), "a\\x20b");
 }
 
 TEST(LineBuffer, CutsBetweenCharactersAndMarksTheCut) {

@@ -21,20 +21,20 @@ using ZBLog::Destination;
 class LoggerConcurrencyTest : public testing::Test {
   protected:
     logging_test::TemporaryFolder folder_;
-    logging_test::FakeSurroundings surroundings_;
-    ZBLog::Logger logger_{surroundings_};
+    logging_test::FakeEnvironment environment_;
+    ZBLog::Logger logger_{environment_};
 };
 
 TEST_F(LoggerConcurrencyTest, LosesNothingWhileTheConfigurationChangesUnderManyThreads) {
     constexpr int threads = 8, recordsEach = 300;
-    surroundings_.source = {folder_ / "zblog.conf", true};
+    environment_.source = {folder_ / "zblog.conf", true};
     const auto configure = [&](int round) {
-        const std::string path = surroundings_.source.path;
+        const std::string path = environment_.source.path;
         logging_test::writeFile(path + ".new",
                                 "log.sink = file:" + (folder_ / "log") + std::to_string(round % 3) +
                                     "\nlog.records = all\nlog.category = Zumbrel.*\n");
         std::filesystem::rename(path + ".new", path);
-        surroundings_.advance(1000);
+        environment_.advance(1000);
     };
     configure(0);
     std::atomic<int> running{threads};
@@ -66,13 +66,13 @@ TEST_F(LoggerConcurrencyTest, LosesNothingWhileTheConfigurationChangesUnderManyT
             EXPECT_EQ(found.count(std::to_string(writer) + "/" + std::to_string(count)), 1u);
         }
     }
-    EXPECT_TRUE(surroundings_.takeSystemLog().empty());
+    EXPECT_TRUE(environment_.takeSystemLog().empty());
 }
 
 TEST_F(LoggerConcurrencyTest, LosesNoRecordOfThreadsThatAllComeFirst) {
     constexpr int threads = 8;
-    surroundings_.source = {folder_ / "zblog.conf", true};
-    logging_test::writeFile(surroundings_.source.path,
+    environment_.source = {folder_ / "zblog.conf", true};
+    logging_test::writeFile(environment_.source.path,
                             "log.sink = file:" + (folder_ / "log") + "\nlog.records = all\n");
     std::vector<std::thread> writers;
     for (int writer = 0; writer < threads; ++writer) {

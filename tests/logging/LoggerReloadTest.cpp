@@ -21,46 +21,46 @@ constexpr const char* failure = "MESSAGE [File: Work.cpp, Line: 12]: it broke";
 
 class LoggerReloadTest : public testing::Test {
   protected:
-    LoggerReloadTest() { surroundings_.source = {path_, true}; }
+    LoggerReloadTest() { environment_.source = {path_, true}; }
 
     void configure(const std::string& content) { writeFile(path_, content); }
     void write(const std::string& text) { logger_.write(record(text)); }
 
     logging_test::TemporaryFolder folder_;
-    logging_test::FakeSurroundings surroundings_;
+    logging_test::FakeEnvironment environment_;
     const std::string path_ = folder_ / "zblog.conf";
     const std::string first_ = folder_ / "first";
     const std::string second_ = folder_ / "second";
     const std::string toFirst_ = "log.sink = file:" + first_ + "\nlog.records = all\n";
     const std::string toSecond_ = "log.sink = file:" + second_ + "\nlog.records = all\n";
-    ZBLog::Logger logger_{surroundings_};
+    ZBLog::Logger logger_{environment_};
 };
 
 TEST_F(LoggerReloadTest, ReadsItsFileWhenTheFirstRecordComes) {
     configure(toFirst_);
     write("one");
     EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one"));
-    EXPECT_THAT(surroundings_.takeSystemLog(), IsEmpty());
+    EXPECT_THAT(environment_.takeSystemLog(), IsEmpty());
 }
 
 TEST_F(LoggerReloadTest, FollowsAChangeAfterOneSecondAndNotBefore) {
     configure(toFirst_);
     write("one");
     configure(toSecond_);
-    surroundings_.advance(999);
+    environment_.advance(999);
     write("two");
-    surroundings_.advance(1);
+    environment_.advance(1);
     write("three");
     EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one", "two"));
     EXPECT_THAT(textsOf(readFile(second_)), ElementsAre("three"));
 }
 
 TEST_F(LoggerReloadTest, FollowsAChangeWhenItsClockWrapsAround) {
-    surroundings_.setMilliseconds(std::numeric_limits<std::uint32_t>::max() - 100);
+    environment_.setMilliseconds(std::numeric_limits<std::uint32_t>::max() - 100);
     configure(toFirst_);
     write("one");
     configure(toSecond_);
-    surroundings_.advance(1000);
+    environment_.advance(1000);
     write("two");
     EXPECT_THAT(textsOf(readFile(second_)), ElementsAre("two"));
 }
@@ -71,7 +71,7 @@ TEST_F(LoggerReloadTest, ClosesAFileThatIsNoLongerWanted) {
     const std::size_t before = logging_test::openDescriptors();
     for (int round = 0; round < 20; ++round) {
         configure(round % 2 == 0 ? toSecond_ : toFirst_);
-        surroundings_.advance(1000);
+        environment_.advance(1000);
         write("two");
         EXPECT_EQ(logging_test::openDescriptors(), before);
     }
@@ -81,13 +81,13 @@ TEST_F(LoggerReloadTest, OpensAClosedChannelAndClosesAnOpenOne) {
     configure("log.sink = off\n");
     write(failure);
     configure(toFirst_);
-    surroundings_.advance(1000);
+    environment_.advance(1000);
     write("one");
     configure("log.sink = off\n");
-    surroundings_.advance(1000);
+    environment_.advance(1000);
     write("two");
     EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one"));
-    EXPECT_THAT(surroundings_.takeSystemLog(), IsEmpty());
+    EXPECT_THAT(environment_.takeSystemLog(), IsEmpty());
 }
 
 TEST_F(LoggerReloadTest, KeepsCountingLostRecordsWhenOnlyTheLevelChanges) {
@@ -96,24 +96,24 @@ TEST_F(LoggerReloadTest, KeepsCountingLostRecordsWhenOnlyTheLevelChanges) {
     configure(sink);
     write("lost");
     configure(sink + "log.level = 4000\n");
-    surroundings_.advance(1000);
+    environment_.advance(1000);
     write("lost");
     std::filesystem::create_directory(folder_ / "var");
     write("one");
     EXPECT_THAT(textsOf(readFile(file)),
                 ElementsAre("2 records were dropped: No such file or directory", "one"));
-    EXPECT_EQ(surroundings_.takeSystemLog().size(), 1u);
+    EXPECT_EQ(environment_.takeSystemLog().size(), 1u);
 }
 
 TEST_F(LoggerReloadTest, ReportsErrorsOnceAndKeepsTheDefaults) {
     configure(toFirst_ + "log.level = high\n");
     for (int count = 0; count < 10; ++count) {
         write(count == 5 ? failure : "one");
-        surroundings_.advance(1000);
+        environment_.advance(1000);
     }
     EXPECT_FALSE(std::filesystem::exists(first_));
     EXPECT_THAT(
-        surroundings_.takeSystemLog(),
+        environment_.takeSystemLog(),
         ElementsAre(
             warning + path_ + ":3: log.level must be a number from 0 to 999999, not \"high\"",
             warning + path_ + ": not in force; the defaults hold",
@@ -124,11 +124,11 @@ TEST_F(LoggerReloadTest, ReportsErrorsOnceAndKeepsTheDefaults) {
 TEST_F(LoggerReloadTest, ReportsAgainWhenTheFileChangesAndIsStillWrong) {
     configure("x\n");
     write("one");
-    surroundings_.takeSystemLog();
+    environment_.takeSystemLog();
     configure("y\n");
-    surroundings_.advance(1000);
+    environment_.advance(1000);
     write("one");
-    EXPECT_THAT(surroundings_.takeSystemLog(),
+    EXPECT_THAT(environment_.takeSystemLog(),
                 ElementsAre(warning + path_ + ":1: not of the form KEY = VALUE: \"y\"",
                             warning + path_ + ": not in force; the defaults hold"));
 }
@@ -137,10 +137,10 @@ TEST_F(LoggerReloadTest, GoesBackToTheDefaultsWhenAGoodFileBecomesABadOne) {
     configure(toFirst_);
     write("one");
     configure(toFirst_ + "nonsense\n");
-    surroundings_.advance(1000);
+    environment_.advance(1000);
     write("two");
     configure(toFirst_);
-    surroundings_.advance(1000);
+    environment_.advance(1000);
     write("three");
     EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one", "three"));
 }
@@ -148,19 +148,19 @@ TEST_F(LoggerReloadTest, GoesBackToTheDefaultsWhenAGoodFileBecomesABadOne) {
 TEST_F(LoggerReloadTest, ReportsAMissingFileOnceIfItWasAskedFor) {
     for (int count = 0; count < 10; ++count) {
         write("one");
-        surroundings_.advance(1000);
+        environment_.advance(1000);
     }
-    EXPECT_THAT(surroundings_.takeSystemLog(),
+    EXPECT_THAT(environment_.takeSystemLog(),
                 ElementsAre(warning + path_ + ": cannot be read: No such file or directory",
                             warning + path_ + ": not in force; the defaults hold"));
 }
 
 TEST_F(LoggerReloadTest, SaysNothingAboutAMissingFileOfTheSystem) {
-    surroundings_.source.required = false;
+    environment_.source.required = false;
     write("one");
-    EXPECT_THAT(surroundings_.takeSystemLog(), IsEmpty());
+    EXPECT_THAT(environment_.takeSystemLog(), IsEmpty());
     configure(toFirst_);
-    surroundings_.advance(1000);
+    environment_.advance(1000);
     write("two");
     EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("two"));
 }
@@ -172,7 +172,7 @@ TEST_F(LoggerReloadTest, LetsGoOfItsFileWhenAConfigurationIsPutInForce) {
     logger_.use(ZBLog::Configuration());
     EXPECT_EQ(logging_test::openDescriptors(), before);
     configure(toSecond_);
-    surroundings_.advance(1000);
+    environment_.advance(1000);
     write("two");
     EXPECT_FALSE(std::filesystem::exists(second_));
 }

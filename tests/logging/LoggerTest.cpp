@@ -32,8 +32,8 @@ class LoggerTest : public testing::Test {
     std::vector<std::string> traced() const { return textsOf(readFile(trace_)); }
 
     logging_test::TemporaryFolder folder_;
-    logging_test::FakeSurroundings surroundings_;
-    ZBLog::Logger logger_{surroundings_};
+    logging_test::FakeEnvironment environment_;
+    ZBLog::Logger logger_{environment_};
     const std::string log_ = folder_ / "log";
     const std::string trace_ = folder_ / "trace";
 };
@@ -45,7 +45,7 @@ TEST_F(LoggerTest, SendsFailuresToTheSystemsLogWithoutAnyConfiguration) {
         write("ENTERING: G() in A [Line: 3],Parameters List: P", 3000, channel);
         write("ENTERING: G() in A [Line: 3]", 4000, channel);
     }
-    EXPECT_THAT(surroundings_.takeSystemLog(),
+    EXPECT_THAT(environment_.takeSystemLog(),
                 ElementsAre(std::to_string(LOG_DAEMON | LOG_ERR) +
                             " korva-osstatus: log 3000 Zumbrel.Test work Work.cpp:12 MESSAGE "
                             "[File: Work.cpp, Line: 12]: it broke"));
@@ -118,15 +118,15 @@ TEST_F(LoggerTest, SendsEachChannelToItsOwnSink) {
     write("one", 3000, Channel::log);
     write("two", 3000, Channel::trace);
     EXPECT_THAT(textsOf(testing::internal::GetCapturedStderr()), ElementsAre("one"));
-    EXPECT_THAT(surroundings_.takeSystemLog(), ElementsAre(testing::EndsWith(" two")));
+    EXPECT_THAT(environment_.takeSystemLog(), ElementsAre(testing::EndsWith(" two")));
 }
 
 TEST_F(LoggerTest, WritesNothingWhereTheSinkIsOff) {
     Configuration configuration;
-    configuration.of(Channel::log) = everythingTo(Destination::nowhere);
+    configuration.of(Channel::log) = everythingTo(Destination::off);
     logger_.use(configuration);
     write(failure, 3000);
-    EXPECT_TRUE(surroundings_.takeSystemLog().empty());
+    EXPECT_TRUE(environment_.takeSystemLog().empty());
 }
 
 TEST_F(LoggerTest, LeavesErrnoAlone) {
@@ -136,22 +136,22 @@ TEST_F(LoggerTest, LeavesErrnoAlone) {
     errno = 4242;
     write("lost", 3000);
     EXPECT_EQ(errno, 4242);
-    EXPECT_EQ(surroundings_.takeSystemLog().size(), 1u);
+    EXPECT_EQ(environment_.takeSystemLog().size(), 1u);
 }
 
 TEST_F(LoggerTest, LeavesErrnoAloneWhenItReadsItsConfiguration) {
-    surroundings_.source = {folder_ / "missing.conf", true};
+    environment_.source = {folder_ / "missing.conf", true};
     errno = 4242;
     write("filtered", 4000);
     EXPECT_EQ(errno, 4242);
-    EXPECT_EQ(surroundings_.takeSystemLog().size(), 2u);
+    EXPECT_EQ(environment_.takeSystemLog().size(), 2u);
 }
 
 TEST_F(LoggerTest, ClosesItsFilesAndDropsRecordsAfterItsEnd) {
     Configuration configuration;
     configuration.of(Channel::log) = everythingTo(Destination::file, log_);
-    surroundings_.source = {folder_ / "zblog.conf", true};
-    logging_test::writeFile(surroundings_.source.path, "log.sink = file:" + log_ + "\n");
+    environment_.source = {folder_ / "zblog.conf", true};
+    logging_test::writeFile(environment_.source.path, "log.sink = file:" + log_ + "\n");
     const std::size_t before = logging_test::openDescriptors();
     logger_.use(configuration);
     write("one", 3000);
@@ -161,7 +161,7 @@ TEST_F(LoggerTest, ClosesItsFilesAndDropsRecordsAfterItsEnd) {
     write("two", 3000);
     logger_.use(configuration);
     write("three", 3000);
-    surroundings_.advance(1000);
+    environment_.advance(1000);
     write("four", 3000);
     logger_.close();
     EXPECT_THAT(logged(), ElementsAre("one"));

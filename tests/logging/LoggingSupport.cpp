@@ -23,7 +23,7 @@ TemporaryFolder::~TemporaryFolder() {
     std::filesystem::remove_all(path_, ignored);
 }
 
-timespec FakeSurroundings::utc() noexcept {
+timespec FakeEnvironment::utc() noexcept {
     if (stoppedAt_ != 0) return {stoppedAt_, 0};
     timespec now{};
     ::clock_gettime(CLOCK_REALTIME, &now);
@@ -31,12 +31,12 @@ timespec FakeSurroundings::utc() noexcept {
     return now;
 }
 
-void FakeSurroundings::writeSystemLog(int priority, const char* text) noexcept {
+void FakeEnvironment::writeSystemLog(int priority, const char* text) noexcept {
     const std::lock_guard<std::mutex> lock(mutex_);
     lines_.push_back(std::to_string(priority) + " " + text);
 }
 
-std::vector<std::string> FakeSurroundings::takeSystemLog() {
+std::vector<std::string> FakeEnvironment::takeSystemLog() {
     const std::lock_guard<std::mutex> lock(mutex_);
     return std::exchange(lines_, {});
 }

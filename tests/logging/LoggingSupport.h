@@ -8,8 +8,8 @@
 #include <vector>
 
 #include "framework/logging/Configuration.h"
+#include "framework/logging/Environment.h"
 #include "framework/logging/Record.h"
-#include "framework/logging/Surroundings.h"
 
 namespace logging_test {
 
@@ -30,7 +30,7 @@ class TemporaryFolder {
 
 /// Surroundings whose clocks stand still until they are moved, and whose system log is a list of
 /// lines, each "PRIORITY TEXT".
-class FakeSurroundings final : public ZBLog::Surroundings {
+class FakeEnvironment final : public ZBLog::Environment {
   public:
     std::uint32_t milliseconds() noexcept override { return milliseconds_; }
     timespec utc() noexcept override;

@@ -32,9 +32,9 @@ TEST(ReadError, OfAConfigurationFileIsTold) {
     logging_test::writeFile(folder / "zblog.conf", "log.level = 1\n");
     const int status = logging_test::inChildProcess([&] {
         if (!failReads()) return 1;
-        logging_test::FakeSurroundings surroundings;
-        ZBLog::ConfigurationFile file({folder / "zblog.conf", false}, surroundings);
-        const auto news = file.news();
+        logging_test::FakeEnvironment environment;
+        ZBLog::ConfigurationFile file({folder / "zblog.conf", false}, environment);
+        const auto news = file.readIfChanged();
         if (!news || news->errors.size() != 1) return 2;
         return news->errors[0].message == "cannot be read: Input/output error" ? 0 : 3;
     });

@@ -1,4 +1,4 @@
-#include "framework/logging/StandardErrorSink.h"
+#include "framework/logging/Sinks.h"
 
 #include <fcntl.h>
 #include <gmock/gmock.h>
@@ -68,8 +68,8 @@ struct Datagrams : Pair {
 
 class StandardErrorSinkTest : public testing::Test {
   protected:
-    logging_test::FakeSurroundings surroundings_;
-    ZBLog::StandardErrorSink sink_{surroundings_};
+    logging_test::FakeEnvironment environment_;
+    ZBLog::StandardErrorSink sink_{environment_};
 };
 
 TEST_F(StandardErrorSinkTest, WritesLines) {
@@ -119,7 +119,7 @@ TEST_P(BrokenPipe, RaisesNoSignal) {
         ::pthread_sigmask(SIG_SETMASK, nullptr, &mask);
         if (::sigismember(&pending, SIGPIPE) != 0 || ::sigismember(&mask, SIGPIPE) != 0) return 1;
         const std::vector<std::string> expected{warning + "Broken pipe" + tillAgain};
-        return surroundings_.takeSystemLog() == expected ? 0 : 2;
+        return environment_.takeSystemLog() == expected ? 0 : 2;
     });
     EXPECT_EQ(status, 0);
 }
@@ -148,7 +148,7 @@ TEST_F(StandardErrorSinkTest, ClosedStandardErrorIsToldOnce) {
     sink_.write(record("lost"));
     ::dup2(former, STDERR_FILENO);
     ::close(former);
-    EXPECT_THAT(surroundings_.takeSystemLog(),
+    EXPECT_THAT(environment_.takeSystemLog(),
                 ElementsAre(warning + "Bad file descriptor" + tillAgain));
 }
 
@@ -165,7 +165,7 @@ TEST_F(StandardErrorSinkTest, LosesPatienceWithAFullPipeOnceAndGoesOnWhenItIsRea
         const auto waited = Clock::now() - start;
         EXPECT_GE(waited, std::chrono::milliseconds(1900));
         EXPECT_LT(waited, std::chrono::milliseconds(3900));
-        EXPECT_THAT(surroundings_.takeSystemLog(),
+        EXPECT_THAT(environment_.takeSystemLog(),
                     ElementsAre(warning + "Connection timed out" + tillAgain));
 
         pipe.drain();
@@ -198,7 +198,7 @@ TEST_F(StandardErrorSinkTest, WaitsOnWhenASignalInterruptsIt) {
     received += pipe.receive();
     received.erase(0, received.find_first_not_of('\n'));  // what filled the pipe
     EXPECT_THAT(textsOf(received), ElementsAre("one"));
-    EXPECT_TRUE(surroundings_.takeSystemLog().empty());
+    EXPECT_TRUE(environment_.takeSystemLog().empty());
 }
 
 TEST_F(StandardErrorSinkTest, ChildOfAForkInTheMiddleOfAWriteIsNotHeldUpForLong) {
@@ -209,7 +209,7 @@ TEST_F(StandardErrorSinkTest, ChildOfAForkInTheMiddleOfAWriteIsNotHeldUpForLong)
     std::this_thread::sleep_for(std::chrono::milliseconds(300));
     const int status = logging_test::inChildProcess([&] {
         for (int count = 0; count < 100; ++count) sink_.write(record("of the child"));
-        return surroundings_.takeSystemLog().size() == 1 ? 0 : 1;
+        return environment_.takeSystemLog().size() == 1 ? 0 : 1;
     });
     writer.join();
     EXPECT_EQ(status, 0);

@@ -10,7 +10,7 @@
 #include <array>
 #include <cstring>
 
-#include "framework/logging/SystemLogSink.h"
+#include "framework/logging/Sinks.h"
 #include "tests/logging/LoggingSupport.h"
 
 namespace {
@@ -59,8 +59,8 @@ TEST(SystemLog, ReceivesEachRecordAsADatagramUnderTheNameOfTheProcess) {
         const int listener = listenAtTheSystemsLog();
         if (listener < 0) return 1;
         ::openlog("cimserver", LOG_PID, LOG_LOCAL0);
-        ZBLog::HostSurroundings surroundings;
-        ZBLog::SystemLogSink sink(surroundings);
+        ZBLog::HostEnvironment environment;
+        ZBLog::SystemLogSink sink(environment);
         sink.write(record("MESSAGE [File: A, Line: 9]: 100 %s full"));
         sink.write(record("VARIABLE: x", 4000));
         writeFile(folder / "message", receivedBy(listener));

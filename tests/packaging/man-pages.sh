@@ -61,7 +61,7 @@ PageOfTheRegisterCommandHasItsOptions() {
 }
 
 PageOfTheConfigurationHasItsKeys() {
-    grep -o '{"[a-z]*\.[a-z]*", Channel' "$KORVA_SOURCE_DIR/framework/logging/ConfigurationParser.cpp" |
+    grep -o '{"[a-z]*\.[a-z]*", Channel' "$KORVA_SOURCE_DIR/framework/logging/Configuration.cpp" |
         cut -d '"' -f 2 | sort >"$work/keys"
     expect_equal keys "$(cat "$work/keys")" \
         "$(sed -n 's/^\.It Cm \(log\.[a-z]*\) , \(trace\.[a-z]*\)$/\1 \2/p' "$pages/zblog.conf.5" | tr ' ' '\n' | sort)"

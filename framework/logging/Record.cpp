@@ -1,8 +1,11 @@
-#include "RecordLine.h"
+// Lines are for people and for grep: one record, one line, the same fields in the same places
+// whatever a client managed to get into a text. The time is UTC and computed without the C library,
+// whose conversions would touch the time zone of the process.
+#include "Record.h"
 
 #include <syslog.h>
 
-#include "UtcTime.h"
+#include "base/CivilTime.h"
 
 namespace ZBLog {
 
@@ -11,11 +14,30 @@ namespace {
 constexpr std::size_t nameRoom = 256;
 constexpr int coarseLevel = 3000;
 
+void putUtc(LineBuffer& line, const timespec& instant) {
+    const base::CivilTime time = base::civilFromSeconds(instant.tv_sec);
+    const struct {
+        long long value;
+        std::size_t digits;
+        char end;
+    } fields[] = {{time.year, 4, '-'},
+                  {time.month, 2, '-'},
+                  {time.day, 2, 'T'},
+                  {time.hour, 2, ':'},
+                  {time.minute, 2, ':'},
+                  {time.second, 2, '.'},
+                  {instant.tv_nsec / 1000000, 3, 'Z'}};
+    for (const auto& field : fields) {
+        line.putNumber(field.value, field.digits);
+        line.put(field.end);
+    }
+}
+
 void putName(LineBuffer& line, std::string_view name) {
     if (name.empty()) {
         line.put('-');
     } else {
-        line.putEscaped(name, nameRoom, LineBuffer::Blanks::escaped);
+        line.putEscaped(name, nameRoom, base::EscapeStyle::logField);
     }
 }
 

@@ -1,5 +1,5 @@
-#ifndef ZBLOG_SURROUNDINGS_H
-#define ZBLOG_SURROUNDINGS_H
+#ifndef FRAMEWORK_LOGGING_ENVIRONMENT_H
+#define FRAMEWORK_LOGGING_ENVIRONMENT_H
 
 #include <cstdint>
 #include <ctime>
@@ -19,7 +19,7 @@ ConfigurationSource configurationSourceFrom(const char* variable);
 
 /// What the library needs of the process and the host around it, apart from files. Tests put
 /// their own in its place. All functions may be called from any number of threads.
-class Surroundings {
+class Environment {
   public:
     /// A steady time in milliseconds that wraps around, read without a system call; it may lag by
     /// a few milliseconds.
@@ -31,19 +31,19 @@ class Surroundings {
     /// Hands one line to the system's log. `priority` contains the facility.
     virtual void writeSystemLog(int priority, const char* text) noexcept = 0;
 
-    /// Asked once, when the first record comes.
+    /// Asked once, when the first record comes. Throws std::bad_alloc.
     virtual ConfigurationSource configurationSource() = 0;
 
   protected:
-    ~Surroundings() = default;
+    ~Environment() = default;
 };
 
-/// The real ones.
+/// The real one.
 ///
 /// The system's log is only written to: its name, options and mask belong to the process, so
 /// openlog, closelog and setlogmask are never called. The C library's own syslog keeps a connection
 /// of the process and looks at the time zone, as it does for the process's own lines.
-class HostSurroundings final : public Surroundings {
+class HostEnvironment final : public Environment {
   public:
     std::uint32_t milliseconds() noexcept override;
     timespec utc() noexcept override;

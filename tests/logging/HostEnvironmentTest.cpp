@@ -2,7 +2,7 @@
 
 #include <chrono>
 
-#include "framework/logging/Surroundings.h"
+#include "framework/logging/Environment.h"
 
 namespace {
 
@@ -12,8 +12,8 @@ long long millisecondsOf(Clock) {
         .count();
 }
 
-TEST(HostSurroundings, CountMillisecondsSteadily) {
-    ZBLog::HostSurroundings host;
+TEST(HostEnvironment, CountMillisecondsSteadily) {
+    ZBLog::HostEnvironment host;
     constexpr std::uint32_t lag = 50;
     for (int round = 0; round < 20; ++round) {
         const auto before = static_cast<std::uint32_t>(millisecondsOf(std::chrono::steady_clock{}));
@@ -23,8 +23,8 @@ TEST(HostSurroundings, CountMillisecondsSteadily) {
     }
 }
 
-TEST(HostSurroundings, TellTheTimeOfDay) {
-    ZBLog::HostSurroundings host;
+TEST(HostEnvironment, TellTheTimeOfDay) {
+    ZBLog::HostEnvironment host;
     const long long before = millisecondsOf(std::chrono::system_clock{});
     const timespec told = host.utc();
     const long long after = millisecondsOf(std::chrono::system_clock{});

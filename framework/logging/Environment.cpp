@@ -1,8 +1,10 @@
+// All that tests replace stands behind one interface. The steady clock is the coarse one: almost
+// every record asks for the time, to learn that the configuration need not be looked at yet.
+#include "Environment.h"
+
 #include <syslog.h>
 
 #include <cstdlib>
-
-#include "Surroundings.h"
 
 namespace ZBLog {
 
@@ -11,24 +13,24 @@ ConfigurationSource configurationSourceFrom(const char* variable) {
     return {variable, true};
 }
 
-std::uint32_t HostSurroundings::milliseconds() noexcept {
+std::uint32_t HostEnvironment::milliseconds() noexcept {
     timespec now{};
     ::clock_gettime(CLOCK_MONOTONIC_COARSE, &now);
     return static_cast<std::uint32_t>(now.tv_sec) * 1000u +
            static_cast<std::uint32_t>(now.tv_nsec / 1000000);
 }
 
-timespec HostSurroundings::utc() noexcept {
+timespec HostEnvironment::utc() noexcept {
     timespec now{};
     ::clock_gettime(CLOCK_REALTIME, &now);
     return now;
 }
 
-void HostSurroundings::writeSystemLog(int priority, const char* text) noexcept {
+void HostEnvironment::writeSystemLog(int priority, const char* text) noexcept {
     ::syslog(priority, "%s", text);
 }
 
-ConfigurationSource HostSurroundings::configurationSource() {
+ConfigurationSource HostEnvironment::configurationSource() {
     return configurationSourceFrom(::secure_getenv("ZBLOG_CONF"));
 }
 

@@ -1,4 +1,4 @@
-#include "framework/logging/IdlePool.h"
+#include "framework/logging/ObjectPool.h"
 
 #include <gtest/gtest.h>
 
@@ -16,9 +16,9 @@ struct Counted {
     std::atomic<bool> inUse{false};
 };
 
-using Pool = ZBLog::IdlePool<Counted, 4>;
+using Pool = ZBLog::ObjectPool<Counted, 4>;
 
-TEST(IdlePool, GivesBackWhatItWasGiven) {
+TEST(ObjectPool, GivesBackWhatItWasGiven) {
     Pool pool;
     EXPECT_EQ(pool.take(), nullptr);
     auto object = std::make_unique<Counted>();
@@ -29,7 +29,7 @@ TEST(IdlePool, GivesBackWhatItWasGiven) {
     EXPECT_EQ(living, 0);
 }
 
-TEST(IdlePool, KeepsAsManyAsItHasPlaces) {
+TEST(ObjectPool, KeepsAsManyAsItHasPlaces) {
     Pool pool;
     for (int count = 0; count < 10; ++count) pool.give(std::make_unique<Counted>());
     EXPECT_EQ(living, 4);
@@ -37,7 +37,7 @@ TEST(IdlePool, KeepsAsManyAsItHasPlaces) {
     EXPECT_EQ(living, 0);
 }
 
-TEST(IdlePool, KeepsNothingAfterItsEnd) {
+TEST(ObjectPool, KeepsNothingAfterItsEnd) {
     Pool pool;
     pool.close();
     pool.give(std::make_unique<Counted>());
@@ -45,7 +45,7 @@ TEST(IdlePool, KeepsNothingAfterItsEnd) {
     EXPECT_EQ(pool.take(), nullptr);
 }
 
-TEST(IdlePool, NeverLendsAnObjectTwice) {
+TEST(ObjectPool, NeverLendsAnObjectTwice) {
     Pool pool;
     std::atomic<int> shared{0};
     std::vector<std::thread> users;

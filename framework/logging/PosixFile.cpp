@@ -1,5 +1,8 @@
-#include "WholeWrite.h"
+// Files in a process that belongs to somebody else: it may close our descriptors, dies of signals
+// that we cause, and expects its standard streams where it left them.
+#include "PosixFile.h"
 
+#include <fcntl.h>
 #include <signal.h>
 #include <unistd.h>
 
@@ -9,6 +12,12 @@
 namespace ZBLog {
 
 namespace {
+
+/// The same file under a number that is none of the standard streams'; errno tells why not.
+base::FileDescriptor beyondStandardStreams(base::FileDescriptor opened) {
+    if (!opened.isOpen() || opened.number() > STDERR_FILENO) return opened;
+    return base::FileDescriptor(::fcntl(opened.number(), F_DUPFD_CLOEXEC, STDERR_FILENO + 1));
+}
 
 /// Keeps the signals of failing writes off this thread while it lives.
 class WriteSignals {
@@ -52,7 +61,24 @@ class WriteSignals {
 
 }  // namespace
 
-WriteResult writeWhole(int descriptor, std::string_view bytes) noexcept {
+int PosixFile::open(const char* path, int flags, mode_t mode) noexcept {
+    close();
+    descriptor_ = beyondStandardStreams(base::FileDescriptor::open(path, flags, mode));
+    return descriptor_.isOpen() && ::fstat(number(), &status_) == 0 ? 0 : errno;
+}
+
+void PosixFile::close() noexcept {
+    if (!isOpen()) static_cast<void>(descriptor_.release());
+    descriptor_.reset();
+}
+
+bool PosixFile::isOpen() const noexcept {
+    struct stat now {};
+    return descriptor_.isOpen() && ::fstat(number(), &now) == 0 &&
+           FileIdentity::of(now) == FileIdentity::of(status_);
+}
+
+WriteResult writeFully(int descriptor, std::string_view bytes) noexcept {
     const WriteSignals signals;
     std::size_t written = 0;
     while (written < bytes.size()) {

@@ -1,4 +1,4 @@
-#include "framework/logging/RecordLine.h"
+#include "framework/logging/Record.h"
 
 #include <gtest/gtest.h>
 #include <syslog.h>
@@ -11,9 +11,9 @@ using ZBLog::Channel;
 using ZBLog::LineBuffer;
 using ZBLog::Record;
 
-std::string lineOf(const Record& record) {
+std::string lineOf(const Record& record, timespec instant = {1709251199, 123456789}) {
     LineBuffer line;
-    ZBLog::formatLine(line, record, {{1709251199, 123456789}, 4711, 4713});
+    ZBLog::formatLine(line, record, {instant, 4711, 4713});
     return std::string(line.line());
 }
 
@@ -31,6 +31,26 @@ TEST(RecordLine, HoldsEveryFieldInOrder) {
         "OperatingSystem_GetInstance OperatingSystemProvider.cpp:77 METHOD: B() was invoked\n");
     EXPECT_EQ(lineOf({Channel::trace, "f", "F.cpp", 1, "C", 3000, "text"}),
               "2024-02-29T23:59:59.123Z 4711 4713 trace 3000 C f F.cpp:1 text\n");
+}
+
+TEST(RecordLine, BeginsWithItsTimeInUtcWithMilliseconds) {
+    const struct {
+        timespec instant;
+        const char* expected;
+    } rows[] = {
+        {{0, 0}, "1970-01-01T00:00:00.000Z"},
+        {{1000000000, 999999999}, "2001-09-09T01:46:40.999Z"},
+        {{1709251199, 7000000}, "2024-02-29T23:59:59.007Z"},
+        {{1709251200, 0}, "2024-03-01T00:00:00.000Z"},
+        {{4107542400, 0}, "2100-03-01T00:00:00.000Z"},
+        {{-1, 500000000}, "1969-12-31T23:59:59.500Z"},
+        {{253402300799, 0}, "9999-12-31T23:59:59.000Z"},
+    };
+    for (const auto& row : rows) {
+        const std::string line =
+            lineOf({Channel::log, "f", "F.cpp", 1, "C", 3000, ""}, row.instant);
+        EXPECT_EQ(line.substr(0, line.find(' ')), row.expected);
+    }
 }
 
 TEST(RecordLine, PrintsADashForNamesThatAreMissing) {
