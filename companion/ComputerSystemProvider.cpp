@@ -1,19 +1,65 @@
+// The computer system is somebody else's class: a host whose object manager has no provider of it
+// gets this one, so that the operating system's associations have their other end. It serves one
+// instance, the host itself, under the name that the provider of the operating system uses.
+
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
 #include <cmpi/cmpimacs.h>
-#include <strings.h>
 
 #include <optional>
 #include <string>
 
-#include "ComputerSystem.h"
+#include "Instrumentation.h"
 #include "ProviderUtilities.h"
+#include "base/Ascii.h"
 
 using Utilities = VA::ProviderUtilities;
 
 static const CMPIBroker* broker;
 
 namespace {
+
+constexpr const char* className = "KORVA_ComputerSystem";
+
+// The host's name; none where it is not known, and then no computer system is served.
+std::optional<std::string> hostName() {
+    VA::Instrumentation instrumentation;
+    instrumentation.selectNode(VA::NodeLexicon::OperatingSystemNode);
+    std::string name;
+    if (!instrumentation.getComputerName(name)) return std::nullopt;
+    return name;
+}
+
+// The computer system's path or instance, in the namespace of the path that was asked for; null
+// when the broker makes none.
+CMPIObjectPath* makePath(const CMPIObjectPath* asked, const std::string& name) {
+    CMPIObjectPath* path =
+        Utilities::createObjectPath(broker, className, Utilities::getNamespace(asked));
+    Utilities::setKeyProperty(path, "CreationClassName", className);
+    Utilities::setKeyProperty(path, "Name", name);
+    return path;
+}
+
+// Nobody measures the state of the computer system, its health or its purpose: those properties are
+// left out.
+CMPIInstance* makeInstance(const CMPIObjectPath* asked, const std::string& name) {
+    CMPIInstance* instance = Utilities::createInstance(broker, makePath(asked, name));
+    std::string elementName = name;
+    std::string nameFormat = "Other";
+    Utilities::setProperty(instance, "ElementName", elementName);
+    Utilities::setProperty(instance, "NameFormat", nameFormat);
+    return instance;
+}
+
+// Whether the path names this computer system: by its keys, which compare as object managers give
+// them, the creation class name without letter case.
+bool names(const CMPIObjectPath* path, const std::string& name) {
+    std::string creationClassName;
+    std::string key;
+    return Utilities::getKeyProperty(path, "Name", key) && key == name &&
+           (!Utilities::getKeyProperty(path, "CreationClassName", creationClassName) ||
+            base::equalsIgnoreCase(creationClassName, className));
+}
 
 CMPIStatus status(CMPIrc rc) {
     return {rc, nullptr};
@@ -23,7 +69,7 @@ CMPIStatus status(CMPIrc rc) {
 template <class Serve>
 CMPIStatus guarded(Serve serve) {
     try {
-        return serve(computersystem::name());
+        return serve(hostName());
     } catch (...) {
         return status(CMPI_RC_ERR_FAILED);
     }
@@ -31,33 +77,20 @@ CMPIStatus guarded(Serve serve) {
 
 // Returns the one object and the end of the results. Object managers do not survive a null.
 template <class Object, class Return>
-CMPIStatus handOver(const CMPIResult* result, Object* object, Return give) {
+CMPIStatus returnResult(const CMPIResult* result, Object* object, Return returnObject) {
     if (object == nullptr) return status(CMPI_RC_ERR_FAILED);
-    const CMPIStatus given = give(result, object);
-    return given.rc == CMPI_RC_OK ? CMReturnDone(result) : given;
+    const CMPIStatus returned = returnObject(result, object);
+    return returned.rc == CMPI_RC_OK ? CMReturnDone(result) : returned;
 }
 
-CMPIStatus handOverPath(const CMPIResult* result, const CMPIObjectPath* asked,
-                        const std::string& name) {
-    return handOver(result, computersystem::makePath(broker, Utilities::getNamespace(asked), name),
-                    result->ft->returnObjectPath);
+CMPIStatus returnPath(const CMPIResult* result, const CMPIObjectPath* asked,
+                      const std::string& name) {
+    return returnResult(result, makePath(asked, name), result->ft->returnObjectPath);
 }
 
-CMPIStatus handOverInstance(const CMPIResult* result, const CMPIObjectPath* asked,
-                            const std::string& name) {
-    return handOver(result,
-                    computersystem::makeInstance(broker, Utilities::getNamespace(asked), name),
-                    result->ft->returnInstance);
-}
-
-// Whether the path names this computer system: by its keys, which compare as object managers give
-// them, the creation class name without letter case.
-bool names(const CMPIObjectPath* path, const std::string& name) {
-    std::string className;
-    std::string key;
-    return Utilities::getKeyProperty(path, "Name", key) && key == name &&
-           (!Utilities::getKeyProperty(path, "CreationClassName", className) ||
-            strcasecmp(className.c_str(), "KORVA_ComputerSystem") == 0);
+CMPIStatus returnInstance(const CMPIResult* result, const CMPIObjectPath* asked,
+                          const std::string& name) {
+    return returnResult(result, makeInstance(asked, name), result->ft->returnInstance);
 }
 
 }  // namespace
@@ -70,7 +103,7 @@ static CMPIStatus ComputerSystem_EnumInstanceNames(CMPIInstanceMI*, const CMPICo
                                                    const CMPIResult* result,
                                                    const CMPIObjectPath* path) {
     return guarded([&](const std::optional<std::string>& name) {
-        return name ? handOverPath(result, path, *name) : CMReturnDone(result);
+        return name ? returnPath(result, path, *name) : CMReturnDone(result);
     });
 }
 
@@ -78,7 +111,7 @@ static CMPIStatus ComputerSystem_EnumInstances(CMPIInstanceMI*, const CMPIContex
                                                const CMPIResult* result, const CMPIObjectPath* path,
                                                const char**) {
     return guarded([&](const std::optional<std::string>& name) {
-        return name ? handOverInstance(result, path, *name) : CMReturnDone(result);
+        return name ? returnInstance(result, path, *name) : CMReturnDone(result);
     });
 }
 
@@ -86,7 +119,7 @@ static CMPIStatus ComputerSystem_GetInstance(CMPIInstanceMI*, const CMPIContext*
                                              const CMPIResult* result, const CMPIObjectPath* path,
                                              const char**) {
     return guarded([&](const std::optional<std::string>& name) {
-        return name && names(path, *name) ? handOverInstance(result, path, *name)
+        return name && names(path, *name) ? returnInstance(result, path, *name)
                                           : status(CMPI_RC_ERR_NOT_FOUND);
     });
 }

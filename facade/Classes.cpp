@@ -1,8 +1,12 @@
+// What the schema says of the classes, as a table: an object manager need not tell a provider about
+// ancestors, and asking one for each request would be slow.
+
 #include "Classes.h"
 
 #include <algorithm>
 
-#include "Names.h"
+#include "Refusal.h"
+#include "base/Ascii.h"
 
 namespace VA::OSStatusFacade {
 
@@ -54,26 +58,67 @@ constexpr Association associationTable[] = {
 }  // namespace
 
 bool Class::isA(std::string_view other) const {
-    return equalNames(name, other) ||
-           std::any_of(ancestors.begin(), ancestors.end(),
-                       [other](const char* ancestor) { return equalNames(ancestor, other); });
+    return base::equalsIgnoreCase(name, other) ||
+           std::any_of(ancestors.begin(), ancestors.end(), [other](const char* ancestor) {
+               return base::equalsIgnoreCase(ancestor, other);
+           });
 }
 
 const Key* Class::key(std::string_view wanted) const {
     const Key* const found = std::find_if(keys.begin(), keys.end(), [wanted](const Key& each) {
-        return equalNames(each.name, wanted);
+        return base::equalsIgnoreCase(each.name, wanted);
     });
     return found == keys.end() ? nullptr : found;
 }
 
 const Class* findClass(std::string_view name) {
     for (const Class& each : classes)
-        if (equalNames(each.name, name)) return &each;
+        if (base::equalsIgnoreCase(each.name, name)) return &each;
     return nullptr;
 }
 
-Rows<Association> associations() {
+base::Span<const Association> associations() {
     return associationTable;
+}
+
+namespace {
+
+// What associations refer to has no references itself; that also limits the depth.
+std::string referenceProblem(const CMPIObjectPath* reference) {
+    const std::vector<KeyBinding> bindings = keysOf(reference);
+    for (const KeyBinding& key : bindings)
+        if (key.reference() != nullptr) return "key " + printable(key.name) + " is a reference";
+    const Class* const known = findClass(classNameOf(reference));
+    return known == nullptr ? "" : keyProblem(*known, bindings);
+}
+
+std::string valueProblem(const Key& key, const KeyBinding& binding) {
+    if (!key.isReference)
+        return binding.text() ? "" : std::string("key ") + key.name + " is no text";
+    if (binding.reference() == nullptr) return std::string("key ") + key.name + " is no reference";
+    const std::string problem = referenceProblem(binding.reference());
+    return problem.empty() ? "" : std::string(key.name) + ": " + problem;
+}
+
+}  // namespace
+
+std::string keyProblem(const Class& itsClass, const std::vector<KeyBinding>& bindings) {
+    const std::string of = std::string(" of ") + itsClass.name;
+    for (const KeyBinding& binding : bindings)
+        if (itsClass.key(binding.name) == nullptr)
+            return std::string(itsClass.name) + " has no key " + printable(binding.name);
+    for (const Key& key : itsClass.keys) {
+        const auto named = [&key](const KeyBinding& each) {
+            return base::equalsIgnoreCase(each.name, key.name);
+        };
+        const auto found = std::find_if(bindings.begin(), bindings.end(), named);
+        if (found == bindings.end()) return std::string("key ") + key.name + of + " is missing";
+        if (std::count_if(bindings.begin(), bindings.end(), named) > 1)
+            return std::string("key ") + key.name + of + " is there twice";
+        const std::string problem = valueProblem(key, *found);
+        if (!problem.empty()) return problem;
+    }
+    return {};
 }
 
 }  // namespace VA::OSStatusFacade

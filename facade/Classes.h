@@ -1,25 +1,14 @@
-#ifndef OSSTATUS_FACADE_CLASSES_H
-#define OSSTATUS_FACADE_CLASSES_H
+#ifndef FACADE_CLASSES_H
+#define FACADE_CLASSES_H
 
-#include <cstddef>
+#include <string>
 #include <string_view>
+#include <vector>
+
+#include "ObjectPath.h"
+#include "base/Span.h"
 
 namespace VA::OSStatusFacade {
-
-/// The rows of a constant table.
-template <class Row>
-class Rows {
-  public:
-    template <std::size_t size>
-    constexpr Rows(const Row (&rows)[size]) : begin_(rows), end_(rows + size) {}
-
-    constexpr const Row* begin() const { return begin_; }
-    constexpr const Row* end() const { return end_; }
-
-  private:
-    const Row* begin_;
-    const Row* end_;
-};
 
 /// A key of a class.
 struct Key {
@@ -30,9 +19,9 @@ struct Key {
 /// A class, as the schema spells it. Nobody is asked about ancestors.
 struct Class {
     const char* name;
-    Rows<const char*> ancestors;
-    Rows<Key> keys;     ///< in the schema's order
-    bool isOfProvider;  ///< the provider behind the facade serves its instances
+    base::Span<const char* const> ancestors;
+    base::Span<const Key> keys;  ///< in the schema's order
+    bool isOfProvider;           ///< the provider behind the facade serves its instances
 
     /// Whether `other` is the class itself or one of its ancestors.
     bool isA(std::string_view other) const;
@@ -57,7 +46,12 @@ struct Association {
 /// The class of that name, null if it is none that is known here.
 const Class* findClass(std::string_view name);
 
-Rows<Association> associations();
+base::Span<const Association> associations();
+
+/// Why these keys of a path of that class can name no instance, as a sentence that names the key:
+/// one is missing, there twice, not of the class or of the wrong type; of references, the same for
+/// the paths they refer to. Empty when all is well.
+std::string keyProblem(const Class& itsClass, const std::vector<KeyBinding>& bindings);
 
 }  // namespace VA::OSStatusFacade
 

@@ -1,3 +1,6 @@
+// What object managers load in the provider's place: two factories, two function tables, and the
+// handlers behind them. No exception leaves a handler, and every failure becomes a status.
+
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
 #include <cxxabi.h>
@@ -5,12 +8,20 @@
 #include <exception>
 #include <string>
 
-#include "AssociationRequests.h"
-#include "InstanceRequests.h"
-#include "Names.h"
-#include "Provider.h"
+#include "Operations.h"
 #include "Refusal.h"
-#include "Request.h"
+
+// The factories of the provider behind the facade, as an object manager would call them: each
+// returns its one record, with the broker that it was given last in use.
+extern "C" {
+
+CMPIInstanceMI* OperatingSystemProvider_Create_InstanceMI(const CMPIBroker* broker,
+                                                          const CMPIContext* context,
+                                                          CMPIStatus* status);
+CMPIAssociationMI* OperatingSystemProvider_Create_AssociationMI(const CMPIBroker* broker,
+                                                                const CMPIContext* context,
+                                                                CMPIStatus* status);
+}
 
 namespace VA::OSStatusFacade {
 
@@ -21,7 +32,7 @@ static Provider provider;
 // the object manager cancels passes here. It may come while the refusal is recorded, too, and that
 // is done outside of the handlers: within one, nobody may catch it.
 template <class Serve>
-static CMPIStatus guarded(Serve serve, Handler handler = Handler::here()) {
+static CMPIStatus guarded(Serve serve, SourceLocation handler = SourceLocation::current()) {
     CMPIrc rc = CMPI_RC_ERR_FAILED;
     Recorded recorded = Recorded::yes;
     const char* text = "unknown exception";
@@ -48,7 +59,8 @@ static CMPIStatus guarded(Serve serve, Handler handler = Handler::here()) {
 // Passes an operation on that is none of a reader's; the provider refuses it.
 template <class Pass>
 static CMPIStatus passedOn(const char* operation, const CMPIObjectPath* path, Pass pass,
-                           Recorded recorded = Recorded::yes, Handler handler = Handler::here()) {
+                           Recorded recorded = Recorded::yes,
+                           SourceLocation handler = SourceLocation::current()) {
     return guarded(
         [&] {
             const CMPIStatus status = pass(provider.instances);

@@ -1,3 +1,6 @@
+// Object managers differ in what they hand out: keys in any order and spelling, numbers where texts
+// are declared, paths without a namespace. Here they become identities, which compare as they are.
+
 #include "ObjectPath.h"
 
 #include <cmpi/cmpift.h>
@@ -6,8 +9,9 @@
 #include <array>
 #include <cstdio>
 
-#include "Names.h"
 #include "Refusal.h"
+#include "base/Ascii.h"
+#include "base/CmpiText.h"
 
 namespace VA::OSStatusFacade {
 
@@ -78,8 +82,9 @@ std::string comparable(const KeyBinding& key, std::string_view nameSpace) {
         return "reference " + textOf(identityOf(reference, nameSpace));
     const std::optional<std::string> text = key.text();
     if (!text) return "type " + std::to_string(key.data.type) + " " + otherValue(key.data);
-    const bool withoutCase = equalNames(key.name, "CSName") || equalNames(key.name, "Name");
-    return "text " + (withoutCase ? lowered(*text) : *text);
+    const bool withoutCase =
+        base::equalsIgnoreCase(key.name, "CSName") || base::equalsIgnoreCase(key.name, "Name");
+    return "text " + (withoutCase ? base::toLower(*text) : *text);
 }
 
 }  // namespace
@@ -115,35 +120,9 @@ const CMPIObjectPath* KeyBinding::reference() const {
 }
 
 std::optional<std::string> KeyBinding::text() const {
-    const CMPIValue& value = data.value;
-    switch (data.type) {
-        case CMPI_string:
-            return charactersOf(value.string);
-        case CMPI_chars:
-            return value.chars;
-        case CMPI_boolean:
-            return value.boolean != 0 ? "true" : "false";
-        case CMPI_uint8:
-            return std::to_string(value.uint8);
-        case CMPI_uint16:
-            return std::to_string(value.uint16);
-        case CMPI_uint32:
-            return std::to_string(value.uint32);
-        case CMPI_uint64:
-            return std::to_string(value.uint64);
-        case CMPI_sint8:
-            return std::to_string(value.sint8);
-        case CMPI_sint16:
-            return std::to_string(value.sint16);
-        case CMPI_sint32:
-            return std::to_string(value.sint32);
-        case CMPI_sint64:
-            return std::to_string(value.sint64);
-        case CMPI_char16:
-            return std::to_string(value.char16);
-        default:
-            return std::nullopt;
-    }
+    if (data.type == CMPI_string) return charactersOf(data.value.string);
+    if (data.type == CMPI_chars) return data.value.chars;
+    return base::scalarText(data);
 }
 
 std::vector<KeyBinding> keysOf(const CMPIObjectPath* path) {
@@ -180,9 +159,9 @@ Identity identityOf(const CMPIObjectPath* path, std::string_view nameSpace) {
     const std::string own = nameSpaceOf(path);
     Identity identity;
     identity.classPath =
-        lowered((own.empty() ? std::string(nameSpace) : own) + ":" + classNameOf(path));
+        base::toLower((own.empty() ? std::string(nameSpace) : own) + ":" + classNameOf(path));
     for (const KeyBinding& key : keysOf(path))
-        identity.keys.emplace_back(lowered(key.name), comparable(key, nameSpace));
+        identity.keys.emplace_back(base::toLower(key.name), comparable(key, nameSpace));
     std::sort(identity.keys.begin(), identity.keys.end());
     return identity;
 }

@@ -1,5 +1,5 @@
-#ifndef OSSTATUS_FACADE_OBJECT_PATH_H
-#define OSSTATUS_FACADE_OBJECT_PATH_H
+#ifndef FACADE_OBJECT_PATH_H
+#define FACADE_OBJECT_PATH_H
 
 #include <cmpi/cmpidt.h>
 

@@ -1,10 +1,12 @@
+// A client hears why a request is refused, and so does the log: the provider itself says nothing.
+
 #include "Refusal.h"
 
 #include <cmpi/cmpift.h>
 #include <cxxabi.h>
 
-#include "Names.h"
 #include "Trace.h"
+#include "base/Utf8.h"
 
 namespace VA::OSStatusFacade {
 
@@ -15,7 +17,7 @@ const std::string category("Zumbrel.OSStatusFacade");
 
 // A message record, since those pass the log as it is shipped. It is put together here: the buffer
 // of VA::trace is shared by all threads.
-void record(const std::string& text, Handler handler) {
+void record(const std::string& text, SourceLocation handler) {
     const std::string whole = std::string("MESSAGE [File: ") + sourceFile +
                               ", Line: " + std::to_string(handler.line) + "]: " + text;
     writeRecord(handler.function, sourceFile, handler.line, category, parameterRecordLevel,
@@ -24,7 +26,12 @@ void record(const std::string& text, Handler handler) {
 
 }  // namespace
 
-CMPIStatus refuse(const CMPIBroker* broker, CMPIrc rc, const char* text, Handler handler,
+std::string printable(std::string_view text, std::size_t most) {
+    const std::string result = base::escape(text.substr(0, most), base::EscapeStyle::ascii);
+    return text.size() > most ? result + "..." : result;
+}
+
+CMPIStatus refuse(const CMPIBroker* broker, CMPIrc rc, const char* text, SourceLocation handler,
                   Recorded recorded) {
     CMPIStatus status = {rc, nullptr};
     try {

@@ -1,12 +1,18 @@
-#ifndef OSSTATUS_FACADE_REFUSAL_H
-#define OSSTATUS_FACADE_REFUSAL_H
+#ifndef FACADE_REFUSAL_H
+#define FACADE_REFUSAL_H
 
 #include <cmpi/cmpidt.h>
 
+#include <cstddef>
 #include <stdexcept>
 #include <string>
+#include <string_view>
+
+#include "base/SourceLocation.h"
 
 namespace VA::OSStatusFacade {
+
+using base::SourceLocation;
 
 /// Whether a refusal leaves a record.
 enum class Recorded { yes, no };
@@ -26,20 +32,13 @@ class Refusal : public std::runtime_error {
     Recorded recorded_;
 };
 
-/// Where a request arrived: the function that the object manager called, and a line of it.
-struct Handler {
-    const char* function;
-    unsigned int line;
-
-    static constexpr Handler here(const char* function = __builtin_FUNCTION(),
-                                  unsigned int line = __builtin_LINE()) {
-        return {function, line};
-    }
-};
+/// A client's text as it may stand in answers and records: bytes other than printable ASCII become
+/// \xNN, and what is longer than `most` bytes is cut, which three dots tell.
+std::string printable(std::string_view text, std::size_t most = 64);
 
 /// Writes the one record of a refused request, if any, and makes its status. Without memory for
 /// record or message, those are left out. Nothing but the end of a cancelled thread passes here.
-CMPIStatus refuse(const CMPIBroker* broker, CMPIrc rc, const char* text, Handler handler,
+CMPIStatus refuse(const CMPIBroker* broker, CMPIrc rc, const char* text, SourceLocation handler,
                   Recorded recorded);
 
 }  // namespace VA::OSStatusFacade

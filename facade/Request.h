@@ -1,17 +1,64 @@
-#ifndef OSSTATUS_FACADE_REQUEST_H
-#define OSSTATUS_FACADE_REQUEST_H
+#ifndef FACADE_REQUEST_H
+#define FACADE_REQUEST_H
 
 #include <cmpi/cmpidt.h>
+#include <cmpi/cmpift.h>
 
+#include <atomic>
 #include <string>
 #include <vector>
 
-#include "Answer.h"
 #include "Classes.h"
 #include "ObjectPath.h"
-#include "Provider.h"
 
 namespace VA::OSStatusFacade {
+
+/// What the factories leave for the requests. An object manager may call a factory again, for
+/// another class, while threads serve requests.
+struct Provider {
+    std::atomic<const CMPIBroker*> broker = nullptr;
+    std::atomic<CMPIInstanceMI*> instances = nullptr;
+    std::atomic<CMPIAssociationMI*> associations = nullptr;
+};
+
+/// What the provider returned to one question. The elements belong to the broker, as all that a
+/// provider returns.
+class Answer {
+  public:
+    /// Calls `ask` with a CMPIResult that gathers here; `ask` returns the provider's status. Throws
+    /// std::bad_alloc when something that was returned found no room, and what `ask` throws.
+    template <class Ask>
+    explicit Answer(Ask ask) : status_(ask(&result_)) {
+        requireRoom();
+    }
+    Answer(const Answer&) = delete;
+    Answer& operator=(const Answer&) = delete;
+
+    CMPIrc rc() const { return status_.rc; }
+
+    /// Nulls are left out.
+    const std::vector<const CMPIObjectPath*>& paths() const { return paths_; }
+    const std::vector<const CMPIInstance*>& instances() const { return instances_; }
+    bool isEmpty() const { return paths_.empty() && instances_.empty(); }
+
+    /// Whether the provider said that it is done. It does not when its walk broke off, and the
+    /// status is OK all the same.
+    bool isDone() const { return done_; }
+
+  private:
+    struct Table;
+    static const CMPIResultFT table;
+
+    void requireRoom() const;
+
+    // CMPI has no const here; nobody writes the table.
+    CMPIResult result_ = {this, const_cast<CMPIResultFT*>(&table)};
+    std::vector<const CMPIObjectPath*> paths_;
+    std::vector<const CMPIInstance*> instances_;
+    bool done_ = false;
+    bool full_ = false;
+    CMPIStatus status_;
+};
 
 /// One request of a client, and what it may ask the provider. What the client's result says to
 /// what it is given is ignored.
@@ -23,7 +70,6 @@ class Request {
 
     const CMPIBroker* broker() const { return provider_.broker; }
     const CMPIContext* context() const { return context_; }
-    const CMPIResult* result() const { return result_; }
     const CMPIObjectPath* path() const { return path_; }
     /// The class as the client wrote it, and what is known of it: null for an unknown one.
     const std::string& className() const { return className_; }
@@ -38,10 +84,11 @@ class Request {
     Answer enumerateInstances(const CMPIObjectPath* path) const;
     Answer getInstance(const CMPIObjectPath* path) const;
 
-    /// Hands over what there is and says that it is done. The property list is applied; null stands
-    /// for all properties.
-    void deliver(const std::vector<const CMPIObjectPath*>& paths) const;
-    void deliver(const std::vector<const CMPIInstance*>& instances, const char** properties) const;
+    /// Give the results to the client and say that this is all. The property list is applied; null
+    /// stands for all properties.
+    void returnPaths(const std::vector<const CMPIObjectPath*>& paths) const;
+    void returnInstances(const std::vector<const CMPIInstance*>& instances,
+                         const char** properties) const;
 
   private:
     const Provider& provider_;

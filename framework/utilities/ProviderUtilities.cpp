@@ -4,10 +4,12 @@
 #include "ProviderUtilities.h"
 
 #include <cstdio>
+#include <optional>
 #include <utility>
 
 #include "base/Ascii.h"
 #include "base/CimDateTime.h"
+#include "base/CmpiText.h"
 
 namespace VA {
 namespace {
@@ -64,12 +66,6 @@ bool assign(const char* characters, std::string& text) {
     return true;
 }
 
-template <class Integer>
-bool decimal(Integer number, std::string& text) {
-    text = std::to_string(number);
-    return true;
-}
-
 // Enough digits that the text names the same number again.
 bool real(double number, int digits, std::string& text) {
     char characters[40];
@@ -92,26 +88,6 @@ bool keyText(const CMPIData& key, std::string& text) {
             return assign(charactersOf(value.string), text);
         case CMPI_chars:
             return assign(value.chars, text);
-        case CMPI_boolean:
-            return assign(value.boolean != 0 ? "true" : "false", text);
-        case CMPI_uint8:
-            return decimal(value.uint8, text);
-        case CMPI_uint16:
-            return decimal(value.uint16, text);
-        case CMPI_uint32:
-            return decimal(value.uint32, text);
-        case CMPI_uint64:
-            return decimal(value.uint64, text);
-        case CMPI_sint8:
-            return decimal(value.sint8, text);
-        case CMPI_sint16:
-            return decimal(value.sint16, text);
-        case CMPI_sint32:
-            return decimal(value.sint32, text);
-        case CMPI_sint64:
-            return decimal(value.sint64, text);
-        case CMPI_char16:
-            return decimal(value.char16, text);
         case CMPI_real32:
             return real(value.real32, 9, text);
         case CMPI_real64:
@@ -119,8 +95,12 @@ bool keyText(const CMPIData& key, std::string& text) {
         case CMPI_dateTime:
             return dateTime(value.dateTime, text);
         default:
-            return false;
+            break;
     }
+    std::optional<std::string> scalar = base::scalarText(key);
+    if (!scalar) return false;
+    text = std::move(*scalar);
+    return true;
 }
 
 void set(CMPIInstance* instance, const char* name, const CMPIValue& value, CMPIType type) {

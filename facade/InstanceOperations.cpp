@@ -1,12 +1,11 @@
-#include "InstanceRequests.h"
-
-#include <cmpi/cmpift.h>
+// Requests for instances. The provider answers a path by some of its keys and tells of nothing that
+// is not there: whether all keys name the instance, and which key does not, is found out here.
 
 #include <algorithm>
 
-#include "KeyCheck.h"
-#include "Names.h"
+#include "Operations.h"
 #include "Refusal.h"
+#include "base/Ascii.h"
 
 namespace VA::OSStatusFacade {
 
@@ -22,7 +21,7 @@ CMPIObjectPath* pathToAskFor(const Request& request, const Class& itsClass,
     CMPIObjectPath* const path = request.newPath(itsClass.name);
     for (const Key& key : itsClass.keys)
         for (const KeyBinding& binding : bindings) {
-            if (key.isReference || !equalNames(binding.name, key.name)) continue;
+            if (key.isReference || !base::equalsIgnoreCase(binding.name, key.name)) continue;
             // Of characters, brokers take the pointer itself, not the address of one.
             const CMPIStatus status = path->ft->addKey(
                 path, key.name, reinterpret_cast<const CMPIValue*>(binding.text()->c_str()),
@@ -44,9 +43,9 @@ Refusal notFound(const Class& itsClass, const Identity& wanted, const Identities
     for (const Key& key : itsClass.keys) {
         const std::string name = std::string(all.empty() ? "" : ", ") + key.name;
         all += name;
-        const auto wantedKey =
-            std::find_if(wanted.keys.begin(), wanted.keys.end(),
-                         [&key](const auto& each) { return equalNames(each.first, key.name); });
+        const auto wantedKey = std::find_if(
+            wanted.keys.begin(), wanted.keys.end(),
+            [&key](const auto& each) { return base::equalsIgnoreCase(each.first, key.name); });
         // The identity is of a reading of its own.
         if (wantedKey == wanted.keys.end() ||
             std::none_of(candidates.begin(), candidates.end(),
@@ -62,13 +61,13 @@ Refusal notFound(const Class& itsClass, const Identity& wanted, const Identities
 void enumerateInstanceNames(const Request& request) {
     const Answer answer = request.enumerateInstanceNames(request.path());
     requireWhole(answer, request.className());
-    request.deliver(answer.paths());
+    request.returnPaths(answer.paths());
 }
 
 void enumerateInstances(const Request& request, const char** properties) {
     const Answer answer = request.enumerateInstances(request.path());
     requireWhole(answer, request.className());
-    request.deliver(answer.instances(), properties);
+    request.returnInstances(answer.instances(), properties);
 }
 
 void getInstance(const Request& request, const char** properties) {
@@ -87,7 +86,7 @@ void getInstance(const Request& request, const char** properties) {
     Identities candidates;
     for (const CMPIInstance* instance : answer.instances()) {
         candidates.push_back(request.identityOf(pathOf(instance)));
-        if (candidates.back() == wanted) return request.deliver({instance}, properties);
+        if (candidates.back() == wanted) return request.returnInstances({instance}, properties);
     }
     requireWhole(answer, known->name);
     // The provider tells of elements only those that have some of the keys.

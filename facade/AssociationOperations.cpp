@@ -1,13 +1,12 @@
-#include "AssociationRequests.h"
-
-#include <cmpi/cmpift.h>
+// Requests about associations, answered from the pairs that the provider enumerates: its own
+// associators follow the first key that fits and know no filters, and it refuses references.
 
 #include <map>
 #include <set>
 
-#include "KeyCheck.h"
-#include "Names.h"
+#include "Operations.h"
 #include "Refusal.h"
+#include "base/Ascii.h"
 
 namespace VA::OSStatusFacade {
 
@@ -29,7 +28,7 @@ bool admits(const char* filter, const Class& itsClass) {
 }
 
 bool admits(const char* filter, const char* role) {
-    return !isGiven(filter) || equalNames(filter, role);
+    return !isGiven(filter) || base::equalsIgnoreCase(filter, role);
 }
 
 // The ways that a source of that class has. None from a path that can name no instance.
@@ -88,14 +87,8 @@ std::vector<Pair> pairsOf(const Request& request, const Filter& filter, Ask ask)
     return pairs;
 }
 
-/// Tells what comes again.
-class Seen {
-  public:
-    bool isNew(const Identity& identity) { return identities_.insert(identity).second; }
-
-  private:
-    std::set<Identity> identities_;
-};
+/// The identities that came already.
+using Seen = std::set<Identity>;
 
 using Paths = std::vector<const CMPIObjectPath*>;
 using Instances = std::vector<const CMPIInstance*>;
@@ -145,19 +138,20 @@ class InstanceIndex {
     std::map<Identity, const CMPIInstance*> instances_;
 };
 
-/// Delivers one path of each pair, what it stands for but once.
-void deliverPaths(const Request& request, const Filter& filter, const CMPIObjectPath* Pair::*path) {
+// Returns one path of each pair, but each once.
+void returnPathOfEach(const Request& request, const Filter& filter,
+                      const CMPIObjectPath* Pair::*path) {
     Paths paths;
     Seen seen;
     for (const Pair& pair : pairsOf(request, filter, Ask::names))
-        if (seen.isNew(request.identityOf(pair.*path))) paths.push_back(pair.*path);
-    request.deliver(paths);
+        if (seen.insert(request.identityOf(pair.*path)).second) paths.push_back(pair.*path);
+    request.returnPaths(paths);
 }
 
 }  // namespace
 
 void associatorNames(const Request& request, const Filter& filter) {
-    deliverPaths(request, filter, &Pair::far);
+    returnPathOfEach(request, filter, &Pair::far);
 }
 
 void associators(const Request& request, const Filter& filter, const char** properties) {
@@ -166,23 +160,23 @@ void associators(const Request& request, const Filter& filter, const char** prop
     Seen seen;
     for (const Pair& pair : pairsOf(request, filter, Ask::names)) {
         const Identity far = request.identityOf(pair.far);
-        if (!seen.isNew(far)) continue;
+        if (!seen.insert(far).second) continue;
         if (const CMPIInstance* instance = index.find(far, pair.farClass))
             instances.push_back(instance);
     }
-    request.deliver(instances, properties);
+    request.returnInstances(instances, properties);
 }
 
 void referenceNames(const Request& request, const Filter& filter) {
-    deliverPaths(request, filter, &Pair::path);
+    returnPathOfEach(request, filter, &Pair::path);
 }
 
 void references(const Request& request, const Filter& filter, const char** properties) {
     Instances instances;
     Seen seen;
     for (const Pair& pair : pairsOf(request, filter, Ask::instances))
-        if (seen.isNew(request.identityOf(pair.path))) instances.push_back(pair.instance);
-    request.deliver(instances, properties);
+        if (seen.insert(request.identityOf(pair.path)).second) instances.push_back(pair.instance);
+    request.returnInstances(instances, properties);
 }
 
 }  // namespace VA::OSStatusFacade

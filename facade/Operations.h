@@ -1,0 +1,40 @@
+#ifndef FACADE_OPERATIONS_H
+#define FACADE_OPERATIONS_H
+
+#include "Request.h"
+
+// What a client may ask. Each operation answers one request, or throws Refusal.
+
+namespace VA::OSStatusFacade {
+
+void enumerateInstanceNames(const Request& request);
+void enumerateInstances(const Request& request, const char** properties);
+
+/// The one instance that all keys name.
+void getInstance(const Request& request, const char** properties);
+
+/// What a client wants of the associations of a source; null filters nothing.
+struct Filter {
+    const char* associationClass = nullptr;
+    const char* farClass = nullptr;
+    const char* role = nullptr;
+    const char* farRole = nullptr;
+};
+
+// The pairs that the provider enumerates are the truth: what is returned is the other end, or the
+// pair itself, of each pair that has the source at one end. A source that is at no end, or filters
+// that admit nothing, give an empty answer.
+//
+// A question to the object manager for computer systems is the expensive part. Each association
+// with the computer system that is looked at costs one, asked by the provider; associators that
+// lead to computer systems cost one more, for the instances. Names of them, and all other
+// instances, need none.
+
+void associatorNames(const Request& request, const Filter& filter);
+void associators(const Request& request, const Filter& filter, const char** properties);
+void referenceNames(const Request& request, const Filter& filter);
+void references(const Request& request, const Filter& filter, const char** properties);
+
+}  // namespace VA::OSStatusFacade
+
+#endif
