@@ -16,19 +16,6 @@
 
 namespace cmpihost {
 
-class ComputerSystems {
-  public:
-    virtual ~ComputerSystems() = default;
-    virtual UpcallService& service() = 0;
-    virtual OperationResult run(Broker& broker, const OperationRequest& request) = 0;
-    virtual void unload() {}
-
-  protected:
-    ComputerSystems() = default;
-    ComputerSystems(const ComputerSystems&) = default;
-    ComputerSystems& operator=(const ComputerSystems&) = default;
-};
-
 namespace {
 
 constexpr const char* logVariable = "ZBLOG_CONF";
@@ -53,59 +40,29 @@ std::vector<std::string> computerNames(unsigned count) {
     return names;
 }
 
-/// The host answers for the computer systems itself.
-class OwnComputerSystems final : public ComputerSystems {
-  public:
-    explicit OwnComputerSystems(unsigned count) : service_(computerNames(count)) {}
-
-    UpcallService& service() override { return service_; }
-    OperationResult run(Broker& broker, const OperationRequest& request) override {
-        return service_.perform(broker, request);
-    }
-
-  private:
-    ComputerSystemService service_;
-};
-
 LoadOptions loadOptions(const std::string& providerName) {
     LoadOptions options;
     options.providerName = providerName;
     return options;
 }
 
-LoadOptions companionOptions() {
+/// Null when the source names no library.
+std::unique_ptr<ProviderLibrary> loadCompanion(const ComputerSystemSource& source, Broker& broker) {
+    if (source.library.empty()) return nullptr;
     LoadOptions options = loadOptions("ComputerSystemProvider");
     options.association = false;
-    return options;
+    return std::make_unique<ProviderLibrary>(source.library, broker, options);
 }
 
-/// A library answers for it.
-class CompanionComputerSystems final : public ComputerSystems {
-  public:
-    CompanionComputerSystems(const std::string& file, Broker& broker)
-        : library_(file, broker, companionOptions()), service_(library_) {}
+std::unique_ptr<UpcallService> makeService(ProviderLibrary* companion, unsigned count) {
+    if (companion != nullptr) return std::make_unique<LibraryService>(*companion);
+    return std::make_unique<ComputerSystemService>(computerNames(count));
+}
 
-    UpcallService& service() override { return service_; }
-    OperationResult run(Broker& broker, const OperationRequest& request) override {
-        return invoke(library_, broker, request);
-    }
-    void unload() override { library_.unload(); }
-
-  private:
-    ProviderLibrary library_;
-    LibraryService service_;
-};
-
-/// The computer system's provider with its route set, before the other provider can ask for it.
-std::unique_ptr<ComputerSystems> routed(const ComputerSystemSource& source, Broker& broker) {
-    std::unique_ptr<ComputerSystems> systems;
-    if (source.library.empty()) {
-        systems = std::make_unique<OwnComputerSystems>(source.count);
-    } else {
-        systems = std::make_unique<CompanionComputerSystems>(source.library, broker);
-    }
-    broker.route(ComputerSystemService::className, systems->service());
-    return systems;
+/// The broker with its route to the computer systems.
+Broker& routed(Broker& broker, UpcallService& computerSystems) {
+    broker.route(ComputerSystemService::className, computerSystems);
+    return broker;
 }
 
 OperationResult escaped(const std::string& what) {
@@ -147,10 +104,9 @@ ScopedStderrLog::~ScopedStderrLog() {
 ProviderHost::ProviderHost(const ProviderSource& provider, const ClassCatalogue& catalogue,
                            const ComputerSystemSource& computerSystems)
     : broker_(&catalogue),
-      computerSystems_(routed(computerSystems, broker_)),
-      library_(provider.library, broker_, loadOptions(provider.name)) {}
-
-ProviderHost::~ProviderHost() = default;
+      companion_(loadCompanion(computerSystems, broker_)),
+      computerSystems_(makeService(companion_.get(), computerSystems.count)),
+      library_(provider.library, routed(broker_, *computerSystems_), loadOptions(provider.name)) {}
 
 OperationResult ProviderHost::run(const OperationRequest& request) {
     return guarded([&]() -> OperationResult { return invoke(library_, broker_, request); });
@@ -161,14 +117,17 @@ OperationResult ProviderHost::ask(const OperationRequest& request) {
         !base::equalsIgnoreCase(request.path.className, ComputerSystemService::className)) {
         return run(request);
     }
-    return guarded([&] { return computerSystems_->run(broker_, request); });
+    return guarded([&]() -> OperationResult {
+        if (companion_ != nullptr) return invoke(*companion_, broker_, request);
+        return computerSystems_->perform(broker_, request);
+    });
 }
 
 std::vector<std::string> ProviderHost::unload() {
     bool escapes = false;
     try {
         library_.unload();
-        computerSystems_->unload();
+        if (companion_ != nullptr) companion_->unload();
     } catch (...) {
         escapes = true;
     }

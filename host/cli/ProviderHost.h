@@ -43,9 +43,6 @@ struct ComputerSystemSource {
     unsigned count = 1;
 };
 
-/// The provider of the computer system, as the host reaches it.
-class ComputerSystems;
-
 /// One provider library in a broker, beside the provider of the computer system, which answers its
 /// up-calls. One thread uses it.
 class ProviderHost {
@@ -53,7 +50,6 @@ class ProviderHost {
     /// Loads the libraries; throws LoadError. `catalogue` outlives the host.
     ProviderHost(const ProviderSource& provider, const ClassCatalogue& catalogue,
                  const ComputerSystemSource& computerSystems = {});
-    ~ProviderHost();
 
     /// Runs one operation of the provider. An exception that leaves the provider becomes
     /// CMPI_RC_ERR_FAILED with a message that says so.
@@ -67,7 +63,9 @@ class ProviderHost {
 
   private:
     Broker broker_;
-    std::unique_ptr<ComputerSystems> computerSystems_;
+    /// The library that serves the computer system; null: the host does.
+    std::unique_ptr<ProviderLibrary> companion_;
+    std::unique_ptr<UpcallService> computerSystems_;
     ProviderLibrary library_;
 };
 

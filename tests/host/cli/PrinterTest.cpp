@@ -1,3 +1,4 @@
+// What people and programs are shown of instances, paths and single values.
 #include "host/cli/Printer.h"
 
 #include <gmock/gmock.h>
@@ -7,6 +8,7 @@
 #include <cmath>
 #include <sstream>
 
+#include "host/cli/ValueText.h"
 #include "host/mof/MofParser.h"
 
 namespace {
@@ -75,8 +77,10 @@ std::string printed(Format format, const std::vector<ObjectPathValue>& paths) {
 
 class Printers : public testing::Test {
   protected:
-    void SetUp() override {
-        setenv("TZ", "UTC0", 1);
+    void SetUp() override { setZone("UTC0"); }
+    void TearDown() override { setZone("UTC0"); }
+    static void setZone(const char* zone) {
+        setenv("TZ", zone, 1);
         tzset();
     }
 };
@@ -241,6 +245,53 @@ TEST_F(Printers, GiveRealsThatAreNoNumbersAsNull) {
     EXPECT_EQ(printed(Format::Mof, std::vector{odd}),
               "instance of X {\n    A = NULL;\n    B = 1.0e+300;\n};\n");
     EXPECT_THAT(printed(Format::Json, std::vector{odd}), testing::HasSubstr("\"A\": null"));
+}
+
+TEST(HumanReadableSize, HasTheLargestUnitThatLeavesAtLeastOneAndRoundsIntoTheNext) {
+    const std::pair<std::uint64_t, const char*> rows[] = {{0, "0 KiB"},
+                                                          {1023, "1023 KiB"},
+                                                          {1024, "1.0 MiB"},
+                                                          {1536, "1.5 MiB"},
+                                                          {1024 + 972, "1.9 MiB"},
+                                                          {1024 + 973, "2.0 MiB"},
+                                                          {8123456, "7.7 GiB"},
+                                                          {1023 * 1024, "1023.0 MiB"},
+                                                          {1024 * 1024 - 1, "1.0 GiB"},
+                                                          {4294967295, "4.0 TiB"},
+                                                          {18446744073709551615U, "16.0 ZiB"}};
+    for (const auto& [kibibytes, text] : rows) EXPECT_EQ(humanReadableSize(kibibytes), text);
+}
+
+TEST_F(Printers, ShowAnInstantInTheZoneOfTheReaderAndAnInterval) {
+    const struct {
+        const char* zone;
+        const char* cimText;
+        const char* shown;
+    } rows[] = {{"UTC0", "20240102030405.000000+000", "2024-01-02 03:04:05 +00:00"},
+                {"CET-1", "20240102030405.000000+000", "2024-01-02 04:04:05 +01:00"},
+                {"NST3:30", "20240102030405.000000+000", "2024-01-01 23:34:05 -03:30"},
+                {"UTC0", "20240102080405.000000+300", "2024-01-02 03:04:05 +00:00"},
+                {"UTC0", "20240101213405.000000-330", "2024-01-02 03:04:05 +00:00"},
+                {"UTC0", "21060708091011.000000+000", "2106-07-08 09:10:11 +00:00"},
+                {"CET-1", "00000003040506.000000:000", "3 days 04:05:06"},
+                {"UTC0", "00000001000000.000000:000", "1 day 00:00:00"},
+                {"UTC0", "", ""},
+                {"UTC0", "yesterday", ""},
+                {"UTC0", "   00000000000.000000+000", ""},
+                {"UTC0", "20241302030405.000000+000", ""},
+                {"UTC0", "2024010203****.000000+000", ""},
+                {"UTC0", "20240102030405.000000", ""},
+                {"UTC0", "19691231235959.000000+000", ""}};
+    for (const auto& row : rows) {
+        setZone(row.zone);
+        EXPECT_EQ(humanReadableDateTime(row.cimText), row.shown) << row.cimText;
+    }
+}
+
+TEST(RealText, IsTheShortestThatGivesTheNumberBack) {
+    EXPECT_EQ(realText(0.1, CMPI_real64), "0.1");
+    EXPECT_EQ(realText(static_cast<double>(0.1F), CMPI_real32), "0.1");
+    EXPECT_EQ(realText(-2.5, CMPI_real64), "-2.5");
 }
 
 }  // namespace

@@ -10,7 +10,7 @@ namespace {
 namespace fs = std::filesystem;
 using namespace cmpihost;
 
-class Places : public testing::Test {
+class InstallPaths : public testing::Test {
   protected:
     void SetUp() override {
         std::string name = (fs::temp_directory_path() / "placesXXXXXX").string();
@@ -27,11 +27,11 @@ class Places : public testing::Test {
     fs::path prefix_;
 };
 
-TEST_F(Places, LookForTheSchemaBesideTheProgramsFolder) {
+TEST_F(InstallPaths, LookForTheSchemaBesideTheProgramsFolder) {
     EXPECT_EQ(schemaFolder("/opt/x/bin"), "/opt/x/share/korva-osstatus/schema");
 }
 
-TEST_F(Places, PreferTheLibraryFolderThenTheProgramsThenTheObjectManagers) {
+TEST_F(InstallPaths, PreferTheLibraryFolderThenTheProgramsThenTheObjectManagers) {
     EXPECT_EQ(found(), "");
     touch("lib64/cmpi/libkorzbosstatusprofileprovider.so");
     EXPECT_EQ(found(), prefix_ / "lib64/cmpi/libkorzbosstatusprofileprovider.so");
@@ -43,7 +43,7 @@ TEST_F(Places, PreferTheLibraryFolderThenTheProgramsThenTheObjectManagers) {
     EXPECT_EQ(found(), prefix_ / "lib/libkorzbosstatusprofileprovider.so.1");
 }
 
-TEST_F(Places, KnowTheFolderThatTheProvidersAreInstalledIn) {
+TEST_F(InstallPaths, KnowTheFolderThatTheProvidersAreInstalledIn) {
     fs::create_directories(prefix_ / "agents");
     touch("lib/cmpi/libkorzbosstatusprofileprovider.so");
     touch("lib/cmpi/libkorvacomputersystemprovider.so");
@@ -60,7 +60,7 @@ TEST_F(Places, KnowTheFolderThatTheProvidersAreInstalledIn) {
     EXPECT_EQ(installedProviderFolder(), KORVA_CMPI_FOLDER);
 }
 
-TEST_F(Places, HoldTheFacadeBesideTheProvider) {
+TEST_F(InstallPaths, HoldTheFacadeBesideTheProvider) {
     touch("lib/libkorzbosstatusprofileprovider.so.1");
     EXPECT_EQ(findLibrary(Library::Facade, prefix_ / "bin"), "");
     touch("lib/libkorvaosstatusfacade.so.1");
@@ -68,7 +68,7 @@ TEST_F(Places, HoldTheFacadeBesideTheProvider) {
               prefix_ / "lib/libkorvaosstatusfacade.so.1");
 }
 
-TEST_F(Places, TellTheNameOfAProviderByTheFileOfItsLibrary) {
+TEST_F(InstallPaths, TellTheNameOfAProviderByTheFileOfItsLibrary) {
     for (const char* file : {"libkorvaosstatusfacade.so", "/x/libkorvaosstatusfacade.so.1"}) {
         EXPECT_EQ(providerName(file), "OSStatusFacade") << file;
     }
@@ -78,16 +78,16 @@ TEST_F(Places, TellTheNameOfAProviderByTheFileOfItsLibrary) {
     }
 }
 
-TEST_F(Places, DoNotTakeAFolderForALibrary) {
+TEST_F(InstallPaths, DoNotTakeAFolderForALibrary) {
     fs::create_directories(prefix_ / "lib/libkorzbosstatusprofileprovider.so.1");
     EXPECT_EQ(found(), "");
 }
 
-TEST_F(Places, KnowTheFolderOfTheRunningProgram) {
+TEST_F(InstallPaths, KnowTheFolderOfTheRunningProgram) {
     EXPECT_EQ(programFolder("elsewhere"), fs::path(KORVA_BINARY_DIR) / "bin");
 }
 
-TEST_F(Places, TakeTheFolderOfTheCalledNameWhereTheSystemTellsNone) {
+TEST_F(InstallPaths, TakeTheFolderOfTheCalledNameWhereTheSystemTellsNone) {
     const fs::path missing = prefix_ / "exe";
     touch("bin/program");
     fs::create_symlink(prefix_ / "bin/program", prefix_ / "called");
@@ -95,7 +95,7 @@ TEST_F(Places, TakeTheFolderOfTheCalledNameWhereTheSystemTellsNone) {
     EXPECT_EQ(programFolder((prefix_ / "called").string(), missing), prefix_ / "bin");
 }
 
-TEST_F(Places, TakeTheInstallationFolderWhereNothingTellsAnother) {
+TEST_F(InstallPaths, TakeTheInstallationFolderWhereNothingTellsAnother) {
     const fs::path missing = prefix_ / "exe";
     EXPECT_EQ(programFolder("cmpihost", missing), KORVA_PROGRAM_FOLDER);
     EXPECT_EQ(programFolder("", missing), KORVA_PROGRAM_FOLDER);

@@ -2,13 +2,12 @@
 #include <gmock/gmock.h>
 #include <link.h>
 #include <sys/stat.h>
-#include <sys/utsname.h>
 
 #include <algorithm>
 #include <filesystem>
 #include <fstream>
 
-#include "support/ProgramRun.h"
+#include "host/cli/Cmpihost.h"
 
 namespace {
 
@@ -49,22 +48,22 @@ class LibraryFile : public testing::Test {
         return (folder_ / "x.so").string();
     }
     static ProgramRun load(const std::string& library) {
-        return runProgram(KORVA_CMPIHOST, {"--provider", library, "ei", "X"});
+        return cmpihost({"--provider", library, "ei", "X"});
     }
 
     fs::path folder_;
 };
 
-TEST_F(LibraryFile, ThatIsMissingExitsWithThree) {
-    const ProgramRun run = load((folder_ / "missing.so").string());
-    EXPECT_EQ(run.status, 3);
-    EXPECT_THAT(run.err, HasSubstr("missing.so: No such file or directory"));
-}
-
-TEST_F(LibraryFile, ThatIsNoLibraryExitsWithThree) {
-    const ProgramRun run = load(file("hello"));
-    EXPECT_EQ(run.status, 3);
-    EXPECT_THAT(run.err, HasSubstr("x.so: not a shared library"));
+TEST_F(LibraryFile, ThatIsNoProviderExitsWithThree) {
+    const std::pair<std::string, const char*> rows[] = {
+        {(folder_ / "missing.so").string(), "missing.so: No such file or directory"},
+        {file("hello"), "x.so: not a shared library"},
+        {KORVA_FACTORYLESS, "OperatingSystemProvider_Create_InstanceMI"}};
+    for (const auto& [library, complaint] : rows) {
+        const ProgramRun run = load(library);
+        EXPECT_EQ(run.status, 3) << library;
+        EXPECT_THAT(run.err, HasSubstr(complaint));
+    }
 }
 
 TEST_F(LibraryFile, ThatIsANamedPipeExitsWithThree) {
@@ -75,7 +74,7 @@ TEST_F(LibraryFile, ThatIsANamedPipeExitsWithThree) {
     EXPECT_EQ(load(pipe).status, 3);
     EXPECT_EQ(load(pipe).err, complaint);
     const ProgramRun companion =
-        runProgram(KORVA_CMPIHOST, {"--provider", KORVA_STAND_IN, "--companion", pipe, "ei", "X"});
+        cmpihost({"--provider", KORVA_STAND_IN, "--companion", pipe, "ei", "X"});
     EXPECT_EQ(companion.status, 3);
     EXPECT_EQ(companion.err, complaint);
 }
@@ -97,8 +96,8 @@ TEST_F(LibraryFile, ThatIsCutOffExitsWithThree) {
 
 TEST_F(LibraryFile, NamedLikeASchemaFileButAPipeExitsWithTwo) {
     ASSERT_EQ(mkfifo((folder_ / "x.mof").c_str(), 0600), 0);
-    const ProgramRun run = runProgram(
-        KORVA_CMPIHOST, {"--provider", KORVA_STAND_IN, "--schema", folder_.string(), "ei", "X"});
+    const ProgramRun run =
+        cmpihost({"--provider", KORVA_STAND_IN, "--schema", folder_.string(), "ei", "X"});
     EXPECT_EQ(run.status, 2);
     EXPECT_EQ(run.err, "cmpihost: the schema file " + (folder_ / "x.mof").string() +
                            " is not a regular file\n");
@@ -117,12 +116,6 @@ TEST_F(LibraryFile, OfTheOtherWordSizeExitsWithThreeAndSaysSo) {
     EXPECT_EQ(run.status, 3);
     EXPECT_THAT(run.err, HasSubstr(sizeof(void*) == 8 ? "a 32-bit library, this host is 64-bit"
                                                       : "a 64-bit library, this host is 32-bit"));
-}
-
-TEST_F(LibraryFile, WithoutFactoryExitsWithThree) {
-    const ProgramRun run = load(KORVA_FACTORYLESS);
-    EXPECT_EQ(run.status, 3);
-    EXPECT_THAT(run.err, HasSubstr("OperatingSystemProvider_Create_InstanceMI"));
 }
 
 TEST_F(LibraryFile, WithoutFolderIsTakenFromTheCurrentOne) {
@@ -145,7 +138,7 @@ class ProgramElsewhere : public LibraryFile {
         fs::copy_file(KORVA_CMPIHOST, folder_ / "bin/cmpihost");
         fs::copy(KORVA_SOURCE_DIR "/schema", folder_ / "share/korva-osstatus/schema");
     }
-    ProgramRun cmpihost(const std::vector<std::string>& arguments) const {
+    ProgramRun installed(const Words& arguments) const {
         return runProgram((folder_ / "bin/cmpihost").string(), arguments);
     }
     void install(const char* name) const { fs::copy_file(KORVA_STAND_IN, folder_ / "lib" / name); }
@@ -153,7 +146,7 @@ class ProgramElsewhere : public LibraryFile {
 
 TEST_F(ProgramElsewhere, WithoutItsLibraryExitsWithThreeAndTellsThePlaces) {
     const struct {
-        std::vector<std::string> arguments;
+        Words arguments;
         const char* complaint;
         const char* place;
         const char* hint;
@@ -166,41 +159,35 @@ TEST_F(ProgramElsewhere, WithoutItsLibraryExitsWithThreeAndTellsThePlaces) {
                  "lib/libkorzbosstatusprofileprovider.so.1\n",
                  "\n(--provider FILE names one, without --bare)\n"}};
     for (const auto& row : rows) {
-        const ProgramRun run = cmpihost(row.arguments);
+        const ProgramRun run = installed(row.arguments);
         EXPECT_EQ(run.status, 3);
         EXPECT_THAT(run.err, StartsWith(row.complaint + ("  " + (folder_ / row.place).string())));
         EXPECT_THAT(run.err, EndsWith(row.hint));
     }
 }
 
-TEST_F(ProgramElsewhere, LoadsTheFacadeBesideItself) {
+TEST_F(ProgramElsewhere, LoadsTheFacadeBesideItselfOrTheProviderWhenItIsToAskThat) {
+    const Words facade = {"ein", "KORVA_OperatingSystem"};
+    const Words provider = {"--bare", "ein", "KORVA_OperatingSystem"};
     install("libkorvaosstatusfacade.so.1");
-    const ProgramRun run = cmpihost({"ein", "KORVA_OperatingSystem"});
-    EXPECT_EQ(run.status, 0) << run.err;
-    EXPECT_THAT(run.out, HasSubstr(moonName));
-    EXPECT_EQ(cmpihost({"--bare", "ein", "KORVA_OperatingSystem"}).status, 3);
+    EXPECT_THAT(installed(facade).out, HasSubstr(moonName));
+    EXPECT_EQ(installed(provider).status, 3);
+    fs::remove(folder_ / "lib/libkorvaosstatusfacade.so.1");
+    install("libkorzbosstatusprofileprovider.so.1");
+    EXPECT_THAT(installed(provider).out, HasSubstr(moonName));
+    EXPECT_EQ(installed(facade).status, 3);
 }
 
 TEST_F(ProgramElsewhere, ServesComputerSystemsItselfWithoutACompanion) {
     install("libkorvaosstatusfacade.so.1");
-    utsname names{};
-    ASSERT_EQ(uname(&names), 0);
     const std::string start =
         "root/cimv2:KORVA_ComputerSystem.CreationClassName=\"KORVA_ComputerSystem\",Name=\"" +
-        std::string(names.nodename);
+        nodeName();
     const std::string first = start + "\"\n";
-    EXPECT_EQ(cmpihost({"ein", "KORVA_ComputerSystem"}).out, first);
-    EXPECT_EQ(cmpihost({"--computer-systems", "0", "ein", "KORVA_ComputerSystem"}).out, "");
-    EXPECT_EQ(cmpihost({"--computer-systems", "3", "ein", "KORVA_ComputerSystem"}).out,
+    EXPECT_EQ(installed({"ein", "KORVA_ComputerSystem"}).out, first);
+    EXPECT_EQ(installed({"--computer-systems", "0", "ein", "KORVA_ComputerSystem"}).out, "");
+    EXPECT_EQ(installed({"--computer-systems", "3", "ein", "KORVA_ComputerSystem"}).out,
               first + start + "-2\"\n" + start + "-3\"\n");
-}
-
-TEST_F(ProgramElsewhere, LoadsTheProviderBesideItselfWhenItIsToAskThat) {
-    install("libkorzbosstatusprofileprovider.so.1");
-    const ProgramRun run = cmpihost({"--bare", "ein", "KORVA_OperatingSystem"});
-    EXPECT_EQ(run.status, 0) << run.err;
-    EXPECT_THAT(run.out, HasSubstr(moonName));
-    EXPECT_EQ(cmpihost({"ein", "KORVA_OperatingSystem"}).status, 3);
 }
 
 }  // namespace

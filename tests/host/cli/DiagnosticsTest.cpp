@@ -8,7 +8,7 @@ namespace {
 
 using namespace cmpihost;
 
-class Notes : public testing::Test {
+class Diagnostics : public testing::Test {
   protected:
     void SetUp() override {
         schema_.add(
@@ -46,7 +46,7 @@ class Notes : public testing::Test {
     Schema schema_;
 };
 
-TEST_F(Notes, NameEachListedNameThatNoClassOfTheAnswerDeclares) {
+TEST_F(Diagnostics, NoteEachListedNameThatNoClassOfTheAnswerDeclares) {
     EXPECT_EQ(notes(Operation::EnumerateInstances, {"name", "Of\n", "Weight"}, {}),
               "note: the class Thing declares no property 'Of\\n'\n"
               "note: the class Thing declares no property 'Weight'\n");
@@ -57,14 +57,14 @@ TEST_F(Notes, NameEachListedNameThatNoClassOfTheAnswerDeclares) {
               "note: the class Link declares no property 'Two'\n");
 }
 
-TEST_F(Notes, AreSilentAboutNamesWhereTheClassIsNotKnown) {
+TEST_F(Diagnostics, AreSilentAboutNamesWhereTheClassIsNotKnown) {
     EXPECT_EQ(notes(Operation::EnumerateInstances, {"Off"}, {}, "Stranger"), "");
     EXPECT_EQ(notes(Operation::Associators, {"Off"}, {}), "");
     EXPECT_EQ(notes(Operation::Associators, {"Off"}, {"Thing", "Stranger"}), "");
     EXPECT_EQ(notes(Operation::ModifyInstance, {"Off"}, {}), "");
 }
 
-TEST_F(Notes, TellWhatAnObjectManagerMakesOfOtherThanOneInstance) {
+TEST_F(Diagnostics, TellWhatAnObjectManagerMakesOfOtherThanOneInstance) {
     EXPECT_EQ(notes(Operation::GetInstance, {}, {"Thing"}), "");
     EXPECT_EQ(notes(Operation::GetInstance, {"Off"}, {}),
               "note: no instance was returned; an object manager answers CIM_ERR_NOT_FOUND (6)\n"
@@ -73,14 +73,14 @@ TEST_F(Notes, TellWhatAnObjectManagerMakesOfOtherThanOneInstance) {
               "note: 2 instances were returned; an object manager takes the first\n");
 }
 
-TEST_F(Notes, HintAtTheAssociationThatARequestDoesNotName) {
+TEST_F(Diagnostics, HintAtTheAssociationThatARequestDoesNotName) {
     EXPECT_EQ(hint(Operation::AssociatorNames, CMPI_RC_ERR_INVALID_CLASS),
               "hint: name the association with --assoc-class, one of Link\n");
     EXPECT_EQ(hint(Operation::Associators, CMPI_RC_ERR_FAILED), "");
     EXPECT_EQ(hint(Operation::EnumerateInstances, CMPI_RC_ERR_INVALID_CLASS), "");
 }
 
-TEST_F(Notes, TellWhichNamesOfAnAssociationRequestWithoutAnAnswerTheSchemaDoesNotHave) {
+TEST_F(Diagnostics, TellWhichNamesOfAnAssociationRequestWithoutAnAnswerTheSchemaDoesNotHave) {
     OperationRequest request = association(Operation::AssociatorNames);
     const auto answered = [&](const OperationResult& result) {
         return notesOn(request, result, schema_);
@@ -112,7 +112,7 @@ TEST_F(Notes, TellWhichNamesOfAnAssociationRequestWithoutAnAnswerTheSchemaDoesNo
     }
 }
 
-TEST_F(Notes, HintAtTheAssociationThatARequestMisspells) {
+TEST_F(Diagnostics, HintAtTheAssociationThatARequestMisspells) {
     OperationRequest request = association(Operation::AssociatorNames);
     request.assocClass = "Lnik";
     OperationResult failure;
@@ -120,6 +120,24 @@ TEST_F(Notes, HintAtTheAssociationThatARequestMisspells) {
     EXPECT_EQ(hintFor(request, failure, schema_), "hint: the schema has no class 'Lnik'\n");
     request.assocClass = "Link";
     EXPECT_EQ(hintFor(request, failure, schema_), "");
+}
+
+TEST(StatusText, NamesTheStatus) {
+    EXPECT_EQ(statusText(CMPI_RC_ERR_FAILED), "CIM_ERR_FAILED (1)");
+    EXPECT_EQ(statusText(CMPI_RC_ERR_INVALID_CLASS), "CIM_ERR_INVALID_CLASS (5)");
+    EXPECT_EQ(statusText(CMPI_RC_ERR_NOT_FOUND), "CIM_ERR_NOT_FOUND (6)");
+    EXPECT_EQ(statusText(CMPI_RC_ERR_NOT_SUPPORTED), "CIM_ERR_NOT_SUPPORTED (7)");
+    EXPECT_EQ(statusText(CMPI_RC_ERR_METHOD_NOT_FOUND), "CIM_ERR_METHOD_NOT_FOUND (17)");
+    EXPECT_EQ(statusText(CMPI_RC_DO_NOT_UNLOAD), "CMPI_RC_DO_NOT_UNLOAD (50)");
+    EXPECT_EQ(statusText(static_cast<CMPIrc>(150)), "CMPI status 150");
+}
+
+TEST(StatusText, AddsTheMessageWithoutItsControlCharacters) {
+    OperationResult result;
+    result.rc = CMPI_RC_ERR_ACCESS_DENIED;
+    EXPECT_EQ(failureText(result), "CIM_ERR_ACCESS_DENIED (2)");
+    result.message = "go\x1b[31m away";
+    EXPECT_EQ(failureText(result), "CIM_ERR_ACCESS_DENIED (2): go\\x1b[31m away");
 }
 
 }  // namespace

@@ -34,7 +34,7 @@ class LowLimit {
 /// The error number that making the object fails with; 0 when it does not.
 int failure() {
     try {
-        const ScopedStderrLog records;
+        const ScopedStderrLog log;
     } catch (const std::system_error& error) {
         EXPECT_THAT(error.what(), testing::StartsWith("the records cannot be shown: "));
         return error.code().value();
@@ -47,10 +47,10 @@ std::ptrdiff_t openFiles() {
     return std::distance(Entries("/proc/self/fd"), Entries());
 }
 
-TEST(RecordsOnStderr, ConfiguresTheLogAsLongAsItLives) {
+TEST(ScopedStderrLog, ConfiguresTheLogAsLongAsItLives) {
     const std::ptrdiff_t before = openFiles();
     {
-        const ScopedStderrLog records;
+        const ScopedStderrLog log;
         std::ostringstream configuration;
         configuration << std::ifstream(std::getenv("ZBLOG_CONF")).rdbuf();
         EXPECT_EQ(configuration.str(),
@@ -60,12 +60,12 @@ TEST(RecordsOnStderr, ConfiguresTheLogAsLongAsItLives) {
     EXPECT_EQ(openFiles(), before);
 }
 
-TEST(RecordsOnStderr, TellsThatNoFileCanBeOpened) {
+TEST(ScopedStderrLog, TellsThatNoFileCanBeOpened) {
     const LowLimit none(RLIMIT_NOFILE, 0);
     EXPECT_EQ(failure(), EMFILE);
 }
 
-TEST(RecordsOnStderr, TellsThatNothingCanBeWrittenAndLeavesNoFileOpen) {
+TEST(ScopedStderrLog, TellsThatNothingCanBeWrittenAndLeavesNoFileOpen) {
     signal(SIGXFSZ, SIG_IGN);
     const std::ptrdiff_t before = openFiles();
     {

@@ -1,0 +1,223 @@
+// Classes with what they inherit, the names of their numbers, and the folder that they are read
+// from.
+#include "host/mof/Schema.h"
+
+#include <gmock/gmock.h>
+#include <stdlib.h>
+
+#include <fstream>
+
+#include "host/broker/Value.h"
+#include "host/mof/MofParser.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+using namespace cmpihost;
+using testing::ElementsAre;
+using testing::HasSubstr;
+
+Schema schemaOf(const std::string& text) {
+    Schema schema;
+    schema.add(mof::parse(text, "x.mof"));
+    return schema;
+}
+
+/// What() of what the call throws.
+template <class Call>
+std::string complaint(Call call) {
+    try {
+        call();
+    } catch (const std::runtime_error& error) {
+        return error.what();
+    }
+    return "no error";
+}
+
+std::string complaintAbout(const std::string& text) {
+    return complaint([&] { schemaOf(text); });
+}
+
+const char* family =
+    "class Base { [Key] string Id; uint16 Size; };"
+    "class Derived : Base { string Name; [Override(\"Id\")] string ID; };"
+    "[Association] class Link { [Key] Base REF From; [Key] Base REF To; };"
+    "class SubLink : Link { };"
+    "class Foreign : CIM_Elsewhere { datetime When; uint8 Codes[]; };";
+
+TEST(Schema, FindsClassesAndTheNearestDeclarationOfAPropertyWithoutCase) {
+    const Schema schema = schemaOf(family);
+    ASSERT_NE(schema.find("dERIVED"), nullptr);
+    EXPECT_EQ(schema.find("dERIVED")->name, "Derived");
+    EXPECT_EQ(schema.find("Nobody"), nullptr);
+    EXPECT_EQ(schema.findProperty("Derived", "id")->name, "ID");
+    EXPECT_EQ(schema.findProperty("Derived", "SIZE")->name, "Size");
+    EXPECT_EQ(schema.findProperty("Derived", "Weight"), nullptr);
+    EXPECT_EQ(schema.findProperty("Nobody", "Id"), nullptr);
+}
+
+TEST(Schema, InheritsKeysAndAssociationsFromSuperclassesDeclaredOrNot) {
+    const Schema schema = schemaOf(family);
+    EXPECT_TRUE(schema.isKey("Derived", "ID"));
+    EXPECT_FALSE(schema.isKey("Derived", "Name"));
+    EXPECT_TRUE(schema.isAssociation("SubLink"));
+    EXPECT_FALSE(schema.isAssociation("Derived"));
+    EXPECT_TRUE(schema.isA("Derived", "Base"));
+    EXPECT_FALSE(schema.isA("Base", "Derived"));
+    EXPECT_TRUE(schema.isA("Foreign", "cim_elsewhere"));
+}
+
+TEST(Schema, RefusesClassesThatAreDeclaredTwiceOrDescendFromThemselves) {
+    EXPECT_EQ(complaintAbout("class A {};\nclass a {};"),
+              "x.mof:2:7: class 'a' is declared twice, first at x.mof:1");
+    EXPECT_EQ(complaintAbout("class A : A {};"), "x.mof:1:7: class 'A' descends from itself");
+    EXPECT_EQ(complaintAbout("class A : B {};\nclass B : C {};\nclass C : A {};"),
+              "x.mof:3:7: class 'C' descends from itself");
+}
+
+TEST(SchemaCatalogue, ShowsTheBrokerClassesWithTheirOwnPropertiesBeforeInheritedOnes) {
+    const SchemaCatalogue catalogue(schemaOf(family));
+    const auto shown = [&](const char* className) {
+        const ClassDeclaration* declared = catalogue.find(className);
+        if (declared == nullptr) return std::string("none");
+        std::string text = declared->name + ":" + declared->superclass;
+        text += declared->association ? " association" : "";
+        for (const PropertyDeclaration& property : declared->properties) {
+            text += std::string(property.key ? " *" : " ") + property.name + "=" +
+                    cimTypeName(property.type);
+            text += property.referenceClass.empty() ? "" : ">" + property.referenceClass;
+        }
+        return text;
+    };
+    EXPECT_EQ(shown("DERIVED"), "Derived:Base Name=string *ID=string Size=uint16");
+    EXPECT_EQ(shown("SubLink"), "SubLink:Link association *From=ref>Base *To=ref>Base");
+    EXPECT_EQ(shown("Foreign"), "Foreign:CIM_Elsewhere When=datetime Codes=uint8[]");
+    EXPECT_EQ(shown("Nobody"), "none");
+}
+
+TEST(SchemaCatalogue, GivesEveryTypeOfMofItsCmpiType) {
+    const std::pair<const char*, CMPIType> rows[] = {
+        {"boolean", CMPI_boolean},   {"string", CMPI_string}, {"char16", CMPI_char16},
+        {"datetime", CMPI_dateTime}, {"uint8", CMPI_uint8},   {"sint8", CMPI_sint8},
+        {"uint16", CMPI_uint16},     {"sint16", CMPI_sint16}, {"uint32", CMPI_uint32},
+        {"sint32", CMPI_sint32},     {"uint64", CMPI_uint64}, {"sint64", CMPI_sint64},
+        {"real32", CMPI_real32},     {"real64", CMPI_real64}, {"A REF", CMPI_ref}};
+    for (const auto& [name, type] : rows) {
+        const Schema schema = schemaOf(std::string("class A { ") + name + " P; };");
+        EXPECT_EQ(cmpiType(*schema.findProperty("A", "P")), type) << name;
+    }
+}
+
+class SchemaFolder : public testing::Test {
+  protected:
+    void SetUp() override {
+        std::string name = (fs::temp_directory_path() / "schemaXXXXXX").string();
+        ASSERT_NE(mkdtemp(name.data()), nullptr);
+        folder_ = name;
+    }
+    void TearDown() override { fs::remove_all(folder_); }
+    void write(const char* name, const std::string& text) { std::ofstream(folder_ / name) << text; }
+    static std::string refusal(const fs::path& folder) {
+        return complaint([&] { Schema::load(folder); });
+    }
+
+    fs::path folder_;
+};
+
+TEST_F(SchemaFolder, IsReadFileByFile) {
+    write("a.mof", "#pragma include (\"b.mof\")\nclass A : B {};");
+    write("b.MOF", "class B { uint8 P; };");
+    write("readme.txt", "no MOF at all");
+    const Schema schema = Schema::load(folder_);
+    EXPECT_THAT(schema.classNames(), ElementsAre("A", "B"));
+    EXPECT_NE(schema.findProperty("A", "P"), nullptr);
+}
+
+TEST_F(SchemaFolder, WithAFileThatCannotBeReadSaysWhichOne) {
+    write("a.mof", "class A {");
+    EXPECT_THAT(refusal(folder_), HasSubstr("/a.mof:1:10: expected a type"));
+    fs::remove(folder_ / "a.mof");
+    fs::create_symlink(folder_ / "missing", folder_ / "a.mof");
+    EXPECT_EQ(refusal(folder_),
+              "the schema file " + (folder_ / "a.mof").string() + " cannot be read");
+}
+
+TEST_F(SchemaFolder, WithoutAClassIsRefused) {
+    const std::string start = "the schema folder " + folder_.string();
+    EXPECT_EQ(refusal(folder_), start + " holds no MOF class");
+    EXPECT_EQ(refusal(folder_ / "missing"),
+              start + "/missing cannot be read: No such file or directory");
+}
+
+ValueMap mapOf(const std::string& qualifiers, const std::string& type = "uint16") {
+    const mof::Document document =
+        mof::parse("class A { [" + qualifiers + "] " + type + " P; };", "x.mof");
+    return ValueMap::of(document.classes.at(0).properties.at(0));
+}
+
+TEST(ValueMap, NamesNumbersByTheNarrowestAndFirstEntryThatHoldsThem) {
+    const char* const ranges =
+        R"(ValueMap{"..","0x8000..","2","10..20"}, Values{"rest","vendor","two","tens"})";
+    const char* const low = R"(ValueMap{"..-5","-1"}, Values{"low","minus one"})";
+    const struct {
+        const char* qualifiers;
+        const char* type;
+        std::int64_t number;
+        const char* name;
+    } rows[] = {
+        {R"(ValueMap{"0","5","0x10"}, Values{"zero","five","sixteen"})", "uint8", 0, "zero"},
+        {R"(ValueMap{"0","5","0x10"}, Values{"zero","five","sixteen"})", "uint8", 5, "five"},
+        {R"(ValueMap{"0","5","0x10"}, Values{"zero","five","sixteen"})", "uint8", 16, "sixteen"},
+        {R"(ValueMap{"0","5","0x10"}, Values{"zero","five","sixteen"})", "uint8", 1, nullptr},
+        {R"(Values{"a","b"})", "uint16", 1, "b"},
+        {R"(Values{"a","b"})", "uint16", 2, nullptr},
+        {ranges, "uint16", 2, "two"},
+        {ranges, "uint16", 10, "tens"},
+        {ranges, "uint16", 20, "tens"},
+        {ranges, "uint16", 21, "rest"},
+        {ranges, "uint16", 0x7FFF, "rest"},
+        {ranges, "uint16", 0x8000, "vendor"},
+        {R"(ValueMap{"1","1"}, Values{"first","second"})", "uint16", 1, "first"},
+        {R"(ValueMap{"1..2","2..3"}, Values{"first","second"})", "uint16", 2, "first"},
+        {low, "sint16", -6, "low"},
+        {low, "sint16", -1, "minus one"},
+        {low, "sint16", 0, nullptr},
+        {R"(ValueMap{"9223372036854775807"}, Values{"most"})", "uint64", INT64_MAX, "most"},
+    };
+    for (const auto& row : rows) {
+        const ValueMap map = mapOf(row.qualifiers, row.type);
+        const std::string* const name = map.find(row.number);
+        EXPECT_EQ(name == nullptr ? "none" : *name, row.name == nullptr ? "none" : row.name)
+            << row.qualifiers << " " << row.number;
+    }
+}
+
+TEST(ValueMap, IsForIntegersWithValues) {
+    for (const char* type :
+         {"uint8", "sint8", "uint16", "sint16", "uint32", "sint32", "uint64", "sint64"}) {
+        EXPECT_FALSE(mapOf(R"(Values{"zero"})", type).empty()) << type;
+    }
+    for (const char* type : {"boolean", "char16", "datetime", "real32", "real64", "string"})
+        EXPECT_TRUE(mapOf(R"(Values{"zero"})", type).empty()) << type;
+    for (const char* qualifiers : {R"(ValueMap{"1"})", "Key"})
+        EXPECT_TRUE(mapOf(qualifiers).empty()) << qualifiers;
+    EXPECT_TRUE(mapOf(R"(ValueMap{"OK"}, Values{"fine"})", "string").empty());
+}
+
+TEST(ValueMap, ThatMakesNoSenseIsRefusedAtItsProperty) {
+    EXPECT_EQ(complaint([] { mapOf(R"(ValueMap{"1","2"}, Values{"a"})"); }),
+              "ValueMap lists 2 entries and Values 1");
+    for (const std::string entry :
+         {"x", "1.5", "1..y", "9223372036854775808", "99999999999999999999"}) {
+        EXPECT_THAT(complaint([&] { mapOf("ValueMap{\"" + entry + "\"}, Values{\"a\"}"); }),
+                    HasSubstr("in the ValueMap is no integer"))
+            << entry;
+    }
+    EXPECT_EQ(complaint([] { mapOf(R"(ValueMap{""}, Values{"a"})"); }),
+              "the ValueMap has an empty entry");
+    EXPECT_EQ(complaintAbout("class A {\n [ValueMap{\"1\"}, Values{}] uint8 P;\n"
+                             " [ValueMap{\"z\"}, Values{\"n\"}] uint8 Q; };"),
+              "x.mof:3:37: property 'Q': 'z' in the ValueMap is no integer");
+}
+
+}  // namespace
