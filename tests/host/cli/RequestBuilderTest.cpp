@@ -67,36 +67,39 @@ TEST_F(RequestBuilder, PassesPathPropertiesAndFiltersOn) {
 }
 
 TEST_F(RequestBuilder, GivesValuesTheTypesOfTheClass) {
-    EXPECT_EQ(assigned("Name=a b"), Value("a b"));
-    EXPECT_EQ(assigned("Name="), Value(""));
-    EXPECT_EQ(assigned("Name={x}"), Value("{x}"));
-    EXPECT_EQ(assigned("On=true"), Value::fromBoolean(true));
-    EXPECT_EQ(assigned("Level=-128"), Value::fromSigned(-128, CMPI_sint8));
-    EXPECT_EQ(assigned("Level=127"), Value::fromSigned(127, CMPI_sint8));
-    EXPECT_EQ(assigned("Deep=-9223372036854775808"), Value::fromSigned(INT64_MIN, CMPI_sint64));
-    EXPECT_EQ(assigned("Size=18446744073709551615"),
-              Value::fromUnsigned(18446744073709551615U, CMPI_uint64));
-    EXPECT_EQ(assigned("Size=-0"), Value::fromUnsigned(0, CMPI_uint64));
-    EXPECT_EQ(assigned("Ratio=0.5"), Value::fromReal(0.5, CMPI_real32));
-    EXPECT_EQ(assigned("Wide=-3"), Value::fromReal(-3, CMPI_real64));
-    EXPECT_EQ(assigned("Wide=3"), Value::fromReal(3, CMPI_real64));
-    EXPECT_EQ(assigned("When=20240102030405.000000+000"),
-              Value::fromText("20240102030405.000000+000", CMPI_dateTime));
-    EXPECT_EQ(assigned("Letter='x'"), Value::fromUnsigned('x', CMPI_char16));
-    EXPECT_EQ(assigned("Next=Thing.Name=\"y\""),
-              Value::fromReference({"root/cimv2", "Thing", {{"Name", Value("y")}}}));
-    EXPECT_EQ(assigned("On=NULL"), Value::null(CMPI_boolean));
-}
-
-TEST_F(RequestBuilder, TakesListsInBraces) {
     const Value two = Value::fromUnsigned(2, CMPI_uint16);
-    EXPECT_EQ(assigned("Codes={2, 2}"), Value::fromArray(CMPI_uint16, {two, two}));
-    EXPECT_EQ(assigned("Codes=2"), Value::fromArray(CMPI_uint16, {two}));
-    EXPECT_EQ(assigned("Codes={}"), Value::fromArray(CMPI_uint16, std::vector<Value>()));
-    EXPECT_EQ(assigned("Codes=NULL"), Value::null(CMPI_uint16A));
-    EXPECT_EQ(assigned("Notes={\"a\", \"b,c\"}"),
-              Value::fromArray(CMPI_string, {Value("a"), Value("b,c")}));
-    EXPECT_EQ(assigned("Notes=plain"), Value::fromArray(CMPI_string, {Value("plain")}));
+    const char* const date = "20240102030405.000000+000";
+    const char* const interval = "00000012030405.000000:000";
+    const std::pair<std::string, Value> rows[] = {
+        {"Name=a b", "a b"},
+        {"Name=", ""},
+        {"Name={x}", "{x}"},
+        {"On=true", Value::fromBoolean(true)},
+        {"On=NULL", Value::null(CMPI_boolean)},
+        {"Level=-128", Value::fromSigned(-128, CMPI_sint8)},
+        {"Level=127", Value::fromSigned(127, CMPI_sint8)},
+        {"Deep=-9223372036854775808", Value::fromSigned(INT64_MIN, CMPI_sint64)},
+        {"Size=18446744073709551615", Value::fromUnsigned(UINT64_MAX, CMPI_uint64)},
+        {"Size=-0", Value::fromUnsigned(0, CMPI_uint64)},
+        {"Ratio=0.5", Value::fromReal(0.5, CMPI_real32)},
+        {"Ratio=2", Value::fromReal(2, CMPI_real32)},
+        {"Wide=-3", Value::fromReal(-3, CMPI_real64)},
+        {"Wide=3", Value::fromReal(3, CMPI_real64)},
+        {std::string("When=") + date, Value::fromText(date, CMPI_dateTime)},
+        {std::string("When=") + interval, Value::fromText(interval, CMPI_dateTime)},
+        {"When=null", Value::null(CMPI_dateTime)},
+        {"Letter='x'", Value::fromUnsigned('x', CMPI_char16)},
+        {"Next=Thing.Name=\"y\"",
+         Value::fromReference({"root/cimv2", "Thing", {{"Name", Value("y")}}})},
+        {"Codes={2, 2}", Value::fromArray(CMPI_uint16, {two, two})},
+        {"Codes=2", Value::fromArray(CMPI_uint16, {two})},
+        {"Codes={}", Value::fromArray(CMPI_uint16, std::vector<Value>())},
+        {"Codes=NULL", Value::null(CMPI_uint16A)},
+        {"Notes={\"a\", \"b,c\"}", Value::fromArray(CMPI_string, {Value("a"), Value("b,c")})},
+        {"Notes=plain", Value::fromArray(CMPI_string, {Value("plain")})},
+    };
+    for (const auto& [assignment, value] : rows)
+        EXPECT_EQ(assigned(assignment), value) << assignment;
 }
 
 TEST_F(RequestBuilder, TakesValuesOfAnUnknownClassAsTexts) {
@@ -125,33 +128,29 @@ TEST_F(RequestBuilder, ModifiesTheAssignedPropertiesOnly) {
 }
 
 TEST_F(RequestBuilder, RefusesValuesThatDoNotFit) {
-    EXPECT_EQ(refusal("Thing", {"Level=128"}),
-              "'128' is no value of type sint8 for the property 'Level'");
-    EXPECT_EQ(refusal("Thing", {"Size=-1"}),
-              "'-1' is no value of type uint64 for the property 'Size'");
-    EXPECT_EQ(refusal("Thing", {"On=1"}), "'1' is no value of type boolean for the property 'On'");
-    EXPECT_EQ(refusal("Thing", {"Level={1}"}),
-              "'{1}' is a list, no single value, for the property 'Level'");
-    EXPECT_EQ(refusal("Thing", {"On=maybe"}),
-              "the value of 'On': expected a value (a string, a number, a character, TRUE, "
-              "FALSE or NULL), found 'maybe'");
-    EXPECT_EQ(refusal("Thing", {"Size=1 2"}),
-              "the value of 'Size': expected nothing after the value, found '2'");
-    EXPECT_EQ(refusal("Thing", {"Weight=1"}), "the class 'Thing' has no property 'Weight'");
-    EXPECT_EQ(refusal("Thing", {"On=TRUE", "on=FALSE"}), "the property 'On' stands twice");
-    EXPECT_EQ(refusal("Thing", {"On"}), "expected NAME=VALUE, found 'On'");
-    EXPECT_EQ(refusal("Thing", {"=1"}), "expected NAME=VALUE, found '=1'");
+    const struct {
+        std::vector<std::string> assignments;
+        const char* complaint;
+    } rows[] = {
+        {{"Level=128"}, "'128' is no value of type sint8 for the property 'Level'"},
+        {{"Size=-1"}, "'-1' is no value of type uint64 for the property 'Size'"},
+        {{"On=1"}, "'1' is no value of type boolean for the property 'On'"},
+        {{"Level={1}"}, "'{1}' is a list, no single value, for the property 'Level'"},
+        {{"On=maybe"},
+         "the value of 'On': expected a value (a string, a number, a character, TRUE, FALSE or "
+         "NULL), found 'maybe'"},
+        {{"Size=1 2"}, "the value of 'Size': expected nothing after the value, found '2'"},
+        {{"Weight=1"}, "the class 'Thing' has no property 'Weight'"},
+        {{"On=TRUE", "on=FALSE"}, "the property 'On' stands twice"},
+        {{"On"}, "expected NAME=VALUE, found 'On'"},
+        {{"=1"}, "expected NAME=VALUE, found '=1'"},
+    };
+    for (const auto& row : rows) EXPECT_EQ(refusal("Thing", row.assignments), row.complaint);
     EXPECT_EQ(refusal("Stranger", {"A\x1b=1", "a\x1b=2"}), "the property 'a\\x1b' stands twice");
-}
-
-TEST_F(RequestBuilder, TakesDatetimesOnly) {
-    EXPECT_EQ(assigned("When=00000012030405.000000:000"),
-              Value::fromText("00000012030405.000000:000", CMPI_dateTime));
-    EXPECT_EQ(assigned("When=null"), Value::null(CMPI_dateTime));
-    for (const char* wrong : {"yesterday", "", "20241302030405.000000+000", "{1}", "2024-01-02"}) {
-        EXPECT_EQ(
-            refusal("Thing", {std::string("When=") + wrong}),
-            "'" + std::string(wrong) + "' is no value of type datetime for the property 'When'");
+    for (const std::string wrong :
+         {"yesterday", "", "20241302030405.000000+000", "{1}", "2024-01-02"}) {
+        EXPECT_EQ(refusal("Thing", {"When=" + wrong}),
+                  "'" + wrong + "' is no value of type datetime for the property 'When'");
     }
 }
 
