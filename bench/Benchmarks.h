@@ -1,12 +1,13 @@
 // The groups of benchmarks; docs/benchmarks.md lists what each measures.
-#pragma once
+#ifndef BENCH_BENCHMARKS_H
+#define BENCH_BENCHMARKS_H
 
 #include "bench/Logging.h"
 #include "bench/Setting.h"
 
 namespace bench {
 
-/// "request/…": every request of the list, by provider and floor. "nodes/…": some of them with a
+/// "request/…": every request of the list, by provider and baseline. "nodes/…": some of them with a
 /// growing number of nodes. `setting` outlives the benchmarks.
 void addRequestBenchmarks(Setting& setting);
 
@@ -18,3 +19,5 @@ void addHostBenchmarks(Setting& setting);
 void addLoggingBenchmarks(LoggingConfiguration& logging);
 
 }  // namespace bench
+
+#endif

@@ -1,3 +1,5 @@
+// Counts below the C library's own functions: whatever a request allocates or opens, through
+// whichever library, is seen.
 #include "bench/Counts.h"
 
 #include <dirent.h>

@@ -1,6 +1,7 @@
 // What the process does: allocations, memory in use, files opened. The counting functions take the
 // place of the C library's in programs that link this, and count while a watch is on.
-#pragma once
+#ifndef BENCH_COUNTS_H
+#define BENCH_COUNTS_H
 
 #include <cstddef>
 
@@ -24,3 +25,5 @@ class Watch {
 };
 
 }  // namespace bench
+
+#endif

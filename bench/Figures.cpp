@@ -1,3 +1,4 @@
+// Google Benchmark repeats and interleaves; a report wants one figure for each name.
 #include "bench/Figures.h"
 
 #include <algorithm>

@@ -1,5 +1,6 @@
 // The figures of a run, as Google Benchmark and callgrind leave them.
-#pragma once
+#ifndef BENCH_FIGURES_H
+#define BENCH_FIGURES_H
 
 #include <map>
 #include <string>
@@ -34,8 +35,10 @@ class Figures {
     std::string machine_;
 };
 
-/// Instructions a request by name ("EnumerateInstances KORVA_RunningOS/floor"): lines of the name,
-/// a tab and the number. Throws std::runtime_error.
+/// Instructions a request by name ("EnumerateInstances KORVA_RunningOS/baseline"): lines of the
+/// name, a tab and the number. Throws std::runtime_error.
 std::map<std::string, double> readInstructions(const std::string& file);
 
 }  // namespace bench
+
+#endif

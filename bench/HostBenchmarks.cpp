@@ -4,7 +4,6 @@
 
 #include "bench/Benchmarks.h"
 #include "bench/Counts.h"
-#include "bench/Requests.h"
 #include "framework/instrumentation/HostSource.h"
 #include "tests/support/SystemCalls.h"
 
@@ -91,7 +90,7 @@ void addHostBenchmarks(Setting& setting) {
             [&part](benchmark::State& state) { measurePart(state, part); });
     for (const char* name : {"EnumerateInstanceNames KORVA_OperatingSystem",
                              "EnumerateInstances KORVA_OperatingSystem"})
-        for (const Answerer answerer : {Answerer::Provider, Answerer::Floor})
+        for (const Answerer answerer : {Answerer::Provider, Answerer::Baseline})
             benchmark::RegisterBenchmark(
                 (std::string("host/") + name + ", " + nameOf(answerer)).c_str(),
                 [&setting, answerer, name](benchmark::State& state) {

@@ -1,3 +1,4 @@
+// Measured requests must not meet a configuration that this machine happens to have.
 #include "bench/Logging.h"
 
 #include "Trace.h"

@@ -1,5 +1,6 @@
 // How the logging behaves while something is measured.
-#pragma once
+#ifndef BENCH_LOGGING_H
+#define BENCH_LOGGING_H
 
 #include <string>
 
@@ -28,3 +29,5 @@ class LoggingConfiguration {
 };
 
 }  // namespace bench
+
+#endif

@@ -1,11 +1,10 @@
-// Every request of the list, answered by the provider and by the floor; what a growing number of
+// Every request of the list, answered by the provider and by the baseline; what a growing number of
 // nodes costs; and what the facade costs beyond the provider.
 
 #include <benchmark/benchmark.h>
 
 #include "bench/Benchmarks.h"
 #include "bench/Counts.h"
-#include "bench/Requests.h"
 
 namespace bench {
 namespace {
@@ -47,7 +46,7 @@ void measure(benchmark::State& state, Setting& setting, Answerer answerer,
 
 void add(Setting& setting, const std::string& group, const std::string& name,
          const cmpihost::OperationRequest& request, unsigned nodes,
-         Answerer against = Answerer::Floor) {
+         Answerer against = Answerer::Baseline) {
     for (const Answerer answerer : {Answerer::Provider, against}) {
         benchmark::RegisterBenchmark(
             (group + "/" + name + "/" + std::to_string(nodes) + "/" + nameOf(answerer)).c_str(),

@@ -1,9 +1,9 @@
+// One broker and one host under all that is compared, so that only the answering library differs.
 #include "bench/Setting.h"
 
-#include "bench/Requests.h"
 #include "framework/instrumentation/HostSource.h"
-#include "host/mof/Schema.h"
 
+#include <algorithm>
 #include <stdexcept>
 
 namespace bench {
@@ -12,9 +12,18 @@ using namespace cmpihost;
 
 namespace {
 
-const ClassCatalogue& schemaCatalogue() {
-    static const SchemaCatalogue catalogue(Schema::load(KORVA_SOURCE_DIR "/schema"));
-    return catalogue;
+std::vector<NamedRequest> makeRequests() {
+    std::vector<NamedRequest> made;
+    for (const NamedRequest& each :
+         servedRequests({"simulated.example", "Simulated Linux", "Simulated Linux"}))
+        if (each.plain) made.push_back(each);
+    for (const NamedRequest& each : refusedRequests()) made.push_back(each);
+    for (NamedRequest& each : made) {
+        each.name =
+            std::string(operationName(each.request.operation)) + " " + each.request.path.className;
+        if (each.request.assocClass) each.name += " " + *each.request.assocClass;
+    }
+    return made;
 }
 
 LoadOptions optionsOf(const char* providerName) {
@@ -25,16 +34,28 @@ LoadOptions optionsOf(const char* providerName) {
 
 }  // namespace
 
+const std::vector<NamedRequest>& requests() {
+    static const std::vector<NamedRequest> all = makeRequests();
+    return all;
+}
+
+const OperationRequest& requestNamed(const std::string& name) {
+    const auto found = std::find_if(requests().begin(), requests().end(),
+                                    [&](const NamedRequest& each) { return each.name == name; });
+    if (found == requests().end()) throw std::invalid_argument("no request " + name);
+    return found->request;
+}
+
 const char* nameOf(Answerer answerer) noexcept {
     switch (answerer) {
         case Answerer::Provider:
             return "provider";
         case Answerer::Facade:
             return "facade";
-        case Answerer::Floor:
+        case Answerer::Baseline:
             break;
     }
-    return "floor";
+    return "baseline";
 }
 
 Setting::Setting()
@@ -44,7 +65,8 @@ Setting::Setting()
       provider_(KORVA_BINARY_DIR "/lib/libkorzbosstatusprofileprovider.so.1", broker_),
       facade_(KORVA_BINARY_DIR "/lib/libkorvaosstatusfacade.so.1", broker_,
               optionsOf("OSStatusFacade")),
-      floor_(KORVA_BINARY_DIR "/lib/libkorvafloor.so", broker_, optionsOf("FloorProvider")) {
+      baseline_(KORVA_BINARY_DIR "/lib/libkorvabaseline.so", broker_,
+                optionsOf("BaselineProvider")) {
     broker_.route(ComputerSystemService::className, computers_);
     useSimulatedHost();
 }
@@ -59,10 +81,10 @@ const ProviderLibrary& Setting::library(Answerer answerer) const {
             return provider_;
         case Answerer::Facade:
             return facade_;
-        case Answerer::Floor:
+        case Answerer::Baseline:
             break;
     }
-    return floor_;
+    return baseline_;
 }
 
 Outcome Setting::run(Answerer answerer, const OperationRequest& request) {
@@ -74,7 +96,7 @@ Outcome Setting::run(Answerer answerer, const OperationRequest& request) {
 void Setting::setNodes(unsigned count) {
     host_->clearNodes();
     host_->addNodes(VA::SimulatedHost::plausibleNode(), count);
-    reinterpret_cast<void (*)(unsigned)>(floor_.symbol("setFloorNodes"))(count);
+    reinterpret_cast<void (*)(unsigned)>(baseline_.symbol("setBaselineNodes"))(count);
 }
 
 void Setting::useRealHost() {
@@ -88,10 +110,10 @@ void Setting::useSimulatedHost() {
 void Setting::compareAnswers() {
     for (const NamedRequest& each : requests()) {
         const Outcome ours = run(Answerer::Provider, each.request);
-        const Outcome floors = run(Answerer::Floor, each.request);
-        if (ours.rc != floors.rc || ours.doneCount != floors.doneCount ||
-            ours.paths != floors.paths || ours.instances != floors.instances)
-            throw std::runtime_error("provider and floor differ on " + each.name);
+        const Outcome baselines = run(Answerer::Baseline, each.request);
+        if (ours.rc != baselines.rc || ours.doneCount != baselines.doneCount ||
+            ours.paths != baselines.paths || ours.instances != baselines.instances)
+            throw std::runtime_error("provider and baseline differ on " + each.name);
     }
 }
 

@@ -4,7 +4,6 @@
 #include <valgrind/callgrind.h>
 
 #include "bench/Logging.h"
-#include "bench/Requests.h"
 #include "bench/Setting.h"
 
 #include <exception>
@@ -15,8 +14,7 @@ namespace {
 
 constexpr int rounds = 100;
 
-void measure(bench::Setting& setting, bench::Answerer answerer,
-             const bench::NamedRequest& request) {
+void measure(bench::Setting& setting, bench::Answerer answerer, const NamedRequest& request) {
     setting.run(answerer, request.request);
     CALLGRIND_ZERO_STATS;
     for (int round = 0; round < rounds; ++round) setting.run(answerer, request.request);
@@ -37,10 +35,10 @@ int main(int argc, char** argv) try {
     const bench::LoggingConfiguration logging;
     bench::Setting setting;
     setting.compareAnswers();
-    for (const bench::NamedRequest& request : bench::requests()) {
+    for (const NamedRequest& request : bench::requests()) {
         if (request.name.find(part) == std::string::npos) continue;
         measure(setting, bench::Answerer::Provider, request);
-        measure(setting, bench::Answerer::Floor, request);
+        measure(setting, bench::Answerer::Baseline, request);
     }
     return 0;
 } catch (const std::exception& caught) {

@@ -33,7 +33,7 @@ std::string microseconds(double nanoseconds) {
     return fixed(nanoseconds / 1000, 2);
 }
 
-/// The highest ratio to the floor that a request is to have, 0 for none.
+/// The highest ratio to the baseline that a request is to have, 0 for none.
 double limitOf(const std::string& request) {
     if (request == "EnumerateInstances KORVA_OperatingSystem" ||
         request == "GetInstance KORVA_OperatingSystem")
@@ -119,22 +119,24 @@ void printHostRequests(const Figures& figures, const Figures& before, Verdict& v
 
 void printRequests(const Figures& figures, const std::map<std::string, double>& instructions,
                    Verdict& verdict) {
-    std::cout << "\n## Requests on a simulated host\n\nOne node. Times in microseconds, "
-                 "instructions in thousands.\n\n"
-                 "| request | time | floor | ratio | limit | instructions | floor | ratio | "
-                 "allocations | floor | opened |\n|---|--:|--:|--:|--:|--:|--:|--:|--:|--:|--:|\n";
+    std::cout
+        << "\n## Requests on a simulated host\n\nOne node. Times in microseconds, "
+           "instructions in thousands.\n\n"
+           "| request | time | baseline | ratio | limit | instructions | baseline | ratio | "
+           "allocations | baseline | opened |\n|---|--:|--:|--:|--:|--:|--:|--:|--:|--:|--:|\n";
     for (const std::string& request : requestsOf(figures, "request/")) {
         const bench::Figure& ours = figureOf(figures, "request/", request, 1, "provider");
-        const bench::Figure& floor = figureOf(figures, "request/", request, 1, "floor");
-        const double ratio = ours.nanoseconds / floor.nanoseconds;
+        const bench::Figure& baseline = figureOf(figures, "request/", request, 1, "baseline");
+        const double ratio = ours.nanoseconds / baseline.nanoseconds;
         const double ourWork = instructions.at(request + "/provider");
-        const double floorWork = instructions.at(request + "/floor");
+        const double baselineWork = instructions.at(request + "/baseline");
         std::cout << "| " << request << " | " << microseconds(ours.nanoseconds) << " | "
-                  << microseconds(floor.nanoseconds) << " | " << fixed(ratio, 2) << " | "
+                  << microseconds(baseline.nanoseconds) << " | " << fixed(ratio, 2) << " | "
                   << verdict.cell(ratio, limitOf(request)) << " | " << fixed(ourWork / 1000, 1)
-                  << " | " << fixed(floorWork / 1000, 1) << " | " << fixed(ourWork / floorWork, 2)
-                  << " | " << ours.counts.at("allocations") << " | "
-                  << floor.counts.at("allocations") << " | " << ours.counts.at("opened") << " |\n";
+                  << " | " << fixed(baselineWork / 1000, 1) << " | "
+                  << fixed(ourWork / baselineWork, 2) << " | " << ours.counts.at("allocations")
+                  << " | " << baseline.counts.at("allocations") << " | " << ours.counts.at("opened")
+                  << " |\n";
     }
 }
 
@@ -166,23 +168,23 @@ void printNodes(const Figures& figures, Verdict& verdict) {
     std::cout
         << "\n## Nodes\n\nWhat one node costs beyond a request without nodes, in "
            "microseconds, and how that compares with the first node. The memory is what a "
-           "request has in use at its peak beyond what the floor has, in bytes a node.\n\n"
-           "| request | nodes | a node | to the first | limit | floor | to the first | memory "
+           "request has in use at its peak beyond what the baseline has, in bytes a node.\n\n"
+           "| request | nodes | a node | to the first | limit | baseline | to the first | memory "
            "|\n|---|--:|--:|--:|--:|--:|--:|--:|\n";
     for (const std::string& request : requestsOf(figures, "nodes/")) {
         const double first = costOfNode(figures, request, "provider", 1);
-        const double floorFirst = costOfNode(figures, request, "floor", 1);
+        const double baselineFirst = costOfNode(figures, request, "baseline", 1);
         for (const unsigned nodes : {1U, 10U, 1000U, 100000U}) {
             const double ours = costOfNode(figures, request, "provider", nodes);
-            const double floor = costOfNode(figures, request, "floor", nodes);
+            const double baseline = costOfNode(figures, request, "baseline", nodes);
             const auto peak = [&](const char* who) {
                 return figureOf(figures, "nodes/", request, nodes, who).counts.at("peakBytes");
             };
             std::cout << "| " << request << " | " << nodes << " | " << microseconds(ours) << " | "
                       << fixed(ours / first, 2) << " | "
                       << (nodes == 1 ? "" : verdict.cell(ours / first, 1.2)) << " | "
-                      << microseconds(floor) << " | " << fixed(floor / floorFirst, 2) << " | "
-                      << fixed((peak("provider") - peak("floor")) / nodes, 0) << " |\n";
+                      << microseconds(baseline) << " | " << fixed(baseline / baselineFirst, 2)
+                      << " | " << fixed((peak("provider") - peak("baseline")) / nodes, 0) << " |\n";
         }
     }
 }

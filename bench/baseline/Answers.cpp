@@ -1,8 +1,15 @@
+// What the provider gives for the plausible node, as constants: nothing is left to compute, so that
+// the baseline costs what the broker costs.
 #include "Answers.h"
 
 #include <strings.h>
 
-namespace floorprovider {
+#include <array>
+#include <iterator>
+
+#include "support/Properties.h"
+
+namespace baseline {
 namespace {
 
 template <unsigned keyCount>
@@ -20,10 +27,6 @@ constexpr Property text(const char* name, const char* value) {
     return {name, CMPI_chars, value};
 }
 
-constexpr Property moment(const char* name, const char* value) {
-    return {name, CMPI_dateTime, value};
-}
-
 constexpr Property number(const char* name, CMPIType type, unsigned long long value) {
     return {name, type, nullptr, value};
 }
@@ -32,9 +35,27 @@ constexpr Property reference(const char* name, const Path& value) {
     return {name, CMPI_ref, nullptr, 0, &value};
 }
 
-template <unsigned length>
-constexpr Property list(const char* name, const unsigned short (&values)[length]) {
-    return {name, CMPI_uint16A, nullptr, 0, nullptr, values, length};
+constexpr unsigned short operationalStatus[] = {2, 11};
+
+// The property of the list that all tests use, in the form in which it is set.
+constexpr Property published(const PublishedProperty& property) {
+    if (property.type == CMPI_uint16A)
+        return {property.name, CMPI_uint16A, nullptr, 0, nullptr, operationalStatus, 2};
+    if (property.isFlag()) return number(property.name, CMPI_boolean, property.value[0] == 't');
+    if (property.isText())
+        return {property.name, property.type == CMPI_string ? CMPIType{CMPI_chars} : property.type,
+                property.value};
+    unsigned long long value = 0;
+    for (const char* digit = property.value; *digit != '\0'; ++digit)
+        value = value * 10 + static_cast<unsigned long long>(*digit - '0');
+    return number(property.name, property.type, value);
+}
+
+constexpr auto publishedProperties() {
+    std::array<Property, std::size(operatingSystemProperties)> result{};
+    for (std::size_t index = 0; index < result.size(); ++index)
+        result[index] = published(operatingSystemProperties[index]);
+    return result;
 }
 
 constexpr char computerName[] = "simulated.example";
@@ -55,35 +76,7 @@ constexpr Key systemKeys[] = {
     {"CreationClassName", "KORVA_OperatingSystem", nullptr},
     {"Name", systemName, nullptr},
 };
-constexpr unsigned short operationalStatus[] = {2, 11};
-constexpr Property systemProperties[] = {
-    text("CSCreationClassName", "KORVA_ComputerSystem"),
-    text("CSName", computerName),
-    text("CreationClassName", "KORVA_OperatingSystem"),
-    text("Name", systemName),
-    text("Description", ""),
-    moment("InstallDate", "20230610090807.000000+000"),
-    list("OperationalStatus", operationalStatus),
-    number("HealthState", CMPI_uint16, 5),
-    text("Status", "OK"),
-    number("EnabledState", CMPI_uint16, 2),
-    number("OSType", CMPI_uint16, 36),
-    text("Version", "12.5"),
-    moment("LastBootUpTime", "20240229235958.000000+000"),
-    number("NumberOfLicensedUsers", CMPI_uint32, 0),
-    number("NumberOfUsers", CMPI_uint32, 3),
-    number("NumberOfProcesses", CMPI_uint32, 211),
-    number("MaxNumberOfProcesses", CMPI_uint32, 32768),
-    number("TotalSwapSpaceSize", CMPI_uint64, 2097152),
-    number("TotalVirtualMemorySize", CMPI_uint64, 18874368),
-    number("FreeVirtualMemory", CMPI_uint64, 13631488),
-    number("FreePhysicalMemory", CMPI_uint64, 12058624),
-    number("TotalVisibleMemorySize", CMPI_uint64, 16777216),
-    number("SizeStoredInPagingFiles", CMPI_uint64, 2097151),
-    number("FreeSpaceInPagingFiles", CMPI_uint64, 1572864),
-    number("MaxProcessMemorySize", CMPI_uint64, 67108864),
-    number("Distributed", CMPI_boolean, 0),
-};
+constexpr auto systemProperties = publishedProperties();
 
 constexpr Key capabilitiesKeys[] = {{"InstanceID", systemName, nullptr}};
 constexpr Property capabilitiesProperties[] = {
@@ -126,7 +119,7 @@ constexpr Property elementProperties[] = {
 
 constexpr Answer computer = answer("KORVA_ComputerSystem", computerKeys, computerProperties);
 constexpr Answer served[] = {
-    answer("KORVA_OperatingSystem", systemKeys, systemProperties),
+    {path("KORVA_OperatingSystem", systemKeys), systemProperties.data(), systemProperties.size()},
     answer("KORVA_OperatingSystemCapabilities", capabilitiesKeys, capabilitiesProperties),
     answer("KORVA_InstalledOS", installedKeys, installedProperties),
     answer("KORVA_RunningOS", runningKeys, runningProperties),
@@ -164,4 +157,4 @@ const Answer* farEndOf(const char* sourceClass, const char* assocClass) {
     return nullptr;
 }
 
-}  // namespace floorprovider
+}  // namespace baseline

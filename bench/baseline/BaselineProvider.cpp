@@ -1,4 +1,4 @@
-// The floor: a CMPI library that answers what the provider answers, from constants and without a
+// The baseline: a CMPI library that answers what the provider answers, from constants and without a
 // record. What the provider costs beyond it is the price of being a provider.
 
 #include <cmpi/cmpidt.h>
@@ -8,7 +8,7 @@
 
 #include "Answers.h"
 
-namespace floorprovider {
+namespace baseline {
 namespace {
 
 const CMPIBroker* broker = nullptr;
@@ -172,37 +172,37 @@ CMPIStatus referenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResu
 }
 
 CMPIInstanceMIFT instanceTable = {
-    CMPIVersion200,    CMPIVersion200, "instanceFloor", cleanup,
-    enumInstanceNames, enumInstances,  getInstance,     createInstance,
+    CMPIVersion200,    CMPIVersion200, "instanceBaseline", cleanup,
+    enumInstanceNames, enumInstances,  getInstance,        createInstance,
     modifyInstance,    deleteInstance, execQuery,
 };
 
 CMPIAssociationMIFT associationTable = {
-    CMPIVersion200, CMPIVersion200,  "associationFloor", associationCleanup,
-    associators,    associatorNames, references,         referenceNames,
+    CMPIVersion200,  CMPIVersion200, "associationBaseline", associationCleanup, associators,
+    associatorNames, references,     referenceNames,
 };
 
 }  // namespace
-}  // namespace floorprovider
+}  // namespace baseline
 
 extern "C" {
 
 /// How many times an enumeration returns its answer.
-[[gnu::visibility("default")]] void setFloorNodes(unsigned count) {
-    floorprovider::nodes = count;
+[[gnu::visibility("default")]] void setBaselineNodes(unsigned count) {
+    baseline::nodes = count;
 }
 
-[[gnu::visibility("default")]] CMPIInstanceMI* FloorProvider_Create_InstanceMI(
+[[gnu::visibility("default")]] CMPIInstanceMI* BaselineProvider_Create_InstanceMI(
     const CMPIBroker* broker, const CMPIContext*, CMPIStatus*) {
-    static CMPIInstanceMI mi = {nullptr, &floorprovider::instanceTable};
-    floorprovider::broker = broker;
+    static CMPIInstanceMI mi = {nullptr, &baseline::instanceTable};
+    baseline::broker = broker;
     return &mi;
 }
 
-[[gnu::visibility("default")]] CMPIAssociationMI* FloorProvider_Create_AssociationMI(
+[[gnu::visibility("default")]] CMPIAssociationMI* BaselineProvider_Create_AssociationMI(
     const CMPIBroker* broker, const CMPIContext*, CMPIStatus*) {
-    static CMPIAssociationMI mi = {nullptr, &floorprovider::associationTable};
-    floorprovider::broker = broker;
+    static CMPIAssociationMI mi = {nullptr, &baseline::associationTable};
+    baseline::broker = broker;
     return &mi;
 }
 }

@@ -1,10 +1,11 @@
-// What the floor answers: the paths and instances that the provider gives for one simulated node,
-// as constants.
-#pragma once
+// What the baseline answers: the paths and instances that the provider gives for one simulated
+// node, as constants.
+#ifndef BENCH_BASELINE_ANSWERS_H
+#define BENCH_BASELINE_ANSWERS_H
 
 #include <cmpi/cmpidt.h>
 
-namespace floorprovider {
+namespace baseline {
 
 struct Path;
 
@@ -44,4 +45,6 @@ const Answer* answerOf(const char* className);
 /// The far end of a source of one class through an association, null if there is none.
 const Answer* farEndOf(const char* sourceClass, const char* assocClass);
 
-}  // namespace floorprovider
+}  // namespace baseline
+
+#endif
