@@ -1,6 +1,9 @@
+// Bytes choose among what is likely before they spell anything: so inputs soon reach the handlers.
 #include "fuzz/Decoder.h"
 
 #include <utility>
+
+#include "support/Requests.h"
 
 namespace fuzz {
 
@@ -39,54 +42,26 @@ constexpr CMPIType scalarTypes[] = {
     CMPI_sint32, CMPI_sint64, CMPI_real32,  CMPI_real64, CMPI_dateTime,
 };
 
-ObjectPathValue pathOf(const char* className, std::vector<cmpihost::KeyBinding> keys) {
-    return {"root/cimv2", className, std::move(keys)};
-}
-
-ObjectPathValue operatingSystem(const std::string& name) {
-    return pathOf("KORVA_OperatingSystem", {{"CSCreationClassName", "KORVA_ComputerSystem"},
-                                            {"CSName", "host1"},
-                                            {"CreationClassName", "KORVA_OperatingSystem"},
-                                            {"Name", name}});
-}
-
-ObjectPathValue capabilities(const std::string& id) {
-    return pathOf("KORVA_OperatingSystemCapabilities", {{"InstanceID", id}});
-}
-
-ObjectPathValue computerSystem(const std::string& name) {
-    return pathOf("KORVA_ComputerSystem",
-                  {{"CreationClassName", "KORVA_ComputerSystem"}, {"Name", name}});
-}
-
-ObjectPathValue association(const char* className, const char* first, ObjectPathValue firstEnd,
-                            const char* second, ObjectPathValue secondEnd) {
-    return pathOf(className, {{first, Value::fromReference(std::move(firstEnd))},
-                              {second, Value::fromReference(std::move(secondEnd))}});
-}
-
 }  // namespace
 
 ObjectPathValue Decoder::knownPath() {
     const auto kind = numberUpTo(5);
     const std::string name = textLike(texts);
     const std::string other = flag() ? textLike(texts) : name;
+    const ObjectPathValue system = operatingSystemPath("host1", name);
     switch (kind) {
         case 0:
-            return operatingSystem(name);
+            return system;
         case 1:
-            return capabilities(name);
+            return capabilitiesPath(name);
         case 2:
-            return computerSystem(name);
+            return computerSystemPath(name);
         case 3:
-            return association("KORVA_OSElementCapabilities", "ManagedElement",
-                               operatingSystem(name), "Capabilities", capabilities(other));
+            return pairPath(elementCapabilities, system, capabilitiesPath(other));
         case 4:
-            return association("KORVA_InstalledOS", "GroupComponent", computerSystem(other),
-                               "PartComponent", operatingSystem(name));
+            return pairPath(installedOS, computerSystemPath(other), system);
         default:
-            return association("KORVA_RunningOS", "Antecedent", operatingSystem(name), "Dependent",
-                               computerSystem(other));
+            return pairPath(runningOS, system, computerSystemPath(other));
     }
 }
 

@@ -1,6 +1,7 @@
 // Turns bytes into what a client, a broker or a host may say. Every input has a meaning; where it
 // ends, the plainest choice is taken.
-#pragma once
+#ifndef TESTS_FUZZ_DECODER_H
+#define TESTS_FUZZ_DECODER_H
 
 #include <fuzzer/FuzzedDataProvider.h>
 
@@ -60,3 +61,5 @@ class Decoder {
 };
 
 }  // namespace fuzz
+
+#endif

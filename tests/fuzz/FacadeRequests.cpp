@@ -2,7 +2,7 @@
 #include <set>
 
 #include "fuzz/Invariant.h"
-#include "fuzz/RequestRun.h"
+#include "fuzz/RequestCheck.h"
 
 // The facade's factories, as an object manager looks them up.
 extern "C" {
@@ -58,17 +58,17 @@ void checkFaultless(Operation operation, const Outcome& outcome) {
     }
 }
 
-void check(const fuzz::Scene& scene, const fuzz::Ending& ending, cmpihost::Broker& broker) {
+void check(const fuzz::FuzzCase& fuzzCase, const fuzz::Ending& ending, cmpihost::Broker& broker) {
     expect(ending.outcome.has_value(), "no exception leaves the facade");
     const Outcome& outcome = *ending.outcome;
     const bool served = outcome.rc == CMPI_RC_OK;
     expect(served || delivered(outcome) == 0, "a refusal delivers nothing");
     expect(outcome.doneCount <= (served ? 1U : 0U), "the end of an answer is reported once");
-    const bool faultless = ending.faultsFired == 0 && scene.logThrowsFrom == 0;
+    const bool faultless = ending.faultsFired == 0 && fuzzCase.logThrowsFrom == 0;
     expect(!faultless || !served || outcome.doneCount == 1, "the end of an answer is reported");
-    if (faultless && scene.exception == fuzz::HostException::None)
-        checkFaultless(scene.request.operation, outcome);
-    fuzz::checkManners(scene, broker);
+    if (faultless && fuzzCase.exception == fuzz::HostException::None)
+        checkFaultless(fuzzCase.request.operation, outcome);
+    fuzz::checkManners(fuzzCase, broker);
 }
 
 }  // namespace

@@ -1,5 +1,6 @@
 // What a fuzz target expects beyond not crashing.
-#pragma once
+#ifndef TESTS_FUZZ_INVARIANT_H
+#define TESTS_FUZZ_INVARIANT_H
 
 #include <cstddef>
 #include <cstdint>
@@ -22,3 +23,5 @@ inline std::string_view textOf(const std::uint8_t* data, std::size_t size) {
 }
 
 }  // namespace fuzz
+
+#endif

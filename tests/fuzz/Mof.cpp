@@ -41,7 +41,8 @@ void checkSchema(const Schema& schema) {
 void checkText(std::string_view text) {
     const std::string written = mof::stringLiteral(text);
     mof::Lexer lexer(written, "written");
-    fuzz::expect(lexer.next().text == base::toValidUtf8(text), "a text is read back as it was written");
+    fuzz::expect(lexer.next().text == base::toValidUtf8(text),
+                 "a text is read back as it was written");
     fuzz::expect(lexer.next().kind == mof::TokenKind::End, "a text is one token");
 }
 

@@ -3,16 +3,11 @@
 
 #include "fuzz/Invariant.h"
 #include "host/cli/PathParser.h"
-#include "host/mof/Schema.h"
+#include "support/Requests.h"
 
 using namespace cmpihost;
 
 namespace {
-
-const SchemaCatalogue& catalogue() {
-    static const SchemaCatalogue made(Schema::load(KORVA_SOURCE_DIR "/schema"));
-    return made;
-}
 
 void checkError(const PathError& error, const std::string& text) {
     const std::string shown = error.what();
@@ -43,7 +38,7 @@ void checkRoundTrip(const ObjectPathValue& path, const ClassCatalogue* classes) 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     const std::string text(fuzz::textOf(data, size));
     for (const ClassCatalogue* classes : {static_cast<const ClassCatalogue*>(nullptr),
-                                          static_cast<const ClassCatalogue*>(&catalogue())}) {
+                                          static_cast<const ClassCatalogue*>(&schemaCatalogue())}) {
         try {
             checkRoundTrip(parsePath(text, classes), classes);
         } catch (const PathError& error) {

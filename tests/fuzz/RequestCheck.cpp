@@ -1,14 +1,19 @@
+// What a request must leave behind whatever its bytes decode to. The provider and the facade differ
+// in what they answer, but not in how they are run.
 #include "fuzz/RequestCheck.h"
 
 #include <algorithm>
+#include <cstdio>
+#include <cstdlib>
 
 #include "fuzz/Invariant.h"
 #include "fuzz/StrictLog.h"
+#include "host/broker/ResultCollector.h"
+#include "support/Requests.h"
 
 namespace fuzz {
 
-using cmpihost::Operation;
-using cmpihost::Outcome;
+using namespace cmpihost;
 
 namespace {
 
@@ -30,7 +35,7 @@ bool isAssociationOperation(Operation operation) {
 }
 
 // Whether the request's class selects an adapter. A name ends where its C string ends.
-bool isServed(const cmpihost::OperationRequest& request) {
+bool isServed(const OperationRequest& request) {
     constexpr const char* associations[] = {"KORVA_InstalledOS", "KORVA_RunningOS",
                                             "KORVA_OSElementCapabilities"};
     constexpr const char* elements[] = {"KORVA_OperatingSystem",
@@ -39,7 +44,7 @@ bool isServed(const cmpihost::OperationRequest& request) {
     const std::string given =
         association ? request.assocClass.value_or("") : request.path.className;
     const auto named = [name = std::string(given.c_str())](const char* each) {
-        return cmpihost::equalNames(name, each);
+        return equalNames(name, each);
     };
     return std::any_of(std::begin(associations), std::end(associations), named) ||
            (!association && std::any_of(std::begin(elements), std::end(elements), named));
@@ -53,36 +58,36 @@ void checkRefusal(const Outcome& outcome) {
 }
 
 // A request for all elements of a class whose elements are the nodes.
-bool asksForEveryNode(const cmpihost::OperationRequest& request) {
+bool asksForEveryNode(const OperationRequest& request) {
     constexpr const char* elements[] = {"KORVA_OperatingSystem",
                                         "KORVA_OperatingSystemCapabilities"};
     const std::string name = request.path.className.c_str();
     return !isAssociationOperation(request.operation) && request.path.keys.empty() &&
            std::any_of(std::begin(elements), std::end(elements),
-                       [&](const char* each) { return cmpihost::equalNames(name, each); });
+                       [&](const char* each) { return equalNames(name, each); });
 }
 
-void checkCount(const Scene& scene, const Outcome& outcome) {
+void checkCount(const FuzzCase& fuzzCase, const Outcome& outcome) {
     const std::size_t found = outcome.paths.size() + outcome.refusedPaths.size() +
                               outcome.instances.size() + outcome.refusedInstances.size();
-    if (outcome.doneCount == 1 && asksForEveryNode(scene.request))
-        expect(found == scene.nodes, "every node is one element");
+    if (outcome.doneCount == 1 && asksForEveryNode(fuzzCase.request))
+        expect(found == fuzzCase.nodes, "every node is one element");
 }
 
-void checkService(const Scene& scene, const Outcome& outcome, bool faultless) {
+void checkService(const FuzzCase& fuzzCase, const Outcome& outcome, bool faultless) {
     const RecordCounts records = countedRecords();
     expect(records.entries == 4 && records.exits == 4, "two markers open and close a request");
     expect(outcome.doneCount <= 1, "the end is reported once");
     // A capabilities association has a first element before anybody looks whether its ends exist.
     expect(outcome.paths.size() + outcome.instances.size() <=
-               1 + 2 * (scene.nodes + scene.computers.answer.instances.size()),
+               1 + 2 * (fuzzCase.nodes + fuzzCase.computers.answer.instances.size()),
            "results are made from nodes and computer systems");
     if (!faultless) {
         expect(outcome.rc == CMPI_RC_OK || outcome.rc == CMPI_RC_ERR_INVALID_CLASS,
                "a request is served or its class is not known");
         return;
     }
-    if (!isServed(scene.request)) {
+    if (!isServed(fuzzCase.request)) {
         expect(outcome.rc == CMPI_RC_ERR_INVALID_CLASS, "a class that is not served is invalid");
         expect(outcome.doneCount == 0, "an invalid class leaves the result alone");
         return;
@@ -91,12 +96,12 @@ void checkService(const Scene& scene, const Outcome& outcome, bool faultless) {
     expect(records.messages == 0 || records.messages == 2, "one exception leaves one message");
     expect((outcome.doneCount == 1) == (records.messages == 0),
            "the end is reported unless an exception was");
-    checkCount(scene, outcome);
+    checkCount(fuzzCase, outcome);
 }
 
-void checkException(const Scene& scene, const Ending& ending) {
-    const bool fromHost = ending.foreignException && scene.exception == HostException::Foreign;
-    const bool fromLog = !ending.foreignException && scene.logThrowsFrom != 0;
+void checkException(const FuzzCase& fuzzCase, const Ending& ending) {
+    const bool fromHost = ending.foreignException && fuzzCase.exception == HostException::Foreign;
+    const bool fromLog = !ending.foreignException && fuzzCase.logThrowsFrom != 0;
     expect(fromHost || fromLog, "an exception leaves the handler only by design");
 }
 
@@ -109,25 +114,72 @@ bool isHarmless(const std::string& violation, bool oddComputers) {
                             holds(", not ") || holds(", in the path "));
 }
 
+Ending run(FuzzCase& fuzzCase, Broker& broker, const ManagementInterfaces& interfaces) {
+    FaultPlan plan;
+    for (const Fault& fault : fuzzCase.faults) plan.add(fault);
+    broker.setFaultPlan(&plan);
+    startRecords(fuzzCase.logThrowsFrom);
+    Ending ending;
+    try {
+        ending.outcome = invoke(interfaces, broker, fuzzCase.request, [&](ResultCollector& result) {
+            result.failReturnInstance(fuzzCase.resultFailsFrom, CMPI_RC_ERR_FAILED);
+            result.failReturnObjectPath(fuzzCase.resultFailsFrom, CMPI_RC_ERR_FAILED);
+            result.failReturnDone(fuzzCase.resultFailsFrom, CMPI_RC_ERR_FAILED);
+        });
+    } catch (const ForeignException&) {
+        ending.foreignException = true;
+    } catch (const std::exception&) {
+    }
+    broker.setFaultPlan(nullptr);
+    ending.faultsFired = plan.fired();
+    return ending;
+}
+
+// For people who look at an input: FUZZ_SHOW in the environment has it told.
+void show(const FuzzCase& fuzzCase, const Ending& ending, const Broker& broker) {
+    if (std::getenv("FUZZ_SHOW") == nullptr) return;
+    std::fputs(describe(fuzzCase).c_str(), stderr);
+    if (ending.outcome)
+        std::fprintf(stderr, "  status %u, %zu paths, %zu instances, %u times done\n",
+                     static_cast<unsigned>(ending.outcome->rc), ending.outcome->paths.size(),
+                     ending.outcome->instances.size(), ending.outcome->doneCount);
+    for (const std::string& violation : broker.violations())
+        std::fprintf(stderr, "  violation: %s\n", violation.c_str());
+}
+
 }  // namespace
 
-void checkManners(const Scene& scene, cmpihost::Broker& broker) {
+void checkManners(const FuzzCase& fuzzCase, Broker& broker) {
     for (const std::string& violation : broker.takeViolations())
-        if (!isHarmless(violation, scene.oddComputers)) broken("good manners: " + violation);
+        if (!isHarmless(violation, fuzzCase.oddComputers)) broken("good manners: " + violation);
     expect(broker.unreleasedClones() == 0, "clones are released");
 }
 
-void checkEnding(const Scene& scene, const Ending& ending, cmpihost::Broker& broker) {
-    const bool faultless = ending.faultsFired == 0 && scene.logThrowsFrom == 0;
+void checkEnding(const FuzzCase& fuzzCase, const Ending& ending, Broker& broker) {
+    const bool faultless = ending.faultsFired == 0 && fuzzCase.logThrowsFrom == 0;
     if (!ending.outcome)
-        checkException(scene, ending);
+        checkException(fuzzCase, ending);
     else if (ending.outcome->message)
         broken("a status carries no message");
-    else if (isRefused(scene.request.operation))
+    else if (isRefused(fuzzCase.request.operation))
         checkRefusal(*ending.outcome);
     else
-        checkService(scene, *ending.outcome, faultless);
-    checkManners(scene, broker);
+        checkService(fuzzCase, *ending.outcome, faultless);
+    checkManners(fuzzCase, broker);
+}
+
+void runRequest(const std::uint8_t* data, std::size_t size, Factories factories, Check check) {
+    Decoder input(data, size);
+    FuzzCase fuzzCase = decodeCase(input);
+    VA::setHostSource(fuzzCase.host);
+    {
+        Broker broker(&schemaCatalogue(), fuzzCase.options);
+        if (fuzzCase.computersServed) broker.route("KORVA_ComputerSystem", fuzzCase.computers);
+        const Ending ending = run(fuzzCase, broker, factories(broker.cmpi()));
+        show(fuzzCase, ending, broker);
+        check(fuzzCase, ending, broker);
+    }
+    VA::setHostSource(nullptr);
 }
 
 }  // namespace fuzz

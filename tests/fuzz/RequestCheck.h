@@ -1,9 +1,10 @@
-// What a request must leave behind, whatever it held.
-#pragma once
+// Runs the request of an input against the handlers of a library, and what it must leave behind.
+#ifndef TESTS_FUZZ_REQUEST_CHECK_H
+#define TESTS_FUZZ_REQUEST_CHECK_H
 
 #include <optional>
 
-#include "fuzz/Scene.h"
+#include "fuzz/FuzzCase.h"
 #include "host/broker/Broker.h"
 #include "host/broker/Invoke.h"
 
@@ -18,10 +19,20 @@ struct Ending {
 };
 
 /// Ends the program where the broker has something to complain of.
-void checkManners(const Scene& scene, cmpihost::Broker& broker);
+void checkManners(const FuzzCase& fuzzCase, cmpihost::Broker& broker);
 
 /// Ends the program where the request to the provider broke a rule; the records are those of
 /// StrictLog.
-void checkEnding(const Scene& scene, const Ending& ending, cmpihost::Broker& broker);
+void checkEnding(const FuzzCase& fuzzCase, const Ending& ending, cmpihost::Broker& broker);
+
+/// Calls the factories of the library, and the rules for how its requests end.
+using Factories = cmpihost::ManagementInterfaces (*)(const CMPIBroker* broker);
+using Check = void (*)(const FuzzCase& fuzzCase, const Ending& ending, cmpihost::Broker& broker);
+
+/// Under a strict broker with the schema, on a simulated host. With FUZZ_SHOW in the environment
+/// the input and how it ended are told, for people.
+void runRequest(const std::uint8_t* data, std::size_t size, Factories factories, Check check);
 
 }  // namespace fuzz
+
+#endif

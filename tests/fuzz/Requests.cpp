@@ -1,5 +1,5 @@
 // Whole requests against the provider's handlers.
-#include "fuzz/RequestRun.h"
+#include "fuzz/RequestCheck.h"
 
 // The provider's factories, as an object manager looks them up.
 extern "C" {

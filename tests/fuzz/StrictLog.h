@@ -1,6 +1,7 @@
 // Stands in for ZBLog::ZBLogger in a fuzz target: every record is checked, and those that quote
 // clients or the host are formatted as lines of a log. A record that breaks a rule is a finding.
-#pragma once
+#ifndef TESTS_FUZZ_STRICT_LOG_H
+#define TESTS_FUZZ_STRICT_LOG_H
 
 #include <cstdint>
 
@@ -21,3 +22,5 @@ void startRecords(std::uint64_t throwFrom = 0);
 RecordCounts countedRecords();
 
 }  // namespace fuzz
+
+#endif

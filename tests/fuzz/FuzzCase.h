@@ -1,5 +1,6 @@
 // All that surrounds one request: the host, the broker, what fails in them, and the request itself.
-#pragma once
+#ifndef TESTS_FUZZ_FUZZ_CASE_H
+#define TESTS_FUZZ_FUZZ_CASE_H
 
 #include <memory>
 #include <string>
@@ -30,7 +31,7 @@ struct ForeignException {};
 /// What the instrumentation throws.
 enum class HostException : unsigned { None, Standard, Framework, NoMemory, Foreign };
 
-struct Scene {
+struct FuzzCase {
     cmpihost::OperationRequest request;
     cmpihost::BrokerOptions options;
     std::shared_ptr<VA::SimulatedHost> host = std::make_shared<VA::SimulatedHost>();
@@ -49,9 +50,11 @@ struct Scene {
 };
 
 /// Where the input ends, the rest is plain: one running node, one computer system, nothing fails.
-Scene decodeScene(Decoder& input);
+FuzzCase decodeCase(Decoder& input);
 
 /// For people: what is asked, of which host, under which faults.
-std::string describe(const Scene& scene);
+std::string describe(const FuzzCase& fuzzCase);
 
 }  // namespace fuzz
+
+#endif

@@ -1,9 +1,11 @@
-#include "fuzz/Scene.h"
+// A request alone finds little: the host, the broker and the log around it are decoded with it.
+#include "fuzz/FuzzCase.h"
 
 #include <new>
 #include <stdexcept>
 
 #include "InstrumentationException.h"
+#include "support/Requests.h"
 
 namespace fuzz {
 
@@ -85,7 +87,7 @@ SimulatedHost::Node decodeNode(Decoder& input) {
     return node;
 }
 
-void addNodes(Decoder& input, Scene& scene) {
+void addNodes(Decoder& input, FuzzCase& fuzzCase) {
     std::vector<SimulatedHost::Node> nodes(1, decodeNode(input));
     for (auto more = input.numberUpTo(3); more > 0; --more) nodes.push_back(decodeNode(input));
     if (input.flag()) nodes.clear();
@@ -94,39 +96,38 @@ void addNodes(Decoder& input, Scene& scene) {
         for (SimulatedHost::Node node : nodes) {
             auto& name = node.properties[VA::NodeLexicon::Name];
             if (each > 0) name = "node" + std::to_string(each);
-            scene.host->addNode(std::move(node));
-            ++scene.nodes;
+            fuzzCase.host->addNode(std::move(node));
+            ++fuzzCase.nodes;
         }
     }
 }
 
-void addException(Decoder& input, Scene& scene) {
-    scene.exception = static_cast<HostException>(input.numberUpTo(4));
+void addException(Decoder& input, FuzzCase& fuzzCase) {
+    fuzzCase.exception = static_cast<HostException>(input.numberUpTo(4));
     const auto from = input.numberUpTo(200) + 1;
-    switch (scene.exception) {
+    switch (fuzzCase.exception) {
         case HostException::Standard:
-            return scene.host->throwFromCall(from, std::runtime_error("from the host"));
+            return fuzzCase.host->throwFromCall(from, std::runtime_error("from the host"));
         case HostException::Framework:
-            return scene.host->throwFromCall(from, VA::InstrumentationException("Not Found."));
+            return fuzzCase.host->throwFromCall(from, VA::InstrumentationException("Not Found."));
         case HostException::NoMemory:
-            return scene.host->throwFromCall(from, std::bad_alloc());
+            return fuzzCase.host->throwFromCall(from, std::bad_alloc());
         case HostException::Foreign:
-            return scene.host->throwFromCall(from, ForeignException{});
+            return fuzzCase.host->throwFromCall(from, ForeignException{});
         default:
             return;
     }
 }
 
 InstanceValue computerSystem(const std::string& name) {
-    constexpr const char* className = "KORVA_ComputerSystem";
     InstanceValue instance;
-    instance.path = {"root/cimv2", className, {{"CreationClassName", className}, {"Name", name}}};
+    instance.path = computerSystemPath(name);
     return instance;
 }
 
-void addComputers(Decoder& input, Scene& scene) {
-    cmpihost::UpcallAnswer& answer = scene.computers.answer;
-    scene.computersServed = !input.flag();
+void addComputers(Decoder& input, FuzzCase& fuzzCase) {
+    cmpihost::UpcallAnswer& answer = fuzzCase.computers.answer;
+    fuzzCase.computersServed = !input.flag();
     if (input.flag()) answer.rc = input.status();
     answer.failAt = static_cast<unsigned>(input.numberUpTo(3));
     answer.failRc = input.status();
@@ -134,7 +135,7 @@ void addComputers(Decoder& input, Scene& scene) {
     for (auto more = input.numberUpTo(3); more > 0; --more) {
         const bool odd = input.flag();
         systems.push_back(odd ? input.instance(1) : computerSystem(input.text(64)));
-        scene.oddComputers = scene.oddComputers || odd;
+        fuzzCase.oddComputers = fuzzCase.oddComputers || odd;
     }
     if (input.flag()) systems.clear();
     const unsigned times = input.pick(repetitions);
@@ -153,7 +154,7 @@ BrokerOptions decodeOptions(Decoder& input) {
     return options;
 }
 
-void addFaults(Decoder& input, Scene& scene) {
+void addFaults(Decoder& input, FuzzCase& fuzzCase) {
     constexpr const char* entries[] = {
         "",
         "newObjectPath",
@@ -183,40 +184,41 @@ void addFaults(Decoder& input, Scene& scene) {
         fault.nth = static_cast<unsigned>(input.numberUpTo(100)) + 1;
         fault.times = static_cast<unsigned>(input.numberUpTo(2));
         fault.rc = input.status();
-        scene.faults.push_back(fault);
+        fuzzCase.faults.push_back(fault);
     }
-    scene.resultFailsFrom = static_cast<unsigned>(input.numberUpTo(4));
+    fuzzCase.resultFailsFrom = static_cast<unsigned>(input.numberUpTo(4));
 }
 
 }  // namespace
 
-Scene decodeScene(Decoder& input) {
-    Scene scene;
-    scene.request = decodeRequest(input);
-    addNodes(input, scene);
-    if (!input.flag()) scene.host->setComputerName("host1");
-    addComputers(input, scene);
-    scene.options = decodeOptions(input);
-    addException(input, scene);
-    addFaults(input, scene);
-    scene.logThrowsFrom = input.flag() ? input.numberUpTo(400) + 1 : 0;
-    return scene;
+FuzzCase decodeCase(Decoder& input) {
+    FuzzCase fuzzCase;
+    fuzzCase.request = decodeRequest(input);
+    addNodes(input, fuzzCase);
+    if (!input.flag()) fuzzCase.host->setComputerName("host1");
+    addComputers(input, fuzzCase);
+    fuzzCase.options = decodeOptions(input);
+    addException(input, fuzzCase);
+    addFaults(input, fuzzCase);
+    fuzzCase.logThrowsFrom = input.flag() ? input.numberUpTo(400) + 1 : 0;
+    return fuzzCase;
 }
 
-std::string describe(const Scene& scene) {
-    const OperationRequest& request = scene.request;
+std::string describe(const FuzzCase& fuzzCase) {
+    const OperationRequest& request = fuzzCase.request;
     std::string text = std::string(operationName(request.operation)) + ' ' + toString(request.path);
     text += "\n  association class " + request.assocClass.value_or("(none)");
-    text += "\n  " + std::to_string(scene.nodes) + " nodes, " +
-            std::to_string(scene.computers.answer.instances.size()) + " computer systems" +
-            (scene.computersServed ? "" : " that nobody serves");
-    for (const ObjectPathValue& path : scene.computers.answer.paths)
+    text += "\n  " + std::to_string(fuzzCase.nodes) + " nodes, " +
+            std::to_string(fuzzCase.computers.answer.instances.size()) + " computer systems" +
+            (fuzzCase.computersServed ? "" : " that nobody serves");
+    for (const ObjectPathValue& path : fuzzCase.computers.answer.paths)
         text += "\n  " + toString(path);
-    for (const cmpihost::Fault& fault : scene.faults)
+    for (const cmpihost::Fault& fault : fuzzCase.faults)
         text += "\n  fault of '" + fault.entry + "' at call " + std::to_string(fault.nth) + ", " +
                 std::to_string(fault.times) + " times, status " + std::to_string(fault.rc);
-    text += "\n  host exception of kind " + std::to_string(static_cast<unsigned>(scene.exception));
-    text += "\n  log throws from record " + std::to_string(scene.logThrowsFrom);
+    text +=
+        "\n  host exception of kind " + std::to_string(static_cast<unsigned>(fuzzCase.exception));
+    text += "\n  log throws from record " + std::to_string(fuzzCase.logThrowsFrom);
     return text + '\n';
 }
 
