@@ -1,25 +1,21 @@
+// What only a close look at a request shows: lines of records, questions to the host, destructors
+// that throw, and key values that a client chose to do harm.
+#include <algorithm>
 #include <fstream>
+#include <iterator>
 #include <stdexcept>
 
 #include "host/broker/ResultCollector.h"
 #include "library/LibraryFixture.h"
+#include "support/Properties.h"
 
 namespace {
 
 using namespace cmpihost;
 using testing::HasSubstr;
+using testing::IsEmpty;
 
-class HandlerDetails : public LibraryFixture {
-  protected:
-    static OperationRequest request(Operation operation, const ObjectPathValue& asked,
-                                    const std::string& assocClass = "") {
-        OperationRequest result;
-        result.operation = operation;
-        result.path = asked;
-        if (!assocClass.empty()) result.assocClass = assocClass;
-        return result;
-    }
-};
+class HandlerDetails : public LibraryFixture {};
 
 TEST_F(HandlerDetails, EveryInstanceCarriesAnEmptyDescriptionAndTheStatusOK) {
     setNodes({"a", "b", "c"});
@@ -33,7 +29,7 @@ TEST_F(HandlerDetails, EveryInstanceCarriesAnEmptyDescriptionAndTheStatusOK) {
 
 TEST_F(HandlerDetails, ResultThatRefusesTheInstanceOfAGetStillGetsDone) {
     const Outcome outcome =
-        invoke(request(Operation::GetInstance, operatingSystemPath("host1", "Linux")),
+        invoke(requestFor(Operation::GetInstance, operatingSystemPath("host1", "Linux")),
                [](ResultCollector& collector) {
                    collector.failReturnInstance(1, CMPI_RC_ERR_FAILED);
                    collector.failReturnDone(1, CMPI_RC_ERR_FAILED);
@@ -45,7 +41,7 @@ TEST_F(HandlerDetails, ResultThatRefusesTheInstanceOfAGetStillGetsDone) {
 
 TEST_F(HandlerDetails, PropertyListReachesTheAdapterAsItCame) {
     for (const Operation operation : {Operation::EnumerateInstances, Operation::GetInstance}) {
-        OperationRequest asked = request(operation, operatingSystemPath("host1", "Linux"));
+        OperationRequest asked = requestFor(operation, operatingSystemPath("host1", "Linux"));
         recording::clear();
         invoke(asked);
         EXPECT_THAT(recording::takeRendered(), HasSubstr("properties=0\n"));
@@ -71,10 +67,10 @@ TEST_F(HandlerDetails, TextOfAnExceptionIsAskedForOnceAChannel) {
 
 TEST_F(HandlerDetails, LineOfARecordIsTheOneInItsText) {
     const OperationRequest requests[] = {
-        request(Operation::EnumerateInstances, path("KORVA_OperatingSystem")),
-        request(Operation::EnumerateInstances, path("KORVA_RunningOS")),
-        request(Operation::Associators, operatingSystemPath("host1", "Linux"),
-                "KORVA_OSElementCapabilities")};
+        requestFor(Operation::EnumerateInstances, path("KORVA_OperatingSystem")),
+        requestFor(Operation::EnumerateInstances, path("KORVA_RunningOS")),
+        requestFor(Operation::Associators, operatingSystemPath("host1", "Linux"),
+                   "KORVA_OSElementCapabilities")};
     for (const OperationRequest& each : requests) {
         invoke(each);
         for (const recording::Record& record : recording::take()) {
@@ -103,16 +99,9 @@ std::string functionAround(unsigned long line) {
 }
 
 TEST_F(HandlerDetails, MarkersBearALineOfTheHandlersOwn) {
-    const ObjectPathValue system = operatingSystemPath("host1", "Linux");
-    const OperationRequest requests[] = {
-        request(Operation::EnumerateInstanceNames, path("KORVA_OperatingSystem")),
-        request(Operation::EnumerateInstances, path("KORVA_OperatingSystem")),
-        request(Operation::GetInstance, system),
-        request(Operation::AssociatorNames, system, "KORVA_RunningOS"),
-        request(Operation::Associators, system, "KORVA_RunningOS")};
-    for (const OperationRequest& each : requests) {
+    for (const NamedRequest& each : oneRequestOfEachHandler()) {
         recording::clear();
-        invoke(each);
+        invoke(each.request);
         unsigned int markers = 0;
         for (const recording::Record& record : recording::take()) {
             const std::size_t found = record.text.find(" [Line: ");
@@ -137,9 +126,10 @@ TEST_F(HandlerDetails, EachCursorSelectsItsNodesOnce) {
 TEST_F(HandlerDetails, OnlyThePropertiesOfTheClassesAreAskedFor) {
     host->setHook([](const VA::SimulatedHost::Call& call) {
         if (!call.id) return;
-        const unsigned int id = *call.id;
-        const bool known = id == 108 || id == 128 || id == 134 || (id >= 139 && id <= 153);
-        EXPECT_TRUE(known) << id;
+        EXPECT_TRUE(std::any_of(std::begin(operatingSystemProperties),
+                                std::end(operatingSystemProperties),
+                                [&](const PublishedProperty& each) { return each.id == *call.id; }))
+            << *call.id;
     });
     for (const char* className : {"KORVA_OperatingSystem", "KORVA_OperatingSystemCapabilities",
                                   "KORVA_OSElementCapabilities"})
@@ -152,17 +142,18 @@ TEST_F(HandlerDetails, OnlyThePropertiesOfTheClassesAreAskedFor) {
 TEST_F(HandlerDetails, ExceptionFromADestructorIsReportedLikeAnyOther) {
     const std::pair<const char*, OperationRequest> rows[] = {
         {"~CMPIOperatingSystem",
-         request(Operation::EnumerateInstanceNames, path("KORVA_OperatingSystem"))},
+         requestFor(Operation::EnumerateInstanceNames, path("KORVA_OperatingSystem"))},
         {"~CMPIOperatingSystemCapabilities",
-         request(Operation::EnumerateInstanceNames, path("KORVA_OperatingSystemCapabilities"))},
-        {"~CMPIInstalledOS", request(Operation::EnumerateInstanceNames, path("KORVA_InstalledOS"))},
+         requestFor(Operation::EnumerateInstanceNames, path("KORVA_OperatingSystemCapabilities"))},
+        {"~CMPIInstalledOS",
+         requestFor(Operation::EnumerateInstanceNames, path("KORVA_InstalledOS"))},
         {"~CMPIOSComputerSystem",
-         request(Operation::EnumerateInstanceNames, path("KORVA_RunningOS"))},
+         requestFor(Operation::EnumerateInstanceNames, path("KORVA_RunningOS"))},
         {"~CMPIOSElementCapabilities",
-         request(Operation::EnumerateInstanceNames, path("KORVA_OSElementCapabilities"))},
+         requestFor(Operation::EnumerateInstanceNames, path("KORVA_OSElementCapabilities"))},
         {"~OSElementCapabilities",
-         request(Operation::EnumerateInstanceNames, path("KORVA_OSElementCapabilities"))},
-        {"~", request(Operation::EnumerateInstanceNames, path("KORVA_OSElementCapabilities"))},
+         requestFor(Operation::EnumerateInstanceNames, path("KORVA_OSElementCapabilities"))},
+        {"~", requestFor(Operation::EnumerateInstanceNames, path("KORVA_OSElementCapabilities"))},
     };
     for (const auto& [function, asked] : rows) {
         const std::string prefix = function;
@@ -192,6 +183,74 @@ TEST_F(HandlerDetails, ExceptionFromADestructorDoesNotReplaceTheFirstOne) {
     recording::clear();
     EXPECT_EQ(enumerate("KORVA_OSElementCapabilities").rc, CMPI_RC_OK);
     EXPECT_THAT(recording::takeRendered(), HasSubstr("]: the first\n"));
+}
+
+class HostileKeys : public LibraryFixture {
+  protected:
+    // The texts of the variable records of the key "Name" that a request leaves in one channel.
+    std::vector<std::string> nameRecords(const std::string& value) {
+        recording::clear();
+        const Outcome outcome = get(operatingSystemPath("host1", value));
+        EXPECT_EQ(outcome.rc, CMPI_RC_OK);
+        EXPECT_EQ(outcome.doneCount, 1U);
+        EXPECT_THAT(outcome.instances, IsEmpty());
+        std::vector<std::string> found;
+        for (const recording::Record& record : recording::take()) {
+            EXPECT_LE(record.text.size(), 511U);
+            if (record.channel == "log" && record.text.rfind("VARIABLE: 'Name'", 0) == 0)
+                found.push_back(record.text);
+        }
+        return found;
+    }
+};
+
+TEST_F(HostileKeys, ValueOfAnyLengthLeavesOneRecordOfAtMost511Characters) {
+    for (const std::size_t length : {std::size_t{0}, std::size_t{511}, std::size_t{512},
+                                     std::size_t{513}, std::size_t{100000}}) {
+        const std::string value(length, 'x');
+        const std::vector<std::string> records = nameRecords(value);
+        ASSERT_EQ(records.size(), 1U) << length;
+        const std::string whole = "VARIABLE: 'Name' has Value '" + value + "' at line ";
+        EXPECT_EQ(records[0].substr(0, whole.size()), whole.substr(0, 511)) << length;
+    }
+}
+
+TEST_F(HostileKeys, ContentIsRecordedAsItIs) {
+    for (const std::string& value :
+         {std::string("%s%n%1000000d%%"), std::string("line\nbreak\r\x1b[31m\x07"),
+          std::string("\xff\xfe\xc0\x80"), std::string("' at line 1 in Other.cpp"),
+          std::string("\"quoted\\\"")}) {
+        const std::vector<std::string> records = nameRecords(value);
+        ASSERT_EQ(records.size(), 1U);
+        EXPECT_EQ(records[0].rfind("VARIABLE: 'Name' has Value '" + value + "' at line ", 0), 0U);
+    }
+}
+
+TEST_F(HostileKeys, ValueThatEndsInABlankOrDiffersInOneByteFindsNothing) {
+    for (const char* value : {"Linux ", " Linux", "Linu", "Linux\t", "Linux\xff"})
+        EXPECT_EQ(nameRecords(value).size(), 1U);
+}
+
+TEST_F(HostileKeys, ManyKeysAreOnlyPassedOver) {
+    ObjectPathValue asked = path("KORVA_OperatingSystem");
+    for (int count = 0; count < 70000; ++count)
+        asked.keys.push_back({"Key" + std::to_string(count), "value"});
+    EXPECT_EQ(get(asked).instances.size(), 1U);
+}
+
+TEST_F(HostileKeys, SourceOfAnAssociationIsMappedWhateverItHolds) {
+    for (const std::string& value :
+         {std::string(), std::string(100000, 'x'), std::string("%n\xff\n'\"\\")}) {
+        EXPECT_EQ(associatorNames(operatingSystemPath(value, value), "KORVA_RunningOS").rc,
+                  CMPI_RC_OK);
+        EXPECT_EQ(associatorNames(computerSystemPath(value), "KORVA_InstalledOS").rc, CMPI_RC_OK);
+        EXPECT_EQ(associators(capabilitiesPath(value), "KORVA_OSElementCapabilities").rc,
+                  CMPI_RC_OK);
+    }
+    // None of them is the name of the node.
+    EXPECT_EQ(broker.takeViolations(),
+              std::vector<std::string>(3, "path of KORVA_OperatingSystem without key Name"));
+    for (const recording::Record& record : recording::take()) EXPECT_LE(record.text.size(), 511U);
 }
 
 }  // namespace

@@ -1,3 +1,5 @@
+// What the file of the provider is: looked at with the tools of the linker, and loaded on its own.
+// An object manager binds to these names and unloads the file at will.
 #include <dlfcn.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -6,11 +8,10 @@
 #include <fstream>
 #include <map>
 #include <memory>
-#include <sstream>
 #include <string>
 #include <vector>
 
-// What the file of the provider is: looked at with the tools of the linker, and loaded on its own.
+#include "support/ProgramRun.h"
 
 namespace {
 
@@ -31,13 +32,6 @@ std::string output(const std::string& command) {
     char part[4096];
     while (pipe && std::fgets(part, sizeof part, pipe.get()) != nullptr) text += part;
     return text;
-}
-
-std::vector<std::string> lines(const std::string& text) {
-    std::istringstream stream(text);
-    std::vector<std::string> result;
-    for (std::string line; std::getline(stream, line);) result.push_back(line);
-    return result;
 }
 
 // Names between brackets behind a tag of the dynamic section.

@@ -24,6 +24,16 @@ std::string text(const InstanceValue& instance, const std::string& property) {
     return value == nullptr ? "(absent)" : value->toText();
 }
 
+std::vector<NamedRequest> oneRequestOfEachHandler() {
+    std::vector<NamedRequest> chosen;
+    for (const NamedRequest& each : servedRequests({"host1", "Linux", "Linux"}))
+        for (const char* suffix :
+             {"NamesOfOperatingSystem", "InstancesOfOperatingSystem", "InstanceOfOperatingSystem",
+              "OfCapabilitiesThroughOSElementCapabilities"})
+            if (testing::Value(each.name, testing::EndsWith(suffix))) chosen.push_back(each);
+    return chosen;
+}
+
 LibraryFixture::LibraryFixture(BrokerOptions options)
     : host(std::make_shared<VA::SimulatedHost>()),
       broker(&schemaCatalogue(), options),

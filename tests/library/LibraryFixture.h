@@ -25,6 +25,9 @@ std::vector<std::string> texts(const std::vector<cmpihost::InstanceValue>& insta
 /// A property as text, "(absent)" when the instance has none of that name.
 std::string text(const cmpihost::InstanceValue& instance, const std::string& property);
 
+/// One request for each of the five handlers that serve, all of which meet the instrumentation.
+std::vector<NamedRequest> oneRequestOfEachHandler();
+
 /// The built provider, loaded as an object manager loads it, under a strict broker with the schema,
 /// on a simulated host with one node "Linux" whose computer is called "host1". The broker serves
 /// one computer system, "host1". What the broker catches fails the test.
