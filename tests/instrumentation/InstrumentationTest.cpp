@@ -16,12 +16,22 @@ using namespace VA::NodeLexicon;
 using VA::Instrumentation;
 using VA::SimulatedHost;
 
+// The numbers are the contract: other libraries of the same interface know nothing else.
+static_assert(OperatingSystemNode == 17);
+static_assert(Name == 108 && OSType == 128 && Version == 134 && InstallDate == 139);
+static_assert(Distributed == 140 && LastBootUpTime == 141 && MaxNumberOfProcesses == 142);
+static_assert(MaxProcessMemorySize == 143 && NumberOfProcesses == 144 && NumberOfUsers == 145);
+static_assert(NumberOfLicensedUsers == 146 && TotalVirtualMemorySize == 147);
+static_assert(FreeVirtualMemory == 148 && FreePhysicalMemory == 149);
+static_assert(TotalVisibleMemorySize == 150 && TotalSwapSpaceSize == 151);
+static_assert(SizeStoredInPagingFiles == 152 && FreeSpaceInPagingFiles == 153);
+
 static_assert(!std::is_copy_constructible_v<Instrumentation>);
 static_assert(!std::is_copy_assignable_v<Instrumentation>);
 static_assert(sizeof(NodeType) == 4 && sizeof(Properties) == 4);
 
 // The operator is not const, as gtest would have it.
-bool standsOnNode(Instrumentation& cursor) {
+bool isValid(Instrumentation& cursor) {
     return cursor;
 }
 
@@ -33,7 +43,7 @@ class InstrumentationTest : public testing::Test {
         std::string text;
         unsigned int number = 0;
         bool flag = false;
-        EXPECT_FALSE(standsOnNode(cursor));
+        EXPECT_FALSE(isValid(cursor));
         for (unsigned int id = 100; id < 160; ++id) {
             EXPECT_FALSE(cursor.getProperty(Properties(id), text)) << id;
             EXPECT_FALSE(cursor.getProperty(Properties(id), number)) << id;
@@ -69,7 +79,7 @@ TEST_F(InstrumentationTest, StandsOnNoNodeBeforeItSelects) {
 TEST_F(InstrumentationTest, FindsOneOperatingSystemOnThisMachineAndNothingBehindIt) {
     Instrumentation cursor;
     EXPECT_TRUE(cursor.selectNode(OperatingSystemNode));
-    EXPECT_TRUE(standsOnNode(cursor));
+    EXPECT_TRUE(isValid(cursor));
     EXPECT_NE(nameOf(cursor), "none");
     EXPECT_EQ(&++cursor, &cursor);
     expectNothing(cursor);
@@ -200,7 +210,7 @@ TEST_F(InstrumentationTest, SourceMayBeReplacedWhileManyThreadsRead) {
                 EXPECT_TRUE(cursor.selectNode(OperatingSystemNode));
                 EXPECT_NE(nameOf(cursor), "none");
                 ++cursor;
-                EXPECT_FALSE(standsOnNode(cursor));
+                EXPECT_FALSE(isValid(cursor));
             }
         });
     }

@@ -12,32 +12,27 @@
 #include <string>
 
 #include "framework/instrumentation/Linux/Dates.h"
-#include "tests/instrumentation/HostParts.h"
+#include "tests/instrumentation/FixtureHost.h"
 
 namespace {
 
 using VA::Linux::Kernel;
+using VA::Linux::parseMemoryInfo;
+using VA::Linux::parseNumberFile;
 using VA::NodeLexicon::MaxProcessMemorySize;
 
-TEST(KernelClock, BootTimeAgreesWithTheKernelsOwnToASecond) {
-    std::ifstream file("/proc/stat");
-    const std::string text{std::istreambuf_iterator<char>(file), {}};
-    const auto expected = VA::Linux::parseBootTime(text);
-    ASSERT_TRUE(expected);
-    const auto clocked = Kernel().bootTime();
-    ASSERT_TRUE(clocked.seconds);
-    EXPECT_NEAR(static_cast<double>(*clocked.seconds), static_cast<double>(*expected), 1.0);
-}
-
-TEST(KernelClock, BootTimeThatIsExactIsTheKernelsOwn) {
+TEST(KernelClock, BootTimeIsTheKernelsOwnToASecondAndWhereItIsExactToTheSecond) {
     int exact = 0;
     for (int i = 0; i < 1000; ++i) {
         std::ifstream file("/proc/stat");
         const std::string text{std::istreambuf_iterator<char>(file), {}};
+        const auto expected = VA::Linux::parseBootTime(text);
         const auto clocked = Kernel().bootTime();
+        ASSERT_TRUE(expected && clocked.seconds);
+        ASSERT_NEAR(static_cast<double>(*clocked.seconds), static_cast<double>(*expected), 1.0);
         if (!clocked.exact) continue;
         ++exact;
-        ASSERT_EQ(clocked.seconds, VA::Linux::parseBootTime(text));
+        ASSERT_EQ(clocked.seconds, expected);
     }
     // A second ends within the two readings of a clock on one host of millions.
     EXPECT_GT(exact, 0);
@@ -114,6 +109,72 @@ TEST(MostMemoryOfAProcess, IsTheLimitInKilobytesAndZeroWhenUnlimited) {
     for (const Case& c : cases) {
         host.kernel->fixedLimit = c.bytes;
         EXPECT_EQ(host.number(MaxProcessMemorySize), c.kiB) << testing::PrintToString(c.bytes);
+    }
+}
+
+// proc
+
+TEST(NumberFile, HoldsOnePositiveNumberAndItsNewline) {
+    EXPECT_EQ(parseNumberFile("32768\n"), 32768u);
+    for (const char* text : {"", "\n", "0\n", "32768\n\n", "32768 \n", "1\t2\n", "max\n", "-1\n",
+                             "3", "3276", "32768"}) {
+        EXPECT_EQ(parseNumberFile(text), std::nullopt) << '"' << text << '"';
+    }
+}
+
+using KiB = std::optional<std::uint32_t>;
+constexpr KiB unknown;
+
+TEST(MemoryInfo, HasEachValueThatIsWholeAndNoOther) {
+    const struct {
+        const char* text;
+        KiB total, available, swapTotal, swapFree;
+    } rows[] = {
+        {"MemTotal:       16777216 kB\nMemFree:  1 kB\nMemAvailable:    8388608 kB\n"
+         "Buffers: 2 kB\nCached: 3 kB\nSwapCached: 4 kB\nSwapTotal:       2097152 kB\n"
+         "SwapFree:        1048576 kB\n",
+         16777216u, 8388608u, 2097152u, 1048576u},
+        // an old kernel: what is free, in buffers and cached is available
+        {"MemTotal: 1000 kB\nMemFree: 100 kB\nBuffers: 20 kB\nCached: 3 kB\nSwapCached: 9000 kB\n",
+         1000u, 123u, 0u, 0u},
+        {"MemTotal: 1000 kB\nMemFree: 100 kB\nBuffers: 20 kB\n", 1000u, unknown, 0u, 0u},
+        {"MemTotal: 1000 kB\nMemFree: 100 kB\nCached: 20 kB\n", 1000u, unknown, 0u, 0u},
+        {"MemTotal: 1000 kB\nBuffers: 100 kB\nCached: 20 kB\n", 1000u, unknown, 0u, 0u},
+        {"MemTotal: 1000 kB\nMemFree: 100 kB\nBuffers: x kB\nCached: 3 kB\n", 1000u, unknown, 0u,
+         0u},
+        // a host without swap has none of it; what is malformed is not known rather than 0
+        {"MemTotal: 1000 kB\nSwapTotal: 0 kB\n", 1000u, unknown, 0u, 0u},
+        {"MemTotal: 1000 kB\nSwapTotal: 0 kB\nSwapFree: 0 kB\n", 1000u, unknown, 0u, 0u},
+        {"MemTotal: 1000 kB\nSwapTotal: many kB\nSwapFree: 1 kB\n", 1000u, unknown, unknown, 1u},
+        {"MemTotal: 1000 kB\nSwapTotal: 50 kB\n", 1000u, unknown, 50u, unknown},
+        // more than four tebibytes
+        {"MemTotal: 6597069766656 kB\nMemFree: 4294967295 kB\nBuffers: 4294967295 kB\n"
+         "Cached: 4294967295 kB\nSwapTotal: 4294967296 kB\nSwapFree: 18446744073709551615 kB\n",
+         4294967295u, 4294967295u, 4294967295u, 4294967295u},
+        // cut short
+        {"MemTotal: 1000 kB\nMemAvailable: 99", 1000u, unknown, 0u, 0u},
+        // of two lines the first counts, even where it is malformed
+        {"MemTotal: 1000 kB\nMemTotal: 5 kB\n", 1000u, unknown, 0u, 0u},
+        {"MemTotal: 1000 kB\nMemAvailable: x kB\nMemAvailable: 5 kB\n", 1000u, unknown, 0u, 0u},
+    };
+    for (const auto& row : rows) {
+        const auto info = parseMemoryInfo(row.text);
+        ASSERT_TRUE(info) << row.text;
+        EXPECT_EQ(info->totalKiB, row.total) << row.text;
+        EXPECT_EQ(info->availableKiB, row.available) << row.text;
+        EXPECT_EQ(info->swapTotalKiB, row.swapTotal) << row.text;
+        EXPECT_EQ(info->swapFreeKiB, row.swapFree) << row.text;
+    }
+}
+
+TEST(MemoryInfo, TextWithoutTotalMemoryIsNone) {
+    for (const char* text :
+         {"", "\n", "MemFree: 1 kB\n", "MemTotal:\n", "MemTotal: kB\n", "MemTotal: 12\n",
+          "MemTotal: 12 k", "MemTotal: 12 MB\n", "MemTotal: -12 kB\n", "MemTotal: 1 2 kB\n",
+          "MemTotal 12 kB\n", "memtotal: 12 kB\n", "MemTotal: 99999999999999999999999 kB\n",
+          "\x7f"
+          "ELF:\x01 kB\n"}) {
+        EXPECT_FALSE(parseMemoryInfo(text)) << text;
     }
 }
 

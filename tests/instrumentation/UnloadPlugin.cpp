@@ -1,4 +1,4 @@
-// Uses the library in every way, on behalf of UnloadTest.
+// Uses the library in every way, on behalf of LibraryFileTest.
 #include <Instrumentation.h>
 
 #include "framework/instrumentation/HostSource.h"

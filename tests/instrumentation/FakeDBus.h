@@ -1,5 +1,5 @@
-#ifndef TESTS_INSTRUMENTATION_MINI_BUS_H
-#define TESTS_INSTRUMENTATION_MINI_BUS_H
+#ifndef TESTS_INSTRUMENTATION_FAKE_DBUS_H
+#define TESTS_INSTRUMENTATION_FAKE_DBUS_H
 
 #include <chrono>
 #include <string>
@@ -8,7 +8,7 @@
 
 /// A message bus of one client at a time, for a real D-Bus library to talk to: it lets anybody in,
 /// and answers the greeting and one property read after it.
-class MiniBus {
+class FakeDBus {
   public:
     enum class Behaviour {
         Answer,              ///< replies with the state, after the delay
@@ -23,11 +23,11 @@ class MiniBus {
     };
 
     /// Listens on a socket at `path`, whose folder exists.
-    MiniBus(const std::string& path, Behaviour behaviour, std::string state = "running",
-            std::chrono::milliseconds delay = {});
-    ~MiniBus();
-    MiniBus(const MiniBus&) = delete;
-    MiniBus& operator=(const MiniBus&) = delete;
+    FakeDBus(const std::string& path, Behaviour behaviour, std::string state = "running",
+             std::chrono::milliseconds delay = {});
+    ~FakeDBus();
+    FakeDBus(const FakeDBus&) = delete;
+    FakeDBus& operator=(const FakeDBus&) = delete;
 
     /// The bodies and headers of the messages received so far, as raw bytes. Called when the client
     /// has finished.

@@ -1,11 +1,17 @@
-// What the built library exports and needs.
+// What the built library exports and needs, and that it can be taken away again.
+#include <dlfcn.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <cstdio>
+#include <filesystem>
+#include <fstream>
 #include <set>
 #include <sstream>
 #include <string>
+#include <thread>
+
+#include "tests/instrumentation/FixtureTree.h"
 
 namespace {
 
@@ -31,7 +37,7 @@ std::string before(const std::string& text, char end) {
 
 const std::string library = INSTRUMENTATION_LIBRARY;
 
-TEST(LibrarySymbols, ExportedAreInstrumentationAndTheSeamAlone) {
+TEST(LibraryFile, ExportedAreInstrumentationAndTheSeamAlone) {
     std::set<std::string> exported;
     for (const auto& line : linesOf("nm -DC --defined-only --format=posix '" + library + "'")) {
         // "name T value size": the demangled name has blanks too.
@@ -67,13 +73,13 @@ TEST(LibrarySymbols, ExportedAreInstrumentationAndTheSeamAlone) {
     EXPECT_EQ(exported, expected);
 }
 
-TEST(LibrarySymbols, NoneIsUniqueAsThatWouldPinTheLibrary) {
+TEST(LibraryFile, NoneIsUniqueAsThatWouldPinTheLibrary) {
     for (const auto& line : linesOf("nm -D '" + library + "'")) {
         EXPECT_EQ(line.find(" u "), std::string::npos) << line;
     }
 }
 
-TEST(LibrarySymbols, NoFunctionIsCalledThatForksResolvesNamesOrSetsUpTheZone) {
+TEST(LibraryFile, NoFunctionIsCalledThatForksResolvesNamesOrSetsUpTheZone) {
     const std::set<std::string> forbidden{
         "fork",          "vfork",         "_Fork",
         "clone",         "clone3",        "execl",
@@ -100,7 +106,7 @@ TEST(LibrarySymbols, NoFunctionIsCalledThatForksResolvesNamesOrSetsUpTheZone) {
     EXPECT_GT(undefined, 20);
 }
 
-TEST(LibrarySymbols, OnlyTheSystemsOwnLibrariesAreNeeded) {
+TEST(LibraryFile, OnlyTheSystemsOwnLibrariesAreNeeded) {
     int needed = 0;
     for (const auto& line : linesOf("readelf -d '" + library + "'")) {
         if (line.find("(NEEDED)") == std::string::npos) continue;
@@ -114,9 +120,48 @@ TEST(LibrarySymbols, OnlyTheSystemsOwnLibrariesAreNeeded) {
     EXPECT_GE(needed, 2);
 }
 
-TEST(LibrarySymbols, NameAndVersionAreThoseThatProgramsLinkAgainst) {
+TEST(LibraryFile, NameAndVersionAreThoseThatProgramsLinkAgainst) {
     EXPECT_THAT(outputOf("readelf -d '" + library + "'"),
                 testing::HasSubstr("[libvainstrumentation.so.1]"));
+}
+
+bool isMapped(const std::string& name) {
+    std::ifstream maps("/proc/self/maps");
+    for (std::string line; std::getline(maps, line);) {
+        if (line.find(name) != std::string::npos) return true;
+    }
+    return false;
+}
+
+std::ptrdiff_t openDescriptors() {
+    const std::filesystem::directory_iterator all("/proc/self/fd"), end;
+    return std::distance(all, end);
+}
+
+void loadUseUnload(const std::string& root) {
+    void* plugin = ::dlopen(INSTRUMENTATION_PLUGIN, RTLD_NOW | RTLD_LOCAL);
+    ASSERT_TRUE(plugin) << ::dlerror();
+    EXPECT_TRUE(isMapped("libvainstrumentation.so"));
+    const auto use = reinterpret_cast<int (*)(const char*)>(::dlsym(plugin, "useLibrary"));
+    ASSERT_TRUE(use);
+    EXPECT_EQ(use(root.c_str()), 1);
+    // A worker's own thread-local data must not hold the library either.
+    std::thread([&] { EXPECT_EQ(use(root.c_str()), 1); }).join();
+    ASSERT_EQ(::dlclose(plugin), 0);
+}
+
+TEST(LibraryFile, VanishesFromTheProcessEachOfAHundredTimesItIsUnloaded) {
+    FixtureTree tree;
+    tree.writeCompleteHost();
+    tree.makeFolder("run/systemd/system");  // so that libsystemd is loaded where there is one
+    loadUseUnload(tree.root());
+    const auto descriptors = openDescriptors();
+    for (int i = 0; i < 100; ++i) {
+        loadUseUnload(tree.root());
+        ASSERT_FALSE(isMapped("libvainstrumentation")) << i;
+        ASSERT_FALSE(isMapped("instrumentation_plugin")) << i;
+    }
+    EXPECT_EQ(openDescriptors(), descriptors);
 }
 
 }  // namespace

@@ -10,7 +10,7 @@
 #include <limits>
 #include <thread>
 
-#include "tests/instrumentation/HostParts.h"
+#include "tests/instrumentation/FixtureHost.h"
 
 namespace {
 

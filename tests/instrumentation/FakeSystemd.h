@@ -1,12 +1,12 @@
-#ifndef TESTS_INSTRUMENTATION_SYSTEMD_STAND_IN_H
-#define TESTS_INSTRUMENTATION_SYSTEMD_STAND_IN_H
+#ifndef TESTS_INSTRUMENTATION_FAKE_SYSTEMD_H
+#define TESTS_INSTRUMENTATION_FAKE_SYSTEMD_H
 
 #include <atomic>
 #include <cstdint>
 
-/// What the stand-in for libsystemd is to do, and what was done with it. Set while it is not used;
+/// What the fake libsystemd is to do, and what was done with it. Set while it is not used;
 /// counted by any number of threads.
-struct SystemdStandIn {
+struct FakeSystemd {
     enum class Behaviour {
         Answer,           ///< replies with `state` after a few rounds
         ErrorReply,       ///< replies with an error instead of a value
@@ -33,7 +33,7 @@ struct SystemdStandIn {
     std::atomic<std::uint64_t> longestWaitMicroseconds{0};
 };
 
-/// The symbol of the function that gives the one control block: SystemdStandIn* ().
-constexpr const char* systemdStandInSymbol = "systemd_stand_in";
+/// The symbol of the function that gives the one control block: FakeSystemd* ().
+constexpr const char* fakeSystemdSymbol = "fake_systemd";
 
 #endif

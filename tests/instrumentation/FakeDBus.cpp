@@ -1,4 +1,4 @@
-#include "MiniBus.h"
+#include "FakeDBus.h"
 
 #include <poll.h>
 #include <sys/socket.h>
@@ -122,8 +122,8 @@ std::optional<std::string> takeMessage(Client& client) {
 
 }  // namespace
 
-MiniBus::MiniBus(const std::string& path, Behaviour behaviour, std::string state,
-                 std::chrono::milliseconds delay)
+FakeDBus::FakeDBus(const std::string& path, Behaviour behaviour, std::string state,
+                   std::chrono::milliseconds delay)
     : behaviour_(behaviour), state_(std::move(state)), delay_(delay) {
     struct sockaddr_un address {};
     address.sun_family = AF_UNIX;
@@ -137,12 +137,12 @@ MiniBus::MiniBus(const std::string& path, Behaviour behaviour, std::string state
     thread_ = std::thread([this] { serve(); });
 }
 
-MiniBus::~MiniBus() {
+FakeDBus::~FakeDBus() {
     stop();
     for (const int descriptor : {listener_, stopPipe_[0]}) ::close(descriptor);
 }
 
-const std::vector<std::string>& MiniBus::stop() {
+const std::vector<std::string>& FakeDBus::stop() {
     if (thread_.joinable()) {
         ::close(stopPipe_[1]);  // the other end becomes readable for good
         thread_.join();
@@ -150,7 +150,7 @@ const std::vector<std::string>& MiniBus::stop() {
     return messages_;
 }
 
-void MiniBus::serve() {
+void FakeDBus::serve() {
     for (;;) {
         struct pollfd waits[2] = {{listener_, POLLIN, 0}, {stopPipe_[0], POLLIN, 0}};
         if (::poll(waits, 2, -1) < 0 || waits[1].revents) return;
@@ -160,12 +160,12 @@ void MiniBus::serve() {
 }
 
 // Lets the delay pass; true when the bus is to stop.
-bool MiniBus::waitForStop() const {
+bool FakeDBus::waitForStop() const {
     struct pollfd stop = {stopPipe_[0], POLLIN, 0};
     return ::poll(&stop, 1, static_cast<int>(delay_.count())) != 0;
 }
 
-void MiniBus::serveClient(int socket) {
+void FakeDBus::serveClient(int socket) {
     constexpr const char* garbage = "HTTP/1.1 400 Bad Request\r\nContent-Length: 0\r\n\r\n";
     Client client(socket, stopPipe_[0]);
     if (behaviour_ == Behaviour::GarbageAtTheDoor) client.send(garbage);

@@ -1,4 +1,4 @@
-#include "tests/instrumentation/SystemdStandIn.h"
+#include "tests/instrumentation/FakeSystemd.h"
 
 #include <unistd.h>
 
@@ -9,13 +9,13 @@
 #include <cstring>
 #include <mutex>
 
-struct StandInMessage {
+struct FakeMessage {
     bool isError;
 };
 
-using Handler = int (*)(StandInMessage*, void*, void*);
+using Handler = int (*)(FakeMessage*, void*, void*);
 
-struct StandInBus {
+struct FakeBus {
     Handler handler = nullptr;
     void* userData = nullptr;
     int rounds = 0;
@@ -24,10 +24,10 @@ struct StandInBus {
 
 namespace {
 
-SystemdStandIn control;
+FakeSystemd control;
 std::mutex textMutex;
 
-using Behaviour = SystemdStandIn::Behaviour;
+using Behaviour = FakeSystemd::Behaviour;
 
 bool fails(const char* function) {
     return std::strcmp(control.failingFunction, function) == 0;
@@ -42,35 +42,35 @@ bool answers() {
 
 extern "C" {
 
-SystemdStandIn* systemd_stand_in() {
+FakeSystemd* fake_systemd() {
     return &control;
 }
 
-int sd_bus_new(StandInBus** bus) {
+int sd_bus_new(FakeBus** bus) {
     if (fails("sd_bus_new")) return -ENOTCONN;
     ++control.connections;
-    *bus = new StandInBus;
+    *bus = new FakeBus;
     return 0;
 }
 
-int sd_bus_set_address(StandInBus*, const char* address) {
+int sd_bus_set_address(FakeBus*, const char* address) {
     const std::lock_guard<std::mutex> lock(textMutex);
     std::snprintf(control.address, sizeof control.address, "%s", address);
     return fails("sd_bus_set_address") ? -ENOTCONN : 0;
 }
 
-int sd_bus_set_bus_client(StandInBus*, int on) {
+int sd_bus_set_bus_client(FakeBus*, int on) {
     control.busClients += on;
     return fails("sd_bus_set_bus_client") ? -ENOTCONN : 0;
 }
 
-int sd_bus_start(StandInBus*) {
+int sd_bus_start(FakeBus*) {
     return fails("sd_bus_start") ? -ENOTCONN : 1;
 }
 
-int sd_bus_call_method_async(StandInBus* bus, void** slot, const char* destination,
-                             const char* path, const char* interface, const char* member,
-                             Handler handler, void* userData, const char* types, ...) {
+int sd_bus_call_method_async(FakeBus* bus, void** slot, const char* destination, const char* path,
+                             const char* interface, const char* member, Handler handler,
+                             void* userData, const char* types, ...) {
     if (slot || std::strcmp(types, "ss") != 0) return -EINVAL;
     std::va_list arguments;
     va_start(arguments, types);
@@ -86,7 +86,7 @@ int sd_bus_call_method_async(StandInBus* bus, void** slot, const char* destinati
     return fails("sd_bus_call_method_async") ? -ENOTCONN : 1;
 }
 
-int sd_bus_process(StandInBus* bus, StandInMessage**) {
+int sd_bus_process(FakeBus* bus, FakeMessage**) {
     if (fails("sd_bus_process")) return -ENOTCONN;
     if (control.behaviour == Behaviour::Busy) return 1;
     // As the real one: some rounds to connect, each of which ends with nothing to do.
@@ -94,12 +94,12 @@ int sd_bus_process(StandInBus* bus, StandInMessage**) {
     if (bus->rounds < 6) return 0;
     if (control.behaviour == Behaviour::LosesConnection) return -ECONNRESET;
     if (!answers()) return 0;
-    StandInMessage reply{control.behaviour == Behaviour::ErrorReply};
+    FakeMessage reply{control.behaviour == Behaviour::ErrorReply};
     bus->handler(&reply, bus->userData, nullptr);
     return 1;
 }
 
-int sd_bus_wait(StandInBus* bus, std::uint64_t microseconds) {
+int sd_bus_wait(FakeBus* bus, std::uint64_t microseconds) {
     auto longest = control.longestWaitMicroseconds.load();
     while (microseconds > longest &&
            !control.longestWaitMicroseconds.compare_exchange_weak(longest, microseconds)) {
@@ -113,7 +113,7 @@ int sd_bus_wait(StandInBus* bus, std::uint64_t microseconds) {
     return comesBack ? 1 : 0;
 }
 
-int sd_bus_message_read(StandInMessage* message, const char* types, ...) {
+int sd_bus_message_read(FakeMessage* message, const char* types, ...) {
     if (fails("sd_bus_message_read")) return -ENOTCONN;
     if (message->isError || std::strcmp(types, "v") != 0) return -ENXIO;
     std::va_list arguments;
@@ -126,11 +126,11 @@ int sd_bus_message_read(StandInMessage* message, const char* types, ...) {
     return 1;
 }
 
-void sd_bus_close(StandInBus*) {
+void sd_bus_close(FakeBus*) {
     ++control.closed;
 }
 
-StandInBus* sd_bus_unref(StandInBus* bus) {
+FakeBus* sd_bus_unref(FakeBus* bus) {
     ++control.released;
     delete bus;
     return nullptr;

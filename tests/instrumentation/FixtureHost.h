@@ -1,7 +1,8 @@
-#ifndef TESTS_INSTRUMENTATION_HOST_PARTS_H
-#define TESTS_INSTRUMENTATION_HOST_PARTS_H
+#ifndef TESTS_INSTRUMENTATION_FIXTURE_HOST_H
+#define TESTS_INSTRUMENTATION_FIXTURE_HOST_H
 
 #include <atomic>
+#include <cstdint>
 #include <map>
 #include <memory>
 #include <mutex>
@@ -9,8 +10,23 @@
 #include <set>
 #include <string>
 
-#include "FixtureTree.h"
 #include "framework/instrumentation/LinuxHost.h"
+#include "tests/instrumentation/FixtureTree.h"
+
+/// One record of a utmp file, byte by byte as an x86 host writes it in either word size.
+inline std::string utmpRecord(std::int16_t type, std::int32_t pid, const std::string& user) {
+    std::string record(384, '\0');
+    record.replace(0, 2, reinterpret_cast<const char*>(&type), 2);
+    record.replace(4, 4, reinterpret_cast<const char*>(&pid), 4);
+    record.replace(8, 5, "pts/0");
+    record.replace(44, user.size(), user);
+    return record;
+}
+
+constexpr std::int16_t utmpBootTime = 2;
+constexpr std::int16_t utmpLoginProcess = 6;
+constexpr std::int16_t utmpUserProcess = 7;
+constexpr std::int16_t utmpDeadProcess = 8;
 
 /// Files of a fixture tree that count each look ("look at /etc/os-release"), and each file or
 /// folder that is read, by path. Those that date an installation have the dates that they are
@@ -106,6 +122,21 @@ class FixedSystemManager final : public VA::Linux::SystemManager {
     std::optional<std::string> state = "running";
     std::atomic<int> calls{0};
 };
+
+/// Asks a cursor for all that it may be asked for, in every type.
+inline void readEverything(VA::NodeCursor& cursor) {
+    std::string text;
+    unsigned int number = 0;
+    bool flag = false;
+    for (unsigned int id = 100; id < 160; ++id) {
+        cursor.readProperty(VA::NodeLexicon::Properties(id), text);
+        cursor.readProperty(VA::NodeLexicon::Properties(id), number);
+        cursor.readProperty(VA::NodeLexicon::Properties(id), flag);
+        cursor.readOnlyProperty(VA::NodeLexicon::Properties(id), flag);
+    }
+    cursor.readComputerName(text);
+    cursor.nodeStatus();
+}
 
 /// A Linux host over a fixture tree, with each of its parts within reach.
 class FixtureHost {
