@@ -21,4 +21,6 @@ endif()
 set_target_properties(korvaosstatusfacade korzbosstatusprofileprovider korvacomputersystemprovider
     PROPERTIES INSTALL_RPATH "$ORIGIN;${korva_framework_folder}")
 
-install(TARGETS cmpihost RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}" COMPONENT tools)
+if(KORVA_CMPIHOST)
+    install(TARGETS cmpihost RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}" COMPONENT tools)
+endif()

@@ -8,21 +8,27 @@ set(CMAKE_CXX_VISIBILITY_PRESET hidden)
 set(CMAKE_VISIBILITY_INLINES_HIDDEN ON)
 set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
 
+if(NOT CMAKE_BUILD_TYPE AND NOT CMAKE_CONFIGURATION_TYPES)
+    set(CMAKE_BUILD_TYPE RelWithDebInfo CACHE STRING "Kind of build" FORCE)
+endif()
+
 set(CMAKE_LIBRARY_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/lib")
 set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/lib/static")
 set(CMAKE_RUNTIME_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/bin")
 
-set(KORVA_WORD_SIZE "64" CACHE STRING "Word size of everything that is built: 32 or 64")
+math(EXPR korva_word_size "8 * ${CMAKE_SIZEOF_VOID_P}")
+set(KORVA_WORD_SIZE "${korva_word_size}" CACHE STRING "Word size of everything that is built: 32 or 64")
 set(KORVA_SANITIZE "" CACHE STRING "Value for -fsanitize=, empty for none")
 option(KORVA_WERROR "Treat warnings as errors" OFF)
+option(KORVA_UNITY "Compile the files of each test program, and those of cmpihost, as one" OFF)
 
 include(CheckPIESupported)
 check_pie_supported()
 
 # Everything carries these: they change the binary interface or the whole program.
-if(KORVA_WORD_SIZE STREQUAL "32")
-    add_compile_options(-m32)
-    add_link_options(-m32)
+if(NOT KORVA_WORD_SIZE STREQUAL "${korva_word_size}")
+    add_compile_options(-m${KORVA_WORD_SIZE})
+    add_link_options(-m${KORVA_WORD_SIZE})
 endif()
 add_compile_definitions(_FILE_OFFSET_BITS=64 _TIME_BITS=64)
 if(KORVA_SANITIZE)
@@ -49,7 +55,9 @@ add_link_options(-Wl,-z,relro -Wl,-z,now -Wl,-z,noexecstack)
 add_library(korva_options INTERFACE)
 add_library(korva::options ALIAS korva_options)
 target_compile_options(korva_options INTERFACE
-    -Wall -Wextra -Wpedantic -Wshadow -Wconversion
+    -Wall -Wextra -Wpedantic -Wconversion
+    # Among files that are compiled as one, a name of one shadows that of another.
+    $<$<NOT:$<BOOL:${KORVA_UNITY}>>:-Wshadow>
     $<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor -Woverloaded-virtual>
     $<$<BOOL:${KORVA_WERROR}>:-Werror>)
 

@@ -9,7 +9,10 @@ set(CPACK_PACKAGE_DIRECTORY "${CMAKE_BINARY_DIR}/packages")
 set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
 set(CPACK_STRIP_FILES ON)
 set(CPACK_COMPONENTS_GROUPING ONE_PER_GROUP)
-set(CPACK_COMPONENTS_ALL provider companion development tools)
+set(CPACK_COMPONENTS_ALL provider companion development)
+if(KORVA_CMPIHOST)
+    list(APPEND CPACK_COMPONENTS_ALL tools)
+endif()
 set(CPACK_PROJECT_CONFIG_FILE "${korva_packaging}/PackageProperties.cmake")
 
 set(CPACK_DEB_COMPONENT_INSTALL ON)
@@ -81,12 +84,14 @@ korva_package(development korva-osstatus-dev korva-osstatus-devel
 another agent of the framework's libraries: utilities for CMPI providers,
 instrumentation of the host, log and trace."
     "${korva_same_provider}")
-korva_package(tools korva-osstatus-tools korva-osstatus-tools
-    "embedded CIM host for one CMPI provider"
-    "The command cmpihost loads a provider as an object manager does, runs one
+if(KORVA_CMPIHOST)
+    korva_package(tools korva-osstatus-tools korva-osstatus-tools
+        "embedded CIM host for one CMPI provider"
+        "The command cmpihost loads a provider as an object manager does, runs one
 operation on it and prints what it returns: for trying out a provider, for
 tests and for looking at a host without an object manager."
-    "${korva_same_provider}" ${korva_libraries})
+        "${korva_same_provider}" ${korva_libraries})
+endif()
 
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_SECTION libdevel)
 set(CPACK_DEBIAN_PROVIDER_PACKAGE_RECOMMENDS "libsystemd0")

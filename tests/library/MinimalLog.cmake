@@ -12,7 +12,7 @@ get_target_property(folder osstatusprovider_objects SOURCE_DIR)
 get_target_property(sources osstatusprovider_objects SOURCES)
 list(TRANSFORM sources PREPEND "${folder}/")
 add_library(minimal_log_provider SHARED EXCLUDE_FROM_ALL ${sources})
-set_target_properties(minimal_log_provider PROPERTIES
+set_target_properties(minimal_log_provider PROPERTIES UNITY_BUILD OFF
     OUTPUT_NAME korzbosstatusprofileprovider SOVERSION 1
     LIBRARY_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/minimal-log/lib")
 target_include_directories(minimal_log_provider

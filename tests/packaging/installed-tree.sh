@@ -190,7 +190,7 @@ AgentIsBuiltWithPkgConfig() {
 
 # configure OPTION...: a tree of its own in $work/build, which is not built.
 configure() {
-    expect_success cmake -G Ninja -S "$KORVA_SOURCE_DIR" -B "$work/build" -DKORVA_TEST_AREAS= \
+    expect_success cmake -G Ninja -S "$KORVA_SOURCE_DIR" -B "$work/build" -DBUILD_TESTING=OFF \
         -DKORVA_WORD_SIZE="$KORVA_WORD_SIZE" "$@"
 }
 

@@ -15,7 +15,7 @@ run("${CMAKE_COMMAND}" -DFROM=${SOURCE}/include/cmpi -DTO=${usr}/include/cmpi
     -P "${CMAKE_CURRENT_LIST_DIR}/headers.cmake")
 run("${CMAKE_COMMAND}" -S "${SOURCE}" -B "${BUILD}" -G Ninja -DCMAKE_PREFIX_PATH=${usr}
     -DCMAKE_C_COMPILER=${C} -DCMAKE_CXX_COMPILER=${CXX} -DCMAKE_BUILD_TYPE=None
-    -DKORVA_WORD_SIZE=${WORD_SIZE} -DKORVA_WERROR=ON -DKORVA_TEST_AREAS=)
+    -DKORVA_WORD_SIZE=${WORD_SIZE} -DKORVA_WERROR=ON -DBUILD_TESTING=OFF -DKORVA_CMPIHOST=OFF)
 if(NOT output MATCHES "CMPI headers: ${usr}/include/cmpi")
     message(FATAL_ERROR "not with the distribution's headers: ${output}")
 endif()
