@@ -203,7 +203,7 @@ ProvidersFollowTheLibrariesToAnotherFolder() {
 
 HostKnowsAnotherFolderOfTheProviders() {
     configure -DKORVA_CMPI_LIBDIR=agents/cim
-    grep -F 'Places.cpp' "$work/build/compile_commands.json" >"$work/compiled"
+    grep -F 'InstallPaths.cpp' "$work/build/compile_commands.json" >"$work/compiled"
     expect_text 'KORVA_CMPI_FOLDER=\\\"agents/cim\\\"' "$(cat "$work/compiled")"
 }
 
