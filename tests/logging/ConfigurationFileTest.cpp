@@ -15,14 +15,13 @@ namespace {
 
 using ZBLog::Channel;
 using ZBLog::ConfigurationFile;
-using ZBLog::configurationSourceFrom;
 
-/// What news brings: the log's level, and the errors.
-std::string newsOf(ConfigurationFile& file) {
-    const auto news = file.readIfChanged();
-    if (!news) return "no news";
-    std::string text = std::to_string(news->configuration.of(Channel::log).level);
-    for (const auto& error : news->errors) {
+/// What reading brings: the log's level, and the errors.
+std::string readingOf(ConfigurationFile& file) {
+    const auto read = file.readIfChanged();
+    if (!read) return "unchanged";
+    std::string text = std::to_string(read->configuration.of(Channel::log).level);
+    for (const auto& error : read->errors) {
         text += " [" + std::to_string(error.line) + ": " + error.message + "]";
     }
     return text;
@@ -74,52 +73,52 @@ class UnnoticedChanges {
     char* content_ = nullptr;
 };
 
-TEST_F(ConfigurationFileTest, IsNewsOnceAndAgainWhenItsContentChanges) {
+TEST_F(ConfigurationFileTest, IsReadOnceAndAgainWhenItsContentChanges) {
     writeLongAgo("log.level = 1\n");
-    EXPECT_EQ(newsOf(file_), "1");
-    EXPECT_EQ(newsOf(file_), "no news");
+    EXPECT_EQ(readingOf(file_), "1");
+    EXPECT_EQ(readingOf(file_), "unchanged");
     logging_test::writeFile(path_, "log.level = 22\n");
-    EXPECT_EQ(newsOf(file_), "22");
-    EXPECT_EQ(newsOf(file_), "no news");
+    EXPECT_EQ(readingOf(file_), "22");
+    EXPECT_EQ(readingOf(file_), "unchanged");
 }
 
-TEST_F(ConfigurationFileTest, IsNoNewsWhenItWasOnlyTouchedOrReplacedByTheSame) {
+TEST_F(ConfigurationFileTest, IsUnchangedWhenItWasOnlyTouchedOrReplacedByTheSame) {
     writeLongAgo("log.level = x\n");
-    EXPECT_EQ(newsOf(file_), "3000 [1: log.level must be a number from 0 to 999999, not \"x\"]");
+    EXPECT_EQ(readingOf(file_), "3000 [1: log.level must be a number from 0 to 999999, not \"x\"]");
     std::filesystem::last_write_time(path_, std::filesystem::file_time_type::clock::now());
-    EXPECT_EQ(newsOf(file_), "no news");
+    EXPECT_EQ(readingOf(file_), "unchanged");
     logging_test::writeFile(path_ + ".new", "log.level = x\n");
     std::filesystem::rename(path_ + ".new", path_);
-    EXPECT_EQ(newsOf(file_), "no news");
+    EXPECT_EQ(readingOf(file_), "unchanged");
 }
 
-TEST_F(ConfigurationFileTest, IsNewsWhenAnotherFileTakesItsPlace) {
+TEST_F(ConfigurationFileTest, IsReadWhenAnotherFileTakesItsPlace) {
     writeLongAgo("log.level = 1\n");
-    EXPECT_EQ(newsOf(file_), "1");
+    EXPECT_EQ(readingOf(file_), "1");
     logging_test::writeFile(path_ + ".new", "log.level = 2\n");
     std::filesystem::rename(path_ + ".new", path_);
-    EXPECT_EQ(newsOf(file_), "2");
+    EXPECT_EQ(readingOf(file_), "2");
 }
 
 TEST_F(ConfigurationFileTest, SeesAChangeThatKeepsItsSizeAndItsTimeOfModification) {
     writeLongAgo("log.level = 1\n");
-    EXPECT_EQ(newsOf(file_), "1");
+    EXPECT_EQ(readingOf(file_), "1");
     const auto modified = std::filesystem::last_write_time(path_);
     std::this_thread::sleep_for(std::chrono::milliseconds(20));  // file times advance in steps
     logging_test::writeFile(path_, "log.level = 2\n");
     std::filesystem::last_write_time(path_, modified);
-    EXPECT_EQ(newsOf(file_), "2");
+    EXPECT_EQ(readingOf(file_), "2");
 }
 
 TEST_F(ConfigurationFileTest, SeesASecondChangeInTheSameMoment) {
     UnnoticedChanges changes;
     ConfigurationFile file({changes.path(), true}, environment_);
     environment_.stopUtcAt(changes.changedAt());
-    EXPECT_EQ(newsOf(file), "1");
+    EXPECT_EQ(readingOf(file), "1");
     changes.setLevel('2');
     environment_.stopUtcAt(changes.changedAt() + 2);
-    EXPECT_EQ(newsOf(file), "2");
-    EXPECT_EQ(newsOf(file), "no news");
+    EXPECT_EQ(readingOf(file), "2");
+    EXPECT_EQ(readingOf(file), "unchanged");
 }
 
 TEST_F(ConfigurationFileTest, IsNotReadWhileItRests) {
@@ -128,69 +127,61 @@ TEST_F(ConfigurationFileTest, IsNotReadWhileItRests) {
         changes.setLevel('1');
         ConfigurationFile file({changes.path(), true}, environment_);
         environment_.stopUtcAt(changes.changedAt() + age);
-        EXPECT_EQ(newsOf(file), "1");
+        EXPECT_EQ(readingOf(file), "1");
         changes.setLevel('2');
-        EXPECT_EQ(newsOf(file), "no news") << age;
+        EXPECT_EQ(readingOf(file), "unchanged") << age;
     }
 }
 
 TEST_F(ConfigurationFileTest, MissingFileIsAnErrorOnlyIfItIsRequired) {
-    EXPECT_EQ(newsOf(file_), "3000 [0: cannot be read: No such file or directory]");
-    EXPECT_EQ(newsOf(file_), "no news");
+    EXPECT_EQ(readingOf(file_), "3000 [0: cannot be read: No such file or directory]");
+    EXPECT_EQ(readingOf(file_), "unchanged");
     ConfigurationFile optional({path_, false}, environment_);
-    EXPECT_EQ(newsOf(optional), "3000");
-    EXPECT_EQ(newsOf(optional), "no news");
+    EXPECT_EQ(readingOf(optional), "3000");
+    EXPECT_EQ(readingOf(optional), "unchanged");
     ConfigurationFile beneathAFile({"/etc/passwd/zblog.conf", false}, environment_);
-    EXPECT_EQ(newsOf(beneathAFile), "3000");
+    EXPECT_EQ(readingOf(beneathAFile), "3000");
 }
 
 TEST_F(ConfigurationFileTest, FileThatIsThereAndCannotBeReadIsAnErrorInAnyCase) {
     std::filesystem::create_symlink(path_, path_);
     ConfigurationFile optional({path_, false}, environment_);
-    EXPECT_EQ(newsOf(optional), "3000 [0: cannot be read: Too many levels of symbolic links]");
-    EXPECT_EQ(newsOf(optional), "no news");
+    EXPECT_EQ(readingOf(optional), "3000 [0: cannot be read: Too many levels of symbolic links]");
+    EXPECT_EQ(readingOf(optional), "unchanged");
 }
 
 TEST_F(ConfigurationFileTest, ComesAndGoes) {
     ConfigurationFile file({path_, false}, environment_);
-    EXPECT_EQ(newsOf(file), "3000");
+    EXPECT_EQ(readingOf(file), "3000");
     writeLongAgo("log.level = 1\n");
-    EXPECT_EQ(newsOf(file), "1");
+    EXPECT_EQ(readingOf(file), "1");
     std::filesystem::remove(path_);
-    EXPECT_EQ(newsOf(file), "3000");
-    EXPECT_EQ(newsOf(file), "no news");
+    EXPECT_EQ(readingOf(file), "3000");
+    EXPECT_EQ(readingOf(file), "unchanged");
     writeLongAgo("log.level = 1\n");
-    EXPECT_EQ(newsOf(file), "1");
+    EXPECT_EQ(readingOf(file), "1");
 }
 
 TEST_F(ConfigurationFileTest, NoFileMeansTheDefaults) {
     ConfigurationFile none({"", true}, environment_);
-    EXPECT_EQ(newsOf(none), "3000");
-    EXPECT_EQ(newsOf(none), "no news");
+    EXPECT_EQ(readingOf(none), "3000");
+    EXPECT_EQ(readingOf(none), "unchanged");
 }
 
 TEST_F(ConfigurationFileTest, IsRefusedWhenItIsTooLong) {
     writeLongAgo(std::string(100000, '\n'));
-    EXPECT_EQ(newsOf(file_), "3000 [0: longer than 65536 bytes]");
-    EXPECT_EQ(newsOf(file_), "no news");
+    EXPECT_EQ(readingOf(file_), "3000 [0: longer than 65536 bytes]");
+    EXPECT_EQ(readingOf(file_), "unchanged");
 }
 
 TEST_F(ConfigurationFileTest, IsRefusedWhenItIsNoRegularFile) {
     ConfigurationFile folder({folder_.path(), true}, environment_);
-    EXPECT_EQ(newsOf(folder), "3000 [0: not a regular file]");
-    EXPECT_EQ(newsOf(folder), "no news");
+    EXPECT_EQ(readingOf(folder), "3000 [0: not a regular file]");
+    EXPECT_EQ(readingOf(folder), "unchanged");
     ASSERT_EQ(::mkfifo(path_.c_str(), 0600), 0);
-    EXPECT_EQ(newsOf(file_), "3000 [0: not a regular file]");
+    EXPECT_EQ(readingOf(file_), "3000 [0: not a regular file]");
     ConfigurationFile endless({"/dev/zero", true}, environment_);
-    EXPECT_EQ(newsOf(endless), "3000 [0: not a regular file]");
-}
-
-TEST(ConfigurationSource, IsTheSystemsFileUnlessTheEnvironmentNamesAnother) {
-    EXPECT_EQ(configurationSourceFrom(nullptr).path, "/etc/zblog.conf");
-    EXPECT_FALSE(configurationSourceFrom(nullptr).required);
-    EXPECT_EQ(configurationSourceFrom("/proc/self/fd/7").path, "/proc/self/fd/7");
-    EXPECT_TRUE(configurationSourceFrom("/proc/self/fd/7").required);
-    EXPECT_EQ(configurationSourceFrom("").path, "");
+    EXPECT_EQ(readingOf(endless), "3000 [0: not a regular file]");
 }
 
 }  // namespace

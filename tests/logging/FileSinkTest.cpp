@@ -1,16 +1,21 @@
-#include "framework/logging/Sinks.h"
-
+// Files as the log uses them: descriptors that the process may take away, writes that raise no
+// signal, and the file that bears a name at the moment of writing.
 #include <fcntl.h>
 #include <gmock/gmock.h>
+#include <sys/mman.h>
+#include <sys/resource.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
 #include <array>
 #include <atomic>
+#include <csignal>
 #include <filesystem>
+#include <functional>
 #include <set>
 #include <thread>
 
+#include "framework/logging/Sinks.h"
 #include "tests/logging/LoggingSupport.h"
 
 namespace {
@@ -19,6 +24,90 @@ using logging_test::readFile;
 using logging_test::record;
 using logging_test::textsOf;
 using testing::ElementsAre;
+using ZBLog::PosixFile;
+
+TEST(PosixFile, HoldsNothingAtFirstAndAfterItWasClosed) {
+    PosixFile file;
+    EXPECT_FALSE(file.isOpen());
+    EXPECT_EQ(file.open("/dev/null", O_RDONLY), 0);
+    EXPECT_TRUE(file.isOpen());
+    file.close();
+    EXPECT_FALSE(file.isOpen());
+    EXPECT_EQ(file.open("/dev/null/x", O_RDONLY), ENOTDIR);
+    EXPECT_FALSE(file.isOpen());
+}
+
+TEST(PosixFile, HoldsOneFileAtATime) {
+    const std::size_t before = logging_test::openDescriptors();
+    {
+        PosixFile file;
+        for (const char* path : {"/dev/null", "/dev/zero", "/dev/null"}) {
+            EXPECT_EQ(file.open(path, O_RDONLY), 0);
+            EXPECT_EQ(logging_test::openDescriptors(), before + 1);
+        }
+    }
+    EXPECT_EQ(logging_test::openDescriptors(), before);
+}
+
+TEST(PosixFile, IsNoneOfTheStandardStreams) {
+    for (const int stream : {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO}) {
+        const int status = logging_test::inChildProcess([stream] {
+            ::close(stream);
+            PosixFile file;
+            if (file.open("/dev/null", O_RDONLY) != 0 || !file.isOpen()) return 1;
+            return ::fcntl(stream, F_GETFD) == -1 ? 0 : 2;
+        });
+        EXPECT_EQ(status, 0) << stream;
+    }
+}
+
+/// A descriptor whose writes raise the signal: of a pipe that nobody reads, or of a file in a
+/// process that may write none.
+int raising(int signal) {
+    if (signal == SIGXFSZ) {
+        const rlimit none{0, 0};
+        ::setrlimit(RLIMIT_FSIZE, &none);
+        return ::memfd_create("limited", 0);
+    }
+    std::array<int, 2> ends{};
+    if (::pipe(ends.data()) != 0) return -1;
+    ::close(ends[0]);
+    return ends[1];
+}
+
+/// Whether `signal` is blocked and pending after a write that raises it, as both were before.
+int writeRaising(int signal, bool pendingBefore) {
+    sigset_t set, mask, pending;
+    ::sigemptyset(&set);
+    ::sigaddset(&set, signal);
+    if (pendingBefore) {
+        ::pthread_sigmask(SIG_BLOCK, &set, nullptr);
+        ::raise(signal);
+    }
+    const ZBLog::WriteResult result = ZBLog::writeFully(raising(signal), "text");
+    if (result.error != (signal == SIGPIPE ? EPIPE : EFBIG) || result.written != 0) return 1;
+    ::sigpending(&pending);
+    ::pthread_sigmask(SIG_SETMASK, nullptr, &mask);
+    const int expected = pendingBefore ? 1 : 0;
+    return ::sigismember(&pending, signal) == expected && ::sigismember(&mask, signal) == expected
+               ? 0
+               : 2;
+}
+
+TEST(WriteFully, RaisesNoSignalAndLeavesOnePendingThatWasPendingBefore) {
+    for (const int signal : {SIGPIPE, SIGXFSZ}) {
+        for (const auto disposition : {SIG_DFL, SIG_IGN}) {
+            for (const bool pendingBefore : {false, true}) {
+                const int status = logging_test::inChildProcess([&] {
+                    std::signal(signal, disposition);
+                    return writeRaising(signal, pendingBefore);
+                });
+                EXPECT_EQ(status, 0) << signal << (disposition == SIG_IGN ? " ignored" : "")
+                                     << (pendingBefore ? " pending" : "");
+            }
+        }
+    }
+}
 
 class FileSinkTest : public testing::Test {
   protected:
@@ -56,49 +145,37 @@ TEST_F(FileSinkTest, WritesWholeLinesAtTheEnd) {
     logging_test::writeFile(path_, "there already\n");
     sink_.write(record("one"));
     sink_.write(record("two\nthree"));
-    const std::string content = readFile(path_);
-    EXPECT_EQ(content.substr(0, 14), "there already\n");
-    EXPECT_THAT(textsOf(content.substr(14)), ElementsAre("one", "two\\x0Athree"));
-    EXPECT_THAT(content, testing::ContainsRegex(
-                             " [0-9]+ [0-9]+ log 3000 Zumbrel\\.Test work Work\\.cpp:12 one\n"));
+    const std::string time = "[0-9]{4}-[0-9]{2}-[0-9]{2}T[0-9:]{8}[.][0-9]{3}Z";
+    const std::string start = time + " " + std::to_string(::getpid()) + " " +
+                              std::to_string(::gettid()) +
+                              " log 3000 Zumbrel.Test work Work.cpp:12 ";
+    EXPECT_THAT(readFile(path_), testing::MatchesRegex("there already\n" + start + "one\n" + start +
+                                                       "two\\\\x0Athree\n"));
     EXPECT_TRUE(environment_.takeSystemLog().empty());
 }
 
-TEST_F(FileSinkTest, TellsProcessAndThread) {
-    sink_.write(record("one"));
-    EXPECT_NE(readFile(path_).find(" " + std::to_string(::getpid()) + " " +
-                                   std::to_string(::gettid()) + " log "),
-              std::string::npos);
-}
-
-TEST_F(FileSinkTest, GoesToTheNewFileAfterARotation) {
-    sink_.write(record("one"));
-    std::filesystem::rename(path_, path_ + ".1");
-    sink_.write(record("two"));
+TEST_F(FileSinkTest, GoesToTheFileThatBearsTheNameNow) {
+    const struct {
+        const char* description;
+        std::function<void()> happen;
+    } rows[] = {
+        {"rotated", [&] { std::filesystem::rename(path_, path_ + ".1"); }},
+        {"replaced",
+         [&] {
+             logging_test::writeFile(path_ + ".new", "");
+             std::filesystem::rename(path_ + ".new", path_);
+         }},
+        {"removed", [&] { std::filesystem::remove(path_); }},
+        {"truncated", [&] { std::filesystem::resize_file(path_, 0); }},
+    };
+    for (const auto& row : rows) {
+        sink_.write(record("one"));
+        row.happen();
+        sink_.write(record("two"));
+        EXPECT_THAT(textsOf(readFile(path_)), ElementsAre("two")) << row.description;
+        std::filesystem::remove(path_);
+    }
     EXPECT_THAT(textsOf(readFile(path_ + ".1")), ElementsAre("one"));
-    EXPECT_THAT(textsOf(readFile(path_)), ElementsAre("two"));
-}
-
-TEST_F(FileSinkTest, GoesToTheFileThatWasPutInItsPlace) {
-    sink_.write(record("one"));
-    logging_test::writeFile(path_ + ".new", "");
-    std::filesystem::rename(path_ + ".new", path_);
-    sink_.write(record("two"));
-    EXPECT_THAT(textsOf(readFile(path_)), ElementsAre("two"));
-}
-
-TEST_F(FileSinkTest, CreatesTheFileAgainWhenItWasRemoved) {
-    sink_.write(record("one"));
-    std::filesystem::remove(path_);
-    sink_.write(record("two"));
-    EXPECT_THAT(textsOf(readFile(path_)), ElementsAre("two"));
-}
-
-TEST_F(FileSinkTest, ContinuesAtTheStartAfterATruncation) {
-    sink_.write(record("one"));
-    std::filesystem::resize_file(path_, 0);
-    sink_.write(record("two"));
-    EXPECT_THAT(textsOf(readFile(path_)), ElementsAre("two"));
 }
 
 /// The text of the record that `writer` writes as its `count`-th.

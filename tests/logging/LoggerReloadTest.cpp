@@ -12,11 +12,11 @@ namespace {
 using logging_test::readFile;
 using logging_test::record;
 using logging_test::textsOf;
+using logging_test::warningOf;
 using logging_test::writeFile;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-const std::string warning = std::to_string(LOG_DAEMON | LOG_WARNING) + " korva-osstatus: ";
 constexpr const char* failure = "MESSAGE [File: Work.cpp, Line: 12]: it broke";
 
 class LoggerReloadTest : public testing::Test {
@@ -24,11 +24,16 @@ class LoggerReloadTest : public testing::Test {
     LoggerReloadTest() { environment_.source = {path_, true}; }
 
     void configure(const std::string& content) { writeFile(path_, content); }
+    void reconfigure(const std::string& content) {
+        configure(content);
+        environment_.advance(1000);
+    }
     void write(const std::string& text) { logger_.write(record(text)); }
 
     logging_test::TemporaryFolder folder_;
     logging_test::FakeEnvironment environment_;
     const std::string path_ = folder_ / "zblog.conf";
+    const std::string notInForce_ = warningOf(path_ + ": not in force; the defaults hold");
     const std::string first_ = folder_ / "first";
     const std::string second_ = folder_ / "second";
     const std::string toFirst_ = "log.sink = file:" + first_ + "\nlog.records = all\n";
@@ -59,8 +64,7 @@ TEST_F(LoggerReloadTest, FollowsAChangeWhenItsClockWrapsAround) {
     environment_.setMilliseconds(std::numeric_limits<std::uint32_t>::max() - 100);
     configure(toFirst_);
     write("one");
-    configure(toSecond_);
-    environment_.advance(1000);
+    reconfigure(toSecond_);
     write("two");
     EXPECT_THAT(textsOf(readFile(second_)), ElementsAre("two"));
 }
@@ -70,8 +74,7 @@ TEST_F(LoggerReloadTest, ClosesAFileThatIsNoLongerWanted) {
     write("one");
     const std::size_t before = logging_test::openDescriptors();
     for (int round = 0; round < 20; ++round) {
-        configure(round % 2 == 0 ? toSecond_ : toFirst_);
-        environment_.advance(1000);
+        reconfigure(round % 2 == 0 ? toSecond_ : toFirst_);
         write("two");
         EXPECT_EQ(logging_test::openDescriptors(), before);
     }
@@ -80,11 +83,9 @@ TEST_F(LoggerReloadTest, ClosesAFileThatIsNoLongerWanted) {
 TEST_F(LoggerReloadTest, OpensAClosedChannelAndClosesAnOpenOne) {
     configure("log.sink = off\n");
     write(failure);
-    configure(toFirst_);
-    environment_.advance(1000);
+    reconfigure(toFirst_);
     write("one");
-    configure("log.sink = off\n");
-    environment_.advance(1000);
+    reconfigure("log.sink = off\n");
     write("two");
     EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one"));
     EXPECT_THAT(environment_.takeSystemLog(), IsEmpty());
@@ -95,8 +96,7 @@ TEST_F(LoggerReloadTest, KeepsCountingLostRecordsWhenOnlyTheLevelChanges) {
     const std::string sink = "log.sink = file:" + file + "\nlog.records = all\n";
     configure(sink);
     write("lost");
-    configure(sink + "log.level = 4000\n");
-    environment_.advance(1000);
+    reconfigure(sink + "log.level = 4000\n");
     write("lost");
     std::filesystem::create_directory(folder_ / "var");
     write("one");
@@ -115,8 +115,8 @@ TEST_F(LoggerReloadTest, ReportsErrorsOnceAndKeepsTheDefaults) {
     EXPECT_THAT(
         environment_.takeSystemLog(),
         ElementsAre(
-            warning + path_ + ":3: log.level must be a number from 0 to 999999, not \"high\"",
-            warning + path_ + ": not in force; the defaults hold",
+            warningOf(path_ + ":3: log.level must be a number from 0 to 999999, not \"high\""),
+            notInForce_,
             std::to_string(LOG_DAEMON | LOG_ERR) +
                 " korva-osstatus: log 3000 Zumbrel.Test work Work.cpp:12 " + failure));
 }
@@ -125,22 +125,19 @@ TEST_F(LoggerReloadTest, ReportsAgainWhenTheFileChangesAndIsStillWrong) {
     configure("x\n");
     write("one");
     environment_.takeSystemLog();
-    configure("y\n");
-    environment_.advance(1000);
+    reconfigure("y\n");
     write("one");
-    EXPECT_THAT(environment_.takeSystemLog(),
-                ElementsAre(warning + path_ + ":1: not of the form KEY = VALUE: \"y\"",
-                            warning + path_ + ": not in force; the defaults hold"));
+    EXPECT_THAT(
+        environment_.takeSystemLog(),
+        ElementsAre(warningOf(path_ + ":1: not of the form KEY = VALUE: \"y\""), notInForce_));
 }
 
 TEST_F(LoggerReloadTest, GoesBackToTheDefaultsWhenAGoodFileBecomesABadOne) {
     configure(toFirst_);
     write("one");
-    configure(toFirst_ + "nonsense\n");
-    environment_.advance(1000);
+    reconfigure(toFirst_ + "nonsense\n");
     write("two");
-    configure(toFirst_);
-    environment_.advance(1000);
+    reconfigure(toFirst_);
     write("three");
     EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one", "three"));
 }
@@ -150,17 +147,16 @@ TEST_F(LoggerReloadTest, ReportsAMissingFileOnceIfItWasAskedFor) {
         write("one");
         environment_.advance(1000);
     }
-    EXPECT_THAT(environment_.takeSystemLog(),
-                ElementsAre(warning + path_ + ": cannot be read: No such file or directory",
-                            warning + path_ + ": not in force; the defaults hold"));
+    EXPECT_THAT(
+        environment_.takeSystemLog(),
+        ElementsAre(warningOf(path_ + ": cannot be read: No such file or directory"), notInForce_));
 }
 
 TEST_F(LoggerReloadTest, SaysNothingAboutAMissingFileOfTheSystem) {
     environment_.source.required = false;
     write("one");
     EXPECT_THAT(environment_.takeSystemLog(), IsEmpty());
-    configure(toFirst_);
-    environment_.advance(1000);
+    reconfigure(toFirst_);
     write("two");
     EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("two"));
 }
@@ -171,8 +167,7 @@ TEST_F(LoggerReloadTest, LetsGoOfItsFileWhenAConfigurationIsPutInForce) {
     write("one");
     logger_.use(ZBLog::Configuration());
     EXPECT_EQ(logging_test::openDescriptors(), before);
-    configure(toSecond_);
-    environment_.advance(1000);
+    reconfigure(toSecond_);
     write("two");
     EXPECT_FALSE(std::filesystem::exists(second_));
 }

@@ -1,11 +1,15 @@
+// What passes and where it goes, with a configuration that is set from the start and stays.
 #include "framework/logging/Logger.h"
 
 #include <gmock/gmock.h>
 #include <syslog.h>
 #include <unistd.h>
 
+#include <atomic>
 #include <cerrno>
 #include <filesystem>
+#include <set>
+#include <thread>
 
 #include "ZBLogger.h"
 #include "tests/logging/LoggingSupport.h"
@@ -18,6 +22,7 @@ using logging_test::record;
 using logging_test::textsOf;
 using testing::ElementsAre;
 using ZBLog::Channel;
+using ZBLog::ChannelConfiguration;
 using ZBLog::Configuration;
 using ZBLog::Destination;
 
@@ -25,6 +30,22 @@ constexpr const char* failure = "MESSAGE [File: Work.cpp, Line: 12]: it broke";
 
 class LoggerTest : public testing::Test {
   protected:
+    static Configuration configurationOf(const ChannelConfiguration& log,
+                                         const ChannelConfiguration& trace = {}) {
+        Configuration configuration;
+        configuration.of(Channel::log) = log;
+        configuration.of(Channel::trace) = trace;
+        return configuration;
+    }
+
+    /// A file that takes everything up to level 4000.
+    static ChannelConfiguration to(const std::string& path) {
+        return everythingTo(Destination::file, path);
+    }
+
+    void use(const ChannelConfiguration& log, const ChannelConfiguration& trace = {}) {
+        logger_.use(configurationOf(log, trace));
+    }
     void write(const std::string& text, int level, Channel channel = Channel::log) {
         logger_.write(record(text, level, channel));
     }
@@ -52,11 +73,9 @@ TEST_F(LoggerTest, SendsFailuresToTheSystemsLogWithoutAnyConfiguration) {
 }
 
 TEST_F(LoggerTest, LetsLevelsUpToTheThresholdPass) {
-    Configuration configuration;
-    configuration.of(Channel::log) = everythingTo(Destination::file, log_);
-    configuration.of(Channel::log).level = 3000;
-    configuration.of(Channel::trace) = everythingTo(Destination::file, trace_);
-    logger_.use(configuration);
+    ChannelConfiguration coarse = to(log_);
+    coarse.level = 3000;
+    use(coarse, to(trace_));
     for (const int level : {-1, 0, 2999, 3000, 3001, 4000, 4001, 2147483647}) {
         write(std::to_string(level), level, Channel::log);
         write(std::to_string(level), level, Channel::trace);
@@ -66,10 +85,9 @@ TEST_F(LoggerTest, LetsLevelsUpToTheThresholdPass) {
 }
 
 TEST_F(LoggerTest, LetsOnlyMessagesPassWhereOnlyFailuresAreWanted) {
-    Configuration configuration;
-    configuration.of(Channel::log) = everythingTo(Destination::file, log_);
-    configuration.of(Channel::log).failuresOnly = true;
-    logger_.use(configuration);
+    ChannelConfiguration failures = to(log_);
+    failures.failuresOnly = true;
+    use(failures);
     for (const char* text : {failure, "MESSAGE [", "MESSAGE", "", " MESSAGE [", "METHOD: x"}) {
         write(text, 3000);
     }
@@ -77,43 +95,26 @@ TEST_F(LoggerTest, LetsOnlyMessagesPassWhereOnlyFailuresAreWanted) {
 }
 
 TEST_F(LoggerTest, LetsOnlyWantedCategoriesPass) {
-    Configuration configuration;
-    configuration.of(Channel::log) = everythingTo(Destination::file, log_);
-    configuration.of(Channel::log).categories.add("Zumbrel.OSStatusProvider");
-    logger_.use(configuration);
+    ChannelConfiguration one = to(log_);
+    one.categories.add("Zumbrel.OSStatusProvider");
+    use(one);
     logger_.write({Channel::log, "f", "F.cpp", 1, "Zumbrel.OSStatusProvider", 3000, "one"});
     logger_.write({Channel::log, "f", "F.cpp", 1, "Zumbrel.OperatingSystemProvider", 3000, "two"});
     EXPECT_THAT(logged(), ElementsAre("one"));
 }
 
 TEST_F(LoggerTest, WritesBothChannelsToOneFileWithoutTearingLines) {
-    Configuration configuration;
-    configuration.of(Channel::log) = everythingTo(Destination::file, log_);
-    configuration.of(Channel::trace) = everythingTo(Destination::file, log_);
-    logger_.use(configuration);
+    use(to(log_), to(log_));
     const std::size_t before = logging_test::openDescriptors();
     write("one", 3000, Channel::log);
     write("two", 3000, Channel::trace);
     EXPECT_EQ(logging_test::openDescriptors(), before + 1);
-    EXPECT_THAT(logged(), ElementsAre("one", "two"));
-    EXPECT_THAT(readFile(log_), testing::ContainsRegex(" log 3000 [^\n]* one\n"));
-    EXPECT_THAT(readFile(log_), testing::ContainsRegex(" trace 3000 [^\n]* two\n"));
-}
-
-TEST_F(LoggerTest, WritesToStandardError) {
-    Configuration configuration;
-    configuration.of(Channel::trace) = everythingTo(Destination::standardError);
-    logger_.use(configuration);
-    testing::internal::CaptureStderr();
-    write("one", 4000, Channel::trace);
-    EXPECT_THAT(textsOf(testing::internal::GetCapturedStderr()), ElementsAre("one"));
+    EXPECT_THAT(readFile(log_), testing::MatchesRegex(
+                                    "[^\n]* log 3000 [^\n]* one\n[^\n]* trace 3000 [^\n]* two\n"));
 }
 
 TEST_F(LoggerTest, SendsEachChannelToItsOwnSink) {
-    Configuration configuration;
-    configuration.of(Channel::log) = everythingTo(Destination::standardError);
-    configuration.of(Channel::trace) = everythingTo(Destination::systemLog);
-    logger_.use(configuration);
+    use(everythingTo(Destination::standardError), everythingTo(Destination::systemLog));
     testing::internal::CaptureStderr();
     write("one", 3000, Channel::log);
     write("two", 3000, Channel::trace);
@@ -122,44 +123,37 @@ TEST_F(LoggerTest, SendsEachChannelToItsOwnSink) {
 }
 
 TEST_F(LoggerTest, WritesNothingWhereTheSinkIsOff) {
-    Configuration configuration;
-    configuration.of(Channel::log) = everythingTo(Destination::off);
-    logger_.use(configuration);
+    use(everythingTo(Destination::off));
     write(failure, 3000);
     EXPECT_TRUE(environment_.takeSystemLog().empty());
 }
 
-TEST_F(LoggerTest, LeavesErrnoAlone) {
-    Configuration configuration;
-    configuration.of(Channel::log) = everythingTo(Destination::file, folder_ / "missing/log");
-    logger_.use(configuration);
+TEST_F(LoggerTest, LeavesErrnoAloneWhenItWritesAndWhenItReadsItsConfiguration) {
+    use(to(folder_ / "missing/log"));
     errno = 4242;
     write("lost", 3000);
     EXPECT_EQ(errno, 4242);
     EXPECT_EQ(environment_.takeSystemLog().size(), 1u);
-}
 
-TEST_F(LoggerTest, LeavesErrnoAloneWhenItReadsItsConfiguration) {
     environment_.source = {folder_ / "missing.conf", true};
+    ZBLog::Logger reading(environment_);
     errno = 4242;
-    write("filtered", 4000);
+    reading.write(record("filtered", 4000));
     EXPECT_EQ(errno, 4242);
     EXPECT_EQ(environment_.takeSystemLog().size(), 2u);
 }
 
 TEST_F(LoggerTest, ClosesItsFilesAndDropsRecordsAfterItsEnd) {
-    Configuration configuration;
-    configuration.of(Channel::log) = everythingTo(Destination::file, log_);
     environment_.source = {folder_ / "zblog.conf", true};
     logging_test::writeFile(environment_.source.path, "log.sink = file:" + log_ + "\n");
     const std::size_t before = logging_test::openDescriptors();
-    logger_.use(configuration);
+    use(to(log_));
     write("one", 3000);
     EXPECT_EQ(logging_test::openDescriptors(), before + 1);
     logger_.close();
     EXPECT_EQ(logging_test::openDescriptors(), before);
     write("two", 3000);
-    logger_.use(configuration);
+    use(to(log_));
     write("three", 3000);
     environment_.advance(1000);
     write("four", 3000);
@@ -168,10 +162,7 @@ TEST_F(LoggerTest, ClosesItsFilesAndDropsRecordsAfterItsEnd) {
 }
 
 TEST_F(LoggerTest, ServesTheTwoCallsOfTheLibrary) {
-    Configuration configuration;
-    configuration.of(Channel::log) = everythingTo(Destination::file, log_);
-    configuration.of(Channel::trace) = everythingTo(Destination::file, trace_);
-    ZBLog::processLogger().use(configuration);
+    ZBLog::processLogger().use(configurationOf(to(log_), to(trace_)));
     const std::string category = "Zumbrel.OSStatusProvider";
     ZBLog::ZBLogger::logLevelMessage("f", "F.cpp", 1, category, 3000, nullptr, 0, 0, "one");
     ZBLog::ZBLogger::traceLevelMessage("g", "G.cpp", 2, category, 4000, nullptr, 0, 0, "two");
@@ -180,6 +171,90 @@ TEST_F(LoggerTest, ServesTheTwoCallsOfTheLibrary) {
                 testing::EndsWith(" log 3000 Zumbrel.OSStatusProvider f F.cpp:1 one\n"));
     EXPECT_THAT(readFile(trace_), testing::EndsWith(" trace 4000 - - -:0 \n"));
     EXPECT_THAT(traced(), ElementsAre("two", ""));
+}
+
+TEST_F(LoggerTest, LosesNothingWhileTheConfigurationChangesUnderManyThreads) {
+    constexpr int threads = 8, recordsEach = 300;
+    environment_.source = {folder_ / "zblog.conf", true};
+    const auto configure = [&](int round) {
+        const std::string path = environment_.source.path;
+        logging_test::writeFile(path + ".new",
+                                "log.sink = file:" + log_ + std::to_string(round % 3) +
+                                    "\nlog.records = all\nlog.category = Zumbrel.*\n");
+        std::filesystem::rename(path + ".new", path);
+        environment_.advance(1000);
+    };
+    configure(0);
+    std::atomic<int> running{threads};
+    std::multiset<std::string> expected, found;
+    std::vector<std::thread> writers;
+    for (int writer = 0; writer < threads; ++writer) {
+        const std::string start = std::to_string(writer) + "/";
+        for (int count = 0; count < recordsEach; ++count) {
+            expected.insert(start + std::to_string(count));
+        }
+        writers.emplace_back([&, start] {
+            for (int count = 0; count < recordsEach; ++count) {
+                write(start + std::to_string(count), 3000);
+                write("filtered", 4000);
+            }
+            --running;
+        });
+    }
+    for (int round = 1; running > 0; ++round) configure(round);
+    for (std::thread& writer : writers) writer.join();
+
+    for (int file = 0; file < 3; ++file) {
+        for (std::string& text : textsOf(readFile(log_ + std::to_string(file)))) {
+            found.insert(std::move(text));
+        }
+    }
+    EXPECT_TRUE(found == expected) << found.size() << " of " << expected.size();
+    EXPECT_TRUE(environment_.takeSystemLog().empty());
+}
+
+TEST_F(LoggerTest, LosesNoRecordOfThreadsThatAllComeFirst) {
+    constexpr std::size_t threads = 8;
+    environment_.source = {folder_ / "zblog.conf", true};
+    logging_test::writeFile(environment_.source.path,
+                            "log.sink = file:" + log_ + "\nlog.records = all\n");
+    std::vector<std::thread> writers;
+    while (writers.size() < threads) writers.emplace_back([&] { write("first", 3000); });
+    for (std::thread& writer : writers) writer.join();
+    EXPECT_EQ(logged(), std::vector<std::string>(threads, "first"));
+}
+
+TEST_F(LoggerTest, EndsCleanlyWhileThreadsWrite) {
+    use(to(log_));
+    std::atomic<bool> stop{false};
+    std::vector<std::thread> writers;
+    for (int writer = 0; writer < 4; ++writer) {
+        writers.emplace_back([&] {
+            while (!stop) write("one", 3000);
+        });
+    }
+    while (logged().size() < 10) std::this_thread::yield();
+    logger_.close();
+    const std::uintmax_t size = std::filesystem::file_size(log_);
+    stop = true;
+    for (std::thread& writer : writers) writer.join();
+    EXPECT_LE(std::filesystem::file_size(log_), size + 4 * 4096);
+}
+
+TEST_F(LoggerTest, GoesOnInAChildProcess) {
+    use(to(log_));
+    write("parent", 3000);
+    const std::string parent = "[^ ]* " + std::to_string(::getpid()) + " [^\n]* parent\n";
+    const int status = logging_test::inChildProcess([&] {
+        write("child", 3000);
+        logging_test::writeFile(trace_, std::to_string(::getpid()));
+        return 0;
+    });
+    EXPECT_EQ(status, 0);
+    const std::string child = readFile(trace_);
+    EXPECT_NE(child, std::to_string(::getpid()));
+    EXPECT_THAT(readFile(log_),
+                testing::MatchesRegex(parent + "[^ ]* " + child + " [^\n]* child\n"));
 }
 
 }  // namespace

@@ -1,6 +1,7 @@
 #include "tests/logging/LoggingSupport.h"
 
 #include <sys/wait.h>
+#include <syslog.h>
 #include <unistd.h>
 
 #include <cstdlib>
@@ -84,6 +85,15 @@ ZBLog::ChannelConfiguration everythingTo(ZBLog::Destination destination, const s
     channel.destination = destination;
     channel.path = path;
     return channel;
+}
+
+std::string warningOf(const std::string& text) {
+    return std::to_string(LOG_DAEMON | LOG_WARNING) + " korva-osstatus: " + text;
+}
+
+std::string lossOf(const std::string& output, const std::string& reason) {
+    return warningOf(output + ": " + reason +
+                     "; records are dropped until it can be written again");
 }
 
 std::size_t openDescriptors() {

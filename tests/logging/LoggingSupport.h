@@ -1,5 +1,5 @@
-#ifndef KORVA_LOGGING_SUPPORT_H
-#define KORVA_LOGGING_SUPPORT_H
+#ifndef TESTS_LOGGING_LOGGING_SUPPORT_H
+#define TESTS_LOGGING_LOGGING_SUPPORT_H
 
 #include <atomic>
 #include <functional>
@@ -9,7 +9,6 @@
 
 #include "framework/logging/Configuration.h"
 #include "framework/logging/Environment.h"
-#include "framework/logging/Record.h"
 
 namespace logging_test {
 
@@ -28,7 +27,7 @@ class TemporaryFolder {
     std::string path_;
 };
 
-/// Surroundings whose clocks stand still until they are moved, and whose system log is a list of
+/// An environment whose clocks stand still until they are moved, and whose system log is a list of
 /// lines, each "PRIORITY TEXT".
 class FakeEnvironment final : public ZBLog::Environment {
   public:
@@ -73,6 +72,12 @@ ZBLog::Record record(const std::string& text, int level = 3000,
 /// A channel that takes everything up to level 4000.
 ZBLog::ChannelConfiguration everythingTo(ZBLog::Destination destination,
                                          const std::string& path = "");
+
+/// What the system's log is told by the library itself.
+std::string warningOf(const std::string& text);
+
+/// What it is told when `output` loses its first record for `reason`.
+std::string lossOf(const std::string& output, const std::string& reason);
 
 /// The number of descriptors that the process has open.
 std::size_t openDescriptors();

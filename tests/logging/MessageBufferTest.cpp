@@ -1,5 +1,7 @@
+// The buffer that gathers a record's text, and the pool that keeps what buffers work with.
 #include <gtest/gtest.h>
 
+#include <atomic>
 #include <deque>
 #include <iomanip>
 #include <locale>
@@ -8,6 +10,7 @@
 #include <vector>
 
 #include "ZBMessageBuffer.h"
+#include "framework/logging/ObjectPool.h"
 
 namespace {
 
@@ -23,17 +26,11 @@ TEST(MessageBuffer, GathersTextsInOrder) {
 
 TEST(MessageBuffer, IsEmptyAfterItsTextWasTaken) {
     ZBMessageBuffer buffer;
-    buffer << "one";
-    EXPECT_EQ(buffer.str(buffer), "one");
+    for (int twin = 0; twin < 2; ++twin) {
+        EXPECT_EQ(buffer.str(buffer << "METHOD: B() was invoked in A [Line: 7]"),
+                  "METHOD: B() was invoked in A [Line: 7]");
+    }
     EXPECT_EQ(buffer.str(buffer), "");
-}
-
-TEST(MessageBuffer, GivesTheTwinOfARecordTheSameText) {
-    ZBMessageBuffer buffer;
-    const std::string log = buffer.str(buffer << "METHOD: B() was invoked in A [Line: 7]");
-    const std::string trace = buffer.str(buffer << "METHOD: B() was invoked in A [Line: 7]");
-    EXPECT_EQ(log, "METHOD: B() was invoked in A [Line: 7]");
-    EXPECT_EQ(trace, log);
 }
 
 TEST(MessageBuffer, TakenTextStaysWhileTheNextIsGathered) {
@@ -59,21 +56,19 @@ TEST(MessageBuffer, HoldsTextOfAnyLength) {
 }
 
 TEST(MessageBuffer, PrintsPointersAsStreamsDo) {
-    struct Moniker {
-    } moniker;
-    const Moniker* const constant = &moniker;
+    int object = 0;
+    const int* const constant = &object;
     const char* text = "text";
-    const char** const texts = &text;
+    const int* const none = nullptr;
+    const void* const address = &object;
     std::ostringstream expected;
-    expected << "p=" << static_cast<const void*>(&moniker) << " "
-             << static_cast<const void*>(constant) << " " << static_cast<const void*>(texts) << " "
+    expected << "p=" << address << " " << address << " " << static_cast<const void*>(&text) << " "
              << static_cast<const void*>(nullptr);
 
     ZBMessageBuffer buffer;
-    buffer << "p=" << &moniker;
+    buffer << "p=" << &object;
     buffer << " " << constant;
-    buffer << " " << texts;
-    const Moniker* const none = nullptr;
+    buffer << " " << &text;
     EXPECT_EQ(buffer.str(buffer << " " << none), expected.str());
 }
 
@@ -81,16 +76,14 @@ TEST(MessageBuffer, PrintsPointersInTheFormatThatTheStreamWasGiven) {
     int object = 0;
     const void* const address = &object;
     ZBMessageBuffer buffer;
-    std::ostringstream expected;
-    expected << address << std::setw(24) << std::setfill('*') << address;
+    std::ostringstream filled, usual, left;
+    filled << address << std::setw(24) << std::setfill('*') << address;
     EXPECT_EQ(buffer.str((buffer << &object) << std::setw(24) << std::setfill('*') << address),
-              expected.str());
+              filled.str());
     // Taking the text brings the usual format back, after a pointer too.
-    std::ostringstream usual;
     usual << address << 255;
     EXPECT_EQ(buffer.str((buffer << &object) << 255), usual.str());
     (buffer << &object) << std::setw(24) << std::left;
-    std::ostringstream left;
     left << address << std::setw(24) << std::left << address;
     EXPECT_EQ(buffer.str(buffer << &object), left.str());
 }
@@ -104,8 +97,8 @@ TEST(MessageBuffer, MixesTextAndStreamInOrder) {
     EXPECT_EQ(buffer.str(stream), "a1b2.5cd1\n");
 }
 
-TEST(MessageBuffer, ForgetsFormatWithTheTextAndWithTheBuffer) {
-    for (int round = 0; round < 3; ++round) {
+TEST(MessageBuffer, ForgetsTextAndFormatWithTheTextAndWithTheBuffer) {
+    for (int round = 0; round < 100; ++round) {
         ZBMessageBuffer buffer;
         std::ostream& stream = buffer;
         EXPECT_EQ(buffer.str(stream << 255 << ' ' << 0.1), "255 0.1");
@@ -115,6 +108,7 @@ TEST(MessageBuffer, ForgetsFormatWithTheTextAndWithTheBuffer) {
         EXPECT_EQ(buffer.str(stream << 255 << std::setw(3) << 1 << 3.14159 << true),
                   "255  13.141591");
         stream << std::hex << std::setw(10);
+        buffer << "left behind";
     }
 }
 
@@ -190,14 +184,6 @@ TEST(MessageBuffer, NestsDeeperThanBuffersAreKept) {
     }
 }
 
-TEST(MessageBuffer, BeginsEmptyWhateverItsPlaceHeldBefore) {
-    for (int round = 0; round < 100; ++round) {
-        ZBMessageBuffer buffer;
-        EXPECT_EQ(buffer.str(buffer), "");
-        buffer << "left behind";
-    }
-}
-
 TEST(MessageBuffer, ServesManyThreadsAtOnce) {
     std::vector<std::thread> threads;
     std::atomic<int> wrong{0};
@@ -217,6 +203,64 @@ TEST(MessageBuffer, ServesManyThreadsAtOnce) {
     }
     for (std::thread& thread : threads) thread.join();
     EXPECT_EQ(wrong, 0);
+}
+
+std::atomic<int> living{0};
+
+struct Counted {
+    Counted() { ++living; }
+    ~Counted() { --living; }
+    std::atomic<bool> inUse{false};
+};
+
+using Pool = ZBLog::ObjectPool<Counted, 4>;
+
+TEST(ObjectPool, GivesBackWhatItWasGiven) {
+    Pool pool;
+    EXPECT_EQ(pool.take(), nullptr);
+    auto object = std::make_unique<Counted>();
+    const Counted* const address = object.get();
+    pool.give(std::move(object));
+    EXPECT_EQ(pool.take().get(), address);
+    EXPECT_EQ(pool.take(), nullptr);
+    EXPECT_EQ(living, 0);
+}
+
+TEST(ObjectPool, KeepsAsManyAsItHasPlaces) {
+    Pool pool;
+    for (int count = 0; count < 10; ++count) pool.give(std::make_unique<Counted>());
+    EXPECT_EQ(living, 4);
+    pool.close();
+    EXPECT_EQ(living, 0);
+}
+
+TEST(ObjectPool, KeepsNothingAfterItsEnd) {
+    Pool pool;
+    pool.close();
+    pool.give(std::make_unique<Counted>());
+    EXPECT_EQ(living, 0);
+    EXPECT_EQ(pool.take(), nullptr);
+}
+
+TEST(ObjectPool, NeverLendsAnObjectTwice) {
+    Pool pool;
+    std::atomic<int> shared{0};
+    std::vector<std::thread> users;
+    for (int user = 0; user < 8; ++user) {
+        users.emplace_back([&] {
+            for (int count = 0; count < 5000; ++count) {
+                auto object = pool.take();
+                if (!object) object = std::make_unique<Counted>();
+                if (object->inUse.exchange(true)) ++shared;
+                object->inUse = false;
+                pool.give(std::move(object));
+            }
+        });
+    }
+    for (std::thread& user : users) user.join();
+    EXPECT_EQ(shared, 0);
+    pool.close();
+    EXPECT_EQ(living, 0);
 }
 
 }  // namespace

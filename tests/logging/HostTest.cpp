@@ -1,0 +1,197 @@
+// What the host does to the log: its clocks, its own log (datagrams to /dev/log, in a folder /dev
+// of the test's own), a disk that fails, a thread that is cancelled.
+#include <gmock/gmock.h>
+#include <linux/filter.h>
+#include <linux/seccomp.h>
+#include <pthread.h>
+#include <sched.h>
+#include <sys/mount.h>
+#include <sys/prctl.h>
+#include <sys/socket.h>
+#include <sys/syscall.h>
+#include <sys/un.h>
+#include <syslog.h>
+#include <unistd.h>
+
+#include <array>
+#include <atomic>
+#include <cerrno>
+#include <chrono>
+#include <cstddef>
+#include <cstring>
+#include <thread>
+
+#include "framework/logging/Logger.h"
+#include "tests/logging/LoggingSupport.h"
+
+namespace {
+
+using logging_test::record;
+using logging_test::writeFile;
+
+template <class Clock>
+long long millisecondsOf(Clock) {
+    return std::chrono::duration_cast<std::chrono::milliseconds>(Clock::now().time_since_epoch())
+        .count();
+}
+
+TEST(HostEnvironment, CountMillisecondsSteadily) {
+    ZBLog::HostEnvironment host;
+    constexpr std::uint32_t lag = 50;
+    for (int round = 0; round < 20; ++round) {
+        const auto before = static_cast<std::uint32_t>(millisecondsOf(std::chrono::steady_clock{}));
+        const std::uint32_t counted = host.milliseconds();
+        const auto after = static_cast<std::uint32_t>(millisecondsOf(std::chrono::steady_clock{}));
+        EXPECT_LE(counted - (before - lag), after - (before - lag));
+    }
+}
+
+TEST(HostEnvironment, TellTheTimeOfDay) {
+    ZBLog::HostEnvironment host;
+    const long long before = millisecondsOf(std::chrono::system_clock{});
+    const timespec told = host.utc();
+    const long long after = millisecondsOf(std::chrono::system_clock{});
+    const long long milliseconds = told.tv_sec * 1000LL + told.tv_nsec / 1000000;
+    EXPECT_GE(milliseconds, before);
+    EXPECT_LE(milliseconds, after);
+}
+
+TEST(ConfigurationSource, IsTheSystemsFileUnlessTheEnvironmentNamesAnother) {
+    const struct {
+        const char* variable;
+        const char* path;
+        bool required;
+    } rows[] = {{nullptr, "/etc/zblog.conf", false}, {"/x/y", "/x/y", true}, {"", "", true}};
+    for (const auto& row : rows) {
+        const ZBLog::ConfigurationSource source = ZBLog::configurationSourceFrom(row.variable);
+        EXPECT_EQ(source.path, row.path);
+        EXPECT_EQ(source.required, row.required) << row.path;
+    }
+}
+
+constexpr int notAllowed = 77;
+
+/// Makes /dev an empty folder that this process alone sees; false where the system forbids it.
+bool makeOwnDeviceFolder() {
+    const uid_t user = ::geteuid();
+    const gid_t group = ::getegid();
+    if (::unshare(user == 0 ? CLONE_NEWNS : CLONE_NEWNS | CLONE_NEWUSER) != 0) return false;
+    if (user != 0) {
+        writeFile("/proc/self/setgroups", "deny");
+        writeFile("/proc/self/gid_map", "0 " + std::to_string(group) + " 1");
+        writeFile("/proc/self/uid_map", "0 " + std::to_string(user) + " 1");
+    }
+    return ::mount("none", "/", nullptr, MS_REC | MS_PRIVATE, nullptr) == 0 &&
+           ::mount("none", "/dev", "tmpfs", 0, nullptr) == 0;
+}
+
+/// The socket that the system's log listens at, -1 if there can be none.
+int listenAtTheSystemsLog() {
+    sockaddr_un address{};
+    address.sun_family = AF_UNIX;
+    std::strcpy(address.sun_path, "/dev/log");
+    const int listener = ::socket(AF_UNIX, SOCK_DGRAM | SOCK_CLOEXEC, 0);
+    return ::bind(listener, reinterpret_cast<const sockaddr*>(&address), sizeof address) == 0
+               ? listener
+               : -1;
+}
+
+/// The next datagram, empty if none came. A local one is there as soon as it was sent.
+std::string receivedBy(int listener) {
+    std::array<char, 8192> text{};
+    const ssize_t size = ::recv(listener, text.data(), text.size(), MSG_DONTWAIT);
+    return size < 0 ? std::string() : std::string(text.data(), static_cast<std::size_t>(size));
+}
+
+TEST(SystemLog, ReceivesEachRecordAsADatagramUnderTheNameOfTheProcess) {
+    const logging_test::TemporaryFolder folder;
+    const int status = logging_test::inChildProcess([&] {
+        if (!makeOwnDeviceFolder()) return notAllowed;
+        const int listener = listenAtTheSystemsLog();
+        if (listener < 0) return 1;
+        ::openlog("cimserver", LOG_PID, LOG_LOCAL0);
+        ZBLog::HostEnvironment environment;
+        ZBLog::SystemLogSink sink(environment);
+        sink.write(record("MESSAGE [File: A, Line: 9]: 100 %s full"));
+        sink.write(record("VARIABLE: x", 4000));
+        writeFile(folder / "message", receivedBy(listener));
+        writeFile(folder / "variable", receivedBy(listener));
+        return receivedBy(listener).empty() ? 0 : 2;
+    });
+    if (status == notAllowed) GTEST_SKIP() << "this system lets nobody have a /dev of its own";
+    ASSERT_EQ(status, 0);
+    // Priorities 27 and 31: the facility "daemon" with "error" and with "debug".
+    const std::string from =
+        "[A-Z][a-z]{2} [ 0-9][0-9] [0-9:]{8} cimserver\\[[0-9]+\\]: "
+        "korva-osstatus: log ";
+    EXPECT_THAT(logging_test::readFile(folder / "message"),
+                testing::MatchesRegex("<27>" + from +
+                                      "3000 Zumbrel.Test work Work.cpp:12 "
+                                      "MESSAGE \\[File: A, Line: 9\\]: 100 %s full"));
+    EXPECT_THAT(
+        logging_test::readFile(folder / "variable"),
+        testing::MatchesRegex("<31>" + from + "4000 Zumbrel.Test work Work.cpp:12 VARIABLE: x"));
+}
+
+/// Lets every read at a place fail from now on, for good; false if that cannot be set up.
+bool failReads() {
+    std::array<sock_filter, 4> program{{
+        BPF_STMT(BPF_LD | BPF_W | BPF_ABS, offsetof(seccomp_data, nr)),
+        BPF_JUMP(BPF_JMP | BPF_JEQ | BPF_K, SYS_pread64, 0, 1),
+        BPF_STMT(BPF_RET | BPF_K, SECCOMP_RET_ERRNO | EIO),
+        BPF_STMT(BPF_RET | BPF_K, SECCOMP_RET_ALLOW),
+    }};
+    const sock_fprog filter{static_cast<unsigned short>(program.size()), program.data()};
+    return ::prctl(PR_SET_NO_NEW_PRIVS, 1, 0, 0, 0) == 0 &&
+           ::prctl(PR_SET_SECCOMP, SECCOMP_MODE_FILTER, &filter) == 0;
+}
+
+TEST(ReadError, OfAConfigurationFileIsTold) {
+    const logging_test::TemporaryFolder folder;
+    logging_test::writeFile(folder / "zblog.conf", "log.level = 1\n");
+    const int status = logging_test::inChildProcess([&] {
+        if (!failReads()) return 1;
+        logging_test::FakeEnvironment environment;
+        ZBLog::ConfigurationFile file({folder / "zblog.conf", false}, environment);
+        const auto read = file.readIfChanged();
+        if (!read || read->errors.size() != 1) return 2;
+        return read->errors[0].message == "cannot be read: Input/output error" ? 0 : 3;
+    });
+    EXPECT_EQ(status, 0);
+}
+
+TEST(Cancellation, MayHitAThreadWhileItWrites) {
+    const logging_test::TemporaryFolder folder;
+    logging_test::FakeEnvironment environment;
+    ZBLog::Logger logger(environment);
+    ZBLog::Configuration configuration;
+    configuration.of(ZBLog::Channel::log) =
+        logging_test::everythingTo(ZBLog::Destination::file, folder / "log");
+    logger.use(configuration);
+    struct Work {
+        ZBLog::Logger& logger;
+        std::atomic<bool> started{false};
+    };
+    for (int round = 0; round < 20; ++round) {
+        Work work{logger};
+        pthread_t thread{};
+        const auto writeForever = [](void* argument) -> void* {
+            auto& own = *static_cast<Work*>(argument);
+            for (;;) {
+                own.logger.write(record("one"));
+                own.started = true;
+                ::pthread_testcancel();
+            }
+        };
+        ASSERT_EQ(::pthread_create(&thread, nullptr, writeForever, &work), 0);
+        while (!work.started) std::this_thread::yield();
+        ::pthread_cancel(thread);
+        void* result = nullptr;
+        ::pthread_join(thread, &result);
+        EXPECT_EQ(result, PTHREAD_CANCELED);
+    }
+    logger.write(record("last"));
+    EXPECT_EQ(logging_test::textsOf(logging_test::readFile(folder / "log")).back(), "last");
+}
+
+}  // namespace
