@@ -33,7 +33,8 @@ using namespace std::string_view_literals;
 
 constexpr std::size_t messageBufferSize = 512;
 
-/// Puts a record together in a message buffer: what does not fit is cut.
+/// Puts a record together in a message buffer: what does not fit is cut. Records are most of what a
+/// request costs by itself, so their parts are copied; no format string is read for each.
 class RecordText {
   public:
     /// Zeroes the buffer, the last character included: the text always ends.

@@ -1,8 +1,16 @@
+#include <cmpi/cmpidt.h>
+#include <cmpi/cmpift.h>
+#include <gtest/gtest.h>
+
 #include <memory>
+#include <string>
+#include <utility>
+#include <vector>
 
 #include "CMPIComputerSystem.h"
 #include "ProviderException.h"
-#include "provider/AdapterFixture.h"
+
+// The adapter of the computer system, with a broker that is told what to answer.
 
 namespace {
 
@@ -21,71 +29,8 @@ std::string thrownBy(CMPIOSComputerSystem& adapter, const CMPIObjectPath* path) 
     return "";
 }
 
-class ComputerSystemAdapter : public Adapters {
-  protected:
-    // Not a member itself: destroying an adapter may throw, destroying a fixture must not.
-    std::unique_ptr<CMPIOSComputerSystem> owned =
-        std::make_unique<CMPIOSComputerSystem>(broker.cmpi(), context, "root/cimv2");
-    CMPIOSComputerSystem& adapter = *owned;
-};
-
-TEST_F(ComputerSystemAdapter, IsTrueOnceForTheOneComputer) {
-    adapter.setObjectPath(made("KORVA_ComputerSystem"));
-    EXPECT_TRUE(stands(adapter));
-    EXPECT_FALSE(stands(adapter));
-    EXPECT_FALSE(stands(adapter));
-    // It still stands on the computer.
-    EXPECT_EQ(key(adapter.getObjectPath(), "Name"), "host1");
-}
-
-TEST_F(ComputerSystemAdapter, IsTrueAgainWhileFurtherComputersArePending) {
-    computers.setNames({"cs1", "cs2"});
-    adapter.setObjectPath(made("KORVA_ComputerSystem"));
-    EXPECT_TRUE(stands(adapter));
-    EXPECT_TRUE(stands(adapter));
-    EXPECT_TRUE(stands(adapter));
-    ++adapter;
-    EXPECT_FALSE(stands(adapter));
-    EXPECT_EQ(key(adapter.getObjectPath(), "Name"), "cs2");
-}
-
-TEST_F(ComputerSystemAdapter, GivesTheSameInstanceEachTime) {
-    adapter.setObjectPath(made("KORVA_ComputerSystem"));
-    CMPIInstance* const first = adapter.getCMPIInstance(nullptr);
-    ASSERT_NE(first, nullptr);
-    const char* properties[] = {"Name", nullptr};
-    EXPECT_EQ(adapter.getCMPIInstance(properties), first);
-}
-
-TEST_F(ComputerSystemAdapter, StandsOnNothingBeforeItHasAPath) {
-    EXPECT_EQ(adapter.getObjectPath(), nullptr);
-    EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
-    EXPECT_FALSE(stands(adapter));
-    ++adapter;
-    EXPECT_FALSE(stands(adapter));
-    EXPECT_EQ(adapter.getObjectPath(), nullptr);
-}
-
-TEST_F(ComputerSystemAdapter, StandsOnNothingPastTheLast) {
-    adapter.setObjectPath(made("KORVA_ComputerSystem"));
-    EXPECT_TRUE(stands(adapter));
-    for (int step = 0; step < 2; ++step) {
-        ++adapter;
-        EXPECT_FALSE(stands(adapter));
-        EXPECT_EQ(adapter.getObjectPath(), nullptr);
-        EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
-    }
-}
-
-TEST_F(ComputerSystemAdapter, ThrowsWhenTheBrokerHasNoneToGive) {
-    computers.setNames({});
-    EXPECT_EQ(thrownBy(adapter, made("KORVA_ComputerSystem")), noComputerSystem);
-    EXPECT_FALSE(stands(adapter));
-    EXPECT_EQ(adapter.getObjectPath(), nullptr);
-}
-
-/// A broker with one enumeration and one instance, whose calls answer what the test says, an object
-/// beside an error included; keeps their names in order.
+/// A broker with one enumeration of some instances, whose calls answer what the test says, an
+/// object beside an error included; keeps their names in order.
 class ScriptedBroker {
   public:
     struct Answer {
@@ -102,12 +47,13 @@ class ScriptedBroker {
         };
         enumeration_.ft->hasNext = [](const CMPIEnumeration* self, CMPIStatus*) {
             of(self).asked_.push_back("hasNext");
-            return static_cast<CMPIBoolean>(of(self).more);
+            return static_cast<CMPIBoolean>(of(self).pending > 0);
         };
         enumeration_.ft->getNext = [](const CMPIEnumeration* self, CMPIStatus* status) {
             ScriptedBroker& script = of(self);
             CMPIData data = {CMPI_instance, CMPI_goodValue, {}};
             data.value.inst = script.give("getNext", script.next, script.instance, status);
+            if (script.pending > 0) --script.pending;
             return data;
         };
         instance.ft->getObjectPath = [](const CMPIInstance* self, CMPIStatus* status) {
@@ -122,7 +68,7 @@ class ScriptedBroker {
     Answer enumerate;
     Answer next;
     Answer pathOfInstance;
-    bool more = true;
+    int pending = 1;  ///< instances that the enumeration still has
     CMPIInstance instance = {this, &instanceCalls_};
     CMPIObjectPath path = {};
 
@@ -152,9 +98,23 @@ constexpr ScriptedBroker::Answer none = {CMPI_RC_OK, true};
 constexpr ScriptedBroker::Answer refused = {CMPI_RC_ERR_FAILED, true};
 constexpr ScriptedBroker::Answer givenWithAnError = {CMPI_RC_ERR_FAILED, false};
 
-class ComputerSystemCalls : public testing::Test {
+class ComputerSystemAdapter : public testing::Test {
   protected:
+    // Whether the adapter stands on an instance, and the calls that it made to find out.
+    std::pair<bool, Texts> asked() {
+        broker.takeAsked();
+        const bool result = static_cast<bool>(adapter);
+        return {result, broker.takeAsked()};
+    }
+
+    // The adapter has none.
+    void expectNothing() {
+        EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
+        EXPECT_EQ(adapter.getObjectPath(), nullptr);
+    }
+
     ScriptedBroker broker;
+    // Not a member itself: destroying an adapter may throw, destroying a fixture must not.
     std::unique_ptr<CMPIOSComputerSystem> owned =
         std::make_unique<CMPIOSComputerSystem>(broker.cmpi(), nullptr, "root/cimv2");
     CMPIOSComputerSystem& adapter = *owned;
@@ -162,89 +122,117 @@ class ComputerSystemCalls : public testing::Test {
 };
 
 const Texts allCalls = {"enumerateInstances", "hasNext", "getNext"};
+const std::pair<bool, Texts> trueWithoutAsking = {true, {}};
+const std::pair<bool, Texts> falseWithoutAsking = {false, {}};
+const std::pair<bool, Texts> thereIsAnother = {true, {"hasNext"}};
+const std::pair<bool, Texts> thereIsNoOther = {false, {"hasNext"}};
 
-TEST_F(ComputerSystemCalls, NullPathAsksNobodyAndThrowsOnEveryCall) {
+TEST_F(ComputerSystemAdapter, StandsOnNothingAndAsksNobodyBeforeItHasAPath) {
+    for (int step = 0; step < 2; ++step, ++adapter) {
+        expectNothing();
+        EXPECT_EQ(asked(), falseWithoutAsking);
+    }
+    EXPECT_EQ(broker.takeAsked(), Texts{});
+}
+
+TEST_F(ComputerSystemAdapter, IsTrueOnceForTheOneComputerAndStillStandsOnIt) {
+    EXPECT_EQ(thrownBy(adapter, &path), "");
+    EXPECT_EQ(broker.takeAsked(), allCalls);
+    EXPECT_EQ(asked(), trueWithoutAsking);
+    EXPECT_EQ(asked(), thereIsNoOther);
+    EXPECT_EQ(asked(), thereIsNoOther);
+    const char* properties[] = {"Name", nullptr};
+    EXPECT_EQ(adapter.getCMPIInstance(nullptr), &broker.instance);
+    EXPECT_EQ(adapter.getCMPIInstance(properties), &broker.instance);
+}
+
+// Of several it never reports the last.
+TEST_F(ComputerSystemAdapter, IsTrueWhileTheBrokerHasAnotherComputerToFetch) {
+    broker.pending = 2;
+    EXPECT_EQ(thrownBy(adapter, &path), "");
+    EXPECT_EQ(asked(), trueWithoutAsking);
+    EXPECT_EQ(asked(), thereIsAnother);
+    EXPECT_EQ(asked(), thereIsAnother);
+    ++adapter;
+    EXPECT_EQ(broker.takeAsked(), Texts{"getNext"});
+    EXPECT_EQ(asked(), thereIsNoOther);
+    EXPECT_EQ(adapter.getCMPIInstance(nullptr), &broker.instance);
+}
+
+TEST_F(ComputerSystemAdapter, AdvanceFetchesWithoutAskingWhetherThereIsAnother) {
+    EXPECT_EQ(thrownBy(adapter, &path), "");
+    broker.takeAsked();
+    ++adapter;
+    EXPECT_EQ(adapter.getCMPIInstance(nullptr), &broker.instance);
+    broker.next = givenWithAnError;
+    ++adapter;
+    EXPECT_EQ(broker.takeAsked(), (Texts{"getNext", "getNext"}));
+    expectNothing();
+}
+
+TEST_F(ComputerSystemAdapter, NullPathAsksNobodyAndThrowsOnEveryCall) {
     EXPECT_EQ(thrownBy(adapter, nullptr), noComputerSystem);
     EXPECT_EQ(thrownBy(adapter, nullptr), noComputerSystem);
     EXPECT_EQ(broker.takeAsked(), Texts{});
     EXPECT_EQ(thrownBy(adapter, &path), "");
-    EXPECT_EQ(broker.takeAsked(), allCalls);
+    broker.takeAsked();
     EXPECT_EQ(thrownBy(adapter, nullptr), noComputerSystem);
     EXPECT_EQ(broker.takeAsked(), Texts{});
     // It stands where it stood.
     EXPECT_EQ(adapter.getCMPIInstance(nullptr), &broker.instance);
-    EXPECT_TRUE(stands(adapter));
-    EXPECT_TRUE(stands(adapter));
-    EXPECT_EQ(broker.takeAsked(), Texts{"hasNext"});
+    EXPECT_EQ(asked(), trueWithoutAsking);
+    EXPECT_EQ(asked(), thereIsNoOther);
 }
 
-TEST_F(ComputerSystemCalls, AnyStatusButOKThrowsWhateverCameBesideIt) {
-    for (const auto& answer : {givenWithAnError, refused}) {
-        broker.enumerate = answer;
+TEST_F(ComputerSystemAdapter, ThrowsWithoutAFirstInstanceWhateverCameBesideAnError) {
+    const struct {
+        ScriptedBroker::Answer enumerate, next;
+        int pending;
+        std::size_t calls;
+    } rows[] = {
+        {givenWithAnError, given, 1, 1},
+        {refused, given, 1, 1},
+        {none, given, 1, 1},
+        {given, given, 0, 2},
+        {given, refused, 1, 3},
+        {given, givenWithAnError, 1, 3},
+    };
+    for (const auto& row : rows) {
+        broker.enumerate = row.enumerate;
+        broker.next = row.next;
+        broker.pending = row.pending;
         EXPECT_EQ(thrownBy(adapter, &path), noComputerSystem);
-        EXPECT_EQ(broker.takeAsked(), Texts{"enumerateInstances"});
+        EXPECT_EQ(broker.takeAsked(), Texts(allCalls.begin(), allCalls.begin() + row.calls));
+        expectNothing();
     }
-    broker.enumerate = given;
+    broker.next = given;
+    broker.pending = 1;
+    EXPECT_EQ(thrownBy(adapter, &path), "");
+    EXPECT_EQ(adapter.getCMPIInstance(nullptr), &broker.instance);
+    // What it stood on is gone.
     broker.next = givenWithAnError;
+    broker.pending = 1;
     EXPECT_EQ(thrownBy(adapter, &path), noComputerSystem);
-    EXPECT_EQ(broker.takeAsked(), allCalls);
-    EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
+    expectNothing();
 }
 
-TEST_F(ComputerSystemCalls, EnumerationThatIsNullOrHasNoElementThrows) {
-    broker.enumerate = none;
-    EXPECT_EQ(thrownBy(adapter, &path), noComputerSystem);
-    EXPECT_EQ(broker.takeAsked(), Texts{"enumerateInstances"});
-    broker.enumerate = given;
-    broker.more = false;
-    EXPECT_EQ(thrownBy(adapter, &path), noComputerSystem);
-    EXPECT_EQ(broker.takeAsked(), (Texts{"enumerateInstances", "hasNext"}));
-}
-
-TEST_F(ComputerSystemCalls, EnumerationThatCameWithAFailureIsKept) {
+TEST_F(ComputerSystemAdapter, EnumerationThatCameWithAFailureIsKept) {
     broker.enumerate = givenWithAnError;
     EXPECT_EQ(thrownBy(adapter, &path), noComputerSystem);
-    broker.takeAsked();
-    EXPECT_TRUE(stands(adapter));
+    EXPECT_EQ(asked(), thereIsAnother);
     ++adapter;
-    EXPECT_EQ(broker.takeAsked(), (Texts{"hasNext", "getNext"}));
+    EXPECT_EQ(broker.takeAsked(), Texts{"getNext"});
     EXPECT_EQ(adapter.getCMPIInstance(nullptr), &broker.instance);
     // A null one replaces it.
     broker.enumerate = refused;
     EXPECT_EQ(thrownBy(adapter, &path), noComputerSystem);
-    broker.takeAsked();
-    EXPECT_FALSE(stands(adapter));
+    EXPECT_EQ(asked(), falseWithoutAsking);
     ++adapter;
     EXPECT_EQ(broker.takeAsked(), Texts{});
-    EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
+    expectNothing();
 }
 
-TEST_F(ComputerSystemCalls, InstanceIsNullAfterAFailedFetch) {
-    EXPECT_EQ(thrownBy(adapter, &path), "");
-    EXPECT_EQ(adapter.getCMPIInstance(nullptr), &broker.instance);
-    broker.next = givenWithAnError;
-    EXPECT_EQ(thrownBy(adapter, &path), noComputerSystem);
-    EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
-    broker.next = given;
-    EXPECT_EQ(thrownBy(adapter, &path), "");
-    broker.next = givenWithAnError;
-    ++adapter;
-    EXPECT_EQ(adapter.getCMPIInstance(nullptr), nullptr);
-    EXPECT_EQ(adapter.getObjectPath(), nullptr);
-}
-
-TEST_F(ComputerSystemCalls, AdvanceFetchesWithoutAskingWhetherThereIsAnother) {
-    EXPECT_EQ(thrownBy(adapter, &path), "");
-    broker.takeAsked();
-    for (const bool more : {true, false}) {
-        broker.more = more;
-        ++adapter;
-        EXPECT_EQ(broker.takeAsked(), Texts{"getNext"});
-        EXPECT_EQ(adapter.getCMPIInstance(nullptr), &broker.instance);
-    }
-}
-
-TEST_F(ComputerSystemCalls, PathIsTheInstancesOwnOrNullWithAnyStatusButOK) {
+TEST_F(ComputerSystemAdapter, PathIsTheInstancesOwnOrNullWithAnyStatusButOK) {
     EXPECT_EQ(thrownBy(adapter, &path), "");
     broker.takeAsked();
     EXPECT_EQ(adapter.getObjectPath(), &broker.path);

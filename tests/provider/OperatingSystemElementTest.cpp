@@ -1,5 +1,8 @@
 #include <gtest/gtest.h>
+#include <stdlib.h>
+#include <time.h>
 
+#include <functional>
 #include <stdexcept>
 #include <string>
 #include <vector>
@@ -43,44 +46,38 @@ TEST_F(OperatingSystemElement, WithoutANodeItIsFalseAtOnceAndFiltersReadNothing)
     EXPECT_EQ(host->calls(Operation::ComputerName), 0U);
 }
 
-TEST_F(OperatingSystemElement, WithoutFiltersItWalksEveryNode) {
-    addNodes({"a", "b", "c"});
-    OperatingSystem element;
-    EXPECT_EQ(walked(element), (Names{"a", "b", "c"}));
-    ++element;
-    EXPECT_FALSE(static_cast<bool>(element));
-}
-
-TEST_F(OperatingSystemElement, NameFilterIgnoresLetterCaseAndTrimsNothing) {
-    addNodes({"a", "Linux", "b", "LINUX"});
-    OperatingSystem element;
-    element.setFilter(OperatingSystem::NameFilter, "linux");
-    EXPECT_EQ(walked(element), (Names{"Linux", "LINUX"}));
-    OperatingSystem trailing;
-    trailing.setFilter(OperatingSystem::NameFilter, "linux ");
-    EXPECT_FALSE(static_cast<bool>(trailing));
-}
-
-TEST_F(OperatingSystemElement, CSNameFilterIgnoresLetterCaseAndTrimsNothing) {
-    addNode("a");
-    OperatingSystem element;
-    element.setFilter(OperatingSystem::CSNameFilter, "hOST1");
-    EXPECT_TRUE(static_cast<bool>(element));
-    OperatingSystem trailing;
-    trailing.setFilter(OperatingSystem::CSNameFilter, "Host1 ");
-    EXPECT_FALSE(static_cast<bool>(trailing));
-}
-
-TEST_F(OperatingSystemElement, NodePassesOnlyIfEveryFilterPasses) {
-    addNodes({"a", "b"});
-    OperatingSystem element;
-    element.setFilter(OperatingSystem::NameFilter, "b");
-    element.setFilter(OperatingSystem::CSNameFilter, "host1");
-    EXPECT_EQ(walked(element), (Names{"b"}));
-    OperatingSystem contradicting;
-    contradicting.setFilter(OperatingSystem::NameFilter, "b");
-    contradicting.setFilter(OperatingSystem::NameFilter, "a");
-    EXPECT_FALSE(static_cast<bool>(contradicting));
+TEST_F(OperatingSystemElement, WalkMeetsTheNodesThatPassEveryFilter) {
+    constexpr auto csName = OperatingSystem::CSNameFilter;
+    constexpr auto name = OperatingSystem::NameFilter;
+    constexpr auto other = static_cast<OperatingSystem::FilterType>(7);
+    addNodes({"a", "Linux"});
+    host->addNode({});  // without a name
+    addNodes({"b", "LINUX"});
+    const Names all = {"a", "Linux", "(none)", "b", "LINUX"};
+    const std::pair<std::vector<OperatingSystem::Filter>, Names> rows[] = {
+        {{}, all},
+        {{{name, "linux"}}, {"Linux", "LINUX"}},  // letter case aside
+        {{{name, "linux "}}, {}},                 // nothing is trimmed
+        {{{name, ""}}, {}},
+        {{{csName, "hOST1"}}, all},
+        {{{csName, "Host1 "}}, {}},
+        {{{name, "b"}, {csName, "host1"}}, {"b"}},
+        {{{name, "b"}, {name, "a"}}, {}},
+        {{{other, "x"}}, all},
+        {{{other, "x"}, {name, "b"}, {other, "y"}}, {"b"}},
+    };
+    for (const auto& [filters, expected] : rows) {
+        OperatingSystem element;
+        for (const OperatingSystem::Filter& filter : filters)
+            element.setFilter(filter.type, filter.value);
+        EXPECT_EQ(walked(element), expected);
+        ++element;
+        EXPECT_FALSE(static_cast<bool>(element));
+    }
+    host->setComputerName(std::nullopt);
+    OperatingSystem nameless;
+    nameless.setFilter(csName, "");
+    EXPECT_FALSE(static_cast<bool>(nameless));
 }
 
 TEST_F(OperatingSystemElement, FirstFailingFilterEndsTheTest) {
@@ -100,46 +97,26 @@ TEST_F(OperatingSystemElement, FilterThatTheCurrentNodeSatisfiesDoesNotMoveTheCu
     EXPECT_EQ(walked(element), (Names{"a", "a"}));
 }
 
-TEST_F(OperatingSystemElement, FilterOfAnotherTypePassesEveryNodeWithoutReading) {
+TEST_F(OperatingSystemElement, FilterOfAnotherTypeReadsNothing) {
     addNodes({"a", "b"});
     OperatingSystem element;
     element.setFilter(static_cast<OperatingSystem::FilterType>(7), "x");
     EXPECT_EQ(host->calls(Operation::ReadText), 0U);
-    EXPECT_EQ(walked(element), (Names{"a", "b"}));
-}
-
-TEST_F(OperatingSystemElement, NodeWithoutTheFilteredValueFails) {
-    host->addNode({});
-    addNode("b");
-    OperatingSystem element;
-    element.setFilter(OperatingSystem::NameFilter, "b");
-    EXPECT_EQ(walked(element), (Names{"b"}));
-    host->setComputerName(std::nullopt);
-    OperatingSystem nameless;
-    nameless.setFilter(OperatingSystem::CSNameFilter, "");
-    EXPECT_FALSE(static_cast<bool>(nameless));
+    EXPECT_EQ(host->calls(Operation::ComputerName), 0U);
 }
 
 TEST_F(OperatingSystemElement, OSTypeIsShiftedAgainstTheFrameworksNumber) {
-    struct Row {
-        unsigned int raw;
-        unsigned short published;
-    };
-    for (const Row& row : {Row{0, 0}, Row{1, 2}, Row{35, 36}, Row{64, 65}, Row{65, 67}, Row{68, 70},
-                           Row{69, 1}, Row{4294967295U, 1}}) {
-        setProperty(OSType, row.raw);
-        OperatingSystem element;
-        unsigned short value = 4711;
-        EXPECT_TRUE(element.getOSType(value)) << row.raw;
-        EXPECT_EQ(value, row.published) << row.raw;
-    }
-}
-
-TEST_F(OperatingSystemElement, OSTypeThatIsNotKnownLeavesTheOutputAlone) {
-    host->addNode({});
-    OperatingSystem element;
+    const std::pair<unsigned int, unsigned short> rows[] = {
+        {0, 0}, {1, 2}, {35, 36}, {64, 65}, {65, 67}, {68, 70}, {69, 1}, {4294967295U, 1}};
     unsigned short value = 4711;
-    EXPECT_FALSE(element.getOSType(value));
+    for (const auto& [raw, published] : rows) {
+        setProperty(OSType, raw);
+        EXPECT_TRUE(OperatingSystem().getOSType(value)) << raw;
+        EXPECT_EQ(value, published) << raw;
+    }
+    setProperty(Name, std::string("a"));
+    value = 4711;
+    EXPECT_FALSE(OperatingSystem().getOSType(value));
     EXPECT_EQ(value, 4711);
 }
 
@@ -189,61 +166,46 @@ TEST_F(OperatingSystemElement, OperationalStatusIsAppendedWithoutClearing) {
     EXPECT_EQ(value, (std::vector<unsigned short>{99, 2, 11, 2, 11}));
 }
 
-using SizeGetter = bool (OperatingSystem::*)(unsigned long long&);
-struct SizeRow {
-    Properties id;
-    SizeGetter getter;
-};
-const SizeRow sizeRows[] = {
-    {TotalSwapSpaceSize, &OperatingSystem::getTotalSwapSpaceSize},
-    {TotalVirtualMemorySize, &OperatingSystem::getTotalVirtualMemorySize},
-    {FreeVirtualMemory, &OperatingSystem::getFreeVirtualMemory},
-    {FreePhysicalMemory, &OperatingSystem::getFreePhysicalMemory},
-    {TotalVisibleMemorySize, &OperatingSystem::getTotalVisibleMemorySize},
-    {SizeStoredInPagingFiles, &OperatingSystem::getSizeStoredInPagingFiles},
-    {FreeSpaceInPagingFiles, &OperatingSystem::getFreeSpaceInPagingFiles},
-    {MaxProcessMemorySize, &OperatingSystem::getMaxProcessMemorySize},
-};
-
-TEST_F(OperatingSystemElement, SizesAreWidenedUnscaled) {
-    for (const SizeRow& row : sizeRows) {
-        setProperty(row.id, 4294967295U);
-        OperatingSystem element;
-        unsigned long long value = 0;
-        EXPECT_TRUE((element.*row.getter)(value)) << row.id;
-        EXPECT_EQ(value, 4294967295ULL) << row.id;
-    }
-}
-
-TEST_F(OperatingSystemElement, SizeThatIsNotKnownIsFalseAndStillWritesZero) {
-    host->addNode({});
-    for (const SizeRow& row : sizeRows) {
-        OperatingSystem element;
-        unsigned long long value = 4711;
-        EXPECT_FALSE((element.*row.getter)(value)) << row.id;
-        EXPECT_EQ(value, 0ULL) << row.id;
-    }
-}
-
-using CountGetter = bool (OperatingSystem::*)(unsigned int&);
-
-TEST_F(OperatingSystemElement, CountsComeFromTheirOwnProperty) {
-    const std::pair<Properties, CountGetter> rows[] = {
-        {NumberOfLicensedUsers, &OperatingSystem::getNumberOfLicensedUsers},
-        {NumberOfUsers, &OperatingSystem::getNumberOfUsers},
-        {NumberOfProcesses, &OperatingSystem::getNumberOfProcesses},
-        {MaxNumberOfProcesses, &OperatingSystem::getMaxNumberOfProcesses},
-    };
+// A number of the framework in the only property of the only node, and in none.
+template <class Value, std::size_t count>
+void expectOwnProperty(
+    const std::pair<Properties, bool (OperatingSystem::*)(Value&)> (&rows)[count],
+    const std::function<void(Properties, SimulatedHost::Value)>& setProperty, Value unknown) {
     for (const auto& [id, getter] : rows) {
-        setProperty(id, 17U);
-        OperatingSystem element;
-        unsigned int value = 0;
-        EXPECT_TRUE((element.*getter)(value)) << id;
-        EXPECT_EQ(value, 17U) << id;
+        setProperty(id, 4294967295U);
+        Value value = 4711;
+        EXPECT_TRUE((OperatingSystem().*getter)(value)) << id;
+        EXPECT_EQ(value, Value{4294967295U}) << id;
         setProperty(Name, std::string("a"));
-        OperatingSystem without;
-        EXPECT_FALSE((without.*getter)(value)) << id;
+        value = 4711;
+        EXPECT_FALSE((OperatingSystem().*getter)(value)) << id;
+        EXPECT_EQ(value, unknown) << id;
     }
+}
+
+TEST_F(OperatingSystemElement, NumbersComeUnscaledFromTheirOwnPropertyAndUnknownSizesAreZero) {
+    using OS = OperatingSystem;
+    const std::pair<Properties, bool (OS::*)(unsigned long long&)> sizes[] = {
+        {TotalSwapSpaceSize, &OS::getTotalSwapSpaceSize},
+        {TotalVirtualMemorySize, &OS::getTotalVirtualMemorySize},
+        {FreeVirtualMemory, &OS::getFreeVirtualMemory},
+        {FreePhysicalMemory, &OS::getFreePhysicalMemory},
+        {TotalVisibleMemorySize, &OS::getTotalVisibleMemorySize},
+        {SizeStoredInPagingFiles, &OS::getSizeStoredInPagingFiles},
+        {FreeSpaceInPagingFiles, &OS::getFreeSpaceInPagingFiles},
+        {MaxProcessMemorySize, &OS::getMaxProcessMemorySize},
+    };
+    const std::pair<Properties, bool (OS::*)(unsigned int&)> counts[] = {
+        {NumberOfLicensedUsers, &OS::getNumberOfLicensedUsers},
+        {NumberOfUsers, &OS::getNumberOfUsers},
+        {NumberOfProcesses, &OS::getNumberOfProcesses},
+        {MaxNumberOfProcesses, &OS::getMaxNumberOfProcesses},
+    };
+    const auto set = [this](Properties id, SimulatedHost::Value value) {
+        setProperty(id, std::move(value));
+    };
+    expectOwnProperty<unsigned long long>(sizes, set, 0);
+    expectOwnProperty<unsigned int>(counts, set, 4711);
 }
 
 TEST_F(OperatingSystemElement, TextsAndFlagComeFromTheirOwnSource) {
@@ -344,6 +306,87 @@ TEST_F(OperatingSystemElement, ExceptionsOfTheFrameworkPassThrough) {
     host->throwFromCall(Operation::ReadText, 1, 17);
     std::string name;
     EXPECT_THROW(element.getName(name), int);
+}
+
+/// Sets libc's zone for one test, as it would stand in the host process.
+class DateTime : public SimulatedFixture {
+  protected:
+    ~DateTime() override { timezone = before_; }
+
+    // Both dates, which are converted alike; "" where one is not known.
+    std::string converted(const std::string& text, long zone) {
+        timezone = zone;
+        SimulatedHost::Node node;
+        node.properties[InstallDate] = text;
+        node.properties[LastBootUpTime] = text;
+        host->clearNodes();
+        host->addNode(node);
+        OperatingSystem element;
+        std::string installed;
+        std::string booted;
+        EXPECT_TRUE(element.getInstallDate(installed));
+        EXPECT_TRUE(element.getLastBootUpTime(booted));
+        EXPECT_EQ(installed, booted);
+        return installed;
+    }
+
+  private:
+    long before_ = timezone;
+};
+
+TEST_F(DateTime, IsWhatTheTextAndTheZoneMakeOfIt) {
+    const std::string usual = "2009-03-17-08:15:42";
+    const struct {
+        std::string text;
+        long zone;
+        const char* expected;
+    } rows[] = {
+        // The sign is minus east of UTC and plus west of it.
+        {usual, -3600, "20090317081542.000000-060"},
+        {usual, 0, "20090317081542.000000+000"},
+        {usual, 18000, "20090317081542.000000+300"},
+        {usual, 50400, "20090317081542.000000+840"},
+        {usual, -45900, "20090317081542.000000-765"},
+        // The offset is truncated towards zero.
+        {usual, -59, "20090317081542.000000-000"},
+        {usual, 119, "20090317081542.000000+001"},
+        // The largest fields fill the buffer; what is longer is cut. A signed field is read as a
+        // huge number, whose ten digits push the rest out.
+        {"9999-99-99-99:99:99", 59940, "99999999999999.000000+999"},
+        {usual, 86340, "20090317081542.000000+143"},
+        {"2009--1-17-08:15:42", 0, "2009429496729517081542.00"},
+        // A space is no separator, any other character is one.
+        {"2009-03-17 18:15:42", 0, "20090317081542.000000+000"},
+        {"2009-03-17 08:15:42", 0, "20090317081542.000000+000"},
+        {"2009/03/17T08.15.42", 0, "20090317081542.000000+000"},
+        {"  2009 - 03 - 17 - 08 : 15 : 42 trailing", 0, "20090317081542.000000+000"},
+        // What does not parse is 0; the year stands in a field of four.
+        {"never", 0, "   00000000000.000000+000"},
+        {"", 18000, "   00000000000.000000+300"},
+        {"2009", 0, "20090000000000.000000+000"},
+        {"2009-03", 0, "20090300000000.000000+000"},
+        {"2009-03-17-08:1", 0, "20090317080100.000000+000"},
+        {"2009-xx-17", 0, "20090000000000.000000+000"},
+        {usual + std::string(1000000, '9'), 0, "20090317081542.000000+000"},
+    };
+    for (const auto& row : rows)
+        EXPECT_EQ(converted(row.text, row.zone), row.expected) << row.text.substr(0, 40);
+}
+
+TEST_F(DateTime, WithoutThePropertyIsNotKnown) {
+    host->addNode({});
+    OperatingSystem element;
+    std::string text = "untouched";
+    EXPECT_FALSE(element.getInstallDate(text));
+    EXPECT_FALSE(element.getLastBootUpTime(text));
+    EXPECT_EQ(text, "untouched");
+}
+
+TEST_F(DateTime, TakesTheZoneAsItStandsWithoutInitialisation) {
+    setenv("TZ", "EST5", 1);
+    EXPECT_EQ(converted("2009-03-17-08:15:42", -3600), "20090317081542.000000-060");
+    EXPECT_EQ(timezone, -3600);
+    unsetenv("TZ");
 }
 
 }  // namespace
