@@ -96,7 +96,7 @@ constexpr const char* statusHelp =
     "What the host catches the provider at (a null result, an undeclared property, an object used\n"
     "after its request) is told on the standard error in lines that begin with 'caught:'.";
 
-std::string withoutBlanksAround(const std::string& text) {
+std::string strip(const std::string& text) {
     constexpr const char* blanks = " \t\r\n";
     const std::size_t start = text.find_first_not_of(blanks);
     return start == std::string::npos
@@ -105,17 +105,17 @@ std::string withoutBlanksAround(const std::string& text) {
 }
 
 /// The names between commas; an empty text holds none.
-void addNames(const std::string& list, std::vector<std::string>& to) {
+void appendNames(const std::string& list, std::vector<std::string>& to) {
     std::size_t start = 0;
     while (start < list.size()) {
         const std::size_t comma = std::min(list.find(',', start), list.size());
-        const std::string name = withoutBlanksAround(list.substr(start, comma - start));
+        const std::string name = strip(list.substr(start, comma - start));
         if (!name.empty()) to.push_back(name);
         start = comma + 1;
     }
 }
 
-Format formatNamed(const std::string& word) {
+Format parseFormat(const std::string& word) {
     if (word == "table") return Format::Table;
     if (word == "mof") return Format::Mof;
     if (word == "json") return Format::Json;
@@ -136,7 +136,7 @@ CLI::Option* addText(CLI::App& to, const char* name, const char* typeName, Text&
 
 /// The arguments behind the program's name, last one first. An empty value that stands behind a
 /// sign of equality becomes an argument of its own: the parser would take the next argument for it.
-std::vector<std::string> separated(int argumentCount, const char* const* arguments) {
+std::vector<std::string> splitArguments(int argumentCount, const char* const* arguments) {
     std::vector<std::string> result;
     bool options = true;
     for (int index = 1; index < argumentCount; ++index) {
@@ -179,6 +179,8 @@ Parser::Parser() : app_(description, "cmpihost") {
     app_.set_help_flag("-h,--help", "Print this help");
     app_.footer(std::string(pathHelp) + statusHelp);
     app_.require_subcommand(1);
+    // As wide as the longest option with its type, so that every help stands on the line of its
+    // option.
     app_.get_formatter()->column_width(34);
     app_.get_formatter()->label("SUBCOMMAND", "OPERATION ARGUMENT...");
     addHostOptions();
@@ -187,7 +189,7 @@ Parser::Parser() : app_(description, "cmpihost") {
 
 ParsedCommandLine Parser::parse(int argumentCount, const char* const* arguments) {
     try {
-        app_.parse(separated(argumentCount, arguments));
+        app_.parse(splitArguments(argumentCount, arguments));
     } catch (const CLI::CallForVersion& version) {
         return {std::nullopt, std::string(version.what()) + "\n", exitDone};
     } catch (const CLI::CallForHelp&) {
@@ -195,6 +197,7 @@ ParsedCommandLine Parser::parse(int argumentCount, const char* const* arguments)
     } catch (const CLI::ParseError& error) {
         return refused(app_.get_subcommands().empty() ? withoutCommand(error) : error.what());
     }
+    // Refused, not ignored: a script that asks for JSON would take the picture for it.
     if (result_.tree && result_.format != Format::Table)
         return refused("--format: tree draws a picture, it has no other form");
     collectProperties();
@@ -208,7 +211,8 @@ ParsedCommandLine Parser::refused(const std::string& complaint) {
             exitUsage};
 }
 
-/// The complaint about arguments among which there is no command.
+/// The complaint about arguments among which there is no command. CLI11's own speaks of
+/// subcommands, a word that the help does not know.
 std::string Parser::withoutCommand(const CLI::ParseError& error) const {
     if (dynamic_cast<const CLI::RequiredError*>(&error) == nullptr) return error.what();
     const std::vector<std::string> unknown = app_.remaining();
@@ -225,7 +229,7 @@ void Parser::addHostOptions() {
                   "Ask the provider itself, and complete no path that lacks keys")
         ->excludes(provider);
     app_.add_option_function<std::string>(
-            "--format", [this](const std::string& word) { result_.format = formatNamed(word); },
+            "--format", [this](const std::string& word) { result_.format = parseFormat(word); },
             "How results are printed: table (the default), mof or json;\n"
             "not for tree")
         ->type_name("FORMAT");
@@ -299,13 +303,16 @@ void Parser::addFilters(CLI::App& to, Filters which) {
 }
 
 void Parser::collectProperties() {
+    // An empty --properties is a list too, one without names; without any there is no list.
     if (!propertyOption_ && propertyArguments_.empty()) return;
     result_.properties.emplace();
-    for (const std::string& argument : propertyArguments_) addNames(argument, *result_.properties);
-    addNames(propertyOption_.value_or(std::string()), *result_.properties);
+    for (const std::string& argument : propertyArguments_)
+        appendNames(argument, *result_.properties);
+    appendNames(propertyOption_.value_or(std::string()), *result_.properties);
 }
 
 std::string Parser::help() {
+    // The operations are few and alike: the help of the program shows all of them in full.
     const std::vector<CLI::App*> chosen = app_.get_subcommands();
     return chosen.empty() ? app_.help("", CLI::AppFormatMode::All)
                           : chosen.front()->help("cmpihost");

@@ -104,6 +104,7 @@ bool mayBeClass(const Schema& schema, const std::string& name) {
     return schema.find(name) != nullptr || base::equalsIgnoreCase(name.substr(0, 4), "CIM_");
 }
 
+/// Whether any association has the role: which one is meant may be what the user got wrong.
 bool isRole(const Schema& schema, const std::string& name) {
     const std::vector<std::string> classes = schema.classNames();
     return std::any_of(classes.begin(), classes.end(), [&](const std::string& className) {
@@ -177,6 +178,7 @@ std::string hintFor(const OperationRequest& request, const OperationResult& fail
                              request.operation == Operation::AssociatorNames;
     if (!associators || failure.rc != CMPI_RC_ERR_INVALID_CLASS) return {};
     const std::string unknown = linesOnUnknownNames("hint: ", request, schema);
+    // The name is right as far as the schema knows, so there is nothing to advise.
     if (request.assocClass) return unknown;
     std::string names;
     for (const std::string& name : schema.classNames()) {

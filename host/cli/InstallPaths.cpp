@@ -54,6 +54,8 @@ std::vector<fs::path> candidates(Library library, const fs::path& programFolder,
     const std::string name = fileName(library);
     const std::string soname = name + ".1";
     const fs::path prefix = programFolder.parent_path();
+    // A library beside the program belongs to it, so it goes before whatever is installed. An
+    // absolute folder of providers takes the place of the prefix.
     std::vector<fs::path> result = {prefix / "lib" / soname, programFolder / soname};
     for (const fs::path& folder : cmpiFolders(installed)) {
         for (const std::string& file : {name, soname}) {
@@ -75,6 +77,7 @@ fs::path findLibrary(Library library, const fs::path& programFolder, const fs::p
 }
 
 std::string providerName(const fs::path& file) {
+    // By the beginning of the file's name: with or without a version behind it.
     const bool facade = file.filename().string().rfind(fileName(Library::Facade), 0) == 0;
     return facade ? "OSStatusFacade" : "OperatingSystemProvider";
 }

@@ -91,6 +91,7 @@ Value assignedValue(const std::string& text, const mof::Feature& property,
         }
         elements.push_back(typed(item, elementType, catalogue));
     }
+    // NULL without braces is an array that is null, in braces it is an array with a null in it.
     const bool nullArray = property.array && !value.array && elements.front().isNull();
     if (nullArray) return Value::null(type);
     return property.array ? Value::fromArray(elementType, std::move(elements)) : elements.front();
@@ -112,6 +113,7 @@ Assignment split(const std::string& assignment) {
 
 PropertyValue property(const Assignment& assignment, const std::string& className,
                        const Schema& schema, const ClassCatalogue& catalogue) {
+    // Whether there is such a class is for the provider to say.
     if (schema.find(className) == nullptr) return {assignment.name, Value(assignment.text)};
     const mof::Feature* declared = schema.findProperty(className, assignment.name);
     if (declared == nullptr) {
@@ -145,7 +147,8 @@ InstanceValue instance(const CommandLine& commandLine, const ObjectPathValue& pa
     return result;
 }
 
-/// The class that a query selects from: the word after FROM. Empty when there is none.
+/// The class that a query selects from: the word after FROM. Empty when there is none. Enough to
+/// route the query; whether it is one of its language is for the provider to say.
 std::string selectedClass(const std::string& query) {
     constexpr const char* blanks = " \t\r\n;";
     bool afterFrom = false;
@@ -159,6 +162,8 @@ std::string selectedClass(const std::string& query) {
     return {};
 }
 
+/// The property list of ModifyInstance: what is not in it must not be touched. The keys that only
+/// the path gives stand behind the assigned properties.
 std::vector<std::string> assignedNames(const InstanceValue& instance,
                                        const CommandLine& commandLine) {
     std::vector<std::string> names;

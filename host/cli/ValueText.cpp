@@ -92,6 +92,8 @@ std::string humanReadableSize(std::uint64_t kibibytes) {
         ++unit;
     }
     if (unit == 0) return std::to_string(whole) + " KiB";
+    // In integers, so that the digits are the same on every machine. What rounds up to 1024 is one
+    // of the next unit.
     std::uint64_t tenths = whole * 10 + (rest * 10 + 512) / 1024;
     if (tenths >= 10240) {
         tenths = 10;
@@ -101,6 +103,7 @@ std::string humanReadableSize(std::uint64_t kibibytes) {
 }
 
 std::string humanReadableDateTime(const std::string& cimText) {
+    // Asterisks leave open which instant it is: there is nothing to tell that is shorter.
     const auto parsed = parseDateTime(cimText);
     if (!parsed || !parsed->microseconds || cimText.find('*') != std::string::npos) return {};
     const std::uint64_t seconds = *parsed->microseconds / microsecondsPerSecond;

@@ -66,6 +66,7 @@ char Lexer::take() {
         ++position_.line;
         position_.column = 1;
     } else if (base::startsUtf8(c)) {
+        // Columns are what an editor shows: a character of several bytes is one.
         ++position_.column;
     }
     return c;
@@ -73,6 +74,7 @@ char Lexer::take() {
 
 void Lexer::skipBlockComment() {
     const Position start = position_;
+    // Both marks go at once, for "/*/" does not end what it begins.
     take();
     take();
     while (!(peek() == '*' && peek(1) == '/')) {
@@ -123,6 +125,7 @@ Token Lexer::word(TokenKind kind, Position start) {
 Token Lexer::number(Position start) {
     std::string text(1, take());
     bool hexadecimal = false;
+    // "0x1e+2" is a number, a sign and a number: only decimals have exponents.
     const auto inExponent = [&] {
         return !hexadecimal && (text.back() == 'e' || text.back() == 'E') &&
                (peek() == '+' || peek() == '-');

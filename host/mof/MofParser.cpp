@@ -163,6 +163,7 @@ Class Parser::classDeclaration(std::vector<Qualifier> qualifiers) {
 }
 
 void Parser::member(Class& to, NameSet& seen) {
+    // Only the parenthesis tells a method from a property, so both begin alike.
     Feature head = feature();
     if (accept("(")) {
         to.methods.push_back(method(std::move(head)));
@@ -267,6 +268,7 @@ Qualifier Parser::qualifier() {
     } else if (peekIs("{")) {
         result.value = list();
     }
+    // Flavors govern how qualifiers are inherited and overridden; nothing here asks for that.
     if (accept(":")) {
         identifier("a flavor of qualifier '" + name.text + "'");
         while (next_.kind == TokenKind::Identifier) take();
@@ -282,6 +284,7 @@ void Parser::nameList(const char* what) {
     expect(")", what);
 }
 
+/// Read as a property is, for its type, array suffix and default have the same form.
 void Parser::qualifierDeclaration() {
     Feature declared;
     declared.name = identifier("the name of the qualifier").text;
@@ -309,6 +312,7 @@ void Parser::instanceDeclaration() {
     const std::string name = identifier("the class of the instance").text;
     alias();
     expect("{", "the head of the instance of '" + name + "'");
+    // Values are not held against a class: it may stand in a file that is read later.
     while (!accept("}")) {
         qualifierList();
         const std::string property = identifier("the name of a property or '}'").text;

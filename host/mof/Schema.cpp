@@ -92,6 +92,7 @@ void Schema::check(const mof::Class& added) const {
                             "class '" + added.name + "' is declared twice, first at " +
                                 earlier->file + ":" + std::to_string(earlier->position.line));
     }
+    // Files may come in any order, so each class is looked at when it closes a circle.
     if (isA(added.superclass, added.name)) {
         throw mof::MofError(added.file, added.position,
                             "class '" + added.name + "' descends from itself");
@@ -151,6 +152,7 @@ bool Schema::isKey(const std::string& className, const std::string& propertyName
     for (const mof::Class* level = find(className); level != nullptr;
          level = find(level->superclass)) {
         for (const mof::Feature& property : level->properties) {
+            // An override need not say Key again.
             if (base::equalsIgnoreCase(property.name, propertyName) &&
                 mof::isSet(property.qualifiers, "Key")) {
                 return true;

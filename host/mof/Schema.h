@@ -18,12 +18,10 @@ namespace cmpihost {
 /// loaded, so any thread may read it.
 class Schema {
   public:
+    /// Moves, but does not copy: value maps are found by the addresses of their properties.
     Schema() = default;
     Schema(Schema&&) = default;
     Schema& operator=(Schema&&) = default;
-    Schema(const Schema&) = delete;
-    Schema& operator=(const Schema&) = delete;
-    ~Schema() = default;
 
     /// Reads every *.mof file of the folder, in the order of their names. An include pragma adds
     /// nothing, for all files of the folder are read anyway. Throws mof::MofError for a file that
@@ -67,6 +65,7 @@ class Schema {
     void keepValueMaps(const mof::Class& added);
 
     std::map<std::string, mof::Class> classes_;
+    /// Read once, when their class is added: a wrong one is an error in the file, not at its use.
     std::map<const mof::Feature*, ValueMap> valueMaps_;
 };
 

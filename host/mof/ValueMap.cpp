@@ -44,6 +44,7 @@ ValueMap::Entry ValueMap::entry(const std::string& range, const std::string& nam
     return {bound(range.substr(0, dots), least), bound(range.substr(dots + 2), most), name};
 }
 
+/// A qualifier of a property that is no integer (strings have them too) names no numbers.
 ValueMap ValueMap::of(const mof::Feature& property) {
     ValueMap result;
     const std::vector<std::string> names = mof::texts(property.qualifiers, "Values");
