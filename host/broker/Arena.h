@@ -1,7 +1,7 @@
-// The objects of one request, and the shells that remain of them. Internal.
-#pragma once
+#ifndef HOST_BROKER_ARENA_H
+#define HOST_BROKER_ARENA_H
 
-#include "host/broker/Shell.h"
+#include "host/broker/Object.h"
 
 #include <cstddef>
 #include <memory>
@@ -9,11 +9,13 @@
 #include <set>
 #include <vector>
 
+/// Who owns the objects of a request, while it runs and after it. Internal.
 namespace cmpihost {
 
-using Shells = std::vector<std::unique_ptr<Shell>>;
+using Objects = std::vector<std::unique_ptr<ObjectBase>>;
 
-/// Objects and memory blocks in the order in which they were made. Used by one thread at a time.
+/// Objects and memory blocks of one request in the order in which they were made. Used by one
+/// thread at a time.
 class Arena {
   public:
     Arena() = default;
@@ -21,17 +23,16 @@ class Arena {
     Arena(const Arena&) = delete;
     Arena& operator=(const Arena&) = delete;
 
-    void add(std::unique_ptr<Shell> shell);
-    /// Retires one object before its time and hands its shell out.
-    std::unique_ptr<Shell> giveBack(const Shell& shell) noexcept;
+    void add(std::unique_ptr<ObjectBase> object);
+    /// Retires one object before its time and hands it out.
+    std::unique_ptr<ObjectBase> release(const ObjectBase& object) noexcept;
 
     /// A mark for what is made from now on; it belongs to the arena.
     void* mark();
     /// Retires what was made since the mark, inner marks included. False: no such mark.
-    bool retireSince(const void* mark, Shells& retired);
-    /// Ends everything: destroys all objects but the last `kept`, and hands the shells of those
-    /// out.
-    Shells retireAll(std::size_t kept) noexcept;
+    bool releaseSince(const void* mark, Objects& retired);
+    /// Ends everything: destroys all objects but the last `kept`, and hands those out, retired.
+    Objects endRequest(std::size_t kept) noexcept;
 
     void* allocate(std::size_t size);
     /// Null: the block is none of this arena, or there is no memory.
@@ -40,28 +41,31 @@ class Arena {
     bool free(void* block) noexcept;
 
   private:
-    Shells shells_;
+    Objects objects_;
     std::vector<std::unique_ptr<std::size_t>> marks_;
     std::set<void*> blocks_;
 };
 
-/// Shells of ended objects, the oldest given up first. Any thread.
+/// Retired objects, the oldest destroyed first, so that a late use of one is recognised and not a
+/// use of freed memory. Any thread.
 class Quarantine {
   public:
-    explicit Quarantine(std::size_t limit) : shells_(limit) {}
+    explicit Quarantine(std::size_t limit) : ring_(limit) {}
 
     /// Null pointers among them do not count.
-    void take(Shells shells) noexcept;
-    void take(std::unique_ptr<Shell> shell) noexcept;
+    void take(Objects objects) noexcept;
+    void take(std::unique_ptr<ObjectBase> object) noexcept;
     std::size_t size() const;
 
   private:
-    void keep(std::unique_ptr<Shell>& shell) noexcept;
+    void put(std::unique_ptr<ObjectBase>& object) noexcept;
 
     mutable std::mutex mutex_;
-    /// A ring; `next_` is the oldest place.
-    Shells shells_;
+    /// `next_` is the oldest place.
+    Objects ring_;
     std::size_t next_ = 0;
 };
 
 }  // namespace cmpihost
+
+#endif

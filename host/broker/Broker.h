@@ -1,10 +1,9 @@
-// The embedded, strict CMPI broker.
-#pragma once
+#ifndef HOST_BROKER_BROKER_H
+#define HOST_BROKER_BROKER_H
 
-#include "host/broker/BrokerOptions.h"
 #include "host/broker/ClassCatalogue.h"
 #include "host/broker/FaultPlan.h"
-#include "host/broker/UpcallService.h"
+#include "host/broker/Operation.h"
 
 #include <cmpi/cmpift.h>
 
@@ -12,9 +11,31 @@
 #include <string>
 #include <vector>
 
+/// The embedded, strict CMPI broker.
 namespace cmpihost {
 
+class Broker;
 class BrokerCore;
+
+/// How a broker presents itself, so that tests can stand for object managers of both kinds.
+struct BrokerOptions {
+    enum class Shape {
+        /// Level 200 with every slot of every table filled.
+        Complete,
+        /// The opposite in all that object managers may leave out or do in their own way: low table
+        /// versions, no memory table, null slots where level 200 added members and in the optional
+        /// services, a context of flags and principal only, key values in the state CMPI_goodValue,
+        /// CMPI_RC_ERR_NOT_FOUND for a missing item, and the keys of a path set as properties by
+        /// newInstance.
+        Sparse
+    };
+
+    Shape shape = Shape::Complete;
+    /// How many ended objects are kept to recognise a late use.
+    std::size_t quarantine = 4096;
+
+    static BrokerOptions sparse() { return {Shape::Sparse}; }
+};
 
 /// What a provider wrote with logMessage (severity) or trace (level).
 struct LogRecord {
@@ -24,6 +45,28 @@ struct LogRecord {
     /// The id of a message or the component of a trace.
     std::string id{};
     std::string text{};
+};
+
+/// What a service answers to an up-call.
+struct UpcallAnswer : OperationResult {
+    /// For enumerations: the k-th getNext (from 1) fails with `failRc`; 0: none.
+    unsigned failAt = 0;
+    CMPIrc failRc = CMPI_RC_ERR_FAILED;
+};
+
+/// Stands for the provider of one or more classes. Up-calls arrive on the thread of the request; a
+/// service that several threads may reach at once must cope with that.
+class UpcallService {
+  public:
+    virtual ~UpcallService() = default;
+
+    /// Answers one operation. An rc other than CMPI_RC_OK goes to the caller with a null object.
+    virtual UpcallAnswer perform(Broker& broker, const OperationRequest& request) = 0;
+
+  protected:
+    UpcallService() = default;
+    UpcallService(const UpcallService&) = default;
+    UpcallService& operator=(const UpcallService&) = default;
 };
 
 /// A broker with all its tables, for one or more providers. Objects that providers make through it
@@ -40,8 +83,6 @@ class Broker {
 
     /// What a provider's factory is given.
     const CMPIBroker* cmpi() const noexcept;
-    const BrokerOptions& options() const noexcept;
-    const ClassCatalogue* catalogue() const noexcept;
 
     /// Up-calls for the class go to `service`, which outlives its use; a later route replaces an
     /// earlier one. Up-calls for a class without route: null and CMPI_RC_ERR_INVALID_CLASS, or
@@ -55,12 +96,11 @@ class Broker {
     std::vector<std::string> violations() const;
     std::vector<std::string> takeViolations();
     /// What providers logged and traced since the start or the last take, in order.
-    std::vector<LogRecord> logRecords() const;
     std::vector<LogRecord> takeLogRecords();
 
     /// Clones that no provider has released yet.
     std::size_t unreleasedClones() const;
-    /// Shells of ended objects in quarantine.
+    /// Ended objects in quarantine.
     std::size_t quarantined() const;
 
     /// For the parts of this library.
@@ -71,3 +111,5 @@ class Broker {
 };
 
 }  // namespace cmpihost
+
+#endif

@@ -1,99 +1,116 @@
+// One lock for each thing that threads share (findings, clones, what belongs to no request); the
+// objects of a request are its thread's alone and take none.
 #include "host/broker/BrokerCore.h"
 
-#include "host/broker/BrokerTables.h"
+#include "base/Ascii.h"
 
-#include <algorithm>
+#include <utility>
 
 namespace cmpihost {
 
-char tombstone[] = "(object of a request that ended)";
+namespace {
 
-Scope*& innermostScope() noexcept {
-    static thread_local Scope* innermost = nullptr;
+RequestScope*& innermostOfThread() noexcept {
+    static thread_local RequestScope* innermost = nullptr;
     return innermost;
 }
 
-void reportLateUse(const Shell& shell, const CallName& call) noexcept {
+[[noreturn]] void refuseHandle(const std::string& violation, CMPIrc rc) {
+    if (RequestScope* const scope = RequestScope::innermost()) scope->core().report(violation);
+    throw Failure{rc};
+}
+
+}  // namespace
+
+void reportLateUse(const ObjectBase& object, const CallName& call) noexcept {
     try {
-        shell.core().report(call.text() + ": " + shell.describe() + ' ' + shell.endOfLife());
+        object.core().report(call.text() + ": " + object.describe() +
+                             (object.lifetime() == Lifetime::Released
+                                  ? " used after it was released"
+                                  : " used after its request ended"));
     } catch (...) {
         // Without memory there is no report; the call fails all the same.
     }
 }
 
-namespace {
-
-void reportToThread(const std::string& violation) {
-    if (const Scope* const scope = innermostScope()) scope->core->report(violation);
+void refuseNull(const CallName& call, std::string_view kind) {
+    refuseHandle(call.text().append(": null ").append(kind), CMPI_RC_ERR_INVALID_PARAMETER);
 }
 
-}  // namespace
-
-void refuseNull(const CallName& call, const char* kind) {
-    reportToThread(call.text() + ": null " + kind);
-    throw Failure{CMPI_RC_ERR_INVALID_PARAMETER};
+void refuseForeign(const CallName& call, std::string_view kind) {
+    refuseHandle(call.text().append(": no ").append(kind).append(" of this host"),
+                 CMPI_RC_ERR_INVALID_HANDLE);
 }
 
-void refuseForeign(const CallName& call, const char* kind) {
-    reportToThread(call.text() + ": no " + kind + " of this host");
-    throw Failure{CMPI_RC_ERR_INVALID_HANDLE};
+RequestScope* RequestScope::innermost() noexcept {
+    return innermostOfThread();
+}
+
+RequestScope::RequestScope(BrokerCore& core, Kind kind)
+    : core_(core), kind_(kind), outer_(innermost()), arena_(core.threadArena()) {
+    if (arena_ == nullptr) arena_ = &own_.emplace();
+    innermostOfThread() = this;
+}
+
+void RequestScope::end() noexcept {
+    if (!open_) return;
+    open_ = false;
+    innermostOfThread() = outer_;
+    if (own_) core_.endRequest(*own_);
 }
 
 BrokerCore::BrokerCore(Broker& owner, const ClassCatalogue* catalogue, BrokerOptions options)
     : owner_(owner),
       catalogue_(catalogue),
-      options_(std::move(options)),
-      shape_(shapeOf(options_)),
-      upcalls_(upcallsFor(options_)),
-      factories_(factoriesFor(options_)),
-      threads_(threadsFor(options_)),
+      options_(options),
+      upcalls_(upcallTable(isSparse())),
+      factories_(factoryTable(isSparse())),
+      threads_(threadTable(isSparse())),
       memory_(memoryTable()),
-      broker_{this, &upcalls_, &factories_, &threads_, options_.memoryTable ? &memory_ : nullptr},
-      quarantine_(options_.quarantine) {}
-
-BrokerCore::~BrokerCore() = default;
+      broker_{this, &upcalls_, &factories_, &threads_, isSparse() ? nullptr : &memory_},
+      quarantine_(options.quarantine) {}
 
 const ClassDeclaration* BrokerCore::declaration(std::string_view className) const {
     return catalogue_ == nullptr ? nullptr : catalogue_->find(className);
 }
 
 Arena* BrokerCore::threadArena() const noexcept {
-    for (const Scope* scope = innermostScope(); scope != nullptr; scope = scope->outer) {
-        if (scope->core == this) return scope->arena;
+    for (RequestScope* scope = RequestScope::innermost(); scope; scope = scope->outer()) {
+        if (&scope->core() == this) return &scope->arena();
     }
     return nullptr;
 }
 
-void BrokerCore::adopt(std::unique_ptr<Shell> shell) {
+void BrokerCore::adopt(std::unique_ptr<ObjectBase> object) {
     if (Arena* const arena = threadArena()) {
-        arena->add(std::move(shell));
+        arena->add(std::move(object));
         return;
     }
-    report(shell->describe() + " made while no request is open on the thread");
-    const std::lock_guard<std::mutex> lock(strayMutex_);
-    strays_.add(std::move(shell));
+    report(object->describe() + " made while no request is open on the thread");
+    const std::lock_guard<std::mutex> lock(unownedMutex_);
+    unowned_.add(std::move(object));
 }
 
-void BrokerCore::adoptClone(std::unique_ptr<Shell> shell) {
+void BrokerCore::adoptClone(std::unique_ptr<ObjectBase> object) {
     const std::lock_guard<std::mutex> lock(cloneMutex_);
-    Shell* const key = shell.get();
-    clones_.emplace(key, std::move(shell));
+    ObjectBase* const key = object.get();
+    clones_.emplace(key, std::move(object));
 }
 
-void BrokerCore::giveBack(const Shell& shell) noexcept {
-    if (shell.arena() != nullptr) {
-        quarantine_.take(shell.arena()->giveBack(shell));
+void BrokerCore::releaseObject(const ObjectBase& object) noexcept {
+    if (object.arena() != nullptr) {
+        quarantine_.take(object.arena()->release(object));
         return;
     }
-    std::unique_ptr<Shell> owned;
+    std::unique_ptr<ObjectBase> owned;
     {
         const std::lock_guard<std::mutex> lock(cloneMutex_);
-        const auto found = clones_.find(&shell);
+        const auto found = clones_.find(&object);
         if (found == clones_.end()) return;
         owned = std::move(found->second);
         clones_.erase(found);
     }
-    owned->retire(Life::GivenBack);
+    owned->retire(Lifetime::Released);
     quarantine_.take(std::move(owned));
 }
 
@@ -104,8 +121,8 @@ std::size_t BrokerCore::unreleasedClones() const {
 
 void BrokerCore::report(std::string violation) noexcept {
     try {
-        for (Scope* scope = innermostScope(); scope != nullptr; scope = scope->outer) {
-            if (scope->core == this) scope->violations.push_back(violation);
+        for (RequestScope* scope = RequestScope::innermost(); scope; scope = scope->outer()) {
+            if (&scope->core() == this) scope->violations().push_back(violation);
         }
         const std::lock_guard<std::mutex> lock(findingsMutex_);
         violations_.push_back(std::move(violation));
@@ -121,41 +138,35 @@ void BrokerCore::log(LogRecord record) {
 
 std::vector<std::string> BrokerCore::violations(bool take) {
     const std::lock_guard<std::mutex> lock(findingsMutex_);
-    std::vector<std::string> result = violations_;
-    if (take) violations_.clear();
-    return result;
+    return take ? std::exchange(violations_, {}) : violations_;
 }
 
-std::vector<LogRecord> BrokerCore::logRecords(bool take) {
+std::vector<LogRecord> BrokerCore::takeLogRecords() {
     const std::lock_guard<std::mutex> lock(findingsMutex_);
-    std::vector<LogRecord> result = log_;
-    if (take) log_.clear();
-    return result;
+    return std::exchange(log_, {});
 }
 
 CMPIrc BrokerCore::inject(FaultPlan& plan, const CallName& call) {
-    const std::optional<PlannedFailure> failure = plan.onCall(call.table, call.slot);
+    const auto failure = plan.onCall(call.text());
     if (!failure) return CMPI_RC_OK;
     if (!failure->withValue) throw Failure{failure->rc};
     return failure->rc;
 }
 
-void BrokerCore::route(std::string className, UpcallService& service) {
-    const auto known = std::find_if(services_.begin(), services_.end(), [&](const auto& entry) {
-        return equalNames(entry.first, className);
-    });
-    if (known != services_.end()) {
-        known->second = &service;
-    } else {
-        services_.emplace_back(std::move(className), &service);
+void BrokerCore::route(const std::string& className, UpcallService& service) {
+    for (auto& [known, knownService] : services_) {
+        if (!base::equalsIgnoreCase(known, className)) continue;
+        knownService = &service;
+        return;
     }
+    services_.emplace_back(className, &service);
 }
 
-UpcallService* BrokerCore::service(const std::string& className) const {
-    const auto found = std::find_if(services_.begin(), services_.end(), [&](const auto& entry) {
-        return equalNames(entry.first, className);
-    });
-    return found == services_.end() ? nullptr : found->second;
+UpcallService* BrokerCore::serviceOf(const std::string& className) const {
+    for (const auto& [known, service] : services_) {
+        if (base::equalsIgnoreCase(known, className)) return service;
+    }
+    return nullptr;
 }
 
 UpcallService* BrokerCore::serviceFor(const OperationRequest& request) const {
@@ -166,9 +177,9 @@ UpcallService* BrokerCore::serviceFor(const OperationRequest& request) const {
     const std::optional<std::string>& association =
         references ? request.resultClass : request.assocClass;
     if (association) {
-        if (UpcallService* const found = service(*association)) return found;
+        if (UpcallService* const found = serviceOf(*association)) return found;
     }
-    return service(request.path.className);
+    return serviceOf(request.path.className);
 }
 
 UpcallAnswer BrokerCore::perform(const OperationRequest& request) {
@@ -178,6 +189,36 @@ UpcallAnswer BrokerCore::perform(const OperationRequest& request) {
                                                                : CMPI_RC_ERR_NOT_SUPPORTED;
     answer.message = "No provider for class " + request.path.className;
     return answer;
+}
+
+Broker::Broker(const ClassCatalogue* catalogue, BrokerOptions options)
+    : core_(std::make_unique<BrokerCore>(*this, catalogue, options)) {}
+
+Broker::~Broker() = default;
+
+const CMPIBroker* Broker::cmpi() const noexcept {
+    return core_->cmpi();
+}
+void Broker::route(const std::string& className, UpcallService& service) {
+    core_->route(className, service);
+}
+void Broker::setFaultPlan(FaultPlan* plan) noexcept {
+    core_->setFaultPlan(plan);
+}
+std::vector<std::string> Broker::violations() const {
+    return core_->violations(false);
+}
+std::vector<std::string> Broker::takeViolations() {
+    return core_->violations(true);
+}
+std::vector<LogRecord> Broker::takeLogRecords() {
+    return core_->takeLogRecords();
+}
+std::size_t Broker::unreleasedClones() const {
+    return core_->unreleasedClones();
+}
+std::size_t Broker::quarantined() const {
+    return core_->quarantined();
 }
 
 }  // namespace cmpihost

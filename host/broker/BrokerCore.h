@@ -1,41 +1,58 @@
-// What stands behind a CMPIBroker: tables, objects, findings. Internal.
-#pragma once
+#ifndef HOST_BROKER_BROKER_CORE_H
+#define HOST_BROKER_BROKER_CORE_H
 
 #include "host/broker/Arena.h"
 #include "host/broker/Broker.h"
-#include "host/broker/Object.h"
 
 #include <atomic>
-#include <map>
 #include <mutex>
+#include <optional>
 #include <unordered_map>
 
+/// What stands behind a CMPIBroker: tables, objects, findings. Internal.
 namespace cmpihost {
 
-/// One open request of a thread.
-struct Scope {
-    BrokerCore* core = nullptr;
-    /// Of the outermost open request of this broker on this thread.
-    Arena* arena = nullptr;
-    Scope* outer = nullptr;
-    std::vector<std::string> violations{};
-    /// What attachThread opened; null for any other scope.
-    class RequestScope* attached = nullptr;
-};
+/// A request or an attached thread, on the calling thread from construction to end(). Scopes nest;
+/// the outermost one of a broker on a thread holds the objects.
+class RequestScope {
+  public:
+    enum class Kind { Request, AttachedThread };
 
-/// The innermost request of the calling thread, of any broker; null: none is open.
-Scope*& innermostScope() noexcept;
+    explicit RequestScope(BrokerCore& core, Kind kind = Kind::Request);
+    ~RequestScope() { end(); }
+    RequestScope(const RequestScope&) = delete;
+    RequestScope& operator=(const RequestScope&) = delete;
+
+    /// Later calls do nothing.
+    void end() noexcept;
+
+    BrokerCore& core() const noexcept { return core_; }
+    Kind kind() const noexcept { return kind_; }
+    Arena& arena() const noexcept { return *arena_; }
+    RequestScope* outer() const noexcept { return outer_; }
+    /// What the broker caught on this thread since construction.
+    std::vector<std::string>& violations() noexcept { return violations_; }
+
+    /// The innermost scope of the calling thread, of any broker; null: none is open.
+    static RequestScope* innermost() noexcept;
+
+  private:
+    BrokerCore& core_;
+    Kind kind_;
+    bool open_ = true;
+    RequestScope* outer_;
+    std::optional<Arena> own_;
+    Arena* arena_;
+    std::vector<std::string> violations_;
+};
 
 class BrokerCore {
   public:
     BrokerCore(Broker& owner, const ClassCatalogue* catalogue, BrokerOptions options);
-    ~BrokerCore();
-    BrokerCore(const BrokerCore&) = delete;
-    BrokerCore& operator=(const BrokerCore&) = delete;
 
     Broker& owner() const noexcept { return owner_; }
     const CMPIBroker* cmpi() const noexcept { return &broker_; }
-    const BrokerOptions& options() const noexcept { return options_; }
+    bool isSparse() const noexcept { return options_.shape == BrokerOptions::Shape::Sparse; }
     const ClassCatalogue* catalogue() const noexcept { return catalogue_; }
     /// The declaration of a class, null if there is none or no catalogue.
     const ClassDeclaration* declaration(std::string_view className) const;
@@ -44,7 +61,7 @@ class BrokerCore {
     /// broker, and that is a violation.
     template <class Edt>
     Object<Edt>* make(typename Object<Edt>::Body body) {
-        auto object = std::make_unique<Object<Edt>>(*this, shape_, std::move(body));
+        auto object = std::make_unique<Object<Edt>>(*this, isSparse(), std::move(body));
         Object<Edt>* const result = object.get();
         adopt(std::move(object));
         return result;
@@ -53,27 +70,30 @@ class BrokerCore {
     /// A new object that belongs to the provider until it is released.
     template <class Edt>
     Object<Edt>* makeClone(typename Object<Edt>::Body body) {
-        auto object = std::make_unique<Object<Edt>>(*this, shape_, std::move(body));
+        auto object = std::make_unique<Object<Edt>>(*this, isSparse(), std::move(body));
         Object<Edt>* const result = object.get();
         adoptClone(std::move(object));
         return result;
     }
     /// Ends an object before its time, whoever owns it.
-    void giveBack(const Shell& shell) noexcept;
+    void releaseObject(const ObjectBase& object) noexcept;
 
     /// Where objects of the calling thread go; null: it has no open request of this broker.
     Arena* threadArena() const noexcept;
 
-    /// Takes the shells of a request that ended.
-    void quarantine(Shells shells) noexcept { quarantine_.take(std::move(shells)); }
-
-    /// Memory services within the thread's request.
+    /// Calls function(arena) with the arena of the thread's request, or with the broker's own.
     template <class Function>
     auto withArena(Function function) {
         if (Arena* const arena = threadArena()) return function(*arena);
-        const std::lock_guard<std::mutex> lock(strayMutex_);
-        return function(strays_);
+        const std::lock_guard<std::mutex> lock(unownedMutex_);
+        return function(unowned_);
     }
+
+    /// Ends the objects of a request.
+    void endRequest(Arena& arena) noexcept {
+        quarantine_.take(arena.endRequest(options_.quarantine));
+    }
+    void quarantine(Objects retired) noexcept { quarantine_.take(std::move(retired)); }
 
     void report(std::string violation) noexcept;
     void log(LogRecord record);
@@ -86,25 +106,24 @@ class BrokerCore {
     }
     void setFaultPlan(FaultPlan* plan) noexcept { plan_.store(plan, std::memory_order_release); }
 
-    void route(std::string className, UpcallService& service);
+    void route(const std::string& className, UpcallService& service);
     UpcallAnswer perform(const OperationRequest& request);
 
     std::vector<std::string> violations(bool take);
-    std::vector<LogRecord> logRecords(bool take);
+    std::vector<LogRecord> takeLogRecords();
     std::size_t unreleasedClones() const;
     std::size_t quarantined() const { return quarantine_.size(); }
 
   private:
-    void adopt(std::unique_ptr<Shell> shell);
-    void adoptClone(std::unique_ptr<Shell> shell);
+    void adopt(std::unique_ptr<ObjectBase> object);
+    void adoptClone(std::unique_ptr<ObjectBase> object);
     static CMPIrc inject(FaultPlan& plan, const CallName& call);
     UpcallService* serviceFor(const OperationRequest& request) const;
-    UpcallService* service(const std::string& className) const;
+    UpcallService* serviceOf(const std::string& className) const;
 
     Broker& owner_;
     const ClassCatalogue* const catalogue_;
     const BrokerOptions options_;
-    const std::size_t shape_;
 
     CMPIBrokerFT upcalls_;
     CMPIBrokerEncFT factories_;
@@ -120,27 +139,20 @@ class BrokerCore {
     std::vector<LogRecord> log_;
 
     mutable std::mutex cloneMutex_;
-    std::unordered_map<const Shell*, std::unique_ptr<Shell>> clones_;
+    std::unordered_map<const ObjectBase*, std::unique_ptr<ObjectBase>> clones_;
 
-    std::mutex strayMutex_;
-    Arena strays_;
+    std::mutex unownedMutex_;
+    /// What was made outside of requests.
+    Arena unowned_;
     Quarantine quarantine_;
 };
 
-/// What release and clone do for every kind.
-template <class Edt>
-CMPIStatus release(Object<Edt>& object) {
-    if (object.arena() != nullptr) {
-        object.core().report(object.describe() + " released that belongs to the object manager");
-        return statusOf(CMPI_RC_ERR_INVALID_HANDLE);
-    }
-    object.core().giveBack(object);
-    return statusOf(CMPI_RC_OK);
-}
-
-template <class Edt>
-Edt* clone(const Object<Edt>& object, CMPIStatus*) {
-    return object.core().template makeClone<Edt>(object.body);
-}
+/// The tables of a broker. A sparse one lacks slots.
+CMPIBrokerFT upcallTable(bool sparse);
+CMPIBrokerEncFT factoryTable(bool sparse);
+CMPIBrokerExtFT threadTable(bool sparse);
+CMPIBrokerMemFT memoryTable();
 
 }  // namespace cmpihost
+
+#endif

@@ -1,32 +1,32 @@
+// A schema may begin in the middle of a model: that a class has a superclass which nobody declares
+// is common, so that "unrelated" and "not known" are different answers.
 #include "host/broker/ClassCatalogue.h"
 
-#include "host/broker/Value.h"
-
-#include <algorithm>
+#include "base/Ascii.h"
 
 namespace cmpihost {
 
-const PropertyDeclaration* ClassDeclaration::property(
-    std::string_view propertyName) const noexcept {
-    const auto found = std::find_if(properties.begin(), properties.end(),
-                                    [propertyName](const PropertyDeclaration& candidate) {
-                                        return equalNames(candidate.name, propertyName);
-                                    });
-    return found == properties.end() ? nullptr : &*found;
+const PropertyDeclaration* ClassDeclaration::property(std::string_view propertyName) const {
+    for (const PropertyDeclaration& declared : properties) {
+        if (base::equalsIgnoreCase(declared.name, propertyName)) return &declared;
+    }
+    return nullptr;
 }
 
-Kinship kinship(const ClassCatalogue* catalogue, std::string_view className,
-                std::string_view ancestor) {
-    if (equalNames(className, ancestor)) return Kinship::Same;
-    if (catalogue == nullptr) return Kinship::Unknown;
+ClassRelation classRelation(const ClassCatalogue* catalogue, std::string_view className,
+                            std::string_view ancestor) {
+    if (base::equalsIgnoreCase(className, ancestor)) return ClassRelation::Same;
+    if (catalogue == nullptr) return ClassRelation::Unknown;
 
     const ClassDeclaration* declaration = catalogue->find(className);
     while (declaration != nullptr) {
-        if (declaration->superclass.empty()) return Kinship::Unrelated;
-        if (equalNames(declaration->superclass, ancestor)) return Kinship::Below;
+        if (declaration->superclass.empty()) return ClassRelation::Unrelated;
+        if (base::equalsIgnoreCase(declaration->superclass, ancestor)) {
+            return ClassRelation::Subclass;
+        }
         declaration = catalogue->find(declaration->superclass);
     }
-    return Kinship::Unknown;
+    return ClassRelation::Unknown;
 }
 
 }  // namespace cmpihost

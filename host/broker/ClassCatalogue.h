@@ -1,5 +1,5 @@
-// The schema as the broker needs it: which classes there are and what they declare.
-#pragma once
+#ifndef HOST_BROKER_CLASS_CATALOGUE_H
+#define HOST_BROKER_CLASS_CATALOGUE_H
 
 #include <cmpi/cmpidt.h>
 
@@ -7,6 +7,7 @@
 #include <string_view>
 #include <vector>
 
+/// The schema as the broker needs it: which classes there are and what they declare.
 namespace cmpihost {
 
 struct PropertyDeclaration {
@@ -27,7 +28,7 @@ struct ClassDeclaration {
     std::vector<PropertyDeclaration> properties{};
 
     /// The declaration of a property (name without case), null if there is none.
-    const PropertyDeclaration* property(std::string_view propertyName) const noexcept;
+    const PropertyDeclaration* property(std::string_view propertyName) const;
 };
 
 /// Finds class declarations. Any thread may call it, several at once.
@@ -45,11 +46,14 @@ class ClassCatalogue {
     ClassCatalogue& operator=(const ClassCatalogue&) = default;
 };
 
-enum class Kinship { Same, Below, Unrelated, Unknown };
+/// How a class stands to another one. Unknown: the chain of superclasses leaves the catalogue
+/// before it can be told.
+enum class ClassRelation { Same, Subclass, Unrelated, Unknown };
 
-/// How `className` stands to `ancestor`. Unknown: the chain of superclasses leaves the catalogue
-/// before it can be told. A null catalogue knows only equal names.
-Kinship kinship(const ClassCatalogue* catalogue, std::string_view className,
-                std::string_view ancestor);
+/// The relation of `className` to `ancestor`. A null catalogue knows only equal names.
+ClassRelation classRelation(const ClassCatalogue* catalogue, std::string_view className,
+                            std::string_view ancestor);
 
 }  // namespace cmpihost
+
+#endif

@@ -1,11 +1,12 @@
-// The computer systems that another provider of the same object manager would serve.
-#pragma once
+#ifndef HOST_BROKER_COMPUTER_SYSTEM_SERVICE_H
+#define HOST_BROKER_COMPUTER_SYSTEM_SERVICE_H
 
-#include "host/broker/UpcallService.h"
+#include "host/broker/Broker.h"
 
 #include <string>
 #include <vector>
 
+/// The computer systems that another provider of the same object manager would serve.
 namespace cmpihost {
 
 /// Serves instances of KORVA_ComputerSystem with the keys Name and CreationClassName. Settings are
@@ -38,3 +39,5 @@ class ComputerSystemService final : public UpcallService {
 };
 
 }  // namespace cmpihost
+
+#endif

@@ -1,3 +1,5 @@
+// A provider passes the address of a variable of its own type, so that no byte beyond that type's
+// may be read; everything else is copied between a member of CMPIValue and the value model.
 #include "host/broker/Conversion.h"
 
 #include <cstring>
@@ -6,7 +8,6 @@ namespace cmpihost {
 
 namespace {
 
-/// Reads only the bytes of T: the provider passes the address of a variable of that size.
 template <class T>
 T bytesAt(const CMPIValue* value) noexcept {
     T result;
@@ -14,143 +15,99 @@ T bytesAt(const CMPIValue* value) noexcept {
     return result;
 }
 
-template <class T>
-Value unsignedAt(const CMPIValue* value, CMPIType type) {
-    return Value::fromUnsigned(bytesAt<T>(value), type);
-}
-
-template <class T>
-Value signedAt(const CMPIValue* value, CMPIType type) {
-    return Value::fromSigned(bytesAt<T>(value), type);
-}
-
-Value textAt(const char* text) {
-    return text == nullptr ? Value::null(CMPI_string) : Value(text);
-}
-
-Value stringAt(const CMPIString* string, const CallName& call) {
-    return string == nullptr ? Value::null(CMPI_string)
-                             : textAt(fromHandle(string, call).body.get());
-}
-
-Value arrayAt(const CMPIArray* array, CMPIType type, const CallName& call) {
-    if (array == nullptr) return Value::null(type);
-    const auto& body = fromHandle(array, call).body;
-    const auto wanted = static_cast<CMPIType>(type & ~CMPI_ARRAY);
-    const auto isText = [](CMPIType t) { return t == CMPI_string || t == CMPI_chars; };
-    if (body.elementType != wanted && !(isText(body.elementType) && isText(wanted))) {
-        throw Failure{CMPI_RC_ERR_TYPE_MISMATCH};
-    }
-    return Value::fromArray(body.elementType, body.elements);
-}
-
-Value objectAt(const CMPIValue* value, CMPIType type, const CallName& call) {
-    if (type == CMPI_ref) {
-        const auto* path = bytesAt<CMPIObjectPath*>(value);
-        return path == nullptr ? Value::null(type)
-                               : Value::fromReference(fromHandle(path, call).body);
-    }
-    if (type == CMPI_instance) {
-        const auto* instance = bytesAt<CMPIInstance*>(value);
-        return instance == nullptr ? Value::null(type)
-                                   : Value::fromInstance(fromHandle(instance, call).body.value);
-    }
-    const auto* dateTime = bytesAt<CMPIDateTime*>(value);
-    return dateTime == nullptr ? Value::null(type)
-                               : Value::fromText(fromHandle(dateTime, call).body, CMPI_dateTime);
-}
-
-Value scalarAt(const CMPIValue* value, CMPIType type) {
+/// Calls use(member of CMPIValue) for the type of a scalar; false: it is no scalar.
+template <class Use>
+bool withScalarMember(CMPIType type, const Use& use) {
     switch (type) {
         case CMPI_boolean:
-            return Value::fromBoolean(bytesAt<CMPIBoolean>(value) != 0);
+            return use(&CMPIValue::boolean), true;
         case CMPI_char16:
-            return unsignedAt<CMPIChar16>(value, type);
+            return use(&CMPIValue::char16), true;
         case CMPI_uint8:
-            return unsignedAt<CMPIUint8>(value, type);
+            return use(&CMPIValue::uint8), true;
         case CMPI_uint16:
-            return unsignedAt<CMPIUint16>(value, type);
+            return use(&CMPIValue::uint16), true;
         case CMPI_uint32:
-            return unsignedAt<CMPIUint32>(value, type);
+            return use(&CMPIValue::uint32), true;
         case CMPI_uint64:
-            return unsignedAt<CMPIUint64>(value, type);
+            return use(&CMPIValue::uint64), true;
         case CMPI_sint8:
-            return signedAt<CMPISint8>(value, type);
+            return use(&CMPIValue::sint8), true;
         case CMPI_sint16:
-            return signedAt<CMPISint16>(value, type);
+            return use(&CMPIValue::sint16), true;
         case CMPI_sint32:
-            return signedAt<CMPISint32>(value, type);
+            return use(&CMPIValue::sint32), true;
         case CMPI_sint64:
-            return signedAt<CMPISint64>(value, type);
+            return use(&CMPIValue::sint64), true;
         case CMPI_real32:
-            return Value::fromReal(bytesAt<CMPIReal32>(value), type);
+            return use(&CMPIValue::real32), true;
         case CMPI_real64:
-            return Value::fromReal(bytesAt<CMPIReal64>(value), type);
+            return use(&CMPIValue::real64), true;
         case CMPI_ptr:
-            return Value::fromPointer(bytesAt<CMPIValuePtr>(value));
+            return use(&CMPIValue::dataPtr), true;
         default:
-            throw Failure{CMPI_RC_ERR_INVALID_DATA_TYPE};
+            return false;
     }
 }
 
-void writeUnsigned(CMPIValue& target, std::uint64_t value, CMPIType type) noexcept {
-    switch (type) {
-        case CMPI_char16:
-            target.char16 = static_cast<CMPIChar16>(value);
-            break;
-        case CMPI_uint8:
-            target.uint8 = static_cast<CMPIUint8>(value);
-            break;
-        case CMPI_uint16:
-            target.uint16 = static_cast<CMPIUint16>(value);
-            break;
-        case CMPI_uint32:
-            target.uint32 = static_cast<CMPIUint32>(value);
-            break;
-        default:
-            target.uint64 = value;
-    }
-}
+template <class Member>
+using MemberType = std::decay_t<decltype(std::declval<CMPIValue>().*std::declval<Member>())>;
 
-void writeSigned(CMPIValue& target, std::int64_t value, CMPIType type) noexcept {
-    switch (type) {
-        case CMPI_sint8:
-            target.sint8 = static_cast<CMPISint8>(value);
-            break;
-        case CMPI_sint16:
-            target.sint16 = static_cast<CMPISint16>(value);
-            break;
-        case CMPI_sint32:
-            target.sint32 = static_cast<CMPISint32>(value);
-            break;
-        default:
-            target.sint64 = value;
-    }
+Value readScalar(const CMPIValue* value, CMPIType type) {
+    Value result;
+    const bool known = withScalarMember(type, [&](auto member) {
+        using T = MemberType<decltype(member)>;
+        const T content = bytesAt<T>(value);
+        if constexpr (std::is_same_v<T, CMPIValuePtr>) {
+            result = Value::fromPointer(content);
+        } else if constexpr (std::is_floating_point_v<T>) {
+            result = Value::fromReal(content, type);
+        } else if constexpr (std::is_signed_v<T>) {
+            result = Value::fromSigned(content, type);
+        } else if (type == CMPI_boolean) {
+            result = Value::fromBoolean(content != 0);
+        } else {
+            result = Value::fromUnsigned(content, type);
+        }
+    });
+    if (!known) throw Failure{CMPI_RC_ERR_INVALID_DATA_TYPE};
+    return result;
 }
 
 void writeScalar(CMPIValue& target, const Value& value) {
-    switch (value.type()) {
-        case CMPI_boolean:
-            target.boolean = value.boolean();
-            break;
-        case CMPI_real32:
-            target.real32 = static_cast<CMPIReal32>(value.real());
-            break;
-        case CMPI_real64:
-            target.real64 = value.real();
-            break;
-        case CMPI_ptr:
-            target.dataPtr = value.pointer();
-            break;
-        case CMPI_sint8:
-        case CMPI_sint16:
-        case CMPI_sint32:
-        case CMPI_sint64:
-            writeSigned(target, value.signedInteger(), value.type());
-            break;
-        default:
-            writeUnsigned(target, value.unsignedInteger(), value.type());
-    }
+    withScalarMember(value.type(), [&](auto member) {
+        using T = MemberType<decltype(member)>;
+        if constexpr (std::is_same_v<T, CMPIValuePtr>) {
+            target.*member = value.pointer();
+        } else if constexpr (std::is_floating_point_v<T>) {
+            target.*member = static_cast<T>(value.real());
+        } else if constexpr (std::is_signed_v<T>) {
+            target.*member = static_cast<T>(value.signedInteger());
+        } else if (value.type() == CMPI_boolean) {
+            target.*member = value.boolean();
+        } else {
+            target.*member = static_cast<T>(value.unsignedInteger());
+        }
+    });
+}
+
+Value readText(const char* text) {
+    return text == nullptr ? Value::null(CMPI_string) : Value(text);
+}
+
+Value readArray(const CMPIArray* array, CMPIType type, const CallName& call) {
+    if (array == nullptr) return Value::null(type);
+    const auto& body = fromHandle(array, call).body;
+    const auto wanted = storedType(static_cast<CMPIType>(type & ~CMPI_ARRAY));
+    if (storedType(body.elementType) != wanted) throw Failure{CMPI_RC_ERR_TYPE_MISMATCH};
+    return Value::fromArray(body.elementType, body.elements);
+}
+
+/// The value of a variable that holds a pointer to an object; `read` makes it of the object's body.
+template <class Edt, class Read>
+Value readObject(const CMPIValue* value, CMPIType type, const CallName& call, const Read& read) {
+    const auto* const object = bytesAt<Edt*>(value);
+    return object == nullptr ? Value::null(type) : read(fromHandle(object, call).body);
 }
 
 void writeText(BrokerCore& core, CMPIValue& target, const Value& value) {
@@ -160,27 +117,39 @@ void writeText(BrokerCore& core, CMPIValue& target, const Value& value) {
         // The characters live as long as the string that holds them.
         target.chars = core.make<CMPIString>(Characters(value.text()))->body.get();
     } else {
-        target.string = core.make<CMPIString>(Characters(value.text()));
+        target.string = makeString(core, value.text());
     }
 }
 
 }  // namespace
 
+CMPIType storedType(CMPIType type) noexcept {
+    return type == CMPI_chars || type == CMPI_charsptr ? CMPIType{CMPI_string} : type;
+}
+
 Value readValue(const CMPIValue* value, CMPIType type, const CallName& call) {
-    if (type == CMPI_chars) return textAt(reinterpret_cast<const char*>(value));
+    if (type == CMPI_chars) return readText(reinterpret_cast<const char*>(value));
     if (value == nullptr) return Value::null(type);
-    if ((type & CMPI_ARRAY) != 0) return arrayAt(bytesAt<CMPIArray*>(value), type, call);
+    if ((type & CMPI_ARRAY) != 0) return readArray(bytesAt<CMPIArray*>(value), type, call);
     switch (type) {
-        case CMPI_string:
-            return stringAt(bytesAt<CMPIString*>(value), call);
         case CMPI_charsptr:
-            return textAt(bytesAt<char*>(value));
+            return readText(bytesAt<char*>(value));
+        case CMPI_string:
+            return readObject<CMPIString>(value, type, call,
+                                          [](const auto& body) { return readText(body.get()); });
         case CMPI_ref:
+            return readObject<CMPIObjectPath>(
+                value, type, call, [](const auto& body) { return Value::fromReference(body); });
         case CMPI_instance:
+            return readObject<CMPIInstance>(value, type, call, [](const auto& body) {
+                return Value::fromInstance(body.value);
+            });
         case CMPI_dateTime:
-            return objectAt(value, type, call);
+            return readObject<CMPIDateTime>(value, type, call, [](const auto& body) {
+                return Value::fromText(body, CMPI_dateTime);
+            });
         default:
-            return scalarAt(value, type);
+            return readScalar(value, type);
     }
 }
 
@@ -213,6 +182,11 @@ CMPIInstance* makeInstance(BrokerCore& core, std::shared_ptr<InstanceValue> valu
     body.declaration = core.declaration(value->path.className);
     body.value = std::move(value);
     return core.make<CMPIInstance>(std::move(body));
+}
+
+CMPIArray* makeArray(BrokerCore& core, CMPIType elementType, std::vector<Value> elements) {
+    return core.make<CMPIArray>(
+        {elementType, std::make_shared<std::vector<Value>>(std::move(elements))});
 }
 
 std::optional<std::string> optionalText(const char* text) {

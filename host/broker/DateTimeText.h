@@ -1,11 +1,12 @@
-// CIM datetimes: 25 characters of text and microseconds.
-#pragma once
+#ifndef HOST_BROKER_DATE_TIME_TEXT_H
+#define HOST_BROKER_DATE_TIME_TEXT_H
 
 #include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
 
+/// CIM datetimes: 25 characters of text and microseconds.
 namespace cmpihost {
 
 struct DateTimeBinary {
@@ -24,3 +25,5 @@ std::optional<DateTimeBinary> parseDateTime(std::string_view text) noexcept;
 std::optional<std::string> formatDateTime(std::uint64_t microseconds, bool interval);
 
 }  // namespace cmpihost
+
+#endif

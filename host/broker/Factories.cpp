@@ -1,14 +1,10 @@
-// CMPIBrokerEncFT: makes objects and examines them.
-#include "host/broker/AnyObject.h"
-#include "host/broker/BrokerTables.h"
+// CMPIBrokerEncFT: makes objects, tells about objects of any kind, and takes messages.
+#include "host/broker/ClassCatalogue.h"
 #include "host/broker/Conversion.h"
 #include "host/broker/DateTimeText.h"
-#include "host/broker/Entry.h"
-#include "host/broker/MessageText.h"
-#include "host/broker/NamedItems.h"
-#include "host/broker/SelectQuery.h"
 
 #include <chrono>
+#include <cstdarg>
 #include <cstring>
 
 namespace cmpihost {
@@ -29,7 +25,7 @@ CMPIInstance* newInstance(BrokerCore& core, const CallName& call, const CMPIObje
     }
     body.value = std::make_shared<InstanceValue>();
     body.value->path = given;
-    if (core.options().keysBecomeProperties) {
+    if (core.isSparse()) {
         for (const KeyBinding& key : given.keys) {
             putNamed(body.value->properties, key.name, key.value);
         }
@@ -57,10 +53,8 @@ CMPIArray* newArray(BrokerCore& core, CMPICount size, CMPIType type, CMPIStatus*
     if (size > mostElements || (type & CMPI_ARRAY) != 0 || type == CMPI_null) {
         return refuse(status, CMPI_RC_ERR_INVALID_PARAMETER);
     }
-    const CMPIType stored =
-        type == CMPI_chars || type == CMPI_charsptr ? CMPIType{CMPI_string} : type;
-    return core.make<CMPIArray>(
-        {stored, std::make_shared<std::vector<Value>>(size, Value::null(stored))});
+    const CMPIType stored = storedType(type);
+    return makeArray(core, stored, std::vector<Value>(size, Value::null(stored)));
 }
 
 CMPIDateTime* dateTime(BrokerCore& core, CMPIUint64 microseconds, bool interval,
@@ -88,45 +82,102 @@ CMPIDateTime* newDateTimeFromChars(BrokerCore& core, const CallName& call, const
     return core.make<CMPIDateTime>(std::string(given));
 }
 
+/// Queries go to providers as text; the broker itself understands none.
 CMPISelectExp* newSelectExp(BrokerCore& core, const CallName& call, const char* query,
                             const char* language, CMPIArray** projection, CMPIStatus* status) {
-    const std::string_view dialect = required(core, language, call, "language");
-    if (!equalNames(dialect, "WQL") && !equalNames(dialect, "CIM:CQL") &&
-        !equalNames(dialect, "DMTF:CQL")) {
-        return refuse(status, CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED);
-    }
-    const std::string text = required(core, query, call, "query");
-    const auto parsed = parseSelect(text);
-    if (!parsed) return refuse(status, CMPI_RC_ERR_INVALID_QUERY);
-    if (projection != nullptr) {
-        const auto& names = parsed->projection;
-        *projection = names.empty()
-                          ? nullptr
-                          : core.make<CMPIArray>({CMPI_string, std::make_shared<std::vector<Value>>(
-                                                                   names.begin(), names.end())});
-    }
-    return core.make<CMPISelectExp>({text, parsed->className, parsed->hasCondition});
+    required(core, language, call, "language");
+    required(core, query, call, "query");
+    if (projection != nullptr) *projection = nullptr;
+    return refuse(status, CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 CMPIBoolean classPathIsA(BrokerCore& core, const CallName& call, const CMPIObjectPath* path,
                          const char* className, CMPIStatus*) {
     const ObjectPathValue& given = *fromHandle(path, call).body;
-    const Kinship kin =
-        kinship(core.catalogue(), given.className, required(core, className, call, "class name"));
-    return kin == Kinship::Same || kin == Kinship::Below;
+    const ClassRelation relation = classRelation(core.catalogue(), given.className,
+                                                 required(core, className, call, "class name"));
+    return relation == ClassRelation::Same || relation == ClassRelation::Subclass;
+}
+
+std::string render(const Value& value) {
+    return value.isText() ? '"' + value.text() + '"' : value.toText();
+}
+
+template <class Items>
+std::string renderItems(const Items& items) {
+    std::string text = "{";
+    for (const auto& item : items) {
+        if (text.size() > 1) text += ", ";
+        text += item.name + '=' + render(item.value);
+    }
+    return text + "}";
+}
+
+/// A rendering of an object for people.
+template <class Edt>
+std::string render(const Object<Edt>& object) {
+    if constexpr (std::is_same_v<Edt, CMPIString>) {
+        return object.body.get() == nullptr ? "" : object.body.get();
+    } else if constexpr (std::is_same_v<Edt, CMPIObjectPath>) {
+        return toString(*object.body);
+    } else if constexpr (std::is_same_v<Edt, CMPIInstance>) {
+        const InstanceValue& value = *object.body.value;
+        return toString(value.path) + ' ' + renderItems(value.properties);
+    } else if constexpr (std::is_same_v<Edt, CMPIArray>) {
+        return Value::fromArray(object.body.elementType, object.body.elements).toText();
+    } else if constexpr (std::is_same_v<Edt, CMPIArgs> || std::is_same_v<Edt, CMPIContext>) {
+        return renderItems(object.body);
+    } else if constexpr (std::is_same_v<Edt, CMPIDateTime>) {
+        return object.body;
+    } else {
+        return object.describe();
+    }
+}
+
+/// What a question about an object of any kind is answered with.
+struct ObjectFacts {
+    std::string_view kind;
+    std::string text;
+};
+
+/// Looks at the handle as one of that kind; none if its table is that of another kind.
+template <class Edt>
+std::optional<ObjectFacts> asKind(const void* handle, const CallName& call) {
+    // Any object is a pair {hdl, ft}.
+    const void* pair[2];
+    std::memcpy(pair, handle, sizeof pair);
+    const auto* const table = static_cast<const typename ObjectTraits<Edt>::Table*>(pair[1]);
+    const Tables<Edt>& tables = tablesOf<Edt>();
+    if (!tables.isLive(table) && table != &tables.retired) return std::nullopt;
+    return ObjectFacts{kindName<Edt>, render(fromHandle(static_cast<const Edt*>(handle), call))};
+}
+
+template <class... Edts>
+ObjectFacts asAnyOf(const void* handle, const CallName& call) {
+    for (const auto look : {&asKind<Edts>...}) {
+        if (const auto found = look(handle, call)) return *found;
+    }
+    refuseForeign(call, "object");
+}
+
+/// Null, retired and foreign pointers are violations and throw Failure.
+ObjectFacts factsOf(const void* handle, const CallName& call) {
+    if (handle == nullptr) refuseNull(call, "object");
+    return asAnyOf<CMPIString, CMPIObjectPath, CMPIInstance, CMPIArray, CMPIArgs, CMPIContext,
+                   CMPIDateTime, CMPIEnumeration, CMPIResult>(handle, call);
 }
 
 CMPIString* objectText(BrokerCore& core, const CallName& call, const void* object, CMPIStatus*) {
-    return makeString(core, anyObject(object, call).text);
+    return makeString(core, factsOf(object, call).text);
 }
 
 CMPIBoolean isOfType(BrokerCore& core, const CallName& call, const void* object, const char* name,
                      CMPIStatus*) {
-    return std::strcmp(anyObject(object, call).kind, required(core, name, call, "type name")) == 0;
+    return factsOf(object, call).kind == required(core, name, call, "type name");
 }
 
 CMPIString* getType(BrokerCore& core, const CallName& call, const void* object, CMPIStatus*) {
-    return makeString(core, anyObject(object, call).kind);
+    return makeString(core, factsOf(object, call).kind);
 }
 
 /// A text, or the string in its place.
@@ -144,27 +195,73 @@ CMPIStatus record(BrokerCore& core, const CallName& call, int severity, const ch
     return statusOf(CMPI_RC_OK);
 }
 
-CMPIError* newCMPIError(BrokerCore& core, const char* owner, const char* id, const char* message,
-                        CMPIErrorSeverity severity, CMPIErrorProbableCause cause, CMPIrc code,
-                        CMPIStatus*) {
-    ErrorBody body;
-    body.owner = optionalText(owner);
-    body.id = optionalText(id);
-    body.message = optionalText(message);
-    body.severity = severity;
-    body.cause = cause;
-    body.code = code;
-    return core.make<CMPIError>(std::move(body));
-}
-
 /// There are no message files: texts come from the provider's defaults.
 CMPIStatus openMessageFile(BrokerCore&, const char*, CMPIMsgFileHandle* handle) {
     if (handle != nullptr) *handle = nullptr;
     return statusOf(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
-CMPIStatus closeMessageFile(BrokerCore&, CMPIMsgFileHandle) {
-    return statusOf(CMPI_RC_ERR_NOT_SUPPORTED);
+std::string textOrNull(const char* text) {
+    return text == nullptr ? "NULL" : text;
+}
+
+/// Small integers come widened to int, as C passes them.
+std::string messageArgument(CMPIType type, std::va_list& arguments, const CallName& call) {
+    switch (type) {
+        case CMPI_sint8:
+        case CMPI_sint16:
+        case CMPI_sint32:
+            return std::to_string(va_arg(arguments, int));
+        case CMPI_uint8:
+        case CMPI_uint16:
+        case CMPI_uint32:
+        case CMPI_char16:
+            return std::to_string(va_arg(arguments, unsigned int));
+        case CMPI_sint64:
+            return std::to_string(va_arg(arguments, CMPISint64));
+        case CMPI_uint64:
+            return std::to_string(va_arg(arguments, CMPIUint64));
+        case CMPI_real32:
+        case CMPI_real64:
+            return Value::fromReal(va_arg(arguments, double)).toText();
+        case CMPI_boolean:
+            return va_arg(arguments, int) != 0 ? "true" : "false";
+        case CMPI_chars:
+            return textOrNull(va_arg(arguments, const char*));
+        case CMPI_string: {
+            const auto* const string = va_arg(arguments, const CMPIString*);
+            return string == nullptr ? "NULL" : textOrNull(fromHandle(string, call).body.get());
+        }
+        default:
+            throw Failure{CMPI_RC_ERR_INVALID_DATA_TYPE};
+    }
+}
+
+/// The arguments $0 to $9 of a text, from pairs of type and value.
+std::vector<std::string> messageArguments(CMPICount count, std::va_list& arguments,
+                                          const CallName& call) {
+    if (count > 10) throw Failure{CMPI_RC_ERR_INVALID_PARAMETER};
+    std::vector<std::string> result;
+    for (CMPICount i = 0; i < count; ++i) {
+        const auto type = static_cast<CMPIType>(va_arg(arguments, int));
+        result.push_back(messageArgument(type, arguments, call));
+    }
+    return result;
+}
+
+/// The text with every $n replaced by argument n, where there is one.
+std::string expandMessage(const char* text, const std::vector<std::string>& arguments) {
+    std::string result;
+    for (const char* at = text; *at != '\0'; ++at) {
+        const auto index = static_cast<std::size_t>(at[0] == '$' ? at[1] - '0' : -1);
+        if (index < arguments.size()) {
+            result += arguments[index];
+            ++at;
+        } else {
+            result += *at;
+        }
+    }
+    return result;
 }
 
 CMPIString* expanded(const CMPIBroker* broker, const CallName& call, const char* text,
@@ -201,7 +298,10 @@ CMPIString* getMessage2(const CMPIBroker* broker, const char*, CMPIMsgFileHandle
 
 using FT = CMPIBrokerEncFT;
 
-void bindConstructors(FT& table) {
+FT completeTable() {
+    using Text = const char*;
+    FT table{};
+    table.ftVersion = CMPICurrentVersion;
     bind<&FT::newInstance, &newInstance>(table, "newInstance");
     bind<&FT::newObjectPath, &newObjectPath>(table, "newObjectPath");
     bind<&FT::newArgs, &newArgs>(table, "newArgs");
@@ -211,25 +311,35 @@ void bindConstructors(FT& table) {
     bind<&FT::newDateTimeFromBinary, &newDateTimeFromBinary>(table, "newDateTimeFromBinary");
     bind<&FT::newDateTimeFromChars, &newDateTimeFromChars>(table, "newDateTimeFromChars");
     bind<&FT::newSelectExp, &newSelectExp>(table, "newSelectExp");
-    bind<&FT::newCMPIError, &newCMPIError>(table, "newCMPIError");
-}
-
-}  // namespace
-
-CMPIBrokerEncFT factoryTable() {
-    FT table{};
-    table.ftVersion = CMPICurrentVersion;
-    bindConstructors(table);
     bind<&FT::classPathIsA, &classPathIsA>(table, "classPathIsA");
     bind<&FT::toString, &objectText>(table, "toString");
     bind<&FT::isOfType, &isOfType>(table, "isOfType");
     bind<&FT::getType, &getType>(table, "getType");
     bind<&FT::logMessage, &record<LogRecord::Channel::Log>>(table, "logMessage");
     bind<&FT::trace, &record<LogRecord::Channel::Trace>>(table, "trace");
-    bind<&FT::openMessageFile, &openMessageFile>(table, "openMessageFile");
-    bind<&FT::closeMessageFile, &closeMessageFile>(table, "closeMessageFile");
     table.getMessage = &getMessage;
+    bind<&FT::newCMPIError,
+         &notSupported<CMPIError*, BrokerCore, Text, Text, Text, CMPIErrorSeverity,
+                       CMPIErrorProbableCause, CMPIrc, CMPIStatus*>>(table, "newCMPIError");
+    bind<&FT::openMessageFile, &openMessageFile>(table, "openMessageFile");
+    bind<&FT::closeMessageFile, &notSupported<CMPIStatus, BrokerCore, CMPIMsgFileHandle>>(
+        table, "closeMessageFile");
     table.getMessage2 = &getMessage2;
+    return table;
+}
+
+}  // namespace
+
+CMPIBrokerEncFT factoryTable(bool sparse) {
+    static const FT complete = completeTable();
+    FT table = complete;
+    if (sparse) {
+        table.ftVersion = 1;
+        table.newCMPIError = nullptr;
+        table.openMessageFile = nullptr;
+        table.closeMessageFile = nullptr;
+        table.getMessage2 = nullptr;
+    }
     return table;
 }
 

@@ -1,3 +1,5 @@
+// Faults count per fault, not per plan: "the second addKey" stays the second addKey whatever else
+// is planned.
 #include "host/broker/FaultPlan.h"
 
 namespace cmpihost {
@@ -57,20 +59,19 @@ std::vector<std::string> FaultPlan::firedCalls() const {
     return fired_;
 }
 
-std::optional<PlannedFailure> FaultPlan::onCall(const char* table, const char* slot) {
+std::optional<FaultPlan::Failure> FaultPlan::onCall(const std::string& call) {
     const std::lock_guard<std::mutex> lock(mutex_);
     ++total_;
-    const std::string call = std::string(table) + '.' + slot;
     ++calls_[call];
 
-    std::optional<PlannedFailure> answer;
+    std::optional<Failure> answer;
     for (Planned& planned : faults_) {
         const Fault& fault = planned.fault;
         if (!names(fault.entry, call)) continue;
         ++planned.seen;
         const bool reached = planned.seen >= fault.nth;
         const bool past = fault.times != 0 && planned.seen - fault.nth >= fault.times;
-        if (reached && !past && !answer) answer = PlannedFailure{fault.rc, fault.withValue};
+        if (reached && !past && !answer) answer = Failure{fault.rc, fault.withValue};
     }
     if (answer) fired_.push_back(call);
     return answer;

@@ -1,5 +1,5 @@
-// Faults on demand: which calls of a provider into the broker fail.
-#pragma once
+#ifndef HOST_BROKER_FAULT_PLAN_H
+#define HOST_BROKER_FAULT_PLAN_H
 
 #include <cmpi/cmpidt.h>
 
@@ -10,6 +10,7 @@
 #include <string_view>
 #include <vector>
 
+/// Faults on demand: which calls of a provider into the broker fail.
 namespace cmpihost {
 
 /// Calls that are to fail. An entry is named as its slot ("newObjectPath", "setProperty",
@@ -28,12 +29,6 @@ struct Fault {
     /// On: the call does its work and hands its value out with `rc` beside it, as some object
     /// managers do.
     bool withValue = false;
-};
-
-/// How one call fails.
-struct PlannedFailure {
-    CMPIrc rc;
-    bool withValue;
 };
 
 /// Counts the calls of all tables by name and decides which of them fail. Attach it with
@@ -58,8 +53,13 @@ class FaultPlan {
     /// "table.slot" of each call that was made to fail, in order.
     std::vector<std::string> firedCalls() const;
 
-    /// For the broker: counts one call and says how it fails, if it does.
-    std::optional<PlannedFailure> onCall(const char* table, const char* slot);
+    /// How one call fails.
+    struct Failure {
+        CMPIrc rc;
+        bool withValue;
+    };
+    /// For the broker: counts a call of "table.slot" and says how it fails, if it does.
+    std::optional<Failure> onCall(const std::string& call);
 
   private:
     struct Planned {
@@ -74,3 +74,5 @@ class FaultPlan {
 };
 
 }  // namespace cmpihost
+
+#endif

@@ -1,3 +1,6 @@
+// The way of one operation: a request is opened, its context and path are made, the slot is called,
+// and what the provider returned is taken out after the request has ended, when nobody else holds
+// it.
 #include "host/broker/Invoke.h"
 
 #include "host/broker/BrokerCore.h"

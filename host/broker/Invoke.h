@@ -1,5 +1,5 @@
-// Runs one operation of a provider, as an object manager does for a client.
-#pragma once
+#ifndef HOST_BROKER_INVOKE_H
+#define HOST_BROKER_INVOKE_H
 
 #include "host/broker/Operation.h"
 #include "host/broker/ProviderLibrary.h"
@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+/// Runs one operation of a provider, as an object manager does for a client.
 namespace cmpihost {
 
 class ResultCollector;
@@ -36,3 +37,5 @@ Outcome invoke(const ProviderLibrary& library, Broker& broker, const OperationRe
                const CollectorSetup& setup = {});
 
 }  // namespace cmpihost
+
+#endif

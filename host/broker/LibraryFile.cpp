@@ -1,5 +1,8 @@
+// The dynamic loader tells little about a file that is no library, and maps one that is cut off, so
+// that its first use ends the process: files are examined before.
 #include "host/broker/LibraryFile.h"
 
+#include <dlfcn.h>
 #include <link.h>
 
 #include <cerrno>
@@ -54,39 +57,57 @@ bool isWhole(std::istream& stream, std::uint64_t fileSize) {
     return true;
 }
 
-FileProblem notALibrary(const std::string& file, const std::string& why) {
+LoadError notALibrary(const std::string& file, const std::string& why) {
     return {LoadProblem::NotALibrary, file + ": " + why};
 }
 
-}  // namespace
-
-std::optional<FileProblem> examineLibraryFile(const std::string& file) {
+void examine(const std::string& file) {
     // A name without folder is searched by the loader.
-    if (file.find('/') == std::string::npos) return std::nullopt;
+    if (file.find('/') == std::string::npos) return;
 
     // Opening a named pipe would wait for its other end.
     std::error_code error;
     const fs::file_status status = fs::status(file, error);
     if (fs::exists(status) && !fs::is_regular_file(status)) {
-        return notALibrary(file, "not a regular file");
+        throw notALibrary(file, "not a regular file");
     }
     std::ifstream stream(file, std::ios::binary);
     if (!stream) {
         const std::error_code reason(errno, std::generic_category());
-        return FileProblem{LoadProblem::FileMissing, file + ": " + reason.message()};
+        throw LoadError(LoadProblem::FileMissing, file + ": " + reason.message());
     }
     ElfStart start{};
     const bool isElf = readAt(stream, 0, start) && std::memcmp(start.ident, ELFMAG, SELFMAG) == 0 &&
                        start.type == ET_DYN;
-    if (!isElf) return notALibrary(file, "not a shared library");
+    if (!isElf) throw notALibrary(file, "not a shared library");
     if (start.ident[EI_CLASS] != ownClass) {
-        return notALibrary(file, std::string("a ") + (is64Bit ? "32" : "64") +
-                                     "-bit library, this host is " + (is64Bit ? "64" : "32") +
-                                     "-bit");
+        throw notALibrary(file, std::string("a ") + (is64Bit ? "32" : "64") +
+                                    "-bit library, this host is " + (is64Bit ? "64" : "32") +
+                                    "-bit");
     }
     const std::uintmax_t size = fs::file_size(file, error);
-    if (error || !isWhole(stream, size)) return notALibrary(file, "the file is cut off");
-    return std::nullopt;
+    if (error || !isWhole(stream, size)) throw notALibrary(file, "the file is cut off");
+}
+
+}  // namespace
+
+void CloseLibrary::operator()(void* handle) const noexcept {
+    dlclose(handle);
+}
+
+LibraryHandle openLibrary(const std::string& file, bool global) {
+    examine(file);
+    LibraryHandle handle(dlopen(file.c_str(), RTLD_NOW | (global ? RTLD_GLOBAL : RTLD_LOCAL)));
+    if (handle == nullptr) {
+        const char* const reason = dlerror();
+        const std::string text = reason == nullptr ? "unknown reason" : reason;
+        // The loader starts with the file's own name where the file itself is at fault.
+        const bool absent = text.rfind(file + ": cannot open shared object file", 0) == 0;
+        const bool named = text.rfind(file + ": ", 0) == 0;
+        throw LoadError(absent ? LoadProblem::FileMissing : LoadProblem::Unresolved,
+                        named ? text : file + ": " + text);
+    }
+    return handle;
 }
 
 }  // namespace cmpihost

@@ -1,19 +1,23 @@
-// What a file is before the dynamic loader sees it. Internal.
-#pragma once
+#ifndef HOST_BROKER_LIBRARY_FILE_H
+#define HOST_BROKER_LIBRARY_FILE_H
 
 #include "host/broker/ProviderLibrary.h"
 
-#include <optional>
+#include <memory>
 #include <string>
 
+/// The file of a library and its handle. Internal.
 namespace cmpihost {
 
-struct FileProblem {
-    LoadProblem problem;
-    std::string text;
+struct CloseLibrary {
+    void operator()(void* handle) const noexcept;
 };
+using LibraryHandle = std::unique_ptr<void, CloseLibrary>;
 
-/// Why a file cannot be a library of this process; none: the loader may try.
-std::optional<FileProblem> examineLibraryFile(const std::string& file);
+/// Opens a library, with its symbols in the global scope or not. Throws LoadError. A file that is
+/// none for this process is recognised before the loader touches it.
+LibraryHandle openLibrary(const std::string& file, bool global);
 
 }  // namespace cmpihost
+
+#endif

@@ -1,7 +1,5 @@
 // CMPIBrokerMemFT: memory of the request, and objects freed before its end.
-#include "host/broker/BrokerTables.h"
 #include "host/broker/Conversion.h"
-#include "host/broker/Entry.h"
 
 #include <cstring>
 #include <limits>
@@ -15,8 +13,8 @@ CMPIGcStat* mark(BrokerCore& core, CMPIStatus*) {
 }
 
 CMPIStatus releaseSince(BrokerCore& core, const CMPIGcStat* gc) {
-    Shells retired;
-    if (!core.withArena([&](Arena& arena) { return arena.retireSince(gc, retired); })) {
+    Objects retired;
+    if (!core.withArena([&](Arena& arena) { return arena.releaseSince(gc, retired); })) {
         core.report("CMPIBrokerMemFT.release without its mark");
         return statusOf(CMPI_RC_ERR_INVALID_HANDLE);
     }
@@ -52,29 +50,18 @@ void freeBlock(BrokerCore& core, void* block) {
 
 template <class Edt>
 void freeObject(BrokerCore& core, const CallName& call, Edt* handle) {
-    core.giveBack(fromHandle(handle, call));
+    core.releaseObject(fromHandle(handle, call));
 }
 
-}  // namespace
+void freeSelectExp(BrokerCore&, const CallName& call, CMPISelectExp* handle) {
+    refuseNeverMade(handle, call, "CMPISelectExp");
+}
 
-CMPIBrokerMemFT memoryTable() {
-    using FT = CMPIBrokerMemFT;
-    // Some CMPI headers declare the version const.
-    FT table{CMPICurrentVersion,
-             nullptr,
-             nullptr,
-             nullptr,
-             nullptr,
-             nullptr,
-             nullptr,
-             nullptr,
-             nullptr,
-             nullptr,
-             nullptr,
-             nullptr,
-             nullptr,
-             nullptr,
-             nullptr};
+using FT = CMPIBrokerMemFT;
+
+FT completeTable() {
+    FT table{};
+    table.ftVersion = CMPICurrentVersion;
     bind<&FT::mark, &mark>(table, "mark");
     bind<&FT::release, &releaseSince>(table, "release");
     bind<&FT::cmpiMalloc, &allocate>(table, "cmpiMalloc");
@@ -88,8 +75,15 @@ CMPIBrokerMemFT memoryTable() {
     bind<&FT::freeString, &freeObject<CMPIString>>(table, "freeString");
     bind<&FT::freeArray, &freeObject<CMPIArray>>(table, "freeArray");
     bind<&FT::freeDateTime, &freeObject<CMPIDateTime>>(table, "freeDateTime");
-    bind<&FT::freeSelectExp, &freeObject<CMPISelectExp>>(table, "freeSelectExp");
+    bind<&FT::freeSelectExp, &freeSelectExp>(table, "freeSelectExp");
     return table;
+}
+
+}  // namespace
+
+CMPIBrokerMemFT memoryTable() {
+    static const FT complete = completeTable();
+    return complete;
 }
 
 }  // namespace cmpihost

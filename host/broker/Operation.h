@@ -1,5 +1,5 @@
-// A CIM operation as a value: what a client asks of a provider and what comes back.
-#pragma once
+#ifndef HOST_BROKER_OPERATION_H
+#define HOST_BROKER_OPERATION_H
 
 #include "host/broker/Value.h"
 
@@ -7,6 +7,7 @@
 #include <string>
 #include <vector>
 
+/// A CIM operation as a value: what a client asks of a provider and what comes back.
 namespace cmpihost {
 
 enum class Operation {
@@ -24,7 +25,15 @@ enum class Operation {
 };
 
 /// "EnumerateInstances" and so on.
-const char* operationName(Operation operation) noexcept;
+constexpr const char* operationName(Operation operation) noexcept {
+    constexpr const char* names[] = {"EnumerateInstances", "EnumerateInstanceNames",
+                                     "GetInstance",        "CreateInstance",
+                                     "ModifyInstance",     "DeleteInstance",
+                                     "ExecQuery",          "Associators",
+                                     "AssociatorNames",    "References",
+                                     "ReferenceNames"};
+    return names[static_cast<unsigned>(operation)];
+}
 
 /// What a request tells about itself.
 struct RequestContext {
@@ -65,3 +74,5 @@ struct OperationResult {
 };
 
 }  // namespace cmpihost
+
+#endif

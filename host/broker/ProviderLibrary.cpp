@@ -1,39 +1,66 @@
+// An object manager calls factories while a request is open and closes a library only after cleanup
+// of all its interfaces; a provider that behaves under one of them is loaded and left in the same
+// order here.
 #include "host/broker/ProviderLibrary.h"
 
 #include "host/broker/BrokerCore.h"
+#include "host/broker/Invoke.h"
 #include "host/broker/LibraryFile.h"
-#include "host/broker/Manners.h"
 #include "host/broker/Request.h"
 
 #include <dlfcn.h>
+
+#include <initializer_list>
 #include <utility>
 
 namespace cmpihost {
 
 namespace {
 
-struct CloseLibrary {
-    void operator()(void* handle) const noexcept { dlclose(handle); }
+struct Slot {
+    const char* name;
+    bool filled;
 };
-using LibraryHandle = std::unique_ptr<void, CloseLibrary>;
 
-const char* loaderText() noexcept {
-    const char* const text = dlerror();
-    return text == nullptr ? "unknown reason" : text;
+/// One line for each thing in a table that an object manager might not forgive.
+template <class Table>
+std::vector<std::string> findings(const char* kind, const Table& table,
+                                  std::initializer_list<Slot> slots) {
+    const std::string who = std::string("table of the ") + kind + " MI: ";
+    std::vector<std::string> result;
+    if (table.ftVersion < 100) {
+        result.push_back(who + "ftVersion " + std::to_string(table.ftVersion) + " is below 100");
+    }
+    if (table.miVersion > table.ftVersion) {
+        result.push_back(who + "miVersion " + std::to_string(table.miVersion) +
+                         " is above ftVersion " + std::to_string(table.ftVersion));
+    }
+    if (table.miName == nullptr) result.push_back(who + "miName is null");
+    for (const Slot& slot : slots) {
+        if (!slot.filled) result.push_back(who + slot.name + " is null");
+    }
+    return result;
 }
 
-LibraryHandle open(const std::string& file, bool global) {
-    if (const auto found = examineLibraryFile(file)) throw LoadError(found->problem, found->text);
-    LibraryHandle handle(dlopen(file.c_str(), RTLD_NOW | (global ? RTLD_GLOBAL : RTLD_LOCAL)));
-    if (handle == nullptr) {
-        // The loader starts with the file's own name where the file itself is at fault.
-        const std::string text = loaderText();
-        const bool absent = text.rfind(file + ": cannot open shared object file", 0) == 0;
-        const bool named = text.rfind(file + ": ", 0) == 0;
-        throw LoadError(absent ? LoadProblem::FileMissing : LoadProblem::Unresolved,
-                        named ? text : file + ": " + text);
-    }
-    return handle;
+std::vector<std::string> checkMiTable(const CMPIInstanceMIFT& table) {
+    return findings("instance", table,
+                    {{"cleanup", table.cleanup != nullptr},
+                     {"enumerateInstanceNames", table.enumerateInstanceNames != nullptr},
+                     {"enumerateInstances", table.enumerateInstances != nullptr},
+                     {"getInstance", table.getInstance != nullptr},
+                     {"createInstance", table.createInstance != nullptr},
+                     {"modifyInstance", table.modifyInstance != nullptr},
+                     {"deleteInstance", table.deleteInstance != nullptr},
+                     {"execQuery", table.execQuery != nullptr}});
+}
+
+std::vector<std::string> checkMiTable(const CMPIAssociationMIFT& table) {
+    return findings("association", table,
+                    {{"cleanup", table.cleanup != nullptr},
+                     {"associators", table.associators != nullptr},
+                     {"associatorNames", table.associatorNames != nullptr},
+                     {"references", table.references != nullptr},
+                     {"referenceNames", table.referenceNames != nullptr}});
 }
 
 std::string messageOf(const CMPIStatus& status) {
@@ -67,7 +94,7 @@ class Factory {
         }
         if (made == nullptr) throw LoadError(LoadProblem::FactoryFailed, where_ + " returned null");
         if (made->ft == nullptr) throw LoadError(LoadProblem::NoTable, where_ + " gave no table");
-        for (const std::string& complaint : badManners(*made->ft)) broker.core().report(complaint);
+        for (const std::string& finding : checkMiTable(*made->ft)) broker.core().report(finding);
         return made;
     }
 
@@ -121,7 +148,7 @@ ProviderLibrary::~ProviderLibrary() {
 
 void ProviderLibrary::load() {
     if (loaded()) return;
-    LibraryHandle handle = open(file_, options_.global);
+    LibraryHandle handle = openLibrary(file_, options_.global);
     Request request(broker_);
     const CMPIContext* const context = request.makeContext({}, {});
 
@@ -154,6 +181,18 @@ bool ProviderLibrary::unload(bool terminating) {
         return false;
     }
     return true;
+}
+
+UpcallAnswer ProviderLibrary::perform(Broker& broker, const OperationRequest& request) {
+    UpcallAnswer answer;
+    try {
+        static_cast<OperationResult&>(answer) = invoke(interfaces_, broker, request);
+    } catch (...) {
+        broker.core().report(std::string("an exception left ") + operationName(request.operation) +
+                             " of " + file_);
+        answer.rc = CMPI_RC_ERR_FAILED;
+    }
+    return answer;
 }
 
 void* ProviderLibrary::symbol(const char* name) const noexcept {

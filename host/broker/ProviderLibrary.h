@@ -1,5 +1,5 @@
-// A CMPI library, loaded as an object manager loads it.
-#pragma once
+#ifndef HOST_BROKER_PROVIDER_LIBRARY_H
+#define HOST_BROKER_PROVIDER_LIBRARY_H
 
 #include "host/broker/Broker.h"
 
@@ -9,6 +9,7 @@
 #include <string>
 #include <vector>
 
+/// A CMPI library, loaded as an object manager loads it.
 namespace cmpihost {
 
 enum class LoadProblem {
@@ -52,15 +53,15 @@ struct ManagementInterfaces {
 };
 
 /// A loaded library and its management interfaces. The factory `_Generic_Create_<kind>MI` is looked
-/// up first, then `<provider name>_Create_<kind>MI`. Bad manners that still can be lived with (a
-/// table version below 100, an MI version above it, a null slot) become violations of the broker.
-/// One thread loads and unloads.
-class ProviderLibrary {
+/// up first, then `<provider name>_Create_<kind>MI`. What an object manager might not forgive in
+/// the interfaces' tables (a version below 100, an MI version above it, a null slot) is a
+/// violation. One thread loads and unloads.
+class ProviderLibrary final : public UpcallService {
   public:
     /// Loads; throws LoadError. `broker` outlives the library.
     ProviderLibrary(std::string file, Broker& broker, LoadOptions options = {});
     /// unload(true).
-    ~ProviderLibrary();
+    ~ProviderLibrary() override;
     ProviderLibrary(const ProviderLibrary&) = delete;
     ProviderLibrary& operator=(const ProviderLibrary&) = delete;
 
@@ -76,6 +77,11 @@ class ProviderLibrary {
     /// Loads again after unload(); throws LoadError. Does nothing while loaded.
     void load();
 
+    /// Answers up-calls of other libraries, on the same thread and within the caller's request:
+    /// what it delivers lives until the outermost request ends. An exception that leaves this
+    /// library becomes a violation and CMPI_RC_ERR_FAILED.
+    UpcallAnswer perform(Broker& broker, const OperationRequest& request) override;
+
     /// The address of an exported symbol, null if there is none or the library is not loaded.
     void* symbol(const char* name) const noexcept;
 
@@ -88,3 +94,5 @@ class ProviderLibrary {
 };
 
 }  // namespace cmpihost
+
+#endif

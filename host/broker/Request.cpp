@@ -1,40 +1,35 @@
+// What a client sends is made into objects here, past the slots, so that no fault plan counts it.
 #include "host/broker/Request.h"
 
 #include "host/broker/Conversion.h"
-#include "host/broker/RequestScope.h"
 
 #include <stdexcept>
 
 namespace cmpihost {
 
-struct Request::State {
-    explicit State(BrokerCore& core) : scope(core, false) {}
-    RequestScope scope;
-};
-
-Request::Request(Broker& broker) : state_(std::make_unique<State>(broker.core())) {}
+Request::Request(Broker& broker) : scope_(std::make_unique<RequestScope>(broker.core())) {}
 Request::~Request() = default;
 
 void Request::end() noexcept {
-    state_->scope.end();
+    scope_->end();
 }
 Broker& Request::broker() const noexcept {
-    return state_->scope.core().owner();
+    return scope_->core().owner();
 }
 const std::vector<std::string>& Request::violations() const noexcept {
-    return state_->scope.violations();
+    return scope_->violations();
 }
 
 CMPIObjectPath* Request::makePath(const ObjectPathValue& value) {
-    return state_->scope.core().make<CMPIObjectPath>(std::make_shared<ObjectPathValue>(value));
+    return scope_->core().make<CMPIObjectPath>(std::make_shared<ObjectPathValue>(value));
 }
 
 CMPIInstance* Request::makeInstance(const InstanceValue& value) {
-    return cmpihost::makeInstance(state_->scope.core(), std::make_shared<InstanceValue>(value));
+    return cmpihost::makeInstance(scope_->core(), std::make_shared<InstanceValue>(value));
 }
 
 CMPIString* Request::makeString(const std::optional<std::string>& text) {
-    return state_->scope.core().make<CMPIString>(text ? Characters(*text) : Characters());
+    return scope_->core().make<CMPIString>(text ? Characters(*text) : Characters());
 }
 
 CMPIContext* Request::makeContext(const RequestContext& context, const std::string& nameSpace) {
@@ -44,8 +39,8 @@ CMPIContext* Request::makeContext(const RequestContext& context, const std::stri
     std::vector<NamedValue> entries = {
         {CMPIInvocationFlags, Value::fromUnsigned(context.flags, CMPI_uint32)},
         {CMPIPrincipal, text(context.principal)}};
-    BrokerCore& core = state_->scope.core();
-    if (core.options().fullContext) {
+    BrokerCore& core = scope_->core();
+    if (!core.isSparse()) {
         entries.push_back({CMPIInitNameSpace, nameSpace});
         entries.push_back({CMPIRole, text(context.role)});
     }
@@ -59,7 +54,7 @@ const Object<Edt>& alive(const Edt* handle) {
     try {
         return fromHandle(handle, {"cmpihost", "valueOf"});
     } catch (const Failure&) {
-        throw std::invalid_argument(std::string("no living ") + Kind<Edt>::name);
+        throw std::invalid_argument(std::string("no living ").append(kindName<Edt>));
     }
 }
 

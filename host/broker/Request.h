@@ -1,14 +1,16 @@
-// The scope in which the objects of a broker live.
-#pragma once
+#ifndef HOST_BROKER_REQUEST_H
+#define HOST_BROKER_REQUEST_H
 
 #include "host/broker/Broker.h"
-#include "host/broker/Operation.h"
 
 #include <memory>
 #include <string>
 #include <vector>
 
+/// The scope in which the objects of a broker live.
 namespace cmpihost {
+
+class RequestScope;
 
 /// While a request is open on a thread, objects made by its broker on that thread belong to it.
 /// Requests nest: objects live until the outermost one of the broker on the thread ends. A use
@@ -38,8 +40,7 @@ class Request {
     CMPIContext* makeContext(const RequestContext& context, const std::string& nameSpace);
 
   private:
-    struct State;
-    std::unique_ptr<State> state_;
+    std::unique_ptr<RequestScope> scope_;
 };
 
 /// The content of an object of any broker. The object must be alive: else std::invalid_argument.
@@ -47,3 +48,5 @@ ObjectPathValue valueOf(const CMPIObjectPath* path);
 InstanceValue valueOf(const CMPIInstance* instance);
 
 }  // namespace cmpihost
+
+#endif

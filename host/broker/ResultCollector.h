@@ -1,12 +1,15 @@
-// The CMPIResult of a request: takes what the provider returns.
-#pragma once
+#ifndef HOST_BROKER_RESULT_COLLECTOR_H
+#define HOST_BROKER_RESULT_COLLECTOR_H
 
 #include "host/broker/Request.h"
 
 #include <memory>
 #include <vector>
 
+/// The CMPIResult of a request: takes what the provider returns.
 namespace cmpihost {
+
+struct ResultState;
 
 /// Collects instances and paths in the order in which they come. Its CMPIResult dies with the
 /// request (a later use is a violation); what was collected stays. Used by the thread of its
@@ -44,8 +47,10 @@ class ResultCollector {
     std::vector<ObjectPathValue> takeRefusedPaths();
 
   private:
-    std::shared_ptr<struct ResultState> state_;
+    std::shared_ptr<ResultState> state_;
     const CMPIResult* result_;
 };
 
 }  // namespace cmpihost
+
+#endif

@@ -1,6 +1,7 @@
+// What a client would see, and only that: paths that a provider makes for itself may be incomplete.
 #include "host/broker/SchemaCheck.h"
 
-#include "host/broker/NamedItems.h"
+#include "host/broker/Conversion.h"
 
 namespace cmpihost {
 
@@ -29,7 +30,8 @@ bool checkType(BrokerCore& core, const ClassDeclaration& owner, const PropertyDe
     if (declared.type != CMPI_ref || value.isNull() || declared.referenceClass.empty()) return true;
 
     const std::string& className = value.reference().className;
-    if (kinship(core.catalogue(), className, declared.referenceClass) == Kinship::Unrelated) {
+    if (classRelation(core.catalogue(), className, declared.referenceClass) ==
+        ClassRelation::Unrelated) {
         core.report(member(owner, declared.name) + " refers to " + declared.referenceClass +
                     ", not to " + className);
         return false;

@@ -1,9 +1,10 @@
-// Compares what a provider makes with what the schema declares. Internal. Every finding is a
-// violation; without a catalogue nothing is found.
-#pragma once
+#ifndef HOST_BROKER_SCHEMA_CHECK_H
+#define HOST_BROKER_SCHEMA_CHECK_H
 
 #include "host/broker/BrokerCore.h"
 
+/// Compares what a provider makes with what the schema declares. Internal. Every finding is a
+/// violation; without a catalogue nothing is found.
 namespace cmpihost {
 
 /// Whether a property of that class may be set to `value`: CMPI_RC_OK, CMPI_RC_ERR_NO_SUCH_PROPERTY
@@ -24,3 +25,5 @@ void completeKeys(const ClassDeclaration* declaration, const std::vector<Propert
                   ObjectPathValue& path);
 
 }  // namespace cmpihost
+
+#endif

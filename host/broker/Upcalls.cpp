@@ -1,9 +1,5 @@
 // CMPIBrokerFT: operations that the provider asks of the object manager.
-#include "host/broker/BrokerTables.h"
 #include "host/broker/Conversion.h"
-#include "host/broker/Entry.h"
-#include "host/broker/NamedItems.h"
-#include "host/broker/RequestScope.h"
 
 namespace cmpihost {
 
@@ -140,59 +136,53 @@ CMPIEnumeration* execQuery(BrokerCore& core, const CallName& call, const CMPICon
     return enumeration(core, request, status);
 }
 
+/// What narrows an association operation down; null: nothing.
+struct Filters {
+    const char* assocClass = nullptr;
+    const char* resultClass = nullptr;
+    const char* role = nullptr;
+    const char* resultRole = nullptr;
+    const char** properties = nullptr;
+};
+
+CMPIEnumeration* related(BrokerCore& core, OperationRequest request, const Filters& filters,
+                         CMPIStatus* status) {
+    request.assocClass = optionalText(filters.assocClass);
+    request.resultClass = optionalText(filters.resultClass);
+    request.role = optionalText(filters.role);
+    request.resultRole = optionalText(filters.resultRole);
+    request.properties = readNames(filters.properties);
+    return enumeration(core, request, status);
+}
+
 CMPIEnumeration* associatorNames(BrokerCore& core, const CallName& call, const CMPIContext* context,
                                  const CMPIObjectPath* path, const char* assocClass,
                                  const char* resultClass, const char* role, const char* resultRole,
                                  CMPIStatus* status) {
-    OperationRequest request = requestOf(Operation::AssociatorNames, call, context, path);
-    request.assocClass = optionalText(assocClass);
-    request.resultClass = optionalText(resultClass);
-    request.role = optionalText(role);
-    request.resultRole = optionalText(resultRole);
-    return enumeration(core, request, status);
+    return related(core, requestOf(Operation::AssociatorNames, call, context, path),
+                   {assocClass, resultClass, role, resultRole}, status);
 }
 
 CMPIEnumeration* associators(BrokerCore& core, const CallName& call, const CMPIContext* context,
                              const CMPIObjectPath* path, const char* assocClass,
                              const char* resultClass, const char* role, const char* resultRole,
                              const char** properties, CMPIStatus* status) {
-    OperationRequest request = requestOf(Operation::Associators, call, context, path);
-    request.assocClass = optionalText(assocClass);
-    request.resultClass = optionalText(resultClass);
-    request.role = optionalText(role);
-    request.resultRole = optionalText(resultRole);
-    request.properties = readNames(properties);
-    return enumeration(core, request, status);
+    return related(core, requestOf(Operation::Associators, call, context, path),
+                   {assocClass, resultClass, role, resultRole, properties}, status);
 }
 
 CMPIEnumeration* referenceNames(BrokerCore& core, const CallName& call, const CMPIContext* context,
                                 const CMPIObjectPath* path, const char* resultClass,
                                 const char* role, CMPIStatus* status) {
-    OperationRequest request = requestOf(Operation::ReferenceNames, call, context, path);
-    request.resultClass = optionalText(resultClass);
-    request.role = optionalText(role);
-    return enumeration(core, request, status);
+    return related(core, requestOf(Operation::ReferenceNames, call, context, path),
+                   {nullptr, resultClass, role}, status);
 }
 
 CMPIEnumeration* references(BrokerCore& core, const CallName& call, const CMPIContext* context,
                             const CMPIObjectPath* path, const char* resultClass, const char* role,
                             const char** properties, CMPIStatus* status) {
-    OperationRequest request = requestOf(Operation::References, call, context, path);
-    request.resultClass = optionalText(resultClass);
-    request.role = optionalText(role);
-    request.properties = readNames(properties);
-    return enumeration(core, request, status);
-}
-
-/// Services that this host does not have.
-template <class... Args>
-CMPIStatus unsupported(BrokerCore&, Args...) {
-    return statusOf(CMPI_RC_ERR_NOT_SUPPORTED);
-}
-template <class... Args>
-CMPIData unsupportedData(BrokerCore&, Args... arguments) {
-    setStatus(statusArgument(arguments...), CMPI_RC_ERR_NOT_SUPPORTED);
-    return noData(CMPI_notFound);
+    return related(core, requestOf(Operation::References, call, context, path),
+                   {nullptr, resultClass, role, nullptr, properties}, status);
 }
 
 CMPIContext* prepareAttachThread(BrokerCore& core, const CallName& call,
@@ -203,32 +193,40 @@ CMPIContext* prepareAttachThread(BrokerCore& core, const CallName& call,
 CMPIStatus attachThread(BrokerCore& core, const CallName& call, const CMPIContext* context) {
     fromHandle(context, call);
     // detachThread deletes it, on this thread.
-    auto scope = std::make_unique<RequestScope>(core, true);
-    scope.release();
+    std::make_unique<RequestScope>(core, RequestScope::Kind::AttachedThread).release();
     return statusOf(CMPI_RC_OK);
 }
 
 CMPIStatus detachThread(BrokerCore& core, const CallName& call, const CMPIContext* context) {
     const Object<CMPIContext>& object = fromHandle(context, call);
-    const std::unique_ptr<RequestScope> scope(RequestScope::attachedTo(core));
-    if (scope == nullptr) {
+    RequestScope* const innermost = RequestScope::innermost();
+    if (innermost == nullptr || &innermost->core() != &core ||
+        innermost->kind() != RequestScope::Kind::AttachedThread) {
         core.report("detachThread on a thread that is not attached");
         return statusOf(CMPI_RC_ERR_FAILED);
     }
+    const std::unique_ptr<RequestScope> scope(innermost);
     if (object.arena() != nullptr) {
         core.report("detachThread with a context that is none of prepareAttachThread");
         return statusOf(CMPI_RC_ERR_INVALID_HANDLE);
     }
-    core.giveBack(object);
+    core.releaseObject(object);
     return statusOf(CMPI_RC_OK);
 }
 
 using FT = CMPIBrokerFT;
-using Context = const CMPIContext*;
-using Path = const CMPIObjectPath*;
-using Text = const char*;
 
-void bindOperations(FT& table) {
+FT completeTable() {
+    using Context = const CMPIContext*;
+    using Path = const CMPIObjectPath*;
+    using Text = const char*;
+    FT table{};
+    table.brokerCapabilities = CMPI_MB_InstanceManipulation | CMPI_MB_AssociationTraversal;
+    table.brokerVersion = CMPICurrentVersion;
+    table.brokerName = "cmpihost";
+    bind<&FT::prepareAttachThread, &prepareAttachThread>(table, "prepareAttachThread");
+    bind<&FT::attachThread, &attachThread>(table, "attachThread");
+    bind<&FT::detachThread, &detachThread>(table, "detachThread");
     bind<&FT::enumerateInstanceNames, &enumerateInstanceNames>(table, "enumerateInstanceNames");
     bind<&FT::enumerateInstances, &enumerateInstances>(table, "enumerateInstances");
     bind<&FT::getInstance, &getInstance>(table, "getInstance");
@@ -240,25 +238,26 @@ void bindOperations(FT& table) {
     bind<&FT::associatorNames, &associatorNames>(table, "associatorNames");
     bind<&FT::references, &references>(table, "references");
     bind<&FT::referenceNames, &referenceNames>(table, "referenceNames");
+    bind<&FT::deliverIndication,
+         &notSupported<CMPIStatus, BrokerCore, Context, Text, const CMPIInstance*>>(
+        table, "deliverIndication");
+    bind<&FT::setProperty,
+         &notSupported<CMPIStatus, BrokerCore, Context, Path, Text, const CMPIValue*, CMPIType>>(
+        table, "setProperty");
+    bind<&FT::getProperty, &notSupported<CMPIData, BrokerCore, Context, Path, Text, CMPIStatus*>>(
+        table, "getProperty");
+    bind<&FT::invokeMethod, &notSupported<CMPIData, BrokerCore, Context, Path, Text,
+                                          const CMPIArgs*, CMPIArgs*, CMPIStatus*>>(table,
+                                                                                    "invokeMethod");
+    return table;
 }
 
 }  // namespace
 
-CMPIBrokerFT upcallTable() {
-    FT table{};
-    bindOperations(table);
-    bind<&FT::prepareAttachThread, &prepareAttachThread>(table, "prepareAttachThread");
-    bind<&FT::attachThread, &attachThread>(table, "attachThread");
-    bind<&FT::detachThread, &detachThread>(table, "detachThread");
-    bind<&FT::deliverIndication, &unsupported<Context, Text, const CMPIInstance*>>(
-        table, "deliverIndication");
-    bind<&FT::setProperty, &unsupported<Context, Path, Text, const CMPIValue*, CMPIType>>(
-        table, "setProperty");
-    bind<&FT::getProperty, &unsupportedData<Context, Path, Text, CMPIStatus*>>(table,
-                                                                               "getProperty");
-    bind<&FT::invokeMethod,
-         &unsupportedData<Context, Path, Text, const CMPIArgs*, CMPIArgs*, CMPIStatus*>>(
-        table, "invokeMethod");
+CMPIBrokerFT upcallTable(bool sparse) {
+    static const FT complete = completeTable();
+    FT table = complete;
+    if (sparse) table.brokerVersion = 0;
     return table;
 }
 

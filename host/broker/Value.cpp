@@ -1,17 +1,16 @@
+// Contents are shared between values and copied by who changes them: a request hands the same paths
+// and instances around many times.
 #include "host/broker/Value.h"
 
+#include "base/Utf8.h"
+
 #include <algorithm>
-#include <array>
-#include <cstdio>
+#include <charconv>
 #include <iterator>
 
 namespace cmpihost {
 
 namespace {
-
-char lowerCase(char letter) noexcept {
-    return letter >= 'A' && letter <= 'Z' ? static_cast<char>(letter - 'A' + 'a') : letter;
-}
 
 struct TypeRow {
     CMPIType type;
@@ -69,7 +68,7 @@ struct SameContent {
 };
 
 template <class Named>
-const Value* valueNamed(const std::vector<Named>& items, std::string_view name) noexcept {
+const Value* valueNamed(const std::vector<Named>& items, std::string_view name) {
     const auto item = std::find_if(items.begin(), items.end(), [name](const Named& candidate) {
         return equalNames(candidate.name, name);
     });
@@ -95,17 +94,22 @@ std::string quoted(const std::string& text) {
     return result + '"';
 }
 
-std::string bindingText(const Value& value) {
-    if (value.isNull()) return "NULL";
-    if (value.isText() || value.type() == CMPI_ref) return quoted(value.toText());
-    return value.toText();
+std::string keyText(const Value& value) {
+    if (value.isNull()) return quoted("");
+    if (value.type() == CMPI_boolean) return value.boolean() ? "TRUE" : "FALSE";
+    if (value.type() == CMPI_char16) {
+        std::string character;
+        base::appendUtf8(character, static_cast<char32_t>(value.unsignedInteger()));
+        return quoted(character);
+    }
+    const bool isNumber = !value.isText() && value.type() != CMPI_ref;
+    return isNumber ? value.toText() : quoted(value.toText());
 }
 
-std::string realText(double value, CMPIType type) {
-    std::array<char, 40> text{};
-    const int digits = type == CMPI_real32 ? 9 : 17;
-    std::snprintf(text.data(), text.size(), "%.*g", digits, value);
-    return text.data();
+template <class Real>
+std::string shortestText(Real real) {
+    char text[64];
+    return std::string(text, std::to_chars(text, text + sizeof text, real).ptr);
 }
 
 std::string arrayText(const std::vector<Value>& elements) {
@@ -124,7 +128,9 @@ struct ToText {
     std::string operator()(bool value) const { return value ? "true" : "false"; }
     std::string operator()(std::uint64_t value) const { return std::to_string(value); }
     std::string operator()(std::int64_t value) const { return std::to_string(value); }
-    std::string operator()(double value) const { return realText(value, type); }
+    std::string operator()(double value) const {
+        return type == CMPI_real32 ? shortestText(static_cast<float>(value)) : shortestText(value);
+    }
     std::string operator()(const std::string& value) const { return value; }
     std::string operator()(const std::shared_ptr<ObjectPathValue>& value) const {
         return toString(*value);
@@ -141,12 +147,6 @@ struct ToText {
 };
 
 }  // namespace
-
-bool equalNames(std::string_view left, std::string_view right) noexcept {
-    return left.size() == right.size() &&
-           std::equal(left.begin(), left.end(), right.begin(),
-                      [](char a, char b) { return a == b || lowerCase(a) == lowerCase(b); });
-}
 
 std::string cimTypeName(CMPIType type) {
     const TypeRow* row = typeRow(static_cast<CMPIType>(type & ~CMPI_ARRAY));
@@ -242,11 +242,11 @@ bool operator==(const Value& left, const Value& right) {
            std::visit(SameContent(), left.data_, right.data_);
 }
 
-const Value* ObjectPathValue::key(std::string_view name) const noexcept {
+const Value* ObjectPathValue::key(std::string_view name) const {
     return valueNamed(keys, name);
 }
 
-const Value* InstanceValue::property(std::string_view name) const noexcept {
+const Value* InstanceValue::property(std::string_view name) const {
     return valueNamed(properties, name);
 }
 
@@ -266,11 +266,13 @@ bool operator!=(const InstanceValue& left, const InstanceValue& right) {
 }
 
 std::string toString(const ObjectPathValue& path) {
-    std::string result =
-        path.nameSpace.empty() ? path.className : path.nameSpace + ":" + path.className;
+    std::string result;
+    if (!path.hostName.empty()) result += "//" + path.hostName + "/";
+    if (!path.nameSpace.empty()) result += path.nameSpace + ":";
+    result += path.className;
     char separator = '.';
     for (const KeyBinding& key : path.keys) {
-        result += separator + key.name + '=' + bindingText(key.value);
+        result += separator + key.name + '=' + keyText(key.value);
         separator = ',';
     }
     return result;

@@ -1,6 +1,7 @@
-// The plain value model of the host: what a CMPI object holds, without CMPI ownership.
-// Everything here is an ordinary C++ value. Text is UTF-8, passed byte for byte.
-#pragma once
+#ifndef HOST_BROKER_VALUE_H
+#define HOST_BROKER_VALUE_H
+
+#include "base/Ascii.h"
 
 #include <cmpi/cmpidt.h>
 
@@ -11,14 +12,17 @@
 #include <variant>
 #include <vector>
 
+/// The plain value model of the host: what a CMPI object holds, without CMPI ownership.
+/// Everything here is an ordinary C++ value. Text is UTF-8, passed byte for byte.
 namespace cmpihost {
 
 struct ObjectPathValue;
 struct InstanceValue;
 
-/// Whether two CIM names (class, property, key, namespace) are the same: ASCII letters without
-/// case.
-bool equalNames(std::string_view left, std::string_view right) noexcept;
+/// Whether two CIM names (class, property, key, namespace) are the same.
+inline bool equalNames(std::string_view left, std::string_view right) {
+    return base::equalsIgnoreCase(left, right);
+}
 
 /// The name of a CMPI type as schemas spell it ("uint16", "string[]", "datetime", "ref", "null").
 std::string cimTypeName(CMPIType type);
@@ -77,8 +81,8 @@ class Value {
     const std::shared_ptr<InstanceValue>& sharedInstance() const;
     const std::shared_ptr<std::vector<Value>>& sharedElements() const;
 
-    /// For people: text as it is, numbers in decimal, "true"/"false", "NULL", references as
-    /// toString(path), arrays as "{a, b}".
+    /// For people: text as it is, numbers in decimal (reals as the shortest that gives the value
+    /// back), "true"/"false", "NULL", references as toString(path), arrays as "{a, b}".
     std::string toText() const;
 
     /// Same type (CMPI_chars counts as CMPI_string) and same content; references compare as paths.
@@ -119,7 +123,7 @@ struct ObjectPathValue {
     std::string hostName{};
 
     /// The value of a key, null if there is none of that name.
-    const Value* key(std::string_view name) const noexcept;
+    const Value* key(std::string_view name) const;
 };
 
 /// An instance: its path and its properties in the order in which they were set.
@@ -128,7 +132,7 @@ struct InstanceValue {
     std::vector<PropertyValue> properties{};
 
     /// The value of a property, null if the instance has none of that name.
-    const Value* property(std::string_view name) const noexcept;
+    const Value* property(std::string_view name) const;
 };
 
 /// Names without case, key bindings as a set; the host name does not count.
@@ -138,8 +142,11 @@ bool operator!=(const ObjectPathValue& left, const ObjectPathValue& right);
 bool operator==(const InstanceValue& left, const InstanceValue& right);
 bool operator!=(const InstanceValue& left, const InstanceValue& right);
 
-/// `root/cimv2:Class.Key1="text",Key2=5`, as clients write a path; quotes and backslashes are
-/// escaped.
+/// The path as clients write it: `[//host/][namespace:]Class[.Key1="text",Key2=5,Key3=TRUE]`. The
+/// path of a class has no dot. Quotes and backslashes in texts are escaped, references are paths in
+/// quotes; null is an empty text.
 std::string toString(const ObjectPathValue& path);
 
 }  // namespace cmpihost
+
+#endif

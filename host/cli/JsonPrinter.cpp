@@ -51,7 +51,7 @@ Json valueJson(const Value& value) {
         case TypeCategory::DateTime:
             return value.text();
         case TypeCategory::Reference:
-            return writePath(value.reference());
+            return toString(value.reference());
         case TypeCategory::Instance:
             return {{"class", value.instance().path.className},
                     {"properties", propertiesJson(value.instance())}};
@@ -63,7 +63,7 @@ Json valueJson(const Value& value) {
 }
 
 Json pathJson(const ObjectPathValue& path) {
-    return {{"class", path.className}, {"path", writePath(path)}};
+    return {{"class", path.className}, {"path", toString(path)}};
 }
 
 class JsonPrinter final : public Printer {

@@ -53,7 +53,7 @@ std::string valueText(const Value& value) {
         case TypeCategory::DateTime:
             return mof::stringLiteral(value.text());
         case TypeCategory::Reference:
-            return mof::stringLiteral(writePath(value.reference()));
+            return mof::stringLiteral(toString(value.reference()));
         case TypeCategory::Instance:
             return mof::stringLiteral(instanceText(value.instance()));
         case TypeCategory::Array:

@@ -52,7 +52,7 @@ bool hasKeys(const ObjectPathValue& name, const std::vector<KeyBinding>& given) 
 std::string list(const std::vector<ObjectPathValue>& paths) {
     std::string text;
     for (std::size_t index = 0; index < std::min(paths.size(), listed); ++index) {
-        text += "\n  " + base::escapeForTerminal(writePath(paths[index]));
+        text += "\n  " + base::escapeForTerminal(toString(paths[index]));
     }
     if (paths.size() > listed) text += "\n  and " + std::to_string(paths.size() - listed) + " more";
     return text;

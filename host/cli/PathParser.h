@@ -46,10 +46,6 @@ ObjectPathValue parsePath(const std::string& text, const ClassCatalogue* catalog
 /// between them. Throws PathError for any other text.
 std::string parseNamespace(const std::string& text);
 
-/// The path as parsePath reads it. A host name goes before the namespace; the path of a class has
-/// no dot. Reals, which no key can be, are written as numbers, and null as an empty text.
-std::string writePath(const ObjectPathValue& path);
-
 }  // namespace cmpihost
 
 #endif

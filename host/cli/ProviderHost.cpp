@@ -11,8 +11,6 @@
 #include <system_error>
 
 #include "base/Ascii.h"
-#include "host/broker/ComputerSystemService.h"
-#include "host/broker/LibraryService.h"
 
 namespace cmpihost {
 
@@ -54,14 +52,10 @@ std::unique_ptr<ProviderLibrary> loadCompanion(const ComputerSystemSource& sourc
     return std::make_unique<ProviderLibrary>(source.library, broker, options);
 }
 
-std::unique_ptr<UpcallService> makeService(ProviderLibrary* companion, unsigned count) {
-    if (companion != nullptr) return std::make_unique<LibraryService>(*companion);
-    return std::make_unique<ComputerSystemService>(computerNames(count));
-}
-
 /// The broker with its route to the computer systems.
-Broker& routed(Broker& broker, UpcallService& computerSystems) {
-    broker.route(ComputerSystemService::className, computerSystems);
+Broker& routed(Broker& broker, ProviderLibrary* companion, ComputerSystemService& own) {
+    UpcallService& service = companion != nullptr ? static_cast<UpcallService&>(*companion) : own;
+    broker.route(ComputerSystemService::className, service);
     return broker;
 }
 
@@ -105,8 +99,9 @@ ProviderHost::ProviderHost(const ProviderSource& provider, const ClassCatalogue&
                            const ComputerSystemSource& computerSystems)
     : broker_(&catalogue),
       companion_(loadCompanion(computerSystems, broker_)),
-      computerSystems_(makeService(companion_.get(), computerSystems.count)),
-      library_(provider.library, routed(broker_, *computerSystems_), loadOptions(provider.name)) {}
+      computerSystems_(computerNames(computerSystems.count)),
+      library_(provider.library, routed(broker_, companion_.get(), computerSystems_),
+               loadOptions(provider.name)) {}
 
 OperationResult ProviderHost::run(const OperationRequest& request) {
     return guarded([&]() -> OperationResult { return invoke(library_, broker_, request); });
@@ -119,7 +114,7 @@ OperationResult ProviderHost::ask(const OperationRequest& request) {
     }
     return guarded([&]() -> OperationResult {
         if (companion_ != nullptr) return invoke(*companion_, broker_, request);
-        return computerSystems_->perform(broker_, request);
+        return computerSystems_.perform(broker_, request);
     });
 }
 

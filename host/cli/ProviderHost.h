@@ -7,6 +7,7 @@
 
 #include "base/FileDescriptor.h"
 #include "host/broker/Broker.h"
+#include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
 #include "host/broker/ProviderLibrary.h"
 
@@ -65,7 +66,7 @@ class ProviderHost {
     Broker broker_;
     /// The library that serves the computer system; null: the host does.
     std::unique_ptr<ProviderLibrary> companion_;
-    std::unique_ptr<UpcallService> computerSystems_;
+    ComputerSystemService computerSystems_;
     ProviderLibrary library_;
 };
 

@@ -131,7 +131,7 @@ class Run {
         const OperationResult names = host.ask(namesRequest(request.path));
         if (names.rc != CMPI_RC_OK) return names;
         request.path = completedPath(request.path, names.paths);
-        err_ << "cmpihost: completed the path: " << base::escapeForTerminal(writePath(request.path))
+        err_ << "cmpihost: completed the path: " << base::escapeForTerminal(toString(request.path))
              << '\n';
         return host.run(request);
     }

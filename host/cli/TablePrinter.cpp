@@ -50,7 +50,7 @@ std::string scalarText(const Value& value, const Hints& hints) {
         case TypeCategory::DateTime:
             return withNote(value.text(), humanReadableDateTime(value.text()));
         case TypeCategory::Reference:
-            return writePath(value.reference());
+            return toString(value.reference());
         case TypeCategory::Text:
             return value.text().empty() ? "\"\"" : value.text();
         default:
@@ -86,7 +86,7 @@ class TablePrinter final : public Printer {
 
     void print(const std::vector<ObjectPathValue>& paths) override {
         for (const ObjectPathValue& path : paths) {
-            stream_ << base::escapeForTerminal(writePath(path)) << '\n';
+            stream_ << base::escapeForTerminal(toString(path)) << '\n';
         }
     }
 
@@ -96,7 +96,7 @@ class TablePrinter final : public Printer {
         for (const PropertyValue& property : instance.properties) {
             width = std::max(width, base::countUtf8(base::escapeForTerminal(property.name)));
         }
-        stream_ << base::escapeForTerminal(writePath(instance.path)) << '\n';
+        stream_ << base::escapeForTerminal(toString(instance.path)) << '\n';
         for (const PropertyValue& property : instance.properties) {
             const std::string name = base::escapeForTerminal(property.name);
             const Hints hints = hintsOf(instance.path.className, property.name);

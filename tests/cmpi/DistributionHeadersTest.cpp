@@ -5,7 +5,6 @@
 #include <cstdlib>
 
 #include "host/broker/Invoke.h"
-#include "host/broker/LibraryService.h"
 #include "host/broker/ProviderLibrary.h"
 #include "host/mof/Schema.h"
 
@@ -36,7 +35,7 @@ class DistributionHeaders : public testing::TestWithParam<Library> {
   protected:
     DistributionHeaders() {
         setenv("ZBLOG_CONF", "", 1);
-        broker.route("KORVA_ComputerSystem", computerSystems);
+        broker.route("KORVA_ComputerSystem", companion);
     }
     void TearDown() override { EXPECT_THAT(broker.takeViolations(), testing::IsEmpty()); }
 
@@ -55,7 +54,6 @@ class DistributionHeaders : public testing::TestWithParam<Library> {
                              optionsFor(GetParam().name, true)};
     ProviderLibrary companion{std::string(folder) + "libkorvacomputersystemprovider.so.1", broker,
                               optionsFor("ComputerSystemProvider", false)};
-    LibraryService computerSystems{companion};
 };
 
 INSTANTIATE_TEST_SUITE_P(Of, DistributionHeaders,

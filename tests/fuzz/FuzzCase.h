@@ -7,10 +7,9 @@
 #include <vector>
 
 #include "fuzz/Decoder.h"
-#include "host/broker/BrokerOptions.h"
+#include "host/broker/Broker.h"
 #include "host/broker/FaultPlan.h"
 #include "host/broker/Invoke.h"
-#include "host/broker/UpcallService.h"
 #include "support/SimulatedHost.h"
 
 namespace fuzz {

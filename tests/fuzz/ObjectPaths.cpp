@@ -22,12 +22,12 @@ void checkError(const PathError& error, const std::string& text) {
 }
 
 void checkRoundTrip(const ObjectPathValue& path, const ClassCatalogue* classes) {
-    const std::string written = writePath(path);
+    const std::string written = toString(path);
     try {
         const ObjectPathValue again = parsePath(written, classes);
         fuzz::expect(again == path && again.hostName == path.hostName,
                      "a path is read back as it was written");
-        fuzz::expect(writePath(again) == written, "a path has one text");
+        fuzz::expect(toString(again) == written, "a path has one text");
     } catch (const PathError& error) {
         fuzz::broken("what was written is a path; " + written + ": " + error.what());
     }

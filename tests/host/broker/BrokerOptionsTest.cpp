@@ -1,5 +1,3 @@
-#include "host/broker/BrokerOptions.h"
-
 #include "BrokerFixture.h"
 
 #include <algorithm>
@@ -48,11 +46,6 @@ TEST(CompleteBroker, LeavesNoSlotEmpty) {
     EXPECT_EQ(nullSlots(*CMNewArgs(mb, nullptr)->ft, front), 0u);
     EXPECT_EQ(nullSlots(*CMNewDateTime(mb, nullptr)->ft, front), 0u);
     EXPECT_EQ(nullSlots(*request.makeContext({}, "")->ft, front), 0u);
-    CMPISelectExp* const query = CMNewSelectExp(mb, "SELECT * FROM A", "WQL", nullptr, nullptr);
-    EXPECT_EQ(nullSlots(*query->ft, front), 0u);
-    CMPIError* const error = mb->eft->newCMPIError(mb, "", "", "", ErrorSevLow,
-                                                   ErrorProbCauseUnknown, CMPI_RC_OK, nullptr);
-    EXPECT_EQ(nullSlots(*error->ft, front), 0u);
 }
 
 TEST(CompleteBroker, LeavesNoSlotEmptyInDeadObjects) {
@@ -132,17 +125,8 @@ TEST(BrokersOfSeveralKinds, UnderstandEachOthersObjects) {
     EXPECT_EQ(valueOf(instance).path.className, "TEST_Thing");
 }
 
-TEST(BrokerName, IsTheGivenOne) {
-    BrokerOptions options;
-    options.name = "another";
-    Broker broker(nullptr, options);
-    EXPECT_STREQ(CBBrokerName(broker.cmpi()), "another");
-}
-
-TEST(KeysAsProperties, AreSetByABrokerThatDoesSo) {
-    BrokerOptions options;
-    options.keysBecomeProperties = true;
-    Broker broker(nullptr, options);
+TEST(SparseBroker, SetsTheKeysOfAPathAsProperties) {
+    Broker broker(nullptr, BrokerOptions::sparse());
     Request request(broker);
     CMPIObjectPath* const path = CMNewObjectPath(broker.cmpi(), "", "TEST_Thing", nullptr);
     CMAddKey(path, "Name", "x", CMPI_chars);

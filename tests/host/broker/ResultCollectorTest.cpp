@@ -96,9 +96,12 @@ TEST_F(Results, TakeDataOfMethods) {
 }
 
 TEST_F(Results, DoNotTakeErrors) {
-    CMPIError* const error = mb->eft->newCMPIError(mb, "", "", "", ErrorSevLow,
-                                                   ErrorProbCauseUnknown, CMPI_RC_OK, nullptr);
-    EXPECT_EQ(CMReturnError(result, error).rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    CMPIError stranger = {nullptr, nullptr};
+    EXPECT_EQ(CMReturnError(result, &stranger).rc, CMPI_RC_ERR_INVALID_HANDLE);
+    EXPECT_EQ(CMReturnError(result, nullptr).rc, CMPI_RC_ERR_INVALID_PARAMETER);
+    EXPECT_THAT(broker.violations(),
+                ElementsAre("CMPIResultFT.returnError: no CMPIError of this host",
+                            "CMPIResultFT.returnError: null CMPIError"));
 }
 
 TEST_F(Results, CanBeMadeToRefuseInstancesFromTheSecondOn) {

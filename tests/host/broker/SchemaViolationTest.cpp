@@ -177,14 +177,14 @@ TEST_F(SchemaViolations, PathsThatOnlyTheProviderSeesAreNotChecked) {
 
 TEST(Catalogue, TellsHowClassesAreRelated) {
     const TestCatalogue catalogue = testClasses();
-    EXPECT_EQ(kinship(&catalogue, "test_thing", "TEST_Thing"), Kinship::Same);
-    EXPECT_EQ(kinship(&catalogue, "TEST_SmallThing", "TEST_Thing"), Kinship::Below);
-    EXPECT_EQ(kinship(&catalogue, "TEST_SmallThing", "CIM_Thing"), Kinship::Below);
-    EXPECT_EQ(kinship(&catalogue, "TEST_SmallThing", "CIM_Base"), Kinship::Unknown);
-    EXPECT_EQ(kinship(&catalogue, "TEST_Other", "TEST_Thing"), Kinship::Unrelated);
-    EXPECT_EQ(kinship(&catalogue, "TEST_Unknown", "TEST_Thing"), Kinship::Unknown);
-    EXPECT_EQ(kinship(nullptr, "TEST_Thing", "test_thing"), Kinship::Same);
-    EXPECT_EQ(kinship(nullptr, "TEST_SmallThing", "TEST_Thing"), Kinship::Unknown);
+    EXPECT_EQ(classRelation(&catalogue, "test_thing", "TEST_Thing"), ClassRelation::Same);
+    EXPECT_EQ(classRelation(&catalogue, "TEST_SmallThing", "TEST_Thing"), ClassRelation::Subclass);
+    EXPECT_EQ(classRelation(&catalogue, "TEST_SmallThing", "CIM_Thing"), ClassRelation::Subclass);
+    EXPECT_EQ(classRelation(&catalogue, "TEST_SmallThing", "CIM_Base"), ClassRelation::Unknown);
+    EXPECT_EQ(classRelation(&catalogue, "TEST_Other", "TEST_Thing"), ClassRelation::Unrelated);
+    EXPECT_EQ(classRelation(&catalogue, "TEST_Unknown", "TEST_Thing"), ClassRelation::Unknown);
+    EXPECT_EQ(classRelation(nullptr, "TEST_Thing", "test_thing"), ClassRelation::Same);
+    EXPECT_EQ(classRelation(nullptr, "TEST_SmallThing", "TEST_Thing"), ClassRelation::Unknown);
 }
 
 }  // namespace

@@ -2,7 +2,6 @@
 #include "BrokerFixture.h"
 
 #include "host/broker/ComputerSystemService.h"
-#include "host/broker/LibraryService.h"
 #include "host/broker/ProviderLibrary.h"
 
 #include <new>
@@ -234,10 +233,9 @@ TEST_F(Upcalls, AnExceptionNeverReachesTheProvider) {
 
 class LibraryUpcalls : public Upcalls {
   protected:
-    LibraryUpcalls() { broker.route("TEST_Thing", service); }
+    LibraryUpcalls() { broker.route("TEST_Thing", library); }
 
     ProviderLibrary library{KORVA_BINARY_DIR "/lib/libbroker_test_good.so", broker, {"Good"}};
-    LibraryService service{library};
 };
 
 TEST_F(LibraryUpcalls, AreAnsweredByTheOtherLibrary) {

@@ -35,7 +35,7 @@ class PathCompletion : public testing::Test {
     /// The completed path, or the complaint.
     std::string completed(const std::string& text, const std::vector<ObjectPathValue>& names) {
         try {
-            return writePath(completedPath(path(text), names));
+            return toString(completedPath(path(text), names));
         } catch (const UsageError& error) {
             return error.what();
         }

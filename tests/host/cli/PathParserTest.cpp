@@ -228,9 +228,9 @@ TEST(NamespaceParser, ShowsWhereANameIsNone) {
 }
 
 TEST(PathWriter, WritesClassPathsWithoutADot) {
-    EXPECT_EQ(writePath({"root/cimv2", "Thing"}), "root/cimv2:Thing");
-    EXPECT_EQ(writePath({"", "Thing"}), "Thing");
-    EXPECT_EQ(writePath({"root", "Thing", {}, "host"}), "//host/root:Thing");
+    EXPECT_EQ(toString({"root/cimv2", "Thing"}), "root/cimv2:Thing");
+    EXPECT_EQ(toString({"", "Thing"}), "Thing");
+    EXPECT_EQ(toString({"root", "Thing", {}, "host"}), "//host/root:Thing");
 }
 
 TEST(PathWriter, WritesEveryKindOfKey) {
@@ -245,7 +245,7 @@ TEST(PathWriter, WritesEveryKindOfKey) {
                                 {"W", Value::fromText("20240102030405.000000+000", CMPI_dateTime)},
                                 {"K", Value::fromUnsigned(0x20AC, CMPI_char16)},
                                 {"N", Value::null(CMPI_string)}}};
-    EXPECT_EQ(writePath(path),
+    EXPECT_EQ(toString(path),
               R"(n:X.S="a\"b\\c",C="d",U=18446744073709551615,I=-5,T=TRUE,F=FALSE,)"
               "W=\"20240102030405.000000+000\",K=\"\xE2\x82\xAC\",N=\"\"");
 }
@@ -253,9 +253,9 @@ TEST(PathWriter, WritesEveryKindOfKey) {
 TEST(PathWriter, QuotesReferencesWithinReferences) {
     const ObjectPathValue thing{"a/b", "Thing", {{"Name", Value("x\"y")}}};
     const ObjectPathValue link{"a/b", "Link", {{"From", Value::fromReference(thing)}}};
-    EXPECT_EQ(writePath(link), R"(a/b:Link.From="a/b:Thing.Name=\"x\\\"y\"")");
+    EXPECT_EQ(toString(link), R"(a/b:Link.From="a/b:Thing.Name=\"x\\\"y\"")");
     const ObjectPathValue outer{"a/b", "Link", {{"Next", Value::fromReference(link)}}};
-    EXPECT_EQ(writePath(outer),
+    EXPECT_EQ(toString(outer),
               R"(a/b:Link.Next="a/b:Link.From=\"a/b:Thing.Name=\\\"x\\\\\\\"y\\\"\"")");
 }
 
@@ -271,11 +271,11 @@ TEST(PathWriter, WritesWhatTheParserReadsBack) {
          {"Empty", Value("")}}};
     ObjectPathValue link{"interop", "Link", {{"From", Value::fromReference(thing)}}, "host"};
     for (int depth = 0; depth < 4; ++depth) {
-        const std::string text = writePath(link);
+        const std::string text = toString(link);
         const ObjectPathValue back = parsed(text);
         EXPECT_EQ(back, link) << text;
         EXPECT_EQ(back.hostName, "host");
-        EXPECT_EQ(writePath(back), text);
+        EXPECT_EQ(toString(back), text);
         link = {"interop", "Link", {{"Next", Value::fromReference(link)}}, "host"};
     }
 }
