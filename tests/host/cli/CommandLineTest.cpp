@@ -9,13 +9,13 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 
-ParsedCommandLine parsed(std::vector<const char*> words) {
+ParsedCommandLine parsedLine(std::vector<const char*> words) {
     words.insert(words.begin(), "cmpihost");
     return parseCommandLine(static_cast<int>(words.size()), words.data());
 }
 
 CommandLine accepted(const std::vector<const char*>& words) {
-    const ParsedCommandLine result = parsed(words);
+    const ParsedCommandLine result = parsedLine(words);
     EXPECT_TRUE(result.commandLine.has_value()) << result.text;
     return result.commandLine.value_or(CommandLine());
 }
@@ -99,7 +99,7 @@ TEST(CommandLine, TakesAQueryWithLanguageAndNamespace) {
 
 /// The complaint about words that are refused, without the hint at the help.
 std::string refusal(const std::vector<const char*>& words) {
-    const ParsedCommandLine result = parsed(words);
+    const ParsedCommandLine result = parsedLine(words);
     EXPECT_FALSE(result.commandLine.has_value()) << result.text;
     EXPECT_EQ(result.status, exitUsage) << result.text;
     EXPECT_THAT(result.text, testing::StartsWith("cmpihost: "));
@@ -179,14 +179,14 @@ TEST(CommandLine, TakesANumberOfComputerSystemsFromNoneToAThousand) {
 }
 
 TEST(CommandLine, TellsItsVersion) {
-    const ParsedCommandLine result = parsed({"--version"});
+    const ParsedCommandLine result = parsedLine({"--version"});
     EXPECT_FALSE(result.commandLine.has_value());
     EXPECT_EQ(result.status, exitDone);
     EXPECT_EQ(result.text, "cmpihost 1.0.0\n");
 }
 
 TEST(CommandLine, DescribesEverythingInItsHelp) {
-    const ParsedCommandLine result = parsed({"--help"});
+    const ParsedCommandLine result = parsedLine({"--help"});
     EXPECT_FALSE(result.commandLine.has_value());
     EXPECT_EQ(result.status, exitDone);
     for (const char* word : {"Usage: cmpihost [OPTIONS] OPERATION ARGUMENT...",
@@ -224,15 +224,15 @@ TEST(CommandLine, DescribesEverythingInItsHelp) {
 }
 
 TEST(CommandLine, DescribesOneOperation) {
-    const ParsedCommandLine result = parsed({"ai", "--help"});
+    const ParsedCommandLine result = parsedLine({"ai", "--help"});
     EXPECT_EQ(result.status, exitDone);
     EXPECT_THAT(result.text, HasSubstr("Usage: cmpihost ai [OPTIONS] PATH [PROPERTY...]"));
     EXPECT_THAT(result.text, HasSubstr("--assoc-class CLASS"));
     EXPECT_THAT(result.text, HasSubstr("\nPaths:\n"));
     EXPECT_THAT(result.text, testing::Not(HasSubstr("--lang")));
-    EXPECT_THAT(parsed({"xq", "--help"}).text, HasSubstr("--lang NAME=WQL"));
+    EXPECT_THAT(parsedLine({"xq", "--help"}).text, HasSubstr("--lang NAME=WQL"));
     for (const char* word : {"xq", "tree"}) {
-        EXPECT_THAT(parsed({word, "--help"}).text, HasSubstr("--namespace NAME=root/cimv2"));
+        EXPECT_THAT(parsedLine({word, "--help"}).text, HasSubstr("--namespace NAME=root/cimv2"));
     }
 }
 
