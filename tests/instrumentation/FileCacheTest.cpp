@@ -23,9 +23,9 @@ using Counts = std::map<std::string, int>;
 const std::string sessions = "run/systemd/sessions";
 
 /// A host whose files were all changed long ago, by its clock.
-class KeptTest : public testing::Test {
+class FileCacheTest : public testing::Test {
   protected:
-    KeptTest() {
+    FileCacheTest() {
         host.tree().writeCompleteHost();
         host.kernel->fixedNow = std::time(nullptr) + 1000;
     }
@@ -74,7 +74,7 @@ void putLink(const FixtureTree& tree, const std::string& path, const std::string
 constexpr const char* first = "NAME=First\n";
 constexpr const char* other = "NAME=Other\n";  // of the same size
 
-class OsReleaseChanges : public KeptTest, public testing::WithParamInterface<Change> {
+class OsReleaseChanges : public FileCacheTest, public testing::WithParamInterface<Change> {
   protected:
     OsReleaseChanges() {
         tree().remove("etc/os-release");
@@ -115,7 +115,7 @@ const Change osReleaseChanges[] = {
 
 INSTANTIATE_TEST_SUITE_P(Of, OsReleaseChanges, testing::ValuesIn(osReleaseChanges), nameOf);
 
-TEST_F(KeptTest, OsReleaseLinkThatIsPointedElsewhereIsFollowedThere) {
+TEST_F(FileCacheTest, OsReleaseLinkThatIsPointedElsewhereIsFollowedThere) {
     tree().write("data/first", first);
     tree().write("data/other", other);
     putLink(tree(), "etc/os-release", "../data/first");
@@ -126,7 +126,7 @@ TEST_F(KeptTest, OsReleaseLinkThatIsPointedElsewhereIsFollowedThere) {
     }
 }
 
-TEST_F(KeptTest, OsReleaseIsSeenWhereThereWasNone) {
+TEST_F(FileCacheTest, OsReleaseIsSeenWhereThereWasNone) {
     tree().remove("etc/os-release");
     EXPECT_EQ(host.text(Name), "Linux");
     const Counts twoLooks{{"look at /etc/os-release", 1}, {"look at /usr/lib/os-release", 1}};
@@ -139,54 +139,42 @@ TEST_F(KeptTest, OsReleaseIsSeenWhereThereWasNone) {
     EXPECT_EQ(countsOf<std::string>(Name), (Counts{{"look at /etc/os-release", 1}}));
 }
 
-const Counts readAnew{{"look at /etc/os-release", 2}, {"etc/os-release", 1}};
-const Counts readAtFirst{{"look at /etc/os-release", 1}, {"etc/os-release", 1}};
-
-TEST_F(KeptTest, YoungFileIsReadEachTime) {
-    const struct timespec dates[2] = {{0, UTIME_OMIT}, {1500000000, 999999999}};
-    ASSERT_EQ(::utimensat(AT_FDCWD, tree().path("etc/os-release").c_str(), dates, 0), 0);
-    const auto changed = host.files->state("etc/os-release")->changed.seconds;
-    for (const auto now : {changed - 100, changed, changed + 2}) {
-        host.kernel->fixedNow = now;
-        EXPECT_EQ(countsOf<std::string>(Name), readAtFirst) << now - changed;
+TEST_F(FileCacheTest, FileIsReadEachTimeUntilItIsOlderThanTheGrainOfItsClock) {
+    const auto isReadAgain = [&] {
+        return countsOf<std::string>(Name).count("etc/os-release") != 0;
+    };
+    for (const std::int64_t date : {std::int64_t{1500000000}, std::int64_t{4000000000}}) {
+        const struct timespec dates[2] = {{0, UTIME_OMIT}, {date, 999999999}};
+        ASSERT_EQ(::utimensat(AT_FDCWD, tree().path("etc/os-release").c_str(), dates, 0), 0);
+        const auto newest = std::max(date, host.files->state("etc/os-release")->changed.seconds);
+        for (const auto now : {newest - 1000, newest, newest + 2}) {
+            host.kernel->fixedNow = now;
+            EXPECT_TRUE(isReadAgain()) << now - newest;
+        }
+        host.kernel->fixedNow = newest + 3;
+        EXPECT_TRUE(isReadAgain());
+        EXPECT_EQ(countsOf<std::string>(Name), (Counts{{"look at /etc/os-release", 1}}));
     }
-    host.kernel->fixedNow = changed + 3;
-    EXPECT_EQ(countsOf<std::string>(Name), readAtFirst);
-    EXPECT_EQ(countsOf<std::string>(Name), (Counts{{"look at /etc/os-release", 1}}));
-}
-
-TEST_F(KeptTest, FileOfTheFutureIsReadEachTime) {
-    constexpr std::int64_t date = 4000000000;
-    const struct timespec dates[2] = {{0, UTIME_OMIT}, {date, 0}};
-    ASSERT_EQ(::utimensat(AT_FDCWD, tree().path("etc/os-release").c_str(), dates, 0), 0);
-    for (const auto now : {date - 1000, date + 2}) {
-        host.kernel->fixedNow = now;
-        EXPECT_EQ(countsOf<std::string>(Name), readAtFirst) << now - date;
-    }
-    host.kernel->fixedNow = date + 3;
-    EXPECT_EQ(countsOf<std::string>(Name), readAtFirst);
-    EXPECT_EQ(countsOf<std::string>(Name), (Counts{{"look at /etc/os-release", 1}}));
-}
-
-TEST_F(KeptTest, ClockBeforeTheEpochKeepsNothing) {
+    tree().write("etc/os-release", first);
     for (const std::int64_t now : {std::int64_t{1}, std::numeric_limits<std::int64_t>::min()}) {
         host.kernel->fixedNow = now;
-        EXPECT_EQ(countsOf<std::string>(Name), readAtFirst) << now;
+        EXPECT_TRUE(isReadAgain()) << now;
     }
 }
 
-TEST_F(KeptTest, FileThatIsNotReadWholeOrHasNoSizeIsReadEachTime) {
+TEST_F(FileCacheTest, FileThatIsNotReadWholeOrHasNoSizeIsReadEachTime) {
     tree().write("data/large", std::string(2 * 1024 * 1024, '\n'));
+    const Counts onceEach{{"look at /etc/os-release", 1}, {"etc/os-release", 1}};
     for (const char* target : {"../data/large", "/proc/version", "/proc/self/mem"}) {
         putLink(tree(), "etc/os-release", target);
         for (int i = 0; i < 3; ++i) {
-            EXPECT_EQ(countsOf<std::string>(Name), readAtFirst) << target;
+            EXPECT_EQ(countsOf<std::string>(Name), onceEach) << target;
             EXPECT_EQ(host.text(Name), "Linux");
         }
     }
 }
 
-TEST_F(KeptTest, WhatCouldNotBeOpenedIsTriedAgain) {
+TEST_F(FileCacheTest, WhatCouldNotBeOpenedIsTriedAgain) {
     struct rlimit before;
     ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &before), 0);
     struct rlimit none = before;
@@ -201,7 +189,7 @@ TEST_F(KeptTest, WhatCouldNotBeOpenedIsTriedAgain) {
     EXPECT_EQ(host.number(NumberOfUsers), 2u);
 }
 
-TEST_F(KeptTest, NothingIsMixedUpBetweenTwoRoots) {
+TEST_F(FileCacheTest, NothingIsMixedUpBetweenTwoRoots) {
     FixtureHost second;
     second.kernel->fixedNow = host.kernel->fixedNow;
     second.tree().write("etc/os-release", other);
@@ -215,7 +203,7 @@ TEST_F(KeptTest, NothingIsMixedUpBetweenTwoRoots) {
 
 // Sessions
 
-class SessionChanges : public KeptTest, public testing::WithParamInterface<Change> {};
+class SessionChanges : public FileCacheTest, public testing::WithParamInterface<Change> {};
 
 TEST_P(SessionChanges, AreSeenByTheNextRequest) {
     tree().write(sessions + "/3", "CLASS=user\nSTATE=closing\n");
@@ -246,7 +234,7 @@ const Change sessionChanges[] = {
 
 INSTANTIATE_TEST_SUITE_P(Of, SessionChanges, testing::ValuesIn(sessionChanges), nameOf);
 
-TEST_F(KeptTest, SessionThatEndsIsGone) {
+TEST_F(FileCacheTest, SessionThatEndsIsGone) {
     EXPECT_EQ(host.number(NumberOfUsers), 2u);
     tree().remove(sessions + "/1");
     EXPECT_EQ(host.number(NumberOfUsers), 1u);
@@ -256,7 +244,7 @@ TEST_F(KeptTest, SessionThatEndsIsGone) {
     EXPECT_EQ(host.number(NumberOfUsers), 1u);
 }
 
-TEST_F(KeptTest, OnlyFoldersAreListedAndOnlyRegularFilesOpened) {
+TEST_F(FileCacheTest, OnlyFoldersAreListedAndOnlyRegularFilesOpened) {
     tree().remove("run");
     tree().makeFifo("etc/os-release.fifo");
     putLink(tree(), "etc/os-release", "os-release.fifo");
@@ -275,7 +263,7 @@ TEST_F(KeptTest, OnlyFoldersAreListedAndOnlyRegularFilesOpened) {
                       {"look at /run/systemd/sessions/1.ref", 1}}));
 }
 
-TEST_F(KeptTest, ManySessionsAreReadEachTime) {
+TEST_F(FileCacheTest, ManySessionsAreReadEachTime) {
     tree().remove(sessions + "/1");
     tree().remove(sessions + "/c2");
     for (int i = 1; i < 256; ++i) tree().write(sessions + '/' + std::to_string(i), "CLASS=user\n");
@@ -288,9 +276,9 @@ TEST_F(KeptTest, ManySessionsAreReadEachTime) {
 
 // The boot time
 
-class KeptBootTime : public KeptTest {
+class BootTimeCache : public FileCacheTest {
   protected:
-    KeptBootTime() {
+    BootTimeCache() {
         host.kernel->fixedBootTime = 1700000000;
         host.files->sizeless.insert("proc/stat");
     }
@@ -298,61 +286,50 @@ class KeptBootTime : public KeptTest {
     bool isReadAgain() { return countsOf<std::string>(LastBootUpTime).count("proc/stat") != 0; }
 };
 
-TEST_F(KeptBootTime, IsReadOnceWhileTheClocksAgreeWithIt) {
-    EXPECT_TRUE(isReadAgain());
-    EXPECT_FALSE(isReadAgain());
+TEST_F(BootTimeCache, IsReadUnlessTheClocksToldTheSameBeyondDoubtThenAndNow) {
+    const struct {
+        std::optional<std::int64_t> clock;
+        bool exact, read;
+    } steps[] = {
+        {1699999999, true, true},  {1699999999, true, true},   // another second: not kept
+        {1700000000, false, true}, {1700000000, true, true},   // in doubt: not kept
+        {1700000000, true, false}, {1700000000, false, true},  // kept, and now in doubt
+        {1700000000, true, false}, {std::nullopt, true, true}, {1700000001, true, true},
+    };
+    for (const auto& step : steps) {
+        host.kernel->fixedBootTime = step.clock;
+        host.kernel->bootTimeIsExact = step.exact;
+        EXPECT_EQ(isReadAgain(), step.read) << &step - steps;
+        EXPECT_EQ(host.text(LastBootUpTime), "2023-11-14-22:13:20");
+    }
+    host.kernel->fixedBootTime = 1700000000;
     EXPECT_EQ(countsOf<std::string>(LastBootUpTime), (Counts{{"look at /proc/stat", 1}}));
-    EXPECT_EQ(host.text(LastBootUpTime), "2023-11-14-22:13:20");
 }
 
-TEST_F(KeptBootTime, IsReadAgainOnceTheClockWasSet) {
+TEST_F(BootTimeCache, IsReadAgainOnceTheClockWasSet) {
     EXPECT_EQ(host.text(LastBootUpTime), "2023-11-14-22:13:20");
     host.kernel->fixedBootTime = 1700000001;
     tree().write("proc/stat", "btime 1700000001\nprocesses 1\n");
     EXPECT_EQ(host.text(LastBootUpTime), "2023-11-14-22:13:21");
     EXPECT_FALSE(isReadAgain());
-    host.kernel->fixedBootTime = std::nullopt;
-    EXPECT_TRUE(isReadAgain());
 }
 
-TEST_F(KeptBootTime, IsReadAgainWhileTheClocksAreInDoubt) {
-    EXPECT_TRUE(isReadAgain());
-    host.kernel->bootTimeIsExact = false;
-    EXPECT_TRUE(isReadAgain());
-    host.kernel->bootTimeIsExact = true;
-    EXPECT_FALSE(isReadAgain());
-}
-
-TEST_F(KeptBootTime, IsReadAgainFromAnotherFile) {
+TEST_F(BootTimeCache, IsReadAgainFromAnotherFile) {
     EXPECT_TRUE(isReadAgain());
     wait();
     renameOver(tree(), "proc/stat", "btime 1800000000\nprocesses 1\n");
     EXPECT_EQ(host.text(LastBootUpTime), "2027-01-15-08:00:00");
 }
 
-TEST_F(KeptBootTime, IsNotKeptWhileTheClocksDifferOrDoubt) {
-    host.kernel->fixedBootTime = 1699999999;
-    EXPECT_TRUE(isReadAgain());
-    EXPECT_TRUE(isReadAgain());
-    host.kernel->fixedBootTime = 1700000000;
-    host.kernel->bootTimeIsExact = false;
-    EXPECT_TRUE(isReadAgain());
-    host.kernel->bootTimeIsExact = true;
-    EXPECT_TRUE(isReadAgain());
-    EXPECT_FALSE(isReadAgain());
-}
-
-TEST_F(KeptBootTime, OfAFileThatIsNotTheKernelsIsNotKept) {
-    host.files->sizeless.clear();
-    EXPECT_TRUE(isReadAgain());
-    EXPECT_TRUE(isReadAgain());
-}
-
-TEST_F(KeptBootTime, OfTheClocksIsNotKept) {
+TEST_F(BootTimeCache, OfTheClocksOrOfAFileThatIsNotTheKernelsIsNotKept) {
     tree().write("proc/stat", "cpu 1\n");
     EXPECT_TRUE(isReadAgain());
     EXPECT_TRUE(isReadAgain());
     EXPECT_EQ(host.text(LastBootUpTime), "2023-11-14-22:13:20");
+    tree().write("proc/stat", "btime 1700000000\n");
+    host.files->sizeless.clear();
+    EXPECT_TRUE(isReadAgain());
+    EXPECT_TRUE(isReadAgain());
 }
 
 }  // namespace

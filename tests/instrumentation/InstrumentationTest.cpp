@@ -68,16 +68,9 @@ class InstrumentationTest : public testing::Test {
     }
 };
 
-TEST_F(InstrumentationTest, StandsOnNoNodeBeforeItSelects) {
-    Instrumentation onThisMachine;
-    expectNothing(onThisMachine);
-    VA::setHostSource(SimulatedHost::withOneNode());
-    Instrumentation simulated;
-    expectNothing(simulated);
-}
-
 TEST_F(InstrumentationTest, FindsOneOperatingSystemOnThisMachineAndNothingBehindIt) {
     Instrumentation cursor;
+    expectNothing(cursor);
     EXPECT_TRUE(cursor.selectNode(OperatingSystemNode));
     EXPECT_TRUE(isValid(cursor));
     EXPECT_NE(nameOf(cursor), "none");
@@ -88,23 +81,18 @@ TEST_F(InstrumentationTest, FindsOneOperatingSystemOnThisMachineAndNothingBehind
     EXPECT_NE(name, "");
 }
 
-TEST_F(InstrumentationTest, MovingPastTheLastNodeIsFinal) {
-    VA::setHostSource(SimulatedHost::withOneNode());
-    Instrumentation cursor;
-    cursor.selectNode(OperatingSystemNode);
-    for (int i = 0; i < 3; ++i) {
-        ++cursor;
+TEST_F(InstrumentationTest, IsOnNoNodeBeforeTheFirstAndForGoodAfterTheLast) {
+    for (const bool hasNode : {true, false}) {
+        VA::setHostSource(hasNode ? SimulatedHost::withOneNode()
+                                  : std::make_shared<SimulatedHost>());
+        Instrumentation cursor;
         expectNothing(cursor);
+        EXPECT_EQ(cursor.selectNode(OperatingSystemNode), hasNode);
+        for (int i = 0; i < 3; ++i) {
+            if (i > 0 || hasNode) ++cursor;
+            expectNothing(cursor);
+        }
     }
-}
-
-TEST_F(InstrumentationTest, HostWithoutNodesIsEmptyFromTheStart) {
-    VA::setHostSource(std::make_shared<SimulatedHost>());
-    Instrumentation cursor;
-    EXPECT_FALSE(cursor.selectNode(OperatingSystemNode));
-    expectNothing(cursor);
-    ++cursor;
-    expectNothing(cursor);
 }
 
 TEST_F(InstrumentationTest, OtherNodeTypesHaveNoNodes) {
@@ -140,25 +128,20 @@ TEST_F(InstrumentationTest, KeepsItsSourceAliveAndLetsItGo) {
     EXPECT_TRUE(watched.expired());
 }
 
-TEST_F(InstrumentationTest, NullRestoresThisMachine) {
-    VA::setHostSource(hostNamed("simulated"));
+TEST_F(InstrumentationTest, CurrentSourceIsTheOneThatWasSetAndWithNoneThisMachineForAll) {
+    const auto host = hostNamed("simulated");
+    VA::setHostSource(host);
+    EXPECT_EQ(VA::currentHostSource(), host);
     VA::setHostSource(nullptr);
+    const auto machine = VA::currentHostSource();
+    ASSERT_TRUE(machine);
+    EXPECT_EQ(VA::currentHostSource(), machine);
     Instrumentation cursor;
     cursor.selectNode(OperatingSystemNode);
     EXPECT_NE(nameOf(cursor), "simulated");
     unsigned int type = 0;
     EXPECT_TRUE(cursor.getProperty(OSType, type));
     EXPECT_EQ(type, 35u);
-}
-
-TEST_F(InstrumentationTest, CurrentSourceIsTheOneThatWasSetAndOneAndTheSameByDefault) {
-    const auto host = hostNamed("x");
-    VA::setHostSource(host);
-    EXPECT_EQ(VA::currentHostSource(), host);
-    VA::setHostSource(nullptr);
-    const auto first = VA::currentHostSource();
-    ASSERT_TRUE(first);
-    EXPECT_EQ(VA::currentHostSource(), first);
 }
 
 TEST_F(InstrumentationTest, ReadsALinuxHostUnderAnyRoot) {

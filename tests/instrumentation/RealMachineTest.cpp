@@ -13,8 +13,7 @@
 #include <fstream>
 #include <functional>
 #include <map>
-#include <sstream>
-#include <variant>
+#include <string>
 
 #include "framework/instrumentation/Linux/Systemd.h"
 #include "framework/instrumentation/LinuxHost.h"
@@ -23,21 +22,12 @@ namespace {
 
 using namespace VA::NodeLexicon;
 
-// A property as the host source tells it: absent, or of one of the three types.
-using Reading = std::variant<std::monostate, std::string, unsigned int, bool>;
-
-void print(const Reading& reading, std::ostream& out) {
-    if (const auto* text = std::get_if<std::string>(&reading)) out << '"' << *text << '"';
-    if (const auto* number = std::get_if<unsigned int>(&reading)) out << *number;
-    if (const auto* flag = std::get_if<bool>(&reading)) out << (*flag ? "true" : "false");
-    if (std::holds_alternative<std::monostate>(reading)) out << "absent";
-}
-
-std::string described(const Reading& reading) {
-    std::ostringstream out;
-    print(reading, out);
-    return out.str();
-}
+// What a number, or the instant of a date, has to be, give or take the tolerance; nothing where the
+// property is to be absent.
+struct Expected {
+    std::optional<double> value;
+    double tolerance = 0;
+};
 
 std::string shell(const std::string& command) {
     std::string output;
@@ -60,30 +50,23 @@ std::optional<double> meminfo(const std::string& row) {
     return shellNumber("awk '$1 == \"" + row + ":\" {print $2}' /proc/meminfo 2>/dev/null");
 }
 
-Reading saturatedNumber(std::optional<double> expected) {
-    if (!expected) return std::monostate{};
-    return static_cast<unsigned int>(std::min(*expected, 4294967295.0));
-}
-
-// Fails unless `actual` is `expected`, give or take `tolerance`; absent when nothing is expected.
-void expectNear(const Reading& actual, std::optional<double> expected, double tolerance) {
-    if (!expected) {
-        EXPECT_TRUE(std::holds_alternative<std::monostate>(actual)) << described(actual);
-        return;
-    }
-    const auto* number = std::get_if<unsigned int>(&actual);
-    ASSERT_TRUE(number) << described(actual);
-    EXPECT_NEAR(static_cast<double>(*number), *expected, tolerance);
-}
-
-double sysinfoKiB(unsigned long value, unsigned int unit) {
-    return static_cast<double>(value) * static_cast<double>(unit) / 1024.0;
-}
-
-struct sysinfo systemInfo() {
+// A size that sysinfo tells, in kilobytes.
+double sysinfoKiB(unsigned long size(const struct sysinfo&)) {
     struct sysinfo info {};
     EXPECT_EQ(::sysinfo(&info), 0);
-    return info;
+    return static_cast<double>(size(info)) * info.mem_unit / 1024.0;
+}
+
+double ram() {
+    return sysinfoKiB([](const struct sysinfo& info) { return info.totalram; });
+}
+
+double swap() {
+    return sysinfoKiB([](const struct sysinfo& info) { return info.totalswap; });
+}
+
+Expected totalSwap() {
+    return {swap(), 1.0};
 }
 
 double instantOf(const std::string& text) {
@@ -120,149 +103,120 @@ std::string firstNonEmpty(std::initializer_list<std::string> texts) {
     return {};
 }
 
-void checkInstallDate(const Reading& actual) {
-    const double now = static_cast<double>(std::time(nullptr));
-    std::optional<double> expected;
+std::string uname(char (utsname::*part)[65]) {
+    struct utsname names {};
+    ::uname(&names);
+    return names.*part;
+}
+
+Expected installDate() {
     for (const char* command : {"stat -c %W /", "stat -L -c %Z /var/log/installer 2>/dev/null",
                                 "stat -L -c %Z /etc/machine-id 2>/dev/null"}) {
         const auto found = shellNumber(command);
-        const bool plausible =
-            found && *found > 694224000 - 1 && *found < bootInstant() + 1 && *found <= now;
-        if (plausible && !expected) expected = found;
+        if (found && *found > 694224000 - 1 && *found < bootInstant() + 1 &&
+            *found <= static_cast<double>(std::time(nullptr)))
+            return {found, 1.0};
     }
-    if (!expected) {
-        EXPECT_TRUE(std::holds_alternative<std::monostate>(actual)) << described(actual);
-        return;
-    }
-    ASSERT_TRUE(std::holds_alternative<std::string>(actual)) << described(actual);
-    EXPECT_NEAR(instantOf(std::get<std::string>(actual)), *expected, 1.0);
+    return {};
 }
 
-void checkBootTime(const Reading& actual) {
-    ASSERT_TRUE(std::holds_alternative<std::string>(actual)) << described(actual);
-    EXPECT_NEAR(instantOf(std::get<std::string>(actual)), bootInstant(), 2.0);
-}
-
-void checkMaxProcesses(const Reading& actual) {
+Expected maxProcesses() {
     const auto pids = shellNumber("cat /proc/sys/kernel/pid_max 2>/dev/null");
     const auto threads = shellNumber("cat /proc/sys/kernel/threads-max 2>/dev/null");
-    if (pids && threads) {
-        EXPECT_EQ(described(actual), described(saturatedNumber(std::min(*pids, *threads))));
-    } else {
-        EXPECT_EQ(described(actual), described(saturatedNumber(pids ? pids : threads)));
-    }
+    if (pids && threads) return {std::min(*pids, *threads)};
+    return {pids ? pids : threads};
 }
 
-void checkMaxProcessMemory(const Reading& actual) {
-    const auto kiB = shellNumber("ulimit -S -v");
-    EXPECT_EQ(described(actual), described(saturatedNumber(kiB ? *kiB : 0.0)));
-}
-
-void checkProcesses(const Reading& actual) {
+Expected processes() {
     glob_t found{};
-    ASSERT_EQ(::glob("/proc/[0-9]*", GLOB_ONLYDIR, nullptr, &found), 0);
+    EXPECT_EQ(::glob("/proc/[0-9]*", GLOB_ONLYDIR, nullptr, &found), 0);
     const auto count = static_cast<double>(found.gl_pathc);
     ::globfree(&found);
-    expectNear(actual, count, 100.0);  // others come and go meanwhile
+    return {count, 100.0};  // others come and go meanwhile
 }
 
-void checkUsers(const Reading& actual) {
+Expected users() {
     if (::access("/run/systemd/sessions", R_OK | X_OK) == 0) {
-        expectNear(
-            actual,
+        return {
             shellNumber("cd /run/systemd/sessions; for s in *; do "
                         "if [ -f \"$s\" ] && grep -qxE 'CLASS=user(-early)?(-light)?' \"$s\" && "
-                        "! grep -qx STATE=closing \"$s\"; then echo x; fi; done | wc -l"),
-            0.0);
-    } else if (::access("/run/utmp", R_OK) == 0 || ::access("/var/run/utmp", R_OK) == 0) {
-        expectNear(actual, shellNumber("who | wc -l"), 10.0);
-    } else {
-        expectNear(actual, std::nullopt, 0.0);
+                        "! grep -qx STATE=closing \"$s\"; then echo x; fi; done | wc -l")};
     }
+    if (::access("/run/utmp", R_OK) == 0 || ::access("/var/run/utmp", R_OK) == 0)
+        return {shellNumber("who | wc -l"), 10.0};
+    return {};
 }
 
-void checkFreePhysical(const Reading& actual) {
-    const auto total = meminfo("MemTotal");
-    expectNear(actual, meminfo("MemAvailable"), total.value_or(0) / 4);
-}
-
-void checkFreeVirtual(const Reading& actual) {
-    const auto total = meminfo("MemTotal");
-    const auto available = meminfo("MemAvailable");
-    ASSERT_TRUE(total && available);
-    expectNear(actual, *available + meminfo("SwapFree").value_or(0), *total / 4);
-}
-
-void checkTotalSwap(const Reading& actual) {
-    const auto info = systemInfo();
-    expectNear(actual, sysinfoKiB(info.totalswap, info.mem_unit), 1.0);
-}
-
-// The value of an independent reading that must be met exactly.
-std::function<void(const Reading&)> equals(std::function<Reading()> expected) {
-    return
-        [expected](const Reading& actual) { EXPECT_EQ(described(actual), described(expected())); };
-}
-
-const std::map<unsigned int, std::function<void(const Reading&)>> checks{
-    {Name, equals([] {
-         struct utsname names {};
-         ::uname(&names);
-         return Reading(firstNonEmpty({osReleaseValue("NAME"), names.sysname}));
-     })},
-    {OSType, equals([] { return Reading(35u); })},
-    {Version, equals([] {
-         struct utsname names {};
-         ::uname(&names);
-         return Reading(firstNonEmpty(
-             {osReleaseValue("VERSION_ID"), osReleaseValue("BUILD_ID"), names.release}));
-     })},
-    {InstallDate, checkInstallDate},
-    {Distributed, equals([] { return Reading(false); })},
-    {LastBootUpTime, checkBootTime},
-    {MaxNumberOfProcesses, checkMaxProcesses},
-    {MaxProcessMemorySize, checkMaxProcessMemory},
-    {NumberOfProcesses, checkProcesses},
-    {NumberOfUsers, checkUsers},
-    {NumberOfLicensedUsers, equals([] { return Reading(0u); })},
-    {TotalVirtualMemorySize,
-     [](const Reading& actual) {
-         const auto info = systemInfo();
-         expectNear(
-             actual,
-             sysinfoKiB(info.totalram, info.mem_unit) + sysinfoKiB(info.totalswap, info.mem_unit),
-             8.0);
+const std::map<unsigned int, std::function<std::string()>> texts{
+    {Name,
+     [] {
+         return firstNonEmpty({osReleaseValue("NAME"), uname(&utsname::sysname)});
      }},
-    {FreeVirtualMemory, checkFreeVirtual},
-    {FreePhysicalMemory, checkFreePhysical},
-    {TotalVisibleMemorySize,
-     [](const Reading& actual) {
-         const auto info = systemInfo();
-         expectNear(actual, sysinfoKiB(info.totalram, info.mem_unit), 8.0);
-     }},
-    {TotalSwapSpaceSize, checkTotalSwap},
-    {SizeStoredInPagingFiles, checkTotalSwap},
-    {FreeSpaceInPagingFiles,
-     [](const Reading& actual) {
-         const auto info = systemInfo();
-         expectNear(actual, sysinfoKiB(info.freeswap, info.mem_unit),
-                    sysinfoKiB(info.totalswap, info.mem_unit) / 4);
+    {Version,
+     [] {
+         return firstNonEmpty(
+             {osReleaseValue("VERSION_ID"), osReleaseValue("BUILD_ID"), uname(&utsname::release)});
      }},
 };
 
-Reading readingOf(VA::NodeCursor& cursor, Properties id) {
-    std::string text;
-    if (cursor.readProperty(id, text)) return text;
-    unsigned int number = 0;
-    if (cursor.readProperty(id, number)) return number;
-    bool flag = false;
-    if (cursor.readProperty(id, flag)) return flag;
-    return std::monostate{};
-}
+const std::map<unsigned int, std::function<Expected()>> dates{
+    {InstallDate, installDate},
+    {LastBootUpTime,
+     [] {
+         return Expected{bootInstant(), 2.0};
+     }},
+};
+
+const std::map<unsigned int, std::function<Expected()>> numbers{
+    {OSType, [] { return Expected{35}; }},
+    {MaxNumberOfProcesses, maxProcesses},
+    {MaxProcessMemorySize, [] { return Expected{shellNumber("ulimit -S -v").value_or(0)}; }},
+    {NumberOfProcesses, processes},
+    {NumberOfUsers, users},
+    {NumberOfLicensedUsers, [] { return Expected{0}; }},
+    {TotalVirtualMemorySize,
+     [] {
+         return Expected{ram() + swap(), 8.0};
+     }},
+    {FreeVirtualMemory,
+     [] {
+         return Expected{meminfo("MemAvailable").value() + meminfo("SwapFree").value_or(0),
+                         ram() / 4};
+     }},
+    {FreePhysicalMemory,
+     [] {
+         return Expected{meminfo("MemAvailable"), ram() / 4};
+     }},
+    {TotalVisibleMemorySize,
+     [] {
+         return Expected{ram(), 8.0};
+     }},
+    {TotalSwapSpaceSize, totalSwap},
+    {SizeStoredInPagingFiles, totalSwap},
+    {FreeSpaceInPagingFiles,
+     [] {
+         return Expected{sysinfoKiB([](const struct sysinfo& info) { return info.freeswap; }),
+                         swap() / 4};
+     }},
+};
 
 class RealMachine : public testing::Test {
   protected:
     RealMachine() : cursor(host->openCursor()) { EXPECT_TRUE(cursor->select(OperatingSystemNode)); }
+
+    template <class T>
+    std::optional<T> read(unsigned int id) {
+        T value{};
+        const bool found = cursor->readProperty(Properties(id), value);
+        return found ? std::optional<T>(value) : std::nullopt;
+    }
+
+    static void expectNear(std::optional<double> actual, const Expected& expected) {
+        ASSERT_EQ(actual.has_value(), expected.value.has_value());
+        if (actual) {
+            EXPECT_NEAR(*actual, std::min(*expected.value, 4294967295.0), expected.tolerance);
+        }
+    }
 
     const std::shared_ptr<VA::HostSource> host = VA::makeLinuxHost();
     std::unique_ptr<VA::NodeCursor> cursor;
@@ -271,14 +225,22 @@ class RealMachine : public testing::Test {
 TEST_F(RealMachine, EveryPropertyAgreesWithAnIndependentReading) {
     for (unsigned int id = 0; id < 1000; ++id) {
         SCOPED_TRACE(id);
-        const Reading reading = readingOf(*cursor, Properties(id));
-        const auto check = checks.find(id);
-        if (check != checks.end()) {
-            check->second(reading);
+        const auto text = read<std::string>(id);
+        const auto number = read<unsigned int>(id);
+        if (texts.count(id) != 0) {
+            EXPECT_EQ(text, texts.at(id)());
+        } else if (dates.count(id) != 0) {
+            expectNear(text ? std::optional(instantOf(*text)) : std::nullopt, dates.at(id)());
         } else {
-            EXPECT_TRUE(std::holds_alternative<std::monostate>(reading))
-                << "nothing here checks " << described(reading);
+            EXPECT_FALSE(text) << "nothing here checks " << *text;
         }
+        if (numbers.count(id) != 0) {
+            expectNear(number ? std::optional<double>(*number) : std::nullopt, numbers.at(id)());
+        } else {
+            EXPECT_FALSE(number) << "nothing here checks " << *number;
+        }
+        const auto distributed = id == Distributed ? std::optional(false) : std::nullopt;
+        EXPECT_EQ(read<bool>(id), distributed);
     }
 }
 
