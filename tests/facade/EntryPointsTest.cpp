@@ -1,9 +1,13 @@
+#include <pthread.h>
+
 #include <cstring>
 #include <fstream>
+#include <functional>
 
 #include "facade/FacadeFixture.h"
+#include "support/GoldenFile.h"
 
-// The factories and their tables, and the file's coming and going.
+// The factories and their tables, the records of requests, and the file's coming and going.
 
 namespace {
 
@@ -38,8 +42,8 @@ TEST_F(FacadeEntryPoints, EitherFactoryAloneServesItsRequests) {
     options.instance = true;
     options.association = false;
     const ProviderLibrary alone(file, broker, options);
-    OperationRequest request;
-    request.path = path("KORVA_OperatingSystem");
+    const OperationRequest request =
+        requestFor(Operation::EnumerateInstances, path("KORVA_OperatingSystem"));
     EXPECT_EQ(cmpihost::invoke(alone, broker, request).instances.size(), 1U);
 }
 
@@ -90,6 +94,56 @@ TEST_F(FacadeEntryPoints, IsGoneWithTheProviderAfterEachOfAHundredUses) {
         EXPECT_FALSE(mapped("libkorvaosstatusfacade"));
         EXPECT_FALSE(mapped("libkorzbosstatusprofileprovider"));
     }
+}
+
+// The whole sequence of records that a request leaves: the provider's for each question, and one
+// line for a refusal. The expected ones stand in records/, a file a sequence.
+TEST_F(FacadeEntryPoints, LeaveTheProvidersRecordsAndOneOfARefusal) {
+    const ObjectPathValue system = operatingSystemPath("host1", "Linux");
+    OperationRequest query = requestFor(Operation::ExecQuery, path("KORVA_OperatingSystem"));
+    query.query = "SELECT * FROM KORVA_OperatingSystem";
+    const std::pair<const char*, OperationRequest> rows[] = {
+        {"AssociatorsOfOperatingSystemByCapabilities",
+         associationRequest(Operation::Associators, system, "CIM_ElementCapabilities")},
+        {"GetInstanceOfUnknownOperatingSystem",
+         requestFor(Operation::GetInstance, operatingSystemPath("host1", "other"))},
+        {"DeleteInstance", requestFor(Operation::DeleteInstance, system)},
+        // Object managers evaluate a refused query themselves, and the request succeeds: no line.
+        {"ExecQuery", query},
+    };
+    for (const auto& [name, request] : rows) {
+        ask(request);
+        expectGolden(std::string(KORVA_TEST_DATA "/records/") + name + ".txt",
+                     recording::takeRendered());
+    }
+    const Outcome refused = ask(query);
+    EXPECT_EQ(refused.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_EQ(refused.message, "ExecQuery is not supported for KORVA_OperatingSystem");
+    // Of a source of another class nobody is asked.
+    ask(associationRequest(Operation::AssociatorNames, path("TEST_Thing", {{"Name", "x"}})));
+    EXPECT_EQ(recording::takeRendered(), "");
+}
+
+// A thread that ends while a refusal is recorded, at a cancellation point of the log.
+TEST_F(FacadeEntryPoints, LetACancelledThreadEndWhileARefusalIsRecorded) {
+    recording::setHook([](const recording::Record& record) {
+        if (record.category != "Zumbrel.OSStatusFacade") return;
+        ::pthread_cancel(::pthread_self());
+        ::pthread_testcancel();
+    });
+    std::function<void()> askForNothing = [this] {
+        ask(Operation::EnumerateInstances, path("Nothing"));
+    };
+    const auto run = [](void* function) -> void* {
+        (*static_cast<std::function<void()>*>(function))();
+        return nullptr;
+    };
+    pthread_t thread{};
+    ASSERT_EQ(::pthread_create(&thread, nullptr, run, &askForNothing), 0);
+    void* result = nullptr;
+    ::pthread_join(thread, &result);
+    recording::setHook({});
+    EXPECT_EQ(result, PTHREAD_CANCELED);
 }
 
 // With the broker that has only what it must have.

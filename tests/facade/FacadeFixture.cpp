@@ -1,5 +1,7 @@
 #include "facade/FacadeFixture.h"
 
+#include <algorithm>
+
 namespace facade {
 
 const char* const file = KORVA_BINARY_DIR "/lib/libkorvaosstatusfacade.so.1";
@@ -8,6 +10,25 @@ LoadOptions loadOptions() {
     LoadOptions options;
     options.providerName = "OSStatusFacade";
     return options;
+}
+
+ObjectPathValue operatingSystemWith(const std::vector<KeyBinding>& changes) {
+    ObjectPathValue result = operatingSystemPath("host1", "Linux");
+    for (const KeyBinding& change : changes) {
+        const auto same = [&change](const KeyBinding& key) { return key.name == change.name; };
+        const auto found = std::find_if(result.keys.begin(), result.keys.end(), same);
+        if (found == result.keys.end())
+            result.keys.push_back(change);
+        else
+            found->value = change.value;
+    }
+    return result;
+}
+
+Texts propertyNames(const InstanceValue& instance) {
+    Texts result;
+    for (const PropertyValue& property : instance.properties) result.push_back(property.name);
+    return result;
 }
 
 FacadeFixture::FacadeFixture(BrokerOptions options)
@@ -20,9 +41,7 @@ Outcome FacadeFixture::ask(const OperationRequest& request) {
 
 Outcome FacadeFixture::ask(Operation operation, const ObjectPathValue& path,
                            std::optional<Texts> properties) {
-    OperationRequest request;
-    request.operation = operation;
-    request.path = path;
+    OperationRequest request = requestFor(operation, path);
     request.properties = std::move(properties);
     return ask(request);
 }
@@ -70,9 +89,7 @@ std::string FacadeFixture::refusal(const OperationRequest& request) {
 
 OperationRequest associationRequest(Operation operation, const ObjectPathValue& source,
                                     const std::string& associationClass) {
-    OperationRequest request;
-    request.operation = operation;
-    request.path = source;
+    OperationRequest request = requestFor(operation, source);
     if (!associationClass.empty())
         (ofReferences(operation) ? request.resultClass : request.assocClass) = associationClass;
     return request;

@@ -23,6 +23,11 @@ inline constexpr const char* operatingSystem =
 inline constexpr const char* capabilities =
     R"(root/cimv2:KORVA_OperatingSystemCapabilities.InstanceID="Linux")";
 
+/// The path of the fixture's operating system with some keys changed, or added at the end.
+ObjectPathValue operatingSystemWith(const std::vector<KeyBinding>& changes);
+
+Texts propertyNames(const InstanceValue& instance);
+
 /// The built facade in front of the built provider, on the host of LibraryFixture.
 class FacadeFixture : public LibraryFixture {
   protected:
