@@ -5,7 +5,7 @@
 #include <memory>
 
 #include "framework/instrumentation/LinuxHost.h"
-#include "instrumentation/HostParts.h"
+#include "instrumentation/FixtureHost.h"
 
 namespace {
 
