@@ -133,21 +133,33 @@ TEST_F(ConfigurationFileTest, IsNotReadWhileItRests) {
     }
 }
 
-TEST_F(ConfigurationFileTest, MissingFileIsAnErrorOnlyIfItIsRequired) {
-    EXPECT_EQ(readingOf(file_), "3000 [0: cannot be read: No such file or directory]");
-    EXPECT_EQ(readingOf(file_), "unchanged");
-    ConfigurationFile optional({path_, false}, environment_);
-    EXPECT_EQ(readingOf(optional), "3000");
-    EXPECT_EQ(readingOf(optional), "unchanged");
-    ConfigurationFile beneathAFile({"/etc/passwd/zblog.conf", false}, environment_);
-    EXPECT_EQ(readingOf(beneathAFile), "3000");
-}
-
-TEST_F(ConfigurationFileTest, FileThatIsThereAndCannotBeReadIsAnErrorInAnyCase) {
-    std::filesystem::create_symlink(path_, path_);
-    ConfigurationFile optional({path_, false}, environment_);
-    EXPECT_EQ(readingOf(optional), "3000 [0: cannot be read: Too many levels of symbolic links]");
-    EXPECT_EQ(readingOf(optional), "unchanged");
+TEST_F(ConfigurationFileTest, TellsOnceWhyThereIsNothingToRead) {
+    const std::string missing = folder_ / "missing", link = folder_ / "link",
+                      fifo = folder_ / "fifo", tooLong = folder_ / "long";
+    std::filesystem::create_symlink(link, link);
+    ASSERT_EQ(::mkfifo(fifo.c_str(), 0600), 0);
+    logging_test::writeFile(tooLong, std::string(100000, '\n'));
+    environment_.setAhead(60);
+    const struct {
+        std::string path;
+        bool required;
+        const char* reading;
+    } rows[] = {
+        {"", true, "3000"},
+        {missing, true, "3000 [0: cannot be read: No such file or directory]"},
+        {missing, false, "3000"},
+        {"/etc/passwd/zblog.conf", false, "3000"},
+        {link, false, "3000 [0: cannot be read: Too many levels of symbolic links]"},
+        {tooLong, false, "3000 [0: longer than 65536 bytes]"},
+        {folder_.path(), false, "3000 [0: not a regular file]"},
+        {fifo, false, "3000 [0: not a regular file]"},
+        {"/dev/zero", false, "3000 [0: not a regular file]"},
+    };
+    for (const auto& row : rows) {
+        ConfigurationFile file({row.path, row.required}, environment_);
+        EXPECT_EQ(readingOf(file), row.reading) << row.path;
+        EXPECT_EQ(readingOf(file), "unchanged") << row.path;
+    }
 }
 
 TEST_F(ConfigurationFileTest, ComesAndGoes) {
@@ -160,28 +172,6 @@ TEST_F(ConfigurationFileTest, ComesAndGoes) {
     EXPECT_EQ(readingOf(file), "unchanged");
     writeLongAgo("log.level = 1\n");
     EXPECT_EQ(readingOf(file), "1");
-}
-
-TEST_F(ConfigurationFileTest, NoFileMeansTheDefaults) {
-    ConfigurationFile none({"", true}, environment_);
-    EXPECT_EQ(readingOf(none), "3000");
-    EXPECT_EQ(readingOf(none), "unchanged");
-}
-
-TEST_F(ConfigurationFileTest, IsRefusedWhenItIsTooLong) {
-    writeLongAgo(std::string(100000, '\n'));
-    EXPECT_EQ(readingOf(file_), "3000 [0: longer than 65536 bytes]");
-    EXPECT_EQ(readingOf(file_), "unchanged");
-}
-
-TEST_F(ConfigurationFileTest, IsRefusedWhenItIsNoRegularFile) {
-    ConfigurationFile folder({folder_.path(), true}, environment_);
-    EXPECT_EQ(readingOf(folder), "3000 [0: not a regular file]");
-    EXPECT_EQ(readingOf(folder), "unchanged");
-    ASSERT_EQ(::mkfifo(path_.c_str(), 0600), 0);
-    EXPECT_EQ(readingOf(file_), "3000 [0: not a regular file]");
-    ConfigurationFile endless({"/dev/zero", true}, environment_);
-    EXPECT_EQ(readingOf(endless), "3000 [0: not a regular file]");
 }
 
 }  // namespace

@@ -4,14 +4,14 @@
 #include <sys/mman.h>
 #include <unistd.h>
 
-#include <array>
 #include <chrono>
-#include <cstdio>
 #include <cstdlib>
 #include <set>
 #include <stdexcept>
 #include <thread>
+#include <vector>
 
+#include "support/ProgramRun.h"
 #include "tests/logging/LoggingSupport.h"
 
 namespace {
@@ -31,14 +31,14 @@ using Append = void* (*)(void*, const char*);
 using Take = const std::string& (*)(void*, void*);
 
 /// The library, loaded for as long as this object lives.
-class Loaded {
+class LoadedLibrary {
   public:
-    Loaded() : handle_(::dlopen(library, RTLD_NOW | RTLD_GLOBAL)) {
+    LoadedLibrary() : handle_(::dlopen(library, RTLD_NOW | RTLD_GLOBAL)) {
         if (handle_ == nullptr) throw std::runtime_error(::dlerror());
     }
-    ~Loaded() { ::dlclose(handle_); }
-    Loaded(const Loaded&) = delete;
-    Loaded& operator=(const Loaded&) = delete;
+    ~LoadedLibrary() { ::dlclose(handle_); }
+    LoadedLibrary(const LoadedLibrary&) = delete;
+    LoadedLibrary& operator=(const LoadedLibrary&) = delete;
 
     template <class Function>
     Function get(const char* name) const {
@@ -86,18 +86,11 @@ class ConfigurationInMemory {
     int descriptor_;
 };
 
+/// The lines that a command of the shell writes; a symbol that is there twice, as constructors are,
+/// is one of them.
 std::set<std::string> outputOf(const std::string& command) {
-    std::set<std::string> lines;
-    std::FILE* const pipe = ::popen(command.c_str(), "r");
-    if (pipe == nullptr) return lines;
-    std::array<char, 4096> line{};
-    while (std::fgets(line.data(), static_cast<int>(line.size()), pipe) != nullptr) {
-        std::string text(line.data());
-        if (!text.empty() && text.back() == '\n') text.pop_back();
-        lines.insert(text);
-    }
-    ::pclose(pipe);
-    return lines;
+    const std::vector<std::string> written = lines(runProgram("/bin/sh", {"-c", command}).out);
+    return {written.begin(), written.end()};
 }
 
 bool isMapped() {
@@ -160,7 +153,7 @@ TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
     for (int round = 0; round < 100; ++round) {
         ASSERT_FALSE(isMapped());
         {
-            const Loaded loaded;
+            const LoadedLibrary loaded;
             ASSERT_TRUE(isMapped());
             void* buffer = nullptr;
             loaded.get<Construct>("_ZN5ZBLog15ZBMessageBufferC1Ev")(&buffer);
@@ -188,7 +181,7 @@ TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
 TEST(Library, FollowsAConfigurationInMemoryThatChanges) {
     const logging_test::TemporaryFolder folder;
     const ConfigurationInMemory configuration("log.sink = off\n");
-    const Loaded loaded;
+    const LoadedLibrary loaded;
     loaded.log("one");
     configuration.set("log.sink = file:" + (folder / "log") + "\nlog.records = all\n");
     const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(10);
@@ -201,7 +194,7 @@ TEST(Library, FollowsAConfigurationInMemoryThatChanges) {
 
 TEST(Library, ReadsNoFileWhenTheEnvironmentNamesNone) {
     ::setenv("ZBLOG_CONF", "", 1);
-    const Loaded loaded;
+    const LoadedLibrary loaded;
     testing::internal::CaptureStderr();
     loaded.log("nothing of this is a failure");
     loaded.trace("MESSAGE [File: A, Line: 9]: traced nowhere");
@@ -216,7 +209,8 @@ TEST(Library, LetsAProcessEndWhileItsThreadsGoOn) {
         const int status = logging_test::inChildProcess([&]() -> int {
             const ConfigurationInMemory configuration("log.sink = file:" + (folder / "log") +
                                                       "\nlog.records = all\n");
-            static const Loaded& loaded = *new Loaded;  // stays loaded until the process is gone
+            static const LoadedLibrary& loaded =
+                *new LoadedLibrary;  // stays loaded until the process is gone
             for (int thread = 0; thread < 3; ++thread) {
                 std::thread([] {
                     for (;;) loaded.log("going on");

@@ -9,6 +9,7 @@
 
 namespace {
 
+using logging_test::failure;
 using logging_test::readFile;
 using logging_test::record;
 using logging_test::textsOf;
@@ -16,8 +17,6 @@ using logging_test::warningOf;
 using logging_test::writeFile;
 using testing::ElementsAre;
 using testing::IsEmpty;
-
-constexpr const char* failure = "MESSAGE [File: Work.cpp, Line: 12]: it broke";
 
 class LoggerReloadTest : public testing::Test {
   protected:

@@ -17,6 +17,7 @@
 namespace {
 
 using logging_test::everythingTo;
+using logging_test::failure;
 using logging_test::readFile;
 using logging_test::record;
 using logging_test::textsOf;
@@ -25,8 +26,6 @@ using ZBLog::Channel;
 using ZBLog::ChannelConfiguration;
 using ZBLog::Configuration;
 using ZBLog::Destination;
-
-constexpr const char* failure = "MESSAGE [File: Work.cpp, Line: 12]: it broke";
 
 class LoggerTest : public testing::Test {
   protected:

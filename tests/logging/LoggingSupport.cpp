@@ -11,6 +11,8 @@
 #include <stdexcept>
 #include <utility>
 
+#include "support/ProgramRun.h"
+
 namespace logging_test {
 
 TemporaryFolder::TemporaryFolder() {
@@ -55,17 +57,10 @@ std::string readFile(const std::string& path) {
     return content.str();
 }
 
-std::vector<std::string> linesOf(const std::string& text) {
-    std::vector<std::string> lines;
-    std::istringstream stream(text);
-    for (std::string line; std::getline(stream, line);) lines.push_back(line);
-    return lines;
-}
-
-std::vector<std::string> textsOf(const std::string& lines) {
+std::vector<std::string> textsOf(const std::string& text) {
     constexpr int fieldsBeforeText = 8;
     std::vector<std::string> texts;
-    for (const std::string& line : linesOf(lines)) {
+    for (const std::string& line : ::lines(text)) {
         std::size_t start = 0;
         for (int field = 0; field < fieldsBeforeText && start <= line.size(); ++field) {
             const std::size_t blank = line.find(' ', start);

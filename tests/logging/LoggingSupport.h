@@ -60,10 +60,12 @@ class FakeEnvironment final : public ZBLog::Environment {
 
 void writeFile(const std::string& path, const std::string& content);
 std::string readFile(const std::string& path);
-std::vector<std::string> linesOf(const std::string& text);
 
-/// The texts of the lines, without the fields before them.
-std::vector<std::string> textsOf(const std::string& lines);
+/// The texts of the records in `text`, one a line, without the fields before them.
+std::vector<std::string> textsOf(const std::string& text);
+
+/// The text of a message record.
+constexpr const char* failure = "MESSAGE [File: Work.cpp, Line: 12]: it broke";
 
 /// A record of a category "Zumbrel.Test" by the function "work" in "Work.cpp", line 12.
 ZBLog::Record record(const std::string& text, int level = 3000,

@@ -97,36 +97,41 @@ TEST(MessageBuffer, MixesTextAndStreamInOrder) {
     EXPECT_EQ(buffer.str(stream), "a1b2.5cd1\n");
 }
 
-TEST(MessageBuffer, ForgetsTextAndFormatWithTheTextAndWithTheBuffer) {
-    for (int round = 0; round < 100; ++round) {
-        ZBMessageBuffer buffer;
-        std::ostream& stream = buffer;
-        EXPECT_EQ(buffer.str(stream << 255 << ' ' << 0.1), "255 0.1");
-        EXPECT_EQ(buffer.str(stream << std::hex << std::showbase << std::setfill('*')
-                                    << std::setprecision(2) << std::boolalpha << 255 << true),
-                  "0xfftrue");
-        EXPECT_EQ(buffer.str(stream << 255 << std::setw(3) << 1 << 3.14159 << true),
-                  "255  13.141591");
-        stream << std::hex << std::setw(10);
-        buffer << "left behind";
-    }
-}
-
-TEST(MessageBuffer, GivesItsStreamBackAsNewWithTheText) {
+void expectNew(const std::ostream& stream) {
     const std::ostringstream fresh;
-    std::ostringstream tied;
-    ZBMessageBuffer buffer;
-    std::ostream& stream = buffer;
-    stream << std::hex << std::setfill('*') << std::setprecision(2) << std::setw(9);
-    stream.tie(&tied);
-    stream.exceptions(std::ios::badbit);
-    buffer.str(stream);
+    EXPECT_EQ(stream.rdstate(), fresh.rdstate());
     EXPECT_EQ(stream.flags(), fresh.flags());
     EXPECT_EQ(stream.fill(), fresh.fill());
     EXPECT_EQ(stream.precision(), fresh.precision());
     EXPECT_EQ(stream.width(), fresh.width());
     EXPECT_EQ(stream.tie(), fresh.tie());
     EXPECT_EQ(stream.exceptions(), fresh.exceptions());
+}
+
+TEST(MessageBuffer, BeginsAnewWhenItsTextIsTakenAndInThePlaceOfAnother) {
+    std::ostringstream elsewhere;
+    const auto spoil = [&](std::ostream& stream) {
+        stream << "left behind" << std::hex << std::showbase << std::boolalpha << std::setfill('*')
+               << std::setprecision(2) << std::setw(9);
+        stream.tie(&elsewhere);
+        stream.rdbuf(elsewhere.rdbuf());
+        stream.setstate(std::ios::failbit);
+        stream.exceptions(std::ios::badbit);
+    };
+    for (int round = 0; round < 100; ++round) {
+        ZBMessageBuffer buffer;
+        std::ostream& stream = buffer;
+        expectNew(stream);
+        EXPECT_EQ(buffer.str(stream << std::setw(3) << 1 << 255 << ' ' << 3.14159 << true),
+                  "  1255 3.141591");
+        spoil(stream);
+        EXPECT_EQ(buffer.str(stream), "left behind");
+        expectNew(stream);
+        EXPECT_EQ(buffer.str(stream << std::hex << std::showbase << 255), "0xff");
+        EXPECT_EQ(buffer.str(stream << 255), "255");
+        spoil(stream);
+    }
+    EXPECT_EQ(elsewhere.str(), "");
 }
 
 TEST(MessageBuffer, ForgetsAFailedInsertion) {
@@ -139,20 +144,6 @@ TEST(MessageBuffer, ForgetsAFailedInsertion) {
     EXPECT_ANY_THROW(stream << static_cast<std::streambuf*>(nullptr));
     EXPECT_EQ(buffer.str(stream), "");
     EXPECT_EQ(buffer.str(stream << static_cast<std::streambuf*>(nullptr)), "");
-}
-
-TEST(MessageBuffer, ReturnsToItsOwnTextWhenItsStreamWasLedElsewhere) {
-    std::ostringstream elsewhere;
-    {
-        ZBMessageBuffer buffer;
-        std::ostream& stream = buffer;
-        stream.rdbuf(elsewhere.rdbuf());
-        stream << "gone";
-    }
-    ZBMessageBuffer buffer;
-    std::ostream& stream = buffer;
-    EXPECT_EQ(buffer.str(stream << "here"), "here");
-    EXPECT_EQ(elsewhere.str(), "gone");
 }
 
 struct Grouping : std::numpunct<char> {
