@@ -35,6 +35,11 @@ constexpr const char* operationName(Operation operation) noexcept {
     return names[static_cast<unsigned>(operation)];
 }
 
+/// Whether it starts from an instance and asks for what associations tie to it.
+constexpr bool isAssociationOperation(Operation operation) noexcept {
+    return operation >= Operation::Associators;
+}
+
 /// What a request tells about itself.
 struct RequestContext {
     CMPIFlags flags = 0;

@@ -94,11 +94,6 @@ std::string notesOnNames(const OperationRequest& request, const OperationResult&
     return notes;
 }
 
-bool startsFromAnInstance(Operation operation) {
-    return operation == Operation::Associators || operation == Operation::AssociatorNames ||
-           operation == Operation::References || operation == Operation::ReferenceNames;
-}
-
 /// The classes of the CIM schema are ancestors that no file needs to declare.
 bool mayBeClass(const Schema& schema, const std::string& name) {
     return schema.find(name) != nullptr || base::equalsIgnoreCase(name.substr(0, 4), "CIM_");
@@ -165,7 +160,7 @@ std::string notesOn(const OperationRequest& request, const OperationResult& resu
                     const Schema& schema) {
     std::string notes;
     if (request.operation == Operation::GetInstance) notes = noteOnCount(result);
-    if (startsFromAnInstance(request.operation) && isEmpty(result)) {
+    if (isAssociationOperation(request.operation) && isEmpty(result)) {
         notes += linesOnUnknownNames("note: ", request, schema);
     }
     if (yieldsInstances(request.operation)) notes += notesOnNames(request, result, schema);

@@ -1,3 +1,5 @@
+// JSON is for programs: values keep their types, and nothing of what the table adds for people
+// (names of numbers, sizes, local times) is in it.
 #include <charconv>
 #include <nlohmann/json.hpp>
 
@@ -13,7 +15,7 @@ using Json = nlohmann::ordered_json;
 
 /// A real of single precision is printed with its own digits, not with those of its double.
 double shownReal(const Value& value) {
-    const std::string text = realText(value.real(), value.type());
+    const std::string text = value.toText();
     double shown = value.real();
     std::from_chars(text.data(), text.data() + text.size(), shown);
     return shown;
@@ -88,6 +90,7 @@ class JsonPrinter final : public Printer {
 
   private:
     void write(const Json& list) {
+        // A provider's text may be no UTF-8, and what is printed has to be JSON all the same.
         stream_ << list.dump(2, ' ', false, Json::error_handler_t::replace) << '\n';
     }
 

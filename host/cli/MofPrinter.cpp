@@ -1,3 +1,4 @@
+// What is printed as MOF can be read back; what MOF has no constant for becomes NULL or a text.
 #include <algorithm>
 #include <cmath>
 
@@ -13,7 +14,7 @@ namespace {
 /// A real constant of MOF always has a point with a digit after it.
 std::string mofReal(const Value& value) {
     if (!std::isfinite(value.real())) return "NULL";
-    std::string text = realText(value.real(), value.type());
+    std::string text = value.toText();
     if (text.find('.') == std::string::npos) {
         text.insert(std::min(text.find('e'), text.size()), ".0");
     }

@@ -14,19 +14,11 @@ namespace cmpihost {
 namespace {
 
 /// How many paths a complaint lists.
-constexpr std::size_t listed = 10;
+constexpr std::size_t mostListed = 10;
 
-bool isAboutOneInstance(Operation operation) {
-    switch (operation) {
-        case Operation::GetInstance:
-        case Operation::Associators:
-        case Operation::AssociatorNames:
-        case Operation::References:
-        case Operation::ReferenceNames:
-            return true;
-        default:
-            return false;
-    }
+/// What is modified or deleted by a path must be named in full.
+bool mayBeCompleted(Operation operation) {
+    return operation == Operation::GetInstance || isAssociationOperation(operation);
 }
 
 /// Names of systems compare without case, as the provider compares them; other texts do not.
@@ -51,10 +43,11 @@ bool hasKeys(const ObjectPathValue& name, const std::vector<KeyBinding>& given) 
 
 std::string list(const std::vector<ObjectPathValue>& paths) {
     std::string text;
-    for (std::size_t index = 0; index < std::min(paths.size(), listed); ++index) {
+    for (std::size_t index = 0; index < std::min(paths.size(), mostListed); ++index) {
         text += "\n  " + base::escapeForTerminal(toString(paths[index]));
     }
-    if (paths.size() > listed) text += "\n  and " + std::to_string(paths.size() - listed) + " more";
+    if (paths.size() > mostListed)
+        text += "\n  and " + std::to_string(paths.size() - mostListed) + " more";
     return text;
 }
 
@@ -74,7 +67,7 @@ std::string complaint(const std::string& className, const std::vector<ObjectPath
 
 bool lacksKeys(const OperationRequest& request, const ClassCatalogue& catalogue) {
     const ClassDeclaration* declaration = catalogue.find(request.path.className);
-    if (!isAboutOneInstance(request.operation) || declaration == nullptr) return false;
+    if (!mayBeCompleted(request.operation) || declaration == nullptr) return false;
     const auto isLacking = [&](const PropertyDeclaration& property) {
         return property.key && request.path.key(property.name) == nullptr;
     };
@@ -102,6 +95,7 @@ ObjectPathValue completedPath(const ObjectPathValue& path,
     std::copy_if(names.begin(), names.end(), std::back_inserter(matching),
                  [&](const ObjectPathValue& name) { return hasKeys(name, path.keys); });
     if (matching.size() != 1) throw UsageError(complaint(path.className, names, matching));
+    // A name that a provider gives may lack the namespace.
     ObjectPathValue result = std::move(matching.front());
     result.nameSpace = path.nameSpace;
     for (KeyBinding& key : result.keys) {

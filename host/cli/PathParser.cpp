@@ -239,6 +239,7 @@ Value PathParser::number() {
     if (digits.empty() || isNamePart(peek())) fail(offset_, "expected the digits of an integer");
     std::int64_t whenNegative{};
     std::uint64_t whenPositive{};
+    // A sign '+' is no part of what from_chars reads, '-' is.
     const bool read =
         negative ? readWhole("-" + digits, whenNegative) : readWhole(digits, whenPositive);
     if (!read) fail(start, "the integer does not fit 64 bits");

@@ -108,6 +108,7 @@ OperationResult ProviderHost::run(const OperationRequest& request) {
 }
 
 OperationResult ProviderHost::ask(const OperationRequest& request) {
+    // Associations of the computer system are the provider's.
     if (request.assocClass ||
         !base::equalsIgnoreCase(request.path.className, ComputerSystemService::className)) {
         return run(request);
@@ -119,6 +120,7 @@ OperationResult ProviderHost::ask(const OperationRequest& request) {
 }
 
 std::vector<std::string> ProviderHost::unload() {
+    // What was caught so far is told even when a library throws while it cleans up.
     bool escapes = false;
     try {
         library_.unload();

@@ -32,20 +32,20 @@ Schema loadSchema(const std::string& given, const fs::path& programFolder) {
 }
 
 /// The loader looks for a bare name in its own folders only, not in the current one.
-std::string loadable(const std::string& given) {
+std::string loaderPath(const std::string& given) {
     std::error_code error;
     const bool bare = given.find('/') == std::string::npos;
     return bare && fs::exists(given, error) ? "./" + given : given;
 }
 
 /// There is no library to load; what() is safe to print on a terminal.
-class NoProvider : public std::runtime_error {
+class ProviderNotFound : public std::runtime_error {
   public:
     using std::runtime_error::runtime_error;
 };
 
 std::string providerFile(const CommandLine& commandLine, const fs::path& programFolder) {
-    if (!commandLine.provider.empty()) return loadable(commandLine.provider);
+    if (!commandLine.provider.empty()) return loaderPath(commandLine.provider);
     const Library wanted = commandLine.bare ? Library::Provider : Library::Facade;
     const fs::path found = findLibrary(wanted, programFolder);
     if (found.empty()) {
@@ -54,8 +54,8 @@ std::string providerFile(const CommandLine& commandLine, const fs::path& program
         for (const fs::path& candidate : candidates(wanted, programFolder)) {
             text += "\n  " + base::escapeForTerminal(candidate.string());
         }
-        throw NoProvider(text + "\n(--provider FILE names one" +
-                         (commandLine.bare ? ", without --bare)" : ")"));
+        throw ProviderNotFound(text + "\n(--provider FILE names one" +
+                               (commandLine.bare ? ", without --bare)" : ")"));
     }
     return found.string();
 }
@@ -66,6 +66,7 @@ bool yieldsPaths(Operation operation) {
            operation == Operation::CreateInstance;
 }
 
+/// Not even an empty list in JSON: there is no result to be empty.
 bool yieldsNothing(Operation operation) {
     return operation == Operation::ModifyInstance || operation == Operation::DeleteInstance;
 }
@@ -94,7 +95,7 @@ class Run {
     ExitStatus guarded() {
         try {
             return execute();
-        } catch (const NoProvider& error) {
+        } catch (const ProviderNotFound& error) {
             return failed(error.what(), exitNotLoaded);
         } catch (const LoadError& error) {
             return failed(base::escapeForTerminal(error.what()), exitNotLoaded);
@@ -105,6 +106,7 @@ class Run {
 
   private:
     ExitStatus execute() {
+        // The schema goes first: a wrong path is told without any library having been loaded.
         const Schema schema = loadSchema(commandLine_.schema, programFolder_);
         const SchemaCatalogue catalogue(schema);
         return commandLine_.tree ? drawHost(schema, catalogue) : runOperation(schema, catalogue);
@@ -112,7 +114,7 @@ class Run {
 
     ExitStatus runOperation(const Schema& schema, const SchemaCatalogue& catalogue) {
         OperationRequest request = buildRequest(commandLine_, schema, catalogue);
-        const OperationResult result = hosted(catalogue, [&](ProviderHost& host) {
+        const OperationResult result = withHost(catalogue, [&](ProviderHost& host) {
             return commandLine_.bare || !lacksKeys(request, catalogue) ? host.run(request)
                                                                        : completed(host, request);
         });
@@ -121,6 +123,7 @@ class Run {
             err_ << hintFor(request, result, schema);
             return exitCimStatus;
         }
+        // The libraries are gone by now, with whatever they may have left to write themselves.
         printResult(request, result, schema, *makePrinter(commandLine_.format, out_, schema));
         err_ << notesOn(request, result, schema);
         return written();
@@ -139,7 +142,7 @@ class Run {
     ExitStatus drawHost(const Schema& schema, const SchemaCatalogue& catalogue) {
         const std::string nameSpace = parseNamespace(commandLine_.nameSpace);
         try {
-            const std::vector<TreeNode> roots = hosted(catalogue, [&](ProviderHost& host) {
+            const std::vector<TreeNode> roots = withHost(catalogue, [&](ProviderHost& host) {
                 const Ask ask = [&host](const OperationRequest& request) {
                     return host.ask(request);
                 };
@@ -164,7 +167,9 @@ class Run {
 
     /// Has the host do its work, and tells what it caught the provider at.
     template <class Work>
-    std::invoke_result_t<Work, ProviderHost&> hosted(const SchemaCatalogue& catalogue, Work work) {
+    std::invoke_result_t<Work, ProviderHost&> withHost(const SchemaCatalogue& catalogue,
+                                                       Work work) {
+        // The logging library reads its configuration when it is loaded, and again while it runs.
         std::optional<ScopedStderrLog> log;
         if (commandLine_.log) log.emplace();
         const std::string provider = providerFile(commandLine_, programFolder_);
@@ -180,7 +185,7 @@ class Run {
         if (commandLine_.computerSystems) return {{}, *commandLine_.computerSystems};
         const std::string companion = commandLine_.companion.empty()
                                           ? findLibrary(Library::Companion, programFolder_).string()
-                                          : loadable(commandLine_.companion);
+                                          : loaderPath(commandLine_.companion);
         return {companion};
     }
 

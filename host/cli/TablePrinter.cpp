@@ -1,3 +1,5 @@
+// The table is for people. Whatever comes from a provider may hold control characters, so all of it
+// is escaped in the last step, when it is written.
 #include <algorithm>
 #include <limits>
 
@@ -43,8 +45,6 @@ std::string scalarText(const Value& value, const Hints& hints) {
             return signedText(value.signedInteger(), hints);
         case TypeCategory::Boolean:
             return value.boolean() ? "TRUE" : "FALSE";
-        case TypeCategory::Real:
-            return realText(value.real(), value.type());
         case TypeCategory::Character:
             return characterText(value.unsignedInteger());
         case TypeCategory::DateTime:

@@ -75,6 +75,7 @@ class TreeBuilder {
         return node;
     }
 
+    /// The state of what runs; what it can do hangs on the installed one, which is the same system.
     TreeNode running(const InstanceValue& system) const {
         return {labelled(system, text(system, "Name") + " " + text(system, "Version")) + ": " +
                 named(system, "EnabledState") + ", health " + named(system, "HealthState") +

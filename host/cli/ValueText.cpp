@@ -1,7 +1,7 @@
-// The parts of values that the printers, the tree and the writer of paths share.
+// The parts of values that the printers and the tree share. What is for people (sizes, instants,
+// names) stands beside the exact value, never in its place.
 #include "host/cli/ValueText.h"
 
-#include <charconv>
 #include <cstdio>
 #include <ctime>
 
@@ -38,13 +38,6 @@ std::string intervalText(std::uint64_t seconds) {
     const unsigned rest = static_cast<unsigned>(seconds % 86400);
     return formatted("%u %s %02u:%02u:%02u", days, days == 1 ? "day" : "days", rest / 3600,
                      rest / 60 % 60, rest % 60);
-}
-
-template <typename Real>
-std::string shortest(Real real) {
-    char text[64];
-    const auto result = std::to_chars(text, text + sizeof text, real);
-    return std::string(text, result.ptr);
 }
 
 }  // namespace
@@ -108,10 +101,6 @@ std::string humanReadableDateTime(const std::string& cimText) {
     if (!parsed || !parsed->microseconds || cimText.find('*') != std::string::npos) return {};
     const std::uint64_t seconds = *parsed->microseconds / microsecondsPerSecond;
     return parsed->interval ? intervalText(seconds) : instantText(seconds);
-}
-
-std::string realText(double real, CMPIType type) {
-    return type == CMPI_real32 ? shortest(static_cast<float>(real)) : shortest(real);
 }
 
 std::string characterText(std::uint64_t code) {

@@ -37,9 +37,6 @@ std::string humanReadableSize(std::uint64_t kibibytes);
 /// leaves digits open with '*'.
 std::string humanReadableDateTime(const std::string& cimText);
 
-/// The shortest decimal that gives the real back, in the precision of its type.
-std::string realText(double real, CMPIType type);
-
 /// The text of a CMPI_char16 in UTF-8.
 std::string characterText(std::uint64_t code);
 

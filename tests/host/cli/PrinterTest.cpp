@@ -288,10 +288,4 @@ TEST_F(Printers, ShowAnInstantInTheZoneOfTheReaderAndAnInterval) {
     }
 }
 
-TEST(RealText, IsTheShortestThatGivesTheNumberBack) {
-    EXPECT_EQ(realText(0.1, CMPI_real64), "0.1");
-    EXPECT_EQ(realText(static_cast<double>(0.1F), CMPI_real32), "0.1");
-    EXPECT_EQ(realText(-2.5, CMPI_real64), "-2.5");
-}
-
 }  // namespace
