@@ -245,9 +245,8 @@ TEST(PathWriter, WritesEveryKindOfKey) {
                                 {"W", Value::fromText("20240102030405.000000+000", CMPI_dateTime)},
                                 {"K", Value::fromUnsigned(0x20AC, CMPI_char16)},
                                 {"N", Value::null(CMPI_string)}}};
-    EXPECT_EQ(toString(path),
-              R"(n:X.S="a\"b\\c",C="d",U=18446744073709551615,I=-5,T=TRUE,F=FALSE,)"
-              "W=\"20240102030405.000000+000\",K=\"\xE2\x82\xAC\",N=\"\"");
+    EXPECT_EQ(toString(path), R"(n:X.S="a\"b\\c",C="d",U=18446744073709551615,I=-5,T=TRUE,F=FALSE,)"
+                              "W=\"20240102030405.000000+000\",K=\"\xE2\x82\xAC\",N=\"\"");
 }
 
 TEST(PathWriter, QuotesReferencesWithinReferences) {

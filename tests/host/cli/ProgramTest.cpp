@@ -1,207 +1,212 @@
-// The built program as a user runs it, with a stand-in library for the provider.
+// The built program as a user runs it: with a stand-in library for the provider, and with the
+// libraries that ship on a host that is the same everywhere. What whole runs print stands in runs/.
 #include <gmock/gmock.h>
 
 #include "host/cli/Cmpihost.h"
+#include "support/GoldenFile.h"
 
 namespace {
 
+using testing::EndsWith;
 using testing::HasSubstr;
+using testing::Not;
 using testing::StartsWith;
 
-ProgramRun withStandIn(Words arguments, const Words& environment = {"TZ=UTC0"}) {
-    arguments.insert(arguments.begin(), {"--provider", KORVA_STAND_IN});
-    return cmpihost(arguments, environment);
+std::string replaced(std::string text, const std::string& part, const std::string& by) {
+    for (std::size_t at = text.find(part); at != std::string::npos; at = text.find(part, at))
+        text.replace(at, part.size(), by);
+    return text;
 }
 
-const std::string moonPath =
-    "root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\"KORVA_ComputerSystem\",CSName=\"moon\","
-    "CreationClassName=\"KORVA_OperatingSystem\",Name=\"Test \\\"OS\\\"\"";
-
-const std::string moonTable = moonPath +
-                              "\n"
-                              "  CSName                  moon\n"
-                              "  Name                    Test \"OS\"\n"
-                              "  Version                 1\\x1b[31m\n"
-                              "  OSType                  36 (LINUX)\n"
-                              "  TotalVisibleMemorySize  8123456 (7.7 GiB)\n";
-
-const std::string completed = "cmpihost: completed the path: " + moonPath + "\n";
-
-struct Run {
-    Words arguments;
-    std::string out;
-    std::string err;
-};
-
-void expectRuns(int status, const std::vector<Run>& rows) {
-    for (const Run& row : rows) {
-        const ProgramRun run = withStandIn(row.arguments);
-        EXPECT_EQ(run.status, status) << testing::PrintToString(row.arguments);
-        EXPECT_EQ(run.out, row.out) << testing::PrintToString(row.arguments);
-        EXPECT_EQ(run.err, row.err) << testing::PrintToString(row.arguments);
+/// The command lines as one types them, each with what it printed. What differs from machine to
+/// machine has a name of its own.
+std::string transcript(const std::vector<Words>& runs, const Words& environment) {
+    std::string text;
+    for (const Words& arguments : runs) {
+        const ProgramRun run = cmpihost(arguments, environment);
+        text += "$ cmpihost";
+        for (const std::string& word : arguments) {
+            const bool plain = word.find_first_of(" \"*{}") == std::string::npos && !word.empty();
+            text += plain ? " " + word : " '" + word + "'";
+        }
+        text += "\n" + run.out;
+        for (const std::string& line : lines(run.err)) text += "! " + line + "\n";
+        text += "exit " + std::to_string(run.status) + "\n\n";
     }
+    text = replaced(std::move(text), KORVA_STAND_IN, "STAND-IN");
+    text = replaced(std::move(text), KORVA_TEST_DATA, "TESTS");
+    text = replaced(std::move(text), KORVA_BINARY_DIR, "BUILD");
+    return replaced(std::move(text), "Name=\"" + nodeName(), "Name=\"NODE");
 }
 
-TEST(Program, PrintsWhatTheProviderReturnsAndExitsWithZero) {
-    expectRuns(
-        0, {{{"ei", "KORVA_OperatingSystem"}, moonTable, ""},
-            {{"ein", "KORVA_OperatingSystem"}, moonPath + "\n", ""},
-            {{"gi", moonPath}, moonTable, ""},
-            {{"gi", "KORVA_OperatingSystem"}, moonTable, completed},
-            {{"gi", "KORVA_OperatingSystem.CSName=\"moon\""}, moonTable, completed},
-            {{"--format", "mof", "ei", "KORVA_OperatingSystem", "ostype"},
-             "instance of KORVA_OperatingSystem {\n"
-             "    CSName = \"moon\";\n"
-             "    Name = \"Test \\\"OS\\\"\";\n"
-             "    OSType = 36;\n"
-             "};\n",
-             ""},
-            {{"--format", "json", "ain", moonPath},
-             "[\n"
-             "  {\n"
-             "    \"class\": \"KORVA_OperatingSystem\",\n"
-             "    \"path\": \"root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\\\""
-             "KORVA_ComputerSystem\\\",CSName=\\\"moon\\\",CreationClassName=\\\""
-             "KORVA_OperatingSystem\\\",Name=\\\"Test \\\\\\\"OS\\\\\\\"\\\"\"\n"
-             "  }\n"
-             "]\n",
-             ""},
-            {{"rin", "X"}, "", "note: the schema has no class 'X'\n"},
-            {{"--format", "json", "rin", "CIM_X"}, "[]\n", ""},
-            {{"ei", "Unknown"}, "", ""},
-            {{"gi", "X.CSName=\"sun\""},
-             "",
-             "note: no instance was returned; an object manager answers CIM_ERR_NOT_FOUND (6)\n"},
-            {{"ei", "KORVA_OperatingSystem", "Versoin, Version", "--format", "mof"},
-             "instance of KORVA_OperatingSystem {\n"
-             "    CSName = \"moon\";\n"
-             "    Name = \"Test \\\"OS\\\"\";\n"
-             "    Version = \"1\\x001B[31m\";\n"
-             "};\n",
-             "note: the class KORVA_OperatingSystem declares no property 'Versoin'\n"},
-            // Of what is created the path is printed, of what is changed or deleted nothing.
-            {{"--format", "json", "ci", "Changeable", "A=1"},
-             "[\n  {\n    \"class\": \"Changeable\",\n"
-             "    \"path\": \"root/cimv2:Changeable\"\n  }\n]\n",
-             "caught: path of Changeable, a class that is not declared\n"},
-            {{"mi", "Changeable.A=1", "B=2"}, "", ""},
-            {{"--format", "json", "mi", "Changeable.A=1", "B=2"}, "", ""},
-            {{"di", "Changeable.A=1"}, "", ""},
-            {{"--format", "json", "di", "Changeable.A=1"}, "", ""}});
+Words withStandIn(Words arguments) {
+    arguments.insert(arguments.begin(), {"--provider", KORVA_STAND_IN});
+    return arguments;
 }
 
-TEST(Program, NamesTheStatusOfAFailureAndExitsWithOne) {
-    expectRuns(
-        1, {{{"di", "X.A=1"}, "", "cmpihost: CIM_ERR_NOT_SUPPORTED (7)\n"},
-            {{"mi", "KORVA_OperatingSystem.Name=\"x\"", "Version=2", "OSType=36"},
-             "",
-             "cmpihost: CIM_ERR_NOT_SUPPORTED (7): properties Version,OSType\n"},
-            {{"ci", "KORVA_OperatingSystem", "OSType=36"},
-             "",
-             "cmpihost: CMPI status 150: OSType 36\n"},
-            {{"xq", "SELECT * FROM Thing", "--lang", "CQL", "--namespace", "interop"},
-             "",
-             "cmpihost: CIM_ERR_INVALID_QUERY (15): CQL|SELECT * FROM Thing|interop|Thing\n"},
-            {{"ai", "X.A=1", "P", "--assoc-class", "a", "--result-class", "b", "--role", "c",
-              "--result-role", "d"},
-             "",
-             "cmpihost: CIM_ERR_FAILED (1): a|b|c|d|P\n"},
-            {{"ai", "X.A=1"}, "", "cmpihost: CIM_ERR_FAILED (1): -|-|-|-|all\n"},
-            {{"ri", "X.A=1", "--result-class", "b", "--role", "c", "--properties", "P,Q"},
-             "",
-             "cmpihost: CIM_ERR_FAILED (1): b|c|P,Q\n"},
-            // It returned an instance before it failed.
-            {{"ei", "KORVA_OperatingSystemCapabilities"},
-             "",
-             "cmpihost: CIM_ERR_FAILED (1): properties all\\x1b[31m\n"},
-            {{"ei", "KORVA_RunningOS"},
-             "",
-             "cmpihost: CIM_ERR_FAILED (1): an exception left the provider: the moon is down\n"},
-            {{"ei", "KORVA_OSElementCapabilities"},
-             "",
-             "cmpihost: CIM_ERR_FAILED (1): an exception left the provider: of an unknown type\n"},
-            // It cannot name the instances that a path without keys may mean.
-            {{"gi", "KORVA_OSElementCapabilities"}, "", "cmpihost: CIM_ERR_ACCESS_DENIED (2)\n"}});
+TEST(Program, PrintsWhatAStandInAnswers) {
+    const std::string moon =
+        "root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\"KORVA_ComputerSystem\","
+        "CSName=\"moon\",CreationClassName=\"KORVA_OperatingSystem\",Name=\"Test \\\"OS\\\"\"";
+    std::vector<Words> runs = {
+        {"ei", "KORVA_OperatingSystem"},
+        {"ein", "KORVA_OperatingSystem"},
+        {"gi", moon},
+        {"gi", "KORVA_OperatingSystem"},
+        {"gi", "KORVA_OperatingSystem.CSName=\"moon\""},
+        {"--format", "mof", "ei", "KORVA_OperatingSystem", "ostype"},
+        {"--format", "json", "ain", moon},
+        {"ei", "KORVA_OperatingSystem", "Versoin, Version"},
+        {"rin", "X"},
+        {"--format", "json", "rin", "CIM_X"},
+        {"ei", "Unknown"},
+        {"gi", "X.CSName=\"sun\""},
+        {"ein", "KORVA_ComputerSystem"},
+        // Of what is created the path is printed, of what is changed or deleted nothing.
+        {"--format", "json", "ci", "Changeable", "A=1"},
+        {"mi", "Changeable.A=1", "B=2"},
+        {"--format", "json", "mi", "Changeable.A=1", "B=2"},
+        {"di", "Changeable.A=1"},
+        {"--format", "json", "di", "Changeable.A=1"},
+        // What the broker caught, once of a provider that publishes more than the schema knows.
+        {"ei", "KORVA_InstalledOS"},
+        {"--schema", KORVA_TEST_DATA "/cli/othermof", "ei", "KORVA_OperatingSystem"},
+        // Failures tell what was asked.
+        {"di", "X.A=1"},
+        {"mi", "KORVA_OperatingSystem.Name=\"x\"", "Version=2", "OSType=36"},
+        {"ci", "KORVA_OperatingSystem", "OSType=36"},
+        {"xq", "SELECT * FROM Thing", "--lang", "CQL", "--namespace", "interop"},
+        {"ai", "X.A=1", "P", "--assoc-class", "a", "--result-class", "b", "--role", "c",
+         "--result-role", "d"},
+        {"ai", "X.A=1"},
+        {"ri", "X.A=1", "--result-class", "b", "--role", "c", "--properties", "P,Q"},
+        // A failure after an instance, two exceptions, names that cannot be had.
+        {"ei", "KORVA_OperatingSystemCapabilities"},
+        {"ei", "KORVA_RunningOS"},
+        {"ei", "KORVA_OSElementCapabilities"},
+        {"gi", "KORVA_OSElementCapabilities"},
+        // Wrong usage.
+        {"gi", "KORVA_OperatingSystem.CSName=\"sun\""},
+        {"--computer-systems", "2", "ain", "KORVA_ComputerSystem"},
+        {"gi", "KORVA_OperatingSystem.Name=x"},
+        {"tree", "--namespace", "root//cimv2"},
+        {"xq", "q", "--namespace=root//cimv2"},
+        {"ci", "KORVA_OperatingSystem", "Colour=red"},
+        {"--schema", "/nowhere", "ei", "X"},
+    };
+    for (Words& run : runs) run = withStandIn(run);
+    runs.insert(runs.end(), {{}, {"--version"}, {"--companion", "/nonexistent.so", "tree"}});
+    expectGolden(KORVA_TEST_DATA "/cli/runs/StandIn.txt", transcript(runs, {"TZ=UTC0"}));
 }
 
-TEST(Program, RefusesWhatMakesNoSenseAndExitsWithTwo) {
-    const std::string noName = "cmpihost: expected a name before '/' in the namespace\n";
-    expectRuns(
-        2, {{{"gi", "KORVA_OperatingSystem.CSName=\"sun\""},
-             "",
-             "cmpihost: the path lacks keys, and no instance of KORVA_OperatingSystem has those "
-             "that it gives; the instances are:\n  " +
-                 moonPath + "\n"},
-            {{"gi", "KORVA_OperatingSystem.Name=x"},
-             "",
-             "cmpihost: expected the value of 'Name': a text in quotes, an integer, TRUE or FALSE "
-             "(a shell keeps the quotes when the path stands in '...')\n"
-             "  KORVA_OperatingSystem.Name=x\n"
-             "                             ^\n"},
-            {{"tree", "--namespace", "root//cimv2"}, "", noName + "  root//cimv2\n       ^\n"},
-            {{"xq", "q", "--namespace=root//cimv2"}, "", noName + "  root//cimv2\n       ^\n"},
-            {{"ci", "KORVA_OperatingSystem", "Colour=red"},
-             "",
-             "cmpihost: the class 'KORVA_OperatingSystem' has no property 'Colour'\n"},
-            {{"--schema", "/nowhere", "ei", "X"},
-             "",
-             "cmpihost: the schema folder /nowhere cannot be read: No such file or directory\n"}});
-    const ProgramRun several =
-        withStandIn({"--computer-systems", "2", "ain", "KORVA_ComputerSystem"});
-    EXPECT_EQ(several.status, 2);
-    EXPECT_EQ(several.out, "");
-    EXPECT_THAT(several.err, StartsWith("cmpihost: the path lacks keys, and 2 instances of "
-                                        "KORVA_ComputerSystem have those that it gives:\n"
-                                        "  root/cimv2:KORVA_ComputerSystem."));
-    const ProgramRun nothing = cmpihost({});
-    EXPECT_EQ(nothing.status, 2);
-    EXPECT_EQ(nothing.err,
-              "cmpihost: An operation is required\nRun cmpihost --help for more information.\n");
+TEST(Program, PrintsWhatTheShippedLibrariesAnswer) {
+    const std::string system =
+        "root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\"KORVA_ComputerSystem\","
+        "CSName=\"fixture.example\",CreationClassName=\"KORVA_OperatingSystem\","
+        "Name=\"Fixture Linux\"";
+    const std::string stranger = replaced(system, "Fixture Linux", "nothing");
+    const std::string other = "CIM_Elsewhere.Name=\"x\"";
+    const std::string runningOS = "KORVA_RunningOS";
+    const std::string wrong = "KORVA_OperatingSystem.Name=\"x\"";
+    const std::vector<Words> runs = {
+        // Every class, and every path that is named.
+        {"ein", "KORVA_OperatingSystem"},
+        {"ein", "KORVA_OperatingSystemCapabilities"},
+        {"ein", "KORVA_InstalledOS"},
+        {"ein", "KORVA_RunningOS"},
+        {"ein", "KORVA_OSElementCapabilities"},
+        {"gi", system, "OSType", "EnabledState"},
+        {"gi", "KORVA_OperatingSystemCapabilities.InstanceID=\"Fixture Linux\""},
+        {"gi", "KORVA_InstalledOS"},
+        {"gi", "KORVA_RunningOS"},
+        {"gi", "KORVA_OSElementCapabilities"},
+        {"gi", stranger},
+        {"--bare", "gi", stranger},
+        // Associations, all of them or as the filters say.
+        {"ain", system},
+        {"rin", system},
+        {"--provider", KORVA_BINARY_DIR "/lib/libkorvaosstatusfacade.so.1", "rin", system},
+        {"ain", system, "--assoc-class", "CIM_RunningOS"},
+        {"ain", system, "--assoc-class", "KORVA_RunningOS"},
+        {"ain", system, "--result-class", "KORVA_OperatingSystemCapabilities"},
+        {"ain", system, "--role", "ManagedElement"},
+        {"ain", system, "--result-role", "Dependent"},
+        {"ain", system, "--result-role", "Antecedent"},
+        {"ain", system, "--assoc-class", "CIM_Elsewhere"},
+        {"rin", system, "--result-class", "KORVA_InstalledOS"},
+        {"rin", system, "--role", "Antecedent"},
+        {"rin", system, "--role", "Dependent"},
+        {"ri", system, "--result-class", runningOS},
+        {"--format", "mof", "ri", system, "--result-class", runningOS},
+        {"--format", "mof", "rin", system, "--result-class", runningOS},
+        {"--format", "json", "ri", system, "--result-class", runningOS},
+        {"--format", "json", "rin", system, "--result-class", runningOS},
+        {"ri", system, "--role", "PartComponent", "--properties", ""},
+        // Paths that lack keys.
+        {"gi", "KORVA_OperatingSystem", "--properties", ""},
+        {"ai", "KORVA_OperatingSystem", "--properties", ""},
+        {"ain", "KORVA_OperatingSystem"},
+        {"ri", "KORVA_OperatingSystem", "--properties", ""},
+        {"rin", "KORVA_OperatingSystem"},
+        {"ai", "KORVA_OperatingSystem", "--assoc-class", "KORVA_InstalledOS"},
+        {"ain", "KORVA_ComputerSystem", "--assoc-class", "KORVA_RunningOS"},
+        {"--bare", "gi", "KORVA_OperatingSystem", "--properties", ""},
+        {"--bare", "ain", "KORVA_OperatingSystem", "--assoc-class", "KORVA_RunningOS"},
+        // Names that are misspelt, objects of others.
+        {"gi", "KORVA_OperatingSystem.Foo=\"x\""},
+        {"ain", "KORVA_OperatingSystem.Foo=\"x\""},
+        {"ain", "KORVA_OperatingSytem"},
+        {"ain", system, "--assoc-class", "Foo"},
+        {"rin", system, "--result-class", "Foo"},
+        {"ri", system, "--role", "Foo"},
+        {"ai", system, "--result-role", "Foo"},
+        {"ai", other},
+        {"ain", other},
+        {"ri", other},
+        {"rin", other},
+        // What the provider by itself needs to be told.
+        {"--bare", "ei", "KORVA_Unknown"},
+        {"--bare", "ai", "KORVA_OperatingSystem"},
+        {"--bare", "ain", "KORVA_OperatingSystem"},
+        {"--bare", "ain", "KORVA_OperatingSystem", "--assoc-class", "CIM_RunningOS"},
+        {"--bare", "ain", "KORVA_OperatingSystem", "--assoc-class", "KORVA_RunninOS"},
+        // What is not supported.
+        {"ci", "KORVA_OperatingSystem", "Name=x"},
+        {"mi", wrong, "Version=1"},
+        {"di", wrong},
+        {"xq", "SELECT * FROM KORVA_OperatingSystem"},
+        {"--bare", "ci", "KORVA_OperatingSystem", "Name=x"},
+        {"--bare", "mi", wrong, "Version=1"},
+        {"--bare", "di", wrong},
+        {"--bare", "xq", "SELECT * FROM KORVA_OperatingSystem"},
+        {"--bare", "ri", wrong},
+        {"--bare", "rin", wrong},
+        {"--bare", "tree"},
+    };
+    expectGolden(
+        KORVA_TEST_DATA "/cli/runs/Shipped.txt",
+        transcript(runs, {"LD_LIBRARY_PATH=" KORVA_BINARY_DIR "/fixture-host", "TZ=UTC0"}));
 }
 
 TEST(Program, TellsHowTheLibrariesCleanedUp) {
-    const Words request = {"--companion", KORVA_STAND_IN, "ein", "KORVA_OperatingSystem"};
-    const ProgramRun failing = withStandIn(request, {"STAND_IN_CLEANUP=fails"});
+    const Words request =
+        withStandIn({"--companion", KORVA_STAND_IN, "ein", "KORVA_OperatingSystem"});
+    const ProgramRun failing = cmpihost(request, {"STAND_IN_CLEANUP=fails"});
     EXPECT_EQ(failing.status, 0);
     EXPECT_EQ(failing.err,
               "caught: cleanup answered status 1\n"
               "caught: cleanup answered status 1\n"
               "caught: cleanup answered status 1\n");
-    const ProgramRun throwing = withStandIn(request, {"STAND_IN_CLEANUP=throws"});
+    const ProgramRun throwing = cmpihost(request, {"STAND_IN_CLEANUP=throws"});
     EXPECT_EQ(throwing.status, 0);
     EXPECT_THAT(throwing.err, StartsWith("caught: an exception left cleanup\n"));
 }
 
-TEST(Program, ServesTheComputerSystemToTheProvidersUpCalls) {
-    expectRuns(0, {{{"ein", "KORVA_ComputerSystem"},
-                    "root/cimv2:KORVA_ComputerSystem.CreationClassName=\"KORVA_ComputerSystem\","
-                    "Name=\"" +
-                        nodeName() + "\"\n",
-                    ""}});
-}
-
-TEST(Program, TellsWhatTheBrokerCaught) {
-    const std::string thirtySix = moonPath +
-                                  "\n"
-                                  "  CSName                  moon\n"
-                                  "  Name                    Test \"OS\"\n"
-                                  "  OSType                  36 (thirty-six)\n"
-                                  "  TotalVisibleMemorySize  8123456\n";
-    expectRuns(0, {{{"ei", "KORVA_InstalledOS"},
-                    "",
-                    "caught: CMPIResultFT.returnInstance: null CMPIInstance\n"},
-                   // A schema that knows less than the provider publishes.
-                   {{"--schema", KORVA_TEST_DATA "/cli/othermof", "ei", "KORVA_OperatingSystem"},
-                    thirtySix,
-                    "caught: KORVA_OperatingSystem has no property Version\n"}});
-}
-
-TEST(Program, PrintsHelpAndVersionOnTheStandardOutput) {
+TEST(Program, PrintsHelpOnTheStandardOutput) {
     const ProgramRun help = cmpihost({"--help"});
     EXPECT_EQ(help.status, 0);
     EXPECT_THAT(help.out, HasSubstr("Usage: cmpihost [OPTIONS] OPERATION ARGUMENT..."));
     EXPECT_EQ(help.err, "");
-    EXPECT_EQ(cmpihost({"--version"}).out, "cmpihost 1.0.0\n");
 }
 
 TEST(Program, SaysThatItCannotWrite) {
@@ -227,6 +232,62 @@ TEST(Program, SaysThatItCannotWrite) {
         EXPECT_EQ(run.status, row.status) << row.command;
         EXPECT_EQ(run.err, row.err) << row.command;
     }
+}
+
+TEST(Program, ShowsTheRecordsOnlyWhenAskedTo) {
+    EXPECT_EQ(cmpihost({"ei", "KORVA_OperatingSystem"}).err, "");
+    const ProgramRun run = cmpihost({"--log", "ein", "KORVA_OperatingSystem"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_THAT(run.out, StartsWith("root/cimv2:KORVA_OperatingSystem."));
+    EXPECT_THAT(run.err, HasSubstr("ENTERING: OperatingSystem_EnumInstanceNames() in "));
+    EXPECT_THAT(run.err, HasSubstr("EXITING: OperatingSystem_EnumInstanceNames() in "));
+    EXPECT_THAT(run.err, HasSubstr("VARIABLE: 'classId' has Value '55'"));
+}
+
+/// The paths of the first so many computer systems that the host serves itself, a line each.
+std::string computers(unsigned count) {
+    std::string text;
+    for (unsigned number = 1; number <= count; ++number) {
+        text +=
+            "root/cimv2:KORVA_ComputerSystem.CreationClassName=\"KORVA_ComputerSystem\",Name=\"" +
+            nodeName() + (number == 1 ? "" : "-" + std::to_string(number)) + "\"\n";
+    }
+    return text;
+}
+
+TEST(Program, ServesAsManyComputerSystemsAsItIsTold) {
+    const auto answer = [](const char* number, Words request) {
+        request.insert(request.begin(), {"--computer-systems", number});
+        const ProgramRun run = cmpihost(request);
+        EXPECT_EQ(run.status, 0);
+        return run.out;
+    };
+    const Words running = {"ain", "KORVA_OperatingSystem", "--assoc-class", "KORVA_RunningOS"};
+    const Words bare = {"--bare", "ain", "KORVA_OperatingSystem", "--assoc-class",
+                        "KORVA_RunningOS"};
+    EXPECT_EQ(answer("0", {"ein", "KORVA_RunningOS"}), "");
+    EXPECT_EQ(answer("0", running), "");
+    // The facade reports the one that the system runs on, the provider all but the last.
+    EXPECT_EQ(answer("3", running), computers(1));
+    EXPECT_EQ(answer("3", bare), computers(2));
+    // The companion knows more of it than the host does.
+    EXPECT_THAT(answer("1", {"ai", "KORVA_OperatingSystem", "--assoc-class", "KORVA_InstalledOS"}),
+                Not(HasSubstr("NameFormat")));
+    for (const char* number : {"0", "1", "3"}) {
+        const std::string tree = answer(number, {"tree"});
+        EXPECT_EQ(tree, answer(number, {"--bare", "tree"}));
+        std::size_t count = 0;
+        for (const std::string& line : lines(tree))
+            count += line == replaced(line, " (KORVA_ComputerSystem)", "") ? 0 : 1;
+        EXPECT_EQ(count, std::stoul(number));
+    }
+    EXPECT_THAT(answer("0", {"tree"}),
+                StartsWith("no KORVA_ComputerSystem, so nothing is associated\n"));
+    const ProgramRun many = cmpihost({"--computer-systems", "12", "ain", "KORVA_ComputerSystem"});
+    EXPECT_EQ(many.status, 2);
+    EXPECT_EQ(many.out, "");
+    EXPECT_THAT(many.err, HasSubstr("and 12 instances of KORVA_ComputerSystem have those"));
+    EXPECT_THAT(many.err, EndsWith("\n  and 2 more\n"));
 }
 
 }  // namespace
