@@ -43,36 +43,32 @@ inline bool returnResult(const Request& request, const CMPIInstance* instance) {
     return true;
 }
 
-/// Fetches the current element of a class that is enumerated and returns it.
-struct Element {
-    template <class Adapter>
-    static bool fetch(Adapter& adapter, const Request& request) {
-        // The broker may tell another class of the path when it is asked again, by the adapter.
-        // CMPIOSElementCapabilities would then return pairs for ever.
-        if (!adapter.enumerates()) return false;
-        return request.wanted == Wanted::objectPaths
-                   ? returnResult(request, adapter.getObjectPath())
-                   : returnResult(request, adapter.getCMPIInstance(request.properties));
-    }
-};
+/// Fetches the adapter's current element and returns it; false when there is none to return.
+template <class Adapter>
+bool returnElement(const Request& request, Adapter& adapter) {
+    // The broker may tell another class of the path when it is asked again, by the adapter.
+    // CMPIOSElementCapabilities would then return pairs for ever.
+    if (!adapter.enumerates()) return false;
+    return request.wanted == Wanted::objectPaths
+               ? returnResult(request, adapter.getObjectPath())
+               : returnResult(request, adapter.getCMPIInstance(request.properties));
+}
 
-/// Fetches what is at the far end of an association and returns it.
-struct FarEnd {
-    template <class Adapter>
-    static bool fetch(Adapter& adapter, const Request& request) {
-        return request.wanted == Wanted::objectPaths
-                   ? returnResult(request, adapter.getAssociatorNames())
-                   : returnResult(request, adapter.getAssociator(request.properties));
-    }
-};
+/// The same for what is at the far end of the adapter's association.
+template <class Adapter>
+bool returnFarEnd(const Request& request, Adapter& adapter) {
+    return request.wanted == Wanted::objectPaths
+               ? returnResult(request, adapter.getAssociatorNames())
+               : returnResult(request, adapter.getAssociator(request.properties));
+}
 
 /// Builds the adapter, returns what it stands on until it ends, and reports the end. A null ends
-/// the walk too: that of a CMPIOSElementCapabilities from a class that is no end of the association
-/// has no other end.
-template <class Adapter, class Result>
+/// the walk too: a CMPIOSElementCapabilities from a class that is no end of the association has no
+/// other end.
+template <class Adapter, bool (*returnCurrent)(const Request&, Adapter&)>
 void walk(const Request& request) {
     Adapter adapter(request.broker, request.context, request.objectPath);
-    while (adapter && Result::fetch(adapter, request)) ++adapter;
+    while (adapter && returnCurrent(request, adapter)) ++adapter;
     request.result->ft->returnDone(request.result);
 }
 
@@ -87,18 +83,18 @@ using Dispatch = base::Span<const DispatchRow>;
 
 /// By the class of the request's path.
 constexpr DispatchRow instanceDispatch[] = {
-    {operatingSystemId, walk<CMPIOperatingSystem, Element>},
-    {operatingSystemCapabilitiesId, walk<CMPIOperatingSystemCapabilities, Element>},
-    {installedOSId, walk<CMPIInstalledOS, Element>},
-    {runningOSId, walk<CMPIRunningOS, Element>},
-    {elementCapabilitiesId, walk<CMPIOSElementCapabilities, Element>},
+    {operatingSystemId, walk<CMPIOperatingSystem, returnElement>},
+    {operatingSystemCapabilitiesId, walk<CMPIOperatingSystemCapabilities, returnElement>},
+    {installedOSId, walk<CMPIInstalledOS, returnElement>},
+    {runningOSId, walk<CMPIRunningOS, returnElement>},
+    {elementCapabilitiesId, walk<CMPIOSElementCapabilities, returnElement>},
 };
 
 /// By the association class that the request names.
 constexpr DispatchRow associatorDispatch[] = {
-    {runningOSId, walk<CMPIRunningOS, FarEnd>},
-    {elementCapabilitiesId, walk<CMPIOSElementCapabilities, FarEnd>},
-    {installedOSId, walk<CMPIInstalledOS, FarEnd>},
+    {runningOSId, walk<CMPIRunningOS, returnFarEnd>},
+    {elementCapabilitiesId, walk<CMPIOSElementCapabilities, returnFarEnd>},
+    {installedOSId, walk<CMPIInstalledOS, returnFarEnd>},
 };
 
 /// Null for a class that is not served.
