@@ -12,7 +12,7 @@ namespace VA {
 /// A walk over the nodes of one type: one stands behind each VA::Instrumentation, and its
 /// operations are those of that class, call for call. One thread uses it at a time; it must not
 /// outlive its source. Where the walk stands on no node, reads give false and the status is 0.
-class [[gnu::visibility("default")]] NodeCursor {
+class __attribute__((visibility("default"))) NodeCursor {
   public:
     NodeCursor();
     virtual ~NodeCursor();
@@ -30,7 +30,7 @@ class [[gnu::visibility("default")]] NodeCursor {
 
     /// Reads a property of the current node. False, with `value` untouched, when the node has no
     /// such value of that type.
-    virtual bool readProperty(NodeLexicon::Properties id, std::string & value) = 0;
+    virtual bool readProperty(NodeLexicon::Properties id, std::string& value) = 0;
     virtual bool readProperty(NodeLexicon::Properties id, unsigned int& value) = 0;
     virtual bool readProperty(NodeLexicon::Properties id, bool& value) = 0;
 
@@ -43,11 +43,11 @@ class [[gnu::visibility("default")]] NodeCursor {
 
     /// Writes the name of the computer that the nodes belong to; false, with `name` untouched, when
     /// it is not known. Answered wherever the walk stands.
-    virtual bool readComputerName(std::string & name) = 0;
+    virtual bool readComputerName(std::string& name) = 0;
 };
 
 /// A host with managed nodes. Any number of threads may open walks at the same time.
-class [[gnu::visibility("default")]] HostSource {
+class __attribute__((visibility("default"))) HostSource {
   public:
     HostSource();
     virtual ~HostSource();
@@ -59,17 +59,18 @@ class [[gnu::visibility("default")]] HostSource {
 };
 
 /// Makes `source` the one that every Instrumentation constructed from now on reads; null restores
-/// the default, makeLinuxHost(). Objects that exist keep the source they have, and
-/// keep it alive. Any thread may call.
-[[gnu::visibility("default")]] void setHostSource(std::shared_ptr<HostSource> source);
+/// the default, makeLinuxHost(). Objects that exist keep the source they have, and keep it alive.
+/// Any thread may call.
+__attribute__((visibility("default"))) void setHostSource(std::shared_ptr<HostSource> source);
 
-/// The Linux host that this code runs on, never null. `root` is the folder under which all files
+/// The Linux host that this code runs on, never null. `root` is the directory under which all files
 /// are looked for; what the kernel tells without a file (its names, its clocks, the limits of the
 /// process) is that of the running kernel.
-[[gnu::visibility("default")]] std::shared_ptr<HostSource> makeLinuxHost(std::string root = "/");
+__attribute__((visibility("default"))) std::shared_ptr<HostSource> makeLinuxHost(
+    std::string root = "/");
 
 /// The source that an Instrumentation constructed now would read; never null. Any thread may call.
-[[gnu::visibility("default")]] std::shared_ptr<HostSource> currentHostSource();
+__attribute__((visibility("default"))) std::shared_ptr<HostSource> currentHostSource();
 
 }  // namespace VA
 

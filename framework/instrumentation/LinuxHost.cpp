@@ -248,8 +248,7 @@ class LinuxCursor final : public NodeCursor {
 
 }  // namespace
 
-class LinuxHost::State {
-  public:
+struct LinuxHost::State {
     const HostParts parts;
     HostCache cache;
 };

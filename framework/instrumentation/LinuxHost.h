@@ -29,11 +29,10 @@ class LinuxHost final : public HostSource {
     explicit LinuxHost(Linux::HostParts parts);
     ~LinuxHost() override;
 
-    /// The cursor must not outlive this object.
     std::unique_ptr<NodeCursor> openCursor() override;
 
   private:
-    class State;
+    struct State;
     const std::unique_ptr<State> state_;
 };
 
