@@ -3,7 +3,7 @@
 #include "faults/Allocations.h"
 #include "faults/FaultFixture.h"
 #include "framework/instrumentation/HostSource.h"
-#include "instrumentation/FixtureTree.h"
+#include "support/FixtureTree.h"
 
 namespace {
 

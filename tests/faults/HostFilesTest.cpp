@@ -8,7 +8,7 @@
 #include "faults/FaultFixture.h"
 #include "faults/FileFaults.h"
 #include "framework/instrumentation/HostSource.h"
-#include "instrumentation/FixtureTree.h"
+#include "support/FixtureTree.h"
 #include "support/Properties.h"
 
 namespace {

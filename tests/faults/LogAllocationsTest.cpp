@@ -10,7 +10,7 @@
 
 #include "ZBLogger.h"
 #include "faults/CountUp.h"
-#include "instrumentation/FixtureTree.h"
+#include "support/FixtureTree.h"
 
 namespace {
 

@@ -4,7 +4,7 @@
 
 #include <functional>
 
-#include "tests/instrumentation/FixtureHost.h"
+#include "support/TestHost.h"
 
 namespace {
 
@@ -17,7 +17,7 @@ constexpr Properties memory[] = {
 struct Fallbacks : testing::Test {
     Fallbacks() { host.tree().writeCompleteHost(); }
     const FixtureTree& tree() { return host.tree(); }
-    FixtureHost host;
+    TestHost host;
 };
 
 TEST_F(Fallbacks, UsrLibOsReleaseStandsInForEtcOsReleaseOrALinkThatLeadsNowhere) {
@@ -195,7 +195,7 @@ const Damage damages[] = {
 };
 
 // A whole host, whose kernel tells nothing that could stand in.
-struct SilentHost : FixtureHost {
+struct SilentHost : TestHost {
     SilentHost() {
         tree().writeCompleteHost();
         kernel->fixedNames = std::nullopt;
@@ -268,7 +268,7 @@ TEST(FilesCutShort, NoPrefixOfAFileGivesAValueThatTheWholeDoesNot) {
         Properties id;
         std::optional<unsigned int> whole;
     };
-    FixtureHost host;
+    TestHost host;
     host.tree().writeCompleteHost();
     const File files[] = {{"proc/meminfo", TotalVisibleMemorySize, 16777216u},
                           {"proc/meminfo", FreePhysicalMemory, 8388608u},
@@ -285,7 +285,7 @@ TEST(FilesCutShort, NoPrefixOfAFileGivesAValueThatTheWholeDoesNot) {
 }
 
 TEST(FilesCutShort, NoPrefixOfProcStatGivesAnotherBootTime) {
-    FixtureHost host;
+    TestHost host;
     host.kernel->fixedBootTime = std::nullopt;
     const std::string whole = "cpu  1 2 3 4\nbtime 1700000000\nprocesses 5\n";
     for (std::size_t length = 0; length <= whole.size(); ++length) {

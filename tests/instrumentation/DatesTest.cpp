@@ -10,7 +10,7 @@
 #include <limits>
 
 #include "base/CivilTime.h"
-#include "tests/instrumentation/FixtureHost.h"
+#include "support/TestHost.h"
 
 namespace {
 
@@ -127,7 +127,7 @@ TEST(InstallDate, IsTheFirstPlausibleOneOfRootInstallerAndMachineId) {
         {{{"", born(0)}, {"etc/machine-id", {0, 1700000001}}}, std::nullopt},
         {{}, std::nullopt},
     };
-    FixtureHost host;
+    TestHost host;
     host.tree().writeCompleteHost();
     for (const auto& row : rows) {
         host.files->fixedDates = row.dates;
@@ -140,7 +140,7 @@ TEST(InstallDate, IsTheFirstPlausibleOneOfRootInstallerAndMachineId) {
 }
 
 TEST(InstallDate, MayLieBeyond2038AndWithoutABootTimeUpToNow) {
-    FixtureHost host;
+    TestHost host;
     host.files->fixedDates[""].birth = 1700050000;
     host.kernel->fixedBootTime = std::nullopt;
     EXPECT_EQ(host.text(InstallDate), "2023-11-15-12:06:40");
@@ -181,7 +181,7 @@ struct TimeZones : testing::Test {
         host.tree().writeCompleteHost();
         host.files->fixedDates = {{"", {1650000000, 0}}};
     }
-    FixtureHost host;
+    TestHost host;
 };
 
 struct Zone {

@@ -1,7 +1,7 @@
 // Whole hosts, as distributions lay them out.
 #include <gtest/gtest.h>
 
-#include "tests/instrumentation/FixtureHost.h"
+#include "support/TestHost.h"
 
 namespace {
 
@@ -26,7 +26,7 @@ void writeKernelFiles(const FixtureTree& tree) {
     tree.makeLink("proc/self", "512");
 }
 
-void expectKernelValues(FixtureHost& host) {
+void expectKernelValues(TestHost& host) {
     const std::pair<Properties, unsigned int> numbers[] = {
         {OSType, 35},
         {MaxNumberOfProcesses, 62432},
@@ -47,7 +47,7 @@ void expectKernelValues(FixtureHost& host) {
 }
 
 TEST(Distributions, DebianWithSystemd) {
-    FixtureHost host;
+    TestHost host;
     const FixtureTree& tree = host.tree();
     writeKernelFiles(tree);
     tree.write("usr/lib/os-release",
@@ -75,7 +75,7 @@ TEST(Distributions, DebianWithSystemd) {
 }
 
 TEST(Distributions, RedHatLikeWithBirthTimeOfTheRootFolder) {
-    FixtureHost host;
+    TestHost host;
     const FixtureTree& tree = host.tree();
     writeKernelFiles(tree);
     tree.write("usr/lib/os-release",
@@ -96,7 +96,7 @@ TEST(Distributions, RedHatLikeWithBirthTimeOfTheRootFolder) {
 }
 
 TEST(Distributions, SuseLikeWithoutUtmp) {
-    FixtureHost host;
+    TestHost host;
     const FixtureTree& tree = host.tree();
     writeKernelFiles(tree);
     tree.write("usr/lib/os-release",
@@ -115,7 +115,7 @@ TEST(Distributions, SuseLikeWithoutUtmp) {
 }
 
 TEST(Distributions, RollingReleaseHasItsBuildForAVersionOrElseItsKernel) {
-    FixtureHost host;
+    TestHost host;
     writeKernelFiles(host.tree());
     host.tree().write("etc/os-release",
                       "NAME=\"Arch Linux\"\nID=arch\nBUILD_ID=rolling\nANSI_COLOR=\"38;2;23\"\n");
@@ -127,7 +127,7 @@ TEST(Distributions, RollingReleaseHasItsBuildForAVersionOrElseItsKernel) {
 }
 
 TEST(Distributions, SmallHostWithoutSystemdCountsUsersInUtmp) {
-    FixtureHost host;
+    TestHost host;
     writeKernelFiles(host.tree());
     host.tree().write("etc/os-release", "NAME='Alpine Linux'\nVERSION_ID=3.19.0\n");
     host.tree().write("run/utmp", utmpRecord(utmpUserProcess, 512, "ada"));
@@ -140,7 +140,7 @@ TEST(Distributions, SmallHostWithoutSystemdCountsUsersInUtmp) {
 }
 
 TEST(Distributions, ContainerWithHalfOfProcMissingLeavesOutWhatItCannotKnow) {
-    FixtureHost host;
+    TestHost host;
     host.tree().write("etc/os-release", "NAME=\"Container Linux\"\nVERSION_ID=\"1\"\n");
     host.tree().write("proc/meminfo", "MemTotal: 4000 kB\nMemFree: 100 kB\n");
     host.kernel->fixedBootTime = std::nullopt;
@@ -157,7 +157,7 @@ TEST(Distributions, ContainerWithHalfOfProcMissingLeavesOutWhatItCannotKnow) {
 }
 
 TEST(Distributions, HostWithSixTebibytesOfMemorySaturates) {
-    FixtureHost host;
+    TestHost host;
     host.tree().write("proc/meminfo",
                       "MemTotal:     6597069766656 kB\nMemFree:      5497558138880 kB\n"
                       "MemAvailable: 5497558138880 kB\nSwapTotal: 4294967294 kB\n"

@@ -10,7 +10,7 @@
 #include <limits>
 #include <thread>
 
-#include "tests/instrumentation/FixtureHost.h"
+#include "support/TestHost.h"
 
 namespace {
 
@@ -43,7 +43,7 @@ class FileCacheTest : public testing::Test {
     // Past the grain of the file system's clock.
     static void wait() { std::this_thread::sleep_for(20ms); }
 
-    FixtureHost host;
+    TestHost host;
 };
 
 struct Change {
@@ -190,7 +190,7 @@ TEST_F(FileCacheTest, WhatCouldNotBeOpenedIsTriedAgain) {
 }
 
 TEST_F(FileCacheTest, NothingIsMixedUpBetweenTwoRoots) {
-    FixtureHost second;
+    TestHost second;
     second.kernel->fixedNow = host.kernel->fixedNow;
     second.tree().write("etc/os-release", other);
     for (int i = 0; i < 2; ++i) {

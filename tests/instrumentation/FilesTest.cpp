@@ -13,7 +13,7 @@
 
 #include <functional>
 
-#include "tests/instrumentation/FixtureTree.h"
+#include "support/FixtureTree.h"
 
 namespace {
 

@@ -7,8 +7,8 @@
 #include <vector>
 
 #include "framework/instrumentation/HostSource.h"
+#include "support/FixtureTree.h"
 #include "support/SimulatedHost.h"
-#include "tests/instrumentation/FixtureTree.h"
 
 namespace {
 

@@ -12,7 +12,7 @@
 #include <string>
 
 #include "framework/instrumentation/Linux/Dates.h"
-#include "tests/instrumentation/FixtureHost.h"
+#include "support/TestHost.h"
 
 namespace {
 
@@ -91,7 +91,7 @@ TEST(KernelLimits, AddressSpaceLimitIsTheSoftOneIn64Bits) {
 }
 
 TEST(MostMemoryOfAProcess, IsTheLimitInKilobytesAndZeroWhenUnlimited) {
-    FixtureHost host;
+    TestHost host;
     struct Case {
         std::optional<std::uint64_t> bytes;
         std::optional<unsigned int> kiB;

@@ -11,7 +11,7 @@
 #include <string>
 #include <thread>
 
-#include "tests/instrumentation/FixtureTree.h"
+#include "support/FixtureTree.h"
 
 namespace {
 

@@ -11,7 +11,7 @@
 #include <thread>
 #include <vector>
 
-#include "tests/instrumentation/FixtureHost.h"
+#include "support/TestHost.h"
 
 namespace {
 
@@ -75,7 +75,7 @@ struct SnapshotTest : testing::Test {
         return value;
     }
 
-    FixtureHost host;
+    TestHost host;
     std::unique_ptr<VA::NodeCursor> cursor;
 };
 
@@ -118,7 +118,7 @@ TEST_F(SnapshotTest, WalkThatAsksForNamesReadsOsReleaseOnly) {
 
 TEST_F(SnapshotTest, EachPropertyReadsItsOwnSourcesOnly) {
     for (const auto& [id, paths] : sources) {
-        FixtureHost fresh;
+        TestHost fresh;
         fresh.tree().writeCompleteHost();
         // Three walks, of which one reads: the type of a property is known without its source.
         fresh.text(Properties(id));
@@ -192,7 +192,7 @@ TEST_F(SnapshotTest, OnlyTheNameIsKnownToBeReadOnly) {
 }
 
 TEST(LinuxNodes, AreOfTheOperatingSystemTypeAlone) {
-    FixtureHost host;
+    TestHost host;
     const auto linuxHost = VA::makeLinuxHost(host.tree().root());
     for (unsigned int type = 0; type < 40; ++type) {
         auto cursor = linuxHost->openCursor();
@@ -205,7 +205,7 @@ TEST(LinuxNodes, AreOfTheOperatingSystemTypeAlone) {
 // Threads, processes, resources
 
 TEST(LinuxHostThreads, EachWithItsCursorReadTheSameHost) {
-    FixtureHost host;
+    TestHost host;
     host.tree().writeCompleteHost();
     host.tree().makeFolder("run/systemd/system");
     const auto machine = VA::makeLinuxHost();
@@ -233,7 +233,7 @@ TEST(LinuxHostThreads, EachWithItsCursorReadTheSameHost) {
 }
 
 TEST(LinuxHostThreads, ShareWhatIsKeptWhileItChanges) {
-    FixtureHost host;
+    TestHost host;
     host.tree().writeCompleteHost();
     host.kernel->fixedNow = std::time(nullptr) + 1000;
     std::atomic<bool> done{false};
@@ -302,7 +302,7 @@ std::ptrdiff_t openDescriptors() {
 }
 
 TEST(LinuxHostResources, ReadingAThousandTimesLeavesNoDescriptorOpen) {
-    FixtureHost host;
+    TestHost host;
     host.tree().writeCompleteHost();
     host.tree().makeFifo("run/systemd/sessions/1.ref");
     host.tree().makeFolder("run/systemd/system");

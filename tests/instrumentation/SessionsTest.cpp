@@ -2,7 +2,7 @@
 
 #include <gtest/gtest.h>
 
-#include "tests/instrumentation/FixtureHost.h"
+#include "support/TestHost.h"
 
 namespace {
 
@@ -72,7 +72,7 @@ struct HostSessions : testing::Test {
     HostSessions() { host.tree().writeCompleteHost(); }
     const FixtureTree& tree() { return host.tree(); }
     std::optional<unsigned int> users() { return host.number(NumberOfUsers); }
-    FixtureHost host;
+    TestHost host;
 };
 
 TEST_F(HostSessions, UtmpStandsInForSessions) {

@@ -11,9 +11,9 @@
 #include <thread>
 #include <vector>
 
+#include "support/TestHost.h"
 #include "tests/instrumentation/FakeDBus.h"
 #include "tests/instrumentation/FakeSystemd.h"
-#include "tests/instrumentation/FixtureHost.h"
 
 namespace {
 

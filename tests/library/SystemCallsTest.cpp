@@ -6,7 +6,7 @@
 #include <thread>
 
 #include "framework/instrumentation/HostSource.h"
-#include "instrumentation/FixtureTree.h"
+#include "support/FixtureTree.h"
 #include "library/LibraryFixture.h"
 #include "support/SystemCalls.h"
 

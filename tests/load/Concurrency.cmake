@@ -11,7 +11,7 @@ if(NOT KORVA_SANITIZE MATCHES "thread")
     set(measuring ProcessState.cpp ProcessStateTest.cpp SoakOptions.cpp)
 endif()
 korva_test(concurrency_tests
-    SOURCES ConcurrencyTest.cpp ThreadGroup.cpp ../instrumentation/FixtureTree.cpp
+    SOURCES ConcurrencyTest.cpp ThreadGroup.cpp
             ${measuring}
     LIBRARIES korva_requests korva_simulated_host korva::vainstrumentation
     PROPERTIES ${load_properties})

@@ -16,7 +16,7 @@
 #include "framework/instrumentation/HostSource.h"
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
-#include "instrumentation/FixtureTree.h"
+#include "support/FixtureTree.h"
 #include "load/ThreadGroup.h"
 #include "support/Requests.h"
 #include "support/SimulatedHost.h"

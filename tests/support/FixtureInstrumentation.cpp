@@ -5,7 +5,7 @@
 #include <memory>
 
 #include "framework/instrumentation/LinuxHost.h"
-#include "instrumentation/FixtureHost.h"
+#include "support/TestHost.h"
 
 namespace {
 

@@ -1,5 +1,5 @@
-#ifndef TESTS_INSTRUMENTATION_FIXTURE_HOST_H
-#define TESTS_INSTRUMENTATION_FIXTURE_HOST_H
+#ifndef TESTS_SUPPORT_TEST_HOST_H
+#define TESTS_SUPPORT_TEST_HOST_H
 
 #include <atomic>
 #include <cstdint>
@@ -11,7 +11,7 @@
 #include <string>
 
 #include "framework/instrumentation/LinuxHost.h"
-#include "tests/instrumentation/FixtureTree.h"
+#include "support/FixtureTree.h"
 
 /// One record of a utmp file, byte by byte as an x86 host writes it in either word size.
 inline std::string utmpRecord(std::int16_t type, std::int32_t pid, const std::string& user) {
@@ -139,9 +139,9 @@ inline void readEverything(VA::NodeCursor& cursor) {
 }
 
 /// A Linux host over a fixture tree, with each of its parts within reach.
-class FixtureHost {
+class TestHost {
   public:
-    FixtureHost() : FixtureHost(std::make_shared<FixtureTree>()) {}
+    TestHost() : TestHost(std::make_shared<FixtureTree>()) {}
 
     const FixtureTree& tree() const { return *tree_; }
 
@@ -164,7 +164,7 @@ class FixtureHost {
     auto flag(VA::NodeLexicon::Properties id) { return read<bool>(id); }
 
   private:
-    explicit FixtureHost(std::shared_ptr<FixtureTree> tree)
+    explicit TestHost(std::shared_ptr<FixtureTree> tree)
         : tree_(std::move(tree)),
           files(std::make_shared<CountingFiles>(tree_->root())),
           host_(std::make_unique<VA::LinuxHost>(VA::Linux::HostParts{files, kernel, manager})) {}

@@ -1,4 +1,4 @@
-#include "FixtureTree.h"
+#include "support/FixtureTree.h"
 
 #include <fcntl.h>
 #include <sys/stat.h>
