@@ -1,5 +1,5 @@
-// What the tests of the broker share.
-#pragma once
+#ifndef TESTS_HOST_BROKER_BROKER_FIXTURE_H
+#define TESTS_HOST_BROKER_BROKER_FIXTURE_H
 
 #include "host/broker/Broker.h"
 #include "host/broker/Request.h"
@@ -12,7 +12,11 @@
 #include <string>
 #include <vector>
 
+/// What the tests of the broker share.
 namespace cmpihost {
+
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
 
 /// What a CMPIString holds; "(null)" for none.
 inline std::string textOf(const CMPIString* string) {
@@ -68,9 +72,14 @@ class BrokerTest : public ::testing::Test {
     CMPIObjectPath* newPath(const char* className = "TEST_Thing") {
         return CMNewObjectPath(mb, "root/cimv2", className, &status);
     }
+    CMPIArray* newArray(CMPIType type, CMPICount size = 1) {
+        return CMNewArray(mb, size, type, &status);
+    }
     CMPIInstance* newInstance(const char* className = "TEST_Thing") {
         return CMNewInstance(mb, newPath(className), &status);
     }
 };
 
 }  // namespace cmpihost
+
+#endif

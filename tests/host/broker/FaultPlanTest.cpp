@@ -11,8 +11,6 @@
 namespace cmpihost {
 namespace {
 
-using ::testing::IsEmpty;
-
 class Faults : public BrokerTest {
   protected:
     Faults() { broker.setFaultPlan(&plan); }

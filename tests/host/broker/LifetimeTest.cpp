@@ -1,53 +1,48 @@
-// How long objects live, and what happens to a pointer that is kept too long.
+// How long objects live, on which thread, and what happens to a pointer that is kept too long.
 #include "BrokerFixture.h"
 
 #include "host/broker/ResultCollector.h"
 
 #include <algorithm>
+#include <atomic>
+#include <thread>
 
 namespace cmpihost {
 namespace {
 
-using ::testing::ElementsAre;
-using ::testing::IsEmpty;
-
-class Lifetime : public ::testing::Test {
+class Lifetimes : public ::testing::Test {
   protected:
     Broker broker;
     const CMPIBroker* mb = broker.cmpi();
     CMPIStatus status = {CMPI_RC_OK, nullptr};
 
     CMPIObjectPath* newPath() { return CMNewObjectPath(mb, "root/cimv2", "TEST_Thing", &status); }
+
+    /// What `make` made in a request that has ended.
+    template <class Make>
+    auto afterItsRequest(Make make) {
+        Request request(broker);
+        return make();
+    }
 };
 
-TEST_F(Lifetime, APathUsedAfterItsRequestIsRecognised) {
-    CMPIObjectPath* kept = nullptr;
-    {
-        Request request(broker);
-        kept = newPath();
-    }
+const std::string deadPath = "CMPIObjectPath of TEST_Thing used after its request ended";
+
+TEST_F(Lifetimes, APathUsedAfterItsRequestIsRecognised) {
+    CMPIObjectPath* const kept = afterItsRequest([this] { return newPath(); });
     EXPECT_EQ(CMGetKeyCount(kept, &status), 0u);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_HANDLE);
     EXPECT_EQ(CMGetClassName(kept, &status), nullptr);
     EXPECT_EQ(CMGetKey(kept, "Name", &status).state, CMPI_badValue);
     EXPECT_EQ(CMAddKey(kept, "Name", "x", CMPI_chars).rc, CMPI_RC_ERR_INVALID_HANDLE);
-    EXPECT_THAT(
-        broker.violations(),
-        ElementsAre(
-            "CMPIObjectPathFT.getKeyCount: CMPIObjectPath of TEST_Thing used after its request "
-            "ended",
-            "CMPIObjectPathFT.getClassName: CMPIObjectPath of TEST_Thing used after its request "
-            "ended",
-            "CMPIObjectPathFT.getKey: CMPIObjectPath of TEST_Thing used after its request ended",
-            "CMPIObjectPathFT.addKey: CMPIObjectPath of TEST_Thing used after its request ended"));
+    EXPECT_THAT(broker.violations(), ElementsAre("CMPIObjectPathFT.getKeyCount: " + deadPath,
+                                                 "CMPIObjectPathFT.getClassName: " + deadPath,
+                                                 "CMPIObjectPathFT.getKey: " + deadPath,
+                                                 "CMPIObjectPathFT.addKey: " + deadPath));
 }
 
-TEST_F(Lifetime, AStringUsedAfterItsRequestShowsThatItIsDead) {
-    CMPIString* kept = nullptr;
-    {
-        Request request(broker);
-        kept = CMNewString(mb, "Linux", nullptr);
-    }
+TEST_F(Lifetimes, AStringUsedAfterItsRequestShowsThatItIsDead) {
+    CMPIString* const kept = afterItsRequest([this] { return CMNewString(mb, "Linux", nullptr); });
     EXPECT_STREQ(CMGetCharPtr(kept), "(object of a request that ended)");
     EXPECT_STREQ(CMGetCharsPtr(kept, &status), "(object of a request that ended)");
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_HANDLE);
@@ -56,13 +51,14 @@ TEST_F(Lifetime, AStringUsedAfterItsRequestShowsThatItIsDead) {
         ElementsAre("CMPIStringFT.getCharPtr: CMPIString \"Linux\" used after its request ended"));
 }
 
-TEST_F(Lifetime, EveryKindOfObjectIsRecognisedAfterItsRequest) {
+TEST_F(Lifetimes, EveryKindOfObjectIsRecognisedAfterItsRequest) {
     CMPIInstance* instance = nullptr;
     CMPIArray* array = nullptr;
     CMPIArgs* args = nullptr;
     CMPIDateTime* date = nullptr;
     CMPIContext* context = nullptr;
     const CMPIResult* result = nullptr;
+    CMPIString* className = nullptr;
     {
         Request request(broker);
         ResultCollector collector(request);
@@ -72,6 +68,7 @@ TEST_F(Lifetime, EveryKindOfObjectIsRecognisedAfterItsRequest) {
         date = CMNewDateTimeFromBinary(mb, 0, 0, nullptr);
         context = request.makeContext({}, "");
         result = collector.cmpi();
+        className = CMGetClassName(newPath(), nullptr);
     }
     CMGetPropertyCount(instance, nullptr);
     CMGetArrayCount(array, nullptr);
@@ -79,60 +76,34 @@ TEST_F(Lifetime, EveryKindOfObjectIsRecognisedAfterItsRequest) {
     CMIsInterval(date, nullptr);
     CMGetContextEntryCount(context, nullptr);
     EXPECT_EQ(CMReturnDone(result).rc, CMPI_RC_ERR_INVALID_HANDLE);
+    CMGetCharsPtr(className, nullptr);
+    const std::string ended = " used after its request ended";
     EXPECT_THAT(
         broker.violations(),
-        ElementsAre(
-            "CMPIInstanceFT.getPropertyCount: CMPIInstance of TEST_Thing used after its request "
-            "ended",
-            "CMPIArrayFT.getSize: CMPIArray used after its request ended",
-            "CMPIArgsFT.getArgCount: CMPIArgs used after its request ended",
-            "CMPIDateTimeFT.isInterval: CMPIDateTime \"19700101000000.000000+000\" used after its "
-            "request ended",
-            "CMPIContextFT.getEntryCount: CMPIContext used after its request ended",
-            "CMPIResultFT.returnDone: CMPIResult used after its request ended"));
+        ElementsAre("CMPIInstanceFT.getPropertyCount: CMPIInstance of TEST_Thing" + ended,
+                    "CMPIArrayFT.getSize: CMPIArray" + ended,
+                    "CMPIArgsFT.getArgCount: CMPIArgs" + ended,
+                    "CMPIDateTimeFT.isInterval: CMPIDateTime \"19700101000000.000000+000\"" + ended,
+                    "CMPIContextFT.getEntryCount: CMPIContext" + ended,
+                    "CMPIResultFT.returnDone: CMPIResult" + ended,
+                    "CMPIStringFT.getCharPtr: CMPIString \"TEST_Thing\"" + ended));
 }
 
-TEST_F(Lifetime, ADeadObjectHandedToALiveOneIsRecognised) {
-    CMPIObjectPath* kept = nullptr;
-    {
-        Request request(broker);
-        kept = newPath();
-    }
+TEST_F(Lifetimes, ADeadObjectHandedToALiveOneIsRecognised) {
+    CMPIObjectPath* kept = afterItsRequest([this] { return newPath(); });
     Request request(broker);
     EXPECT_EQ(CMNewInstance(mb, kept, &status), nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_HANDLE);
-    CMPIObjectPath* const path = newPath();
-    EXPECT_EQ(CMAddKey(path, "Ref", &kept, CMPI_ref).rc, CMPI_RC_ERR_INVALID_HANDLE);
+    EXPECT_EQ(CMAddKey(newPath(), "Ref", &kept, CMPI_ref).rc, CMPI_RC_ERR_INVALID_HANDLE);
     EXPECT_EQ(CDGetType(mb, kept, &status), nullptr);
-    EXPECT_THAT(
-        broker.violations(),
-        ElementsAre(
-            "CMPIBrokerEncFT.newInstance: CMPIObjectPath of TEST_Thing used after its request "
-            "ended",
-            "CMPIObjectPathFT.addKey: CMPIObjectPath of TEST_Thing used after its request ended",
-            "CMPIBrokerEncFT.getType: CMPIObjectPath of TEST_Thing used after its request ended"));
+    EXPECT_THAT(broker.violations(), ElementsAre("CMPIBrokerEncFT.newInstance: " + deadPath,
+                                                 "CMPIObjectPathFT.addKey: " + deadPath,
+                                                 "CMPIBrokerEncFT.getType: " + deadPath));
 }
 
-TEST_F(Lifetime, ObjectsThatGettersHandOutEndWithTheRequestToo) {
-    CMPIString* name = nullptr;
-    {
-        Request request(broker);
-        name = CMGetClassName(newPath(), nullptr);
-    }
-    CMGetCharsPtr(name, nullptr);
-    EXPECT_THAT(
-        broker.violations(),
-        ElementsAre(
-            "CMPIStringFT.getCharPtr: CMPIString \"TEST_Thing\" used after its request ended"));
-}
-
-TEST_F(Lifetime, ObjectsOfANestedRequestLiveUntilTheOuterOneEnds) {
+TEST_F(Lifetimes, ObjectsOfANestedRequestLiveUntilTheOuterOneEnds) {
     Request outer(broker);
-    CMPIObjectPath* path = nullptr;
-    {
-        Request inner(broker);
-        path = newPath();
-    }
+    CMPIObjectPath* const path = afterItsRequest([this] { return newPath(); });
     EXPECT_EQ(textOf(CMGetClassName(path, nullptr)), "TEST_Thing");
     EXPECT_THAT(broker.violations(), IsEmpty());
     outer.end();
@@ -140,7 +111,7 @@ TEST_F(Lifetime, ObjectsOfANestedRequestLiveUntilTheOuterOneEnds) {
     EXPECT_EQ(broker.violations().size(), 1u);
 }
 
-TEST_F(Lifetime, EndingARequestTwiceIsHarmless) {
+TEST_F(Lifetimes, EndingARequestTwiceIsHarmless) {
     Request request(broker);
     newPath();
     request.end();
@@ -148,31 +119,25 @@ TEST_F(Lifetime, EndingARequestTwiceIsHarmless) {
     EXPECT_EQ(broker.quarantined(), 1u);
 }
 
-TEST_F(Lifetime, AnObjectMadeOutsideARequestIsAViolationButWorks) {
+TEST_F(Lifetimes, AnObjectMadeOutsideARequestOfItsBrokerIsAViolationButWorks) {
+    Broker other;
+    Request request(other);
     CMPIObjectPath* const path = newPath();
     ASSERT_NE(path, nullptr);
     EXPECT_EQ(CMGetKeyCount(path, nullptr), 0u);
+    EXPECT_THAT(request.violations(), IsEmpty());
     EXPECT_THAT(
         broker.violations(),
         ElementsAre("CMPIObjectPath of TEST_Thing made while no request is open on the thread"));
 }
 
-TEST_F(Lifetime, ARequestOfAnotherBrokerDoesNotCount) {
-    Broker other;
-    Request request(other);
-    newPath();
-    EXPECT_EQ(broker.violations().size(), 1u);
-    EXPECT_THAT(request.violations(), IsEmpty());
-}
-
-TEST_F(Lifetime, BrokersKeepTheirRequestsApartOnOneThread) {
+TEST_F(Lifetimes, BrokersKeepTheirRequestsApartOnOneThread) {
     Broker other;
     Request first(broker);
     CMPIObjectPath* const mine = newPath();
     {
         Request second(other);
         CMPIObjectPath* const nested = newPath();
-        EXPECT_NE(nested, nullptr);
         EXPECT_EQ(CMAddKey(nested, "Ref", &mine, CMPI_ref).rc, CMPI_RC_OK);
     }
     EXPECT_EQ(CMGetKeyCount(mine, &status), 0u);
@@ -181,15 +146,14 @@ TEST_F(Lifetime, BrokersKeepTheirRequestsApartOnOneThread) {
     EXPECT_THAT(other.violations(), IsEmpty());
 }
 
-TEST_F(Lifetime, ACloneLivesUntilItIsReleased) {
-    CMPIObjectPath* copy = nullptr;
-    {
-        Request request(broker);
+TEST_F(Lifetimes, ACloneLivesUntilItIsReleased) {
+    CMPIObjectPath* const copy = afterItsRequest([this] {
         CMPIObjectPath* const path = newPath();
         CMAddKey(path, "Name", "x", CMPI_chars);
-        copy = CMClone(path, &status);
+        CMPIObjectPath* const made = CMClone(path, &status);
         CMAddKey(path, "Name", "changed", CMPI_chars);
-    }
+        return made;
+    });
     EXPECT_EQ(broker.unreleasedClones(), 1u);
     EXPECT_EQ(toString(valueOf(copy)), "root/cimv2:TEST_Thing.Name=\"x\"");
     EXPECT_EQ(CMRelease(copy).rc, CMPI_RC_OK);
@@ -197,7 +161,7 @@ TEST_F(Lifetime, ACloneLivesUntilItIsReleased) {
     EXPECT_THAT(broker.violations(), IsEmpty());
 }
 
-TEST_F(Lifetime, EveryKindOfObjectCanBeCloned) {
+TEST_F(Lifetimes, EveryKindOfObjectButAResultCanBeCloned) {
     Request request(broker);
     CMPIInstance* const instance = CMClone(CMNewInstance(mb, newPath(), nullptr), &status);
     CMPIString* const string = CMClone(CMNewString(mb, "x", nullptr), &status);
@@ -205,6 +169,9 @@ TEST_F(Lifetime, EveryKindOfObjectCanBeCloned) {
     CMPIDateTime* const date = CMClone(CMNewDateTimeFromBinary(mb, 0, 0, nullptr), &status);
     CMPIArgs* const args = CMClone(CMNewArgs(mb, nullptr), &status);
     CMPIContext* const context = CMClone(request.makeContext({}, ""), &status);
+    ResultCollector collector(request);
+    EXPECT_EQ(CMClone(collector.cmpi(), &status), nullptr);
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
     request.end();
     EXPECT_EQ(CMGetPropertyCount(instance, nullptr), 0u);
     EXPECT_EQ(textOf(string), "x");
@@ -212,6 +179,7 @@ TEST_F(Lifetime, EveryKindOfObjectCanBeCloned) {
     EXPECT_FALSE(CMIsInterval(date, nullptr));
     EXPECT_EQ(CMGetArgCount(args, nullptr), 0u);
     EXPECT_EQ(CMGetContextEntryCount(context, nullptr), 4u);
+    EXPECT_EQ(broker.unreleasedClones(), 6u);
     CMRelease(instance);
     CMRelease(string);
     CMRelease(array);
@@ -222,14 +190,7 @@ TEST_F(Lifetime, EveryKindOfObjectCanBeCloned) {
     EXPECT_THAT(broker.violations(), IsEmpty());
 }
 
-TEST_F(Lifetime, AResultCannotBeCloned) {
-    Request request(broker);
-    ResultCollector collector(request);
-    EXPECT_EQ(CMClone(collector.cmpi(), &status), nullptr);
-    EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
-}
-
-TEST_F(Lifetime, ACloneUsedOrReleasedAfterItsReleaseIsRecognised) {
+TEST_F(Lifetimes, ACloneUsedOrReleasedAfterItsReleaseIsRecognised) {
     Request request(broker);
     CMPIObjectPath* const copy = CMClone(newPath(), nullptr);
     CMRelease(copy);
@@ -242,7 +203,7 @@ TEST_F(Lifetime, ACloneUsedOrReleasedAfterItsReleaseIsRecognised) {
             "CMPIObjectPathFT.release: CMPIObjectPath of TEST_Thing used after it was released"));
 }
 
-TEST_F(Lifetime, ReleasingAnObjectOfTheRequestIsAViolationAndLeavesItAlive) {
+TEST_F(Lifetimes, ReleasingAnObjectOfTheRequestIsAViolationAndLeavesItAlive) {
     Request request(broker);
     CMPIObjectPath* const path = newPath();
     EXPECT_EQ(CMRelease(path).rc, CMPI_RC_ERR_INVALID_HANDLE);
@@ -253,28 +214,33 @@ TEST_F(Lifetime, ReleasingAnObjectOfTheRequestIsAViolationAndLeavesItAlive) {
         ElementsAre("CMPIObjectPath of TEST_Thing released that belongs to the object manager"));
 }
 
-TEST_F(Lifetime, TheQuarantineKeepsTheYoungestShellsUpToItsLimit) {
+BrokerOptions withQuarantine(std::size_t limit) {
     BrokerOptions options;
-    options.quarantine = 10;
-    Broker small(nullptr, options);
-    CMPIObjectPath* last = nullptr;
-    {
-        Request request(small);
-        for (int i = 0; i < 25; ++i) {
-            last =
-                CMNewObjectPath(small.cmpi(), "", ("TEST_" + std::to_string(i)).c_str(), nullptr);
-        }
-    }
-    EXPECT_EQ(small.quarantined(), 10u);
-    CMGetKeyCount(last, nullptr);
-    EXPECT_THAT(small.violations(), ElementsAre("CMPIObjectPathFT.getKeyCount: CMPIObjectPath of "
-                                                "TEST_24 used after its request ended"));
+    options.quarantine = limit;
+    return options;
 }
 
-TEST_F(Lifetime, AnObjectGivenBackEarlyTakesOnePlaceOfTheQuarantine) {
-    BrokerOptions options;
-    options.quarantine = 3;
-    Broker small(nullptr, options);
+TEST(QuarantineOfObjects, KeepsTheYoungestUpToItsLimit) {
+    for (const std::size_t limit : {0u, 1u, 10u}) {
+        Broker small(nullptr, withQuarantine(limit));
+        CMPIObjectPath* last = nullptr;
+        {
+            Request request(small);
+            for (int i = 0; i < 25; ++i) {
+                const std::string name = "TEST_" + std::to_string(i);
+                last = CMNewObjectPath(small.cmpi(), "", name.c_str(), nullptr);
+            }
+        }
+        EXPECT_EQ(small.quarantined(), limit);
+        if (limit == 0) continue;
+        CMGetKeyCount(last, nullptr);
+        EXPECT_THAT(small.violations(), ElementsAre("CMPIObjectPathFT.getKeyCount: CMPIObjectPath "
+                                                    "of TEST_24 used after its request ended"));
+    }
+}
+
+TEST(QuarantineOfObjects, GivesAnObjectFreedEarlyOnePlace) {
+    Broker small(nullptr, withQuarantine(3));
     {
         Request request(small);
         CMPIObjectPath* paths[3];
@@ -286,42 +252,130 @@ TEST_F(Lifetime, AnObjectGivenBackEarlyTakesOnePlaceOfTheQuarantine) {
     EXPECT_EQ(small.quarantined(), 3u);
 }
 
-TEST_F(Lifetime, AQuarantineOfNoSizeKeepsNothing) {
-    BrokerOptions options;
-    options.quarantine = 0;
-    Broker none(nullptr, options);
-    {
-        Request request(none);
-        CMNewObjectPath(none.cmpi(), "", "TEST_Thing", nullptr);
-    }
-    EXPECT_EQ(none.quarantined(), 0u);
-}
-
-TEST_F(Lifetime, AVeryLongNameIsCutInTheReport) {
-    CMPIString* kept = nullptr;
-    {
-        Request request(broker);
-        kept = CMNewString(mb, std::string(1000, 'x').c_str(), nullptr);
-    }
+TEST_F(Lifetimes, AVeryLongNameIsCutInTheReport) {
+    CMPIString* const kept = afterItsRequest(
+        [this] { return CMNewString(mb, std::string(1000, 'x').c_str(), nullptr); });
     CMGetCharsPtr(kept, nullptr);
     EXPECT_THAT(broker.violations(),
                 ElementsAre("CMPIStringFT.getCharPtr: CMPIString \"" + std::string(47, 'x') +
                             "\" used after its request ended"));
 }
 
-class Memory : public BrokerTest {};
+TEST_F(Lifetimes, RequestsSeeTheViolationsOfTheirOwnThreadAndOfInnerOnes) {
+    Request outer(broker);
+    CMNewString(mb, nullptr, nullptr);
+    std::thread([this] {
+        Request other(broker);
+        CMNewObjectPath(mb, nullptr, nullptr, nullptr);
+        EXPECT_EQ(other.violations().size(), 1u);
+    }).join();
+    {
+        Request inner(broker);
+        CMNewInstance(mb, nullptr, nullptr);
+        EXPECT_EQ(inner.violations().size(), 1u);
+    }
+    EXPECT_THAT(outer.violations(),
+                ElementsAre("CMPIBrokerEncFT.newString: null text",
+                            "CMPIBrokerEncFT.newInstance: null CMPIObjectPath"));
+    EXPECT_EQ(broker.violations().size(), 3u);
+}
+
+TEST_F(Lifetimes, RequestsRunInParallelOnOneBroker) {
+    std::vector<std::thread> threads;
+    std::atomic<int> wrong{0};
+    for (int t = 0; t < 4; ++t) {
+        threads.emplace_back([&, t] {
+            const std::string className = "TEST_" + std::to_string(t);
+            for (int round = 0; round < 200; ++round) {
+                Request request(broker);
+                CMPIObjectPath* const path =
+                    CMNewObjectPath(mb, "root", className.c_str(), nullptr);
+                CMAddKey(path, "Name", className.c_str(), CMPI_chars);
+                CMPIInstance* const instance = CMNewInstance(mb, path, nullptr);
+                CMSetProperty(instance, "Name", className.c_str(), CMPI_chars);
+                CMPIInstance* const copy = CMClone(instance, nullptr);
+                const CMPIData name = CMGetProperty(copy, "Name", nullptr);
+                if (textOf(name.value.string) != className) ++wrong;
+                CMRelease(copy);
+            }
+        });
+    }
+    for (std::thread& thread : threads) thread.join();
+    EXPECT_EQ(wrong, 0);
+    EXPECT_EQ(broker.unreleasedClones(), 0u);
+    EXPECT_THAT(broker.violations(), IsEmpty());
+}
+
+TEST_F(Lifetimes, AnAttachedThreadHasARequestOfItsOwn) {
+    Request request(broker);
+    CMPIContext* const prepared =
+        CBPrepareAttachThread(mb, request.makeContext({5, {}, {}}, "root"));
+    ASSERT_NE(prepared, nullptr);
+    CMPIObjectPath* path = nullptr;
+    std::thread([&] {
+        EXPECT_EQ(CBAttachThread(mb, prepared).rc, CMPI_RC_OK);
+        EXPECT_EQ(CMGetContextEntry(prepared, CMPIInvocationFlags, nullptr).value.uint32, 5u);
+        path = newPath();
+        EXPECT_EQ(CMGetKeyCount(path, nullptr), 0u);
+        EXPECT_EQ(CBDetachThread(mb, prepared).rc, CMPI_RC_OK);
+    }).join();
+    EXPECT_EQ(broker.unreleasedClones(), 0u);
+    EXPECT_THAT(broker.violations(), IsEmpty());
+    CMGetKeyCount(path, nullptr);
+    EXPECT_THAT(broker.violations(), ElementsAre("CMPIObjectPathFT.getKeyCount: " + deadPath));
+}
+
+TEST_F(Lifetimes, AThreadDetachesOnlyWhenItIsAttachedAndWithAPreparedContext) {
+    Request request(broker);
+    CMPIContext* const context = request.makeContext({}, "root");
+    CMPIContext* const prepared = CBPrepareAttachThread(mb, context);
+    EXPECT_EQ(CBDetachThread(mb, prepared).rc, CMPI_RC_ERR_FAILED);
+    CMRelease(prepared);
+    std::thread([&] {
+        CBAttachThread(mb, context);
+        EXPECT_EQ(CBDetachThread(mb, context).rc, CMPI_RC_ERR_INVALID_HANDLE);
+    }).join();
+    EXPECT_THAT(broker.violations(),
+                ElementsAre("detachThread on a thread that is not attached",
+                            "detachThread with a context that is none of prepareAttachThread"));
+    EXPECT_EQ(CMGetContextEntryCount(context, nullptr), 4u);
+}
+
+TEST_F(Lifetimes, ARequestMakesAndReadsBackPathsAndInstances) {
+    Request request(broker);
+    const InstanceValue thing = {{"root", "TEST_Thing", {{"Name", "x"}}},
+                                 {{"Name", "x"}, {"Size", Value::fromUnsigned(3, CMPI_uint16)}}};
+    CMPIObjectPath* const path = request.makePath(thing.path);
+    EXPECT_EQ(valueOf(request.makeInstance(thing)), thing);
+    EXPECT_EQ(valueOf(path), thing.path);
+    EXPECT_EQ(textOf(request.makeString("text")), "text");
+    const CMPIData key = CMGetKey(
+        request.makePath({"", "T", {{"Name", Value::fromText("characters here", CMPI_chars)}}}),
+        "Name", nullptr);
+    EXPECT_EQ(key.type, CMPI_chars);
+    EXPECT_STREQ(key.value.chars, "characters here");
+
+    request.end();
+    EXPECT_THROW(valueOf(path), std::invalid_argument);
+    EXPECT_THROW(valueOf(static_cast<CMPIInstance*>(nullptr)), std::invalid_argument);
+}
+
+class Memory : public BrokerTest {
+  protected:
+    CMPIBrokerMemFT* mft = mb->mft;
+};
 
 TEST_F(Memory, AMarkIsReleasedWithEverythingMadeSince) {
     CMPIObjectPath* const before = newPath();
-    CMPIGcStat* const outer = mb->mft->mark(mb, &status);
-    CMPIGcStat* const inner = mb->mft->mark(mb, &status);
+    CMPIGcStat* const outer = mft->mark(mb, &status);
+    CMPIGcStat* const inner = mft->mark(mb, &status);
     CMPIObjectPath* const after = newPath();
-    EXPECT_EQ(mb->mft->release(mb, outer).rc, CMPI_RC_OK);
+    EXPECT_EQ(mft->release(mb, outer).rc, CMPI_RC_OK);
     EXPECT_EQ(CMGetKeyCount(before, &status), 0u);
     EXPECT_EQ(status.rc, CMPI_RC_OK);
     CMGetKeyCount(after, &status);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_HANDLE);
-    EXPECT_EQ(mb->mft->release(mb, inner).rc, CMPI_RC_ERR_INVALID_HANDLE);
+    EXPECT_EQ(mft->release(mb, inner).rc, CMPI_RC_ERR_INVALID_HANDLE);
     EXPECT_THAT(
         broker.violations(),
         ElementsAre(
@@ -330,9 +384,7 @@ TEST_F(Memory, AMarkIsReleasedWithEverythingMadeSince) {
 }
 
 TEST_F(Memory, BlocksBelongToTheRequest) {
-    CMPIBrokerMemFT* const mft = mb->mft;
-    char* const text = mft->cmpiStrDup(mb, "copied");
-    EXPECT_STREQ(text, "copied");
+    EXPECT_STREQ(mft->cmpiStrDup(mb, "copied"), "copied");
     auto* block = static_cast<unsigned char*>(mft->cmpiCalloc(mb, 4, 8));
     EXPECT_EQ(std::count(block, block + 32, 0), 32);
     block[31] = 9;
@@ -345,30 +397,33 @@ TEST_F(Memory, BlocksBelongToTheRequest) {
     EXPECT_NE(mft->cmpiCalloc(mb, 4, 0), nullptr);
     EXPECT_EQ(mft->cmpiCalloc(mb, ~std::size_t{0}, 2), nullptr);
     EXPECT_THAT(broker.violations(), IsEmpty());
-}
 
-TEST_F(Memory, FreeingWhatIsNoBlockIsAViolation) {
     int stranger = 0;
-    mb->mft->cmpiFree(mb, &stranger);
-    EXPECT_EQ(mb->mft->cmpiRealloc(mb, &stranger, 10), nullptr);
+    mft->cmpiFree(mb, &stranger);
+    EXPECT_EQ(mft->cmpiRealloc(mb, &stranger, 10), nullptr);
     EXPECT_THAT(broker.violations(),
                 ElementsAre("CMPIBrokerMemFT.cmpiFree of memory that is none of the request"));
 }
 
-TEST_F(Memory, ObjectsCanBeFreedEarly) {
+TEST_F(Memory, ObjectsCanBeFreedEarlyAndOnce) {
     CMPIObjectPath* const path = newPath();
-    CMPIInstance* const instance = newInstance();
-    CMPIBrokerMemFT* const mft = mb->mft;
-    mft->freeInstance(mb, instance);
+    mft->freeInstance(mb, newInstance());
     mft->freeObjectPath(mb, path);
     mft->freeString(mb, CMNewString(mb, "x", nullptr));
-    mft->freeArray(mb, CMNewArray(mb, 1, CMPI_uint8, nullptr));
+    mft->freeArray(mb, newArray(CMPI_uint8));
     mft->freeArgs(mb, CMNewArgs(mb, nullptr));
     mft->freeDateTime(mb, CMNewDateTime(mb, nullptr));
     EXPECT_THAT(broker.violations(), IsEmpty());
+
+    CMPISelectExp stranger = {nullptr, nullptr};
     mft->freeObjectPath(mb, path);
-    EXPECT_THAT(broker.violations(), ElementsAre("CMPIBrokerMemFT.freeObjectPath: CMPIObjectPath "
-                                                 "of TEST_Thing used after it was released"));
+    mft->freeSelectExp(mb, nullptr);
+    mft->freeSelectExp(mb, &stranger);
+    EXPECT_THAT(broker.violations(),
+                ElementsAre("CMPIBrokerMemFT.freeObjectPath: CMPIObjectPath of TEST_Thing used "
+                            "after it was released",
+                            "CMPIBrokerMemFT.freeSelectExp: null CMPISelectExp",
+                            "CMPIBrokerMemFT.freeSelectExp: no CMPISelectExp of this host"));
 }
 
 }  // namespace

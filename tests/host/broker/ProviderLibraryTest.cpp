@@ -1,24 +1,27 @@
+// Provider libraries, loaded and asked as an object manager does.
 #include "host/broker/ProviderLibrary.h"
 
 #include "BrokerFixture.h"
+
+#include "host/broker/Invoke.h"
+#include "host/broker/ResultCollector.h"
 
 #include <dlfcn.h>
 #include <elf.h>
 #include <unistd.h>
 
+#include <atomic>
 #include <fstream>
+#include <thread>
 
 namespace cmpihost {
 namespace {
 
-using ::testing::ElementsAre;
 using ::testing::HasSubstr;
-using ::testing::IsEmpty;
 using ::testing::StartsWith;
 
 const std::string libraries = KORVA_BINARY_DIR "/lib/lib";
-const std::string goodFile = libraries + "broker_test_good.so";
-const std::string badFile = libraries + "broker_test_bad.so";
+const std::string testFile = libraries + "broker_test_providers.so";
 
 LoadOptions instanceOnly(const char* provider) {
     LoadOptions options;
@@ -53,7 +56,7 @@ class Library : public ::testing::Test {
 };
 
 TEST_F(Library, GivesBothInterfacesOfAGoodProvider) {
-    ProviderLibrary library(goodFile, broker, {"Good"});
+    ProviderLibrary library(testFile, broker, {"Good"});
     EXPECT_TRUE(library.loaded());
     ASSERT_NE(library.instanceMI(), nullptr);
     ASSERT_NE(library.associationMI(), nullptr);
@@ -65,25 +68,25 @@ TEST_F(Library, GivesBothInterfacesOfAGoodProvider) {
 }
 
 TEST_F(Library, LoadsOnlyTheInterfacesThatAreAskedFor) {
-    ProviderLibrary library(goodFile, broker, instanceOnly("Good"));
+    ProviderLibrary library(testFile, broker, instanceOnly("Good"));
     EXPECT_NE(library.instanceMI(), nullptr);
     EXPECT_EQ(library.associationMI(), nullptr);
 }
 
 TEST_F(Library, LeavesTheProcessWhenItIsDestroyed) {
-    { ProviderLibrary library(goodFile, broker, {"Good", false}); }
-    EXPECT_FALSE(inProcessMap(goodFile));
+    { ProviderLibrary library(testFile, broker, {"Good", false}); }
+    EXPECT_FALSE(inProcessMap(testFile));
 }
 
 TEST_F(Library, IsCleanedUpOnceForEachInterface) {
-    void* const held = dlopen(goodFile.c_str(), RTLD_NOW);
+    void* const held = dlopen(testFile.c_str(), RTLD_NOW);
     ASSERT_NE(held, nullptr);
     auto* const cleanups = static_cast<int*>(dlsym(held, "cleanups"));
     auto* const terminations = static_cast<int*>(dlsym(held, "terminations"));
     *cleanups = 0;
     *terminations = 0;
     {
-        ProviderLibrary library(goodFile, broker, {"Good"});
+        ProviderLibrary library(testFile, broker, {"Good"});
         EXPECT_EQ(*cleanups, 0);
     }
     EXPECT_EQ(*cleanups, 2);
@@ -92,7 +95,7 @@ TEST_F(Library, IsCleanedUpOnceForEachInterface) {
 }
 
 TEST_F(Library, StaysLoadedWhenTheProviderRefusesToGo) {
-    ProviderLibrary library(goodFile, broker, {"Good"});
+    ProviderLibrary library(testFile, broker, {"Good"});
     *static_cast<int*>(library.symbol("refuseUnload")) = 1;
     EXPECT_FALSE(library.unload(false));
     EXPECT_TRUE(library.loaded());
@@ -105,7 +108,7 @@ TEST_F(Library, StaysLoadedWhenTheProviderRefusesToGo) {
 }
 
 TEST_F(Library, CanBeLoadedAgain) {
-    ProviderLibrary library(goodFile, broker, {"Good"});
+    ProviderLibrary library(testFile, broker, {"Good"});
     for (int round = 0; round < 20; ++round) {
         EXPECT_TRUE(library.unload(false));
         library.load();
@@ -146,26 +149,25 @@ class FakeFile {
     std::string name_;
 };
 
-TEST_F(Library, AFileThatIsNoLibraryIsTold) {
-    const FakeFile text("#!/bin/sh\necho not a library\n");
-    EXPECT_EQ(problem(text.name(), {}, LoadProblem::NotALibrary),
-              text.name() + ": not a shared library");
-    const FakeFile empty("");
-    EXPECT_EQ(problem(empty.name(), {}, LoadProblem::NotALibrary),
-              empty.name() + ": not a shared library");
-}
-
-TEST_F(Library, ALibraryOfTheOtherWordSizeIsTold) {
+TEST_F(Library, AFileThatIsNoLibraryOfThisHostIsTold) {
+    constexpr bool is64Bit = sizeof(void*) == 8;
     std::string header(64, '\0');
-    header.replace(0, 4,
-                   "\x7F"
-                   "ELF");
-    header[EI_CLASS] = static_cast<char>(sizeof(void*) == 8 ? ELFCLASS32 : ELFCLASS64);
+    header.replace(0, 4, ELFMAG);
+    header[EI_CLASS] = static_cast<char>(is64Bit ? ELFCLASS32 : ELFCLASS64);
     header[16] = ET_DYN;
-    const FakeFile other(header);
-    EXPECT_EQ(problem(other.name(), {}, LoadProblem::NotALibrary),
-              other.name() + (sizeof(void*) == 8 ? ": a 32-bit library, this host is 64-bit"
-                                                 : ": a 64-bit library, this host is 32-bit"));
+    std::string cutOff = header;
+    cutOff[EI_CLASS] = static_cast<char>(is64Bit ? ELFCLASS64 : ELFCLASS32);
+    const std::pair<std::string, std::string> rows[] = {
+        {"#!/bin/sh\necho not a library\n", "not a shared library"},
+        {"", "not a shared library"},
+        {header, is64Bit ? "a 32-bit library, this host is 64-bit"
+                         : "a 64-bit library, this host is 32-bit"},
+        {cutOff.substr(0, 40), "the file is cut off"}};
+    for (const auto& [content, complaint] : rows) {
+        const FakeFile file(content);
+        EXPECT_EQ(problem(file.name(), {}, LoadProblem::NotALibrary),
+                  file.name() + ": " + complaint);
+    }
 }
 
 TEST_F(Library, AnUnresolvedSymbolIsTold) {
@@ -179,50 +181,221 @@ TEST_F(Library, AMissingFactoryIsTold) {
     EXPECT_EQ(problem(plain, {"Good"}, LoadProblem::NoFactory),
               plain + ": neither _Generic_Create_InstanceMI nor Good_Create_InstanceMI");
     EXPECT_EQ(
-        problem(badFile, {"LowVersion"}, LoadProblem::NoFactory),
-        badFile + ": neither _Generic_Create_AssociationMI nor LowVersion_Create_AssociationMI");
+        problem(testFile, {"LowVersion"}, LoadProblem::NoFactory),
+        testFile + ": neither _Generic_Create_AssociationMI nor LowVersion_Create_AssociationMI");
 }
 
 TEST_F(Library, AFactoryThatFailsIsTold) {
-    const std::string where = badFile + ": factory of the Instance MI";
-    EXPECT_EQ(problem(badFile, instanceOnly("Null"), LoadProblem::FactoryFailed),
-              where + " returned null");
-    EXPECT_EQ(problem(badFile, instanceOnly("Refusing"), LoadProblem::FactoryFailed),
-              where + " answered status 2: not today");
-    EXPECT_EQ(problem(badFile, instanceOnly("Throwing"), LoadProblem::FactoryFailed),
-              where + " threw: no such luck");
-    EXPECT_EQ(problem(badFile, instanceOnly("NoTable"), LoadProblem::NoTable),
-              where + " gave no table");
-    EXPECT_FALSE(inProcessMap(badFile));
-}
-
-TEST_F(Library, AVersionBelow100IsBadManners) {
-    ProviderLibrary library(badFile, broker, instanceOnly("LowVersion"));
-    EXPECT_THAT(broker.violations(),
-                ::testing::Contains("table of the instance MI: ftVersion 1 is below 100"));
-}
-
-TEST_F(Library, AnMiVersionAboveItsTableIsBadManners) {
-    ProviderLibrary library(badFile, broker, instanceOnly("HighMi"));
-    EXPECT_THAT(
-        broker.violations(),
-        ::testing::Contains("table of the instance MI: miVersion 200 is above ftVersion 100"));
-}
-
-TEST_F(Library, EmptySlotsAreBadManners) {
-    {
-        ProviderLibrary library(badFile, broker, instanceOnly("EmptySlots"));
-        EXPECT_THAT(broker.takeViolations(),
-                    ElementsAre("table of the instance MI: miName is null",
-                                "table of the instance MI: enumerateInstanceNames is null",
-                                "table of the instance MI: enumerateInstances is null",
-                                "table of the instance MI: getInstance is null",
-                                "table of the instance MI: createInstance is null",
-                                "table of the instance MI: modifyInstance is null",
-                                "table of the instance MI: deleteInstance is null",
-                                "table of the instance MI: execQuery is null"));
+    const struct {
+        const char* provider;
+        LoadProblem expected;
+        const char* complaint;
+    } rows[] = {{"Null", LoadProblem::FactoryFailed, " returned null"},
+                {"Refusing", LoadProblem::FactoryFailed, " answered status 2: not today"},
+                {"Throwing", LoadProblem::FactoryFailed, " threw: no such luck"},
+                {"NoTable", LoadProblem::NoTable, " gave no table"}};
+    for (const auto& row : rows) {
+        EXPECT_EQ(problem(testFile, instanceOnly(row.provider), row.expected),
+                  testFile + ": factory of the Instance MI" + row.complaint);
     }
+    EXPECT_FALSE(inProcessMap(testFile));
+}
+
+TEST_F(Library, WhatAnObjectManagerMightNotForgiveInATableIsAViolation) {
+    const auto findingsOf = [this](const char* provider) {
+        ProviderLibrary library(testFile, broker, instanceOnly(provider));
+        return broker.takeViolations();
+    };
+    const std::string who = "table of the instance MI: ";
+    std::vector<std::string> empty;
+    for (const char* const slot :
+         {"enumerateInstanceNames", "enumerateInstances", "getInstance", "createInstance",
+          "modifyInstance", "deleteInstance", "execQuery"})
+        empty.push_back(who + slot + " is null");
+    const auto withCleanup = [&](const std::string& version) {
+        std::vector<std::string> all = {who + version, who + "cleanup is null"};
+        all.insert(all.end(), empty.begin(), empty.end());
+        return all;
+    };
+    EXPECT_EQ(findingsOf("LowVersion"), withCleanup("ftVersion 1 is below 100"));
+    EXPECT_EQ(findingsOf("HighMi"), withCleanup("miVersion 200 is above ftVersion 100"));
+    empty.insert(empty.begin(), who + "miName is null");
+    EXPECT_EQ(findingsOf("EmptySlots"), empty);
     EXPECT_THAT(broker.violations(), ElementsAre("cleanup answered status 1"));
+}
+
+class Invocation : public ::testing::Test {
+  protected:
+    Broker broker;
+    ProviderLibrary library{testFile, broker, {"Good"}};
+
+    static OperationRequest request(Operation operation, std::vector<KeyBinding> keys = {}) {
+        OperationRequest result;
+        result.operation = operation;
+        result.path = {"root/cimv2", "TEST_Thing", std::move(keys)};
+        return result;
+    }
+    Outcome run(const OperationRequest& given, const CollectorSetup& setup = {}) {
+        return invoke(library, broker, given, setup);
+    }
+    std::string property(const Outcome& outcome, const char* name) {
+        const Value* const value = outcome.instances.at(0).property(name);
+        return value == nullptr ? "(absent)" : value->toText();
+    }
+    std::string filtersOf(const Outcome& outcome) {
+        std::string text = property(outcome, "Name");
+        for (const char* name : {"AssocClass", "ResultClass", "Role", "ResultRole"})
+            text += ' ' + property(outcome, name);
+        return text;
+    }
+};
+
+TEST_F(Invocation, CollectsPathsInstancesAndTheEnd) {
+    const Outcome names = run(request(Operation::EnumerateInstanceNames));
+    EXPECT_EQ(names.rc, CMPI_RC_OK);
+    EXPECT_FALSE(names.message);
+    EXPECT_EQ(names.doneCount, 1u);
+    ASSERT_EQ(names.paths.size(), 2u);
+    EXPECT_EQ(toString(names.paths[0]), "root/cimv2:TEST_Thing.Name=\"one\"");
+    EXPECT_THAT(names.violations, IsEmpty());
+
+    const Outcome instances = run(request(Operation::EnumerateInstances));
+    ASSERT_EQ(instances.instances.size(), 2u);
+    EXPECT_EQ(property(instances, "Name"), "one");
+    EXPECT_EQ(property(instances, "Properties"), "(null)");
+}
+
+TEST_F(Invocation, HandsThePropertyListOver) {
+    OperationRequest given = request(Operation::EnumerateInstances);
+    given.properties = {{"A", "B"}};
+    EXPECT_EQ(property(run(given), "Properties"), "AB");
+    given.properties = std::vector<std::string>{};
+    EXPECT_EQ(property(run(given), "Properties"), "");
+}
+
+TEST_F(Invocation, KeysArriveWithTheirTypes) {
+    const auto typeOf = [this](const Value& key) {
+        return property(run(request(Operation::GetInstance, {{"Name", key}})), "KeyType");
+    };
+    EXPECT_EQ(typeOf("text"), std::to_string(CMPI_string));
+    EXPECT_EQ(typeOf(Value::fromText("text", CMPI_chars)), std::to_string(CMPI_chars));
+    EXPECT_EQ(typeOf(Value::fromUnsigned(5)), std::to_string(CMPI_uint64));
+    EXPECT_EQ(typeOf(Value::fromBoolean(true)), std::to_string(CMPI_boolean));
+    EXPECT_EQ(typeOf(Value::fromReference({"", "TEST_Other"})), std::to_string(CMPI_ref));
+}
+
+TEST_F(Invocation, TheContextTellsAboutTheRequest) {
+    const auto contextOf = [this](const RequestContext& context) {
+        OperationRequest given = request(Operation::GetInstance);
+        given.context = context;
+        const Outcome outcome = run(given);
+        return property(outcome, "Flags") + ' ' + property(outcome, CMPIPrincipal) + ' ' +
+               property(outcome, CMPIRole) + ' ' + property(outcome, CMPIInitNameSpace);
+    };
+    EXPECT_EQ(contextOf({}), "0 (none) (none) root/cimv2");
+    EXPECT_EQ(contextOf({CMPI_FLAG_LocalOnly, "operator", "admin"}), "1 operator admin root/cimv2");
+}
+
+TEST_F(Invocation, WriteOperationsReachTheirSlots) {
+    OperationRequest create = request(Operation::CreateInstance);
+    create.instance = {{"root/cimv2", "TEST_Thing"}, {{"Name", "new"}}};
+    const Outcome created = run(create);
+    ASSERT_EQ(created.paths.size(), 1u);
+    EXPECT_EQ(toString(created.paths[0]), "root/cimv2:TEST_Thing.Name=\"new\"");
+
+    EXPECT_EQ(run(request(Operation::ModifyInstance)).rc, CMPI_RC_ERR_ACCESS_DENIED);
+    const Outcome deleted = run(request(Operation::DeleteInstance));
+    EXPECT_EQ(deleted.rc, CMPI_RC_ERR_NOT_FOUND);
+    EXPECT_EQ(deleted.message, "It has gone");
+    EXPECT_EQ(deleted.doneCount, 0u);
+}
+
+TEST_F(Invocation, AssociationFiltersArriveAsGiven) {
+    OperationRequest given = request(Operation::Associators);
+    given.assocClass = "TEST_Link";
+    given.resultRole = "Right";
+    EXPECT_EQ(filtersOf(run(given)), "associators TEST_Link (null) (null) Right");
+
+    given.operation = Operation::References;
+    given.resultClass = "TEST_Link";
+    given.role = "Left";
+    EXPECT_EQ(filtersOf(run(given)), "references (null) TEST_Link Left (null)");
+
+    for (const auto& [operation, name] : {std::pair(Operation::AssociatorNames, "associatorNames"),
+                                          {Operation::ReferenceNames, "referenceNames"}}) {
+        EXPECT_EQ(run(request(operation)).paths.at(0).key("Name")->text(), name);
+    }
+}
+
+TEST_F(Invocation, AnExceptionOfTheProviderGoesOnOnceTheRequestHasEnded) {
+    OperationRequest given = request(Operation::ExecQuery);
+    given.query = "SELECT * FROM TEST_Thing";
+    try {
+        run(given);
+        FAIL() << "nothing was thrown";
+    } catch (const std::runtime_error& error) {
+        EXPECT_STREQ(error.what(), "SELECT * FROM TEST_Thing in WQL");
+    }
+    const std::size_t ended = broker.quarantined();
+    EXPECT_GT(ended, 0u);
+    EXPECT_EQ(run(request(Operation::EnumerateInstanceNames)).paths.size(), 2u);
+    EXPECT_THAT(broker.violations(), IsEmpty());
+}
+
+TEST_F(Invocation, TheCollectorCanBePreparedToRefuse) {
+    const Outcome outcome = run(
+        request(Operation::EnumerateInstances),
+        [](ResultCollector& collector) { collector.failReturnInstance(2, CMPI_RC_ERR_FAILED); });
+    EXPECT_EQ(outcome.instances.size(), 1u);
+    ASSERT_EQ(outcome.refusedInstances.size(), 1u);
+    EXPECT_EQ(outcome.refusedInstances[0].property("Name")->text(), "two");
+    EXPECT_EQ(outcome.doneCount, 1u);
+}
+
+TEST_F(Invocation, TellsTheViolationsOfItsOwnRequestOnly) {
+    const TestCatalogue catalogue = testClasses();
+    Broker schooled(&catalogue);
+    ProviderLibrary other(library.file(), schooled, {"Good"});
+    const Outcome outcome = invoke(other, schooled, request(Operation::EnumerateInstances));
+    EXPECT_THAT(outcome.violations, ElementsAre("TEST_Thing has no property Properties"));
+    EXPECT_THAT(invoke(other, schooled, request(Operation::EnumerateInstanceNames)).violations,
+                IsEmpty());
+    EXPECT_EQ(schooled.violations().size(), 1u);
+}
+
+TEST_F(Invocation, AMissingInterfaceOrSlotIsNotSupported) {
+    Outcome outcome =
+        invoke(ManagementInterfaces{}, broker, request(Operation::EnumerateInstances));
+    EXPECT_EQ(outcome.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_THAT(outcome.violations, IsEmpty());
+    EXPECT_EQ(invoke(ManagementInterfaces{}, broker, request(Operation::Associators)).rc,
+              CMPI_RC_ERR_NOT_SUPPORTED);
+
+    CMPIAssociationMIFT table{};
+    CMPIAssociationMI mi = {nullptr, &table};
+    outcome = invoke({nullptr, &mi}, broker, request(Operation::ReferenceNames));
+    EXPECT_EQ(outcome.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    EXPECT_THAT(outcome.violations, ElementsAre("no function for ReferenceNames"));
+}
+
+TEST_F(Invocation, RunsOnSeveralThreadsAtOnce) {
+    std::vector<std::thread> threads;
+    std::atomic<int> good{0};
+    for (int t = 0; t < 4; ++t) {
+        threads.emplace_back([&] {
+            for (int round = 0; round < 50; ++round) {
+                if (run(request(Operation::EnumerateInstances)).instances.size() == 2) ++good;
+            }
+        });
+    }
+    for (std::thread& thread : threads) thread.join();
+    EXPECT_EQ(good, 200);
+    EXPECT_THAT(broker.violations(), IsEmpty());
+}
+
+TEST(Operations, HaveTheNamesOfTheirKind) {
+    EXPECT_STREQ(operationName(Operation::EnumerateInstances), "EnumerateInstances");
+    EXPECT_STREQ(operationName(Operation::ReferenceNames), "ReferenceNames");
 }
 
 }  // namespace

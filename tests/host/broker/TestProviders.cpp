@@ -1,8 +1,8 @@
-// A well-mannered provider library. It answers by its own name TEST_..., echoes what it was given,
-// and can be told through exported variables to behave in other ways.
+// Several providers under names of their own. "Good" behaves: it answers with paths and instances
+// of TEST_Thing, echoes what it was given, and can be told through exported variables to behave in
+// other ways. The factories of the others misbehave, each in its own way.
 #include <cmpi/cmpift.h>
 
-#include <cstdio>
 #include <stdexcept>
 #include <string>
 
@@ -185,4 +185,71 @@ CMPI_EXTERN_C CMPIAssociationMI* Good_Create_AssociationMI(const CMPIBroker* giv
     static CMPIAssociationMI mi = {nullptr, &associationTable};
     broker = given;
     return &mi;
+}
+
+namespace {
+
+CMPIStatus failingCleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
+    return {CMPI_RC_ERR_FAILED, nullptr};
+}
+
+CMPIInstanceMIFT tableOf(int ftVersion, int miVersion) {
+    CMPIInstanceMIFT table{};
+    table.ftVersion = ftVersion;
+    table.miVersion = miVersion;
+    table.miName = "instanceBad";
+    return table;
+}
+
+CMPIInstanceMIFT lowVersion = tableOf(1, 1);
+CMPIInstanceMIFT highMi = tableOf(100, 200);
+CMPIInstanceMIFT emptySlots = [] {
+    CMPIInstanceMIFT table = tableOf(200, 200);
+    table.cleanup = failingCleanup;
+    table.miName = nullptr;
+    return table;
+}();
+
+/// One interface for each table, as a factory hands it out.
+CMPIInstanceMI lowVersionMI = {nullptr, &lowVersion};
+CMPIInstanceMI highMiMI = {nullptr, &highMi};
+CMPIInstanceMI emptySlotsMI = {nullptr, &emptySlots};
+CMPIInstanceMI tablelessMI = {nullptr, nullptr};
+
+}  // namespace
+
+CMPI_EXTERN_C CMPIInstanceMI* Null_Create_InstanceMI(const CMPIBroker*, const CMPIContext*,
+                                                     CMPIStatus*) {
+    return nullptr;
+}
+
+CMPI_EXTERN_C CMPIInstanceMI* Refusing_Create_InstanceMI(const CMPIBroker* given,
+                                                         const CMPIContext*, CMPIStatus* rc) {
+    *rc = {CMPI_RC_ERR_ACCESS_DENIED, CMNewString(given, "not today", nullptr)};
+    return &lowVersionMI;
+}
+
+CMPI_EXTERN_C CMPIInstanceMI* Throwing_Create_InstanceMI(const CMPIBroker*, const CMPIContext*,
+                                                         CMPIStatus*) {
+    throw std::runtime_error("no such luck");
+}
+
+CMPI_EXTERN_C CMPIInstanceMI* NoTable_Create_InstanceMI(const CMPIBroker*, const CMPIContext*,
+                                                        CMPIStatus*) {
+    return &tablelessMI;
+}
+
+CMPI_EXTERN_C CMPIInstanceMI* LowVersion_Create_InstanceMI(const CMPIBroker*, const CMPIContext*,
+                                                           CMPIStatus*) {
+    return &lowVersionMI;
+}
+
+CMPI_EXTERN_C CMPIInstanceMI* HighMi_Create_InstanceMI(const CMPIBroker*, const CMPIContext*,
+                                                       CMPIStatus*) {
+    return &highMiMI;
+}
+
+CMPI_EXTERN_C CMPIInstanceMI* EmptySlots_Create_InstanceMI(const CMPIBroker*, const CMPIContext*,
+                                                           CMPIStatus*) {
+    return &emptySlotsMI;
 }

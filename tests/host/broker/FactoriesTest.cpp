@@ -1,5 +1,6 @@
-// Errors, queries, messages and questions about objects.
 #include "BrokerFixture.h"
+
+#include "host/broker/ResultCollector.h"
 
 namespace cmpihost {
 namespace {
@@ -7,7 +8,7 @@ namespace {
 using MissingServices = BrokerTest;
 
 TEST_F(MissingServices, ErrorsAndQueriesAreNotMade) {
-    CMPIArray* names = CMNewArray(mb, 1, CMPI_string, nullptr);
+    CMPIArray* names = newArray(CMPI_string);
     EXPECT_EQ(CMNewSelectExp(mb, "SELECT * FROM A", "WQL", &names, &status), nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
     EXPECT_EQ(names, nullptr);
@@ -15,10 +16,10 @@ TEST_F(MissingServices, ErrorsAndQueriesAreNotMade) {
         CMNewCMPIError(mb, "", "", "", ErrorSevLow, ErrorProbCauseUnknown, CMPI_RC_OK, &status),
         nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
-    EXPECT_THAT(broker.violations(), ::testing::IsEmpty());
+    EXPECT_THAT(broker.violations(), IsEmpty());
 }
 
-class Messages : public BrokerTest {};
+using Messages = BrokerTest;
 
 TEST_F(Messages, TakeArgumentsOfEveryKind) {
     CMPIString* const string = CMNewString(mb, "string", nullptr);
@@ -81,37 +82,36 @@ TEST_F(Messages, LoggedAndTracedOnesAreKept) {
     EXPECT_TRUE(broker.takeLogRecords().empty());
 }
 
-class ObjectQuestions : public BrokerTest {
-  protected:
-    std::string typeOf(const void* object) { return textOf(CDGetType(mb, object, &status)); }
-    std::string text(const void* object) { return textOf(CDToString(mb, object, &status)); }
-};
+using ObjectQuestions = BrokerTest;
 
-TEST_F(ObjectQuestions, EveryKindKnowsItsType) {
-    EXPECT_EQ(typeOf(CMNewString(mb, "x", nullptr)), "CMPIString");
-    EXPECT_EQ(typeOf(newPath()), "CMPIObjectPath");
-    EXPECT_EQ(typeOf(newInstance()), "CMPIInstance");
-    EXPECT_EQ(typeOf(CMNewArray(mb, 1, CMPI_uint8, nullptr)), "CMPIArray");
-    EXPECT_EQ(typeOf(CMNewArgs(mb, nullptr)), "CMPIArgs");
-    EXPECT_EQ(typeOf(request.makeContext({}, "")), "CMPIContext");
-    EXPECT_EQ(typeOf(CMNewDateTime(mb, nullptr)), "CMPIDateTime");
-    EXPECT_TRUE(CDIsOfType(mb, newPath(), "CMPIObjectPath", &status));
-    EXPECT_FALSE(CDIsOfType(mb, newPath(), "CMPIInstance", &status));
-}
-
-TEST_F(ObjectQuestions, EveryKindHasAText) {
+TEST_F(ObjectQuestions, EveryKindKnowsItsTypeAndHasAText) {
     CMPIInstance* const instance = newInstance();
     CMSetProperty(instance, "Name", "x", CMPI_chars);
     const CMPIUint16 number = 3;
     CMSetProperty(instance, "Size", &number, CMPI_uint16);
     CMPIArgs* const args = CMNewArgs(mb, nullptr);
     CMAddArg(args, "A", "b", CMPI_chars);
-    EXPECT_EQ(text(instance), "root/cimv2:TEST_Thing {Name=\"x\", Size=3}");
-    EXPECT_EQ(text(newPath()), "root/cimv2:TEST_Thing");
-    EXPECT_EQ(text(CMNewString(mb, "plain", nullptr)), "plain");
-    EXPECT_EQ(text(CMNewArray(mb, 2, CMPI_uint8, nullptr)), "{NULL, NULL}");
-    EXPECT_EQ(text(args), "{A=\"b\"}");
-    EXPECT_EQ(text(CMNewDateTimeFromBinary(mb, 0, 0, nullptr)), "19700101000000.000000+000");
+    ResultCollector collector(request);
+    const struct {
+        const void* object;
+        const char* type;
+        const char* text;
+    } rows[] = {
+        {CMNewString(mb, "plain", nullptr), "CMPIString", "plain"},
+        {newPath(), "CMPIObjectPath", "root/cimv2:TEST_Thing"},
+        {instance, "CMPIInstance", "root/cimv2:TEST_Thing {Name=\"x\", Size=3}"},
+        {newArray(CMPI_uint8, 2), "CMPIArray", "{NULL, NULL}"},
+        {args, "CMPIArgs", "{A=\"b\"}"},
+        {request.makeContext({}, "n"), "CMPIContext",
+         "{CMPIInvocationFlags=0, CMPIPrincipal=NULL, CMPIInitNameSpace=\"n\", CMPIRole=NULL}"},
+        {CMNewDateTimeFromBinary(mb, 0, 0, nullptr), "CMPIDateTime", "19700101000000.000000+000"},
+        {collector.cmpi(), "CMPIResult", "CMPIResult"}};
+    for (const auto& row : rows) {
+        EXPECT_EQ(textOf(CDGetType(mb, row.object, &status)), row.type);
+        EXPECT_EQ(textOf(CDToString(mb, row.object, &status)), row.text);
+        EXPECT_TRUE(CDIsOfType(mb, row.object, row.type, &status)) << row.type;
+        EXPECT_FALSE(CDIsOfType(mb, row.object, "CMPIError", &status)) << row.type;
+    }
 }
 
 TEST_F(ObjectQuestions, WhatIsNoObjectIsAViolation) {
@@ -123,9 +123,8 @@ TEST_F(ObjectQuestions, WhatIsNoObjectIsAViolation) {
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_HANDLE);
     EXPECT_EQ(CDToString(mb, nullptr, &status), nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_PARAMETER);
-    EXPECT_THAT(broker.violations(),
-                ::testing::ElementsAre("CMPIBrokerEncFT.getType: no object of this host",
-                                       "CMPIBrokerEncFT.toString: null object"));
+    EXPECT_THAT(broker.violations(), ElementsAre("CMPIBrokerEncFT.getType: no object of this host",
+                                                 "CMPIBrokerEncFT.toString: null object"));
 }
 
 TEST_F(ObjectQuestions, ClassesDescendAsTheCatalogueSays) {
@@ -134,9 +133,9 @@ TEST_F(ObjectQuestions, ClassesDescendAsTheCatalogueSays) {
     Request scope(schooled);
     const CMPIBroker* const other = schooled.cmpi();
     const CMPIObjectPath* const small = CMNewObjectPath(other, "", "TEST_SmallThing", nullptr);
-    EXPECT_TRUE(CMClassPathIsA(other, small, "test_smallthing", &status));
-    EXPECT_TRUE(CMClassPathIsA(other, small, "TEST_Thing", &status));
-    EXPECT_TRUE(CMClassPathIsA(other, small, "CIM_Thing", &status));
+    for (const char* const ancestor : {"test_smallthing", "TEST_Thing", "CIM_Thing"}) {
+        EXPECT_TRUE(CMClassPathIsA(other, small, ancestor, &status)) << ancestor;
+    }
     EXPECT_FALSE(CMClassPathIsA(other, small, "TEST_Other", &status));
     EXPECT_FALSE(CMClassPathIsA(mb, newPath("TEST_SmallThing"), "TEST_Thing", &status));
 }

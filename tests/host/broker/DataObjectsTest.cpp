@@ -10,7 +10,7 @@ namespace {
 using ArrayObject = BrokerTest;
 
 TEST_F(ArrayObject, StartsWithNullElements) {
-    CMPIArray* const array = CMNewArray(mb, 3, CMPI_uint16, &status);
+    CMPIArray* const array = newArray(CMPI_uint16, 3);
     EXPECT_EQ(CMGetArrayCount(array, &status), 3u);
     EXPECT_EQ(CMGetArrayType(array, &status), CMPI_uint16);
     EXPECT_EQ(CMGetArrayElementAt(array, 2, &status).state, CMPI_nullValue);
@@ -18,7 +18,7 @@ TEST_F(ArrayObject, StartsWithNullElements) {
 }
 
 TEST_F(ArrayObject, TextElementsComeBackAsStrings) {
-    CMPIArray* const array = CMNewArray(mb, 2, CMPI_chars, &status);
+    CMPIArray* const array = newArray(CMPI_chars, 2);
     CMPIString* const text = CMNewString(mb, "two", nullptr);
     EXPECT_EQ(CMSetArrayElementAt(array, 0, "one", CMPI_chars).rc, CMPI_RC_OK);
     EXPECT_EQ(CMSetArrayElementAt(array, 1, &text, CMPI_string).rc, CMPI_RC_OK);
@@ -28,16 +28,15 @@ TEST_F(ArrayObject, TextElementsComeBackAsStrings) {
 }
 
 TEST_F(ArrayObject, AnElementOfAnotherTypeIsAViolation) {
-    CMPIArray* const array = CMNewArray(mb, 1, CMPI_uint16, nullptr);
+    CMPIArray* const array = newArray(CMPI_uint16);
     const CMPIUint32 value = 1;
     EXPECT_EQ(CMSetArrayElementAt(array, 0, &value, CMPI_uint32).rc, CMPI_RC_ERR_TYPE_MISMATCH);
     EXPECT_EQ(CMGetArrayElementAt(array, 0, nullptr).state, CMPI_nullValue);
-    EXPECT_THAT(broker.violations(),
-                ::testing::ElementsAre("element of an array of uint16 set to a uint32"));
+    EXPECT_THAT(broker.violations(), ElementsAre("element of an array of uint16 set to a uint32"));
 }
 
 TEST_F(ArrayObject, HasNoElementBeyondItsEnd) {
-    CMPIArray* const array = CMNewArray(mb, 1, CMPI_uint16, nullptr);
+    CMPIArray* const array = newArray(CMPI_uint16);
     const CMPIUint16 value = 1;
     EXPECT_EQ(CMSetArrayElementAt(array, 1, &value, CMPI_uint16).rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
     EXPECT_EQ(CMGetArrayElementAt(array, 1, &status).state, CMPI_notFound);
@@ -76,11 +75,11 @@ TEST_F(ContextObject, HoldsTheStandardEntries) {
     const CMPIData flags = CMGetContextEntry(context, "CMPIInvocationFlags", &status);
     EXPECT_EQ(flags.type, CMPI_uint32);
     EXPECT_EQ(flags.value.uint32, 9u);
-    EXPECT_EQ(textOf(CMGetContextEntry(context, "CMPIPrincipal", nullptr).value.string),
-              "operator");
-    EXPECT_EQ(textOf(CMGetContextEntry(context, "CMPIRole", nullptr).value.string), "admin");
-    EXPECT_EQ(textOf(CMGetContextEntry(context, "CMPIInitNameSpace", nullptr).value.string),
-              "root/cimv2");
+    for (const auto& [name, text] : {std::pair("CMPIPrincipal", "operator"),
+                                     {"CMPIRole", "admin"},
+                                     {"CMPIInitNameSpace", "root/cimv2"}}) {
+        EXPECT_EQ(textOf(CMGetContextEntry(context, name, nullptr).value.string), text) << name;
+    }
 }
 
 TEST_F(ContextObject, AnUnknownPrincipalIsAStringWithoutCharacters) {
@@ -175,7 +174,7 @@ TEST_F(DateTimeObject, IsNotMadeOfWhatIsNone) {
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_PARAMETER);
     EXPECT_EQ(CMNewDateTimeFromBinary(mb, 253402300800000000u, 0, &status), nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_PARAMETER);
-    EXPECT_THAT(broker.violations(), ::testing::IsEmpty());
+    EXPECT_THAT(broker.violations(), IsEmpty());
 }
 
 TEST_F(DateTimeObject, AnInstantBefore1970HasNoMicroseconds) {
