@@ -30,11 +30,6 @@ static_assert(!std::is_copy_constructible_v<Instrumentation>);
 static_assert(!std::is_copy_assignable_v<Instrumentation>);
 static_assert(sizeof(NodeType) == 4 && sizeof(Properties) == 4);
 
-// The operator is not const, as gtest would have it.
-bool isValid(Instrumentation& cursor) {
-    return cursor;
-}
-
 class InstrumentationTest : public testing::Test {
   protected:
     ~InstrumentationTest() override { VA::setHostSource(nullptr); }
@@ -43,7 +38,7 @@ class InstrumentationTest : public testing::Test {
         std::string text;
         unsigned int number = 0;
         bool flag = false;
-        EXPECT_FALSE(isValid(cursor));
+        EXPECT_FALSE(static_cast<bool>(cursor));
         for (unsigned int id = 100; id < 160; ++id) {
             EXPECT_FALSE(cursor.getProperty(Properties(id), text)) << id;
             EXPECT_FALSE(cursor.getProperty(Properties(id), number)) << id;
@@ -72,7 +67,7 @@ TEST_F(InstrumentationTest, FindsOneOperatingSystemOnThisMachineAndNothingBehind
     Instrumentation cursor;
     expectNothing(cursor);
     EXPECT_TRUE(cursor.selectNode(OperatingSystemNode));
-    EXPECT_TRUE(isValid(cursor));
+    EXPECT_TRUE(static_cast<bool>(cursor));
     EXPECT_NE(nameOf(cursor), "none");
     EXPECT_EQ(&++cursor, &cursor);
     expectNothing(cursor);
@@ -193,7 +188,7 @@ TEST_F(InstrumentationTest, SourceMayBeReplacedWhileManyThreadsRead) {
                 EXPECT_TRUE(cursor.selectNode(OperatingSystemNode));
                 EXPECT_NE(nameOf(cursor), "none");
                 ++cursor;
-                EXPECT_FALSE(isValid(cursor));
+                EXPECT_FALSE(static_cast<bool>(cursor));
             }
         });
     }

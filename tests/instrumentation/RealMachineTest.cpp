@@ -46,7 +46,7 @@ std::optional<double> shellNumber(const std::string& command) {
     return end == output.c_str() ? std::nullopt : std::optional<double>(number);
 }
 
-std::optional<double> meminfo(const std::string& row) {
+std::optional<double> meminfoKiB(const std::string& row) {
     return shellNumber("awk '$1 == \"" + row + ":\" {print $2}' /proc/meminfo 2>/dev/null");
 }
 
@@ -180,12 +180,12 @@ const std::map<unsigned int, std::function<Expected()>> numbers{
      }},
     {FreeVirtualMemory,
      [] {
-         return Expected{meminfo("MemAvailable").value() + meminfo("SwapFree").value_or(0),
+         return Expected{meminfoKiB("MemAvailable").value() + meminfoKiB("SwapFree").value_or(0),
                          ram() / 4};
      }},
     {FreePhysicalMemory,
      [] {
-         return Expected{meminfo("MemAvailable"), ram() / 4};
+         return Expected{meminfoKiB("MemAvailable"), ram() / 4};
      }},
     {TotalVisibleMemorySize,
      [] {

@@ -17,11 +17,6 @@ using VA::Instrumentation;
 using VA::SimulatedHost;
 using Operation = SimulatedHost::Operation;
 
-// The operator is not const, as gtest would have it.
-bool isValid(Instrumentation& cursor) {
-    return cursor;
-}
-
 class SimulatedHostTest : public testing::Test {
   protected:
     SimulatedHostTest() { VA::setHostSource(host); }
@@ -101,7 +96,7 @@ TEST_F(SimulatedHostTest, NodesComeInTheOrderTheyWereAddedEachWithItsOwnValues) 
     Instrumentation cursor;
     cursor.selectNode(OperatingSystemNode);
     for (const unsigned int i : {1u, 2u, 2u}) {
-        ASSERT_TRUE(isValid(cursor));
+        ASSERT_TRUE(static_cast<bool>(cursor));
         std::string name;
         bool readOnly = false;
         EXPECT_TRUE(cursor.getProperty(Name, name));
@@ -111,7 +106,7 @@ TEST_F(SimulatedHostTest, NodesComeInTheOrderTheyWereAddedEachWithItsOwnValues) 
         EXPECT_EQ(cursor.getNodeStatus(), 20 + i);
         ++cursor;
     }
-    EXPECT_FALSE(isValid(cursor));
+    EXPECT_FALSE(static_cast<bool>(cursor));
 }
 
 TEST_F(SimulatedHostTest, ComputerNameCanBeUnknown) {
@@ -128,7 +123,7 @@ TEST_F(SimulatedHostTest, WalkKeepsTheHostAsItStoodWhenItWasSelected) {
     cursor.selectNode(OperatingSystemNode);
     host->clearNodes();
     host->setComputerName("renamed");
-    EXPECT_TRUE(isValid(cursor));
+    EXPECT_TRUE(static_cast<bool>(cursor));
     std::string name;
     EXPECT_TRUE(cursor.getComputerName(name));
     EXPECT_EQ(name, "simulated.example");
@@ -141,7 +136,7 @@ TEST_F(SimulatedHostTest, WalkKeepsTheHostAsItStoodWhenItWasSelected) {
 TEST_F(SimulatedHostTest, NodesAreOfTheOperatingSystemTypeAlone) {
     Instrumentation cursor;
     EXPECT_FALSE(cursor.selectNode(NodeType(16)));
-    EXPECT_FALSE(isValid(cursor));
+    EXPECT_FALSE(static_cast<bool>(cursor));
 }
 
 // Calls every operation once, in the order of the enumeration.
@@ -151,7 +146,7 @@ void callEverything() {
     bool flag = false;
     Instrumentation cursor;
     cursor.selectNode(OperatingSystemNode);
-    isValid(cursor);
+    static_cast<void>(static_cast<bool>(cursor));
     ++cursor;
     cursor.getProperty(Name, text);
     cursor.getProperty(OSType, number);
