@@ -37,15 +37,6 @@ class OperatingSystemElement : public SimulatedFixture {
 
 using Names = std::vector<std::string>;
 
-TEST_F(OperatingSystemElement, WithoutANodeItIsFalseAtOnceAndFiltersReadNothing) {
-    OperatingSystem element;
-    element.setFilter(OperatingSystem::CSNameFilter, "Host1");
-    element.setFilter(OperatingSystem::NameFilter, "a");
-    EXPECT_FALSE(static_cast<bool>(element));
-    EXPECT_EQ(host->calls(Operation::ReadText), 0U);
-    EXPECT_EQ(host->calls(Operation::ComputerName), 0U);
-}
-
 TEST_F(OperatingSystemElement, WalkMeetsTheNodesThatPassEveryFilter) {
     constexpr auto csName = OperatingSystem::CSNameFilter;
     constexpr auto name = OperatingSystem::NameFilter;
@@ -80,29 +71,31 @@ TEST_F(OperatingSystemElement, WalkMeetsTheNodesThatPassEveryFilter) {
     EXPECT_FALSE(static_cast<bool>(nameless));
 }
 
-TEST_F(OperatingSystemElement, FirstFailingFilterEndsTheTest) {
-    addNode("a");
+TEST_F(OperatingSystemElement, FiltersReadAndMoveNoMoreThanTheyNeed) {
+    const auto other = static_cast<OperatingSystem::FilterType>(7);
+    const auto readings = [this] {
+        return host->calls(Operation::ReadText) + host->calls(Operation::ComputerName);
+    };
+    OperatingSystem none;  // on a host without a node
+    none.setFilter(OperatingSystem::CSNameFilter, "Host1");
+    none.setFilter(OperatingSystem::NameFilter, "a");
+    EXPECT_FALSE(static_cast<bool>(none));
+    EXPECT_EQ(readings(), 0U);
+    addNodes({"a", "a", "b"});
     OperatingSystem element;
-    element.setFilter(OperatingSystem::CSNameFilter, "other");
-    host->resetCounts();
-    element.setFilter(OperatingSystem::NameFilter, "a");
-    EXPECT_EQ(host->calls(Operation::ReadText, Name), 0U);
-}
-
-TEST_F(OperatingSystemElement, FilterThatTheCurrentNodeSatisfiesDoesNotMoveTheCursor) {
-    addNodes({"a", "a"});
-    OperatingSystem element;
+    element.setFilter(other, "x");
+    EXPECT_EQ(readings(), 0U);
+    // The current node passes.
     element.setFilter(OperatingSystem::NameFilter, "A");
     EXPECT_EQ(host->calls(Operation::Next), 0U);
     EXPECT_EQ(walked(element), (Names{"a", "a"}));
-}
-
-TEST_F(OperatingSystemElement, FilterOfAnotherTypeReadsNothing) {
-    addNodes({"a", "b"});
-    OperatingSystem element;
-    element.setFilter(static_cast<OperatingSystem::FilterType>(7), "x");
-    EXPECT_EQ(host->calls(Operation::ReadText), 0U);
-    EXPECT_EQ(host->calls(Operation::ComputerName), 0U);
+    // The first filter that fails ends the test of a node.
+    OperatingSystem narrowed;
+    narrowed.setFilter(OperatingSystem::NameFilter, "a");
+    narrowed.setFilter(OperatingSystem::CSNameFilter, "host1");
+    host->resetCounts();
+    EXPECT_EQ(walked(narrowed), (Names{"a", "a"}));
+    EXPECT_EQ(host->calls(Operation::ComputerName), 1U);  // of the second node
 }
 
 TEST_F(OperatingSystemElement, OSTypeIsShiftedAgainstTheFrameworksNumber) {
@@ -121,40 +114,34 @@ TEST_F(OperatingSystemElement, OSTypeIsShiftedAgainstTheFrameworksNumber) {
 }
 
 TEST_F(OperatingSystemElement, EveryStatusCodeHasItsMeaningInTheThreeMaps) {
-    using Numbers = std::vector<unsigned short>;
-    struct Row {
-        unsigned short enabledState;
-        unsigned short healthState;
-        Numbers operationalStatus;
+    const struct {
+        unsigned int first, last;
+        unsigned short enabledState, healthState;
+        std::vector<unsigned short> operationalStatus;
+    } rows[] = {
+        {0, 0, 0, 0, {0}},    {1, 1, 2, 5, {2, 11}}, {2, 2, 10, 0, {0}},
+        {3, 7, 5, 0, {0}},    {8, 8, 9, 0, {0}},     {9, 9, 10, 0, {0}},
+        {10, 11, 5, 0, {0}},  {12, 12, 6, 0, {0}},   {13, 15, 5, 0, {0}},
+        {16, 16, 3, 0, {0}},  {17, 19, 5, 0, {0}},   {20, 20, 5, 10, {3, 5}},
+        {21, 26, 5, 10, {3}}, {27, 30, 5, 0, {0}},   {4294967294U, 4294967294U, 5, 0, {0}},
     };
-    const Row notApplicable = {5, 0, {0}};
-    std::vector<std::pair<unsigned int, Row>> rows;
-    for (unsigned int code = 0; code <= 30; ++code) rows.push_back({code, notApplicable});
-    rows.push_back({4294967295U, notApplicable});
-    rows[0].second = {0, 0, {0}};
-    rows[1].second = {2, 5, {2, 11}};
-    rows[2].second = {10, 0, {0}};
-    rows[8].second = {9, 0, {0}};
-    rows[9].second = {10, 0, {0}};
-    rows[12].second = {6, 0, {0}};
-    rows[16].second = {3, 0, {0}};
-    rows[20].second = {5, 10, {3, 5}};
-    for (unsigned int code = 21; code <= 26; ++code) rows[code].second = {5, 10, {3}};
-
-    for (const auto& [code, expected] : rows) {
+    const auto expectMeaning = [this](unsigned int code, const auto& expected) {
         host->clearNodes();
         host->addNode({{}, {}, code});
         OperatingSystem element;
         unsigned short enabledState = 4711;
         unsigned short healthState = 4711;
-        Numbers operationalStatus;
+        std::vector<unsigned short> operationalStatus;
         EXPECT_TRUE(element.getEnabledState(enabledState));
         EXPECT_TRUE(element.getHealthState(healthState));
         EXPECT_TRUE(element.getOperationalStatus(operationalStatus));
         EXPECT_EQ(enabledState, expected.enabledState) << code;
         EXPECT_EQ(healthState, expected.healthState) << code;
         EXPECT_EQ(operationalStatus, expected.operationalStatus) << code;
-    }
+    };
+    for (const auto& row : rows)
+        for (unsigned int code = row.first; code <= row.last; ++code) expectMeaning(code, row);
+    expectMeaning(4294967295U, rows[3]);
 }
 
 TEST_F(OperatingSystemElement, OperationalStatusIsAppendedWithoutClearing) {
