@@ -9,8 +9,23 @@ missing_packages() {
     done
 }
 
+# Without apt-get: says what the named packages are for Debian's, and whether it is worth going on.
+need_elsewhere() {
+    echo "== No apt-get here. What is needed has these names in Debian: $*"
+    for command in cmake ninja g++; do
+        command -v "$command" >/dev/null || {
+            echo "$command is missing: install it and the others, then run this again" >&2
+            return 1
+        }
+    done
+}
+
 # Installs the named packages, as root or through sudo. Does nothing when they are all there.
 need() {
+    if ! command -v apt-get >/dev/null || ! command -v dpkg-query >/dev/null; then
+        need_elsewhere "$@"
+        return
+    fi
     missing=$(missing_packages "$@")
     [ -n "$missing" ] || return 0
     echo "== Installing packages: $missing"
@@ -33,6 +48,10 @@ need() {
 # shellcheck disable=SC2034
 bench_packages="libbenchmark-dev valgrind"
 
+# What looks at the source.
+# shellcheck disable=SC2034
+lint_packages="clang-format clang-tidy shellcheck git"
+
 # What every build needs; g++-multilib compiles 32-bit code on a 64-bit machine.
 build_packages="cmake ninja-build g++ libc6-dev googletest libcli11-dev nlohmann-json3-dev"
-[ "$(dpkg --print-architecture)" = i386 ] || build_packages="$build_packages g++-multilib"
+[ "$(dpkg --print-architecture 2>/dev/null)" = i386 ] || build_packages="$build_packages g++-multilib"

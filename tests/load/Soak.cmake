@@ -14,7 +14,7 @@ add_dependencies(soak load_hosts korvaosstatusfacade)
 function(korva_soak name)
     add_test(NAME load.${name}
         COMMAND "${CMAKE_CURRENT_SOURCE_DIR}/run" $<TARGET_FILE:soak> ${ARGN} --report)
-    set_tests_properties(load.${name} PROPERTIES TIMEOUT 300 COST 100)
+    set_tests_properties(load.${name} PROPERTIES TIMEOUT 300 COST 100 LABELS slow)
 endfunction()
 
 # On a busy machine the last page that is ever used may come late: a tenth and a fifth of the requests come
@@ -37,5 +37,5 @@ if(NOT KORVA_SANITIZE AND KORVA_WORD_SIZE STREQUAL "64")
     add_test(NAME load.ValgrindFindsNoErrorAndNothingThatIsNotFreed
         COMMAND "${CMAKE_CURRENT_SOURCE_DIR}/memcheck" $<TARGET_FILE:soak>)
     set_tests_properties(load.ValgrindFindsNoErrorAndNothingThatIsNotFreed PROPERTIES
-        TIMEOUT 300 SKIP_RETURN_CODE 77)
+        TIMEOUT 300 SKIP_RETURN_CODE 77 LABELS slow)
 endif()
