@@ -13,7 +13,7 @@ namespace VA::OSStatusFacade {
 namespace {
 
 /// A way from the source over one association.
-struct Hop {
+struct Traversal {
     const Class& association;
     const End& near;
     const End& far;
@@ -23,8 +23,8 @@ bool isGiven(const char* filter) {
     return filter != nullptr && *filter != '\0';
 }
 
-bool admits(const char* filter, const Class& itsClass) {
-    return !isGiven(filter) || itsClass.isA(filter);
+bool admits(const char* filter, const Class& cimClass) {
+    return !isGiven(filter) || cimClass.isA(filter);
 }
 
 bool admits(const char* filter, const char* role) {
@@ -32,20 +32,23 @@ bool admits(const char* filter, const char* role) {
 }
 
 // The ways that a source of that class has. None from a path that can name no instance.
-std::vector<Hop> hopsFrom(const Request& request, const Filter& filter) {
-    std::vector<Hop> hops;
+std::vector<Traversal> traversalsFrom(const Request& request, const Filter& filter) {
+    std::vector<Traversal> traversals;
     const Class* const source = request.knownClass();
-    if (source == nullptr || !keyProblem(*source, keysOf(request.path())).empty()) return hops;
+    if (source == nullptr || !keyProblem(*source, keysOf(request.path())).empty())
+        return traversals;
     for (const Association& association : associations())
         for (const int near : {0, 1}) {
-            const Hop hop = {association.itself, association.ends[near],
-                             association.ends[1 - near]};
-            if (&hop.near.elements == source && admits(filter.associationClass, hop.association) &&
-                admits(filter.farClass, hop.far.elements) && admits(filter.role, hop.near.role) &&
-                admits(filter.farRole, hop.far.role))
-                hops.push_back(hop);
+            const Traversal traversal = {association.associationClass, association.ends[near],
+                                         association.ends[1 - near]};
+            if (&traversal.near.elements == source &&
+                admits(filter.associationClass, traversal.association) &&
+                admits(filter.farClass, traversal.far.elements) &&
+                admits(filter.role, traversal.near.role) &&
+                admits(filter.farRole, traversal.far.role))
+                traversals.push_back(traversal);
         }
-    return hops;
+    return traversals;
 }
 
 /// A pair that has the source at its near end.
@@ -58,31 +61,31 @@ struct Pair {
 
 // Adds the pair that a path names, if the source is at its near end. One without a far end, or
 // whose far end has no keys, ties the source to nothing.
-void addPair(std::vector<Pair>& pairs, const Request& request, const Hop& hop,
+void addPair(std::vector<Pair>& pairs, const Request& request, const Traversal& traversal,
              const Identity& source, const CMPIObjectPath* path, const CMPIInstance* instance) {
-    const CMPIObjectPath* const near = referenceOf(path, hop.near.role);
-    const CMPIObjectPath* const far = referenceOf(path, hop.far.role);
+    const CMPIObjectPath* const near = referenceOf(path, traversal.near.role);
+    const CMPIObjectPath* const far = referenceOf(path, traversal.far.role);
     if (near == nullptr || far == nullptr || keysOf(far).empty()) return;
     if (request.identityOf(near) == source)
-        pairs.push_back({hop.far.elements, path, far, instance});
+        pairs.push_back({traversal.far.elements, path, far, instance});
 }
 
 enum class Ask { names, instances };
 
 std::vector<Pair> pairsOf(const Request& request, const Filter& filter, Ask ask) {
     std::vector<Pair> pairs;
-    const std::vector<Hop> hops = hopsFrom(request, filter);
-    if (hops.empty()) return pairs;
+    const std::vector<Traversal> traversals = traversalsFrom(request, filter);
+    if (traversals.empty()) return pairs;
     const Identity source = request.identityOf(request.path());
-    for (const Hop& hop : hops) {
-        const CMPIObjectPath* const classPath = request.newPath(hop.association.name);
+    for (const Traversal& traversal : traversals) {
+        const CMPIObjectPath* const classPath = request.newPath(traversal.association.name);
         const Answer answer = ask == Ask::names ? request.enumerateInstanceNames(classPath)
                                                 : request.enumerateInstances(classPath);
-        requireWhole(answer, hop.association.name);
+        requireWhole(answer, traversal.association.name);
         for (const CMPIObjectPath* path : answer.paths())
-            addPair(pairs, request, hop, source, path, nullptr);
+            addPair(pairs, request, traversal, source, path, nullptr);
         for (const CMPIInstance* instance : answer.instances())
-            addPair(pairs, request, hop, source, pathOf(instance), instance);
+            addPair(pairs, request, traversal, source, pathOf(instance), instance);
     }
     return pairs;
 }
@@ -94,12 +97,12 @@ using Paths = std::vector<const CMPIObjectPath*>;
 using Instances = std::vector<const CMPIInstance*>;
 
 // The computer systems, which another provider of the object manager serves.
-Instances computerSystems(const Request& request, const Class& itsClass) {
+Instances computerSystems(const Request& request, const Class& cimClass) {
     const Refusal failure(CMPI_RC_ERR_FAILED,
-                          std::string("the object manager does not enumerate ") + itsClass.name);
+                          std::string("the object manager does not enumerate ") + cimClass.name);
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     CMPIEnumeration* const enumeration = request.broker()->bft->enumerateInstances(
-        request.broker(), request.context(), request.newPath(itsClass.name), nullptr, &status);
+        request.broker(), request.context(), request.newPath(cimClass.name), nullptr, &status);
     if (enumeration == nullptr || status.rc != CMPI_RC_OK) throw failure;
     Instances instances;
     while (enumeration->ft->hasNext(enumeration, &status) != 0) {
@@ -111,10 +114,10 @@ Instances computerSystems(const Request& request, const Class& itsClass) {
     return instances;
 }
 
-Instances instancesOf(const Request& request, const Class& itsClass) {
-    if (!itsClass.isOfProvider) return computerSystems(request, itsClass);
-    const Answer answer = request.enumerateInstances(request.newPath(itsClass.name));
-    requireWhole(answer, itsClass.name);
+Instances instancesOf(const Request& request, const Class& cimClass) {
+    if (!cimClass.servedByProvider) return computerSystems(request, cimClass);
+    const Answer answer = request.enumerateInstances(request.newPath(cimClass.name));
+    requireWhole(answer, cimClass.name);
     return answer.instances();
 }
 
@@ -124,9 +127,9 @@ class InstanceIndex {
     explicit InstanceIndex(const Request& request) : request_(request) {}
 
     /// Null when there is no such instance any more.
-    const CMPIInstance* find(const Identity& identity, const Class& itsClass) {
-        if (fetched_.insert(&itsClass).second)
-            for (const CMPIInstance* instance : instancesOf(request_, itsClass))
+    const CMPIInstance* find(const Identity& identity, const Class& cimClass) {
+        if (fetched_.insert(&cimClass).second)
+            for (const CMPIInstance* instance : instancesOf(request_, cimClass))
                 instances_.emplace(request_.identityOf(pathOf(instance)), instance);
         const auto found = instances_.find(identity);
         return found == instances_.end() ? nullptr : found->second;

@@ -102,12 +102,12 @@ std::string valueProblem(const Key& key, const KeyBinding& binding) {
 
 }  // namespace
 
-std::string keyProblem(const Class& itsClass, const std::vector<KeyBinding>& bindings) {
-    const std::string of = std::string(" of ") + itsClass.name;
+std::string keyProblem(const Class& cimClass, const std::vector<KeyBinding>& bindings) {
+    const std::string of = std::string(" of ") + cimClass.name;
     for (const KeyBinding& binding : bindings)
-        if (itsClass.key(binding.name) == nullptr)
-            return std::string(itsClass.name) + " has no key " + printable(binding.name);
-    for (const Key& key : itsClass.keys) {
+        if (cimClass.key(binding.name) == nullptr)
+            return std::string(cimClass.name) + " has no key " + printable(binding.name);
+    for (const Key& key : cimClass.keys) {
         const auto named = [&key](const KeyBinding& each) {
             return base::equalsIgnoreCase(each.name, key.name);
         };

@@ -21,7 +21,7 @@ struct Class {
     const char* name;
     base::Span<const char* const> ancestors;
     base::Span<const Key> keys;  ///< in the schema's order
-    bool isOfProvider;           ///< the provider behind the facade serves its instances
+    bool servedByProvider;       ///< the provider behind the facade serves its instances
 
     /// Whether `other` is the class itself or one of its ancestors.
     bool isA(std::string_view other) const;
@@ -39,7 +39,7 @@ struct End {
 };
 
 struct Association {
-    const Class& itself;
+    const Class& associationClass;
     End ends[2];
 };
 
@@ -51,7 +51,7 @@ base::Span<const Association> associations();
 /// Why these keys of a path of that class can name no instance, as a sentence that names the key:
 /// one is missing, there twice, not of the class or of the wrong type; of references, the same for
 /// the paths they refer to. Empty when all is well.
-std::string keyProblem(const Class& itsClass, const std::vector<KeyBinding>& bindings);
+std::string keyProblem(const Class& cimClass, const std::vector<KeyBinding>& bindings);
 
 }  // namespace VA::OSStatusFacade
 

@@ -16,10 +16,10 @@ using Identities = std::vector<Identity>;
 // The path of a request for an instance as the provider is asked for it, from keys without a
 // problem: its text keys in their order, which has a meaning to the provider, and the references
 // left out, which keeps the provider from judging them. What comes back is compared anyway.
-CMPIObjectPath* pathToAskFor(const Request& request, const Class& itsClass,
+CMPIObjectPath* pathToAskFor(const Request& request, const Class& cimClass,
                              const std::vector<KeyBinding>& bindings) {
-    CMPIObjectPath* const path = request.newPath(itsClass.name);
-    for (const Key& key : itsClass.keys)
+    CMPIObjectPath* const path = request.newPath(cimClass.name);
+    for (const Key& key : cimClass.keys)
         for (const KeyBinding& binding : bindings) {
             if (key.isReference || !base::equalsIgnoreCase(binding.name, key.name)) continue;
             // Of characters, brokers take the pointer itself, not the address of one.
@@ -37,10 +37,10 @@ bool hasKey(const Identity& candidate, const std::pair<std::string, std::string>
 }
 
 // Names the keys that no instance has, or all of them when instances have each, but none has all.
-Refusal notFound(const Class& itsClass, const Identity& wanted, const Identities& candidates) {
+Refusal notFound(const Class& cimClass, const Identity& wanted, const Identities& candidates) {
     std::string all;
     std::string unknown;
-    for (const Key& key : itsClass.keys) {
+    for (const Key& key : cimClass.keys) {
         const std::string name = std::string(all.empty() ? "" : ", ") + key.name;
         all += name;
         const auto wantedKey = std::find_if(
@@ -52,7 +52,7 @@ Refusal notFound(const Class& itsClass, const Identity& wanted, const Identities
                          [&](const Identity& candidate) { return hasKey(candidate, *wantedKey); }))
             unknown += std::string(unknown.empty() ? "" : ", ") + key.name;
     }
-    return Refusal(CMPI_RC_ERR_NOT_FOUND, std::string("no instance of ") + itsClass.name +
+    return Refusal(CMPI_RC_ERR_NOT_FOUND, std::string("no instance of ") + cimClass.name +
                                               " has this " + (unknown.empty() ? all : unknown));
 }
 
@@ -72,7 +72,7 @@ void enumerateInstances(const Request& request, const char** properties) {
 
 void getInstance(const Request& request, const char** properties) {
     const Class* const known = request.knownClass();
-    if (known == nullptr || !known->isOfProvider)
+    if (known == nullptr || !known->servedByProvider)
         return requireServed(request.getInstance(request.path()), request.className());
     // An object manager may tell other keys the second time that it is asked: the provider gets
     // those that were checked.

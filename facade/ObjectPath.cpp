@@ -17,7 +17,7 @@ namespace VA::OSStatusFacade {
 
 namespace {
 
-void requireTold(const CMPIStatus& status, const char* what) {
+void requireOk(const CMPIStatus& status, const char* what) {
     if (status.rc != CMPI_RC_OK)
         throw Refusal(CMPI_RC_ERR_FAILED, std::string("the object manager does not tell ") + what);
 }
@@ -59,7 +59,7 @@ std::string hexadecimal(double value) {
 std::string textOf(const CMPIDateTime* dateTime) {
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     const CMPIString* const text = dateTime->ft->getStringFormat(dateTime, &status);
-    requireTold(status, "a date");
+    requireOk(status, "a date");
     return charactersOf(text);
 }
 
@@ -94,7 +94,7 @@ std::string charactersOf(const CMPIString* string) {
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     const char* const characters = string->ft->getCharPtr(string, &status);
     if (characters == nullptr) status.rc = CMPI_RC_ERR_FAILED;
-    requireTold(status, "a text");
+    requireOk(status, "a text");
     return characters;
 }
 
@@ -103,7 +103,7 @@ std::string classNameOf(const CMPIObjectPath* path) {
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     const CMPIString* const name = path->ft->getClassName(path, &status);
     if (name == nullptr) status.rc = CMPI_RC_ERR_FAILED;
-    requireTold(status, "a class");
+    requireOk(status, "a class");
     return charactersOf(name);
 }
 
@@ -111,7 +111,7 @@ std::string nameSpaceOf(const CMPIObjectPath* path) {
     if (path == nullptr) return {};
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     const CMPIString* const nameSpace = path->ft->getNameSpace(path, &status);
-    requireTold(status, "a namespace");
+    requireOk(status, "a namespace");
     return charactersOf(nameSpace);
 }
 
@@ -129,11 +129,11 @@ std::vector<KeyBinding> keysOf(const CMPIObjectPath* path) {
     std::vector<KeyBinding> keys;
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     const CMPICount count = path == nullptr ? 0 : path->ft->getKeyCount(path, &status);
-    requireTold(status, "how many keys there are");
+    requireOk(status, "how many keys there are");
     for (CMPICount index = 0; index < count; ++index) {
         CMPIString* name = nullptr;
         const CMPIData data = path->ft->getKeyAt(path, index, &name, &status);
-        requireTold(status, "a key");
+        requireOk(status, "a key");
         if (!isAbsent(data)) keys.push_back({charactersOf(name), data});
     }
     return keys;
@@ -151,7 +151,7 @@ const CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* role) 
     const CMPIData data = path->ft->getKey(path, role, &status);
     if (status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY || status.rc == CMPI_RC_ERR_NOT_FOUND)
         return nullptr;
-    requireTold(status, "a reference");
+    requireOk(status, "a reference");
     return data.type == CMPI_ref && !isAbsent(data) ? data.value.ref : nullptr;
 }
 

@@ -12,7 +12,9 @@
 #include "ClassIds.h"
 #include "base/Span.h"
 
-// How a request finds its adapter, and how an adapter is walked.
+// How a request finds its adapter, and how an adapter is walked. A request for instances names the
+// adapter by the class of its path, and gets the elements of that class. A request for associators
+// names it by the association class; the path is then one end, and it gets what is at the other.
 
 namespace VA::OSStatusProvider {
 
