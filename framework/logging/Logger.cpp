@@ -23,8 +23,8 @@ class ScopedErrnoAndCancelState {
         ::pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &cancelState_);
     }
     ~ScopedErrnoAndCancelState() {
-        int disabled = PTHREAD_CANCEL_DISABLE;
-        ::pthread_setcancelstate(cancelState_, &disabled);
+        int ignored = 0;
+        ::pthread_setcancelstate(cancelState_, &ignored);
         errno = error_;
     }
     ScopedErrnoAndCancelState(const ScopedErrnoAndCancelState&) = delete;

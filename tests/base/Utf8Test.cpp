@@ -100,6 +100,14 @@ TEST(Utf8, TakesNeitherOverlongFormsNorSurrogatesNorCutCharacters) {
     }
 }
 
+TEST(Utf8, LooksAtNoByteBehindTheText) {
+    for (const std::string_view character : {"\xC3\xA9", "\xE2\x82\xAC", "\xF0\x9F\x98\x80"}) {
+        for (std::size_t length = 1; length < character.size(); ++length) {
+            EXPECT_FALSE(decodeUtf8(character.substr(0, length)).valid);
+        }
+    }
+}
+
 TEST(Utf8, TakesOneCharacterOrOneBadByteAtATime) {
     std::string_view rest = "\xFF\xC3\xA9\xC3";
     EXPECT_EQ(takeUtf8(rest), (Utf8Char{1, replacementCharacter, false}));
