@@ -5,8 +5,8 @@
 
 namespace base {
 
-/// The elements of an array that lies elsewhere and lives longer; for constant tables whose length
-/// is nobody's business. As std::span of later standards, as far as it is needed.
+/// The elements of an array that lies elsewhere and lives longer: what constant tables need of
+/// std::span, which C++17 lacks.
 template <class Element>
 class Span {
   public:

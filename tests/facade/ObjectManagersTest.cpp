@@ -13,13 +13,6 @@ using testing::StartsWith;
 
 const CMPIBroker* linkBroker;
 
-// The other provider: TEST_Link ties TEST_Thing to the computer system. It looks at nothing but
-// association class and source class, as simple providers do.
-bool isTied(const char* associationClass) {
-    return associationClass == nullptr || equalNames(associationClass, "TEST_Link") ||
-           equalNames(associationClass, "CIM_Dependency");
-}
-
 CMPIObjectPath* linkPath(const char* className, const char* name) {
     CMPIObjectPath* const path =
         linkBroker->eft->newObjectPath(linkBroker, "root/cimv2", className, nullptr);
@@ -27,38 +20,43 @@ CMPIObjectPath* linkPath(const char* className, const char* name) {
     return path;
 }
 
-enum class Give { paths, instances };
+enum class What { farEnd, link };
+enum class Form { path, instance };
 
-CMPIStatus give(const CMPIResult* result, const CMPIObjectPath* path, Give what) {
-    if (path != nullptr && what == Give::paths) result->ft->returnObjectPath(result, path);
-    if (path != nullptr && what == Give::instances)
-        result->ft->returnInstance(result, linkBroker->eft->newInstance(linkBroker, path, nullptr));
+// The other provider: TEST_Link ties TEST_Thing to the computer system. It looks at nothing but
+// association class and source class, as simple providers do.
+template <What what, Form form, class... Filters>
+CMPIStatus answer(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
+                  const CMPIObjectPath* source, const char* associationClass, Filters...) {
+    const CMPIString* const sourceClass = source->ft->getClassName(source, nullptr);
+    const char* const name = sourceClass->ft->getCharPtr(sourceClass, nullptr);
+    const bool fromThing = equalNames(name, "TEST_Thing");
+    const bool isTied = associationClass == nullptr || equalNames(associationClass, "TEST_Link") ||
+                        equalNames(associationClass, "CIM_Dependency");
+    if (isTied && (fromThing || equalNames(name, "KORVA_ComputerSystem"))) {
+        const CMPIObjectPath* const path = what == What::link ? linkPath("TEST_Link", "link")
+                                           : fromThing ? linkPath("KORVA_ComputerSystem", "host1")
+                                                       : linkPath("TEST_Thing", "thing");
+        if (form == Form::path)
+            result->ft->returnObjectPath(result, path);
+        else
+            result->ft->returnInstance(result,
+                                       linkBroker->eft->newInstance(linkBroker, path, nullptr));
+    }
     result->ft->returnDone(result);
     return {CMPI_RC_OK, nullptr};
 }
 
-CMPIObjectPath* farEnd(const CMPIObjectPath* source, const char* associationClass) {
-    const CMPIString* const sourceClass = source->ft->getClassName(source, nullptr);
-    const char* const name = sourceClass->ft->getCharPtr(sourceClass, nullptr);
-    if (isTied(associationClass) && equalNames(name, "TEST_Thing"))
-        return linkPath("KORVA_ComputerSystem", "host1");
-    if (isTied(associationClass) && equalNames(name, "KORVA_ComputerSystem"))
-        return linkPath("TEST_Thing", "thing");
-    return nullptr;
-}
-
-template <Give what>
-CMPIStatus linkEnds(const CMPIResult* result, const CMPIObjectPath* source,
-                    const char* associationClass) {
-    return give(result, farEnd(source, associationClass), what);
-}
-
-template <Give what>
-CMPIStatus links(const CMPIResult* result, const CMPIObjectPath* source,
-                 const char* associationClass) {
-    const bool any = farEnd(source, associationClass) != nullptr;
-    return give(result, any ? linkPath("TEST_Link", "link") : nullptr, what);
-}
+constexpr CMPIAssociationMIFT linkTable = {
+    CMPIVersion200,
+    CMPIVersion200,
+    "associationTestLink",
+    nullptr,
+    answer<What::farEnd, Form::instance>,
+    answer<What::farEnd, Form::path>,
+    answer<What::link, Form::instance>,
+    answer<What::link, Form::path>,
+};
 
 class ObjectManagers : public FacadeFixture {
   protected:
@@ -118,25 +116,6 @@ class ObjectManagers : public FacadeFixture {
         return result;
     }
 
-    static constexpr CMPIAssociationMIFT linkTable = {
-        CMPIVersion200,
-        CMPIVersion200,
-        "associationTestLink",
-        nullptr,
-        [](CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
-           const CMPIObjectPath* source, const char* association, const char*, const char*,
-           const char*,
-           const char**) { return linkEnds<Give::instances>(result, source, association); },
-        [](CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
-           const CMPIObjectPath* source, const char* association, const char*, const char*,
-           const char*) { return linkEnds<Give::paths>(result, source, association); },
-        [](CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
-           const CMPIObjectPath* source, const char* association, const char*,
-           const char**) { return links<Give::instances>(result, source, association); },
-        [](CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
-           const CMPIObjectPath* source, const char* association,
-           const char*) { return links<Give::paths>(result, source, association); },
-    };
     CMPIAssociationMI link = {nullptr, const_cast<CMPIAssociationMIFT*>(&linkTable)};
     Broker plainBroker;  // knows no schema, so that there may be other classes
     ProviderLibrary bareProvider{providerFile, plainBroker};
