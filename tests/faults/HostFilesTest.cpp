@@ -39,18 +39,14 @@ std::vector<Source> sources(Fault fault) {
     // is none.
     const bool unreadable = fault == Fault::Denied || fault == Fault::Error;
     const char* const users = unreadable ? absent : "1";
+    std::vector<Property> memory;
+    for (const PublishedProperty& each : operatingSystemProperties)
+        if (each.source == std::string("proc/meminfo")) memory.push_back({each.name, absent});
     return {
         {"etc/os-release", {{"Name", kernel.sysname}, {"Version", kernel.release}}},
         // The kernel tells when it was booted as well: before the tree was made.
         {"proc/stat", {{"LastBootUpTime", another}, {"InstallDate", absent}}},
-        {"proc/meminfo",
-         {{"TotalVirtualMemorySize", absent},
-          {"FreeVirtualMemory", absent},
-          {"FreePhysicalMemory", absent},
-          {"TotalVisibleMemorySize", absent},
-          {"TotalSwapSpaceSize", absent},
-          {"SizeStoredInPagingFiles", absent},
-          {"FreeSpaceInPagingFiles", absent}}},
+        {"proc/meminfo", memory},
         {"proc/sys/kernel/pid_max", {{"MaxNumberOfProcesses", "127412"}}},
         {"proc/sys/kernel/threads-max", {}},
         {"proc", {{"NumberOfProcesses", absent}}},

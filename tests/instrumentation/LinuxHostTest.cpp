@@ -11,6 +11,7 @@
 #include <thread>
 #include <vector>
 
+#include "support/Properties.h"
 #include "support/TestHost.h"
 
 namespace {
@@ -22,33 +23,29 @@ using testing::Pair;
 
 using Paths = std::vector<std::string>;
 
-const Paths osRelease{"look at /etc/os-release", "etc/os-release"};
-const Paths meminfo{"proc/meminfo"};
-
-// Every property, and what it alone makes a walk look at and read.
-const std::map<unsigned int, Paths> sources{
-    {Name, osRelease},
-    {OSType, {}},
-    {Version, osRelease},
-    {InstallDate,
+// What a source makes a walk look at and read; one that is not here is read as it is.
+const std::map<std::string, Paths> readings{
+    {"", {}},
+    {"etc/os-release", {"look at /etc/os-release", "etc/os-release"}},
+    {"(dates)",
      {"look at /", "look at /etc/machine-id", "look at /var/log/installer", "proc/stat"}},
-    {Distributed, {}},
-    {LastBootUpTime, {"proc/stat"}},
-    {MaxNumberOfProcesses, {"proc/sys/kernel/pid_max", "proc/sys/kernel/threads-max"}},
-    {MaxProcessMemorySize, {}},
-    {NumberOfProcesses, {"proc"}},
-    {NumberOfUsers,
+    {"proc/sys/kernel", {"proc/sys/kernel/pid_max", "proc/sys/kernel/threads-max"}},
+    {"run/systemd/sessions",
      {"look at /run/systemd/sessions", "run/systemd/sessions", "look at /run/systemd/sessions/1",
       "run/systemd/sessions/1", "look at /run/systemd/sessions/c2", "run/systemd/sessions/c2"}},
-    {NumberOfLicensedUsers, {}},
-    {TotalVirtualMemorySize, meminfo},
-    {FreeVirtualMemory, meminfo},
-    {FreePhysicalMemory, meminfo},
-    {TotalVisibleMemorySize, meminfo},
-    {TotalSwapSpaceSize, meminfo},
-    {SizeStoredInPagingFiles, meminfo},
-    {FreeSpaceInPagingFiles, meminfo},
 };
+
+// Every property, and what it alone makes a walk look at and read.
+std::map<unsigned int, Paths> readingsOfProperties() {
+    std::map<unsigned int, Paths> result;
+    for (const PublishedProperty& each : operatingSystemProperties) {
+        const auto found = readings.find(each.source);
+        if (each.id != 0)
+            result[each.id] = found == readings.end() ? Paths{each.source} : found->second;
+    }
+    return result;
+}
+const std::map<unsigned int, Paths> sources = readingsOfProperties();
 
 std::map<std::string, int> onceEach(const Paths& paths) {
     std::map<std::string, int> counts;
@@ -112,7 +109,7 @@ TEST_F(SnapshotTest, WalkThatAsksForNamesReadsOsReleaseOnly) {
     EXPECT_EQ(text(Name), "Test Linux");
     bool readOnly = false;
     EXPECT_TRUE(cursor->readOnlyProperty(Name, readOnly));
-    EXPECT_EQ(host.files->counts(), onceEach(osRelease));
+    EXPECT_EQ(host.files->counts(), onceEach(readings.at("etc/os-release")));
     EXPECT_EQ(host.manager->calls, 0);
 }
 

@@ -8,8 +8,10 @@ struct PublishedProperty {
     const char* name;
     CMPIType type;
     const char* value;  ///< for the plausible node of a simulated host, as cmpihost::Value tells it
-    unsigned int id = 0;              ///< its number in VA::NodeLexicon; 0: the provider makes it
-    const char* hostValue = nullptr;  ///< what the host tells, where that is another text
+    unsigned int id = 0;      ///< its number in VA::NodeLexicon; 0: the provider makes it
+    const char* source = "";  ///< the file or directory of a Linux host that it comes from
+    const char* hostValue =
+        nullptr;  ///< what the host tells, where that is another text than `value`
 
     constexpr bool isText() const { return type == CMPI_string || type == CMPI_dateTime; }
     constexpr bool isFlag() const { return type == CMPI_boolean; }
@@ -23,27 +25,29 @@ inline constexpr PublishedProperty operatingSystemProperties[] = {
     {"CSCreationClassName", CMPI_string, "KORVA_ComputerSystem"},
     {"CSName", CMPI_string, "simulated.example"},
     {"CreationClassName", CMPI_string, "KORVA_OperatingSystem"},
-    {"Name", CMPI_string, "Simulated Linux", 108},
+    {"Name", CMPI_string, "Simulated Linux", 108, "etc/os-release"},
     {"Description", CMPI_string, ""},
-    {"InstallDate", CMPI_dateTime, "20230610090807.000000+000", 139, "2023-06-10-09:08:07"},
+    {"InstallDate", CMPI_dateTime, "20230610090807.000000+000", 139, "(dates)",
+     "2023-06-10-09:08:07"},
     {"OperationalStatus", CMPI_uint16A, "{2, 11}"},
     {"HealthState", CMPI_uint16, "5"},
     {"Status", CMPI_string, "OK"},
     {"EnabledState", CMPI_uint16, "2"},
-    {"OSType", CMPI_uint16, "36", 128, "35"},
-    {"Version", CMPI_string, "12.5", 134},
-    {"LastBootUpTime", CMPI_dateTime, "20240229235958.000000+000", 141, "2024-02-29-23:59:58"},
+    {"OSType", CMPI_uint16, "36", 128, "", "35"},
+    {"Version", CMPI_string, "12.5", 134, "etc/os-release"},
+    {"LastBootUpTime", CMPI_dateTime, "20240229235958.000000+000", 141, "proc/stat",
+     "2024-02-29-23:59:58"},
     {"NumberOfLicensedUsers", CMPI_uint32, "0", 146},
-    {"NumberOfUsers", CMPI_uint32, "3", 145},
-    {"NumberOfProcesses", CMPI_uint32, "211", 144},
-    {"MaxNumberOfProcesses", CMPI_uint32, "32768", 142},
-    {"TotalSwapSpaceSize", CMPI_uint64, "2097152", 151},
-    {"TotalVirtualMemorySize", CMPI_uint64, "18874368", 147},
-    {"FreeVirtualMemory", CMPI_uint64, "13631488", 148},
-    {"FreePhysicalMemory", CMPI_uint64, "12058624", 149},
-    {"TotalVisibleMemorySize", CMPI_uint64, "16777216", 150},
-    {"SizeStoredInPagingFiles", CMPI_uint64, "2097151", 152},
-    {"FreeSpaceInPagingFiles", CMPI_uint64, "1572864", 153},
+    {"NumberOfUsers", CMPI_uint32, "3", 145, "run/systemd/sessions"},
+    {"NumberOfProcesses", CMPI_uint32, "211", 144, "proc"},
+    {"MaxNumberOfProcesses", CMPI_uint32, "32768", 142, "proc/sys/kernel"},
+    {"TotalSwapSpaceSize", CMPI_uint64, "2097152", 151, "proc/meminfo"},
+    {"TotalVirtualMemorySize", CMPI_uint64, "18874368", 147, "proc/meminfo"},
+    {"FreeVirtualMemory", CMPI_uint64, "13631488", 148, "proc/meminfo"},
+    {"FreePhysicalMemory", CMPI_uint64, "12058624", 149, "proc/meminfo"},
+    {"TotalVisibleMemorySize", CMPI_uint64, "16777216", 150, "proc/meminfo"},
+    {"SizeStoredInPagingFiles", CMPI_uint64, "2097151", 152, "proc/meminfo"},
+    {"FreeSpaceInPagingFiles", CMPI_uint64, "1572864", 153, "proc/meminfo"},
     {"MaxProcessMemorySize", CMPI_uint64, "67108864", 143},
     {"Distributed", CMPI_boolean, "false", 140},
 };
