@@ -5,6 +5,7 @@
 
 #include <algorithm>
 #include <iterator>
+#include <map>
 #include <optional>
 #include <stdexcept>
 #include <thread>
@@ -67,23 +68,6 @@ TEST_F(SimulatedHostTest, EachPropertyCanBeAbsent) {
     }
 }
 
-TEST_F(SimulatedHostTest, ChangesWhileWalksBeginAndEndLeaveEachWalkItsOwnView) {
-    std::thread changing([this] {
-        for (int change = 0; change < 2000; ++change)
-            host->setComputerName("computer " + std::to_string(change));
-    });
-    for (int walk = 0; walk < 2000; ++walk) {
-        Instrumentation cursor;
-        cursor.selectNode(OperatingSystemNode);
-        std::string first;
-        std::string second;
-        cursor.getComputerName(first);
-        cursor.getComputerName(second);
-        EXPECT_EQ(first, second);
-    }
-    changing.join();
-}
-
 TEST_F(SimulatedHostTest, NodesComeInTheOrderTheyWereAddedEachWithItsOwnValues) {
     host->clearNodes();
     for (unsigned int i = 0; i < 3; ++i) {
@@ -109,34 +93,19 @@ TEST_F(SimulatedHostTest, NodesComeInTheOrderTheyWereAddedEachWithItsOwnValues) 
     EXPECT_FALSE(static_cast<bool>(cursor));
 }
 
-TEST_F(SimulatedHostTest, ComputerNameCanBeUnknown) {
-    host->setComputerName(std::nullopt);
-    Instrumentation cursor;
-    cursor.selectNode(OperatingSystemNode);
-    std::string name = "untouched";
-    EXPECT_FALSE(cursor.getComputerName(name));
-    EXPECT_EQ(name, "untouched");
-}
-
 TEST_F(SimulatedHostTest, WalkKeepsTheHostAsItStoodWhenItWasSelected) {
     Instrumentation cursor;
     cursor.selectNode(OperatingSystemNode);
     host->clearNodes();
-    host->setComputerName("renamed");
+    host->setComputerName(std::nullopt);
     EXPECT_TRUE(static_cast<bool>(cursor));
     std::string name;
     EXPECT_TRUE(cursor.getComputerName(name));
     EXPECT_EQ(name, "simulated.example");
     Instrumentation later;
     EXPECT_FALSE(later.selectNode(OperatingSystemNode));
-    EXPECT_TRUE(later.getComputerName(name));
-    EXPECT_EQ(name, "renamed");
-}
-
-TEST_F(SimulatedHostTest, NodesAreOfTheOperatingSystemTypeAlone) {
-    Instrumentation cursor;
-    EXPECT_FALSE(cursor.selectNode(NodeType(16)));
-    EXPECT_FALSE(static_cast<bool>(cursor));
+    EXPECT_FALSE(later.getComputerName(name));
+    EXPECT_EQ(name, "simulated.example");
 }
 
 // Calls every operation once, in the order of the enumeration.
@@ -161,17 +130,26 @@ const Operation everyOperation[] = {
     Operation::ReadText,   Operation::ReadNumber,  Operation::ReadFlag, Operation::ReadOnlyQuery,
     Operation::NodeStatus, Operation::ComputerName};
 
-TEST_F(SimulatedHostTest, EachCallIsCountedOnceByOperationAndByProperty) {
+TEST_F(SimulatedHostTest, HookSeesEachCallInOrderAsItIsCountedByOperationAndByProperty) {
+    std::vector<SimulatedHost::Call> seen;
+    host->setHook([&](const SimulatedHost::Call& call) { seen.push_back(call); });
     callEverything();
-    callEverything();
-    EXPECT_EQ(host->calls(), 20u);
-    for (const Operation operation : everyOperation) {
-        EXPECT_EQ(host->calls(operation), 2u) << static_cast<int>(operation);
+    const std::map<std::size_t, Properties> ids{
+        {4, Name}, {5, OSType}, {6, Distributed}, {7, Name}};
+    ASSERT_EQ(seen.size(), 10u);
+    for (std::size_t i = 0; i < seen.size(); ++i) {
+        EXPECT_EQ(seen[i].operation, everyOperation[i]);
+        EXPECT_EQ(seen[i].number, i + 1);
+        EXPECT_EQ(seen[i].numberOfOperation, 1u);
+        EXPECT_EQ(seen[i].id, ids.count(i) != 0 ? std::optional(ids.at(i)) : std::nullopt) << i;
     }
-    EXPECT_EQ(host->calls(Operation::ReadText, Name), 2u);
-    EXPECT_EQ(host->calls(Operation::ReadOnlyQuery, Name), 2u);
-    EXPECT_EQ(host->calls(Operation::ReadNumber, OSType), 2u);
-    EXPECT_EQ(host->calls(Operation::ReadFlag, Distributed), 2u);
+    host->setHook({});
+    callEverything();
+    EXPECT_EQ(seen.size(), 10u);
+    EXPECT_EQ(host->calls(), 20u);
+    for (const Operation operation : everyOperation)
+        EXPECT_EQ(host->calls(operation), 2u) << static_cast<int>(operation);
+    for (const auto& [i, id] : ids) EXPECT_EQ(host->calls(everyOperation[i], id), 2u) << i;
     EXPECT_EQ(host->calls(Operation::ReadText, Version), 0u);
     EXPECT_EQ(host->calls(Operation::ReadNumber, Name), 0u);
     host->resetCounts();
@@ -180,36 +158,17 @@ TEST_F(SimulatedHostTest, EachCallIsCountedOnceByOperationAndByProperty) {
     EXPECT_EQ(host->calls(Operation::ReadText, Name), 0u);
 }
 
-TEST_F(SimulatedHostTest, HookSeesEachCallInOrder) {
-    std::vector<SimulatedHost::Call> seen;
-    host->setHook([&](const SimulatedHost::Call& call) { seen.push_back(call); });
-    callEverything();
-    ASSERT_EQ(seen.size(), 10u);
-    for (std::size_t i = 0; i < seen.size(); ++i) {
-        EXPECT_EQ(seen[i].operation, everyOperation[i]);
-        EXPECT_EQ(seen[i].number, i + 1);
-        EXPECT_EQ(seen[i].numberOfOperation, 1u);
-        EXPECT_EQ(seen[i].id.has_value(), i >= 4 && i <= 7) << i;
-    }
-    EXPECT_EQ(seen[5].id, OSType);
-    host->setHook({});
-    callEverything();
-    EXPECT_EQ(seen.size(), 10u);
-}
-
-TEST_F(SimulatedHostTest, NthCallOfAllFailsWhateverItIs) {
-    for (std::uint64_t n = 1; n <= 10; ++n) {
+TEST_F(SimulatedHostTest, NthCallOfAllOrOfOneOperationAndEachLaterOneFails) {
+    for (std::uint64_t n = 1; n <= 11; ++n) {
         host->resetCounts();
         host->throwFromCall(n, std::runtime_error("fault"));
-        EXPECT_THROW(callEverything(), std::runtime_error) << n;
-        EXPECT_EQ(host->calls(), n);
+        if (n <= 10) {
+            EXPECT_THROW(callEverything(), std::runtime_error) << n;
+            EXPECT_EQ(host->calls(), n);
+        } else {
+            EXPECT_NO_THROW(callEverything());
+        }
     }
-    host->resetCounts();
-    host->throwFromCall(11, std::runtime_error("fault"));
-    EXPECT_NO_THROW(callEverything());
-}
-
-TEST_F(SimulatedHostTest, NthCallOfAnOperationAndEachLaterOneFails) {
     for (const Operation operation : everyOperation) {
         host->resetCounts();
         host->throwFromCall(operation, 2, std::runtime_error("fault"));
@@ -225,10 +184,8 @@ TEST_F(SimulatedHostTest, ExceptionsOfAnyTypeComeThrough) {
     EXPECT_THROW(callEverything(), Unrelated);
     host->throwFromCall(1, 42);
     EXPECT_THROW(callEverything(), int);
-    host->throwFromCall(1, "text");
+    host->throwFromCall(Operation::NodeStatus, 1, "text");
     EXPECT_THROW(callEverything(), const char*);
-    host->throwFromCall(Operation::NodeStatus, 1, std::bad_alloc());
-    EXPECT_THROW(callEverything(), std::bad_alloc);
 }
 
 TEST_F(SimulatedHostTest, HookMayUseTheHost) {
@@ -242,20 +199,28 @@ TEST_F(SimulatedHostTest, HookMayUseTheHost) {
     EXPECT_EQ(host->calls(), 3u);
 }
 
-TEST_F(SimulatedHostTest, CursorsOfManyThreadsAreCountedTogether) {
+TEST_F(SimulatedHostTest, CursorsOfManyThreadsAreCountedTogetherWhileTheHostChanges) {
     std::vector<std::thread> threads;
     for (int i = 0; i < 8; ++i) {
         threads.emplace_back([&] {
-            for (int round = 0; round < 100; ++round) callEverything();
+            for (int round = 0; round < 200; ++round) {
+                callEverything();
+                Instrumentation cursor;
+                cursor.selectNode(OperatingSystemNode);
+                std::string first, second;
+                cursor.getComputerName(first);
+                cursor.getComputerName(second);
+                EXPECT_EQ(first, second);
+            }
         });
     }
-    for (int i = 0; i < 100; ++i) {
+    for (int i = 0; i < 1000; ++i) {
         host->setComputerName("name " + std::to_string(i));
         host->setHook([](const SimulatedHost::Call&) {});
     }
     for (auto& thread : threads) thread.join();
-    EXPECT_EQ(host->calls(), 8000u);
-    EXPECT_EQ(host->calls(Operation::ReadText, Name), 800u);
+    EXPECT_EQ(host->calls(), 8u * 200 * 14);
+    EXPECT_EQ(host->calls(Operation::ReadText, Name), 8u * 200);
 }
 
 }  // namespace
