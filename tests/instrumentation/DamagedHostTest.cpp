@@ -158,10 +158,6 @@ struct Damage {
     std::function<void(const FixtureTree&, const std::string& path)> apply;
 };
 
-void PrintTo(const Damage& damage, std::ostream* out) {
-    *out << damage.description;
-}
-
 std::string allBytes() {
     std::string bytes;
     for (int i = 0; i < 4096; ++i) bytes += static_cast<char>(i * 31 + i / 256);
@@ -203,83 +199,72 @@ struct SilentHost : TestHost {
     }
 };
 
-class DamagedFiles : public testing::TestWithParam<Damage> {
-  protected:
-    static void damage(const SilentHost& host, const std::string& path) {
-        GetParam().apply(host.tree(), path);
-    }
-    static bool is(const std::string& description) { return GetParam().description == description; }
-};
-
-TEST_P(DamagedFiles, GiveNoValue) {
+TEST(DamagedFiles, GiveNoValue) {
     const std::pair<const char*, std::vector<Properties>> rows[] = {
         {"etc/os-release", {Name, Version}},
         {"proc/stat", {LastBootUpTime}},
         {"proc/meminfo", {std::begin(memory), std::end(memory)}},
         {"proc", {NumberOfProcesses, TotalVisibleMemorySize}},
     };
-    for (const auto& [path, properties] : rows) {
-        SilentHost host;
-        damage(host, path);
-        for (const Properties id : properties) {
-            EXPECT_EQ(host.text(id), std::nullopt) << path << id;
-            EXPECT_EQ(host.number(id), std::nullopt) << path << id;
+    for (const Damage& damage : damages) {
+        for (const auto& [path, properties] : rows) {
+            SilentHost host;
+            damage.apply(host.tree(), path);
+            for (const Properties id : properties) {
+                EXPECT_EQ(host.text(id), std::nullopt) << damage.description << path << id;
+                EXPECT_EQ(host.number(id), std::nullopt) << damage.description << path << id;
+            }
         }
     }
 }
 
-TEST_P(DamagedFiles, LeaveTheOtherLimitInForce) {
-    SilentHost host;
-    damage(host, "proc/sys/kernel/pid_max");
-    EXPECT_EQ(host.number(MaxNumberOfProcesses), 127412u);
-    damage(host, "proc/sys/kernel/threads-max");
-    EXPECT_EQ(host.number(MaxNumberOfProcesses), std::nullopt);
+TEST(DamagedFiles, LeaveTheOtherLimitInForce) {
+    for (const Damage& damage : damages) {
+        SilentHost host;
+        damage.apply(host.tree(), "proc/sys/kernel/pid_max");
+        EXPECT_EQ(host.number(MaxNumberOfProcesses), 127412u) << damage.description;
+        damage.apply(host.tree(), "proc/sys/kernel/threads-max");
+        EXPECT_EQ(host.number(MaxNumberOfProcesses), std::nullopt) << damage.description;
+    }
 }
 
-TEST_P(DamagedFiles, AreNoSessions) {
+TEST(DamagedFiles, AreNoSessions) {
     using Users = std::optional<unsigned int>;
-    SilentHost one;
-    damage(one, "run/systemd/sessions/1");
-    const bool unreadable = is("PastTheCap") || is("ReadError");
-    EXPECT_EQ(one.number(NumberOfUsers), unreadable ? std::nullopt : Users(1));
+    for (const Damage& damage : damages) {
+        const std::string damaged = damage.description;
+        SCOPED_TRACE(damaged);
+        SilentHost one;
+        damage.apply(one.tree(), "run/systemd/sessions/1");
+        const bool unreadable = damaged == "PastTheCap" || damaged == "ReadError";
+        EXPECT_EQ(one.number(NumberOfUsers), unreadable ? std::nullopt : Users(1));
 
-    SilentHost all;
-    damage(all, "run/systemd/sessions");
-    EXPECT_EQ(all.number(NumberOfUsers), is("Folder") ? Users(0) : std::nullopt);
+        SilentHost all;
+        damage.apply(all.tree(), "run/systemd/sessions");
+        EXPECT_EQ(all.number(NumberOfUsers), damaged == "Folder" ? Users(0) : std::nullopt);
 
-    SilentHost utmp;
-    utmp.tree().remove("run/systemd");
-    utmp.tree().write("run/utmp", "");
-    damage(utmp, "run/utmp");
-    // None of the damages is a record of a user; only an empty file is one of whole records.
-    EXPECT_EQ(utmp.number(NumberOfUsers), is("Empty") ? Users(0) : std::nullopt);
+        SilentHost utmp;
+        utmp.tree().remove("run/systemd");
+        utmp.tree().write("run/utmp", "");
+        damage.apply(utmp.tree(), "run/utmp");
+        // None of the damages is a record of a user; only an empty file is one of whole records.
+        EXPECT_EQ(utmp.number(NumberOfUsers), damaged == "Empty" ? Users(0) : std::nullopt);
+    }
 }
-
-std::string nameOfDamage(const testing::TestParamInfo<Damage>& info) {
-    return info.param.description;
-}
-
-INSTANTIATE_TEST_SUITE_P(Of, DamagedFiles, testing::ValuesIn(damages), nameOfDamage);
 
 // A host whose files were cut at any byte tells what was there before or nothing.
 TEST(FilesCutShort, NoPrefixOfAFileGivesAValueThatTheWholeDoesNot) {
-    struct File {
-        const char* path;
-        Properties id;
-        std::optional<unsigned int> whole;
-    };
     TestHost host;
     host.tree().writeCompleteHost();
-    const File files[] = {{"proc/meminfo", TotalVisibleMemorySize, 16777216u},
-                          {"proc/meminfo", FreePhysicalMemory, 8388608u},
-                          {"proc/meminfo", FreeSpaceInPagingFiles, 1048576u}};
+    const std::pair<Properties, unsigned int> whole[] = {{TotalVisibleMemorySize, 16777216},
+                                                         {FreePhysicalMemory, 8388608},
+                                                         {FreeSpaceInPagingFiles, 1048576}};
     const std::string meminfo = host.files->text("proc/meminfo").value();
     for (std::size_t length = 0; length < meminfo.size(); ++length) {
         host.tree().write("proc/meminfo", meminfo.substr(0, length));
-        for (const File& file : files) {
-            const auto value = host.number(file.id);
-            const bool noSwapYet = file.id == FreeSpaceInPagingFiles && value == 0u;
-            EXPECT_TRUE(!value || value == file.whole || noSwapYet) << length << ' ' << *value;
+        for (const auto& [id, expected] : whole) {
+            const auto value = host.number(id);
+            const bool noSwapYet = id == FreeSpaceInPagingFiles && value == 0u;
+            EXPECT_TRUE(!value || value == expected || noSwapYet) << length << ' ' << *value;
         }
     }
 }

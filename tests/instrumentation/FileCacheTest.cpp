@@ -23,41 +23,41 @@ using Counts = std::map<std::string, int>;
 const std::string sessions = "run/systemd/sessions";
 
 /// A host whose files were all changed long ago, by its clock.
-class FileCacheTest : public testing::Test {
-  protected:
-    FileCacheTest() {
-        host.tree().writeCompleteHost();
-        host.kernel->fixedNow = std::time(nullptr) + 1000;
+struct OldHost : TestHost {
+    OldHost() {
+        tree().writeCompleteHost();
+        kernel->fixedNow = std::time(nullptr) + 1000;
     }
-
-    const FixtureTree& tree() { return host.tree(); }
 
     // What a new request for one property looks at and reads.
     template <class T>
     Counts countsOf(Properties id) {
-        host.files->resetCounts();
-        host.read<T>(id);
-        return host.files->counts();
+        files->resetCounts();
+        read<T>(id);
+        return files->counts();
+    }
+};
+
+struct FileCacheTest : testing::Test {
+    const FixtureTree& tree() { return host.tree(); }
+
+    template <class T>
+    Counts countsOf(Properties id) {
+        return host.countsOf<T>(id);
     }
 
-    // Past the grain of the file system's clock.
-    static void wait() { std::this_thread::sleep_for(20ms); }
-
-    TestHost host;
+    OldHost host;
 };
+
+// Past the grain of the file system's clock.
+void wait() {
+    std::this_thread::sleep_for(20ms);
+}
 
 struct Change {
     const char* description;
     std::function<void(const FixtureTree&)> apply;
 };
-
-void PrintTo(const Change& change, std::ostream* out) {
-    *out << change.description;
-}
-
-std::string nameOf(const testing::TestParamInfo<Change>& info) {
-    return info.param.description;
-}
 
 void renameOver(const FixtureTree& tree, const std::string& path, const std::string& content) {
     tree.write(path + ".new", content);
@@ -73,25 +73,6 @@ void putLink(const FixtureTree& tree, const std::string& path, const std::string
 
 constexpr const char* first = "NAME=First\n";
 constexpr const char* other = "NAME=Other\n";  // of the same size
-
-class OsReleaseChanges : public FileCacheTest, public testing::WithParamInterface<Change> {
-  protected:
-    OsReleaseChanges() {
-        tree().remove("etc/os-release");
-        tree().write("data/first", first);
-        tree().write("data/other", other);
-        tree().write("etc/os-release", first);
-    }
-};
-
-TEST_P(OsReleaseChanges, AreSeenByTheNextRequest) {
-    EXPECT_EQ(host.text(Name), "First");
-    EXPECT_EQ(countsOf<std::string>(Name), (Counts{{"look at /etc/os-release", 1}}));
-    wait();
-    GetParam().apply(tree());
-    EXPECT_EQ(host.text(Name), "Other");
-    EXPECT_EQ(host.text(Name), "Other");
-}
 
 const Change osReleaseChanges[] = {
     {"Replaced", [](auto& tree) { renameOver(tree, "etc/os-release", other); }},
@@ -113,7 +94,20 @@ const Change osReleaseChanges[] = {
      }},
 };
 
-INSTANTIATE_TEST_SUITE_P(Of, OsReleaseChanges, testing::ValuesIn(osReleaseChanges), nameOf);
+TEST(FileCache, ChangeOfOsReleaseIsSeenByTheNextRequest) {
+    for (const Change& change : osReleaseChanges) {
+        SCOPED_TRACE(change.description);
+        OldHost host;
+        host.tree().write("data/other", other);
+        host.tree().write("etc/os-release", first);
+        EXPECT_EQ(host.text(Name), "First");
+        EXPECT_EQ(host.countsOf<std::string>(Name), (Counts{{"look at /etc/os-release", 1}}));
+        wait();
+        change.apply(host.tree());
+        EXPECT_EQ(host.text(Name), "Other");
+        EXPECT_EQ(host.text(Name), "Other");
+    }
+}
 
 TEST_F(FileCacheTest, OsReleaseLinkThatIsPointedElsewhereIsFollowedThere) {
     tree().write("data/first", first);
@@ -203,22 +197,6 @@ TEST_F(FileCacheTest, NothingIsMixedUpBetweenTwoRoots) {
 
 // Sessions
 
-class SessionChanges : public FileCacheTest, public testing::WithParamInterface<Change> {};
-
-TEST_P(SessionChanges, AreSeenByTheNextRequest) {
-    tree().write(sessions + "/3", "CLASS=user\nSTATE=closing\n");
-    EXPECT_EQ(host.number(NumberOfUsers), 2u);
-    EXPECT_EQ(countsOf<unsigned int>(NumberOfUsers),
-              (Counts{{"look at /run/systemd/sessions", 1},
-                      {"look at /run/systemd/sessions/1", 1},
-                      {"look at /run/systemd/sessions/3", 1},
-                      {"look at /run/systemd/sessions/c2", 1}}));
-    wait();
-    GetParam().apply(tree());
-    EXPECT_EQ(host.number(NumberOfUsers), 3u);
-    EXPECT_EQ(host.number(NumberOfUsers), 3u);
-}
-
 const Change sessionChanges[] = {
     {"NewSession", [](auto& tree) { tree.write(sessions + "/4", "CLASS=user\n"); }},
     {"RewrittenInPlace",
@@ -232,7 +210,23 @@ const Change sessionChanges[] = {
      }},
 };
 
-INSTANTIATE_TEST_SUITE_P(Of, SessionChanges, testing::ValuesIn(sessionChanges), nameOf);
+TEST(FileCache, ChangeOfSessionsIsSeenByTheNextRequest) {
+    for (const Change& change : sessionChanges) {
+        SCOPED_TRACE(change.description);
+        OldHost host;
+        host.tree().write(sessions + "/3", "CLASS=user\nSTATE=closing\n");
+        EXPECT_EQ(host.number(NumberOfUsers), 2u);
+        EXPECT_EQ(host.countsOf<unsigned int>(NumberOfUsers),
+                  (Counts{{"look at /run/systemd/sessions", 1},
+                          {"look at /run/systemd/sessions/1", 1},
+                          {"look at /run/systemd/sessions/3", 1},
+                          {"look at /run/systemd/sessions/c2", 1}}));
+        wait();
+        change.apply(host.tree());
+        EXPECT_EQ(host.number(NumberOfUsers), 3u);
+        EXPECT_EQ(host.number(NumberOfUsers), 3u);
+    }
+}
 
 TEST_F(FileCacheTest, SessionThatEndsIsGone) {
     EXPECT_EQ(host.number(NumberOfUsers), 2u);

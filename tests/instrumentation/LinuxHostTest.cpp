@@ -76,12 +76,6 @@ struct SnapshotTest : testing::Test {
     std::unique_ptr<VA::NodeCursor> cursor;
 };
 
-TEST_F(SnapshotTest, SelectingReadsNothing) {
-    EXPECT_THAT(host.files->counts(), IsEmpty());
-    EXPECT_EQ(host.kernel->namesCalls, 0);
-    EXPECT_EQ(host.manager->calls, 0);
-}
-
 TEST_F(SnapshotTest, EachSourceIsReadAtMostOnce) {
     for (int i = 0; i < 3; ++i) readEverything(*cursor);
     Paths all{"look at /run/systemd/system"};  // for the status
@@ -103,7 +97,9 @@ TEST_F(SnapshotTest, SourceThatIsMissingIsLookedForOnce) {
     EXPECT_EQ(host.manager->calls, 1);
 }
 
-TEST_F(SnapshotTest, WalkThatAsksForNamesReadsOsReleaseOnly) {
+TEST_F(SnapshotTest, SelectingReadsNothingAndAskingForNamesOsReleaseOnly) {
+    EXPECT_THAT(host.files->counts(), IsEmpty());
+    EXPECT_EQ(host.kernel->namesCalls, 0);
     std::string name;
     EXPECT_TRUE(cursor->readComputerName(name));
     EXPECT_EQ(text(Name), "Test Linux");
@@ -167,7 +163,7 @@ TEST_F(SnapshotTest, NothingIsReadOnceTheWalkIsOver) {
     EXPECT_FALSE(cursor->valid());
 }
 
-TEST_F(SnapshotTest, PropertyHasOneTypeOnly) {
+TEST_F(SnapshotTest, PropertyHasOneTypeOnlyAndOnlyTheNameIsKnownToBeReadOnly) {
     for (unsigned int id = 0; id < 300; ++id) {
         std::string asText;
         unsigned int asNumber = 0;
@@ -177,26 +173,21 @@ TEST_F(SnapshotTest, PropertyHasOneTypeOnly) {
                           cursor->readProperty(Properties(id), asFlag);
         // No file of the fixture dates an installation.
         EXPECT_EQ(types, sources.count(id) != 0 && id != InstallDate ? 1 : 0) << id;
-    }
-}
-
-TEST_F(SnapshotTest, OnlyTheNameIsKnownToBeReadOnly) {
-    for (unsigned int id = 0; id < 300; ++id) {
         bool readOnly = false;
         EXPECT_EQ(cursor->readOnlyProperty(Properties(id), readOnly), id == 108) << id;
         EXPECT_EQ(readOnly, id == 108) << id;
     }
 }
 
-TEST(LinuxNodes, AreOfTheOperatingSystemTypeAlone) {
-    TestHost host;
+TEST_F(SnapshotTest, NodesAreOfTheOperatingSystemTypeAlone) {
     const auto linuxHost = VA::makeLinuxHost(host.tree().root());
     for (unsigned int type = 0; type < 40; ++type) {
-        auto cursor = linuxHost->openCursor();
+        cursor = linuxHost->openCursor();
         EXPECT_FALSE(cursor->valid());
         EXPECT_EQ(cursor->select(NodeType(type)), type == 17) << type;
         EXPECT_EQ(cursor->valid(), type == 17) << type;
     }
+    cursor.reset();  // not to outlive its source
 }
 
 // Threads, processes, resources
