@@ -115,7 +115,7 @@ std::string keyProblem(const Class& cimClass, const std::vector<KeyBinding>& bin
         if (found == bindings.end()) return std::string("key ") + key.name + of + " is missing";
         if (std::count_if(bindings.begin(), bindings.end(), named) > 1)
             return std::string("key ") + key.name + of + " is there twice";
-        const std::string problem = valueProblem(key, *found);
+        std::string problem = valueProblem(key, *found);
         if (!problem.empty()) return problem;
     }
     return {};

@@ -28,8 +28,8 @@ struct Class {
 
     bool isAssociation() const { return keys.begin()->isReference; }
 
-    /// The key of that name, null if there is none.
-    const Key* key(std::string_view name) const;
+    /// The key of the wanted name, null if there is none.
+    const Key* key(std::string_view wanted) const;
 };
 
 /// An end of an association: the reference that points to it, and the class of its elements.

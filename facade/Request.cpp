@@ -112,6 +112,7 @@ const CMPIInstance* withProperties(const CMPIBroker* broker, const CMPIInstance*
 
     const std::vector<KeyBinding> keys = keysOf(path);
     std::vector<const char*> keyNames;
+    keyNames.reserve(keys.size() + 1);
     for (const KeyBinding& key : keys) keyNames.push_back(key.name.c_str());
     std::vector<const char*> names = keyNames;
     for (const char** property = properties; *property != nullptr; ++property)

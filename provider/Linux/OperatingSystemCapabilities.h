@@ -34,7 +34,7 @@ class OperatingSystemCapabilities {
     OperatingSystemCapabilities& operator++();
 
     /// Accepts any filter and applies none: every request sees every element.
-    void setFilter(FilterType, std::string) {}
+    void setFilter(FilterType, const std::string&) {}
 
     bool getInstanceID(std::string& value);
     /// The identifier itself.
