@@ -32,7 +32,7 @@ bool admits(const char* filter, const char* role) {
 }
 
 // The ways that a source of that class has. None from a path that can name no instance.
-std::vector<Traversal> traversalsFrom(const Request& request, const Filter& filter) {
+std::vector<Traversal> traversalsFrom(const ClientRequest& request, const Filter& filter) {
     std::vector<Traversal> traversals;
     const Class* const source = request.knownClass();
     if (source == nullptr || !keyProblem(*source, keysOf(request.path())).empty())
@@ -61,7 +61,7 @@ struct Pair {
 
 // Adds the pair that a path names, if the source is at its near end. One without a far end, or
 // whose far end has no keys, ties the source to nothing.
-void addPair(std::vector<Pair>& pairs, const Request& request, const Traversal& traversal,
+void addPair(std::vector<Pair>& pairs, const ClientRequest& request, const Traversal& traversal,
              const Identity& source, const CMPIObjectPath* path, const CMPIInstance* instance) {
     const CMPIObjectPath* const near = referenceOf(path, traversal.near.role);
     const CMPIObjectPath* const far = referenceOf(path, traversal.far.role);
@@ -72,7 +72,7 @@ void addPair(std::vector<Pair>& pairs, const Request& request, const Traversal& 
 
 enum class Ask { names, instances };
 
-std::vector<Pair> pairsOf(const Request& request, const Filter& filter, Ask ask) {
+std::vector<Pair> pairsOf(const ClientRequest& request, const Filter& filter, Ask ask) {
     std::vector<Pair> pairs;
     const std::vector<Traversal> traversals = traversalsFrom(request, filter);
     if (traversals.empty()) return pairs;
@@ -97,7 +97,7 @@ using Paths = std::vector<const CMPIObjectPath*>;
 using Instances = std::vector<const CMPIInstance*>;
 
 // The computer systems, which another provider of the object manager serves.
-Instances computerSystems(const Request& request, const Class& cimClass) {
+Instances computerSystems(const ClientRequest& request, const Class& cimClass) {
     const Refusal failure(CMPI_RC_ERR_FAILED,
                           std::string("the object manager does not enumerate ") + cimClass.name);
     CMPIStatus status = {CMPI_RC_OK, nullptr};
@@ -114,7 +114,7 @@ Instances computerSystems(const Request& request, const Class& cimClass) {
     return instances;
 }
 
-Instances instancesOf(const Request& request, const Class& cimClass) {
+Instances instancesOf(const ClientRequest& request, const Class& cimClass) {
     if (!cimClass.servedByProvider) return computerSystems(request, cimClass);
     const Answer answer = request.enumerateInstances(request.newPath(cimClass.name));
     requireWhole(answer, cimClass.name);
@@ -124,7 +124,7 @@ Instances instancesOf(const Request& request, const Class& cimClass) {
 /// Instances by what they stand for, fetched class by class when one is first looked for.
 class InstanceIndex {
   public:
-    explicit InstanceIndex(const Request& request) : request_(request) {}
+    explicit InstanceIndex(const ClientRequest& request) : request_(request) {}
 
     /// Null when there is no such instance any more.
     const CMPIInstance* find(const Identity& identity, const Class& cimClass) {
@@ -136,13 +136,13 @@ class InstanceIndex {
     }
 
   private:
-    const Request& request_;
+    const ClientRequest& request_;
     std::set<const Class*> fetched_;
     std::map<Identity, const CMPIInstance*> instances_;
 };
 
 // Returns one path of each pair, but each once.
-void returnPathOfEach(const Request& request, const Filter& filter,
+void returnPathOfEach(const ClientRequest& request, const Filter& filter,
                       const CMPIObjectPath* Pair::*path) {
     Paths paths;
     Seen seen;
@@ -153,11 +153,11 @@ void returnPathOfEach(const Request& request, const Filter& filter,
 
 }  // namespace
 
-void associatorNames(const Request& request, const Filter& filter) {
+void associatorNames(const ClientRequest& request, const Filter& filter) {
     returnPathOfEach(request, filter, &Pair::far);
 }
 
-void associators(const Request& request, const Filter& filter, const char** properties) {
+void associators(const ClientRequest& request, const Filter& filter, const char** properties) {
     Instances instances;
     InstanceIndex index(request);
     Seen seen;
@@ -170,11 +170,11 @@ void associators(const Request& request, const Filter& filter, const char** prop
     request.returnInstances(instances, properties);
 }
 
-void referenceNames(const Request& request, const Filter& filter) {
+void referenceNames(const ClientRequest& request, const Filter& filter) {
     returnPathOfEach(request, filter, &Pair::path);
 }
 
-void references(const Request& request, const Filter& filter, const char** properties) {
+void references(const ClientRequest& request, const Filter& filter, const char** properties) {
     Instances instances;
     Seen seen;
     for (const Pair& pair : pairsOf(request, filter, Ask::instances))

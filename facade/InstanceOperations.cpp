@@ -16,7 +16,7 @@ using Identities = std::vector<Identity>;
 // The path of a request for an instance as the provider is asked for it, from keys without a
 // problem: its text keys in their order, which has a meaning to the provider, and the references
 // left out, which keeps the provider from judging them. What comes back is compared anyway.
-CMPIObjectPath* pathToAskFor(const Request& request, const Class& cimClass,
+CMPIObjectPath* pathToAskFor(const ClientRequest& request, const Class& cimClass,
                              const std::vector<KeyBinding>& bindings) {
     CMPIObjectPath* const path = request.newPath(cimClass.name);
     for (const Key& key : cimClass.keys)
@@ -58,19 +58,19 @@ Refusal notFound(const Class& cimClass, const Identity& wanted, const Identities
 
 }  // namespace
 
-void enumerateInstanceNames(const Request& request) {
+void enumerateInstanceNames(const ClientRequest& request) {
     const Answer answer = request.enumerateInstanceNames(request.path());
     requireWhole(answer, request.className());
     request.returnPaths(answer.paths());
 }
 
-void enumerateInstances(const Request& request, const char** properties) {
+void enumerateInstances(const ClientRequest& request, const char** properties) {
     const Answer answer = request.enumerateInstances(request.path());
     requireWhole(answer, request.className());
     request.returnInstances(answer.instances(), properties);
 }
 
-void getInstance(const Request& request, const char** properties) {
+void getInstance(const ClientRequest& request, const char** properties) {
     const Class* const known = request.knownClass();
     if (known == nullptr || !known->servedByProvider)
         return requireServed(request.getInstance(request.path()), request.className());

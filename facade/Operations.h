@@ -1,17 +1,17 @@
 #ifndef FACADE_OPERATIONS_H
 #define FACADE_OPERATIONS_H
 
-#include "Request.h"
+#include "ClientRequest.h"
 
 // What a client may ask. Each operation answers one request, or throws Refusal.
 
 namespace VA::OSStatusFacade {
 
-void enumerateInstanceNames(const Request& request);
-void enumerateInstances(const Request& request, const char** properties);
+void enumerateInstanceNames(const ClientRequest& request);
+void enumerateInstances(const ClientRequest& request, const char** properties);
 
 /// The one instance that all keys name.
-void getInstance(const Request& request, const char** properties);
+void getInstance(const ClientRequest& request, const char** properties);
 
 /// What a client wants of the associations of a source; null filters nothing.
 struct Filter {
@@ -30,10 +30,10 @@ struct Filter {
 // lead to computer systems cost one more, for the instances. Names of them, and all other
 // instances, need none.
 
-void associatorNames(const Request& request, const Filter& filter);
-void associators(const Request& request, const Filter& filter, const char** properties);
-void referenceNames(const Request& request, const Filter& filter);
-void references(const Request& request, const Filter& filter, const char** properties);
+void associatorNames(const ClientRequest& request, const Filter& filter);
+void associators(const ClientRequest& request, const Filter& filter, const char** properties);
+void referenceNames(const ClientRequest& request, const Filter& filter);
+void references(const ClientRequest& request, const Filter& filter, const char** properties);
 
 }  // namespace VA::OSStatusFacade
 

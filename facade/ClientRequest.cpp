@@ -1,7 +1,7 @@
 // The facade asks the provider as an object manager would, and gathers what comes back before it
 // hands anything over: an answer that broke off must not look like a whole one.
 
-#include "Request.h"
+#include "ClientRequest.h"
 
 #include <algorithm>
 #include <new>
@@ -128,8 +128,8 @@ const CMPIInstance* withProperties(const CMPIBroker* broker, const CMPIInstance*
 
 }  // namespace
 
-Request::Request(const Provider& provider, const CMPIContext* context, const CMPIResult* result,
-                 const CMPIObjectPath* path)
+ClientRequest::ClientRequest(const Provider& provider, const CMPIContext* context,
+                             const CMPIResult* result, const CMPIObjectPath* path)
     : provider_(provider),
       context_(context),
       result_(result),
@@ -138,45 +138,45 @@ Request::Request(const Provider& provider, const CMPIContext* context, const CMP
       class_(findClass(className_)),
       nameSpace_(nameSpaceOf(path)) {}
 
-Identity Request::identityOf(const CMPIObjectPath* path) const {
+Identity ClientRequest::identityOf(const CMPIObjectPath* path) const {
     return OSStatusFacade::identityOf(path, nameSpace_);
 }
 
-CMPIObjectPath* Request::newPath(const char* className) const {
+CMPIObjectPath* ClientRequest::newPath(const char* className) const {
     CMPIObjectPath* const path =
         broker()->eft->newObjectPath(broker(), nameSpace_.c_str(), className, nullptr);
     if (path == nullptr) throw Refusal(CMPI_RC_ERR_FAILED, "the object manager makes no path");
     return path;
 }
 
-Answer Request::enumerateInstanceNames(const CMPIObjectPath* path) const {
+Answer ClientRequest::enumerateInstanceNames(const CMPIObjectPath* path) const {
     CMPIInstanceMI* const mi = provider_.instances;
     return Answer([&](const CMPIResult* result) {
         return mi->ft->enumerateInstanceNames(mi, context_, result, path);
     });
 }
 
-Answer Request::enumerateInstances(const CMPIObjectPath* path) const {
+Answer ClientRequest::enumerateInstances(const CMPIObjectPath* path) const {
     CMPIInstanceMI* const mi = provider_.instances;
     return Answer([&](const CMPIResult* result) {
         return mi->ft->enumerateInstances(mi, context_, result, path, nullptr);
     });
 }
 
-Answer Request::getInstance(const CMPIObjectPath* path) const {
+Answer ClientRequest::getInstance(const CMPIObjectPath* path) const {
     CMPIInstanceMI* const mi = provider_.instances;
     return Answer([&](const CMPIResult* result) {
         return mi->ft->getInstance(mi, context_, result, path, nullptr);
     });
 }
 
-void Request::returnPaths(const std::vector<const CMPIObjectPath*>& paths) const {
+void ClientRequest::returnPaths(const std::vector<const CMPIObjectPath*>& paths) const {
     for (const CMPIObjectPath* path : paths) result_->ft->returnObjectPath(result_, path);
     result_->ft->returnDone(result_);
 }
 
-void Request::returnInstances(const std::vector<const CMPIInstance*>& instances,
-                              const char** properties) const {
+void ClientRequest::returnInstances(const std::vector<const CMPIInstance*>& instances,
+                                    const char** properties) const {
     std::vector<const CMPIInstance*> answer = instances;
     for (const CMPIInstance*& instance : answer)
         instance = withProperties(broker(), instance, properties);

@@ -1,5 +1,5 @@
-#ifndef FACADE_REQUEST_H
-#define FACADE_REQUEST_H
+#ifndef FACADE_CLIENT_REQUEST_H
+#define FACADE_CLIENT_REQUEST_H
 
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
@@ -62,11 +62,11 @@ class Answer {
 
 /// One request of a client, and what it may ask the provider. What the client's result says to
 /// what it is given is ignored.
-class Request {
+class ClientRequest {
   public:
     /// The arguments outlive the request.
-    Request(const Provider& provider, const CMPIContext* context, const CMPIResult* result,
-            const CMPIObjectPath* path);
+    ClientRequest(const Provider& provider, const CMPIContext* context, const CMPIResult* result,
+                  const CMPIObjectPath* path);
 
     const CMPIBroker* broker() const { return provider_.broker; }
     const CMPIContext* context() const { return context_; }
