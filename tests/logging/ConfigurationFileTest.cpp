@@ -13,8 +13,8 @@
 
 namespace {
 
-using ZBLog::Channel;
-using ZBLog::ConfigurationFile;
+using namespace ZBLog;
+using namespace logging_test;
 
 /// What reading brings: the log's level, and the errors.
 std::string readingOf(ConfigurationFile& file) {
@@ -31,12 +31,12 @@ class ConfigurationFileTest : public testing::Test {
   protected:
     /// Writes the file as if that had been long ago.
     void writeLongAgo(const std::string& content) {
-        logging_test::writeFile(path_, content);
+        writeFile(path_, content);
         environment_.setAhead(60);
     }
 
-    logging_test::TemporaryFolder folder_;
-    logging_test::FakeEnvironment environment_;
+    TemporaryFolder folder_;
+    FakeEnvironment environment_;
     const std::string path_ = folder_ / "zblog.conf";
     ConfigurationFile file_{{path_, true}, environment_};
 };
@@ -77,7 +77,7 @@ TEST_F(ConfigurationFileTest, IsReadOnceAndAgainWhenItsContentChanges) {
     writeLongAgo("log.level = 1\n");
     EXPECT_EQ(readingOf(file_), "1");
     EXPECT_EQ(readingOf(file_), "unchanged");
-    logging_test::writeFile(path_, "log.level = 22\n");
+    writeFile(path_, "log.level = 22\n");
     EXPECT_EQ(readingOf(file_), "22");
     EXPECT_EQ(readingOf(file_), "unchanged");
 }
@@ -87,7 +87,7 @@ TEST_F(ConfigurationFileTest, IsUnchangedWhenItWasOnlyTouchedOrReplacedByTheSame
     EXPECT_EQ(readingOf(file_), "3000 [1: log.level must be a number from 0 to 999999, not \"x\"]");
     std::filesystem::last_write_time(path_, std::filesystem::file_time_type::clock::now());
     EXPECT_EQ(readingOf(file_), "unchanged");
-    logging_test::writeFile(path_ + ".new", "log.level = x\n");
+    writeFile(path_ + ".new", "log.level = x\n");
     std::filesystem::rename(path_ + ".new", path_);
     EXPECT_EQ(readingOf(file_), "unchanged");
 }
@@ -95,7 +95,7 @@ TEST_F(ConfigurationFileTest, IsUnchangedWhenItWasOnlyTouchedOrReplacedByTheSame
 TEST_F(ConfigurationFileTest, IsReadWhenAnotherFileTakesItsPlace) {
     writeLongAgo("log.level = 1\n");
     EXPECT_EQ(readingOf(file_), "1");
-    logging_test::writeFile(path_ + ".new", "log.level = 2\n");
+    writeFile(path_ + ".new", "log.level = 2\n");
     std::filesystem::rename(path_ + ".new", path_);
     EXPECT_EQ(readingOf(file_), "2");
 }
@@ -105,7 +105,7 @@ TEST_F(ConfigurationFileTest, SeesAChangeThatKeepsItsSizeAndItsTimeOfModificatio
     EXPECT_EQ(readingOf(file_), "1");
     const auto modified = std::filesystem::last_write_time(path_);
     std::this_thread::sleep_for(std::chrono::milliseconds(20));  // file times advance in steps
-    logging_test::writeFile(path_, "log.level = 2\n");
+    writeFile(path_, "log.level = 2\n");
     std::filesystem::last_write_time(path_, modified);
     EXPECT_EQ(readingOf(file_), "2");
 }
@@ -140,7 +140,7 @@ TEST_F(ConfigurationFileTest, TellsOnceWhyThereIsNothingToRead) {
                       fifo = folder_ / "fifo", tooLong = folder_ / "long";
     std::filesystem::create_symlink(link, link);
     ASSERT_EQ(::mkfifo(fifo.c_str(), 0600), 0);
-    logging_test::writeFile(tooLong, std::string(100000, '\n'));
+    writeFile(tooLong, std::string(100000, '\n'));
     environment_.setAhead(60);
     const struct {
         std::string path;

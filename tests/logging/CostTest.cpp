@@ -23,6 +23,9 @@
 
 namespace {
 
+using namespace ZBLog;
+using namespace logging_test;
+
 std::atomic<long> allocations{0};
 std::atomic<long> bytesInUse{0};
 
@@ -54,14 +57,6 @@ void operator delete(void* memory, std::size_t) noexcept {
 
 namespace {
 
-using logging_test::everythingTo;
-using logging_test::record;
-using ZBLog::Channel;
-using ZBLog::Configuration;
-using ZBLog::Destination;
-using ZBLog::ZBLogger;
-using ZBLog::ZBMessageBuffer;
-
 constexpr int rounds = 10000;
 
 /// Ends this process at the next system call that is not its own end. False if that cannot be set
@@ -82,7 +77,7 @@ bool allowNoSystemCall() {
 /// Runs `work` where a system call is deadly; 0 when it came through.
 template <class Work>
 int withoutSystemCalls(Work work) {
-    return logging_test::inChildProcess([&] {
+    return inChildProcess([&] {
         if (!allowNoSystemCall()) return 1;
         work();
         return 0;
@@ -129,10 +124,10 @@ class CostTest : public testing::Test {
         logger_.use(configuration_);
     }
 
-    logging_test::TemporaryFolder folder_;
-    logging_test::FakeEnvironment environment_;
+    TemporaryFolder folder_;
+    FakeEnvironment environment_;
     Configuration configuration_;
-    ZBLog::Logger logger_{environment_};
+    Logger logger_{environment_};
     const std::string text_ = "ENTERING: G() in A [Line: 3],Parameters List: P";
 };
 
@@ -163,7 +158,7 @@ TEST_F(CostTest, FilteredRecordOfTheProcessIsFree) {
 
 TEST_F(CostTest, LookAtTheConfigurationFileComesOnceASecond) {
     environment_.source = {folder_ / "zblog.conf", false};
-    ZBLog::Logger logger(environment_);
+    Logger logger(environment_);
     logger.write(record(text_, 4000));
     EXPECT_EQ(withoutSystemCalls([&] {
                   environment_.advance(999);
@@ -179,9 +174,9 @@ TEST_F(CostTest, LookAtTheConfigurationFileComesOnceASecond) {
 
 TEST_F(CostTest, RestingConfigurationFileCostsNoAllocation) {
     environment_.source = {folder_ / "zblog.conf", true};
-    logging_test::writeFile(environment_.source.path, "log.level = 3000\n");
+    writeFile(environment_.source.path, "log.level = 3000\n");
     environment_.setAhead(60);
-    ZBLog::Logger logger(environment_);
+    Logger logger(environment_);
     logger.write(record(text_, 4000));
     EXPECT_EQ(allocationsOf([&] {
                   environment_.advance(1000);
@@ -198,7 +193,7 @@ TEST_F(CostTest, WrittenRecordCostsOneWriteAndNoAllocation) {
     EXPECT_EQ(allocationsOf([&] { logger_.write(record(text_)); }), 0);
     if (!before) GTEST_SKIP() << "the kernel does not count writes";
     EXPECT_EQ(*writeCalls() - *before, rounds);
-    EXPECT_EQ(logging_test::textsOf(logging_test::readFile(folder_ / "log")).size(), 1u + rounds);
+    EXPECT_EQ(textsOf(readFile(folder_ / "log")).size(), 1u + rounds);
 }
 
 TEST_F(CostTest, WarmMessageBufferIsFree) {

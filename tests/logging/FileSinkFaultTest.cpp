@@ -12,10 +12,8 @@
 
 namespace {
 
-using logging_test::lossOf;
-using logging_test::readFile;
-using logging_test::record;
-using logging_test::textsOf;
+using namespace ZBLog;
+using namespace logging_test;
 using testing::ElementsAre;
 
 /// A limit on the size of files that the process may write, while it lives.
@@ -36,8 +34,8 @@ class FileSizeLimit {
 
 class FileSinkFaultTest : public testing::Test {
   protected:
-    logging_test::TemporaryFolder folder_;
-    logging_test::FakeEnvironment environment_;
+    TemporaryFolder folder_;
+    FakeEnvironment environment_;
 };
 
 TEST_F(FileSinkFaultTest, LossIsToldOnceToTheSystemsLogAndInTheFileWhenItCanBeWrittenAgain) {
@@ -54,7 +52,7 @@ TEST_F(FileSinkFaultTest, LossIsToldOnceToTheSystemsLogAndInTheFileWhenItCanBeWr
     for (const auto& row : rows) {
         const std::string dropped = std::string(" dropped: ") + row.reason;
         row.breakDisk();
-        ZBLog::FileSink sink(path, environment_);
+        FileSink sink(path, environment_);
         for (int count = 0; count < 12; ++count) sink.write(record("lost"));
         EXPECT_THAT(environment_.takeSystemLog(), ElementsAre(lossOf(path, row.reason)));
 
@@ -82,9 +80,9 @@ TEST_F(FileSinkFaultTest, LossIsToldOnceToTheSystemsLogAndInTheFileWhenItCanBeWr
 TEST_F(FileSinkFaultTest, UnwritableFolderIsToldOnceAndTheFileIsUsedWhenItBecomesWritable) {
     ASSERT_EQ(::chmod(folder_.path().c_str(), 0555), 0);
     const std::string path = folder_ / "korva.log";
-    const int status = logging_test::inChildProcess([&] {
+    const int status = inChildProcess([&] {
         if (::geteuid() == 0 && ::setresuid(65534, 65534, 0) != 0) return 1;
-        ZBLog::FileSink sink(path, environment_);
+        FileSink sink(path, environment_);
         sink.write(record("lost"));
         sink.write(record("lost"));
         const bool told = environment_.takeSystemLog() ==
@@ -101,7 +99,7 @@ TEST_F(FileSinkFaultTest, UnwritableFolderIsToldOnceAndTheFileIsUsedWhenItBecome
 
 TEST_F(FileSinkFaultTest, HalfALineIsNeverContinuedByAnotherRecord) {
     const std::string path = folder_ / "korva.log";
-    ZBLog::FileSink sink(path, environment_);
+    FileSink sink(path, environment_);
     sink.write(record("one"));
     const std::string before = readFile(path);
     {
@@ -124,7 +122,7 @@ TEST_F(FileSinkFaultTest, HalfALineIsNeverContinuedByAnotherRecord) {
 
 TEST_F(FileSinkFaultTest, NewFileAfterATornLineBeginsWithoutAnEmptyLine) {
     const std::string path = folder_ / "korva.log";
-    ZBLog::FileSink sink(path, environment_);
+    FileSink sink(path, environment_);
     {
         const FileSizeLimit limit(10);
         sink.write(record("torn"));
@@ -138,7 +136,7 @@ TEST_F(FileSinkFaultTest, NewFileAfterATornLineBeginsWithoutAnEmptyLine) {
 TEST_F(FileSinkFaultTest, TornLineIsRememberedWhileTheFileIsAway) {
     const std::string path = folder_ / "var/korva.log";
     std::filesystem::create_directory(folder_ / "var");
-    ZBLog::FileSink sink(path, environment_);
+    FileSink sink(path, environment_);
     {
         const FileSizeLimit limit(10);
         sink.write(record("torn"));
@@ -155,7 +153,7 @@ TEST_F(FileSinkFaultTest, TornLineIsRememberedWhileTheFileIsAway) {
 TEST_F(FileSinkFaultTest, WhatIsNoPlainFileIsRefused) {
     const std::string path = folder_ / "korva.log";
     const std::string victim = folder_ / "victim";
-    logging_test::writeFile(victim, "precious");
+    writeFile(victim, "precious");
     const struct {
         std::function<void()> make;
         const char* reason;
@@ -167,7 +165,7 @@ TEST_F(FileSinkFaultTest, WhatIsNoPlainFileIsRefused) {
     };
     for (const auto& row : rows) {
         row.make();
-        ZBLog::FileSink sink(path, environment_);
+        FileSink sink(path, environment_);
         sink.write(record("one"));
         EXPECT_THAT(environment_.takeSystemLog(), ElementsAre(lossOf(path, row.reason)));
         std::filesystem::remove(path);
@@ -179,12 +177,12 @@ TEST_F(FileSinkFaultTest, FifoThatSomebodyReadsIsRefusedToo) {
     const std::string path = folder_ / "fifo";
     ASSERT_EQ(::mkfifo(path.c_str(), 0600), 0);
     const int reader = ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
-    const std::size_t before = logging_test::openDescriptors();
-    ZBLog::FileSink sink(path, environment_);
+    const std::size_t before = openDescriptors();
+    FileSink sink(path, environment_);
     for (int count = 0; count < 2; ++count) sink.write(record("one"));
     char byte = 0;
     EXPECT_EQ(::read(reader, &byte, 1), 0);
-    EXPECT_EQ(logging_test::openDescriptors(), before);
+    EXPECT_EQ(openDescriptors(), before);
     EXPECT_THAT(environment_.takeSystemLog(), ElementsAre(lossOf(path, "Invalid argument")));
     ::close(reader);
 }

@@ -20,11 +20,9 @@
 
 namespace {
 
-using logging_test::readFile;
-using logging_test::record;
-using logging_test::textsOf;
+using namespace ZBLog;
+using namespace logging_test;
 using testing::ElementsAre;
-using ZBLog::PosixFile;
 
 TEST(PosixFile, HoldsNothingAtFirstAndAfterItWasClosed) {
     PosixFile file;
@@ -38,24 +36,25 @@ TEST(PosixFile, HoldsNothingAtFirstAndAfterItWasClosed) {
 }
 
 TEST(PosixFile, HoldsOneFileAtATime) {
-    const std::size_t before = logging_test::openDescriptors();
+    const std::size_t before = openDescriptors();
     {
         PosixFile file;
         for (const char* path : {"/dev/null", "/dev/zero", "/dev/null"}) {
             EXPECT_EQ(file.open(path, O_RDONLY), 0);
-            EXPECT_EQ(logging_test::openDescriptors(), before + 1);
+            EXPECT_EQ(openDescriptors(), before + 1);
         }
     }
-    EXPECT_EQ(logging_test::openDescriptors(), before);
+    EXPECT_EQ(openDescriptors(), before);
 }
 
-TEST(PosixFile, IsNoneOfTheStandardStreams) {
+TEST(PosixFile, IsNoneOfTheStandardStreamsAndIsNotInherited) {
     for (const int stream : {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO}) {
-        const int status = logging_test::inChildProcess([stream] {
+        const int status = inChildProcess([stream] {
             ::close(stream);
             PosixFile file;
             if (file.open("/dev/null", O_RDONLY) != 0 || !file.isOpen()) return 1;
-            return ::fcntl(stream, F_GETFD) == -1 ? 0 : 2;
+            if (::fcntl(file.number(), F_GETFD) != FD_CLOEXEC) return 2;
+            return ::fcntl(stream, F_GETFD) == -1 ? 0 : 3;
         });
         EXPECT_EQ(status, 0) << stream;
     }
@@ -84,7 +83,7 @@ int writeRaising(int signal, bool pendingBefore) {
         ::pthread_sigmask(SIG_BLOCK, &set, nullptr);
         ::raise(signal);
     }
-    const ZBLog::WriteResult result = ZBLog::writeFully(raising(signal), "text");
+    const WriteResult result = writeFully(raising(signal), "text");
     if (result.error != (signal == SIGPIPE ? EPIPE : EFBIG) || result.written != 0) return 1;
     ::sigpending(&pending);
     ::pthread_sigmask(SIG_SETMASK, nullptr, &mask);
@@ -98,7 +97,7 @@ TEST(WriteFully, RaisesNoSignalAndLeavesOnePendingThatWasPendingBefore) {
     for (const int signal : {SIGPIPE, SIGXFSZ}) {
         for (const auto disposition : {SIG_DFL, SIG_IGN}) {
             for (const bool pendingBefore : {false, true}) {
-                const int status = logging_test::inChildProcess([&] {
+                const int status = inChildProcess([&] {
                     std::signal(signal, disposition);
                     return writeRaising(signal, pendingBefore);
                 });
@@ -122,10 +121,10 @@ class FileSinkTest : public testing::Test {
         return -1;
     }
 
-    logging_test::TemporaryFolder folder_;
-    logging_test::FakeEnvironment environment_;
+    TemporaryFolder folder_;
+    FakeEnvironment environment_;
     const std::string path_ = folder_ / "korva.log";
-    ZBLog::FileSink sink_{path_, environment_};
+    FileSink sink_{path_, environment_};
 };
 
 TEST_F(FileSinkTest, CreatesNothingBeforeTheFirstRecord) {
@@ -142,7 +141,7 @@ TEST_F(FileSinkTest, CreatesAFileThatTheGroupMayReadAndNobodyElse) {
 }
 
 TEST_F(FileSinkTest, WritesWholeLinesAtTheEnd) {
-    logging_test::writeFile(path_, "there already\n");
+    writeFile(path_, "there already\n");
     sink_.write(record("one"));
     sink_.write(record("two\nthree"));
     const std::string time = "[0-9]{4}-[0-9]{2}-[0-9]{2}T[0-9:]{8}[.][0-9]{3}Z";
@@ -162,7 +161,7 @@ TEST_F(FileSinkTest, GoesToTheFileThatBearsTheNameNow) {
         {"rotated", [&] { std::filesystem::rename(path_, path_ + ".1"); }},
         {"replaced",
          [&] {
-             logging_test::writeFile(path_ + ".new", "");
+             writeFile(path_ + ".new", "");
              std::filesystem::rename(path_ + ".new", path_);
          }},
         {"removed", [&] { std::filesystem::remove(path_); }},
@@ -215,29 +214,12 @@ TEST_F(FileSinkTest, LosesNothingAndTearsNothingWhileThreadsWriteAndFilesRotate)
     EXPECT_TRUE(environment_.takeSystemLog().empty());
 }
 
-TEST_F(FileSinkTest, IsNotInheritedByChildProcesses) {
-    sink_.write(record("one"));
-    const int number = descriptorOf(path_);
-    ASSERT_GE(number, 0);
-    EXPECT_NE(::fcntl(number, F_GETFD) & FD_CLOEXEC, 0);
-}
-
-TEST_F(FileSinkTest, NeverTakesThePlaceOfAStandardStream) {
-    const int status = logging_test::inChildProcess([&] {
-        ::close(STDIN_FILENO);
-        sink_.write(record("one"));
-        return ::fcntl(STDIN_FILENO, F_GETFD) == -1 ? 0 : 1;
-    });
-    EXPECT_EQ(status, 0);
-    EXPECT_THAT(textsOf(readFile(path_)), ElementsAre("one"));
-}
-
 TEST_F(FileSinkTest, LeavesADescriptorAloneThatTheProcessTookFromIt) {
     sink_.write(record("one"));
     const int number = descriptorOf(path_);
     ASSERT_GE(number, 0);
     const std::string others = folder_ / "data";
-    logging_test::writeFile(others, "valuable");
+    writeFile(others, "valuable");
     const int other = ::open(others.c_str(), O_RDWR | O_APPEND | O_CLOEXEC);
     ASSERT_EQ(::dup2(other, number), number);
 

@@ -26,8 +26,8 @@
 
 namespace {
 
-using logging_test::record;
-using logging_test::writeFile;
+using namespace ZBLog;
+using namespace logging_test;
 
 template <class Clock>
 long long millisecondsOf(Clock) {
@@ -36,7 +36,7 @@ long long millisecondsOf(Clock) {
 }
 
 TEST(HostEnvironment, CountMillisecondsSteadily) {
-    ZBLog::HostEnvironment host;
+    HostEnvironment host;
     constexpr std::uint32_t lag = 50;
     for (int round = 0; round < 20; ++round) {
         const auto before = static_cast<std::uint32_t>(millisecondsOf(std::chrono::steady_clock{}));
@@ -47,7 +47,7 @@ TEST(HostEnvironment, CountMillisecondsSteadily) {
 }
 
 TEST(HostEnvironment, TellTheTimeOfDay) {
-    ZBLog::HostEnvironment host;
+    HostEnvironment host;
     const long long before = millisecondsOf(std::chrono::system_clock{});
     const timespec told = host.utc();
     const long long after = millisecondsOf(std::chrono::system_clock{});
@@ -63,7 +63,7 @@ TEST(ConfigurationSource, IsTheSystemsFileUnlessTheEnvironmentNamesAnother) {
         bool required;
     } rows[] = {{nullptr, "/etc/zblog.conf", false}, {"/x/y", "/x/y", true}, {"", "", true}};
     for (const auto& row : rows) {
-        const ZBLog::ConfigurationSource source = ZBLog::configurationSourceFrom(row.variable);
+        const ConfigurationSource source = configurationSourceFrom(row.variable);
         EXPECT_EQ(source.path, row.path);
         EXPECT_EQ(source.required, row.required) << row.path;
     }
@@ -104,14 +104,14 @@ std::string receivedBy(int listener) {
 }
 
 TEST(SystemLog, ReceivesEachRecordAsADatagramUnderTheNameOfTheProcess) {
-    const logging_test::TemporaryFolder folder;
-    const int status = logging_test::inChildProcess([&] {
+    const TemporaryFolder folder;
+    const int status = inChildProcess([&] {
         if (!makeOwnDeviceFolder()) return notAllowed;
         const int listener = listenAtTheSystemsLog();
         if (listener < 0) return 1;
         ::openlog("cimserver", LOG_PID, LOG_LOCAL0);
-        ZBLog::HostEnvironment environment;
-        ZBLog::SystemLogSink sink(environment);
+        HostEnvironment environment;
+        SystemLogSink sink(environment);
         sink.write(record("MESSAGE [File: A, Line: 9]: 100 %s full"));
         sink.write(record("VARIABLE: x", 4000));
         writeFile(folder / "message", receivedBy(listener));
@@ -124,12 +124,12 @@ TEST(SystemLog, ReceivesEachRecordAsADatagramUnderTheNameOfTheProcess) {
     const std::string from =
         "[A-Z][a-z]{2} [ 0-9][0-9] [0-9:]{8} cimserver\\[[0-9]+\\]: "
         "korva-osstatus: log ";
-    EXPECT_THAT(logging_test::readFile(folder / "message"),
+    EXPECT_THAT(readFile(folder / "message"),
                 testing::MatchesRegex("<27>" + from +
                                       "3000 Zumbrel.Test work Work.cpp:12 "
                                       "MESSAGE \\[File: A, Line: 9\\]: 100 %s full"));
     EXPECT_THAT(
-        logging_test::readFile(folder / "variable"),
+        readFile(folder / "variable"),
         testing::MatchesRegex("<31>" + from + "4000 Zumbrel.Test work Work.cpp:12 VARIABLE: x"));
 }
 
@@ -147,12 +147,12 @@ bool failReads() {
 }
 
 TEST(ReadError, OfAConfigurationFileIsTold) {
-    const logging_test::TemporaryFolder folder;
-    logging_test::writeFile(folder / "zblog.conf", "log.level = 1\n");
-    const int status = logging_test::inChildProcess([&] {
+    const TemporaryFolder folder;
+    writeFile(folder / "zblog.conf", "log.level = 1\n");
+    const int status = inChildProcess([&] {
         if (!failReads()) return 1;
-        logging_test::FakeEnvironment environment;
-        ZBLog::ConfigurationFile file({folder / "zblog.conf", false}, environment);
+        FakeEnvironment environment;
+        ConfigurationFile file({folder / "zblog.conf", false}, environment);
         const auto read = file.readIfChanged();
         if (!read || read->errors.size() != 1) return 2;
         return read->errors[0].message == "cannot be read: Input/output error" ? 0 : 3;
@@ -161,15 +161,14 @@ TEST(ReadError, OfAConfigurationFileIsTold) {
 }
 
 TEST(Cancellation, MayHitAThreadWhileItWrites) {
-    const logging_test::TemporaryFolder folder;
-    logging_test::FakeEnvironment environment;
-    ZBLog::Logger logger(environment);
-    ZBLog::Configuration configuration;
-    configuration.of(ZBLog::Channel::log) =
-        logging_test::everythingTo(ZBLog::Destination::file, folder / "log");
+    const TemporaryFolder folder;
+    FakeEnvironment environment;
+    Logger logger(environment);
+    Configuration configuration;
+    configuration.of(Channel::log) = everythingTo(Destination::file, folder / "log");
     logger.use(configuration);
     struct Work {
-        ZBLog::Logger& logger;
+        Logger& logger;
         std::atomic<bool> started{false};
     };
     for (int round = 0; round < 20; ++round) {
@@ -191,7 +190,7 @@ TEST(Cancellation, MayHitAThreadWhileItWrites) {
         EXPECT_EQ(result, PTHREAD_CANCELED);
     }
     logger.write(record("last"));
-    EXPECT_EQ(logging_test::textsOf(logging_test::readFile(folder / "log")).back(), "last");
+    EXPECT_EQ(textsOf(readFile(folder / "log")).back(), "last");
 }
 
 }  // namespace

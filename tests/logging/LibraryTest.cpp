@@ -16,8 +16,7 @@
 
 namespace {
 
-using logging_test::readFile;
-using logging_test::textsOf;
+using namespace logging_test;
 using testing::Contains;
 using testing::ElementsAre;
 using testing::Not;
@@ -143,7 +142,7 @@ TEST(Library, TouchesNothingThatBelongsToTheProcess) {
 }
 
 TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
-    const logging_test::TemporaryFolder folder;
+    const TemporaryFolder folder;
     const ConfigurationInMemory configuration("log.sink = file:" + (folder / "log") +
                                               "\nlog.records = all\n"
                                               "trace.sink = file:" +
@@ -166,8 +165,8 @@ TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
             loaded.get<Construct>("_ZN5ZBLog15ZBMessageBufferD1Ev")(&buffer);
         }
         ASSERT_FALSE(isMapped());
-        if (round == 0) descriptors = logging_test::openDescriptors();
-        ASSERT_EQ(logging_test::openDescriptors(), descriptors);
+        if (round == 0) descriptors = openDescriptors();
+        ASSERT_EQ(openDescriptors(), descriptors);
         if (round == 50) bytes = ::mallinfo2().uordblks;
     }
     EXPECT_LT(::mallinfo2().uordblks, bytes + 2000);
@@ -179,7 +178,7 @@ TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
 }
 
 TEST(Library, FollowsAConfigurationInMemoryThatChanges) {
-    const logging_test::TemporaryFolder folder;
+    const TemporaryFolder folder;
     const ConfigurationInMemory configuration("log.sink = off\n");
     const LoadedLibrary loaded;
     loaded.log("one");
@@ -204,9 +203,9 @@ TEST(Library, ReadsNoFileWhenTheEnvironmentNamesNone) {
 
 /// A process that ends while its threads go on logging.
 TEST(Library, LetsAProcessEndWhileItsThreadsGoOn) {
-    const logging_test::TemporaryFolder folder;
+    const TemporaryFolder folder;
     for (int round = 0; round < 10; ++round) {
-        const int status = logging_test::inChildProcess([&]() -> int {
+        const int status = inChildProcess([&]() -> int {
             const ConfigurationInMemory configuration("log.sink = file:" + (folder / "log") +
                                                       "\nlog.records = all\n");
             static const LoadedLibrary& loaded =

@@ -9,12 +9,7 @@
 
 namespace {
 
-using logging_test::failure;
-using logging_test::readFile;
-using logging_test::record;
-using logging_test::textsOf;
-using logging_test::warningOf;
-using logging_test::writeFile;
+using namespace logging_test;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
@@ -29,8 +24,8 @@ class LoggerReloadTest : public testing::Test {
     }
     void write(const std::string& text) { logger_.write(record(text)); }
 
-    logging_test::TemporaryFolder folder_;
-    logging_test::FakeEnvironment environment_;
+    TemporaryFolder folder_;
+    FakeEnvironment environment_;
     const std::string path_ = folder_ / "zblog.conf";
     const std::string notInForce_ = warningOf(path_ + ": not in force; the defaults hold");
     const std::string first_ = folder_ / "first";
@@ -71,11 +66,11 @@ TEST_F(LoggerReloadTest, FollowsAChangeWhenItsClockWrapsAround) {
 TEST_F(LoggerReloadTest, ClosesAFileThatIsNoLongerWanted) {
     configure(toFirst_);
     write("one");
-    const std::size_t before = logging_test::openDescriptors();
+    const std::size_t before = openDescriptors();
     for (int round = 0; round < 20; ++round) {
         reconfigure(round % 2 == 0 ? toSecond_ : toFirst_);
         write("two");
-        EXPECT_EQ(logging_test::openDescriptors(), before);
+        EXPECT_EQ(openDescriptors(), before);
     }
 }
 
@@ -162,10 +157,10 @@ TEST_F(LoggerReloadTest, SaysNothingAboutAMissingFileOfTheSystem) {
 
 TEST_F(LoggerReloadTest, LetsGoOfItsFileWhenAConfigurationIsPutInForce) {
     configure(toFirst_);
-    const std::size_t before = logging_test::openDescriptors();
+    const std::size_t before = openDescriptors();
     write("one");
     logger_.use(ZBLog::Configuration());
-    EXPECT_EQ(logging_test::openDescriptors(), before);
+    EXPECT_EQ(openDescriptors(), before);
     reconfigure(toSecond_);
     write("two");
     EXPECT_FALSE(std::filesystem::exists(second_));

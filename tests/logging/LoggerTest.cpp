@@ -16,16 +16,9 @@
 
 namespace {
 
-using logging_test::everythingTo;
-using logging_test::failure;
-using logging_test::readFile;
-using logging_test::record;
-using logging_test::textsOf;
+using namespace ZBLog;
+using namespace logging_test;
 using testing::ElementsAre;
-using ZBLog::Channel;
-using ZBLog::ChannelConfiguration;
-using ZBLog::Configuration;
-using ZBLog::Destination;
 
 class LoggerTest : public testing::Test {
   protected:
@@ -51,9 +44,9 @@ class LoggerTest : public testing::Test {
     std::vector<std::string> logged() const { return textsOf(readFile(log_)); }
     std::vector<std::string> traced() const { return textsOf(readFile(trace_)); }
 
-    logging_test::TemporaryFolder folder_;
-    logging_test::FakeEnvironment environment_;
-    ZBLog::Logger logger_{environment_};
+    TemporaryFolder folder_;
+    FakeEnvironment environment_;
+    Logger logger_{environment_};
     const std::string log_ = folder_ / "log";
     const std::string trace_ = folder_ / "trace";
 };
@@ -104,10 +97,10 @@ TEST_F(LoggerTest, LetsOnlyWantedCategoriesPass) {
 
 TEST_F(LoggerTest, WritesBothChannelsToOneFileWithoutTearingLines) {
     use(to(log_), to(log_));
-    const std::size_t before = logging_test::openDescriptors();
+    const std::size_t before = openDescriptors();
     write("one", 3000, Channel::log);
     write("two", 3000, Channel::trace);
-    EXPECT_EQ(logging_test::openDescriptors(), before + 1);
+    EXPECT_EQ(openDescriptors(), before + 1);
     EXPECT_THAT(readFile(log_), testing::MatchesRegex(
                                     "[^\n]* log 3000 [^\n]* one\n[^\n]* trace 3000 [^\n]* two\n"));
 }
@@ -135,7 +128,7 @@ TEST_F(LoggerTest, LeavesErrnoAloneWhenItWritesAndWhenItReadsItsConfiguration) {
     EXPECT_EQ(environment_.takeSystemLog().size(), 1u);
 
     environment_.source = {folder_ / "missing.conf", true};
-    ZBLog::Logger reading(environment_);
+    Logger reading(environment_);
     errno = 4242;
     reading.write(record("filtered", 4000));
     EXPECT_EQ(errno, 4242);
@@ -144,13 +137,13 @@ TEST_F(LoggerTest, LeavesErrnoAloneWhenItWritesAndWhenItReadsItsConfiguration) {
 
 TEST_F(LoggerTest, ClosesItsFilesAndDropsRecordsAfterItsEnd) {
     environment_.source = {folder_ / "zblog.conf", true};
-    logging_test::writeFile(environment_.source.path, "log.sink = file:" + log_ + "\n");
-    const std::size_t before = logging_test::openDescriptors();
+    writeFile(environment_.source.path, "log.sink = file:" + log_ + "\n");
+    const std::size_t before = openDescriptors();
     use(to(log_));
     write("one", 3000);
-    EXPECT_EQ(logging_test::openDescriptors(), before + 1);
+    EXPECT_EQ(openDescriptors(), before + 1);
     logger_.close();
-    EXPECT_EQ(logging_test::openDescriptors(), before);
+    EXPECT_EQ(openDescriptors(), before);
     write("two", 3000);
     use(to(log_));
     write("three", 3000);
@@ -161,11 +154,11 @@ TEST_F(LoggerTest, ClosesItsFilesAndDropsRecordsAfterItsEnd) {
 }
 
 TEST_F(LoggerTest, ServesTheTwoCallsOfTheLibrary) {
-    ZBLog::processLogger().use(configurationOf(to(log_), to(trace_)));
+    processLogger().use(configurationOf(to(log_), to(trace_)));
     const std::string category = "Zumbrel.OSStatusProvider";
-    ZBLog::ZBLogger::logLevelMessage("f", "F.cpp", 1, category, 3000, nullptr, 0, 0, "one");
-    ZBLog::ZBLogger::traceLevelMessage("g", "G.cpp", 2, category, 4000, nullptr, 0, 0, "two");
-    ZBLog::ZBLogger::traceLevelMessage(nullptr, nullptr, 0, "", 4000, nullptr, 0, 0, "");
+    ZBLogger::logLevelMessage("f", "F.cpp", 1, category, 3000, nullptr, 0, 0, "one");
+    ZBLogger::traceLevelMessage("g", "G.cpp", 2, category, 4000, nullptr, 0, 0, "two");
+    ZBLogger::traceLevelMessage(nullptr, nullptr, 0, "", 4000, nullptr, 0, 0, "");
     EXPECT_THAT(readFile(log_),
                 testing::EndsWith(" log 3000 Zumbrel.OSStatusProvider f F.cpp:1 one\n"));
     EXPECT_THAT(readFile(trace_), testing::EndsWith(" trace 4000 - - -:0 \n"));
@@ -177,9 +170,8 @@ TEST_F(LoggerTest, LosesNothingWhileTheConfigurationChangesUnderManyThreads) {
     environment_.source = {folder_ / "zblog.conf", true};
     const auto configure = [&](int round) {
         const std::string path = environment_.source.path;
-        logging_test::writeFile(path + ".new",
-                                "log.sink = file:" + log_ + std::to_string(round % 3) +
-                                    "\nlog.records = all\nlog.category = Zumbrel.*\n");
+        writeFile(path + ".new", "log.sink = file:" + log_ + std::to_string(round % 3) +
+                                     "\nlog.records = all\nlog.category = Zumbrel.*\n");
         std::filesystem::rename(path + ".new", path);
         environment_.advance(1000);
     };
@@ -215,8 +207,7 @@ TEST_F(LoggerTest, LosesNothingWhileTheConfigurationChangesUnderManyThreads) {
 TEST_F(LoggerTest, LosesNoRecordOfThreadsThatAllComeFirst) {
     constexpr std::size_t threads = 8;
     environment_.source = {folder_ / "zblog.conf", true};
-    logging_test::writeFile(environment_.source.path,
-                            "log.sink = file:" + log_ + "\nlog.records = all\n");
+    writeFile(environment_.source.path, "log.sink = file:" + log_ + "\nlog.records = all\n");
     std::vector<std::thread> writers;
     while (writers.size() < threads) writers.emplace_back([&] { write("first", 3000); });
     for (std::thread& writer : writers) writer.join();
@@ -244,9 +235,9 @@ TEST_F(LoggerTest, GoesOnInAChildProcess) {
     use(to(log_));
     write("parent", 3000);
     const std::string parent = "[^ ]* " + std::to_string(::getpid()) + " [^\n]* parent\n";
-    const int status = logging_test::inChildProcess([&] {
+    const int status = inChildProcess([&] {
         write("child", 3000);
-        logging_test::writeFile(trace_, std::to_string(::getpid()));
+        writeFile(trace_, std::to_string(::getpid()));
         return 0;
     });
     EXPECT_EQ(status, 0);

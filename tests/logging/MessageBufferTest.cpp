@@ -175,27 +175,6 @@ TEST(MessageBuffer, NestsDeeperThanBuffersAreKept) {
     }
 }
 
-TEST(MessageBuffer, ServesManyThreadsAtOnce) {
-    std::vector<std::thread> threads;
-    std::atomic<int> wrong{0};
-    for (int thread = 0; thread < 8; ++thread) {
-        threads.emplace_back([&, thread] {
-            const std::string own(static_cast<std::size_t>(thread + 1) * 10,
-                                  static_cast<char>('a' + thread));
-            for (int count = 0; count < 2000; ++count) {
-                ZBMessageBuffer buffer;
-                const std::string& text = buffer.str(buffer << own.c_str());
-                if (text != own) ++wrong;
-                ZBMessageBuffer inner;
-                std::ostream& stream = inner;
-                if (inner.str(stream << count) != std::to_string(count)) ++wrong;
-            }
-        });
-    }
-    for (std::thread& thread : threads) thread.join();
-    EXPECT_EQ(wrong, 0);
-}
-
 std::atomic<int> living{0};
 
 struct Counted {

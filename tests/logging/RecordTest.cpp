@@ -8,10 +8,8 @@
 
 namespace {
 
+using namespace ZBLog;
 using base::EscapeStyle;
-using ZBLog::Channel;
-using ZBLog::LineBuffer;
-using ZBLog::Record;
 
 std::string escaped(const std::string& text, std::size_t room = LineBuffer::capacity,
                     EscapeStyle style = EscapeStyle::logText) {
@@ -91,7 +89,7 @@ TEST(LineBuffer, EndsItsLineAndBeginsOneAfterATornOne) {
 
 std::string lineOf(const Record& record, timespec instant = {1709251199, 123456789}) {
     LineBuffer line;
-    ZBLog::formatLine(line, record, {instant, 4711, 4713});
+    formatLine(line, record, {instant, 4711, 4713});
     return std::string(line.line());
 }
 
@@ -147,8 +145,8 @@ TEST(RecordLine, HoldsTheLongestTextOfTheProviderWhole) {
 
 TEST(RecordLine, NamesTheProgramInTheSystemsLog) {
     LineBuffer line;
-    ZBLog::formatForSystemLog(line, {Channel::log, "f", "F.cpp", 12, "Zumbrel.OSStatusProvider",
-                                     3000, "MESSAGE [File: F.cpp, Line: 12]: 100%s\n"});
+    formatForSystemLog(line, {Channel::log, "f", "F.cpp", 12, "Zumbrel.OSStatusProvider", 3000,
+                              "MESSAGE [File: F.cpp, Line: 12]: 100%s\n"});
     EXPECT_STREQ(line.nulTerminated(),
                  "korva-osstatus: log 3000 Zumbrel.OSStatusProvider f F.cpp:12 "
                  "MESSAGE [File: F.cpp, Line: 12]: 100%s\\x0A");
@@ -169,9 +167,8 @@ TEST(RecordLine, RanksFailuresAboveEverythingElseInTheSystemsLog) {
         {3000, "MESSAGE", LOG_INFO},
     };
     for (const auto& row : rows) {
-        EXPECT_EQ(
-            ZBLog::systemLogPriority({Channel::log, "f", "F.cpp", 1, "C", row.level, row.text}),
-            LOG_DAEMON | row.severity)
+        EXPECT_EQ(systemLogPriority({Channel::log, "f", "F.cpp", 1, "C", row.level, row.text}),
+                  LOG_DAEMON | row.severity)
             << row.level << " " << row.text;
     }
 }
