@@ -20,6 +20,9 @@ endfunction()
 
 if(KORVA_CMPIHOST)
     korva_man_page(tools cmpihost 1)
+    # The licences of the libraries whose code is in it want to go along.
+    install(FILES "${PROJECT_SOURCE_DIR}/packaging/debian/copyright.tools" RENAME copyright.cmpihost
+            DESTINATION "${CMAKE_INSTALL_DOCDIR}" COMPONENT tools)
 endif()
 korva_man_page(provider zblog.conf 5)
 korva_man_page(provider korva-osstatus 7)
@@ -29,6 +32,8 @@ korva_man_page(provider korva-osstatus-register 8)
 file(GLOB korva_documents CONFIGURE_DEPENDS "${PROJECT_SOURCE_DIR}/docs/*.md")
 install(FILES ${korva_documents} DESTINATION "${CMAKE_INSTALL_DOCDIR}/docs" COMPONENT provider)
 install(FILES "${PROJECT_SOURCE_DIR}/README.md" "${PROJECT_SOURCE_DIR}/CHANGELOG.md"
+              "${PROJECT_SOURCE_DIR}/CONTRIBUTING.md" "${PROJECT_SOURCE_DIR}/SECURITY.md"
+              "${PROJECT_SOURCE_DIR}/LICENSE"
         DESTINATION "${CMAKE_INSTALL_DOCDIR}" COMPONENT provider)
 install(FILES "${PROJECT_SOURCE_DIR}/packaging/examples/zblog.conf"
         DESTINATION "${KORVA_SHARE_DIR}/examples" COMPONENT provider)

@@ -48,7 +48,13 @@ macro(korva_package component deb rpm summary description)
     set(CPACK_COMPONENT_DEBIAN-${key}_GROUP ${component})
     list(APPEND CPACK_COMPONENTS_ALL debian-${component})
     set(CPACK_COMPONENT_GROUP_${key}_DESCRIPTION "${description}")
-    install(FILES "${korva_packaging}/debian/copyright" "${korva_changelog}"
+    set(copyright "${korva_packaging}/debian/copyright")
+    if(EXISTS "${copyright}.${component}")
+        string(APPEND copyright ".${component}")
+    endif()
+    install(FILES "${korva_changelog}"
+            DESTINATION "share/doc/${deb}" COMPONENT debian-${component} EXCLUDE_FROM_ALL)
+    install(FILES "${copyright}" RENAME copyright
             DESTINATION "share/doc/${deb}" COMPONENT debian-${component} EXCLUDE_FROM_ALL)
 
     set(CPACK_DEBIAN_${key}_PACKAGE_NAME ${deb})

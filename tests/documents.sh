@@ -3,7 +3,7 @@
 # the root folder. A dead link or a command that fails ends the run and is named.
 set -eu
 cd "$(dirname "$0")/.."
-sh tests/links.sh README.md CHANGELOG.md docs/*.md
+sh tests/links.sh ./*.md docs/*.md
 script=$(mktemp)
 trap 'rm -f "$script"' EXIT
 for document in README.md docs/*.md; do

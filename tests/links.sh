@@ -5,13 +5,13 @@ set -eu
 
 # Targets of the links in a document, without what is shown in blocks and as code.
 targets() {
-    awk '/^```/ {inside = !inside; next} !inside' "$1" | sed "s/\`[^\`]*\`//g" |
+    awk '/^ *```/ {inside = !inside; next} !inside' "$1" | sed "s/\`[^\`]*\`//g" |
         grep -o '](<\{0,1\}[^)>]*' | sed 's/^](<\{0,1\}//; s/ .*//'
 }
 
 # Names of a document's headings, as links write them.
 anchors() {
-    awk '/^```/ {inside = !inside; next} !inside' "$1" | sed -n 's/^##* *//p' | tr '[:upper:]' '[:lower:]' |
+    awk '/^ *```/ {inside = !inside; next} !inside' "$1" | sed -n 's/^##* *//p' | tr '[:upper:]' '[:lower:]' |
         sed 's/[^[:alnum:] _-]//g; s/ /-/g'
 }
 

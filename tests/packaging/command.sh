@@ -4,122 +4,50 @@
 . ./managers.sh
 : "${KORVA_SOURCE_DIR:?}"
 
-called() { calls | sed 's/ .*//' | sort -u | tr '\n' ' '; }
-
-RegistersWithEveryManagerThatIsInstalled() {
-    with_sfcb
-    with_pegasus
-    register register
-    expect_code 0
-    expect_equal "the commands" "cimmof sfcbrepos sfcbstage " "$(called)"
+called() { calls | sed 's/ .*//' | sort -u | paste -sd ' '; }
+expect_told() { expect_equal "${row:-}the commands" "$1" "$(called)"; }
+start_again() {
+    rm -f "$managers"/bin/*
+    start_afresh
 }
 
-RegistersWithTheNamedManagerOnly() {
-    with_sfcb
-    with_pegasus
-    register --cimom=pegasus register
-    expect_code 0
-    expect_equal "the commands" "cimmof " "$(called)"
+# Each line: what is done before, the arguments, the status, the commands, and texts of the output.
+choices() {
+    registration=$tree/share/korva-osstatus/registration
+    cat <<EOF
+with_sfcb; with_pegasus|register|0|cimmof sfcbrepos sfcbstage
+with_sfcb; with_pegasus|--cimom=pegasus register|0|cimmof
+with_sfcb; with_pegasus; fails sfcbstage disk full|register|1|cimmof sfcbstage
+|register|1||no object manager was found|install one, or add the folder of its commands to PATH
+with_pegasus|--cimom sfcb register|1||the commands of sfcb are not installed
+|register --package|0||no object manager was found|the package itself is in order
+with_sfcb; fails sfcbrepos disk full|register --package|0|sfcbrepos sfcbstage sfcbunstage|sfcbrepos failed with exit status 3|once an object manager is, run: korva-osstatus-register register
+with_sfcb|--dry-run --only-companion register|0||would run: sfcbstage -n root/cimv2 -r $registration/|would run: sfcbrepos -f
+with_sfcb|register|0|sfcbrepos sfcbstage|running: sfcbstage -n root/cimv2|running: sfcbrepos -f
+EOF
 }
 
-GoesOnWithTheNextManagerWhenOneFails() {
-    with_sfcb
-    with_pegasus
-    echo "disk full" >"$managers/fail/sfcbstage"
-    register register
-    expect_code 1
-    expect_equal "the commands" "cimmof sfcbstage " "$(called)"
+RegistersWithTheManagersThatAreThereOrNamed() { expect_rows choices; }
+
+what_is_missing() {
+    shared=$tree/share/korva-osstatus
+    cat <<EOF
+with_sfcb; temporary=/nowhere|register|1||cannot make a temporary folder in /nowhere|make room there or set TMPDIR
+with_sfcb|--package register|0||cannot make a temporary folder in /nowhere
+with_sfcb|--package unregister|0||cannot make a temporary folder in /nowhere
+with_sfcb; temporary=$work/tmp; rm $shared/schema/KORVA_RunningOS.mof|--without-companion register|1||cannot read $shared/schema/KORVA_RunningOS.mof|install the package again, or name the tree that holds it with --prefix
+with_sfcb; rm $shared/register/sfcb.sh|register|1||cannot read $shared/register/sfcb.sh, a part of this command|install the package again
+with_sfcb|--package register|0||cannot read $shared/register/sfcb.sh
+EOF
 }
 
-FailsWithoutAnObjectManager() {
-    register register
-    expect_code 1
-    expect_text "no object manager was found" "$output"
-    expect_text "install one, or add the folder of its commands to PATH" "$output"
-}
+NamesWhatIsMissingAndTheWayOut() { expect_rows what_is_missing; }
 
-FailsWithoutTheNamedManager() {
-    with_pegasus
-    register --cimom sfcb register
-    expect_code 1
-    expect_text "the commands of sfcb are not installed" "$output"
-}
-
-ServesAPackageWithoutAnObjectManager() {
-    register register --package
-    expect_code 0
-    expect_text "no object manager was found" "$output"
-    expect_text "the package itself is in order" "$output"
-}
-
-ServesAPackageWhenTheManagerFails() {
-    with_sfcb
-    echo "disk full" >"$managers/fail/sfcbrepos"
-    register register --package
-    expect_code 0
-    expect_text "sfcbrepos failed with exit status 3" "$output"
-    expect_text "once an object manager is, run: korva-osstatus-register register" "$output"
-}
-
-DryRunTellsAndDoesNothing() {
-    with_sfcb
-    register --dry-run --only-companion register
-    expect_code 0
-    expect_calls ""
-    expect_text "would run: sfcbstage -n root/cimv2 -r $tree/share/korva-osstatus/registration/" "$output"
-    expect_text "would run: sfcbrepos -f" "$output"
-}
-
-TellsEachCommandBeforeItRuns() {
-    with_sfcb
-    register register
-    expect_text "running: sfcbstage -n root/cimv2" "$output"
-    expect_text "running: sfcbrepos -f" "$output"
-}
-
-NamesAMissingFileAndTheWayOut() {
-    with_sfcb
-    rm "$tree/share/korva-osstatus/schema/KORVA_RunningOS.mof"
-    register --without-companion register
-    expect_code 1
-    expect_calls ""
-    expect_text "cannot read $tree/share/korva-osstatus/schema/KORVA_RunningOS.mof" "$output"
-    expect_text "install the package again, or name the tree that holds it with --prefix" "$output"
-}
-
-NamesAMissingPartOfItself() {
-    with_sfcb
-    rm "$tree/share/korva-osstatus/register/sfcb.sh"
-    register register
-    expect_code 1
-    expect_calls ""
-    expect_text "cannot read $tree/share/korva-osstatus/register/sfcb.sh, a part of this command" "$output"
-    expect_text "install the package again" "$output"
-    register --package register
-    expect_code 0
-    expect_text "cannot read $tree/share/korva-osstatus/register/sfcb.sh" "$output"
-}
-
-NamesAnUnusableFolderForTemporaryFiles() {
+DoesNotBlameThePackageForAFolderOfTheSystem() {
     with_sfcb
     temporary=/nowhere
     register register
-    expect_code 1
-    expect_calls ""
-    expect_text "cannot make a temporary folder in /nowhere" "$output"
-    expect_text "make room there or set TMPDIR" "$output"
     expect_no_text "install the package again" "$output"
-}
-
-ServesAPackageWithoutAFolderForTemporaryFiles() {
-    with_sfcb
-    temporary=/nowhere
-    for operation in register unregister; do
-        register --package "$operation"
-        expect_code 0
-        expect_text "cannot make a temporary folder in /nowhere" "$output"
-    done
-    expect_calls ""
 }
 
 TakesClassesFromTheNamedFolder() {

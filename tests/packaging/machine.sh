@@ -33,6 +33,8 @@ set_up_machine() {
     [ "$architecture" = "$(dpkg --print-architecture)" ] || on_machine --add-architecture "$architecture"
 }
 
+set_up_machine
+
 with_sfcb() {
     for name in sfcbstage sfcbunstage sfcbrepos; do cp stand-in "$machine/usr/bin/$name"; done
     mkdir -p "$machine/usr/fail"
@@ -40,6 +42,7 @@ with_sfcb() {
 
 # What sfcb was told, by the names of the files.
 calls() { sed 's| /[^ ]*/| |g; s| -n root/cimv2||; s| KORVA.*||' "$machine/usr/calls"; }
+expect_told() { expect_equal "what sfcb was told" "$1" "$(calls)"; }
 forget_calls() { rm -f "$machine/usr/calls"; }
 
 # All that is on the machine, except what dpkg and the stand-ins remember.
@@ -47,30 +50,37 @@ everything() {
     (cd "$machine" && find . ! -path './var/lib/*' ! -path ./usr/calls | LC_ALL=C sort)
 }
 
-install_all() {
-    on_machine -i "$(package provider)" "$(package companion)" "$(package dev)" "$(package tools)"
+# install NAME...: the packages of these names.
+install() {
+    # Names of files, without blanks.
+    # shellcheck disable=SC2046
+    on_machine -i $(for name in "$@"; do package "$name"; done)
+}
+install_all() { install provider companion dev tools; }
+
+# remove_all -r|-P
+remove_all() {
+    on_machine "$1" korva-osstatus-tools korva-osstatus-dev korva-osstatus-companion korva-osstatus-provider
 }
 
 state_of() { dpkg-query --admindir="$machine/var/lib/dpkg" -W -f '${db:Status-Status}' "korva-osstatus-$1"; }
 
 InstallationRegistersProviderAndCompanion() {
-    set_up_machine
     with_sfcb
     install_all
     for name in provider companion dev tools; do
         expect_equal "the state of $name" installed "$(state_of $name)"
     done
-    expect_equal "what sfcb was told" "sfcbstage -r korva-osstatus.reg
+    expect_told "sfcbstage -r korva-osstatus.reg
 sfcbrepos -f
 sfcbstage -r korva-osstatus-companion.reg
-sfcbrepos -f" "$(calls)"
+sfcbrepos -f"
     expect_text "sfcb: the broker must be restarted" "$output"
 }
 
 InstallationRegistersTheFacade() {
-    set_up_machine
     with_sfcb
-    on_machine -i "$(package provider)"
+    install provider
     expect_equal "what is staged" "location: korvaosstatusfacade
 provider: OSStatusFacade" \
         "$(sed -n 's/^ *\(provider:\|location:\)/\1/p' "$machine/var/lib/sfcb/stage/regs/korva-osstatus.reg" | sort -u)"
@@ -78,14 +88,12 @@ provider: OSStatusFacade" \
 }
 
 InstallationNeedsNoObjectManager() {
-    set_up_machine
     install_all
     expect_equal "the state of the provider" installed "$(state_of provider)"
     expect_text "no object manager was found" "$output"
 }
 
 InstallationSurvivesAFailingObjectManager() {
-    set_up_machine
     with_sfcb
     echo "the schema is missing" >"$machine/usr/fail/sfcbrepos"
     install_all
@@ -94,23 +102,21 @@ InstallationSurvivesAFailingObjectManager() {
 }
 
 InstalledHostReportsTheOperatingSystem() {
-    set_up_machine
     install_all
     expect_success env -i "$machine/usr/bin/cmpihost" ein KORVA_OperatingSystem
     expect_text 'KORVA_OperatingSystem.CSCreationClassName="KORVA_ComputerSystem"' "$output"
 }
 
 RemovalUnregistersAndLeavesNothing() {
-    set_up_machine
     with_sfcb
     everything >"$work/before"
     install_all
     forget_calls
-    on_machine -r korva-osstatus-tools korva-osstatus-dev korva-osstatus-companion korva-osstatus-provider
-    expect_equal "what sfcb was told" "sfcbunstage -r korva-osstatus-companion.reg
+    remove_all -r
+    expect_told "sfcbunstage -r korva-osstatus-companion.reg
 sfcbrepos -f
 sfcbunstage -r korva-osstatus.reg
-sfcbrepos -f" "$(calls)"
+sfcbrepos -f"
     touch "$machine/var/log/korva-osstatus.log" "$machine/var/log/korva-osstatus.log.1.gz" \
         "$machine/var/log/korva-osstatus.log-20261121" "$machine/var/log/korva-osstatus-other.log-20261121.gz"
     on_machine -P korva-osstatus-provider
@@ -119,7 +125,6 @@ sfcbrepos -f" "$(calls)"
 
 # As with a package manager that has a PATH of its own.
 RemovalFindsAnObjectManagerOutsideOfPath() {
-    set_up_machine
     everything >"$work/before"
     install_all
     mkdir -p "$machine/opt/sfcb/bin" "$machine/opt/sfcb/fail"
@@ -128,7 +133,7 @@ RemovalFindsAnObjectManagerOutsideOfPath() {
     regs=$machine/opt/sfcb/var/lib/sfcb/stage/regs
     expect_equal "what is staged" "korva-osstatus-companion.reg
 korva-osstatus.reg" "$(ls "$regs")"
-    on_machine -P korva-osstatus-tools korva-osstatus-dev korva-osstatus-companion korva-osstatus-provider
+    remove_all -P
     expect_equal "what is staged" "" "$(ls "$regs")"
     [ ! -e "$machine/var/lib/korva-osstatus" ] || fail "$(ls "$machine/var/lib/korva-osstatus") is left"
     rm -r "$machine/opt"
@@ -136,8 +141,7 @@ korva-osstatus.reg" "$(ls "$regs")"
 }
 
 PurgeForgetsWhereObjectManagersWere() {
-    set_up_machine
-    on_machine -i "$(package provider)"
+    install provider
     mkdir "$machine/var/lib/korva-osstatus"
     ln -s /opt/gone "$machine/var/lib/korva-osstatus/sfcb"
     on_machine -r korva-osstatus-provider
@@ -147,52 +151,47 @@ PurgeForgetsWhereObjectManagersWere() {
 }
 
 UpgradeKeepsTheBareProvider() {
-    set_up_machine
     with_sfcb
-    on_machine -i "$(package provider)"
+    install provider
     register_on_machine --bare
-    later_provider
-    on_machine -i "$work/later.deb"
+    install_later_provider
     expect_text "provider: OperatingSystemProvider" "$(cat "$machine/var/lib/sfcb/stage/regs/korva-osstatus.reg")"
 }
 
 RemovalOfTheCompanionKeepsTheProviderRegistered() {
-    set_up_machine
     with_sfcb
     install_all
     forget_calls
     on_machine -r korva-osstatus-companion
-    expect_equal "what sfcb was told" "sfcbunstage -r korva-osstatus-companion.reg
-sfcbrepos -f" "$(calls)"
+    expect_told "sfcbunstage -r korva-osstatus-companion.reg
+sfcbrepos -f"
     expect_equal "what is staged" korva-osstatus.reg "$(ls "$machine/var/lib/sfcb/stage/regs")"
 }
 
 RemovalSurvivesAFailingObjectManager() {
-    set_up_machine
     with_sfcb
     install_all
     echo "disk full" >"$machine/usr/fail/sfcbunstage"
-    on_machine -P korva-osstatus-tools korva-osstatus-dev korva-osstatus-companion korva-osstatus-provider
+    remove_all -P
     expect_text "sfcbunstage failed with exit status 3" "$output"
     [ ! -e "$machine/usr/sbin/korva-osstatus-register" ] || fail "the command is still there"
 }
 
-# The provider's package as a later version.
-later_provider() {
+# Installs the provider's package as a later version.
+install_later_provider() {
     dpkg-deb -R "$(package provider)" "$work/later"
     sed -i 's/^Version: .*/Version: 1.0.1-1/' "$work/later/DEBIAN/control"
     dpkg-deb --root-owner-group -b "$work/later" "$work/later.deb" >/dev/null
+    on_machine -i "$work/later.deb"
 }
 
 UpgradeRegistersAgainAndUnregistersNothing() {
-    set_up_machine
     with_sfcb
-    on_machine -i "$(package provider)"
+    install provider
     forget_calls
-    later_provider
-    on_machine -i "$work/later.deb"
-    expect_equal "what sfcb was told" "sfcbstage -r korva-osstatus.reg
-sfcbrepos -f" "$(calls)"
+    install_later_provider
+    expect_told "sfcbstage -r korva-osstatus.reg
+sfcbrepos -f"
     expect_equal "the state of the provider" installed "$(state_of provider)"
 }
 
@@ -200,26 +199,22 @@ sfcbrepos -f" "$(calls)"
 register_on_machine() { expect_success as_root chroot "$machine" /usr/sbin/korva-osstatus-register "$@" register; }
 
 UpgradeKeepsTheNamespaceThatTheClassesAreIn() {
-    set_up_machine
     with_sfcb
-    on_machine -i "$(package provider)"
+    install provider
     register_on_machine --namespace root/other
     forget_calls
-    later_provider
-    on_machine -i "$work/later.deb"
-    expect_equal "what sfcb was told" "sfcbstage -n root/other -r korva-osstatus.reg
-sfcbrepos -f" "$(calls)"
+    install_later_provider
+    expect_told "sfcbstage -n root/other -r korva-osstatus.reg
+sfcbrepos -f"
     forget_calls
     on_machine -r korva-osstatus-provider
-    expect_equal "what sfcb was told" "sfcbunstage -n root/other -r korva-osstatus.reg
-sfcbrepos -f" "$(calls)"
+    expect_told "sfcbunstage -n root/other -r korva-osstatus.reg
+sfcbrepos -f"
 }
 
 UpgradeKeepsAChangedRotation() {
-    set_up_machine
-    on_machine -i "$(package provider)"
+    install provider
     echo "# ours" >>"$machine/etc/logrotate.d/korva-osstatus"
-    later_provider
-    on_machine -i "$work/later.deb"
+    install_later_provider
     expect_text "# ours" "$(cat "$machine/etc/logrotate.d/korva-osstatus")"
 }

@@ -29,6 +29,17 @@ stand_in() {
     for name in "$@"; do cp stand-in "$managers/bin/$name"; done
 }
 
+# fails COMMAND TEXT, half COMMAND TEXT, says COMMAND TEXT: how a stand-in does its work from now on.
+behaves() {
+    manner=$1
+    name=$2
+    shift 2
+    echo "$*" >"$managers/$manner/$name"
+}
+fails() { behaves fail "$@"; }
+half() { behaves half "$@"; }
+says() { behaves says "$@"; }
+
 with_sfcb() { stand_in sfcbstage sfcbunstage sfcbrepos; }
 with_running() {
     stand_in "$1"
@@ -55,7 +66,7 @@ register() {
     capture env -i PATH="$path" TMPDIR="$temporary" "$tree/sbin/korva-osstatus-register" "$@"
 }
 
-expect_code() { [ "$code" -eq "$1" ] || fail "status $code, not $1: $output"; }
+expect_code() { [ "$code" -eq "$1" ] || fail "${row:-}status $code, not $1: $output"; }
 
 # The recorded calls, with names for the folders, and nothing of what only asks.
 calls() {
@@ -65,6 +76,40 @@ calls() {
 
 forget_calls() { : >"$managers/calls"; }
 
-expect_calls() { expect_equal "what the object manager was told" "$1" "$(calls)"; }
+expect_calls() { expect_equal "${row:-}what the object manager was told" "$1" "$(calls)"; }
+
+# Nothing is registered, runs or fails any more.
+start_afresh() {
+    rm -rf "${managers:?}/var" "${tree:?}/var" "$managers/active" "$managers/modules" "$managers/registration.mof"
+    rm -f "$managers"/fail/* "$managers"/half/* "$managers"/says/*
+    for name in systemctl service pgrep pidof; do rm -f "$managers/bin/$name"; done
+    forget_calls
+}
+start_again() { start_afresh; }
+
+# expect_told WORDS: the calls that they stand for in the tables of a script.
+expect_told() { expect_calls "$(for word in $1; do call_named "$word"; done)"; }
+
+# expect_rows TABLE: each line has what is done before, the arguments, the status, what the object manager
+# is told, and texts of the output.
+expect_rows() {
+    "$1" >"$work/rows"
+    while IFS='|' read -r before arguments status words texts <&3; do
+        row="'$before' '$arguments': "
+        start_again
+        eval "$before"
+        # Options, without blanks in them.
+        # shellcheck disable=SC2086
+        register $arguments
+        expect_code "$status"
+        expect_told "$words"
+        while [ -n "$texts" ]; do
+            expect_text "${texts%%|*}" "$output"
+            case $texts in *'|'*) texts=${texts#*|} ;; *) texts= ;; esac
+        done
+    done 3<"$work/rows"
+    row=
+    start_again
+}
 
 prepare

@@ -86,3 +86,15 @@ ScriptsOfPackagesSurviveAFailingCommand() {
         expect_success env PATH="$work/bin:$PATH" "$work/$name/prerm" remove
     done
 }
+
+PackageOfTheHostHasTheNoticesOfWhatIsInIt() {
+    dpkg-deb -x "$(package tools)" "$work/tools"
+    documents=$work/tools/usr/share/doc
+    for notices in "$documents/korva-osstatus-tools/copyright" "$documents/korva-osstatus/copyright.cmpihost"; do
+        for line in "the OperatingSystemProvider authors" "University of Cincinnati" "Niels Lohmann" \
+            "Florian Loitsch" "Bjoern Hoehrmann" "License: BSD-3-clause" "License: Expat" \
+            "Redistributions in binary form" "The above copyright notice and this permission notice"; do
+            expect_text "$line" "$(cat "$notices")"
+        done
+    done
+}

@@ -4,57 +4,75 @@
 . ./managers.sh
 with_pegasus
 
-provider_mofs="SHARE/schema/KORVA_OperatingSystem.mof SHARE/schema/KORVA_OperatingSystemCapabilities.mof\
- SHARE/schema/KORVA_InstalledOS.mof SHARE/schema/KORVA_RunningOS.mof SHARE/schema/KORVA_OSElementCapabilities.mof"
-companion_mof=SHARE/schema/KORVA_ComputerSystem.mof
-provider_registration=SHARE/registration/korva-osstatus-pegasus.mof
-companion_registration=SHARE/registration/korva-osstatus-companion-pegasus.mof
-
-CompilesClassesAndRegistrations() {
-    register register
-    expect_code 0
-    expect_calls "cimmof -uc -n root/cimv2 $companion_mof
-cimmof -uc -n root/PG_InterOp $companion_registration
-cimmof -uc -n root/cimv2 $provider_mofs
-cimmof -uc -n root/PG_InterOp $provider_registration"
+# The call that a word of a table stands for; "offline-" for the compiler of a stopped server, "interop-"
+# and "elsewhere-" for other namespaces.
+call_named() {
+    provider="KORVA_OperatingSystem KORVA_OperatingSystemCapabilities KORVA_InstalledOS KORVA_RunningOS\
+ KORVA_OSElementCapabilities"
+    case $1 in
+        classes) echo "cimmof -uc -n root/cimv2" "$(echo "$provider" | sed 's|KORVA[^ ]*|SHARE/schema/&.mof|g')" ;;
+        classes-companion) echo "cimmof -uc -n root/cimv2 SHARE/schema/KORVA_ComputerSystem.mof" ;;
+        registration) echo "cimmof -uc -n root/PG_InterOp SHARE/registration/korva-osstatus-pegasus.mof" ;;
+        registration-companion)
+            echo "cimmof -uc -n root/PG_InterOp SHARE/registration/korva-osstatus-companion-pegasus.mof" ;;
+        disable) echo "cimprovider -d -m KorvaOSStatusModule" ;;
+        remove) echo "cimprovider -r -m KorvaOSStatusModule" ;;
+        disable-companion | remove-companion) call_named "${1%-companion}" | sed 's/OSStatus/ComputerSystem/' ;;
+        offline-*) call_named "${1#offline-}" | sed 's/^cimmof/cimmofl/' ;;
+        interop-*) call_named "${1#interop-}" | sed 's|root/PG_InterOp|root/interop|' ;;
+        elsewhere-*) call_named "${1#elsewhere-}" | sed 's|root/cimv2|root/korva|; s|SHARE/registration|TMP|' ;;
+    esac
 }
 
-ReplacesAFormerRegistration() {
-    register --only-companion register
-    forget_calls
-    register --only-companion register
-    expect_code 0
-    expect_calls "cimmof -uc -n root/cimv2 $companion_mof
-cimprovider -d -m KorvaComputerSystemModule
-cimprovider -r -m KorvaComputerSystemModule
-cimmof -uc -n root/PG_InterOp $companion_registration"
+registered() { register "$@" register && forget_calls; }
+has_module() { echo "$1    $2" >"$managers/modules"; }
+
+# Each line: what is done before, the operation, its status, what OpenPegasus is told, and texts of the
+# output.
+registrations() {
+    cat <<'EOF'
+|register|0|classes-companion registration-companion classes registration
+registered --only-companion|--only-companion register|0|classes-companion disable-companion remove-companion registration-companion
+|--only-companion --interop root/interop register|0|classes-companion interop-registration-companion
+|--only-companion --namespace root/korva register|0|elsewhere-classes-companion elsewhere-registration-companion
+says cimmof Warning: KORVA_ComputerSystem: not updated, same Version|--only-companion register|0|classes-companion registration-companion|    cimmof: Warning: KORVA_ComputerSystem: not updated, same Version
+registered|unregister|0|disable-companion remove-companion disable remove|OpenPegasus: the classes of the provider stay in root/cimv2
+has_module KorvaOSStatusModule Stopped|--without-companion unregister|0|disable remove
+has_module KorvaOSStatusModule2 OK|unregister|0||OpenPegasus: the provider is not registered
+EOF
+}
+
+RegistersWhatItIsToldTo() {
+    expect_rows registrations
+    for module in "KorvaOSStatusModule    OK" "KorvaOSStatusModule    Stopped"; do
+        echo "$module" >"$managers/modules"
+        register --without-companion unregister
+        expect_equal "the modules that are left" "" "$(cat "$managers/modules")"
+    done
+}
+
+registrations_with_a_stopped_server() {
+    cat <<'EOF'
+|--only-companion register|0|offline-classes-companion offline-registration-companion|OpenPegasus: cimserver does not answer; its repository is written to directly
+fails cimmofl CIM_ERR_ALREADY_EXISTS: PG_ProviderModule|--only-companion register|0|offline-classes-companion offline-registration-companion|OpenPegasus: root/PG_InterOp holds this already, and it stays as it is
+half cimmofl CIM_ERR_FAILED: broken|--without-companion register|1|offline-classes offline-registration|once cimserver runs, see whether KorvaOSStatusModule is left: cimprovider -l|and take it out: cimprovider -r -m KorvaOSStatusModule
+|unregister|1||OpenPegasus forgets a provider only while it runs|start cimserver and unregister again
+rm "$managers/bin/cimmofl"|register|1||cimserver does not answer, and cimmofl|start cimserver and register again
+EOF
 }
 
 WritesToTheRepositoryOfAStoppedServer() {
-    server_is_stopped
-    register --only-companion register
-    expect_code 0
-    expect_calls "cimmofl -uc -n root/cimv2 $companion_mof
-cimmofl -uc -n root/PG_InterOp $companion_registration"
-    expect_text "OpenPegasus: cimserver does not answer; its repository is written to directly" "$output"
+    start_again() { start_afresh && server_is_stopped; }
+    expect_rows registrations_with_a_stopped_server
 }
 
-TakesARegistrationThatAStoppedServerHasForDone() {
-    server_is_stopped
-    echo "CIM_ERR_ALREADY_EXISTS: PG_ProviderModule" >"$managers/fail/cimmofl"
-    register --only-companion register
-    expect_code 0
-    expect_text "OpenPegasus: root/PG_InterOp holds this already, and it stays as it is" "$output"
-}
-
-SaysThatAStoppedServerNeedsItsOtherCompiler() {
-    server_is_stopped
-    rm "$managers/bin/cimmofl"
-    register register
+TakesOutWhatAFailedRegistrationLeft() {
+    half cimmof CIM_ERR_FAILED: broken
+    register --without-companion register
     expect_code 1
-    expect_calls ""
-    expect_text "cimserver does not answer, and cimmofl" "$output"
-    expect_text "start cimserver and register again" "$output"
+    expect_calls "$(for word in classes registration disable remove; do call_named $word; done)"
+    expect_equal "the modules that are left" "" "$(cat "$managers/modules")"
+    expect_text "what it left of the provider is taken out; the provider is not registered" "$output"
 }
 
 # Each line: what the compiler says of its failure, and the way out.
@@ -80,34 +98,6 @@ SpeaksOfTheNamespaceOnlyWhereItIsTheCause() {
         [ "$said" = "${said#*NAMESPACE}" ] || continue
         expect_no_text "namespace" "$output"
     done <"$work/failures"
-}
-
-ShowsWhatTheCompilerSaysThoughItDidItsWork() {
-    echo "Warning: KORVA_ComputerSystem: not updated, same Version" >"$managers/says/cimmof"
-    register --only-companion register
-    expect_code 0
-    expect_text "    cimmof: Warning: KORVA_ComputerSystem: not updated, same Version" "$output"
-}
-
-TakesOutWhatAFailedRegistrationLeft() {
-    echo "CIM_ERR_FAILED: broken" >"$managers/half/cimmof"
-    register --without-companion register
-    expect_code 1
-    expect_calls "cimmof -uc -n root/cimv2 $provider_mofs
-cimmof -uc -n root/PG_InterOp $provider_registration
-cimprovider -d -m KorvaOSStatusModule
-cimprovider -r -m KorvaOSStatusModule"
-    expect_equal "the modules that are left" "" "$(cat "$managers/modules")"
-    expect_text "what it left of the provider is taken out; the provider is not registered" "$output"
-}
-
-TellsHowToTakeOutWhatAFailedRegistrationLeftInAStoppedServer() {
-    server_is_stopped
-    echo "CIM_ERR_FAILED: broken" >"$managers/half/cimmofl"
-    register --without-companion register
-    expect_code 1
-    expect_text "once cimserver runs, see whether KorvaOSStatusModule is left: cimprovider -l" "$output"
-    expect_text "and take it out: cimprovider -r -m KorvaOSStatusModule" "$output"
 }
 
 # Each line: what is registered after a registration, and its options.
@@ -136,52 +126,4 @@ RegistersTheFacadeOrTheBareProvider() {
     expect_text 'Location = "korzbosstatusprofileprovider";' "$(cat "$managers/registration.mof")"
     register --without-companion unregister
     expect_equal "the modules" "" "$(cat "$managers/modules")"
-}
-
-UsesTheInteropNamespaceThatIsNamed() {
-    register --only-companion --interop root/interop register
-    expect_calls "cimmof -uc -n root/cimv2 $companion_mof
-cimmof -uc -n root/interop $companion_registration"
-}
-
-WritesAnotherNamespaceIntoTheRegistration() {
-    register --only-companion --namespace root/korva register
-    expect_calls "cimmof -uc -n root/korva $companion_mof
-cimmof -uc -n root/PG_InterOp TMP/korva-osstatus-companion-pegasus.mof"
-}
-
-RemovesTheModulesOnUnregistration() {
-    register register
-    forget_calls
-    register unregister
-    expect_code 0
-    expect_calls "cimprovider -d -m KorvaComputerSystemModule
-cimprovider -r -m KorvaComputerSystemModule
-cimprovider -d -m KorvaOSStatusModule
-cimprovider -r -m KorvaOSStatusModule"
-    expect_equal "the modules that are left" "" "$(cat "$managers/modules")"
-    expect_text "OpenPegasus: the classes of the provider stay in root/cimv2" "$output"
-}
-
-RemovesAModuleThatIsDisabledAlready() {
-    echo "KorvaOSStatusModule    Stopped" >"$managers/modules"
-    register --without-companion unregister
-    expect_code 0
-    expect_equal "the modules that are left" "" "$(cat "$managers/modules")"
-}
-
-LeavesModulesOfSimilarNamesAlone() {
-    echo "KorvaOSStatusModule2    OK" >"$managers/modules"
-    register unregister
-    expect_code 0
-    expect_calls ""
-    expect_text "OpenPegasus: the provider is not registered" "$output"
-}
-
-CannotUnregisterWhileTheServerIsStopped() {
-    server_is_stopped
-    register unregister
-    expect_code 1
-    expect_text "OpenPegasus forgets a provider only while it runs" "$output"
-    expect_text "start cimserver and unregister again" "$output"
 }

@@ -4,70 +4,94 @@
 . ./managers.sh
 with_sfcb
 
-provider_mofs="SHARE/schema/KORVA_OperatingSystem.mof SHARE/schema/KORVA_OperatingSystemCapabilities.mof\
- SHARE/schema/KORVA_InstalledOS.mof SHARE/schema/KORVA_RunningOS.mof SHARE/schema/KORVA_OSElementCapabilities.mof"
-stage_provider="sfcbstage -n root/cimv2 -r SHARE/registration/korva-osstatus.reg $provider_mofs"
-stage_companion="sfcbstage -n root/cimv2 -r SHARE/registration/korva-osstatus-companion.reg\
- SHARE/schema/KORVA_ComputerSystem.mof"
-unstage_provider="sfcbunstage -n root/cimv2 -r korva-osstatus.reg KORVA_OperatingSystem.mof\
- KORVA_OperatingSystemCapabilities.mof KORVA_InstalledOS.mof KORVA_RunningOS.mof KORVA_OSElementCapabilities.mof"
-unstage_companion="sfcbunstage -n root/cimv2 -r korva-osstatus-companion.reg KORVA_ComputerSystem.mof"
-
-
-# The same calls for another namespace.
-elsewhere() { printf '%s\n' "$1" | sed "s|-n root/cimv2|-n root/other|; s|SHARE/registration/|TMP/|"; }
+# The call that a word of a table stands for; with "elsewhere-" before it, for another namespace.
+call_named() {
+    provider="KORVA_OperatingSystem.mof KORVA_OperatingSystemCapabilities.mof KORVA_InstalledOS.mof\
+ KORVA_RunningOS.mof KORVA_OSElementCapabilities.mof"
+    case $1 in
+        stage) echo "sfcbstage -n root/cimv2 -r SHARE/registration/korva-osstatus.reg" \
+            "$(echo "$provider" | sed 's|KORVA|SHARE/schema/&|g')" ;;
+        stage-companion) echo "sfcbstage -n root/cimv2 -r SHARE/registration/korva-osstatus-companion.reg" \
+            "SHARE/schema/KORVA_ComputerSystem.mof" ;;
+        unstage) echo "sfcbunstage -n root/cimv2 -r korva-osstatus.reg $provider" ;;
+        unstage-companion) echo "sfcbunstage -n root/cimv2 -r korva-osstatus-companion.reg KORVA_ComputerSystem.mof" ;;
+        repository) echo "sfcbrepos -f" ;;
+        elsewhere-*) call_named "${1#elsewhere-}" |
+            sed "s|-n root/cimv2|-n root/other|; s|SHARE/registration/|TMP/|" ;;
+        *) echo "$1" | tr '_' ' ' ;;
+    esac
+}
 
 staged() { ls "$managers/var/lib/sfcb/stage/regs"; }
+classes_in() { ls "$managers/var/lib/sfcb/stage/mofs/$1"; }
+registered() { register "$@" register && forget_calls; }
 
-StagesTheClassesAndBuildsTheRepository() {
-    register --without-companion register
-    expect_code 0
-    expect_calls "$stage_provider
-sfcbrepos -f"
+# Each line: what is done before, the operation, its status, what sfcb is told, and texts of the output.
+registrations() {
+    cat <<'EOF'
+|--without-companion register|0|stage repository
+|register|0|stage-companion stage repository
+|--only-companion register|0|stage-companion repository
+registered|register|0|stage-companion stage repository
+registered|unregister|0|unstage-companion unstage repository
+|unregister|0||sfcb: the provider is not registered
+without_companion|register|0|stage repository
+EOF
 }
 
-RegistersAnInstalledCompanionFirst() {
-    register register
-    expect_code 0
-    expect_calls "$stage_companion
-$stage_provider
-sfcbrepos -f"
+RegistersWhatItIsToldTo() { expect_rows registrations; }
+
+restarts() {
+    cat <<'EOF'
+with_running systemctl sfcb.service|--without-companion register|0|stage repository|sfcb: the broker must be restarted before this takes effect
+with_running systemctl sfcb.service|--without-companion --restart register|0|stage repository systemctl_restart_sfcb.service
+with_running systemctl sblim-sfcb.service|--only-companion --restart register|0|stage-companion repository systemctl_restart_sblim-sfcb.service
+with_running service sfcb|--only-companion --restart register|0|stage-companion repository service_sfcb_restart
+with_running systemctl other.service|--only-companion --restart register|0|stage-companion repository|sfcb: no running broker was found; it reads this when it is started
+with_running pgrep sfcbd|--only-companion --restart register|3|stage-companion repository|sfcbd runs, but not as a service|stop it and start it again; everything else is done
+with_running pidof sfcbd|--only-companion --restart register|3|stage-companion repository|sfcbd runs, but not as a service|stop it and start it again; everything else is done
+with_running pidof sfcbd; fails sfcbrepos disk full|--only-companion --restart register|1|stage-companion repository unstage-companion
+with_running systemctl sfcb.service; fails systemctl sfcb.service is masked|--restart register|1|stage-companion stage repository systemctl_restart_sfcb.service|systemctl restart sfcb.service failed with exit status 3|    sfcb.service is masked|restart the broker by hand
+EOF
 }
 
-PassesOverACompanionThatIsNotInstalled() {
-    without_companion
-    register register
-    expect_code 0
-    expect_calls "$stage_provider
-sfcbrepos -f"
+RestartsARunningBrokerOnRequest() { expect_rows restarts; }
+
+failures() {
+    cat <<'EOF'
+fails sfcbrepos CIM_ManagedElement is unknown|--without-companion register|1|stage repository unstage|sfcbrepos failed with exit status 3|    CIM_ManagedElement is unknown|the broker keeps its former repository; mend what sfcbrepos names
+fails sfcbstage cannot write to the stage|--without-companion register|1|stage|sfcbstage failed with exit status 3|    cannot write to the stage|mend what it names and register again
+EOF
 }
 
-RegistersTheCompanionAlone() {
-    register --only-companion register
-    expect_code 0
-    expect_calls "$stage_companion
-sfcbrepos -f"
+NamesTheCommandThatFailsAndTheWayOut() { expect_rows failures; }
+
+moves() {
+    cat <<'EOF'
+registered --without-companion --namespace root/other|--without-companion unregister|0|elsewhere-unstage repository
+registered --without-companion --namespace root/other|--without-companion register|0|elsewhere-stage repository
+registered --without-companion --namespace root/other|--without-companion --namespace root/cimv2 register|0|elsewhere-unstage stage repository|sfcb: the provider moves from root/other to root/cimv2
+registered --without-companion; fails sfcbrepos root/other is unknown|--without-companion --namespace root/other register|1|unstage elsewhere-stage repository elsewhere-unstage stage
+EOF
 }
 
-RegistersAgainWithoutComplaint() {
-    register register
-    forget_calls
-    register register
-    expect_code 0
-    expect_calls "$stage_companion
-$stage_provider
-sfcbrepos -f"
-}
-
-UnregistersWhatItRegistered() {
-    register register
-    forget_calls
-    register unregister
-    expect_code 0
-    expect_calls "$unstage_companion
-$unstage_provider
-sfcbrepos -f"
+KnowsTheNamespaceThatItIsIn() {
+    expect_rows moves
+    register --without-companion --namespace root/other register
+    register --without-companion --namespace root/cimv2 register
+    expect_equal "the classes that are left" "" "$(classes_in root/other)"
+    register --without-companion unregister
     expect_equal "what is staged" "" "$(staged)"
+    expect_equal "the classes" "" "$(classes_in root/cimv2)"
+}
+
+StaysWhereItIsWhenAClassCannotBeRead() {
+    registered --without-companion
+    rm "$tree/share/korva-osstatus/schema/KORVA_RunningOS.mof"
+    register --without-companion --namespace root/other register
+    expect_code 1
+    expect_calls ""
+    expect_equal "what is staged" korva-osstatus.reg "$(staged)"
 }
 
 UnregistersTheCompanionAlone() {
@@ -75,110 +99,17 @@ UnregistersTheCompanionAlone() {
     register --only-companion unregister
     expect_code 0
     expect_equal "what is staged" korva-osstatus.reg "$(staged)"
-}
-
-UnregistersNothingWhereNothingIsRegistered() {
     register unregister
-    expect_code 0
-    expect_calls ""
-    expect_text "sfcb: the provider is not registered" "$output"
-}
-
-SaysThatTheBrokerMustBeRestarted() {
-    with_running systemctl sfcb.service
-    register --without-companion register
-    expect_calls "$stage_provider
-sfcbrepos -f"
-    expect_text "sfcb: the broker must be restarted before this takes effect" "$output"
-}
-
-RestartsARunningServiceOnRequest() {
-    with_running systemctl sfcb.service
-    register --without-companion --restart register
-    expect_code 0
-    expect_calls "$stage_provider
-sfcbrepos -f
-systemctl restart sfcb.service"
-}
-
-RestartsTheServiceByItsOtherName() {
-    with_running systemctl sblim-sfcb.service
-    register --only-companion --restart register
-    expect_calls "$stage_companion
-sfcbrepos -f
-systemctl restart sblim-sfcb.service"
-}
-
-RestartsAServiceOfAnInitScript() {
-    with_running service sfcb
-    register --only-companion --restart register
-    expect_calls "$stage_companion
-sfcbrepos -f
-service sfcb restart"
-}
-
-RestartsNothingThatDoesNotRun() {
-    with_running systemctl other.service
-    register --only-companion --restart register
-    expect_code 0
-    expect_calls "$stage_companion
-sfcbrepos -f"
-    expect_text "sfcb: no running broker was found; it reads this when it is started" "$output"
-}
-
-TellsOfABrokerThatOnlyItsStarterCanRestart() {
-    for tool in pgrep pidof; do
-        with_running "$tool" sfcbd
-        register --only-companion --restart register
-        expect_code 3
-        expect_text "sfcbd runs, but not as a service" "$output"
-        expect_text "stop it and start it again; everything else is done" "$output"
-        rm "$managers/bin/$tool"
-    done
-    echo "disk full" >"$managers/fail/sfcbrepos"
-    register --only-companion --restart register
-    expect_code 1
-}
-
-FailsWhenTheRestartFails() {
-    with_running systemctl sfcb.service
-    echo "sfcb.service is masked" >"$managers/fail/systemctl"
-    register --restart register
-    expect_code 1
-    expect_text "systemctl restart sfcb.service failed with exit status 3" "$output"
-    expect_text "    sfcb.service is masked" "$output"
-    expect_text "restart the broker by hand" "$output"
-}
-
-TakesBackWhatItStagedWhenTheRepositoryCannotBeBuilt() {
-    echo "CIM_ManagedElement is unknown" >"$managers/fail/sfcbrepos"
-    register --without-companion register
-    expect_code 1
-    expect_calls "$stage_provider
-sfcbrepos -f
-$unstage_provider"
-    expect_text "sfcbrepos failed with exit status 3" "$output"
-    expect_text "    CIM_ManagedElement is unknown" "$output"
-    expect_text "the broker keeps its former repository; mend what sfcbrepos names" "$output"
+    expect_equal "what is staged" "" "$(staged)"
 }
 
 KeepsAnOlderRegistrationWhenTheRepositoryCannotBeBuilt() {
     register register
-    echo "disk full" >"$managers/fail/sfcbrepos"
+    fails sfcbrepos disk full
     register register
     expect_code 1
     expect_equal "what is staged" "korva-osstatus-companion.reg
 korva-osstatus.reg" "$(staged)"
-}
-
-NamesTheCommandThatFailsAndTheWayOut() {
-    echo "cannot write to the stage" >"$managers/fail/sfcbstage"
-    register --without-companion register
-    expect_code 1
-    expect_calls "$stage_provider"
-    expect_text "sfcbstage failed with exit status 3" "$output"
-    expect_text "    cannot write to the stage" "$output"
-    expect_text "mend what it names and register again" "$output"
 }
 
 WritesAnotherNamespaceIntoTheRegistration() {
@@ -192,63 +123,6 @@ sfcbrepos -f"
    type: instance
    namespace: root/korva
 #" "$(cat "$managers/var/lib/sfcb/stage/regs/korva-osstatus-companion.reg")"
-}
-
-classes_in() { ls "$managers/var/lib/sfcb/stage/mofs/$1"; }
-
-UnregistersFromTheNamespaceThatItIsIn() {
-    register --without-companion --namespace root/other register
-    forget_calls
-    register --without-companion unregister
-    expect_code 0
-    expect_calls "$(elsewhere "$unstage_provider")
-sfcbrepos -f"
-    expect_equal "what is staged" "" "$(staged)"
-    expect_equal "the classes" "" "$(classes_in root/other)"
-}
-
-RegistersAgainInTheNamespaceThatItIsIn() {
-    register --without-companion --namespace root/other register
-    forget_calls
-    register --without-companion register
-    expect_code 0
-    expect_calls "$(elsewhere "$stage_provider")
-sfcbrepos -f"
-}
-
-MovesToTheNamespaceThatIsNamed() {
-    register --without-companion --namespace root/other register
-    forget_calls
-    register --without-companion --namespace root/cimv2 register
-    expect_code 0
-    expect_calls "$(elsewhere "$unstage_provider")
-$stage_provider
-sfcbrepos -f"
-    expect_text "sfcb: the provider moves from root/other to root/cimv2" "$output"
-    expect_equal "the classes" "" "$(classes_in root/other)"
-}
-
-MovesBackWhenTheRepositoryCannotBeBuilt() {
-    register --without-companion register
-    forget_calls
-    echo "root/other is unknown" >"$managers/fail/sfcbrepos"
-    register --without-companion --namespace root/other register
-    expect_code 1
-    expect_calls "$unstage_provider
-$(elsewhere "$stage_provider")
-sfcbrepos -f
-$(elsewhere "$unstage_provider")
-$stage_provider"
-}
-
-StaysWhereItIsWhenAClassCannotBeRead() {
-    register --without-companion register
-    forget_calls
-    rm "$tree/share/korva-osstatus/schema/KORVA_RunningOS.mof"
-    register --without-companion --namespace root/other register
-    expect_code 1
-    expect_calls ""
-    expect_equal "what is staged" korva-osstatus.reg "$(staged)"
 }
 
 # What is staged of the provider: its name and its library.
@@ -291,7 +165,7 @@ RegistersTheFacadeOrTheBareProvider() {
 
 BareStaysWhenTheRepositoryCannotBeBuiltWithTheFacade() {
     register --without-companion --bare register
-    echo "disk full" >"$managers/fail/sfcbrepos"
+    fails sfcbrepos disk full
     register --without-companion register
     expect_code 1
     expect_equal "what is staged" "OperatingSystemProvider korzbosstatusprofileprovider" "$(staged_provider)"
