@@ -37,16 +37,6 @@ struct BrokerOptions {
     static BrokerOptions sparse() { return {Shape::Sparse}; }
 };
 
-/// What a provider wrote with logMessage (severity) or trace (level).
-struct LogRecord {
-    enum class Channel { Log, Trace };
-    Channel channel = Channel::Log;
-    int severity = 0;
-    /// The id of a message or the component of a trace.
-    std::string id{};
-    std::string text{};
-};
-
 /// What a service answers to an up-call.
 struct UpcallAnswer : OperationResult {
     /// For enumerations: the k-th getNext (from 1) fails with `failRc`; 0: none.
@@ -95,8 +85,6 @@ class Broker {
     /// What the broker caught since the start or the last take, in order, one line each.
     std::vector<std::string> violations() const;
     std::vector<std::string> takeViolations();
-    /// What providers logged and traced since the start or the last take, in order.
-    std::vector<LogRecord> takeLogRecords();
 
     /// Clones that no provider has released yet.
     std::size_t unreleasedClones() const;

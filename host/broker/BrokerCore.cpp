@@ -131,19 +131,9 @@ void BrokerCore::report(std::string violation) noexcept {
     }
 }
 
-void BrokerCore::log(LogRecord record) {
-    const std::lock_guard<std::mutex> lock(findingsMutex_);
-    log_.push_back(std::move(record));
-}
-
 std::vector<std::string> BrokerCore::violations(bool take) {
     const std::lock_guard<std::mutex> lock(findingsMutex_);
     return take ? std::exchange(violations_, {}) : violations_;
-}
-
-std::vector<LogRecord> BrokerCore::takeLogRecords() {
-    const std::lock_guard<std::mutex> lock(findingsMutex_);
-    return std::exchange(log_, {});
 }
 
 CMPIrc BrokerCore::inject(FaultPlan& plan, const CallName& call) {
@@ -210,9 +200,6 @@ std::vector<std::string> Broker::violations() const {
 }
 std::vector<std::string> Broker::takeViolations() {
     return core_->violations(true);
-}
-std::vector<LogRecord> Broker::takeLogRecords() {
-    return core_->takeLogRecords();
 }
 std::size_t Broker::unreleasedClones() const {
     return core_->unreleasedClones();

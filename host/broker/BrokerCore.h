@@ -96,7 +96,6 @@ class BrokerCore {
     void quarantine(Objects retired) noexcept { quarantine_.take(std::move(retired)); }
 
     void report(std::string violation) noexcept;
-    void log(LogRecord record);
 
     /// Counts a call and throws Failure if it is to fail. Else the status that it is to report
     /// beside its value, CMPI_RC_OK for its own.
@@ -110,7 +109,6 @@ class BrokerCore {
     UpcallAnswer perform(const OperationRequest& request);
 
     std::vector<std::string> violations(bool take);
-    std::vector<LogRecord> takeLogRecords();
     std::size_t unreleasedClones() const;
     std::size_t quarantined() const { return quarantine_.size(); }
 
@@ -136,7 +134,6 @@ class BrokerCore {
 
     mutable std::mutex findingsMutex_;
     std::vector<std::string> violations_;
-    std::vector<LogRecord> log_;
 
     mutable std::mutex cloneMutex_;
     std::unordered_map<const ObjectBase*, std::unique_ptr<ObjectBase>> clones_;
@@ -150,6 +147,7 @@ class BrokerCore {
 /// The tables of a broker. A sparse one lacks slots.
 CMPIBrokerFT upcallTable(bool sparse);
 CMPIBrokerEncFT factoryTable(bool sparse);
+void bindMessages(CMPIBrokerEncFT& table);
 CMPIBrokerExtFT threadTable(bool sparse);
 CMPIBrokerMemFT memoryTable();
 

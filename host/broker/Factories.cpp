@@ -1,10 +1,10 @@
-// CMPIBrokerEncFT: makes objects, tells about objects of any kind, and takes messages.
+// CMPIBrokerEncFT: makes objects and tells about objects of any kind. A table names the kind of an
+// object, as no other part of a handle can be trusted before it is known.
 #include "host/broker/ClassCatalogue.h"
 #include "host/broker/Conversion.h"
 #include "host/broker/DateTimeText.h"
 
 #include <chrono>
-#include <cstdarg>
 #include <cstring>
 
 namespace cmpihost {
@@ -152,19 +152,15 @@ std::optional<ObjectFacts> asKind(const void* handle, const CallName& call) {
     return ObjectFacts{kindName<Edt>, render(fromHandle(static_cast<const Edt*>(handle), call))};
 }
 
-template <class... Edts>
-ObjectFacts asAnyOf(const void* handle, const CallName& call) {
-    for (const auto look : {&asKind<Edts>...}) {
-        if (const auto found = look(handle, call)) return *found;
-    }
-    refuseForeign(call, "object");
-}
-
 /// Null, retired and foreign pointers are violations and throw Failure.
 ObjectFacts factsOf(const void* handle, const CallName& call) {
     if (handle == nullptr) refuseNull(call, "object");
-    return asAnyOf<CMPIString, CMPIObjectPath, CMPIInstance, CMPIArray, CMPIArgs, CMPIContext,
-                   CMPIDateTime, CMPIEnumeration, CMPIResult>(handle, call);
+    for (const auto look : {&asKind<CMPIString>, &asKind<CMPIObjectPath>, &asKind<CMPIInstance>,
+                            &asKind<CMPIArray>, &asKind<CMPIArgs>, &asKind<CMPIContext>,
+                            &asKind<CMPIDateTime>, &asKind<CMPIEnumeration>, &asKind<CMPIResult>}) {
+        if (const auto found = look(handle, call)) return *found;
+    }
+    refuseForeign(call, "object");
 }
 
 CMPIString* objectText(BrokerCore& core, const CallName& call, const void* object, CMPIStatus*) {
@@ -178,122 +174,6 @@ CMPIBoolean isOfType(BrokerCore& core, const CallName& call, const void* object,
 
 CMPIString* getType(BrokerCore& core, const CallName& call, const void* object, CMPIStatus*) {
     return makeString(core, factsOf(object, call).kind);
-}
-
-/// A text, or the string in its place.
-std::string textOf(const char* text, const CMPIString* string, const CallName& call) {
-    if (text != nullptr) return text;
-    if (string == nullptr) return {};
-    const char* const characters = fromHandle(string, call).body.get();
-    return characters == nullptr ? "" : characters;
-}
-
-template <LogRecord::Channel Channel>
-CMPIStatus record(BrokerCore& core, const CallName& call, int severity, const char* id,
-                  const char* text, const CMPIString* string) {
-    core.log({Channel, severity, id == nullptr ? "" : id, textOf(text, string, call)});
-    return statusOf(CMPI_RC_OK);
-}
-
-/// There are no message files: texts come from the provider's defaults.
-CMPIStatus openMessageFile(BrokerCore&, const char*, CMPIMsgFileHandle* handle) {
-    if (handle != nullptr) *handle = nullptr;
-    return statusOf(CMPI_RC_ERR_NOT_SUPPORTED);
-}
-
-std::string textOrNull(const char* text) {
-    return text == nullptr ? "NULL" : text;
-}
-
-/// Small integers come widened to int, as C passes them.
-std::string messageArgument(CMPIType type, std::va_list& arguments, const CallName& call) {
-    switch (type) {
-        case CMPI_sint8:
-        case CMPI_sint16:
-        case CMPI_sint32:
-            return std::to_string(va_arg(arguments, int));
-        case CMPI_uint8:
-        case CMPI_uint16:
-        case CMPI_uint32:
-        case CMPI_char16:
-            return std::to_string(va_arg(arguments, unsigned int));
-        case CMPI_sint64:
-            return std::to_string(va_arg(arguments, CMPISint64));
-        case CMPI_uint64:
-            return std::to_string(va_arg(arguments, CMPIUint64));
-        case CMPI_real32:
-        case CMPI_real64:
-            return Value::fromReal(va_arg(arguments, double)).toText();
-        case CMPI_boolean:
-            return va_arg(arguments, int) != 0 ? "true" : "false";
-        case CMPI_chars:
-            return textOrNull(va_arg(arguments, const char*));
-        case CMPI_string: {
-            const auto* const string = va_arg(arguments, const CMPIString*);
-            return string == nullptr ? "NULL" : textOrNull(fromHandle(string, call).body.get());
-        }
-        default:
-            throw Failure{CMPI_RC_ERR_INVALID_DATA_TYPE};
-    }
-}
-
-/// The arguments $0 to $9 of a text, from pairs of type and value.
-std::vector<std::string> messageArguments(CMPICount count, std::va_list& arguments,
-                                          const CallName& call) {
-    if (count > 10) throw Failure{CMPI_RC_ERR_INVALID_PARAMETER};
-    std::vector<std::string> result;
-    for (CMPICount i = 0; i < count; ++i) {
-        const auto type = static_cast<CMPIType>(va_arg(arguments, int));
-        result.push_back(messageArgument(type, arguments, call));
-    }
-    return result;
-}
-
-/// The text with every $n replaced by argument n, where there is one.
-std::string expandMessage(const char* text, const std::vector<std::string>& arguments) {
-    std::string result;
-    for (const char* at = text; *at != '\0'; ++at) {
-        const auto index = static_cast<std::size_t>(at[0] == '$' ? at[1] - '0' : -1);
-        if (index < arguments.size()) {
-            result += arguments[index];
-            ++at;
-        } else {
-            result += *at;
-        }
-    }
-    return result;
-}
-
-CMPIString* expanded(const CMPIBroker* broker, const CallName& call, const char* text,
-                     CMPIStatus* status, CMPICount count, std::va_list& arguments) noexcept {
-    return guarded<CMPIString*>(status, [&]() -> CMPIString* {
-        BrokerCore& core = target(broker, call);
-        return reporting<CMPIString*>(core.countCall(call), status, [&] {
-            const char* const message = required(core, text, call, "default message");
-            return makeString(core,
-                              expandMessage(message, messageArguments(count, arguments, call)));
-        });
-    });
-}
-
-CMPIString* getMessage(const CMPIBroker* broker, const char*, const char* text, CMPIStatus* status,
-                       CMPICount count, ...) {
-    std::va_list arguments;
-    va_start(arguments, count);
-    CMPIString* const result =
-        expanded(broker, {"CMPIBrokerEncFT", "getMessage"}, text, status, count, arguments);
-    va_end(arguments);
-    return result;
-}
-
-CMPIString* getMessage2(const CMPIBroker* broker, const char*, CMPIMsgFileHandle, const char* text,
-                        CMPIStatus* status, CMPICount count, ...) {
-    std::va_list arguments;
-    va_start(arguments, count);
-    CMPIString* const result =
-        expanded(broker, {"CMPIBrokerEncFT", "getMessage2"}, text, status, count, arguments);
-    va_end(arguments);
-    return result;
 }
 
 using FT = CMPIBrokerEncFT;
@@ -315,16 +195,10 @@ FT completeTable() {
     bind<&FT::toString, &objectText>(table, "toString");
     bind<&FT::isOfType, &isOfType>(table, "isOfType");
     bind<&FT::getType, &getType>(table, "getType");
-    bind<&FT::logMessage, &record<LogRecord::Channel::Log>>(table, "logMessage");
-    bind<&FT::trace, &record<LogRecord::Channel::Trace>>(table, "trace");
-    table.getMessage = &getMessage;
     bind<&FT::newCMPIError,
          &notSupported<CMPIError*, BrokerCore, Text, Text, Text, CMPIErrorSeverity,
                        CMPIErrorProbableCause, CMPIrc, CMPIStatus*>>(table, "newCMPIError");
-    bind<&FT::openMessageFile, &openMessageFile>(table, "openMessageFile");
-    bind<&FT::closeMessageFile, &notSupported<CMPIStatus, BrokerCore, CMPIMsgFileHandle>>(
-        table, "closeMessageFile");
-    table.getMessage2 = &getMessage2;
+    bindMessages(table);
     return table;
 }
 

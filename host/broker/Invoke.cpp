@@ -144,11 +144,12 @@ Outcome invoke(const ManagementInterfaces& interfaces, Broker& broker,
     outcome.message = messageOf(status);
     scope.end();
     outcome.violations = scope.violations();
-    outcome.doneCount = collector.doneCount();
-    outcome.paths = collector.takePaths();
-    outcome.instances = collector.takeInstances();
-    outcome.refusedPaths = collector.takeRefusedPaths();
-    outcome.refusedInstances = collector.takeRefusedInstances();
+    Results results = collector.take();
+    outcome.doneCount = results.doneCount;
+    outcome.paths = std::move(results.paths);
+    outcome.instances = std::move(results.instances);
+    outcome.refusedPaths = std::move(results.refusedPaths);
+    outcome.refusedInstances = std::move(results.refusedInstances);
     return outcome;
 }
 

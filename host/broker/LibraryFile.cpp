@@ -57,10 +57,6 @@ bool isWhole(std::istream& stream, std::uint64_t fileSize) {
     return true;
 }
 
-LoadError notALibrary(const std::string& file, const std::string& why) {
-    return {LoadProblem::NotALibrary, file + ": " + why};
-}
-
 void examine(const std::string& file) {
     // A name without folder is searched by the loader.
     if (file.find('/') == std::string::npos) return;
@@ -69,24 +65,23 @@ void examine(const std::string& file) {
     std::error_code error;
     const fs::file_status status = fs::status(file, error);
     if (fs::exists(status) && !fs::is_regular_file(status)) {
-        throw notALibrary(file, "not a regular file");
+        throw LoadError(file + ": " + "not a regular file");
     }
     std::ifstream stream(file, std::ios::binary);
     if (!stream) {
         const std::error_code reason(errno, std::generic_category());
-        throw LoadError(LoadProblem::FileMissing, file + ": " + reason.message());
+        throw LoadError(file + ": " + reason.message());
     }
     ElfStart start{};
     const bool isElf = readAt(stream, 0, start) && std::memcmp(start.ident, ELFMAG, SELFMAG) == 0 &&
                        start.type == ET_DYN;
-    if (!isElf) throw notALibrary(file, "not a shared library");
+    if (!isElf) throw LoadError(file + ": " + "not a shared library");
     if (start.ident[EI_CLASS] != ownClass) {
-        throw notALibrary(file, std::string("a ") + (is64Bit ? "32" : "64") +
-                                    "-bit library, this host is " + (is64Bit ? "64" : "32") +
-                                    "-bit");
+        throw LoadError(file + ": " + std::string("a ") + (is64Bit ? "32" : "64") +
+                        "-bit library, this host is " + (is64Bit ? "64" : "32") + "-bit");
     }
     const std::uintmax_t size = fs::file_size(file, error);
-    if (error || !isWhole(stream, size)) throw notALibrary(file, "the file is cut off");
+    if (error || !isWhole(stream, size)) throw LoadError(file + ": " + "the file is cut off");
 }
 
 }  // namespace
@@ -102,10 +97,8 @@ LibraryHandle openLibrary(const std::string& file, bool global) {
         const char* const reason = dlerror();
         const std::string text = reason == nullptr ? "unknown reason" : reason;
         // The loader starts with the file's own name where the file itself is at fault.
-        const bool absent = text.rfind(file + ": cannot open shared object file", 0) == 0;
         const bool named = text.rfind(file + ": ", 0) == 0;
-        throw LoadError(absent ? LoadProblem::FileMissing : LoadProblem::Unresolved,
-                        named ? text : file + ": " + text);
+        throw LoadError(named ? text : file + ": " + text);
     }
     return handle;
 }

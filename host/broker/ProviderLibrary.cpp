@@ -79,8 +79,7 @@ class Factory {
         generic_ = reinterpret_cast<Generic>(dlsym(library, ("_Generic" + suffix).c_str()));
         named_ = reinterpret_cast<Named>(dlsym(library, (provider + suffix).c_str()));
         if (generic_ == nullptr && named_ == nullptr) {
-            throw LoadError(LoadProblem::NoFactory,
-                            file + ": neither _Generic" + suffix + " nor " + provider + suffix);
+            throw LoadError(file + ": neither _Generic" + suffix + " nor " + provider + suffix);
         }
     }
 
@@ -88,12 +87,11 @@ class Factory {
         CMPIStatus status = {CMPI_RC_OK, nullptr};
         MI* const made = callGuarded(broker.cmpi(), context, status);
         if (status.rc != CMPI_RC_OK) {
-            throw LoadError(
-                LoadProblem::FactoryFailed,
-                where_ + " answered status " + std::to_string(status.rc) + messageOf(status));
+            throw LoadError(where_ + " answered status " + std::to_string(status.rc) +
+                            messageOf(status));
         }
-        if (made == nullptr) throw LoadError(LoadProblem::FactoryFailed, where_ + " returned null");
-        if (made->ft == nullptr) throw LoadError(LoadProblem::NoTable, where_ + " gave no table");
+        if (made == nullptr) throw LoadError(where_ + " returned null");
+        if (made->ft == nullptr) throw LoadError(where_ + " gave no table");
         for (const std::string& finding : checkMiTable(*made->ft)) broker.core().report(finding);
         return made;
     }
@@ -108,7 +106,7 @@ class Factory {
             if (generic_ != nullptr) return generic_(broker, context, provider_.c_str(), &status);
             return named_(broker, context, &status);
         } catch (const std::exception& exception) {
-            throw LoadError(LoadProblem::FactoryFailed, where_ + " threw: " + exception.what());
+            throw LoadError(where_ + " threw: " + exception.what());
         }
     }
 

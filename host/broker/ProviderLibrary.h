@@ -12,29 +12,11 @@
 /// A CMPI library, loaded as an object manager loads it.
 namespace cmpihost {
 
-enum class LoadProblem {
-    FileMissing,
-    /// Not a shared library of this machine, or one of the other word size.
-    NotALibrary,
-    /// A library that it needs is missing, or a symbol does not resolve.
-    Unresolved,
-    /// No factory of either name.
-    NoFactory,
-    /// The factory set a status other than CMPI_RC_OK or returned null.
-    FactoryFailed,
-    /// The management interface has no function table.
-    NoTable
-};
-
-/// Why a library could not be loaded; what() is one line that names the file.
+/// Why a library could not be loaded (no library of this process, an unresolved symbol, no factory,
+/// one that failed); what() is one line that names the file.
 class LoadError : public std::runtime_error {
   public:
-    LoadError(LoadProblem problem, const std::string& text)
-        : std::runtime_error(text), problem_(problem) {}
-    LoadProblem problem() const noexcept { return problem_; }
-
-  private:
-    LoadProblem problem_;
+    using std::runtime_error::runtime_error;
 };
 
 struct LoadOptions {

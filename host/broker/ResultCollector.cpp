@@ -5,6 +5,8 @@
 #include "host/broker/Conversion.h"
 #include "host/broker/SchemaCheck.h"
 
+#include <utility>
+
 namespace cmpihost {
 
 /// Makes the calls of one kind fail from the n-th on.
@@ -149,36 +151,13 @@ void ResultCollector::failReturnDone(unsigned from, CMPIrc rc) {
     state_->doneFault = {from, rc, state_->doneFault.calls};
 }
 
-std::size_t ResultCollector::instanceCount() const noexcept {
-    return state_->instances.size();
-}
-const InstanceValue& ResultCollector::instance(std::size_t index) const {
-    return *state_->instances.at(index);
-}
-std::size_t ResultCollector::pathCount() const noexcept {
-    return state_->paths.size();
-}
-const ObjectPathValue& ResultCollector::path(std::size_t index) const {
-    return *state_->paths.at(index);
-}
-const std::vector<Value>& ResultCollector::data() const noexcept {
-    return state_->data;
-}
-unsigned ResultCollector::doneCount() const noexcept {
-    return state_->doneFault.calls;
-}
-
-std::vector<InstanceValue> ResultCollector::takeInstances() {
-    return taken(state_->instances);
-}
-std::vector<ObjectPathValue> ResultCollector::takePaths() {
-    return taken(state_->paths);
-}
-std::vector<InstanceValue> ResultCollector::takeRefusedInstances() {
-    return taken(state_->refusedInstances);
-}
-std::vector<ObjectPathValue> ResultCollector::takeRefusedPaths() {
-    return taken(state_->refusedPaths);
+Results ResultCollector::take() {
+    return {taken(state_->paths),
+            taken(state_->instances),
+            taken(state_->refusedPaths),
+            taken(state_->refusedInstances),
+            std::exchange(state_->data, {}),
+            state_->doneFault.calls};
 }
 
 }  // namespace cmpihost

@@ -11,6 +11,19 @@ namespace cmpihost {
 
 struct ResultState;
 
+/// What a provider returned, in the order in which it came.
+struct Results {
+    std::vector<ObjectPathValue> paths{};
+    std::vector<InstanceValue> instances{};
+    /// Objects whose call was made to fail by a setting of the collector.
+    std::vector<ObjectPathValue> refusedPaths{};
+    std::vector<InstanceValue> refusedInstances{};
+    /// What returnData handed over.
+    std::vector<Value> data{};
+    /// Calls of returnDone, refused ones included.
+    unsigned doneCount = 0;
+};
+
 /// Collects instances and paths in the order in which they come. Its CMPIResult dies with the
 /// request (a later use is a violation); what was collected stays. Used by the thread of its
 /// request.
@@ -30,21 +43,8 @@ class ResultCollector {
     void failReturnObjectPath(unsigned from, CMPIrc rc);
     void failReturnDone(unsigned from, CMPIrc rc);
 
-    std::size_t instanceCount() const noexcept;
-    const InstanceValue& instance(std::size_t index) const;
-    std::size_t pathCount() const noexcept;
-    const ObjectPathValue& path(std::size_t index) const;
-    /// What returnData handed over.
-    const std::vector<Value>& data() const noexcept;
-    /// Calls of returnDone, refused ones included.
-    unsigned doneCount() const noexcept;
-
-    /// Everything at once; moves it out, without a copy once the request has ended.
-    std::vector<InstanceValue> takeInstances();
-    std::vector<ObjectPathValue> takePaths();
-    /// Objects whose call was made to fail by a setting of this collector.
-    std::vector<InstanceValue> takeRefusedInstances();
-    std::vector<ObjectPathValue> takeRefusedPaths();
+    /// Everything so far; moves it out, without a copy once the request has ended.
+    Results take();
 
   private:
     std::shared_ptr<ResultState> state_;

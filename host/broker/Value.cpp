@@ -2,6 +2,7 @@
 // and instances around many times.
 #include "host/broker/Value.h"
 
+#include "base/Ascii.h"
 #include "base/Utf8.h"
 
 #include <algorithm>
@@ -70,7 +71,7 @@ struct SameContent {
 template <class Named>
 const Value* valueNamed(const std::vector<Named>& items, std::string_view name) {
     const auto item = std::find_if(items.begin(), items.end(), [name](const Named& candidate) {
-        return equalNames(candidate.name, name);
+        return base::equalsIgnoreCase(candidate.name, name);
     });
     return item == items.end() ? nullptr : &item->value;
 }
@@ -251,8 +252,9 @@ const Value* InstanceValue::property(std::string_view name) const {
 }
 
 bool operator==(const ObjectPathValue& left, const ObjectPathValue& right) {
-    return equalNames(left.nameSpace, right.nameSpace) &&
-           equalNames(left.className, right.className) && sameSet(left.keys, right.keys);
+    return base::equalsIgnoreCase(left.nameSpace, right.nameSpace) &&
+           base::equalsIgnoreCase(left.className, right.className) &&
+           sameSet(left.keys, right.keys);
 }
 bool operator!=(const ObjectPathValue& left, const ObjectPathValue& right) {
     return !(left == right);

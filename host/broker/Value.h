@@ -1,8 +1,6 @@
 #ifndef HOST_BROKER_VALUE_H
 #define HOST_BROKER_VALUE_H
 
-#include "base/Ascii.h"
-
 #include <cmpi/cmpidt.h>
 
 #include <cstdint>
@@ -18,11 +16,6 @@ namespace cmpihost {
 
 struct ObjectPathValue;
 struct InstanceValue;
-
-/// Whether two CIM names (class, property, key, namespace) are the same.
-inline bool equalNames(std::string_view left, std::string_view right) {
-    return base::equalsIgnoreCase(left, right);
-}
 
 /// The name of a CMPI type as schemas spell it ("uint16", "string[]", "datetime", "ref", "null").
 std::string cimTypeName(CMPIType type);

@@ -1,5 +1,6 @@
 #include <algorithm>
 
+#include "base/Ascii.h"
 #include "facade/FacadeFixture.h"
 
 // The facade beside another association provider, asked in the two ways that object managers have.
@@ -30,10 +31,10 @@ CMPIStatus answer(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* resu
                   const CMPIObjectPath* source, const char* associationClass, Filters...) {
     const CMPIString* const sourceClass = source->ft->getClassName(source, nullptr);
     const char* const name = sourceClass->ft->getCharPtr(sourceClass, nullptr);
-    const bool fromThing = equalNames(name, "TEST_Thing");
-    const bool isTied = associationClass == nullptr || equalNames(associationClass, "TEST_Link") ||
-                        equalNames(associationClass, "CIM_Dependency");
-    if (isTied && (fromThing || equalNames(name, "KORVA_ComputerSystem"))) {
+    const bool fromThing = base::equalsIgnoreCase(name, "TEST_Thing");
+    const bool isTied = associationClass == nullptr || base::equalsIgnoreCase(associationClass, "TEST_Link") ||
+                        base::equalsIgnoreCase(associationClass, "CIM_Dependency");
+    if (isTied && (fromThing || base::equalsIgnoreCase(name, "KORVA_ComputerSystem"))) {
         const CMPIObjectPath* const path = what == What::link ? linkPath("TEST_Link", "link")
                                            : fromThing ? linkPath("KORVA_ComputerSystem", "host1")
                                                        : linkPath("TEST_Thing", "thing");

@@ -6,6 +6,7 @@
 #include <cstdio>
 #include <cstdlib>
 
+#include "base/Ascii.h"
 #include "fuzz/Invariant.h"
 #include "fuzz/StrictLog.h"
 #include "host/broker/ResultCollector.h"
@@ -44,7 +45,7 @@ bool isServed(const OperationRequest& request) {
     const std::string given =
         association ? request.assocClass.value_or("") : request.path.className;
     const auto named = [name = std::string(given.c_str())](const char* each) {
-        return equalNames(name, each);
+        return base::equalsIgnoreCase(name, each);
     };
     return std::any_of(std::begin(associations), std::end(associations), named) ||
            (!association && std::any_of(std::begin(elements), std::end(elements), named));
@@ -64,7 +65,7 @@ bool asksForEveryNode(const OperationRequest& request) {
     const std::string name = request.path.className.c_str();
     return !isAssociationOperation(request.operation) && request.path.keys.empty() &&
            std::any_of(std::begin(elements), std::end(elements),
-                       [&](const char* each) { return equalNames(name, each); });
+                       [&](const char* each) { return base::equalsIgnoreCase(name, each); });
 }
 
 void checkCount(const FuzzCase& fuzzCase, const Outcome& outcome) {

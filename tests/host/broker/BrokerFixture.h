@@ -1,6 +1,7 @@
 #ifndef TESTS_HOST_BROKER_BROKER_FIXTURE_H
 #define TESTS_HOST_BROKER_BROKER_FIXTURE_H
 
+#include "base/Ascii.h"
 #include "host/broker/Broker.h"
 #include "host/broker/Request.h"
 
@@ -34,7 +35,7 @@ class TestCatalogue final : public ClassCatalogue {
     }
     const ClassDeclaration* find(std::string_view className) const override {
         for (const ClassDeclaration& declaration : classes_) {
-            if (equalNames(declaration.name, className)) return &declaration;
+            if (base::equalsIgnoreCase(declaration.name, className)) return &declaration;
         }
         return nullptr;
     }

@@ -6,27 +6,30 @@
 namespace cmpihost {
 namespace {
 
-class Results : public BrokerTest {
+class ResultCollectors : public BrokerTest {
   protected:
     ResultCollector collector{request};
     const CMPIResult* result = collector.cmpi();
 };
 
-TEST_F(Results, KeepWhatIsReturnedInOrder) {
+TEST_F(ResultCollectors, KeepWhatIsReturnedInOrder) {
+    const CMPIUint32 number = 5;
     EXPECT_EQ(CMReturnObjectPath(result, newPath("TEST_A")).rc, CMPI_RC_OK);
     EXPECT_EQ(CMReturnObjectPath(result, newPath("TEST_B")).rc, CMPI_RC_OK);
     EXPECT_EQ(CMReturnInstance(result, newInstance("TEST_C")).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMReturnData(result, &number, CMPI_uint32).rc, CMPI_RC_OK);
     EXPECT_EQ(CMReturnDone(result).rc, CMPI_RC_OK);
-    ASSERT_EQ(collector.pathCount(), 2u);
-    EXPECT_EQ(collector.path(0).className, "TEST_A");
-    EXPECT_EQ(collector.path(1).className, "TEST_B");
-    ASSERT_EQ(collector.instanceCount(), 1u);
-    EXPECT_EQ(collector.instance(0).path.className, "TEST_C");
-    EXPECT_EQ(collector.doneCount(), 1u);
+    const Results results = collector.take();
+    EXPECT_THAT(results.paths, ElementsAre(ObjectPathValue{"root/cimv2", "TEST_A"},
+                                           ObjectPathValue{"root/cimv2", "TEST_B"}));
+    EXPECT_THAT(results.instances, ElementsAre(InstanceValue{{"root/cimv2", "TEST_C"}}));
+    EXPECT_THAT(results.data, ElementsAre(Value::fromUnsigned(5, CMPI_uint32)));
+    EXPECT_EQ(results.doneCount, 1u);
     EXPECT_THAT(broker.violations(), IsEmpty());
+    EXPECT_TRUE(collector.take().paths.empty());
 }
 
-TEST_F(Results, AreNotChangedByWhatTheProviderDoesLater) {
+TEST_F(ResultCollectors, AreNotChangedByWhatTheProviderDoesLater) {
     CMPIInstance* const instance = newInstance();
     CMPIObjectPath* const path = newPath();
     CMReturnInstance(result, instance);
@@ -34,95 +37,69 @@ TEST_F(Results, AreNotChangedByWhatTheProviderDoesLater) {
     CMSetProperty(instance, "Later", "x", CMPI_chars);
     CMAddKey(path, "Later", "x", CMPI_chars);
     CMReturnInstance(result, instance);
-    EXPECT_EQ(collector.instance(0).properties.size(), 0u);
-    EXPECT_EQ(collector.instance(1).properties.size(), 1u);
-    EXPECT_EQ(collector.path(0).keys.size(), 0u);
+    const Results results = collector.take();
+    EXPECT_EQ(results.instances.at(0).properties.size(), 0u);
+    EXPECT_EQ(results.instances.at(1).properties.size(), 1u);
+    EXPECT_EQ(results.paths.at(0).keys.size(), 0u);
+    EXPECT_EQ(CMGetPropertyCount(instance, nullptr), 1u) << "taken while the request is open";
 }
 
-TEST_F(Results, OutliveTheRequest) {
+TEST_F(ResultCollectors, OutliveTheRequest) {
     CMPIInstance* const instance = newInstance();
     CMSetProperty(instance, "Name", "a text that does not fit into a small string", CMPI_chars);
     CMReturnInstance(result, instance);
     CMReturnObjectPath(result, newPath());
     request.end();
-    const std::vector<InstanceValue> instances = collector.takeInstances();
-    ASSERT_EQ(instances.size(), 1u);
-    EXPECT_EQ(instances[0].property("Name")->text(),
+    const Results results = collector.take();
+    ASSERT_EQ(results.instances.size(), 1u);
+    EXPECT_EQ(results.instances[0].property("Name")->text(),
               "a text that does not fit into a small string");
-    EXPECT_EQ(collector.takePaths().size(), 1u);
-    EXPECT_EQ(collector.instanceCount(), 0u);
-    EXPECT_EQ(collector.pathCount(), 0u);
+    EXPECT_EQ(results.paths.size(), 1u);
 }
 
-TEST_F(Results, MayBeTakenWhileTheRequestIsOpen) {
-    CMPIInstance* const instance = newInstance();
-    CMSetProperty(instance, "Name", "x", CMPI_chars);
-    CMReturnInstance(result, instance);
-    EXPECT_EQ(collector.takeInstances().at(0).properties.size(), 1u);
-    EXPECT_EQ(CMGetPropertyCount(instance, nullptr), 1u);
-}
-
-TEST_F(Results, ANullObjectIsRefused) {
-    EXPECT_EQ(CMReturnInstance(result, nullptr).rc, CMPI_RC_ERR_INVALID_PARAMETER);
-    EXPECT_EQ(CMReturnObjectPath(result, nullptr).rc, CMPI_RC_ERR_INVALID_PARAMETER);
-    EXPECT_EQ(collector.instanceCount() + collector.pathCount(), 0u);
+TEST_F(ResultCollectors, TakeNothingAfterReturnDoneNorWhatIsNoObject) {
+    CMPIError stranger = {nullptr, nullptr};
+    const CMPIUint32 number = 1;
+    const std::vector<CMPIrc> before = {
+        CMReturnInstance(result, nullptr).rc, CMReturnObjectPath(result, nullptr).rc,
+        CMReturnError(result, nullptr).rc, CMReturnError(result, &stranger).rc};
+    EXPECT_THAT(before, ElementsAre(CMPI_RC_ERR_INVALID_PARAMETER, CMPI_RC_ERR_INVALID_PARAMETER,
+                                    CMPI_RC_ERR_INVALID_PARAMETER, CMPI_RC_ERR_INVALID_HANDLE));
+    EXPECT_EQ(CMReturnDone(result).rc, CMPI_RC_OK);
+    const std::vector<CMPIrc> after = {
+        CMReturnInstance(result, newInstance()).rc, CMReturnObjectPath(result, newPath()).rc,
+        CMReturnData(result, &number, CMPI_uint32).rc, CMReturnDone(result).rc};
+    EXPECT_EQ(after, std::vector<CMPIrc>(4, CMPI_RC_ERR_FAILED));
+    const Results results = collector.take();
+    EXPECT_EQ(results.instances.size() + results.paths.size() + results.data.size(), 0u);
+    EXPECT_EQ(results.doneCount, 2u);
     EXPECT_THAT(broker.violations(),
                 ElementsAre("CMPIResultFT.returnInstance: null CMPIInstance",
-                            "CMPIResultFT.returnObjectPath: null CMPIObjectPath"));
-}
-
-TEST_F(Results, NothingMayFollowReturnDone) {
-    CMReturnDone(result);
-    EXPECT_EQ(CMReturnInstance(result, newInstance()).rc, CMPI_RC_ERR_FAILED);
-    EXPECT_EQ(CMReturnObjectPath(result, newPath()).rc, CMPI_RC_ERR_FAILED);
-    const CMPIUint32 number = 1;
-    EXPECT_EQ(CMReturnData(result, &number, CMPI_uint32).rc, CMPI_RC_ERR_FAILED);
-    EXPECT_EQ(CMReturnDone(result).rc, CMPI_RC_ERR_FAILED);
-    EXPECT_EQ(collector.instanceCount() + collector.pathCount() + collector.data().size(), 0u);
-    EXPECT_EQ(collector.doneCount(), 2u);
-    EXPECT_THAT(broker.violations(),
-                ElementsAre("CMPIInstance of TEST_Thing returned after returnDone",
+                            "CMPIResultFT.returnObjectPath: null CMPIObjectPath",
+                            "CMPIResultFT.returnError: null CMPIError",
+                            "CMPIResultFT.returnError: no CMPIError of this host",
+                            "CMPIInstance of TEST_Thing returned after returnDone",
                             "CMPIObjectPath of TEST_Thing returned after returnDone",
                             "data returned after returnDone", "returnDone called twice"));
 }
 
-TEST_F(Results, TakeDataOfMethods) {
-    const CMPIUint32 number = 5;
-    EXPECT_EQ(CMReturnData(result, &number, CMPI_uint32).rc, CMPI_RC_OK);
-    ASSERT_EQ(collector.data().size(), 1u);
-    EXPECT_EQ(collector.data()[0], Value::fromUnsigned(5, CMPI_uint32));
-}
-
-TEST_F(Results, DoNotTakeErrors) {
-    CMPIError stranger = {nullptr, nullptr};
-    EXPECT_EQ(CMReturnError(result, &stranger).rc, CMPI_RC_ERR_INVALID_HANDLE);
-    EXPECT_EQ(CMReturnError(result, nullptr).rc, CMPI_RC_ERR_INVALID_PARAMETER);
-    EXPECT_THAT(broker.violations(),
-                ElementsAre("CMPIResultFT.returnError: no CMPIError of this host",
-                            "CMPIResultFT.returnError: null CMPIError"));
-}
-
-TEST_F(Results, CanBeMadeToRefuseInstancesFromTheSecondOn) {
+TEST_F(ResultCollectors, CanBeMadeToRefuseFromACallOn) {
     collector.failReturnInstance(2, CMPI_RC_ERR_ACCESS_DENIED);
+    collector.failReturnObjectPath(1, CMPI_RC_ERR_FAILED);
+    collector.failReturnDone(1, CMPI_RC_ERR_NOT_FOUND);
     EXPECT_EQ(CMReturnInstance(result, newInstance("TEST_A")).rc, CMPI_RC_OK);
     EXPECT_EQ(CMReturnInstance(result, newInstance("TEST_B")).rc, CMPI_RC_ERR_ACCESS_DENIED);
     EXPECT_EQ(CMReturnInstance(result, newInstance("TEST_C")).rc, CMPI_RC_ERR_ACCESS_DENIED);
-    EXPECT_EQ(CMReturnObjectPath(result, newPath()).rc, CMPI_RC_OK);
-    EXPECT_EQ(collector.instanceCount(), 1u);
-    const std::vector<InstanceValue> refused = collector.takeRefusedInstances();
-    ASSERT_EQ(refused.size(), 2u);
-    EXPECT_EQ(refused[0].path.className, "TEST_B");
+    EXPECT_EQ(CMReturnObjectPath(result, newPath("TEST_D")).rc, CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(CMReturnDone(result).rc, CMPI_RC_ERR_NOT_FOUND);
+    const Results results = collector.take();
+    EXPECT_THAT(results.instances, ElementsAre(InstanceValue{{"root/cimv2", "TEST_A"}}));
+    EXPECT_THAT(results.refusedInstances, ElementsAre(InstanceValue{{"root/cimv2", "TEST_B"}},
+                                                      InstanceValue{{"root/cimv2", "TEST_C"}}));
+    EXPECT_THAT(results.paths, IsEmpty());
+    EXPECT_THAT(results.refusedPaths, ElementsAre(ObjectPathValue{"root/cimv2", "TEST_D"}));
+    EXPECT_EQ(results.doneCount, 1u);
     EXPECT_THAT(broker.violations(), IsEmpty());
-}
-
-TEST_F(Results, CanBeMadeToRefusePathsAndTheEnd) {
-    collector.failReturnObjectPath(1, CMPI_RC_ERR_FAILED);
-    collector.failReturnDone(1, CMPI_RC_ERR_ACCESS_DENIED);
-    EXPECT_EQ(CMReturnObjectPath(result, newPath()).rc, CMPI_RC_ERR_FAILED);
-    EXPECT_EQ(CMReturnDone(result).rc, CMPI_RC_ERR_ACCESS_DENIED);
-    EXPECT_EQ(collector.pathCount(), 0u);
-    EXPECT_EQ(collector.takeRefusedPaths().size(), 1u);
-    EXPECT_EQ(collector.doneCount(), 1u);
 }
 
 class SchemaViolations : public ::testing::Test {
@@ -241,7 +218,7 @@ TEST_F(SchemaViolations, AReturnedPathHasExactlyTheKeysOfItsClass) {
          {none, extra, noKey, wrongType, thingPath(), otherPath()}) {
         EXPECT_EQ(CMReturnObjectPath(collector.cmpi(), path).rc, CMPI_RC_OK);
     }
-    EXPECT_EQ(collector.pathCount(), 6u);
+    EXPECT_EQ(collector.take().paths.size(), 6u);
     EXPECT_THAT(broker.violations(),
                 ElementsAre("path of TEST_Thing without key Name",
                             "path of TEST_Thing with Id, which is no key of it",
@@ -273,7 +250,7 @@ TEST_F(SchemaViolations, KeysThatAreOnlyPropertiesCompleteThePath) {
     CMSetProperty(instance, "Name", "x", CMPI_chars);
     EXPECT_EQ(toString(valueOf(CMGetObjectPath(instance, nullptr))), "root:TEST_Thing.Name=\"x\"");
     CMReturnInstance(collector.cmpi(), instance);
-    EXPECT_EQ(toString(collector.instance(0).path), "root:TEST_Thing.Name=\"x\"");
+    EXPECT_EQ(toString(collector.take().instances.at(0).path), "root:TEST_Thing.Name=\"x\"");
     EXPECT_EQ(valueOf(instance).path.keys.size(), 0u);
     EXPECT_THAT(broker.violations(), IsEmpty());
 }
