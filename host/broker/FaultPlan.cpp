@@ -22,6 +22,14 @@ void FaultPlan::add(Fault fault) {
     faults_.push_back({std::move(fault), 0});
 }
 
+void FaultPlan::clear() {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    faults_.clear();
+    calls_.clear();
+    total_ = 0;
+    fired_.clear();
+}
+
 unsigned FaultPlan::calls() const {
     const std::lock_guard<std::mutex> lock(mutex_);
     return total_;

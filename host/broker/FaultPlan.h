@@ -39,6 +39,8 @@ class FaultPlan {
     explicit FaultPlan(Fault fault);
 
     void add(Fault fault);
+    /// Forgets faults and counts.
+    void clear();
 
     /// All calls since the start.
     unsigned calls() const;

@@ -134,6 +134,15 @@ TEST_F(Faults, EveryShapeOfResultCanFail) {
     EXPECT_THAT(broker.violations(), IsEmpty());
 }
 
+TEST_F(Faults, ClearingForgetsFaultsAndCounts) {
+    plan.add({"newObjectPath", 1, 0});
+    EXPECT_EQ(newPath(), nullptr);
+    plan.clear();
+    EXPECT_EQ(plan.calls(), 0u);
+    EXPECT_EQ(plan.fired(), 0u);
+    EXPECT_NE(newPath(), nullptr);
+}
+
 TEST_F(Faults, WhatTheHostMakesDoesNotCount) {
     plan.add({"", 1, 0});
     EXPECT_NE(request.makePath({"root", "TEST_Thing"}), nullptr);
