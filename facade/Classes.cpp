@@ -48,11 +48,14 @@ constexpr Class classes[] = {
 constexpr const Class& operatingSystem = classes[0];
 constexpr const Class& computerSystem = classes[1];
 constexpr const Class& capabilities = classes[2];
+constexpr const Class& installedOS = classes[3];
+constexpr const Class& runningOS = classes[4];
+constexpr const Class& elementCapabilities = classes[5];
 
 constexpr Association associationTable[] = {
-    {classes[3], {{"GroupComponent", computerSystem}, {"PartComponent", operatingSystem}}},
-    {classes[4], {{"Antecedent", operatingSystem}, {"Dependent", computerSystem}}},
-    {classes[5], {{"ManagedElement", operatingSystem}, {"Capabilities", capabilities}}},
+    {installedOS, {{"GroupComponent", computerSystem}, {"PartComponent", operatingSystem}}},
+    {runningOS, {{"Antecedent", operatingSystem}, {"Dependent", computerSystem}}},
+    {elementCapabilities, {{"ManagedElement", operatingSystem}, {"Capabilities", capabilities}}},
 };
 
 }  // namespace

@@ -75,11 +75,14 @@ class ClientRequest {
     const std::string& className() const { return className_; }
     const Class* knownClass() const { return class_; }
 
+    /// What a path stands for; where it has no namespace, it is in that of the request.
     Identity identityOf(const CMPIObjectPath* path) const;
 
     /// A new path in the namespace of the request. Throws Refusal when the broker makes none.
     CMPIObjectPath* newPath(const char* className) const;
 
+    /// Each asks the provider one question, as an object manager would. No property list goes with
+    /// it: the list is applied to what is returned, and until then all keys are there to compare.
     Answer enumerateInstanceNames(const CMPIObjectPath* path) const;
     Answer enumerateInstances(const CMPIObjectPath* path) const;
     Answer getInstance(const CMPIObjectPath* path) const;

@@ -2,6 +2,7 @@
 #include <cmpi/cmpift.h>
 #include <gtest/gtest.h>
 
+#include <cstddef>
 #include <memory>
 #include <string>
 #include <utility>
@@ -188,7 +189,7 @@ TEST_F(ComputerSystemAdapter, ThrowsWithoutAFirstInstanceWhateverCameBesideAnErr
     const struct {
         ScriptedBroker::Answer enumerate, next;
         int pending;
-        std::size_t calls;
+        std::ptrdiff_t calls;
     } rows[] = {
         {givenWithAnError, given, 1, 1},
         {refused, given, 1, 1},
