@@ -153,9 +153,9 @@ std::vector<std::string> splitArguments(int argumentCount, const char* const* ar
 }
 
 /// The command line as CLI11 fills it, and the description of it all.
-class Parser {
+class CommandLineParser {
   public:
-    Parser();
+    CommandLineParser();
     ParsedCommandLine parse(int argumentCount, const char* const* arguments);
 
   private:
@@ -174,7 +174,7 @@ class Parser {
     std::optional<std::string> propertyOption_;
 };
 
-Parser::Parser() : app_(description, "cmpihost") {
+CommandLineParser::CommandLineParser() : app_(description, "cmpihost") {
     app_.set_version_flag("--version", "cmpihost " KORVA_VERSION, "Print the version");
     app_.set_help_flag("-h,--help", "Print this help");
     app_.footer(std::string(pathHelp) + statusHelp);
@@ -187,7 +187,7 @@ Parser::Parser() : app_(description, "cmpihost") {
     for (const Command& command : commands) addCommand(command);
 }
 
-ParsedCommandLine Parser::parse(int argumentCount, const char* const* arguments) {
+ParsedCommandLine CommandLineParser::parse(int argumentCount, const char* const* arguments) {
     try {
         app_.parse(splitArguments(argumentCount, arguments));
     } catch (const CLI::CallForVersion& version) {
@@ -204,7 +204,7 @@ ParsedCommandLine Parser::parse(int argumentCount, const char* const* arguments)
     return {result_, {}, exitDone};
 }
 
-ParsedCommandLine Parser::refused(const std::string& complaint) {
+ParsedCommandLine CommandLineParser::refused(const std::string& complaint) {
     return {std::nullopt,
             "cmpihost: " + base::escapeForTerminal(complaint) +
                 "\nRun cmpihost --help for more information.\n",
@@ -213,14 +213,14 @@ ParsedCommandLine Parser::refused(const std::string& complaint) {
 
 /// The complaint about arguments among which there is no command. CLI11's own speaks of
 /// subcommands, a word that the help does not know.
-std::string Parser::withoutCommand(const CLI::ParseError& error) const {
+std::string CommandLineParser::withoutCommand(const CLI::ParseError& error) const {
     if (dynamic_cast<const CLI::RequiredError*>(&error) == nullptr) return error.what();
     const std::vector<std::string> unknown = app_.remaining();
     return unknown.empty() ? "An operation is required"
                            : "There is no operation '" + unknown.front() + "'";
 }
 
-void Parser::addHostOptions() {
+void CommandLineParser::addHostOptions() {
     CLI::Option* provider =
         addText(app_, "--provider", "FILE", result_.provider,
                 "Library of the provider; without it the facade beside this program,\n"
@@ -248,7 +248,7 @@ void Parser::addHostOptions() {
         ->type_name("N");
 }
 
-void Parser::addCommand(const Command& command) {
+void CommandLineParser::addCommand(const Command& command) {
     CLI::App& added = *app_.add_subcommand(command.name, command.help);
     added.fallthrough();
     added.group(command.operation ? "Operations" : "Pictures");
@@ -263,7 +263,7 @@ void Parser::addCommand(const Command& command) {
     addFilters(added, command.filters);
 }
 
-void Parser::addArguments(CLI::App& to, Takes takes) {
+void CommandLineParser::addArguments(CLI::App& to, Takes takes) {
     switch (takes) {
         case Takes::Nothing:
             return;
@@ -293,7 +293,7 @@ void Parser::addArguments(CLI::App& to, Takes takes) {
         ->capture_default_str();
 }
 
-void Parser::addFilters(CLI::App& to, Filters which) {
+void CommandLineParser::addFilters(CLI::App& to, Filters which) {
     if (which == Filters::None) return;
     for (const Filter& filter : filters) {
         const char* help =
@@ -302,7 +302,7 @@ void Parser::addFilters(CLI::App& to, Filters which) {
     }
 }
 
-void Parser::collectProperties() {
+void CommandLineParser::collectProperties() {
     // An empty --properties is a list too, one without names; without any there is no list.
     if (!propertyOption_ && propertyArguments_.empty()) return;
     result_.properties.emplace();
@@ -311,7 +311,7 @@ void Parser::collectProperties() {
     appendNames(propertyOption_.value_or(std::string()), *result_.properties);
 }
 
-std::string Parser::help() {
+std::string CommandLineParser::help() {
     // The operations are few and alike: the help of the program shows all of them in full.
     const std::vector<CLI::App*> chosen = app_.get_subcommands();
     return chosen.empty() ? app_.help("", CLI::AppFormatMode::All)
@@ -321,7 +321,7 @@ std::string Parser::help() {
 }  // namespace
 
 ParsedCommandLine parseCommandLine(int argumentCount, const char* const* arguments) {
-    return Parser().parse(argumentCount, arguments);
+    return CommandLineParser().parse(argumentCount, arguments);
 }
 
 }  // namespace cmpihost

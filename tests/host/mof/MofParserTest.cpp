@@ -138,6 +138,8 @@ TEST(MofParser, SaysWhereAndWhatWasExpected) {
          "1:1: expected 'class', 'instance', 'qualifier' or '#pragma', found 'klass'"},
         {"[Key]",
          "1:6: expected 'class' or 'instance' after the qualifiers, found the end of the file"},
+        {"[Key] qualifier Q : boolean;",
+         "1:7: expected 'class' or 'instance' after the qualifiers, found 'qualifier'"},
         {"class { };", "1:7: expected the name of the class, found '{'"},
         {"class A : { };", "1:11: expected the name of the superclass, found '{'"},
         {"class A\n;", "2:1: expected '{' after the head of class 'A', found ';'"},
