@@ -32,7 +32,8 @@ CMPIStatus answer(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* resu
     const CMPIString* const sourceClass = source->ft->getClassName(source, nullptr);
     const char* const name = sourceClass->ft->getCharPtr(sourceClass, nullptr);
     const bool fromThing = base::equalsIgnoreCase(name, "TEST_Thing");
-    const bool isTied = associationClass == nullptr || base::equalsIgnoreCase(associationClass, "TEST_Link") ||
+    const bool isTied = associationClass == nullptr ||
+                        base::equalsIgnoreCase(associationClass, "TEST_Link") ||
                         base::equalsIgnoreCase(associationClass, "CIM_Dependency");
     if (isTied && (fromThing || base::equalsIgnoreCase(name, "KORVA_ComputerSystem"))) {
         const CMPIObjectPath* const path = what == What::link ? linkPath("TEST_Link", "link")
