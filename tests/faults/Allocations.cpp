@@ -1,3 +1,5 @@
+// Only what the libraries ask for may fail: the broker, the log of the test and GoogleTest allocate
+// through the same operator new, so each call's frames are searched for who asked.
 #include "faults/Allocations.h"
 
 #include <link.h>

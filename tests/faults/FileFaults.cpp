@@ -1,3 +1,5 @@
+// Files fail here rather than on a file system of the test's: only so a file can vanish between a
+// look and the opening of it, or a read be interrupted.
 #include "faults/FileFaults.h"
 
 #include <dirent.h>

@@ -1,3 +1,4 @@
+// The compiler's instrumentation reaches every function of the framework, whatever is added to it.
 #include "faults/FrameworkCalls.h"
 
 #include <utility>

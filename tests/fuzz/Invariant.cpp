@@ -1,3 +1,4 @@
+// A broken invariant must look to libFuzzer like a crash, with a text that tells it from another.
 #include "fuzz/Invariant.h"
 
 #include <cstdio>

@@ -1,3 +1,5 @@
+// Records carry what clients say, and administrators read them on terminals: so each is checked as
+// it comes.
 #include "fuzz/StrictLog.h"
 
 #include <stdexcept>

@@ -1,3 +1,5 @@
+// The companion is the other end of every association where no other provider serves computer
+// systems.
 #include <stdexcept>
 
 #include "framework/instrumentation/HostSource.h"

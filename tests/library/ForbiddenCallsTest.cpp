@@ -1,3 +1,5 @@
+// Requests on the host that they run on, in a child process that ends at the first attempt to start
+// another process or to use the network: an object manager runs as root and allows neither.
 #include <linux/filter.h>
 #include <linux/seccomp.h>
 #include <sched.h>
@@ -17,9 +19,6 @@
 #include "library/LibraryFixture.h"
 
 #include "framework/instrumentation/HostSource.h"
-
-// Requests on the host that they run on, in a child process that ends at the first attempt to start
-// another process or to use the network.
 
 namespace {
 

@@ -1,3 +1,5 @@
+// What requests open on the host that they run on. This program's functions stand before the C
+// library's. A host is asked often: each source is opened once, or not at all.
 #include <dirent.h>
 #include <dlfcn.h>
 #include <fcntl.h>
@@ -9,9 +11,6 @@
 #include "library/LibraryFixture.h"
 
 #include "framework/instrumentation/HostSource.h"
-
-// What requests open on the host that they run on. This program's functions stand before the C
-// library's.
 
 namespace {
 

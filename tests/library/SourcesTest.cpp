@@ -1,6 +1,6 @@
+// Every class of source through every association class, whatever the filters of the request say: a
+// client may ask from any object, and the provider answers by its class alone.
 #include "library/AssociationsFixture.h"
-
-// Every class of source through every association class.
 
 namespace {
 
@@ -50,6 +50,8 @@ std::vector<Row> rows() {
          "Object Not Found."},
         {path(element, {{"Name", "x"}}), {}, {}, {}, "Object Not Found."},
         {path("KORVA_Unknown"), {}, {}, {}},
+        {path("CIM_OperatingSystem", {{"Name", "x"}}), {}, {}, {}},
+        {path("", {{"Name", "x"}}), {}, {}, {}},
         {path("KORVA_Unknown", {{"Name", "host1"}, {"InstanceID", "os2"}}), {}, {}, {}},
     };
 }

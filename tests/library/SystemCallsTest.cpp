@@ -1,3 +1,4 @@
+// How many system calls a request takes that is not the first one: monitoring asks every minute.
 #include <sys/syscall.h>
 #include <unistd.h>
 
@@ -6,11 +7,9 @@
 #include <thread>
 
 #include "framework/instrumentation/HostSource.h"
-#include "support/FixtureTree.h"
 #include "library/LibraryFixture.h"
+#include "support/FixtureTree.h"
 #include "support/SystemCalls.h"
-
-// How many system calls a request takes that is not the first one.
 
 namespace {
 

@@ -1,8 +1,7 @@
+// What the provider asks the object manager about computer systems.
 #include <utility>
 
 #include "library/LibraryFixture.h"
-
-// What the provider asks the object manager about computer systems.
 
 namespace {
 

@@ -16,8 +16,8 @@
 #include "framework/instrumentation/HostSource.h"
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
-#include "support/FixtureTree.h"
 #include "load/ThreadGroup.h"
+#include "support/FixtureTree.h"
 #include "support/Requests.h"
 #include "support/SimulatedHost.h"
 

@@ -1,3 +1,5 @@
+// Numbers that must be equal, not nearly so: whatever the allocator and the kernel change by
+// themselves is evened out before they are read.
 #include "load/ProcessState.h"
 
 #include <malloc.h>

@@ -1,3 +1,4 @@
+// A soak that measured nothing would pass: what it measures with is tested itself.
 #include "load/ProcessState.h"
 
 #include <gtest/gtest.h>

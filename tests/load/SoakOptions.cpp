@@ -1,3 +1,4 @@
+// A number that is wrong or too small would make a soak pass without measuring: it is refused.
 #include "load/SoakOptions.h"
 
 #include <stdexcept>

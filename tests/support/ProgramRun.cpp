@@ -1,3 +1,4 @@
+// Programs are spawned, not run by a shell: what they get and leave is exactly what the test says.
 #include "support/ProgramRun.h"
 
 #include <fcntl.h>

@@ -1,3 +1,5 @@
+// Records are the provider's other interface. Here they are kept with all nine arguments, and
+// rendered so that only what may differ from build to build is masked.
 #include "support/RecordingLog.h"
 
 #include <algorithm>

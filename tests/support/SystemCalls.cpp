@@ -1,3 +1,4 @@
+// The kernel's own count, by tracing a child: no wrapper of the C library can be passed by.
 #include "tests/support/SystemCalls.h"
 
 #include <sys/ptrace.h>

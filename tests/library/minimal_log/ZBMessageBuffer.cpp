@@ -1,3 +1,5 @@
+// As little as a logging layer of another make may offer: what the provider needs beyond it shows
+// here.
 #include "ZBMessageBuffer.h"
 
 namespace ZBLog {
