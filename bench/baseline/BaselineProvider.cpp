@@ -106,8 +106,15 @@ const char* classOf(const CMPIObjectPath* path) {
     return name->ft->getCharPtr(name, nullptr);
 }
 
-CMPIStatus cleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
+// Whatever the slot takes.
+template <class... Arguments>
+CMPIStatus succeed(Arguments...) {
     return done;
+}
+
+template <class... Arguments>
+CMPIStatus refuse(Arguments...) {
+    return refused;
 }
 
 CMPIStatus enumInstanceNames(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
@@ -125,30 +132,6 @@ CMPIStatus getInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* re
     return answerInstances(result, answerOf(classOf(path)), 1);
 }
 
-CMPIStatus createInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
-                          const CMPIObjectPath*, const CMPIInstance*) {
-    return refused;
-}
-
-CMPIStatus modifyInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
-                          const CMPIObjectPath*, const CMPIInstance*, const char**) {
-    return refused;
-}
-
-CMPIStatus deleteInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
-                          const CMPIObjectPath*) {
-    return refused;
-}
-
-CMPIStatus execQuery(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*, const CMPIObjectPath*,
-                     const char*, const char*) {
-    return refused;
-}
-
-CMPIStatus associationCleanup(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) {
-    return done;
-}
-
 CMPIStatus associators(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
                        const CMPIObjectPath* path, const char* assocClass, const char*, const char*,
                        const char*, const char**) {
@@ -161,25 +144,23 @@ CMPIStatus associatorNames(CMPIAssociationMI*, const CMPIContext*, const CMPIRes
     return answerPaths(result, farEndOf(classOf(path), assocClass), nodes);
 }
 
-CMPIStatus references(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
-                      const CMPIObjectPath*, const char*, const char*, const char**) {
-    return refused;
-}
-
-CMPIStatus referenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult*,
-                          const CMPIObjectPath*, const char*, const char*) {
-    return refused;
-}
-
 CMPIInstanceMIFT instanceTable = {
-    CMPIVersion200,    CMPIVersion200, "instanceBaseline", cleanup,
-    enumInstanceNames, enumInstances,  getInstance,        createInstance,
-    modifyInstance,    deleteInstance, execQuery,
+    CMPIVersion200,
+    CMPIVersion200,
+    "instanceBaseline",
+    succeed,
+    enumInstanceNames,
+    enumInstances,
+    getInstance,
+    refuse,
+    refuse,
+    refuse,
+    refuse,
 };
 
 CMPIAssociationMIFT associationTable = {
-    CMPIVersion200,  CMPIVersion200, "associationBaseline", associationCleanup, associators,
-    associatorNames, references,     referenceNames,
+    CMPIVersion200, CMPIVersion200, "associationBaseline", succeed, associators, associatorNames,
+    refuse,         refuse,
 };
 
 }  // namespace

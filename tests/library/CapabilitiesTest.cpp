@@ -64,13 +64,6 @@ TEST_F(CapabilitiesRequests, NameIsEditableWhereItIsNotReadOnlyAndUnknownWhereTh
                             "uint16 HostShutdownBehavior=3"));
 }
 
-TEST_F(CapabilitiesRequests, LengthAndRequestedStatesAreNeverSupplied) {
-    const Outcome outcome = enumerate(className);
-    ASSERT_EQ(outcome.instances.size(), 1U);
-    EXPECT_EQ(text(outcome.instances[0], "MaxElementNameLen"), "(absent)");
-    EXPECT_EQ(text(outcome.instances[0], "RequestedStatesSupported"), "(absent)");
-}
-
 TEST_F(CapabilitiesRequests, NamesComeOnePerNode) {
     setNodes({"a", "b"});
     const Outcome outcome = enumerateNames(className);
