@@ -44,20 +44,6 @@ TEST_F(HostFilesTest, TextIsTheWholeContentByteForByte) {
     EXPECT_EQ(files.text("empty"), "");
 }
 
-TEST_F(HostFilesTest, DescriptorZeroServesAsAnyOther) {
-    tree.write("file", "content");
-    const int standardInput = ::dup(STDIN_FILENO);
-    ::close(STDIN_FILENO);
-    const auto text = files.text("file");
-    const bool closed = ::fcntl(STDIN_FILENO, F_GETFD) == -1;
-    if (standardInput != -1) {
-        ::dup2(standardInput, STDIN_FILENO);
-        ::close(standardInput);
-    }
-    EXPECT_EQ(text, "content");
-    EXPECT_TRUE(closed);
-}
-
 TEST_F(HostFilesTest, FileOfAMegabyteIsReadAndOneThatIsLargerOrUnreadableIsToldFromAMissingOne) {
     tree.write("largest", std::string(1024 * 1024, 'x'));
     EXPECT_EQ(files.text("largest").value_or("").size(), 1024u * 1024u);
