@@ -31,7 +31,7 @@ bool isRefused(Operation operation) {
     }
 }
 
-bool isAssociationOperation(Operation operation) {
+bool asksForFarEnds(Operation operation) {
     return operation == Operation::Associators || operation == Operation::AssociatorNames;
 }
 
@@ -41,7 +41,7 @@ bool isServed(const OperationRequest& request) {
                                             "KORVA_OSElementCapabilities"};
     constexpr const char* elements[] = {"KORVA_OperatingSystem",
                                         "KORVA_OperatingSystemCapabilities"};
-    const bool association = isAssociationOperation(request.operation);
+    const bool association = asksForFarEnds(request.operation);
     const std::string given =
         association ? request.assocClass.value_or("") : request.path.className;
     const auto named = [name = std::string(given.c_str())](const char* each) {
@@ -63,7 +63,7 @@ bool asksForEveryNode(const OperationRequest& request) {
     constexpr const char* elements[] = {"KORVA_OperatingSystem",
                                         "KORVA_OperatingSystemCapabilities"};
     const std::string name = request.path.className.c_str();
-    return !isAssociationOperation(request.operation) && request.path.keys.empty() &&
+    return !asksForFarEnds(request.operation) && request.path.keys.empty() &&
            std::any_of(std::begin(elements), std::end(elements),
                        [&](const char* each) { return base::equalsIgnoreCase(name, each); });
 }
