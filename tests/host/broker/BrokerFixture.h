@@ -26,6 +26,52 @@ inline std::string textOf(const CMPIString* string) {
     return text == nullptr ? "(no characters)" : text;
 }
 
+/// A CMPIData as text: "uint16 5", "key string x", "null uint32", "missing" or "bad".
+inline std::string shown(const CMPIData& data) {
+    if ((data.state & CMPI_badValue) != 0) return "bad";
+    if ((data.state & CMPI_notFound) != 0) return data.type == CMPI_null ? "missing" : "odd";
+    if ((data.state & CMPI_nullValue) != 0) return "null " + cimTypeName(data.type);
+    const std::string type = (data.state & CMPI_keyValue) != 0 ? "key " + cimTypeName(data.type)
+                                                               : cimTypeName(data.type);
+    const auto text = [&](const Value& value) { return type + ' ' + value.toText(); };
+    switch (data.type) {
+        case CMPI_boolean:
+            return text(Value::fromBoolean(data.value.boolean == 1));
+        case CMPI_char16:
+            return text(Value::fromUnsigned(data.value.char16));
+        case CMPI_uint8:
+            return text(Value::fromUnsigned(data.value.uint8));
+        case CMPI_uint16:
+            return text(Value::fromUnsigned(data.value.uint16));
+        case CMPI_uint32:
+            return text(Value::fromUnsigned(data.value.uint32));
+        case CMPI_uint64:
+            return text(Value::fromUnsigned(data.value.uint64));
+        case CMPI_sint8:
+            return text(Value::fromSigned(data.value.sint8));
+        case CMPI_sint16:
+            return text(Value::fromSigned(data.value.sint16));
+        case CMPI_sint32:
+            return text(Value::fromSigned(data.value.sint32));
+        case CMPI_sint64:
+            return text(Value::fromSigned(data.value.sint64));
+        case CMPI_real32:
+            return text(Value::fromReal(data.value.real32, CMPI_real32));
+        case CMPI_real64:
+            return text(Value::fromReal(data.value.real64));
+        case CMPI_string:
+            return text(textOf(data.value.string));
+        case CMPI_dateTime:
+            return text(textOf(CMGetStringFormat(data.value.dateTime, nullptr)));
+        case CMPI_ref:
+            return text(toString(valueOf(data.value.ref)));
+        case CMPI_instance:
+            return text(toString(valueOf(data.value.inst).path));
+        default:
+            return type;
+    }
+}
+
 /// Classes given by the test.
 class TestCatalogue final : public ClassCatalogue {
   public:
