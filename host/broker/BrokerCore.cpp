@@ -16,6 +16,7 @@ RequestScope*& innermostOfThread() noexcept {
 }
 
 [[noreturn]] void refuseHandle(const std::string& violation, CMPIrc rc) {
+    // A handle that is none does not tell its broker: that of the request is the likeliest.
     if (RequestScope* const scope = RequestScope::innermost()) scope->core().report(violation);
     throw Failure{rc};
 }
@@ -102,6 +103,7 @@ void BrokerCore::releaseObject(const ObjectBase& object) noexcept {
         quarantine_.take(object.arena()->release(object));
         return;
     }
+    // Retired outside the lock: its content may be large.
     std::unique_ptr<ObjectBase> owned;
     {
         const std::lock_guard<std::mutex> lock(cloneMutex_);

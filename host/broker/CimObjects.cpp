@@ -53,6 +53,7 @@ CMPIStatus addKey(Path& path, const CallName& call, const char* name, const CMPI
     return statusOf(CMPI_RC_OK);
 }
 
+/// The state of a key differs between object managers; providers must not rely on one.
 CMPIData asKey(const BrokerCore& core, CMPIData data) noexcept {
     const bool found = (data.state & (CMPI_notFound | CMPI_badValue)) == 0;
     if (found && !core.isSparse()) {
@@ -76,6 +77,7 @@ CMPICount getKeyCount(Path& path, CMPIStatus*) {
     return static_cast<CMPICount>(path.body->keys.size());
 }
 
+/// Despite its name the call takes over the class, too; the keys stay.
 CMPIStatus setNameSpaceFrom(Path& path, const CallName& call, const CMPIObjectPath* source) {
     const std::shared_ptr<ObjectPathValue> from = fromHandle(source, call).body;
     ObjectPathValue& to = mutableContent(path);
@@ -159,6 +161,8 @@ CMPIObjectPath* getObjectPath(Instance& instance, CMPIStatus*) {
     return instance.core().make<CMPIObjectPath>(std::move(path));
 }
 
+/// Drops what is set already, too, as a client would otherwise see it. Key names are not needed:
+/// keys stand in the path, which no filter touches.
 CMPIStatus setPropertyFilter(Instance& instance, const char** properties, const char**) {
     instance.body.filter = readNames(properties);
     if (!instance.body.filter) return statusOf(CMPI_RC_OK);

@@ -36,6 +36,7 @@ void ComputerSystemService::failAtNext(unsigned k, CMPIrc rc) {
     failRc_ = rc;
 }
 
+/// Keys of the path do not matter, as an enumeration asks about a class.
 UpcallAnswer ComputerSystemService::enumerate(const OperationRequest& request) const {
     UpcallAnswer answer;
     answer.rc = enumerationRc_;

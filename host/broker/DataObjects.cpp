@@ -61,6 +61,7 @@ CMPIStatus setElementAt(Array& array, const CallName& call, CMPICount index, con
 
 using Enumeration = const Object<CMPIEnumeration>;
 
+/// Past the end nothing is found, which is no violation: loops may ask until they are told.
 CMPIData getNext(Enumeration& enumeration, CMPIStatus* status) {
     EnumerationBody& body = enumeration.body;
     ++body.nextCalls;

@@ -25,6 +25,7 @@ CMPIInstance* newInstance(BrokerCore& core, const CallName& call, const CMPIObje
     }
     body.value = std::make_shared<InstanceValue>();
     body.value->path = given;
+    // Some object managers do this by themselves; who sets the keys again must not double them.
     if (core.isSparse()) {
         for (const KeyBinding& key : given.keys) {
             putNamed(body.value->properties, key.name, key.value);
@@ -49,6 +50,7 @@ CMPIString* newString(BrokerCore& core, const CallName& call, const char* text, 
     return makeString(core, required(core, text, call, "text"));
 }
 
+/// All elements start as null. There are no arrays of arrays in CIM.
 CMPIArray* newArray(BrokerCore& core, CMPICount size, CMPIType type, CMPIStatus* status) {
     if (size > mostElements || (type & CMPI_ARRAY) != 0 || type == CMPI_null) {
         return refuse(status, CMPI_RC_ERR_INVALID_PARAMETER);
@@ -57,6 +59,7 @@ CMPIArray* newArray(BrokerCore& core, CMPICount size, CMPIType type, CMPIStatus*
     return makeArray(core, stored, std::vector<Value>(size, Value::null(stored)));
 }
 
+/// Kept as text, which is what clients see; an instant without a text is refused here and now.
 CMPIDateTime* dateTime(BrokerCore& core, CMPIUint64 microseconds, bool interval,
                        CMPIStatus* status) {
     auto text = formatDateTime(microseconds, interval);

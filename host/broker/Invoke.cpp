@@ -41,15 +41,8 @@ class Call {
           properties_(request.properties) {}
 
     CMPIStatus run(const ManagementInterfaces& interfaces) {
-        switch (request_.operation) {
-            case Operation::Associators:
-            case Operation::AssociatorNames:
-            case Operation::References:
-            case Operation::ReferenceNames:
-                return runAssociation(interfaces.association);
-            default:
-                return runInstance(interfaces.instance);
-        }
+        return isAssociationOperation(request_.operation) ? runAssociation(interfaces.association)
+                                                          : runInstance(interfaces.instance);
     }
 
   private:
@@ -141,7 +134,7 @@ Outcome invoke(const ManagementInterfaces& interfaces, Broker& broker,
 
     Outcome outcome;
     outcome.rc = status.rc;
-    outcome.message = messageOf(status);
+    outcome.message = messageOf(status);  // an object of the request
     scope.end();
     outcome.violations = scope.violations();
     Results results = collector.take();

@@ -63,6 +63,7 @@ std::vector<std::string> checkMiTable(const CMPIAssociationMIFT& table) {
                      {"referenceNames", table.referenceNames != nullptr}});
 }
 
+/// The message as the provider's own macros would read it: it may be no object of this broker.
 std::string messageOf(const CMPIStatus& status) {
     if (status.msg == nullptr) return {};
     const char* const text = status.msg->ft->getCharPtr(status.msg, nullptr);
@@ -76,6 +77,7 @@ class Factory {
     Factory(void* library, const std::string& file, const std::string& provider, const char* kind)
         : where_(file + ": factory of the " + kind + " MI"), provider_(provider) {
         const std::string suffix = std::string("_Create_") + kind + "MI";
+        // The generic one is called first: only it is told which provider is meant.
         generic_ = reinterpret_cast<Generic>(dlsym(library, ("_Generic" + suffix).c_str()));
         named_ = reinterpret_cast<Named>(dlsym(library, (provider + suffix).c_str()));
         if (generic_ == nullptr && named_ == nullptr) {
@@ -147,6 +149,7 @@ ProviderLibrary::~ProviderLibrary() {
 void ProviderLibrary::load() {
     if (loaded()) return;
     LibraryHandle handle = openLibrary(file_, options_.global);
+    // Factories may already make objects, which have to belong somewhere.
     Request request(broker_);
     const CMPIContext* const context = request.makeContext({}, {});
 

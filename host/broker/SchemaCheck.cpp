@@ -8,11 +8,10 @@ namespace cmpihost {
 namespace {
 
 bool sameType(CMPIType declared, CMPIType given) noexcept {
-    const auto plain = [](CMPIType type) {
-        const int element = type & ~CMPI_ARRAY;
-        return element == CMPI_chars ? (CMPI_string | (type & CMPI_ARRAY)) : int{type};
+    const auto stored = [](CMPIType type) {
+        return storedType(static_cast<CMPIType>(type & ~CMPI_ARRAY)) | (type & CMPI_ARRAY);
     };
-    return plain(declared) == plain(given);
+    return stored(declared) == stored(given);
 }
 
 std::string member(const ClassDeclaration& declaration, std::string_view name) {
@@ -21,6 +20,7 @@ std::string member(const ClassDeclaration& declaration, std::string_view name) {
 
 bool checkType(BrokerCore& core, const ClassDeclaration& owner, const PropertyDeclaration& declared,
                const Value& value) {
+    // A provider may set a property to null without saying null of which type.
     const bool typelessNull = value.isNull() && value.type() == CMPI_null;
     if (!typelessNull && !sameType(declared.type, value.type())) {
         core.report(member(owner, declared.name) + " is " + cimTypeName(declared.type) + ", not " +

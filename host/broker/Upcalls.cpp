@@ -1,4 +1,5 @@
-// CMPIBrokerFT: operations that the provider asks of the object manager.
+// CMPIBrokerFT: operations that the provider asks of the object manager. Each becomes a request as
+// a value, so that whoever answers (another library or this host) sees the same as for a client.
 #include "host/broker/Conversion.h"
 
 namespace cmpihost {
@@ -11,6 +12,7 @@ std::optional<std::string> contextText(const std::vector<NamedValue>& entries, c
                                                      : std::nullopt;
 }
 
+/// The provider's context goes on to who answers: it tells on whose behalf the question is asked.
 RequestContext readContext(const CMPIContext* context, const CallName& call) {
     const auto& entries = fromHandle(context, call).body;
     RequestContext result;
@@ -38,6 +40,7 @@ std::optional<UpcallAnswer> answerTo(BrokerCore& core, const OperationRequest& r
     UpcallAnswer answer = core.perform(request);
     if (answer.rc == CMPI_RC_OK) return answer;
     if (status != nullptr) {
+        // Not setStatus: the message is an object of the caller's request, too.
         status->rc = answer.rc;
         status->msg = answer.message ? makeString(core, *answer.message) : nullptr;
     }
@@ -96,6 +99,7 @@ CMPIInstance* getInstance(BrokerCore& core, const CallName& call, const CMPICont
     request.properties = readNames(properties);
     std::optional<UpcallAnswer> answer = answerTo(core, request, status);
     if (!answer) return nullptr;
+    // A provider that delivers nothing and reports success has no such instance.
     if (answer->instances.empty()) return refuse(status, CMPI_RC_ERR_NOT_FOUND);
     return makeInstance(core,
                         std::make_shared<InstanceValue>(std::move(answer->instances.front())));

@@ -95,6 +95,7 @@ std::string quoted(const std::string& text) {
     return result + '"';
 }
 
+/// As parsers of clients read it: booleans in capitals, and everything that is no number in quotes.
 std::string keyText(const Value& value) {
     if (value.isNull()) return quoted("");
     if (value.type() == CMPI_boolean) return value.boolean() ? "TRUE" : "FALSE";
@@ -170,6 +171,7 @@ Value Value::fromBoolean(bool value) {
 }
 
 Value Value::fromUnsigned(std::uint64_t value, CMPIType type) {
+    // A shift by all 64 bits would be undefined; no type is so narrow.
     const unsigned unused = 64 - bitsOf(type);
     return Value(type, value << unused >> unused);
 }
