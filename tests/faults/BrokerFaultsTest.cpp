@@ -272,18 +272,6 @@ INSTANTIATE_TEST_SUITE_P(Of, BrokerFaults, testing::ValuesIn(servingHandlers()),
 
 class UnservedRequests : public FaultFixture {};
 
-TEST_F(UnservedRequests, AreRefusedWithoutACallOfTheBroker) {
-    for (const NamedRequest& asked : refusedRequests()) {
-        FaultPlan plan(Fault{"", 1, 0, CMPI_RC_ERR_FAILED});
-        broker.setFaultPlan(&plan);
-        const Answer answer = answerTo(asked);
-        broker.setFaultPlan(nullptr);
-        EXPECT_EQ(answer.outcome.rc, CMPI_RC_ERR_NOT_SUPPORTED) << asked;
-        EXPECT_EQ(plan.calls(), 0U) << asked;
-        EXPECT_EQ(answer.records.size(), 2U) << asked;
-    }
-}
-
 TEST_F(UnservedRequests, OfAnotherClassAreInvalidWhateverCallFails) {
     for (const NamedRequest& asked : unservedRequests({"host1", "Linux", "other"})) {
         for (unsigned n = 1; n <= 3; ++n) {

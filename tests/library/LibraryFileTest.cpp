@@ -26,6 +26,10 @@ const std::string folder = KORVA_BINARY_DIR "/lib/";
 const std::string provider = folder + "libkorzbosstatusprofileprovider.so.1";
 const std::string facade = folder + "libkorvaosstatusfacade.so.1";
 
+constexpr const char* libraries[] = {"libkorvaosstatusfacade.so.1",
+                                     "libkorzbosstatusprofileprovider.so.1", "libvaprovider.so.1",
+                                     "libvainstrumentation.so.1", "libzblog.so.1"};
+
 std::string output(const std::string& command) {
     const std::unique_ptr<std::FILE, int (*)(std::FILE*)> pipe(popen(command.c_str(), "r"), pclose);
     std::string text;
@@ -67,16 +71,8 @@ bool mapped(const std::string& name) {
 }
 
 TEST(LibraryFile, BearsItsSoname) {
-    EXPECT_EQ(dynamicEntries(provider, "SONAME"),
-              (std::vector<std::string>{"libkorzbosstatusprofileprovider.so.1"}));
-    EXPECT_EQ(dynamicEntries(facade, "SONAME"),
-              (std::vector<std::string>{"libkorvaosstatusfacade.so.1"}));
-    EXPECT_EQ(dynamicEntries(folder + "libvaprovider.so.1", "SONAME"),
-              (std::vector<std::string>{"libvaprovider.so.1"}));
-    EXPECT_EQ(dynamicEntries(folder + "libvainstrumentation.so.1", "SONAME"),
-              (std::vector<std::string>{"libvainstrumentation.so.1"}));
-    EXPECT_EQ(dynamicEntries(folder + "libzblog.so.1", "SONAME"),
-              (std::vector<std::string>{"libzblog.so.1"}));
+    for (const char* name : libraries)
+        EXPECT_EQ(dynamicEntries(folder + name, "SONAME"), std::vector<std::string>{name});
 }
 
 TEST(LibraryFile, ExportsTheTwoFactoriesAndTheNotice) {
@@ -140,8 +136,7 @@ TEST(LibraryFile, NeedsTheFrameworkAndTheLanguagesLibrariesOnly) {
 }
 
 TEST(LibraryFile, IsHardened) {
-    for (const char* name : {"libkorvaosstatusfacade.so.1", "libkorzbosstatusprofileprovider.so.1",
-                             "libvaprovider.so.1", "libvainstrumentation.so.1", "libzblog.so.1"}) {
+    for (const char* name : libraries) {
         const std::string segments = output("readelf -lW " + folder + name);
         EXPECT_THAT(segments, HasSubstr("GNU_RELRO")) << name;
         for (const std::string& line : lines(segments))
@@ -159,8 +154,7 @@ TEST(LibraryFile, IsHardened) {
 }
 
 TEST(LibraryFile, StartsNoProcessAndTouchesNoProcessWideState) {
-    for (const char* name : {"libkorvaosstatusfacade.so.1", "libkorzbosstatusprofileprovider.so.1",
-                             "libvaprovider.so.1", "libvainstrumentation.so.1", "libzblog.so.1"})
+    for (const char* name : libraries)
         for (const char* forbidden :
              {"fork",          "vfork",     "execve",   "execv",      "execl",
               "posix_spawn",   "system",    "popen",    "tzset",      "localtime",
@@ -178,9 +172,7 @@ void expectGoneAfterUnloading(const std::string& file, const char* factory) {
         EXPECT_NE(dlsym(handle, factory), nullptr);
         EXPECT_TRUE(mapped("libkorzbosstatusprofileprovider"));
         EXPECT_EQ(dlclose(handle), 0);
-        for (const char* library : {"libkorvaosstatusfacade", "libkorzbosstatusprofileprovider",
-                                    "libvaprovider", "libvainstrumentation", "libzblog"})
-            EXPECT_FALSE(mapped(library));
+        for (const char* library : libraries) EXPECT_FALSE(mapped(library));
     }
 }
 
