@@ -2,6 +2,7 @@
 #include <gmock/gmock.h>
 #include <sys/stat.h>
 #include <sys/utsname.h>
+#include <unistd.h>
 
 #include <cctype>
 #include <cstdio>
@@ -179,7 +180,8 @@ TEST(ProgramValues, BareGetFindsTheNodeByEitherKeyInAnyLetterCase) {
 }
 
 TEST(ProgramValues, FullDiskUnderTheLogCostsNoRequest) {
-    const std::string configuration = testing::TempDir() + "full-disk.conf";
+    const std::string configuration =
+        testing::TempDir() + "full-disk-" + std::to_string(::getpid()) + ".conf";
     std::ofstream(configuration) << "log.sink = file:/dev/full\nlog.level = 4000\n"
                                     "log.records = all\n";
     const ProgramRun run =
