@@ -5,6 +5,7 @@ target_link_libraries(load_hosts PRIVATE korva_simulated_host korva::vainstrumen
 korva_shared_library(load_hosts)
 
 add_executable(soak ProcessState.cpp Soak.cpp SoakOptions.cpp Workload.cpp)
+set_target_properties(soak PROPERTIES UNITY_BUILD OFF)
 target_compile_definitions(soak PRIVATE
     KORVA_BINARY_DIR="${CMAKE_BINARY_DIR}" KORVA_LOAD_HOSTS="$<TARGET_FILE:load_hosts>")
 target_link_libraries(soak PRIVATE korva_requests korva::options)
