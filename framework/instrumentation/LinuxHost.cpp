@@ -229,8 +229,9 @@ class LinuxCursor final : public NodeCursor {
   private:
     template <class T>
     static bool assign(std::optional<T> found, T& value) {
-        if (found) value = *std::move(found);
-        return found.has_value();
+        if (!found) return false;
+        value = *std::move(found);
+        return true;
     }
 
     template <class T, std::size_t Count>

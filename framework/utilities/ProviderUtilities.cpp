@@ -186,8 +186,9 @@ std::string ProviderUtilities::getNamespace(const CMPIObjectPath* path) {
     return nameSpace == nullptr ? "" : nameSpace;
 }
 
-CMPIObjectPath* ProviderUtilities::createObjectPath(const CMPIBroker* broker, const char* className,
-                                                    std::string nameSpace) {
+CMPIObjectPath* ProviderUtilities::createObjectPath(
+    const CMPIBroker* broker, const char* className,
+    std::string nameSpace) {  // NOLINT(performance-unnecessary-value-param): the contract's type
     if (broker == nullptr) return nullptr;
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     CMPIObjectPath* path =

@@ -35,13 +35,13 @@ bool isUserSession(std::string_view sessionFile) {
 }
 
 SessionCount countSystemdSessions(TrackedFiles& files) {
-    const std::string directory = "run/systemd/sessions";
-    const auto names = files.names(directory);
+    const std::string directory = "run/systemd/sessions/";
+    const auto names = files.names("run/systemd/sessions");
     if (!names) return {false, std::nullopt};
     std::uint64_t count = 0;
     for (const std::string& name : *names) {
         if (name.front() == '.') continue;  // a session file that is being written
-        const auto file = files.read(directory + '/' + name);
+        const auto file = files.read(directory + name);
         if (file && isUserSession(file->text)) ++count;
     }
     // A session that cannot be read may be one more.

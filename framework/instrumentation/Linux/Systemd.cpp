@@ -123,7 +123,7 @@ class Connection {
 
 }  // namespace
 
-SystemdBus::SystemdBus(std::string socket, std::string library, Lookup lookup,
+SystemdBus::SystemdBus(const std::string& socket, std::string library, Lookup lookup,
                        std::chrono::milliseconds deadline)
     : address_(addressOf(socket)),
       library_(std::move(library)),

@@ -45,7 +45,7 @@ class SystemdBus final : public SystemManager {
 
     /// `socket` is the path of the bus's socket; `library` is a name for dlopen; `lookup` finds the
     /// functions in it, dlsym where empty.
-    explicit SystemdBus(std::string socket, std::string library = defaultLibrary,
+    explicit SystemdBus(const std::string& socket, std::string library = defaultLibrary,
                         Lookup lookup = {}, std::chrono::milliseconds deadline = defaultDeadline);
     ~SystemdBus() override;
     SystemdBus(const SystemdBus&) = delete;
