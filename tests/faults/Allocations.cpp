@@ -43,7 +43,8 @@ struct State {
 State state;
 std::atomic<std::size_t> inUse{0};
 
-/// Keeps what it does from being watched itself: unwinding allocates, and so does the ledger.
+/// Keeps what it does from being watched itself: unwinding allocates, and so does the record of
+/// blocks.
 class Pause {
   public:
     Pause() : purpose_(state.purpose) { state.purpose = Purpose::None; }
@@ -56,7 +57,7 @@ class Pause {
 };
 
 /// The sizes of the blocks that are measured and in use.
-std::unordered_map<void*, std::size_t>& ledger() {
+std::unordered_map<void*, std::size_t>& blockSizes() {
     static std::unordered_map<void*, std::size_t> sizes;
     return sizes;
 }
@@ -115,19 +116,19 @@ bool mustFail() {
     return fails;
 }
 
-void enter(void* block, std::size_t size) {
+void recordBlock(void* block, std::size_t size) {
     const Pause pause;
-    ledger().emplace(block, size);
+    blockSizes().emplace(block, size);
     state.current += size;
     state.peak = std::max(state.peak, state.current);
 }
 
-void strike(void* block) {
+void forgetBlock(void* block) {
     const Pause pause;
-    const auto found = ledger().find(block);
-    if (found == ledger().end()) return;
+    const auto found = blockSizes().find(block);
+    if (found == blockSizes().end()) return;
     state.current -= found->second;
-    ledger().erase(found);
+    blockSizes().erase(found);
 }
 
 void watch(Purpose purpose) {
@@ -153,7 +154,7 @@ std::size_t release() {
 }
 
 void measure() {
-    ledger().clear();
+    blockSizes().clear();
     watch(Purpose::Measure);
 }
 
@@ -179,14 +180,14 @@ std::size_t blocksInUse() {
     void* const block = std::malloc(size == 0 ? 1 : size);
     if (block == nullptr) throw std::bad_alloc();
     ++inUse;
-    if (counted && state.purpose == Purpose::Measure) enter(block, size);
+    if (counted && state.purpose == Purpose::Measure) recordBlock(block, size);
     return block;
 }
 
 [[gnu::visibility("default")]] void operator delete(void* block) noexcept {
     if (block == nullptr) return;
     --inUse;
-    if (state.purpose == Purpose::Measure) strike(block);
+    if (state.purpose == Purpose::Measure) forgetBlock(block);
     std::free(block);
 }
 

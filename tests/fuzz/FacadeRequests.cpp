@@ -68,7 +68,7 @@ void check(const fuzz::FuzzCase& fuzzCase, const fuzz::Ending& ending, cmpihost:
     expect(!faultless || !served || outcome.doneCount == 1, "the end of an answer is reported");
     if (faultless && fuzzCase.exception == fuzz::HostException::None)
         checkFaultless(fuzzCase.request.operation, outcome);
-    fuzz::checkManners(fuzzCase, broker);
+    fuzz::checkViolations(fuzzCase, broker);
 }
 
 }  // namespace

@@ -150,9 +150,10 @@ void show(const FuzzCase& fuzzCase, const Ending& ending, const Broker& broker) 
 
 }  // namespace
 
-void checkManners(const FuzzCase& fuzzCase, Broker& broker) {
+void checkViolations(const FuzzCase& fuzzCase, Broker& broker) {
     for (const std::string& violation : broker.takeViolations())
-        if (!isHarmless(violation, fuzzCase.oddComputers)) broken("good manners: " + violation);
+        if (!isHarmless(violation, fuzzCase.oddComputers))
+            broken("the broker is used as it may be: " + violation);
     expect(broker.unreleasedClones() == 0, "clones are released");
 }
 
@@ -166,7 +167,7 @@ void checkEnding(const FuzzCase& fuzzCase, const Ending& ending, Broker& broker)
         checkRefusal(*ending.outcome);
     else
         checkService(fuzzCase, *ending.outcome, faultless);
-    checkManners(fuzzCase, broker);
+    checkViolations(fuzzCase, broker);
 }
 
 void runRequest(const std::uint8_t* data, std::size_t size, Factories factories, Check check) {

@@ -19,7 +19,7 @@ struct Ending {
 };
 
 /// Ends the program where the broker has something to complain of.
-void checkManners(const FuzzCase& fuzzCase, cmpihost::Broker& broker);
+void checkViolations(const FuzzCase& fuzzCase, cmpihost::Broker& broker);
 
 /// Ends the program where the request to the provider broke a rule; the records are those of
 /// StrictLog.
