@@ -179,9 +179,8 @@ CMPIString* getType(BrokerCore& core, const CallName& call, const void* object, 
     return makeString(core, factsOf(object, call).kind);
 }
 
-using FT = CMPIBrokerEncFT;
-
-FT completeTable() {
+CMPIBrokerEncFT completeFactories() {
+    using FT = CMPIBrokerEncFT;
     using Text = const char*;
     FT table{};
     table.ftVersion = CMPICurrentVersion;
@@ -208,8 +207,8 @@ FT completeTable() {
 }  // namespace
 
 CMPIBrokerEncFT factoryTable(bool sparse) {
-    static const FT complete = completeTable();
-    FT table = complete;
+    static const CMPIBrokerEncFT complete = completeFactories();
+    CMPIBrokerEncFT table = complete;
     if (sparse) {
         table.ftVersion = 1;
         table.newCMPIError = nullptr;

@@ -57,9 +57,8 @@ void freeSelectExp(BrokerCore&, const CallName& call, CMPISelectExp* handle) {
     refuseNeverMade(handle, call, "CMPISelectExp");
 }
 
-using FT = CMPIBrokerMemFT;
-
-FT completeTable() {
+CMPIBrokerMemFT completeMemory() {
+    using FT = CMPIBrokerMemFT;
     FT table{};
     table.ftVersion = CMPICurrentVersion;
     bind<&FT::mark, &mark>(table, "mark");
@@ -82,7 +81,7 @@ FT completeTable() {
 }  // namespace
 
 CMPIBrokerMemFT memoryTable() {
-    static const FT complete = completeTable();
+    static const CMPIBrokerMemFT complete = completeMemory();
     return complete;
 }
 

@@ -64,7 +64,7 @@ std::vector<std::string> checkMiTable(const CMPIAssociationMIFT& table) {
 }
 
 /// The message as the provider's own macros would read it: it may be no object of this broker.
-std::string messageOf(const CMPIStatus& status) {
+std::string messageSuffix(const CMPIStatus& status) {
     if (status.msg == nullptr) return {};
     const char* const text = status.msg->ft->getCharPtr(status.msg, nullptr);
     return text == nullptr ? std::string() : std::string(": ") + text;
@@ -90,7 +90,7 @@ class Factory {
         MI* const made = callGuarded(broker.cmpi(), context, status);
         if (status.rc != CMPI_RC_OK) {
             throw LoadError(where_ + " answered status " + std::to_string(status.rc) +
-                            messageOf(status));
+                            messageSuffix(status));
         }
         if (made == nullptr) throw LoadError(where_ + " returned null");
         if (made->ft == nullptr) throw LoadError(where_ + " gave no table");
@@ -126,7 +126,7 @@ bool cleanUp(MI* interface, Broker& broker, const CMPIContext* context, bool ter
     const bool refuses = status.rc == CMPI_RC_DO_NOT_UNLOAD || status.rc == CMPI_RC_NEVER_UNLOAD;
     if (!refuses && status.rc != CMPI_RC_OK) {
         broker.core().report("cleanup answered status " + std::to_string(status.rc) +
-                             messageOf(status));
+                             messageSuffix(status));
     }
     return !refuses;
 }

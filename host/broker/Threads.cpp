@@ -171,9 +171,8 @@ int signalCondition(CMPI_COND_TYPE condition) {
     return pthread_cond_signal(conditionOf(condition));
 }
 
-using FT = CMPIBrokerExtFT;
-
-FT completeTable() {
+CMPIBrokerExtFT completeThreads() {
+    using FT = CMPIBrokerExtFT;
     FT table{};
     table.ftVersion = CMPICurrentVersion;
     bindThread<&FT::resolveFileName, &resolveFileName>(table, "resolveFileName");
@@ -202,8 +201,8 @@ FT completeTable() {
 }  // namespace
 
 CMPIBrokerExtFT threadTable(bool sparse) {
-    static const FT complete = completeTable();
-    FT table = complete;
+    static const CMPIBrokerExtFT complete = completeThreads();
+    CMPIBrokerExtFT table = complete;
     if (sparse) {
         table.joinThread = nullptr;
         table.exitThread = nullptr;

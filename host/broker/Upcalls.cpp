@@ -218,9 +218,8 @@ CMPIStatus detachThread(BrokerCore& core, const CallName& call, const CMPIContex
     return statusOf(CMPI_RC_OK);
 }
 
-using FT = CMPIBrokerFT;
-
-FT completeTable() {
+CMPIBrokerFT completeUpcalls() {
+    using FT = CMPIBrokerFT;
     using Context = const CMPIContext*;
     using Path = const CMPIObjectPath*;
     using Text = const char*;
@@ -259,8 +258,8 @@ FT completeTable() {
 }  // namespace
 
 CMPIBrokerFT upcallTable(bool sparse) {
-    static const FT complete = completeTable();
-    FT table = complete;
+    static const CMPIBrokerFT complete = completeUpcalls();
+    CMPIBrokerFT table = complete;
     if (sparse) table.brokerVersion = 0;
     return table;
 }

@@ -86,7 +86,7 @@ bool sameSet(const std::vector<Named>& left, const std::vector<Named>& right) {
            });
 }
 
-std::string quoted(const std::string& text) {
+std::string inQuotes(const std::string& text) {
     std::string result = "\"";
     for (const char letter : text) {
         if (letter == '"' || letter == '\\') result += '\\';
@@ -97,15 +97,15 @@ std::string quoted(const std::string& text) {
 
 /// As parsers of clients read it: booleans in capitals, and everything that is no number in quotes.
 std::string keyText(const Value& value) {
-    if (value.isNull()) return quoted("");
+    if (value.isNull()) return inQuotes("");
     if (value.type() == CMPI_boolean) return value.boolean() ? "TRUE" : "FALSE";
     if (value.type() == CMPI_char16) {
         std::string character;
         base::appendUtf8(character, static_cast<char32_t>(value.unsignedInteger()));
-        return quoted(character);
+        return inQuotes(character);
     }
     const bool isNumber = !value.isText() && value.type() != CMPI_ref;
-    return isNumber ? value.toText() : quoted(value.toText());
+    return isNumber ? value.toText() : inQuotes(value.toText());
 }
 
 template <class Real>

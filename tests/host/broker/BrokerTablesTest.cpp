@@ -73,80 +73,66 @@ TEST(CompleteBroker, LeavesNoSlotEmptyInLiveOrDeadObjects) {
     }
 }
 
-TEST(SparseBroker, AnnouncesLowVersionsAndLacksWhatMayBeMissing) {
-    Broker broker(nullptr, BrokerOptions::sparse());
-    Request request(broker);
-    const CMPIBroker* const mb = broker.cmpi();
+class SparseBroker : public ::testing::Test {
+  protected:
+    Broker broker{nullptr, BrokerOptions::sparse()};
+    Request request{broker};
+    const CMPIBroker* mb = broker.cmpi();
+    CMPIObjectPath* path = CMNewObjectPath(mb, "", "TEST_Thing", nullptr);
+};
+
+TEST_F(SparseBroker, AnnouncesLowVersionsAndLacksJustWhatMayBeMissing) {
     EXPECT_EQ(mb->bft->brokerVersion, 0u);
     EXPECT_EQ(mb->eft->ftVersion, 1);
     EXPECT_EQ(mb->xft->ftVersion, 200);
-    EXPECT_EQ(mb->mft, nullptr);
-    EXPECT_EQ(mb->eft->newCMPIError, nullptr);
-    EXPECT_EQ(mb->eft->openMessageFile, nullptr);
-    EXPECT_EQ(mb->eft->closeMessageFile, nullptr);
-    EXPECT_EQ(mb->eft->getMessage2, nullptr);
-    EXPECT_EQ(mb->xft->joinThread, nullptr);
-    EXPECT_EQ(mb->xft->exitThread, nullptr);
-    EXPECT_EQ(mb->xft->cancelThread, nullptr);
-    EXPECT_EQ(mb->xft->threadSleep, nullptr);
-    EXPECT_EQ(mb->xft->signalCondition, nullptr);
-    EXPECT_NE(mb->xft->newMutex, nullptr);
-
-    CMPIObjectPath* const path = CMNewObjectPath(mb, "", "TEST_Thing", nullptr);
     EXPECT_EQ(path->ft->ftVersion, 1);
-    EXPECT_EQ(path->ft->getClassQualifier, nullptr);
-    EXPECT_EQ(path->ft->getPropertyQualifier, nullptr);
-    EXPECT_EQ(path->ft->getMethodQualifier, nullptr);
-    EXPECT_EQ(path->ft->getParameterQualifier, nullptr);
-    EXPECT_EQ(CMNewInstance(mb, path, nullptr)->ft->setPropertyWithOrigin, nullptr);
+    EXPECT_EQ(mb->mft, nullptr);
+
+    CMPIBrokerEncFT* const eft = mb->eft;
+    EXPECT_FALSE(eft->newCMPIError || eft->openMessageFile || eft->closeMessageFile ||
+                 eft->getMessage2);
+    EXPECT_EQ(nullSlots(*eft, sizeof(void*)), 4u);
+    CMPIBrokerExtFT* const xft = mb->xft;
+    EXPECT_FALSE(xft->joinThread || xft->exitThread || xft->cancelThread || xft->threadSleep ||
+                 xft->signalCondition);
+    EXPECT_EQ(nullSlots(*xft, sizeof(void*)), 5u);
+    CMPIObjectPathFT* const ft = path->ft;
+    EXPECT_FALSE(ft->getClassQualifier || ft->getPropertyQualifier || ft->getMethodQualifier ||
+                 ft->getParameterQualifier);
+    EXPECT_EQ(nullSlotsOf(path), 4u);
+    CMPIInstance* const instance = CMNewInstance(mb, path, nullptr);
+    EXPECT_FALSE(instance->ft->setPropertyWithOrigin);
+    EXPECT_EQ(nullSlotsOf(instance), 1u);
     ResultCollector collector(request);
-    EXPECT_EQ(collector.cmpi()->ft->returnError, nullptr);
+    EXPECT_FALSE(collector.cmpi()->ft->returnError);
+    EXPECT_EQ(nullSlotsOf(collector.cmpi()), 1u);
 }
 
-TEST(SparseBroker, TellsMissingItemsAndKeysInItsOwnWay) {
-    Broker broker(nullptr, BrokerOptions::sparse());
-    Request request(broker);
+TEST_F(SparseBroker, TellsKeysAndMissingItemsInItsOwnWay) {
     CMPIStatus status = {CMPI_RC_OK, nullptr};
-    CMPIObjectPath* const path = CMNewObjectPath(broker.cmpi(), "", "TEST_Thing", nullptr);
-    EXPECT_EQ(CMGetKey(path, "Name", &status).state, CMPI_notFound);
+    EXPECT_EQ(shown(CMGetKey(path, "Name", &status)), "missing");
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_FOUND);
     CMAddKey(path, "Name", "x", CMPI_chars);
-    EXPECT_EQ(CMGetKey(path, "Name", &status).state, CMPI_goodValue);
+    EXPECT_EQ(shown(CMGetKey(path, "Name", &status)), "string x");
+    EXPECT_EQ(valueOf(CMNewInstance(mb, path, nullptr)).properties.size(), 1u);
+    EXPECT_EQ(valueOf(CMNewInstance(mb, path, nullptr)).property("Name")->text(), "x");
     const CMPIContext* const context = request.makeContext({}, "root");
     EXPECT_EQ(CMGetContextEntryCount(context, nullptr), 2u);
-    EXPECT_EQ(CMGetContextEntry(context, "CMPIInitNameSpace", &status).state, CMPI_notFound);
+    EXPECT_EQ(shown(CMGetContextEntry(context, "CMPIInitNameSpace", &status)), "missing");
 }
 
-TEST(SparseBroker, RecognisesDeadObjectsAllTheSame) {
-    Broker broker(nullptr, BrokerOptions::sparse());
-    CMPIObjectPath* path = nullptr;
+TEST_F(SparseBroker, SharesObjectsWithACompleteOneAndRecognisesDeadOnes) {
+    Broker complete;
     {
-        Request request(broker);
-        path = CMNewObjectPath(broker.cmpi(), "", "TEST_Thing", nullptr);
+        Request other(complete);
+        CMPIInstance* const instance = CMNewInstance(complete.cmpi(), path, nullptr);
+        ASSERT_NE(instance, nullptr);
+        EXPECT_EQ(valueOf(instance).path.className, "TEST_Thing");
     }
+    EXPECT_THAT(complete.violations(), IsEmpty());
+    request.end();
     CMGetKeyCount(path, nullptr);
     EXPECT_EQ(broker.violations().size(), 1u);
-}
-
-TEST(BrokersOfSeveralKinds, UnderstandEachOthersObjects) {
-    Broker complete;
-    Broker sparse(nullptr, BrokerOptions::sparse());
-    Request first(complete);
-    Request second(sparse);
-    CMPIObjectPath* const path = CMNewObjectPath(complete.cmpi(), "", "TEST_Thing", nullptr);
-    CMPIInstance* const instance = CMNewInstance(sparse.cmpi(), path, nullptr);
-    ASSERT_NE(instance, nullptr);
-    EXPECT_EQ(valueOf(instance).path.className, "TEST_Thing");
-}
-
-TEST(SparseBroker, SetsTheKeysOfAPathAsProperties) {
-    Broker broker(nullptr, BrokerOptions::sparse());
-    Request request(broker);
-    CMPIObjectPath* const path = CMNewObjectPath(broker.cmpi(), "", "TEST_Thing", nullptr);
-    CMAddKey(path, "Name", "x", CMPI_chars);
-    const InstanceValue made = valueOf(CMNewInstance(broker.cmpi(), path, nullptr));
-    ASSERT_EQ(made.properties.size(), 1u);
-    EXPECT_EQ(made.property("Name")->text(), "x");
 }
 
 class ThreadTable : public ::testing::Test {
@@ -185,6 +171,8 @@ void* raiseValue(void* parm) {
 TEST_F(ThreadTable, ThreadsMeetAtAConditionAndAreJoined) {
     Shared shared = {xft, xft->newMutex(0), xft->newCondition(0), 0};
     xft->lockMutex(shared.mutex);
+    timespec past{};
+    EXPECT_EQ(xft->timedCondWait(shared.condition, shared.mutex, &past), ETIMEDOUT);
     void* const thread = xft->newThread(raiseValue, &shared, 0);
     ASSERT_NE(thread, nullptr);
     while (shared.value == 0) xft->condWait(shared.condition, shared.mutex);
@@ -192,23 +180,9 @@ TEST_F(ThreadTable, ThreadsMeetAtAConditionAndAreJoined) {
     void* result = nullptr;
     EXPECT_EQ(xft->joinThread(thread, &result), 0);
     EXPECT_EQ(result, &shared);
-    xft->destroyCondition(shared.condition);
-    xft->destroyMutex(shared.mutex);
-}
-
-TEST_F(ThreadTable, AWaitEndsWithItsTime) {
-    void* const mutex = xft->newMutex(0);
-    void* const condition = xft->newCondition(0);
-    timespec until{};
-    clock_gettime(CLOCK_REALTIME, &until);
-    until.tv_sec -= 1;
-    xft->lockMutex(mutex);
-    EXPECT_EQ(xft->timedCondWait(condition, mutex, &until), ETIMEDOUT);
-    xft->unlockMutex(mutex);
-    xft->destroyCondition(condition);
-    xft->destroyMutex(mutex);
-    xft->destroyCondition(nullptr);
-    xft->destroyMutex(nullptr);
+    for (void* const each : {shared.condition, static_cast<void*>(nullptr)})
+        xft->destroyCondition(each);
+    for (void* const each : {shared.mutex, static_cast<void*>(nullptr)}) xft->destroyMutex(each);
 }
 
 void* leaveEarly(void* parm) {

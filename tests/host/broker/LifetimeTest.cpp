@@ -180,12 +180,11 @@ TEST_F(Lifetimes, EveryKindOfObjectButAResultCanBeCloned) {
     EXPECT_EQ(CMGetArgCount(args, nullptr), 0u);
     EXPECT_EQ(CMGetContextEntryCount(context, nullptr), 4u);
     EXPECT_EQ(broker.unreleasedClones(), 6u);
-    CMRelease(instance);
-    CMRelease(string);
-    CMRelease(array);
-    CMRelease(date);
-    CMRelease(args);
-    CMRelease(context);
+    const auto releaseAll = [](auto*... clones) {
+        const CMPIrc results[] = {CMRelease(clones).rc...};
+        for (const CMPIrc rc : results) EXPECT_EQ(rc, CMPI_RC_OK);
+    };
+    releaseAll(instance, string, array, date, args, context);
     EXPECT_EQ(broker.unreleasedClones(), 0u);
     EXPECT_THAT(broker.violations(), IsEmpty());
 }
