@@ -176,6 +176,9 @@ TEST(CmpiLayout, NoMemberIsWithoutARow) {
     }
 #define MEMBER(...)
 #include "Records.inc"
+#undef RECORD
+#undef UNION
+#undef MEMBER
 }
 
 TEST(CmpiLayout, ABareInitialiserOfAValueSetsItsLongestInteger) {

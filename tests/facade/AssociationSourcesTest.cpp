@@ -11,9 +11,6 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::SizeIs;
 
-const std::string cs = "KORVA_ComputerSystem";
-const std::string os = "KORVA_OperatingSystem";
-
 class Sources : public FacadeFixture {
   protected:
     // Whether the source leads anywhere; checks that the four operations agree.

@@ -14,6 +14,10 @@ using Texts = std::vector<std::string>;
 extern const char* const file;
 LoadOptions loadOptions();
 
+/// The classes at the two ends of an installation.
+inline const std::string cs = "KORVA_ComputerSystem";
+inline const std::string os = "KORVA_OperatingSystem";
+
 /// The three paths that there are on the fixture's host, as text.
 inline constexpr const char* computerSystem =
     R"(root/cimv2:KORVA_ComputerSystem.CreationClassName="KORVA_ComputerSystem",Name="host1")";

@@ -8,9 +8,6 @@ namespace {
 using namespace facade;
 using testing::ElementsAre;
 
-const std::string cs = "KORVA_ComputerSystem";
-const std::string os = "KORVA_OperatingSystem";
-
 Value to(const ObjectPathValue& path) {
     return Value::fromReference(path);
 }
@@ -22,7 +19,7 @@ ObjectPathValue inNamespace(ObjectPathValue path, const std::string& nameSpace,
     return path;
 }
 
-ObjectPathValue installed(const ObjectPathValue& system, const ObjectPathValue& part) {
+ObjectPathValue installedPair(const ObjectPathValue& system, const ObjectPathValue& part) {
     return pairPath(installedOS, system, part);
 }
 
@@ -145,14 +142,14 @@ TEST_F(InstanceOperations, GetTheOneOfSeveralThatAllKeysName) {
     EXPECT_THAT(delivered(get(operatingSystemPath("host1", "b"))), testing::SizeIs(1));
     EXPECT_THAT(delivered(get(capabilitiesPath("c"))),
                 ElementsAre("root/cimv2:KORVA_OperatingSystemCapabilities.InstanceID=\"c\""));
-    EXPECT_THAT(
-        delivered(get(installed(computerSystemPath("host2"), operatingSystemPath("host1", "b")))),
-        testing::SizeIs(1));
+    EXPECT_THAT(delivered(get(
+                    installedPair(computerSystemPath("host2"), operatingSystemPath("host1", "b")))),
+                testing::SizeIs(1));
     EXPECT_THAT(
         delivered(get(capabilitiesPair(operatingSystemPath("host1", "a"), capabilitiesPath("b")))),
         testing::SizeIs(1));
     EXPECT_EQ(
-        refusal(get(installed(computerSystemPath("host1"), operatingSystemPath("host1", "b")))),
+        refusal(get(installedPair(computerSystemPath("host1"), operatingSystemPath("host1", "b")))),
         "6 no instance of KORVA_InstalledOS has this GroupComponent, PartComponent");
 }
 
@@ -166,9 +163,9 @@ TEST_F(InstanceOperations, GetWhateverTheSpellingOfNamesAndNamespaces) {
                                        {"CSCREATIONCLASSNAME", cs}}),
         inNamespace(part, "root/cimv2", "host.example"),
         path("korva_INSTALLEDOS", {{"partcomponent", to(part)}, {"GROUPCOMPONENT", to(system)}}),
-        installed(inNamespace(system, ""), inNamespace(part, "", "host.example")),
-        installed(inNamespace(system, "ROOT/CIMV2", "192.0.2.1"), part),
-        installed(computerSystemPath("HOST1"), operatingSystemPath("Host1", "linux")),
+        installedPair(inNamespace(system, ""), inNamespace(part, "", "host.example")),
+        installedPair(inNamespace(system, "ROOT/CIMV2", "192.0.2.1"), part),
+        installedPair(computerSystemPath("HOST1"), operatingSystemPath("Host1", "linux")),
         capabilitiesPair(operatingSystemPath("HOST1", "LINUX"), capabilitiesPath("Linux")),
     };
     for (const ObjectPathValue& row : rows)
@@ -198,11 +195,11 @@ TEST_F(InstanceOperations, SayWhichKeyIsNotAsItMustBe) {
          "4 key GroupComponent is no reference"},
         {path("KORVA_RunningOS", {{"Antecedent", to(part)}}),
          "4 key Dependent of KORVA_RunningOS is missing"},
-        {installed(system, path(os, {{"Name", "Linux"}})),
+        {installedPair(system, path(os, {{"Name", "Linux"}})),
          "4 PartComponent: key CSCreationClassName of KORVA_OperatingSystem is missing"},
-        {installed(path("Other_ComputerSystem", {{"Itself", to(system)}}), part),
+        {installedPair(path("Other_ComputerSystem", {{"Itself", to(system)}}), part),
          "4 GroupComponent: key Itself is a reference"},
-        {installed(installed(system, part), part),
+        {installedPair(installedPair(system, part), part),
          "4 GroupComponent: key GroupComponent is a reference"},
         {operatingSystemPath("host1", "Linux2"),
          "6 no instance of KORVA_OperatingSystem has this Name"},
@@ -216,11 +213,11 @@ TEST_F(InstanceOperations, SayWhichKeyIsNotAsItMustBe) {
          "6 no instance of KORVA_OperatingSystem has this CSCreationClassName"},
         {capabilitiesPath("linux"),
          "6 no instance of KORVA_OperatingSystemCapabilities has this InstanceID"},
-        {installed(computerSystemPath("host2"), part),
+        {installedPair(computerSystemPath("host2"), part),
          "6 no instance of KORVA_InstalledOS has this GroupComponent"},
-        {installed(system, inNamespace(part, "root/other")),
+        {installedPair(system, inNamespace(part, "root/other")),
          "6 no instance of KORVA_InstalledOS has this PartComponent"},
-        {installed(path("Other_ComputerSystem", system.keys), part),
+        {installedPair(path("Other_ComputerSystem", system.keys), part),
          "6 no instance of KORVA_InstalledOS has this GroupComponent"},
         {capabilitiesPair(part, capabilitiesPath("linux")),
          "6 no instance of KORVA_OSElementCapabilities has this Capabilities"},
@@ -236,9 +233,9 @@ TEST_F(InstanceOperations, SayWhichKeyIsNotAsItMustBe) {
 
 TEST_F(InstanceOperations, SayThatWhatIsNowhereIsNotFound) {
     computers.setNames({});
-    EXPECT_EQ(
-        refusal(get(installed(computerSystemPath("host1"), operatingSystemPath("host1", "Linux")))),
-        "6 no instance of KORVA_InstalledOS has this GroupComponent, PartComponent");
+    EXPECT_EQ(refusal(get(installedPair(computerSystemPath("host1"),
+                                        operatingSystemPath("host1", "Linux")))),
+              "6 no instance of KORVA_InstalledOS has this GroupComponent, PartComponent");
     setNodes({});
     EXPECT_EQ(refusal(get(capabilitiesPath("Linux"))),
               "6 no instance of KORVA_OperatingSystemCapabilities has this InstanceID");

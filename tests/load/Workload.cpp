@@ -118,7 +118,7 @@ void Workload::send(const ProviderLibrary& to, const std::vector<const MixedRequ
     sendShare(to, picked, next);
     for (std::thread& other : others) other.join();
     const MixedRequest* const wrong = wrong_;
-    if (wrong != nullptr) throw std::runtime_error("wrong status of " + describe(wrong->request));
+    if (wrong != nullptr) throw std::runtime_error("wrong status of " + ::describe(wrong->request));
 }
 
 void Workload::sendShare(const ProviderLibrary& to, const std::vector<const MixedRequest*>& picked,
