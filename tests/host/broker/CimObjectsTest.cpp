@@ -1,3 +1,4 @@
+// Object paths, instances and strings as a provider sees them through their tables.
 #include "BrokerFixture.h"
 
 #include "host/broker/Object.h"

@@ -1,3 +1,4 @@
+// The objects that only carry data, as a provider sees them through their tables.
 #include "BrokerFixture.h"
 
 #include "host/broker/ComputerSystemService.h"

@@ -1,3 +1,5 @@
+// What a provider may ask of the broker about objects and texts, and what the broker does not
+// offer.
 #include "BrokerFixture.h"
 
 #include "host/broker/ResultCollector.h"

@@ -1,3 +1,5 @@
+// The value model: what values, paths and instances are equal to, how they read, and datetimes as
+// numbers.
 #include "host/broker/Value.h"
 
 #include "host/broker/ClassCatalogue.h"
