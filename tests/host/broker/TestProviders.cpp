@@ -27,6 +27,18 @@ std::string textOf(const CMPIString* string) {
     return text == nullptr ? "(none)" : text;
 }
 
+/// Returns the last instance or path of an answer, and its end.
+CMPIStatus deliver(const CMPIResult* result, const CMPIInstance* instance) {
+    CMReturnInstance(result, instance);
+    CMReturnDone(result);
+    return done();
+}
+CMPIStatus deliver(const CMPIResult* result, const CMPIObjectPath* path) {
+    CMReturnObjectPath(result, path);
+    CMReturnDone(result);
+    return done();
+}
+
 CMPIObjectPath* pathOf(const CMPIObjectPath* given, const char* name) {
     CMPIObjectPath* const path = CMNewObjectPath(
         broker, textOf(CMGetNameSpace(given, nullptr)).c_str(), "TEST_Thing", nullptr);
@@ -61,9 +73,7 @@ CMPIStatus associationCleanup(CMPIAssociationMI*, const CMPIContext*, CMPIBoolea
 CMPIStatus enumerateInstanceNames(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
                                   const CMPIObjectPath* path) {
     CMReturnObjectPath(result, pathOf(path, "one"));
-    CMReturnObjectPath(result, pathOf(path, "two"));
-    CMReturnDone(result);
-    return done();
+    return deliver(result, pathOf(path, "two"));
 }
 
 CMPIStatus enumerateInstances(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
@@ -73,9 +83,7 @@ CMPIStatus enumerateInstances(CMPIInstanceMI*, const CMPIContext*, const CMPIRes
     for (; properties != nullptr && *properties != nullptr; ++properties) list += *properties;
     setText(instance, "Properties", list.c_str());
     CMReturnInstance(result, instance);
-    CMReturnInstance(result, instanceOf(path, "two"));
-    CMReturnDone(result);
-    return done();
+    return deliver(result, instanceOf(path, "two"));
 }
 
 /// Tells the type of the key "Name" and what stands in the context.
@@ -93,17 +101,13 @@ CMPIStatus getInstance(CMPIInstanceMI*, const CMPIContext* context, const CMPIRe
         setText(instance, name,
                 status.rc == CMPI_RC_OK ? textOf(entry.value.string).c_str() : "(missing)");
     }
-    CMReturnInstance(result, instance);
-    CMReturnDone(result);
-    return done();
+    return deliver(result, instance);
 }
 
 CMPIStatus createInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
                           const CMPIObjectPath* path, const CMPIInstance* instance) {
     const CMPIData name = CMGetProperty(instance, "Name", nullptr);
-    CMReturnObjectPath(result, pathOf(path, textOf(name.value.string).c_str()));
-    CMReturnDone(result);
-    return done();
+    return deliver(result, pathOf(path, textOf(name.value.string).c_str()));
 }
 
 CMPIStatus modifyInstance(CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
@@ -134,32 +138,24 @@ CMPIInstance* echo(const CMPIObjectPath* path, const char* operation, const char
 CMPIStatus associators(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
                        const CMPIObjectPath* path, const char* assocClass, const char* resultClass,
                        const char* role, const char* resultRole, const char**) {
-    CMReturnInstance(result, echo(path, "associators", assocClass, resultClass, role, resultRole));
-    CMReturnDone(result);
-    return done();
+    return deliver(result, echo(path, "associators", assocClass, resultClass, role, resultRole));
 }
 
 CMPIStatus associatorNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
                            const CMPIObjectPath* path, const char*, const char*, const char*,
                            const char*) {
-    CMReturnObjectPath(result, pathOf(path, "associatorNames"));
-    CMReturnDone(result);
-    return done();
+    return deliver(result, pathOf(path, "associatorNames"));
 }
 
 CMPIStatus references(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
                       const CMPIObjectPath* path, const char* resultClass, const char* role,
                       const char**) {
-    CMReturnInstance(result, echo(path, "references", nullptr, resultClass, role, nullptr));
-    CMReturnDone(result);
-    return done();
+    return deliver(result, echo(path, "references", nullptr, resultClass, role, nullptr));
 }
 
 CMPIStatus referenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
                           const CMPIObjectPath* path, const char*, const char*) {
-    CMReturnObjectPath(result, pathOf(path, "referenceNames"));
-    CMReturnDone(result);
-    return done();
+    return deliver(result, pathOf(path, "referenceNames"));
 }
 
 CMPIInstanceMIFT instanceTable = {
