@@ -14,7 +14,7 @@ HostEnvironment hostEnvironment;
 /// The destructor is never run: threads that outlive the end of main may still call the logger.
 union NoDestructor {
     constexpr NoDestructor() : logger(hostEnvironment) {}
-    ~NoDestructor() {}
+    ~NoDestructor() {}  // NOLINT(modernize-use-equals-default): of a union, it would be deleted
 
     Logger logger;
 } process;

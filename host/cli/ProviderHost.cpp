@@ -129,7 +129,7 @@ std::vector<std::string> ProviderHost::unload() {
         escapes = true;
     }
     std::vector<std::string> caught = broker_.takeViolations();
-    if (escapes) caught.push_back("an exception left cleanup");
+    if (escapes) caught.emplace_back("an exception left cleanup");
     return caught;
 }
 

@@ -55,7 +55,7 @@ class Lexer {
 /// Reads a number as MOF writes it: decimal, octal (leading 0), hexadecimal (0x), binary (trailing
 /// b) or real, each with an optional sign. Returns false with a complaint when it is none of these
 /// or does not fit 64 bits.
-bool parseNumber(const std::string& text, Scalar& value, std::string& complaint);
+bool parseNumber(const std::string& written, Scalar& value, std::string& complaint);
 
 /// The text as a string constant of MOF, quotes included. Control characters become escapes; bytes
 /// that are no UTF-8 become U+FFFD.
