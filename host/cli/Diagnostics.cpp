@@ -172,7 +172,7 @@ std::string hintFor(const OperationRequest& request, const OperationResult& fail
     const bool associators = request.operation == Operation::Associators ||
                              request.operation == Operation::AssociatorNames;
     if (!associators || failure.rc != CMPI_RC_ERR_INVALID_CLASS) return {};
-    const std::string unknown = linesOnUnknownNames("hint: ", request, schema);
+    std::string unknown = linesOnUnknownNames("hint: ", request, schema);
     // The name is right as far as the schema knows, so there is nothing to advise.
     if (request.assocClass) return unknown;
     std::string names;

@@ -76,6 +76,7 @@ class MofPrinter final : public Printer {
         }
     }
 
+    /// MOF has no form for a path: an instance with its keys alone says the same.
     void print(const std::vector<ObjectPathValue>& paths) override {
         std::vector<InstanceValue> instances;
         for (const ObjectPathValue& path : paths) {

@@ -87,6 +87,7 @@ std::string PathParser::takeWhile(bool (*belongs)(char)) {
     return source_.text.substr(start, offset_ - start);
 }
 
+/// Other clients take the address of a server before the path, so it is what users try first.
 void PathParser::refuseServerAddress() const {
     for (const char* scheme : {"http://", "https://"}) {
         const std::string start = source_.text.substr(0, std::string(scheme).size());
@@ -197,6 +198,7 @@ Value PathParser::value(CMPIType declared, const std::string& keyName) {
                     "when the path stands in '...')");
 }
 
+/// A key's text alone does not tell whether it is a path or a datetime: the class does.
 Value PathParser::quotedValue(CMPIType declared) {
     Source content = quotedText();
     if (declared == CMPI_ref) {

@@ -154,7 +154,7 @@ std::string selectedClass(const std::string& query) {
     bool afterFrom = false;
     for (std::size_t start = query.find_first_not_of(blanks); start != std::string::npos;) {
         const std::size_t end = query.find_first_of(blanks, start);
-        const std::string word = query.substr(start, end - start);
+        std::string word = query.substr(start, end - start);
         if (afterFrom) return word;
         afterFrom = base::equalsIgnoreCase(word, "FROM");
         start = query.find_first_not_of(blanks, end);

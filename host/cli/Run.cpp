@@ -129,9 +129,10 @@ class Run {
         return written();
     }
 
-    /// Has the request answered once its path has all keys.
+    /// Has the request answered once its path has all keys. The path is told: a script can give it
+    /// in full the next time, and a person sees what was asked.
     OperationResult completed(ProviderHost& host, OperationRequest& request) {
-        const OperationResult names = host.ask(namesRequest(request.path));
+        OperationResult names = host.ask(namesRequest(request.path));
         if (names.rc != CMPI_RC_OK) return names;
         request.path = completedPath(request.path, names.paths);
         err_ << "cmpihost: completed the path: " << base::escapeForTerminal(toString(request.path))

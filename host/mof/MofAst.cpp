@@ -17,7 +17,8 @@ struct TypeRow {
     bool isSigned{};
 };
 
-/// In the order of Type.
+/// In the order of Type. "ref" is only how a reference is called: it is declared by a class and
+/// REF.
 constexpr TypeRow types[] = {
     {"boolean"},
     {"string"},
