@@ -29,7 +29,7 @@ if [ $# -gt 0 ]; then
     mv "$folder/chosen" "$folder/files"
 fi
 
-if xargs -P "$(nproc)" -n 1 clang-tidy --quiet -p "$folder" <"$folder/files" >"$folder/findings" 2>"$folder/errors"; then
+if xargs -r -P "$(nproc)" -n 1 clang-tidy --quiet -p "$folder" <"$folder/files" >"$folder/findings" 2>"$folder/errors"; then
     echo "$(wc -l <"$folder/files") files, no finding"
 else
     # Findings in headers of others are counted, but not shown.
