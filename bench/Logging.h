@@ -4,6 +4,8 @@
 
 #include <string>
 
+#include "tests/support/TemporaryDirectory.h"
+
 namespace bench {
 
 /// The logging library follows a configuration of this program's, kept in a folder that goes with
@@ -15,17 +17,14 @@ class LoggingConfiguration {
 
     /// Nothing but failures passes, as without any configuration.
     LoggingConfiguration();
-    ~LoggingConfiguration();
-    LoggingConfiguration(const LoggingConfiguration&) = delete;
-    LoggingConfiguration& operator=(const LoggingConfiguration&) = delete;
 
     /// Puts settings in force; returns when they are.
     void use(const std::string& settings);
 
-    const std::string& folder() const noexcept { return folder_; }
+    const std::string& folder() const noexcept { return folder_.path(); }
 
   private:
-    std::string folder_;
+    TemporaryDirectory folder_;
 };
 
 }  // namespace bench

@@ -35,9 +35,9 @@ class ConfigurationFileTest : public testing::Test {
         environment_.setAhead(60);
     }
 
-    TemporaryFolder folder_;
+    TemporaryDirectory folder_;
     FakeEnvironment environment_;
-    const std::string path_ = folder_ / "zblog.conf";
+    const std::string path_ = folder_.path("zblog.conf");
     ConfigurationFile file_{{path_, true}, environment_};
 };
 
@@ -136,8 +136,8 @@ TEST_F(ConfigurationFileTest, IsNotReadWhileItRests) {
 }
 
 TEST_F(ConfigurationFileTest, TellsOnceWhyThereIsNothingToRead) {
-    const std::string missing = folder_ / "missing", link = folder_ / "link",
-                      fifo = folder_ / "fifo", tooLong = folder_ / "long";
+    const std::string missing = folder_.path("missing"), link = folder_.path("link"),
+                      fifo = folder_.path("fifo"), tooLong = folder_.path("long");
     std::filesystem::create_symlink(link, link);
     ASSERT_EQ(::mkfifo(fifo.c_str(), 0600), 0);
     writeFile(tooLong, std::string(100000, '\n'));

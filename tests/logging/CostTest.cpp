@@ -117,14 +117,14 @@ class CostTest : public testing::Test {
   protected:
     /// A logger in which each kind of filter keeps something out.
     CostTest() {
-        configuration_.of(Channel::log) = everythingTo(Destination::file, folder_ / "log");
+        configuration_.of(Channel::log) = everythingTo(Destination::file, folder_.path("log"));
         configuration_.of(Channel::log).level = 3000;
         configuration_.of(Channel::log).categories.add("Zumbrel.OSStatusProvider");
         configuration_.of(Channel::log).categories.add("Other.*");
         logger_.use(configuration_);
     }
 
-    TemporaryFolder folder_;
+    TemporaryDirectory folder_;
     FakeEnvironment environment_;
     Configuration configuration_;
     Logger logger_{environment_};
@@ -157,7 +157,7 @@ TEST_F(CostTest, FilteredRecordOfTheProcessIsFree) {
 }
 
 TEST_F(CostTest, LookAtTheConfigurationFileComesOnceASecond) {
-    environment_.source = {folder_ / "zblog.conf", false};
+    environment_.source = {folder_.path("zblog.conf"), false};
     Logger logger(environment_);
     logger.write(record(text_, 4000));
     EXPECT_EQ(withoutSystemCalls([&] {
@@ -173,7 +173,7 @@ TEST_F(CostTest, LookAtTheConfigurationFileComesOnceASecond) {
 }
 
 TEST_F(CostTest, RestingConfigurationFileCostsNoAllocation) {
-    environment_.source = {folder_ / "zblog.conf", true};
+    environment_.source = {folder_.path("zblog.conf"), true};
     writeFile(environment_.source.path, "log.level = 3000\n");
     environment_.setAhead(60);
     Logger logger(environment_);
@@ -193,7 +193,7 @@ TEST_F(CostTest, WrittenRecordCostsOneWriteAndNoAllocation) {
     EXPECT_EQ(allocationsOf([&] { logger_.write(record(text_)); }), 0);
     if (!before) GTEST_SKIP() << "the kernel does not count writes";
     EXPECT_EQ(*writeCalls() - *before, rounds);
-    EXPECT_EQ(textsOf(readFile(folder_ / "log")).size(), 1u + rounds);
+    EXPECT_EQ(textsOf(readFile(folder_.path("log"))).size(), 1u + rounds);
 }
 
 TEST_F(CostTest, WarmMessageBufferIsFree) {

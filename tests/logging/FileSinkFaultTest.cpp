@@ -34,12 +34,12 @@ class FileSizeLimit {
 
 class FileSinkFaultTest : public testing::Test {
   protected:
-    TemporaryFolder folder_;
+    TemporaryDirectory folder_;
     FakeEnvironment environment_;
 };
 
 TEST_F(FileSinkFaultTest, LossIsToldOnceToTheSystemsLogAndInTheFileWhenItCanBeWrittenAgain) {
-    const std::string disk = folder_ / "disk";
+    const std::string disk = folder_.path("disk");
     const std::string path = disk + "/full";
     const struct {
         const char* reason;
@@ -79,7 +79,7 @@ TEST_F(FileSinkFaultTest, LossIsToldOnceToTheSystemsLogAndInTheFileWhenItCanBeWr
 
 TEST_F(FileSinkFaultTest, UnwritableFolderIsToldOnceAndTheFileIsUsedWhenItBecomesWritable) {
     ASSERT_EQ(::chmod(folder_.path().c_str(), 0555), 0);
-    const std::string path = folder_ / "korva.log";
+    const std::string path = folder_.path("korva.log");
     const int status = inChildProcess([&] {
         if (::geteuid() == 0 && ::setresuid(65534, 65534, 0) != 0) return 1;
         FileSink sink(path, environment_);
@@ -98,7 +98,7 @@ TEST_F(FileSinkFaultTest, UnwritableFolderIsToldOnceAndTheFileIsUsedWhenItBecome
 }
 
 TEST_F(FileSinkFaultTest, HalfALineIsNeverContinuedByAnotherRecord) {
-    const std::string path = folder_ / "korva.log";
+    const std::string path = folder_.path("korva.log");
     FileSink sink(path, environment_);
     sink.write(record("one"));
     const std::string before = readFile(path);
@@ -121,7 +121,7 @@ TEST_F(FileSinkFaultTest, HalfALineIsNeverContinuedByAnotherRecord) {
 }
 
 TEST_F(FileSinkFaultTest, NewFileAfterATornLineBeginsWithoutAnEmptyLine) {
-    const std::string path = folder_ / "korva.log";
+    const std::string path = folder_.path("korva.log");
     FileSink sink(path, environment_);
     {
         const FileSizeLimit limit(10);
@@ -134,16 +134,16 @@ TEST_F(FileSinkFaultTest, NewFileAfterATornLineBeginsWithoutAnEmptyLine) {
 }
 
 TEST_F(FileSinkFaultTest, TornLineIsRememberedWhileTheFileIsAway) {
-    const std::string path = folder_ / "var/korva.log";
-    std::filesystem::create_directory(folder_ / "var");
+    const std::string path = folder_.path("var/korva.log");
+    std::filesystem::create_directory(folder_.path("var"));
     FileSink sink(path, environment_);
     {
         const FileSizeLimit limit(10);
         sink.write(record("torn"));
     }
-    std::filesystem::rename(folder_ / "var", folder_ / "away");
+    std::filesystem::rename(folder_.path("var"), folder_.path("away"));
     sink.write(record("lost"));
-    std::filesystem::rename(folder_ / "away", folder_ / "var");
+    std::filesystem::rename(folder_.path("away"), folder_.path("var"));
     sink.write(record("one"));
     EXPECT_EQ(readFile(path)[10], '\n');
     EXPECT_THAT(textsOf(readFile(path).substr(11)),
@@ -151,8 +151,8 @@ TEST_F(FileSinkFaultTest, TornLineIsRememberedWhileTheFileIsAway) {
 }
 
 TEST_F(FileSinkFaultTest, WhatIsNoPlainFileIsRefused) {
-    const std::string path = folder_ / "korva.log";
-    const std::string victim = folder_ / "victim";
+    const std::string path = folder_.path("korva.log");
+    const std::string victim = folder_.path("victim");
     writeFile(victim, "precious");
     const struct {
         std::function<void()> make;
@@ -174,7 +174,7 @@ TEST_F(FileSinkFaultTest, WhatIsNoPlainFileIsRefused) {
 }
 
 TEST_F(FileSinkFaultTest, FifoThatSomebodyReadsIsRefusedToo) {
-    const std::string path = folder_ / "fifo";
+    const std::string path = folder_.path("fifo");
     ASSERT_EQ(::mkfifo(path.c_str(), 0600), 0);
     const int reader = ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
     const std::size_t before = openDescriptors();

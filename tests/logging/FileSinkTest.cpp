@@ -121,9 +121,9 @@ class FileSinkTest : public testing::Test {
         return -1;
     }
 
-    TemporaryFolder folder_;
+    TemporaryDirectory folder_;
     FakeEnvironment environment_;
-    const std::string path_ = folder_ / "korva.log";
+    const std::string path_ = folder_.path("korva.log");
     FileSink sink_{path_, environment_};
 };
 
@@ -218,7 +218,7 @@ TEST_F(FileSinkTest, LeavesADescriptorAloneThatTheProcessTookFromIt) {
     sink_.write(record("one"));
     const int number = descriptorOf(path_);
     ASSERT_GE(number, 0);
-    const std::string others = folder_ / "data";
+    const std::string others = folder_.path("data");
     writeFile(others, "valuable");
     const int other = ::open(others.c_str(), O_RDWR | O_APPEND | O_CLOEXEC);
     ASSERT_EQ(::dup2(other, number), number);

@@ -104,7 +104,7 @@ std::string receivedBy(int listener) {
 }
 
 TEST(SystemLog, ReceivesEachRecordAsADatagramUnderTheNameOfTheProcess) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     const int status = inChildProcess([&] {
         if (!makeOwnDeviceFolder()) return notAllowed;
         const int listener = listenAtTheSystemsLog();
@@ -114,8 +114,8 @@ TEST(SystemLog, ReceivesEachRecordAsADatagramUnderTheNameOfTheProcess) {
         SystemLogSink sink(environment);
         sink.write(record("MESSAGE [File: A, Line: 9]: 100 %s full"));
         sink.write(record("VARIABLE: x", 4000));
-        writeFile(folder / "message", receivedBy(listener));
-        writeFile(folder / "variable", receivedBy(listener));
+        writeFile(folder.path("message"), receivedBy(listener));
+        writeFile(folder.path("variable"), receivedBy(listener));
         return receivedBy(listener).empty() ? 0 : 2;
     });
     if (status == notAllowed) GTEST_SKIP() << "this system lets nobody have a /dev of its own";
@@ -124,12 +124,12 @@ TEST(SystemLog, ReceivesEachRecordAsADatagramUnderTheNameOfTheProcess) {
     const std::string from =
         "[A-Z][a-z]{2} [ 0-9][0-9] [0-9:]{8} cimserver\\[[0-9]+\\]: "
         "korva-osstatus: log ";
-    EXPECT_THAT(readFile(folder / "message"),
+    EXPECT_THAT(readFile(folder.path("message")),
                 testing::MatchesRegex("<27>" + from +
                                       "3000 Zumbrel.Test work Work.cpp:12 "
                                       "MESSAGE \\[File: A, Line: 9\\]: 100 %s full"));
     EXPECT_THAT(
-        readFile(folder / "variable"),
+        readFile(folder.path("variable")),
         testing::MatchesRegex("<31>" + from + "4000 Zumbrel.Test work Work.cpp:12 VARIABLE: x"));
 }
 
@@ -147,12 +147,12 @@ bool failReads() {
 }
 
 TEST(ReadError, OfAConfigurationFileIsTold) {
-    const TemporaryFolder folder;
-    writeFile(folder / "zblog.conf", "log.level = 1\n");
+    const TemporaryDirectory folder;
+    writeFile(folder.path("zblog.conf"), "log.level = 1\n");
     const int status = inChildProcess([&] {
         if (!failReads()) return 1;
         FakeEnvironment environment;
-        ConfigurationFile file({folder / "zblog.conf", false}, environment);
+        ConfigurationFile file({folder.path("zblog.conf"), false}, environment);
         const auto read = file.readIfChanged();
         if (!read || read->errors.size() != 1) return 2;
         return read->errors[0].message == "cannot be read: Input/output error" ? 0 : 3;
@@ -161,11 +161,11 @@ TEST(ReadError, OfAConfigurationFileIsTold) {
 }
 
 TEST(Cancellation, MayHitAThreadWhileItWrites) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     FakeEnvironment environment;
     Logger logger(environment);
     Configuration configuration;
-    configuration.of(Channel::log) = everythingTo(Destination::file, folder / "log");
+    configuration.of(Channel::log) = everythingTo(Destination::file, folder.path("log"));
     logger.use(configuration);
     struct Work {
         Logger& logger;
@@ -190,7 +190,7 @@ TEST(Cancellation, MayHitAThreadWhileItWrites) {
         EXPECT_EQ(result, PTHREAD_CANCELED);
     }
     logger.write(record("last"));
-    EXPECT_EQ(textsOf(readFile(folder / "log")).back(), "last");
+    EXPECT_EQ(textsOf(readFile(folder.path("log"))).back(), "last");
 }
 
 }  // namespace

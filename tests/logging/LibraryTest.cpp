@@ -142,11 +142,11 @@ TEST(Library, TouchesNothingThatBelongsToTheProcess) {
 }
 
 TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
-    const TemporaryFolder folder;
-    const ConfigurationInMemory configuration("log.sink = file:" + (folder / "log") +
+    const TemporaryDirectory folder;
+    const ConfigurationInMemory configuration("log.sink = file:" + (folder.path("log")) +
                                               "\nlog.records = all\n"
                                               "trace.sink = file:" +
-                                              (folder / "trace") + "\n");
+                                              (folder.path("trace")) + "\n");
     std::size_t descriptors = 0;
     std::size_t bytes = 0;
     for (int round = 0; round < 100; ++round) {
@@ -170,25 +170,25 @@ TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
         if (round == 50) bytes = ::mallinfo2().uordblks;
     }
     EXPECT_LT(::mallinfo2().uordblks, bytes + 2000);
-    const auto texts = textsOf(readFile(folder / "log"));
+    const auto texts = textsOf(readFile(folder.path("log")));
     ASSERT_EQ(texts.size(), 200u);
     EXPECT_EQ(texts.front(), "round 0");
     EXPECT_EQ(texts[198], "round 99");
-    EXPECT_EQ(textsOf(readFile(folder / "trace")).size(), 100u);
+    EXPECT_EQ(textsOf(readFile(folder.path("trace"))).size(), 100u);
 }
 
 TEST(Library, FollowsAConfigurationInMemoryThatChanges) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     const ConfigurationInMemory configuration("log.sink = off\n");
     const LoadedLibrary loaded;
     loaded.log("one");
-    configuration.set("log.sink = file:" + (folder / "log") + "\nlog.records = all\n");
+    configuration.set("log.sink = file:" + (folder.path("log")) + "\nlog.records = all\n");
     const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(10);
-    while (readFile(folder / "log").empty() && std::chrono::steady_clock::now() < deadline) {
+    while (readFile(folder.path("log")).empty() && std::chrono::steady_clock::now() < deadline) {
         loaded.log("two");
         std::this_thread::sleep_for(std::chrono::milliseconds(20));
     }
-    EXPECT_THAT(textsOf(readFile(folder / "log")), ElementsAre("two"));
+    EXPECT_THAT(textsOf(readFile(folder.path("log"))), ElementsAre("two"));
 }
 
 TEST(Library, ReadsNoFileWhenTheEnvironmentNamesNone) {
@@ -203,10 +203,10 @@ TEST(Library, ReadsNoFileWhenTheEnvironmentNamesNone) {
 
 /// A process that ends while its threads go on logging.
 TEST(Library, LetsAProcessEndWhileItsThreadsGoOn) {
-    const TemporaryFolder folder;
+    const TemporaryDirectory folder;
     for (int round = 0; round < 10; ++round) {
         const int status = inChildProcess([&]() -> int {
-            const ConfigurationInMemory configuration("log.sink = file:" + (folder / "log") +
+            const ConfigurationInMemory configuration("log.sink = file:" + (folder.path("log")) +
                                                       "\nlog.records = all\n");
             static const LoadedLibrary& loaded =
                 *new LoadedLibrary;  // stays loaded until the process is gone
@@ -215,7 +215,7 @@ TEST(Library, LetsAProcessEndWhileItsThreadsGoOn) {
                     for (;;) loaded.log("going on");
                 }).detach();
             }
-            while (readFile(folder / "log").size() < 1000) std::this_thread::yield();
+            while (readFile(folder.path("log")).size() < 1000) std::this_thread::yield();
             std::exit(7);
         });
         EXPECT_EQ(status, 7);

@@ -24,12 +24,12 @@ class LoggerReloadTest : public testing::Test {
     }
     void write(const std::string& text) { logger_.write(record(text)); }
 
-    TemporaryFolder folder_;
+    TemporaryDirectory folder_;
     FakeEnvironment environment_;
-    const std::string path_ = folder_ / "zblog.conf";
+    const std::string path_ = folder_.path("zblog.conf");
     const std::string notInForce_ = warningOf(path_ + ": not in force; the defaults hold");
-    const std::string first_ = folder_ / "first";
-    const std::string second_ = folder_ / "second";
+    const std::string first_ = folder_.path("first");
+    const std::string second_ = folder_.path("second");
     const std::string toFirst_ = "log.sink = file:" + first_ + "\nlog.records = all\n";
     const std::string toSecond_ = "log.sink = file:" + second_ + "\nlog.records = all\n";
     ZBLog::Logger logger_{environment_};
@@ -86,13 +86,13 @@ TEST_F(LoggerReloadTest, OpensAClosedChannelAndClosesAnOpenOne) {
 }
 
 TEST_F(LoggerReloadTest, KeepsCountingLostRecordsWhenOnlyTheLevelChanges) {
-    const std::string file = folder_ / "var/log";
+    const std::string file = folder_.path("var/log");
     const std::string sink = "log.sink = file:" + file + "\nlog.records = all\n";
     configure(sink);
     write("lost");
     reconfigure(sink + "log.level = 4000\n");
     write("lost");
-    std::filesystem::create_directory(folder_ / "var");
+    std::filesystem::create_directory(folder_.path("var"));
     write("one");
     EXPECT_THAT(textsOf(readFile(file)),
                 ElementsAre("2 records were dropped: No such file or directory", "one"));

@@ -44,11 +44,11 @@ class LoggerTest : public testing::Test {
     std::vector<std::string> logged() const { return textsOf(readFile(log_)); }
     std::vector<std::string> traced() const { return textsOf(readFile(trace_)); }
 
-    TemporaryFolder folder_;
+    TemporaryDirectory folder_;
     FakeEnvironment environment_;
     Logger logger_{environment_};
-    const std::string log_ = folder_ / "log";
-    const std::string trace_ = folder_ / "trace";
+    const std::string log_ = folder_.path("log");
+    const std::string trace_ = folder_.path("trace");
 };
 
 TEST_F(LoggerTest, SendsFailuresToTheSystemsLogWithoutAnyConfiguration) {
@@ -121,13 +121,13 @@ TEST_F(LoggerTest, WritesNothingWhereTheSinkIsOff) {
 }
 
 TEST_F(LoggerTest, LeavesErrnoAloneWhenItWritesAndWhenItReadsItsConfiguration) {
-    use(to(folder_ / "missing/log"));
+    use(to(folder_.path("missing/log")));
     errno = 4242;
     write("lost", 3000);
     EXPECT_EQ(errno, 4242);
     EXPECT_EQ(environment_.takeSystemLog().size(), 1u);
 
-    environment_.source = {folder_ / "missing.conf", true};
+    environment_.source = {folder_.path("missing.conf"), true};
     Logger reading(environment_);
     errno = 4242;
     reading.write(record("filtered", 4000));
@@ -136,7 +136,7 @@ TEST_F(LoggerTest, LeavesErrnoAloneWhenItWritesAndWhenItReadsItsConfiguration) {
 }
 
 TEST_F(LoggerTest, ClosesItsFilesAndDropsRecordsAfterItsEnd) {
-    environment_.source = {folder_ / "zblog.conf", true};
+    environment_.source = {folder_.path("zblog.conf"), true};
     writeFile(environment_.source.path, "log.sink = file:" + log_ + "\n");
     const std::size_t before = openDescriptors();
     use(to(log_));
@@ -167,7 +167,7 @@ TEST_F(LoggerTest, ServesTheTwoCallsOfTheLibrary) {
 
 TEST_F(LoggerTest, LosesNothingWhileTheConfigurationChangesUnderManyThreads) {
     constexpr int threads = 8, recordsEach = 300;
-    environment_.source = {folder_ / "zblog.conf", true};
+    environment_.source = {folder_.path("zblog.conf"), true};
     const auto configure = [&](int round) {
         const std::string path = environment_.source.path;
         writeFile(path + ".new", "log.sink = file:" + log_ + std::to_string(round % 3) +
@@ -206,7 +206,7 @@ TEST_F(LoggerTest, LosesNothingWhileTheConfigurationChangesUnderManyThreads) {
 
 TEST_F(LoggerTest, LosesNoRecordOfThreadsThatAllComeFirst) {
     constexpr std::size_t threads = 8;
-    environment_.source = {folder_ / "zblog.conf", true};
+    environment_.source = {folder_.path("zblog.conf"), true};
     writeFile(environment_.source.path, "log.sink = file:" + log_ + "\nlog.records = all\n");
     std::vector<std::thread> writers;
     while (writers.size() < threads) writers.emplace_back([&] { write("first", 3000); });

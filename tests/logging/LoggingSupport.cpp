@@ -15,17 +15,6 @@
 
 namespace logging_test {
 
-TemporaryFolder::TemporaryFolder() {
-    std::string pattern = (std::filesystem::temp_directory_path() / "korva-log-XXXXXX").string();
-    if (::mkdtemp(pattern.data()) == nullptr) throw std::runtime_error("no temporary folder");
-    path_ = pattern;
-}
-
-TemporaryFolder::~TemporaryFolder() {
-    std::error_code ignored;
-    std::filesystem::remove_all(path_, ignored);
-}
-
 timespec FakeEnvironment::utc() noexcept {
     if (stoppedAt_ != 0) return {stoppedAt_, 0};
     timespec now{};

@@ -9,23 +9,9 @@
 
 #include "framework/logging/Configuration.h"
 #include "framework/logging/Environment.h"
+#include "support/TemporaryDirectory.h"
 
 namespace logging_test {
-
-/// A folder of its own, removed with all that is in it at the end.
-class TemporaryFolder {
-  public:
-    TemporaryFolder();
-    ~TemporaryFolder();
-    TemporaryFolder(const TemporaryFolder&) = delete;
-    TemporaryFolder& operator=(const TemporaryFolder&) = delete;
-
-    std::string operator/(const std::string& name) const { return path_ + "/" + name; }
-    const std::string& path() const { return path_; }
-
-  private:
-    std::string path_;
-};
 
 /// An environment whose clocks stand still until they are moved, and whose system log is a list of
 /// lines, each "PRIORITY TEXT".

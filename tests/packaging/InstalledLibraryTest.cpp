@@ -11,6 +11,7 @@
 #include "host/broker/Invoke.h"
 #include "host/broker/ProviderLibrary.h"
 #include "host/mof/Schema.h"
+#include "support/TemporaryDirectory.h"
 
 namespace {
 
@@ -47,16 +48,12 @@ struct Registered {
 class InstalledLibrary : public testing::TestWithParam<Registered> {
   protected:
     static void SetUpTestSuite() {
-        std::string pattern = (fs::temp_directory_path() / "installedXXXXXX").string();
-        ASSERT_NE(mkdtemp(pattern.data()), nullptr);
-        prefix_ = pattern;
         const std::string command = KORVA_CMAKE " --install '" KORVA_BINARY_DIR
                                                 "' --component provider --prefix '" +
-                                    pattern + "' >/dev/null";
+                                    prefix_.string() + "' >/dev/null";
         ASSERT_EQ(std::system(command.c_str()), 0);
         setenv("ZBLOG_CONF", "", 1);
     }
-    static void TearDownTestSuite() { fs::remove_all(prefix_); }
 
     InstalledLibrary()
         : catalogue_(Schema::load(prefix_ / "share/korva-osstatus/schema")), broker_(&catalogue_) {
@@ -84,7 +81,8 @@ class InstalledLibrary : public testing::TestWithParam<Registered> {
         return invoke(library, broker_, request).instances.size();
     }
 
-    static inline fs::path prefix_;
+    static inline const TemporaryDirectory directory_;
+    static inline const fs::path prefix_ = directory_.path();
     SchemaCatalogue catalogue_;
     ComputerSystemService computers_{"host1"};
     Broker broker_;

@@ -3,32 +3,10 @@
 #include <fcntl.h>
 #include <sys/stat.h>
 
-#include <cstdlib>
 #include <filesystem>
-#include <fstream>
 #include <stdexcept>
 
 namespace fs = std::filesystem;
-
-FixtureTree::FixtureTree() {
-    std::string pattern = (fs::temp_directory_path() / "korva-host-XXXXXX").string();
-    if (!::mkdtemp(pattern.data())) throw std::runtime_error("no temporary folder");
-    root_ = pattern;
-    // Readable for the tests that give up root's privileges.
-    fs::permissions(root_, fs::perms(0755));
-}
-
-FixtureTree::~FixtureTree() {
-    std::error_code ignored;
-    fs::remove_all(root_, ignored);
-}
-
-void FixtureTree::write(const std::string& name, const std::string& content) const {
-    fs::create_directories(fs::path(path(name)).parent_path());
-    std::ofstream file(path(name), std::ios::binary | std::ios::trunc);
-    file << content;
-    if (!file.flush()) throw std::runtime_error("cannot write " + path(name));
-}
 
 void FixtureTree::makeFolder(const std::string& name) const {
     fs::create_directories(path(name));

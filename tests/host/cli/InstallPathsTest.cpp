@@ -1,9 +1,8 @@
 #include "host/cli/InstallPaths.h"
 
 #include <gmock/gmock.h>
-#include <stdlib.h>
 
-#include <fstream>
+#include "support/TemporaryDirectory.h"
 
 namespace {
 
@@ -12,19 +11,16 @@ using namespace cmpihost;
 
 class InstallPaths : public testing::Test {
   protected:
-    void SetUp() override {
-        std::string name = (fs::temp_directory_path() / "placesXXXXXX").string();
-        ASSERT_NE(mkdtemp(name.data()), nullptr);
-        prefix_ = name;
+    InstallPaths() {
         for (const char* folder : {"bin", "lib/cmpi", "lib64/cmpi"}) {
             fs::create_directories(prefix_ / folder);
         }
     }
-    void TearDown() override { fs::remove_all(prefix_); }
-    void touch(const char* file) { std::ofstream(prefix_ / file) << ""; }
+    void touch(const char* file) { directory_.write(file, ""); }
     fs::path found() { return findLibrary(Library::Provider, prefix_ / "bin"); }
 
-    fs::path prefix_;
+    const TemporaryDirectory directory_;
+    const fs::path prefix_ = directory_.path();
 };
 
 TEST_F(InstallPaths, LookForTheSchemaBesideTheProgramsFolder) {

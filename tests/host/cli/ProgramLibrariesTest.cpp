@@ -8,6 +8,7 @@
 #include <fstream>
 
 #include "host/cli/Cmpihost.h"
+#include "support/TemporaryDirectory.h"
 
 namespace {
 
@@ -37,12 +38,6 @@ std::uintmax_t mappedSize(const fs::path& library) {
 
 class LibraryFile : public testing::Test {
   protected:
-    void SetUp() override {
-        std::string name = (fs::temp_directory_path() / "libraryXXXXXX").string();
-        ASSERT_NE(mkdtemp(name.data()), nullptr);
-        folder_ = name;
-    }
-    void TearDown() override { fs::remove_all(folder_); }
     std::string file(const std::string& content) {
         std::ofstream(folder_ / "x.so", std::ios::binary) << content;
         return (folder_ / "x.so").string();
@@ -51,7 +46,8 @@ class LibraryFile : public testing::Test {
         return cmpihost({"--provider", library, "ei", "X"});
     }
 
-    fs::path folder_;
+    const TemporaryDirectory directory_;
+    const fs::path folder_ = directory_.path();
 };
 
 TEST_F(LibraryFile, ThatIsNoProviderExitsWithThree) {

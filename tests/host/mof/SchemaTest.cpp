@@ -3,12 +3,10 @@
 #include "host/mof/Schema.h"
 
 #include <gmock/gmock.h>
-#include <stdlib.h>
-
-#include <fstream>
 
 #include "host/broker/Value.h"
 #include "host/mof/MofParser.h"
+#include "support/TemporaryDirectory.h"
 
 namespace {
 
@@ -110,18 +108,13 @@ TEST(SchemaCatalogue, GivesEveryTypeOfMofItsCmpiType) {
 
 class SchemaFolder : public testing::Test {
   protected:
-    void SetUp() override {
-        std::string name = (fs::temp_directory_path() / "schemaXXXXXX").string();
-        ASSERT_NE(mkdtemp(name.data()), nullptr);
-        folder_ = name;
-    }
-    void TearDown() override { fs::remove_all(folder_); }
-    void write(const char* name, const std::string& text) { std::ofstream(folder_ / name) << text; }
+    void write(const char* name, const std::string& text) { directory_.write(name, text); }
     static std::string refusal(const fs::path& folder) {
         return complaint([&] { Schema::load(folder); });
     }
 
-    fs::path folder_;
+    const TemporaryDirectory directory_;
+    const fs::path folder_ = directory_.path();
 };
 
 TEST_F(SchemaFolder, IsReadFileByFile) {
