@@ -33,6 +33,7 @@ std::unique_ptr<ObjectBase> Arena::release(const ObjectBase& object) noexcept {
 }
 
 void* Arena::mark() {
+    // Allocated one by one: the address is the handle that the provider gives back.
     marks_.push_back(std::make_unique<std::size_t>(objects_.size()));
     return marks_.back().get();
 }
@@ -49,12 +50,14 @@ bool Arena::releaseSince(const void* mark, Objects& retired) {
         objects_[i]->retire(Lifetime::Released);
         retired.push_back(std::move(objects_[i]));
     }
+    // Marks that were set later go along: their objects are gone.
     objects_.resize(first);
     marks_.erase(found, marks_.end());
     return true;
 }
 
 Objects Arena::endRequest(std::size_t kept) noexcept {
+    // The oldest go: what is used too late is most often what was made last.
     const std::size_t surplus = objects_.size() - std::min(objects_.size(), kept);
     objects_.erase(objects_.begin(), objects_.begin() + static_cast<std::ptrdiff_t>(surplus));
     for (const auto& object : objects_) {
@@ -83,6 +86,7 @@ void* Arena::reallocate(void* block, std::size_t size) {
     if (found == blocks_.end()) return nullptr;
     void* grown = std::realloc(block, atLeastOne(size));
     if (grown == nullptr) return nullptr;
+    // The node is reused, so that nothing can throw once the block has moved.
     auto node = blocks_.extract(found);
     node.value() = grown;
     blocks_.insert(std::move(node));

@@ -35,9 +35,9 @@ class Arena {
     Objects endRequest(std::size_t kept) noexcept;
 
     void* allocate(std::size_t size);
-    /// Null: the block is none of this arena, or there is no memory.
+    /// Returns null if the block does not belong to this arena or there is no memory.
     void* reallocate(void* block, std::size_t size);
-    /// False: the block is none of this arena.
+    /// Returns false if the block does not belong to this arena.
     bool free(void* block) noexcept;
 
   private:

@@ -60,7 +60,7 @@ class UpcallService {
 };
 
 /// A broker with all its tables, for one or more providers. Objects that providers make through it
-/// belong to the Request that is open on the thread. Several threads may run requests at once;
+/// belong to the RequestScope that is open on the thread. Several threads may run requests at once;
 /// catalogue, routes and fault plan are set while none runs. The broker outlives its requests and
 /// loaded libraries.
 class Broker {

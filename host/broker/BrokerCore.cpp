@@ -10,14 +10,15 @@ namespace cmpihost {
 
 namespace {
 
-RequestScope*& innermostOfThread() noexcept {
-    static thread_local RequestScope* innermost = nullptr;
+/// The innermost is enough: each scope knows the one around it.
+ObjectScope*& innermostOfThread() noexcept {
+    static thread_local ObjectScope* innermost = nullptr;
     return innermost;
 }
 
 [[noreturn]] void refuseHandle(const std::string& violation, CMPIrc rc) {
-    // A handle that is none does not tell its broker: that of the request is the likeliest.
-    if (RequestScope* const scope = RequestScope::innermost()) scope->core().report(violation);
+    // An invalid handle does not lead to its broker: that of the request is the likeliest.
+    if (ObjectScope* const scope = ObjectScope::innermost()) scope->core().report(violation);
     throw Failure{rc};
 }
 
@@ -43,17 +44,17 @@ void refuseForeign(const CallName& call, std::string_view kind) {
                  CMPI_RC_ERR_INVALID_HANDLE);
 }
 
-RequestScope* RequestScope::innermost() noexcept {
+ObjectScope* ObjectScope::innermost() noexcept {
     return innermostOfThread();
 }
 
-RequestScope::RequestScope(BrokerCore& core, Kind kind)
+ObjectScope::ObjectScope(BrokerCore& core, Kind kind)
     : core_(core), kind_(kind), outer_(innermost()), arena_(core.threadArena()) {
     if (arena_ == nullptr) arena_ = &own_.emplace();
     innermostOfThread() = this;
 }
 
-void RequestScope::end() noexcept {
+void ObjectScope::end() noexcept {
     if (!open_) return;
     open_ = false;
     innermostOfThread() = outer_;
@@ -76,7 +77,7 @@ const ClassDeclaration* BrokerCore::declaration(std::string_view className) cons
 }
 
 Arena* BrokerCore::threadArena() const noexcept {
-    for (RequestScope* scope = RequestScope::innermost(); scope; scope = scope->outer()) {
+    for (ObjectScope* scope = ObjectScope::innermost(); scope; scope = scope->outer()) {
         if (&scope->core() == this) return &scope->arena();
     }
     return nullptr;
@@ -87,6 +88,7 @@ void BrokerCore::adopt(std::unique_ptr<ObjectBase> object) {
         arena->add(std::move(object));
         return;
     }
+    // The object works all the same, so that one finding does not hide the next.
     report(object->describe() + " made while no request is open on the thread");
     const std::lock_guard<std::mutex> lock(unownedMutex_);
     unowned_.add(std::move(object));
@@ -123,7 +125,8 @@ std::size_t BrokerCore::unreleasedClones() const {
 
 void BrokerCore::report(std::string violation) noexcept {
     try {
-        for (RequestScope* scope = RequestScope::innermost(); scope; scope = scope->outer()) {
+        // What an inner request is caught at happened during the outer one, too.
+        for (ObjectScope* scope = ObjectScope::innermost(); scope; scope = scope->outer()) {
             if (&scope->core() == this) scope->violations().push_back(violation);
         }
         const std::lock_guard<std::mutex> lock(findingsMutex_);
@@ -177,6 +180,7 @@ UpcallService* BrokerCore::serviceFor(const OperationRequest& request) const {
 UpcallAnswer BrokerCore::perform(const OperationRequest& request) {
     if (UpcallService* const found = serviceFor(request)) return found->perform(owner_, request);
     UpcallAnswer answer;
+    // A class that nobody serves is another mistake than a name that is wrong.
     answer.rc = declaration(request.path.className) == nullptr ? CMPI_RC_ERR_INVALID_CLASS
                                                                : CMPI_RC_ERR_NOT_SUPPORTED;
     answer.message = "No provider for class " + request.path.className;

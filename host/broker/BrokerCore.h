@@ -14,14 +14,14 @@ namespace cmpihost {
 
 /// A request or an attached thread, on the calling thread from construction to end(). Scopes nest;
 /// the outermost one of a broker on a thread holds the objects.
-class RequestScope {
+class ObjectScope {
   public:
     enum class Kind { Request, AttachedThread };
 
-    explicit RequestScope(BrokerCore& core, Kind kind = Kind::Request);
-    ~RequestScope() { end(); }
-    RequestScope(const RequestScope&) = delete;
-    RequestScope& operator=(const RequestScope&) = delete;
+    explicit ObjectScope(BrokerCore& core, Kind kind = Kind::Request);
+    ~ObjectScope() { end(); }
+    ObjectScope(const ObjectScope&) = delete;
+    ObjectScope& operator=(const ObjectScope&) = delete;
 
     /// Later calls do nothing.
     void end() noexcept;
@@ -29,18 +29,18 @@ class RequestScope {
     BrokerCore& core() const noexcept { return core_; }
     Kind kind() const noexcept { return kind_; }
     Arena& arena() const noexcept { return *arena_; }
-    RequestScope* outer() const noexcept { return outer_; }
+    ObjectScope* outer() const noexcept { return outer_; }
     /// What the broker caught on this thread since construction.
     std::vector<std::string>& violations() noexcept { return violations_; }
 
     /// The innermost scope of the calling thread, of any broker; null: none is open.
-    static RequestScope* innermost() noexcept;
+    static ObjectScope* innermost() noexcept;
 
   private:
     BrokerCore& core_;
     Kind kind_;
     bool open_ = true;
-    RequestScope* outer_;
+    ObjectScope* outer_;
     std::optional<Arena> own_;
     Arena* arena_;
     std::vector<std::string> violations_;

@@ -41,6 +41,7 @@ CMPIStatus addKey(Path& path, const CallName& call, const char* name, const CMPI
     BrokerCore& core = path.core();
     const std::string key = required(core, name, call, "name");
     Value read = readValue(value, type, call);
+    // Object managers compare keys to find an instance: a null would match none or any.
     if (read.isNull()) {
         core.report("key " + path.body->className + '.' + key + " without a value");
         return statusOf(CMPI_RC_ERR_INVALID_PARAMETER);
@@ -132,6 +133,7 @@ CMPIStatus set(Instance& instance, const CallName& call, const char* name, Value
                const char* origin) {
     BrokerCore& core = instance.core();
     const std::string_view property = required(core, name, call, "name");
+    // Before the filter: a misspelt property is to be found whatever the client asked for.
     if (instance.body.declaration != nullptr) {
         const CMPIrc rc = checkProperty(core, *instance.body.declaration, property, value);
         if (rc != CMPI_RC_OK) return statusOf(rc);
@@ -154,6 +156,7 @@ CMPIStatus setPropertyWithOrigin(Instance& instance, const CallName& call, const
     return set(instance, call, name, readValue(value, type, call), origin);
 }
 
+/// Keys that the provider set as properties only are added, as object managers do it.
 CMPIObjectPath* getObjectPath(Instance& instance, CMPIStatus*) {
     const InstanceValue& value = *instance.body.value;
     auto path = std::make_shared<ObjectPathValue>(value.path);

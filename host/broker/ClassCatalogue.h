@@ -47,7 +47,7 @@ class ClassCatalogue {
 };
 
 /// How a class stands to another one. Unknown: the chain of superclasses leaves the catalogue
-/// before it can be told.
+/// before the ancestor is met.
 enum class ClassRelation { Same, Subclass, Unrelated, Unknown };
 
 /// The relation of `className` to `ancestor`. A null catalogue knows only equal names.

@@ -15,6 +15,7 @@ T bytesAt(const CMPIValue* value) noexcept {
     return result;
 }
 
+/// Reading and writing share the switch, so that no type can be missing in one of them alone.
 /// Calls use(member of CMPIValue) for the type of a scalar; false: it is no scalar.
 template <class Use>
 bool withScalarMember(CMPIType type, const Use& use) {
@@ -100,6 +101,7 @@ Value readArray(const CMPIArray* array, CMPIType type, const CallName& call) {
     const auto& body = fromHandle(array, call).body;
     const auto wanted = storedType(static_cast<CMPIType>(type & ~CMPI_ARRAY));
     if (storedType(body.elementType) != wanted) throw Failure{CMPI_RC_ERR_TYPE_MISMATCH};
+    // Shared with the array until one of the two changes.
     return Value::fromArray(body.elementType, body.elements);
 }
 
@@ -128,6 +130,7 @@ CMPIType storedType(CMPIType type) noexcept {
 }
 
 Value readValue(const CMPIValue* value, CMPIType type, const CallName& call) {
+    // Here the argument is no address of a variable: it points to the characters themselves.
     if (type == CMPI_chars) return readText(reinterpret_cast<const char*>(value));
     if (value == nullptr) return Value::null(type);
     if ((type & CMPI_ARRAY) != 0) return readArray(bytesAt<CMPIArray*>(value), type, call);
@@ -157,6 +160,7 @@ CMPIData writeValue(BrokerCore& core, const Value& value) {
     CMPIData data{};
     data.type = value.type();
     if (value.isNull()) {
+        // The value stays zero: who forgets to look at the state finds null there.
         data.state = CMPI_nullValue;
     } else if (value.isArray()) {
         const auto elementType = static_cast<CMPIType>(value.type() & ~CMPI_ARRAY);

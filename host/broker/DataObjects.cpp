@@ -15,7 +15,7 @@ using DateTime = const Object<CMPIDateTime>;
 
 CMPIUint64 getBinaryFormat(DateTime& dateTime, CMPIStatus* status) {
     const auto binary = parseDateTime(dateTime.body);
-    if (!binary || !binary->microseconds) return refuse<CMPIUint64>(status, CMPI_RC_ERR_FAILED);
+    if (!binary || !binary->microseconds) return failWith<CMPIUint64>(status, CMPI_RC_ERR_FAILED);
     return *binary->microseconds;
 }
 
@@ -61,7 +61,8 @@ CMPIStatus setElementAt(Array& array, const CallName& call, CMPICount index, con
 
 using Enumeration = const Object<CMPIEnumeration>;
 
-/// Past the end nothing is found, which is no violation: loops may ask until they are told.
+/// Past the end the status is CMPI_RC_ERR_NOT_FOUND and no violation is recorded: providers may
+/// loop until then without asking hasNext.
 CMPIData getNext(Enumeration& enumeration, CMPIStatus* status) {
     EnumerationBody& body = enumeration.body;
     ++body.nextCalls;

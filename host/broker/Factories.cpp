@@ -1,5 +1,5 @@
-// CMPIBrokerEncFT: makes objects and tells about objects of any kind. A table names the kind of an
-// object, as no other part of a handle can be trusted before it is known.
+// CMPIBrokerEncFT: makes objects and answers questions about objects of any kind. A table names the
+// kind of an object, as no other part of a handle can be trusted before it is known.
 #include "host/broker/ClassCatalogue.h"
 #include "host/broker/Conversion.h"
 #include "host/broker/DateTimeText.h"
@@ -21,7 +21,7 @@ CMPIInstance* newInstance(BrokerCore& core, const CallName& call, const CMPIObje
     body.declaration = core.declaration(given.className);
     if (core.catalogue() != nullptr && body.declaration == nullptr) {
         core.report("newInstance of " + given.className + ", a class that is not declared");
-        return refuse(status, CMPI_RC_ERR_INVALID_CLASS);
+        return failWith(status, CMPI_RC_ERR_INVALID_CLASS);
     }
     body.value = std::make_shared<InstanceValue>();
     body.value->path = given;
@@ -53,7 +53,7 @@ CMPIString* newString(BrokerCore& core, const CallName& call, const char* text, 
 /// All elements start as null. There are no arrays of arrays in CIM.
 CMPIArray* newArray(BrokerCore& core, CMPICount size, CMPIType type, CMPIStatus* status) {
     if (size > mostElements || (type & CMPI_ARRAY) != 0 || type == CMPI_null) {
-        return refuse(status, CMPI_RC_ERR_INVALID_PARAMETER);
+        return failWith(status, CMPI_RC_ERR_INVALID_PARAMETER);
     }
     const CMPIType stored = storedType(type);
     return makeArray(core, stored, std::vector<Value>(size, Value::null(stored)));
@@ -63,7 +63,7 @@ CMPIArray* newArray(BrokerCore& core, CMPICount size, CMPIType type, CMPIStatus*
 CMPIDateTime* dateTime(BrokerCore& core, CMPIUint64 microseconds, bool interval,
                        CMPIStatus* status) {
     auto text = formatDateTime(microseconds, interval);
-    if (!text) return refuse(status, CMPI_RC_ERR_INVALID_PARAMETER);
+    if (!text) return failWith(status, CMPI_RC_ERR_INVALID_PARAMETER);
     return core.make<CMPIDateTime>(std::move(*text));
 }
 
@@ -81,7 +81,7 @@ CMPIDateTime* newDateTimeFromBinary(BrokerCore& core, CMPIUint64 binTime, CMPIBo
 CMPIDateTime* newDateTimeFromChars(BrokerCore& core, const CallName& call, const char* text,
                                    CMPIStatus* status) {
     const std::string_view given = required(core, text, call, "text");
-    if (!parseDateTime(given)) return refuse(status, CMPI_RC_ERR_INVALID_PARAMETER);
+    if (!parseDateTime(given)) return failWith(status, CMPI_RC_ERR_INVALID_PARAMETER);
     return core.make<CMPIDateTime>(std::string(given));
 }
 
@@ -91,7 +91,7 @@ CMPISelectExp* newSelectExp(BrokerCore& core, const CallName& call, const char* 
     required(core, language, call, "language");
     required(core, query, call, "query");
     if (projection != nullptr) *projection = nullptr;
-    return refuse(status, CMPI_RC_ERR_NOT_SUPPORTED);
+    return failWith(status, CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 CMPIBoolean classPathIsA(BrokerCore& core, const CallName& call, const CMPIObjectPath* path,

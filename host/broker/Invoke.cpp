@@ -32,7 +32,7 @@ const char* textOf(const std::optional<std::string>& text) noexcept {
 /// One request with everything that its slot takes.
 class Call {
   public:
-    Call(Request& scope, const OperationRequest& request, const CMPIResult* result)
+    Call(RequestScope& scope, const OperationRequest& request, const CMPIResult* result)
         : scope_(scope),
           request_(request),
           context_(scope.makeContext(request.context, request.path.nameSpace)),
@@ -104,7 +104,7 @@ class Call {
         }
     }
 
-    Request& scope_;
+    RequestScope& scope_;
     const OperationRequest& request_;
     const CMPIContext* context_;
     const CMPIObjectPath* path_;
@@ -126,7 +126,7 @@ std::optional<std::string> messageOf(const CMPIStatus& status) {
 
 Outcome invoke(const ManagementInterfaces& interfaces, Broker& broker,
                const OperationRequest& request, const CollectorSetup& setup) {
-    Request scope(broker);
+    RequestScope scope(broker);
     ResultCollector collector(scope);
     if (setup) setup(collector);
 

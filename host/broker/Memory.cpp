@@ -27,6 +27,7 @@ void* allocate(BrokerCore& core, std::size_t size) {
 }
 
 void* allocateZeroed(BrokerCore& core, std::size_t count, std::size_t size) {
+    // As calloc would: the product may be too large for a size.
     if (size != 0 && count > std::numeric_limits<std::size_t>::max() / size) return nullptr;
     return std::memset(allocate(core, count * size), 0, count * size);
 }
@@ -53,6 +54,7 @@ void freeObject(BrokerCore& core, const CallName& call, Edt* handle) {
     core.releaseObject(fromHandle(handle, call));
 }
 
+/// No call of this broker makes one, so whatever comes here was made by somebody else.
 void freeSelectExp(BrokerCore&, const CallName& call, CMPISelectExp* handle) {
     refuseNeverMade(handle, call, "CMPISelectExp");
 }

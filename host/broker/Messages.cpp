@@ -86,7 +86,7 @@ std::string expandMessage(const char* text, const std::vector<std::string>& argu
 
 CMPIString* expanded(const CMPIBroker* broker, const CallName& call, const char* text,
                      CMPIStatus* status, CMPICount count, std::va_list& arguments) noexcept {
-    return guarded<CMPIString*>(status, [&]() -> CMPIString* {
+    return exceptionsToStatus<CMPIString*>(status, [&]() -> CMPIString* {
         BrokerCore& core = target(broker, call);
         return reporting<CMPIString*>(core.countCall(call), status, [&] {
             const char* const message = required(core, text, call, "default message");

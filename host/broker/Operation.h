@@ -40,7 +40,7 @@ constexpr bool isAssociationOperation(Operation operation) noexcept {
     return operation >= Operation::Associators;
 }
 
-/// What a request tells about itself.
+/// What accompanies a request: flags, and who sent it.
 struct RequestContext {
     CMPIFlags flags = 0;
     /// None: the entry is there and its string has no characters, as for a client that is not

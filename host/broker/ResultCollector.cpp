@@ -131,7 +131,7 @@ void bindSlots(Tables<CMPIResult>& tables) {
     tables.sparse.returnError = nullptr;
 }
 
-ResultCollector::ResultCollector(Request& request)
+ResultCollector::ResultCollector(RequestScope& request)
     : state_(std::make_shared<ResultState>()),
       result_(request.broker().core().make<CMPIResult>(state_)) {}
 

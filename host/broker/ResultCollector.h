@@ -1,7 +1,7 @@
 #ifndef HOST_BROKER_RESULT_COLLECTOR_H
 #define HOST_BROKER_RESULT_COLLECTOR_H
 
-#include "host/broker/Request.h"
+#include "host/broker/RequestScope.h"
 
 #include <memory>
 #include <vector>
@@ -30,7 +30,7 @@ struct Results {
 class ResultCollector {
   public:
     /// The request is open.
-    explicit ResultCollector(Request& request);
+    explicit ResultCollector(RequestScope& request);
     ~ResultCollector();
     ResultCollector(const ResultCollector&) = delete;
     ResultCollector& operator=(const ResultCollector&) = delete;

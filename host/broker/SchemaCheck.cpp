@@ -7,6 +7,7 @@ namespace cmpihost {
 
 namespace {
 
+/// A string reaches the broker as one of three types; a schema knows one.
 bool sameType(CMPIType declared, CMPIType given) noexcept {
     const auto stored = [](CMPIType type) {
         return storedType(static_cast<CMPIType>(type & ~CMPI_ARRAY)) | (type & CMPI_ARRAY);
@@ -30,6 +31,7 @@ bool checkType(BrokerCore& core, const ClassDeclaration& owner, const PropertyDe
     if (declared.type != CMPI_ref || value.isNull() || declared.referenceClass.empty()) return true;
 
     const std::string& className = value.reference().className;
+    // An unknown relation passes: the ancestor may be declared in a file that nobody gave.
     if (classRelation(core.catalogue(), className, declared.referenceClass) ==
         ClassRelation::Unrelated) {
         core.report(member(owner, declared.name) + " refers to " + declared.referenceClass +
@@ -45,6 +47,7 @@ void checkKey(BrokerCore& core, const ClassDeclaration& owner, const KeyBinding&
         core.report("path of " + owner.name + " with " + key.name + ", which is no key of it");
         return;
     }
+    // Clients follow the ends of an association, so their paths have to be complete as well.
     if (checkType(core, owner, *declared, key.value) && key.value.type() == CMPI_ref &&
         !key.value.isNull()) {
         checkPath(core, key.value.reference());
@@ -81,6 +84,7 @@ void checkPath(BrokerCore& core, const ObjectPathValue& path) {
 void checkInstance(BrokerCore& core, const InstanceValue& instance) {
     if (core.catalogue() == nullptr) return;
     checkPath(core, instance.path);
+    // A client may read a key in either place, so both have to say the same.
     for (const KeyBinding& key : instance.path.keys) {
         const Value* const property = instance.property(key.name);
         if (property != nullptr && *property != key.value) {

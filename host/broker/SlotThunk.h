@@ -30,7 +30,7 @@ inline void setStatus(CMPIStatus* status, CMPIrc rc) noexcept {
 
 /// Sets the status and gives the answer of a call that has nothing to give.
 template <class T = std::nullptr_t>
-T refuse(CMPIStatus* status, CMPIrc rc) noexcept {
+T failWith(CMPIStatus* status, CMPIrc rc) noexcept {
     setStatus(status, rc);
     return T{};
 }
@@ -104,7 +104,7 @@ inline BrokerCore& coreOf(const ObjectBase& object) noexcept {
 
 /// Runs an implementation so that nothing is thrown into the provider.
 template <class R, class Body>
-R guarded(CMPIStatus* status, Body&& body) noexcept {
+R exceptionsToStatus(CMPIStatus* status, Body&& body) noexcept {
     CMPIrc rc = CMPI_RC_ERR_FAILED;
     try {
         setStatus(status, CMPI_RC_OK);
@@ -141,7 +141,7 @@ template <class Table, class R, class Self, class... Args, R (*Table::*Slot)(Sel
 struct SlotThunk<Slot, Impl> {
     static R call(Self* self, Args... args) noexcept {
         CMPIStatus* const status = statusArgument(args...);
-        return guarded<R>(status, [&]() -> R {
+        return exceptionsToStatus<R>(status, [&]() -> R {
             const CallName name = callName();
             auto& object = target(self, name);
             return reporting<R>(coreOf(object).countCall(name), status, [&]() -> R {

@@ -18,9 +18,10 @@ static_assert(std::is_same_v<pthread_once_t, int>);
 
 /// Counts a call. True: it is to fail.
 bool isFaulty(std::string_view slot) noexcept {
-    const RequestScope* const scope = RequestScope::innermost();
+    const ObjectScope* const scope = ObjectScope::innermost();
     if (scope == nullptr) return false;
     try {
+        // It throws when the call is to fail, which must not reach the provider's C code.
         scope->core().countCall({tableName<CMPIBrokerExtFT>, slot});
         return false;
     } catch (...) {
@@ -54,6 +55,7 @@ void bindThread(CMPIBrokerExtFT& table, std::string_view name) {
 char* resolveFileName(const char* name) {
     if (name == nullptr) return nullptr;
     try {
+        // The provider frees it by free().
         return ::strdup(("lib" + std::string(name) + ".so").c_str());
     } catch (...) {
         return nullptr;

@@ -6,13 +6,15 @@ namespace cmpihost {
 
 namespace {
 
+/// An entry that is absent, null or no text counts as not given: which ones a context has differs
+/// between object managers.
 std::optional<std::string> contextText(const std::vector<NamedValue>& entries, const char* name) {
     const NamedValue* const entry = findNamed(entries, name);
     return entry != nullptr && entry->value.isText() ? std::optional(entry->value.text())
                                                      : std::nullopt;
 }
 
-/// The provider's context goes on to who answers: it tells on whose behalf the question is asked.
+/// The provider's context goes on to who answers: it says on whose behalf the question is asked.
 RequestContext readContext(const CMPIContext* context, const CallName& call) {
     const auto& entries = fromHandle(context, call).body;
     RequestContext result;
@@ -58,6 +60,8 @@ bool answersPaths(Operation operation) noexcept {
            operation == Operation::AssociatorNames || operation == Operation::ReferenceNames;
 }
 
+/// Items stay values until getNext hands them out: an enumeration that is given up early costs no
+/// objects.
 CMPIEnumeration* enumeration(BrokerCore& core, const OperationRequest& request,
                              CMPIStatus* status) {
     std::optional<UpcallAnswer> answer = answerTo(core, request, status);
@@ -100,7 +104,7 @@ CMPIInstance* getInstance(BrokerCore& core, const CallName& call, const CMPICont
     std::optional<UpcallAnswer> answer = answerTo(core, request, status);
     if (!answer) return nullptr;
     // A provider that delivers nothing and reports success has no such instance.
-    if (answer->instances.empty()) return refuse(status, CMPI_RC_ERR_NOT_FOUND);
+    if (answer->instances.empty()) return failWith(status, CMPI_RC_ERR_NOT_FOUND);
     return makeInstance(core,
                         std::make_shared<InstanceValue>(std::move(answer->instances.front())));
 }
@@ -112,7 +116,8 @@ CMPIObjectPath* createInstance(BrokerCore& core, const CallName& call, const CMP
     request.instance = *fromHandle(instance, call).body.value;
     std::optional<UpcallAnswer> answer = answerTo(core, request, status);
     if (!answer) return nullptr;
-    if (answer->paths.empty()) return refuse(status, CMPI_RC_ERR_FAILED);
+    // Success without a path is of no use: the caller could not find what it made.
+    if (answer->paths.empty()) return failWith(status, CMPI_RC_ERR_FAILED);
     return core.make<CMPIObjectPath>(
         std::make_shared<ObjectPathValue>(std::move(answer->paths.front())));
 }
@@ -189,6 +194,7 @@ CMPIEnumeration* references(BrokerCore& core, const CallName& call, const CMPICo
                    {nullptr, resultClass, role, nullptr, properties}, status);
 }
 
+/// A clone, since the thread may still use it when the request that prepared it has ended.
 CMPIContext* prepareAttachThread(BrokerCore& core, const CallName& call,
                                  const CMPIContext* context) {
     return core.makeClone<CMPIContext>(fromHandle(context, call).body);
@@ -197,19 +203,20 @@ CMPIContext* prepareAttachThread(BrokerCore& core, const CallName& call,
 CMPIStatus attachThread(BrokerCore& core, const CallName& call, const CMPIContext* context) {
     fromHandle(context, call);
     // detachThread deletes it, on this thread.
-    std::make_unique<RequestScope>(core, RequestScope::Kind::AttachedThread).release();
+    std::make_unique<ObjectScope>(core, ObjectScope::Kind::AttachedThread).release();
     return statusOf(CMPI_RC_OK);
 }
 
 CMPIStatus detachThread(BrokerCore& core, const CallName& call, const CMPIContext* context) {
     const Object<CMPIContext>& object = fromHandle(context, call);
-    RequestScope* const innermost = RequestScope::innermost();
+    ObjectScope* const innermost = ObjectScope::innermost();
     if (innermost == nullptr || &innermost->core() != &core ||
-        innermost->kind() != RequestScope::Kind::AttachedThread) {
+        innermost->kind() != ObjectScope::Kind::AttachedThread) {
         core.report("detachThread on a thread that is not attached");
         return statusOf(CMPI_RC_ERR_FAILED);
     }
-    const std::unique_ptr<RequestScope> scope(innermost);
+    // The scope ends in any case: a wrong context does not make the thread attached again.
+    const std::unique_ptr<ObjectScope> scope(innermost);
     if (object.arena() != nullptr) {
         core.report("detachThread with a context that is none of prepareAttachThread");
         return statusOf(CMPI_RC_ERR_INVALID_HANDLE);
@@ -260,6 +267,7 @@ CMPIBrokerFT completeUpcalls() {
 CMPIBrokerFT upcallTable(bool sparse) {
     static const CMPIBrokerFT complete = completeUpcalls();
     CMPIBrokerFT table = complete;
+    // No version is lower, so whoever goes by the number takes the oldest ways.
     if (sparse) table.brokerVersion = 0;
     return table;
 }

@@ -86,6 +86,7 @@ bool sameSet(const std::vector<Named>& left, const std::vector<Named>& right) {
            });
 }
 
+/// Nothing else is escaped: the syntax of object paths knows no other escape.
 std::string inQuotes(const std::string& text) {
     std::string result = "\"";
     for (const char letter : text) {
@@ -108,6 +109,7 @@ std::string keyText(const Value& value) {
     return isNumber ? value.toText() : inQuotes(value.toText());
 }
 
+/// Not by a stream: this is the shortest text that reads back as the same number, in every locale.
 template <class Real>
 std::string shortestText(Real real) {
     char text[64];
@@ -177,6 +179,7 @@ Value Value::fromUnsigned(std::uint64_t value, CMPIType type) {
 }
 
 Value Value::fromSigned(std::int64_t value, CMPIType type) {
+    // Through the narrow type: the value is what a variable of a provider would hold.
     switch (type) {
         case CMPI_sint8:
             return Value(type, std::int64_t{static_cast<std::int8_t>(value)});
@@ -253,6 +256,7 @@ const Value* InstanceValue::property(std::string_view name) const {
     return valueNamed(properties, name);
 }
 
+/// The host is left out: a path with one and a path without name the same object.
 bool operator==(const ObjectPathValue& left, const ObjectPathValue& right) {
     return base::equalsIgnoreCase(left.nameSpace, right.nameSpace) &&
            base::equalsIgnoreCase(left.className, right.className) &&

@@ -115,7 +115,7 @@ struct ObjectPathValue {
     std::vector<KeyBinding> keys{};
     std::string hostName{};
 
-    /// The value of a key, null if there is none of that name.
+    /// The value of a key; null if no key has that name.
     const Value* key(std::string_view name) const;
 };
 
@@ -124,7 +124,7 @@ struct InstanceValue {
     ObjectPathValue path{};
     std::vector<PropertyValue> properties{};
 
-    /// The value of a property, null if the instance has none of that name.
+    /// The value of a property; null if the instance has no property of that name.
     const Value* property(std::string_view name) const;
 };
 

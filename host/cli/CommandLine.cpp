@@ -74,7 +74,7 @@ constexpr Filter filters[] = {
 constexpr const char* description =
     "Embedded CIM host: loads a CMPI provider library as an object manager does, runs one\n"
     "operation on it and prints what it returns. It loads the facade, which asks the provider\n"
-    "and has the manners that WBEM clients expect.";
+    "and answers as WBEM clients expect.";
 
 constexpr const char* pathHelp =
     "Paths:\n"
@@ -127,6 +127,7 @@ template <class Text>
 CLI::Option* addText(CLI::App& to, const char* name, const char* typeName, Text& value,
                      const char* help) {
     const auto complaint = [](const std::string& given) {
+        // Most often a variable of the shell that is not set.
         return given.empty() ? std::string("the value is empty") : std::string();
     };
     return to.add_option(name, value, help)
@@ -250,6 +251,7 @@ void CommandLineParser::addHostOptions() {
 
 void CommandLineParser::addCommand(const Command& command) {
     CLI::App& added = *app_.add_subcommand(command.name, command.help);
+    // Options of the program may stand behind the operation, too.
     added.fallthrough();
     added.group(command.operation ? "Operations" : "Pictures");
     if (command.operation) added.footer(pathHelp);

@@ -1,5 +1,5 @@
 // What goes to the standard error beside results. Statuses bear the names of the CIM standard, and
-// what the schema knows better than the provider (a misspelt name) is told as a note or a hint: the
+// what the schema knows better than the provider (a misspelt name) becomes a note or a hint: the
 // provider itself answers with nothing at all.
 #include "host/cli/Diagnostics.h"
 
@@ -87,6 +87,7 @@ std::string notesOnNames(const OperationRequest& request, const OperationResult&
             return declares(schema, className, name);
         };
         if (!classes.empty() && std::none_of(classes.begin(), classes.end(), declaresIt)) {
+            // Never null: a class that the schema does not know counts as declaring everything.
             notes += "note: the class " + schema.find(classes.front())->name +
                      " declares no property '" + base::escapeForTerminal(name) + "'\n";
         }

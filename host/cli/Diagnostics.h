@@ -19,12 +19,12 @@ std::string failureText(const OperationResult& result);
 /// otherwise with it, that a name in the property list is that of no declared property, that an
 /// association request was answered with nothing and the schema does not know one of its names.
 /// Lines that begin with "note: ", safe to print on a terminal; empty when there is nothing to
-/// tell.
+/// say.
 std::string notesOn(const OperationRequest& request, const OperationResult& result,
                     const Schema& schema);
 
 /// How to mend a request that failed, in lines that begin with "hint: "; empty when the failure
-/// tells nothing about that.
+/// gives no clue.
 std::string hintFor(const OperationRequest& request, const OperationResult& failure,
                     const Schema& schema);
 

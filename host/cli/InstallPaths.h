@@ -7,7 +7,7 @@
 
 namespace cmpihost {
 
-/// The folder that the running program's file is in. Where the system does not tell it (ownFile, a
+/// The folder that the running program's file is in. Where the system does not know it (ownFile, a
 /// link to that file, cannot be read), the folder of invokedAs, the name that the program was
 /// called by; where that is a bare name, the folder that the program is made to be installed in.
 std::filesystem::path programFolder(const std::string& invokedAs,

@@ -14,6 +14,7 @@ namespace cmpihost {
 
 namespace {
 
+/// CIM names may hold every character beyond ASCII, in UTF-8 bytes from 0x80 on.
 bool isNameStart(char c) {
     return base::isAlpha(c) || c == '_' || static_cast<unsigned char>(c) >= 0x80;
 }
@@ -108,6 +109,7 @@ std::string PathParser::host() {
 }
 
 std::string PathParser::nameSpace(const std::string& word, std::size_t start) const {
+    // With a slash in front, a name that is missing at the start shows in the same way.
     const std::size_t doubled = ("/" + word).find("//");
     if (doubled != std::string::npos) {
         fail(start + doubled, "expected a name before '/' in the namespace");
@@ -122,6 +124,7 @@ std::string PathParser::className(const std::string& word, std::size_t start) co
         fail(start + word.size(),
              "expected ':' and the name of a class after the namespace '" + word + "'");
     }
+    // Taken along so far because namespaces may have it: the complaint can now point at it.
     const std::size_t dash = word.find('-');
     if (dash != std::string::npos) {
         fail(start + dash, "the name of a class holds letters, digits and '_' only");
@@ -136,6 +139,7 @@ ObjectPathValue PathParser::parse(const std::string& outerNamespace) {
     path.nameSpace = outerNamespace;
     std::size_t start = offset_;
     std::string word = takeWhile(isNamespacePart);
+    // Only what follows the first word shows whether it was a namespace or the class.
     if (!word.empty() && accept(':')) {
         path.nameSpace = nameSpace(word, start);
         start = offset_;
@@ -198,7 +202,7 @@ Value PathParser::value(CMPIType declared, const std::string& keyName) {
                     "when the path stands in '...')");
 }
 
-/// A key's text alone does not tell whether it is a path or a datetime: the class does.
+/// A key's text alone does not say whether it is a path or a datetime: the class does.
 Value PathParser::quotedValue(CMPIType declared) {
     Source content = quotedText();
     if (declared == CMPI_ref) {
@@ -222,6 +226,7 @@ Source PathParser::quotedText() {
         content.origins.push_back(source_.origins[at]);
         ++offset_;
     }
+    // Complaints may point behind the last character: the quote stands there.
     content.origins.push_back(source_.origins[offset_ - 1]);
     return content;
 }
@@ -248,6 +253,7 @@ Value PathParser::number() {
     return whenNegative < 0 ? Value::fromSigned(whenNegative) : Value::fromUnsigned(whenPositive);
 }
 
+/// The column is counted in what is shown: escapes are longer than what was written.
 std::string withCaret(const std::string& text, std::size_t offset, const std::string& complaint) {
     const std::size_t column = base::countUtf8(base::escapeForTerminal(text.substr(0, offset)));
     return base::escapeForTerminal(complaint) + "\n  " + base::escapeForTerminal(text) + "\n  " +

@@ -37,6 +37,7 @@ std::unique_ptr<Printer> makeMofPrinter(std::ostream& stream);
 /// One array with an object an element: `class`, `path` and for instances `properties`.
 std::unique_ptr<Printer> makeJsonPrinter(std::ostream& stream);
 
+/// The printer of a form. Stream and schema outlive it.
 std::unique_ptr<Printer> makePrinter(Format format, std::ostream& stream, const Schema& schema);
 
 }  // namespace cmpihost

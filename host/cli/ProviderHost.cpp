@@ -2,28 +2,15 @@
 // one may make its first up-call while it is being loaded.
 #include "host/cli/ProviderHost.h"
 
-#include <sys/mman.h>
 #include <sys/utsname.h>
-#include <unistd.h>
 
-#include <cerrno>
-#include <cstdlib>
-#include <system_error>
+#include <exception>
 
 #include "base/Ascii.h"
 
 namespace cmpihost {
 
 namespace {
-
-constexpr const char* logVariable = "ZBLOG_CONF";
-
-/// The log channel alone: the trace channel carries the same records once more.
-constexpr std::string_view logConfiguration =
-    "log.sink = stderr\n"
-    "log.level = 4000\n"
-    "log.records = all\n"
-    "trace.sink = off\n";
 
 std::string nodeName() {
     utsname names{};
@@ -59,41 +46,28 @@ Broker& routed(Broker& broker, ProviderLibrary* companion, ComputerSystemService
     return broker;
 }
 
-OperationResult escaped(const std::string& what) {
+OperationResult failureOf(const std::string& what) {
     OperationResult result;
     result.rc = CMPI_RC_ERR_FAILED;
     result.message = "an exception left the provider: " + what;
     return result;
 }
 
-/// Runs what calls a provider, whose exceptions must not end the host.
+/// Calls a provider. An exception that leaves it must not end the host: in an object manager it
+/// would end the process for everybody, and a person who looks into that wants to read what was
+/// thrown.
 template <class Call>
-OperationResult guarded(Call call) {
+OperationResult resultOrFailure(Call call) {
     try {
         return call();
     } catch (const std::exception& error) {
-        return escaped(error.what());
+        return failureOf(error.what());
     } catch (...) {
-        return escaped("of an unknown type");
+        return failureOf("of an unknown type");
     }
 }
 
 }  // namespace
-
-ScopedStderrLog::ScopedStderrLog() : configuration_(::memfd_create("cmpihost-log", MFD_CLOEXEC)) {
-    const int file = configuration_.number();
-    const bool written = configuration_.isOpen() &&
-                         ::write(file, logConfiguration.data(), logConfiguration.size()) ==
-                             static_cast<ssize_t>(logConfiguration.size());
-    const std::string name = "/proc/self/fd/" + std::to_string(file);
-    if (!written || ::setenv(logVariable, name.c_str(), 1) != 0) {
-        throw std::system_error(errno, std::generic_category(), "the records cannot be shown");
-    }
-}
-
-ScopedStderrLog::~ScopedStderrLog() {
-    ::unsetenv(logVariable);
-}
 
 ProviderHost::ProviderHost(const ProviderSource& provider, const ClassCatalogue& catalogue,
                            const ComputerSystemSource& computerSystems)
@@ -104,7 +78,7 @@ ProviderHost::ProviderHost(const ProviderSource& provider, const ClassCatalogue&
                loadOptions(provider.name)) {}
 
 OperationResult ProviderHost::run(const OperationRequest& request) {
-    return guarded([&]() -> OperationResult { return invoke(library_, broker_, request); });
+    return resultOrFailure([&]() -> OperationResult { return invoke(library_, broker_, request); });
 }
 
 OperationResult ProviderHost::ask(const OperationRequest& request) {
@@ -113,14 +87,14 @@ OperationResult ProviderHost::ask(const OperationRequest& request) {
         !base::equalsIgnoreCase(request.path.className, ComputerSystemService::className)) {
         return run(request);
     }
-    return guarded([&]() -> OperationResult {
+    return resultOrFailure([&]() -> OperationResult {
         if (companion_ != nullptr) return invoke(*companion_, broker_, request);
         return computerSystems_.perform(broker_, request);
     });
 }
 
 std::vector<std::string> ProviderHost::unload() {
-    // What was caught so far is told even when a library throws while it cleans up.
+    // A library that throws in cleanup must not hide what was caught before.
     bool escapes = false;
     try {
         library_.unload();

@@ -5,29 +5,12 @@
 #include <string>
 #include <vector>
 
-#include "base/FileDescriptor.h"
 #include "host/broker/Broker.h"
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
 #include "host/broker/ProviderLibrary.h"
 
 namespace cmpihost {
-
-/// Makes the provider's logging library write every record to the standard error of this process,
-/// by a configuration that it finds in the environment. To be made before the library is loaded;
-/// the configuration stays readable, and the variable ZBLOG_CONF set, until the object goes.
-/// Not for use by several threads, as the environment is not.
-class ScopedStderrLog {
-  public:
-    /// Throws std::system_error.
-    ScopedStderrLog();
-    ~ScopedStderrLog();
-    ScopedStderrLog(const ScopedStderrLog&) = delete;
-    ScopedStderrLog& operator=(const ScopedStderrLog&) = delete;
-
-  private:
-    base::FileDescriptor configuration_;
-};
 
 /// The provider that is asked.
 struct ProviderSource {

@@ -3,6 +3,7 @@
 #include "host/cli/Tree.h"
 
 #include "base/Utf8.h"
+#include "host/cli/Diagnostics.h"
 #include "host/cli/ValueText.h"
 
 namespace cmpihost {
@@ -29,6 +30,7 @@ class TreeBuilder {
             root.branches.push_back(associated(computer, runningOn, &TreeBuilder::running));
             result.push_back(std::move(root));
         }
+        // Associations need a computer to start from; the systems can be shown without.
         if (result.empty()) {
             result.push_back({std::string("no ") + computerSystem + ", so nothing is associated"});
             for (const InstanceValue& system : enumerated(operatingSystem)) {
@@ -43,7 +45,7 @@ class TreeBuilder {
 
     std::vector<InstanceValue> answered(const OperationRequest& request) const {
         OperationResult result = ask_(request);
-        if (result.rc != CMPI_RC_OK) throw TreeFailure{std::move(result)};
+        if (result.rc != CMPI_RC_OK) throw TreeFailure(failureText(result));
         return std::move(result.instances);
     }
 
@@ -59,6 +61,7 @@ class TreeBuilder {
         OperationRequest request;
         request.operation = Operation::Associators;
         request.path = source.path;
+        // One association at a time, as the answer does not say which one led to an instance.
         request.assocClass = association;
         TreeNode node{association};
         for (const InstanceValue& farEnd : answered(request)) {

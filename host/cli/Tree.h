@@ -3,6 +3,7 @@
 
 #include <functional>
 #include <ostream>
+#include <stdexcept>
 #include <string>
 #include <vector>
 
@@ -23,14 +24,15 @@ void drawTree(const TreeNode& root, std::ostream& stream);
 /// Answers an operation, whoever serves its class.
 using Ask = std::function<OperationResult(const OperationRequest&)>;
 
-/// An operation of a tree that failed.
-struct TreeFailure {
-    OperationResult result;
+/// An answer with a status other than OK, of which no tree can be drawn; what() is its failureText.
+class TreeFailure : public std::runtime_error {
+  public:
+    using std::runtime_error::runtime_error;
 };
 
 /// The computer systems of the host, what is installed and running on each, and the capabilities of
 /// that, as answers to requests give it. Without a computer system, the operating systems alone.
-/// Throws TreeFailure when an answer has a status other than OK.
+/// Throws TreeFailure.
 std::vector<TreeNode> hostTree(const Ask& ask, const std::string& nameSpace, const Schema& schema);
 
 }  // namespace cmpihost

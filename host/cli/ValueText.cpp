@@ -96,7 +96,7 @@ std::string humanReadableSize(std::uint64_t kibibytes) {
 }
 
 std::string humanReadableDateTime(const std::string& cimText) {
-    // Asterisks leave open which instant it is: there is nothing to tell that is shorter.
+    // Asterisks leave open which instant it is: no shorter form would say the same.
     const auto parsed = parseDateTime(cimText);
     if (!parsed || !parsed->microseconds || cimText.find('*') != std::string::npos) return {};
     const std::uint64_t seconds = *parsed->microseconds / microsecondsPerSecond;

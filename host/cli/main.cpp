@@ -1,24 +1,223 @@
+// One run is one process: everything is loaded for a single request and unloaded before the exit,
+// so that what the broker catches while the provider cleans up is reported too.
 #include <time.h>
 
 #include <exception>
+#include <filesystem>
 #include <iostream>
+#include <optional>
+#include <stdexcept>
+#include <type_traits>
 
+#include "base/Utf8.h"
 #include "host/cli/CommandLine.h"
+#include "host/cli/Diagnostics.h"
 #include "host/cli/InstallPaths.h"
-#include "host/cli/Run.h"
+#include "host/cli/PathCompletion.h"
+#include "host/cli/PathParser.h"
+#include "host/cli/ProviderHost.h"
+#include "host/cli/RequestBuilder.h"
+#include "host/cli/ScopedStderrLog.h"
+#include "host/cli/Tree.h"
+#include "host/mof/Schema.h"
+
+namespace cmpihost {
 
 namespace {
 
-cmpihost::ExitStatus show(const cmpihost::ParsedCommandLine& parsed) {
-    std::ostream& stream = parsed.status == cmpihost::exitDone ? std::cout : std::cerr;
+namespace fs = std::filesystem;
+
+Schema loadSchema(const std::string& given, const fs::path& programFolder) {
+    try {
+        return Schema::load(given.empty() ? schemaFolder(programFolder) : fs::path(given));
+    } catch (const std::runtime_error& error) {
+        const char* hint = given.empty() ? " (--schema DIR names another folder)" : "";
+        throw UsageError(base::escapeForTerminal(error.what()) + hint);
+    }
+}
+
+/// The loader looks for a bare name in its own folders only, not in the current one.
+std::string loaderPath(const std::string& given) {
+    std::error_code error;
+    const bool bare = given.find('/') == std::string::npos;
+    return bare && fs::exists(given, error) ? "./" + given : given;
+}
+
+/// There is no library to load; what() is safe to print on a terminal.
+class ProviderNotFound : public std::runtime_error {
+  public:
+    using std::runtime_error::runtime_error;
+};
+
+std::string providerFile(const CommandLine& commandLine, const fs::path& programFolder) {
+    if (!commandLine.provider.empty()) return loaderPath(commandLine.provider);
+    const Library wanted = commandLine.bare ? Library::Provider : Library::Facade;
+    const fs::path found = findLibrary(wanted, programFolder);
+    if (found.empty()) {
+        std::string text = std::string("no library of the ") +
+                           (commandLine.bare ? "provider" : "facade") + " was found; looked for";
+        for (const fs::path& candidate : candidates(wanted, programFolder)) {
+            text += "\n  " + base::escapeForTerminal(candidate.string());
+        }
+        throw ProviderNotFound(text + "\n(--provider FILE names one" +
+                               (commandLine.bare ? ", without --bare)" : ")"));
+    }
+    return found.string();
+}
+
+bool yieldsPaths(Operation operation) {
+    return operation == Operation::EnumerateInstanceNames ||
+           operation == Operation::AssociatorNames || operation == Operation::ReferenceNames ||
+           operation == Operation::CreateInstance;
+}
+
+/// Not even an empty list in JSON: there is no result to be empty.
+bool yieldsNothing(Operation operation) {
+    return operation == Operation::ModifyInstance || operation == Operation::DeleteInstance;
+}
+
+void printResult(const OperationRequest& request, OperationResult result, const Schema& schema,
+                 Printer& printer) {
+    if (yieldsNothing(request.operation)) return;
+    if (yieldsPaths(request.operation)) {
+        printer.print(result.paths);
+        return;
+    }
+    if (request.properties) {
+        for (InstanceValue& instance : result.instances) {
+            instance = withoutUnlisted(std::move(instance), *request.properties, schema);
+        }
+    }
+    printer.print(result.instances);
+}
+
+/// Carries a command line out: loads the provider, runs the operation, writes the results to `out`
+/// and everything else (failures, what the broker caught, notes) to `err`. Libraries and MOF files
+/// that the command line does not name are looked for around `programFolder`.
+class Run {
+  public:
+    Run(const CommandLine& commandLine, const fs::path& programFolder, std::ostream& out,
+        std::ostream& err)
+        : commandLine_(commandLine), programFolder_(programFolder), out_(out), err_(err) {}
+
+    /// Does it all, and turns what is thrown on the way into a complaint and its exit status.
+    ExitStatus exitStatus() {
+        try {
+            return execute();
+        } catch (const ProviderNotFound& error) {
+            return failed(error.what(), exitNotLoaded);
+        } catch (const LoadError& error) {
+            return failed(base::escapeForTerminal(error.what()), exitNotLoaded);
+        } catch (const UsageError& error) {
+            return failed(error.what(), exitUsage);
+        }
+    }
+
+  private:
+    ExitStatus execute() {
+        // The schema goes first: a wrong path is reported without loading any library.
+        const Schema schema = loadSchema(commandLine_.schema, programFolder_);
+        const SchemaCatalogue catalogue(schema);
+        return commandLine_.tree ? drawHost(schema, catalogue) : runOperation(schema, catalogue);
+    }
+
+    ExitStatus runOperation(const Schema& schema, const SchemaCatalogue& catalogue) {
+        OperationRequest request = buildRequest(commandLine_, schema, catalogue);
+        const OperationResult result = withHost(catalogue, [&](ProviderHost& host) {
+            return commandLine_.bare || !lacksKeys(request, catalogue) ? host.run(request)
+                                                                       : completed(host, request);
+        });
+        if (result.rc != CMPI_RC_OK) {
+            failed(failureText(result), exitCimStatus);
+            err_ << hintFor(request, result, schema);
+            return exitCimStatus;
+        }
+        // The libraries are gone by now, with whatever they may have left to write themselves.
+        printResult(request, result, schema, *makePrinter(commandLine_.format, out_, schema));
+        err_ << notesOn(request, result, schema);
+        return written();
+    }
+
+    /// Has the request answered once its path has all keys. The path is printed: a script can give
+    /// it in full the next time, and a person sees what was asked.
+    OperationResult completed(ProviderHost& host, OperationRequest& request) {
+        OperationResult names = host.ask(namesRequest(request.path));
+        if (names.rc != CMPI_RC_OK) return names;
+        request.path = completedPath(request.path, names.paths);
+        err_ << "cmpihost: completed the path: " << base::escapeForTerminal(toString(request.path))
+             << '\n';
+        return host.run(request);
+    }
+
+    ExitStatus drawHost(const Schema& schema, const SchemaCatalogue& catalogue) {
+        const std::string nameSpace = parseNamespace(commandLine_.nameSpace);
+        try {
+            const std::vector<TreeNode> roots = withHost(catalogue, [&](ProviderHost& host) {
+                const Ask ask = [&host](const OperationRequest& request) {
+                    return host.ask(request);
+                };
+                return hostTree(ask, nameSpace, schema);
+            });
+            for (const TreeNode& root : roots) drawTree(root, out_);
+        } catch (const TreeFailure& failure) {
+            return failed(failure.what(), exitCimStatus);
+        }
+        return written();
+    }
+
+    ExitStatus failed(const std::string& complaint, ExitStatus status) {
+        err_ << "cmpihost: " << complaint << '\n';
+        return status;
+    }
+
+    ExitStatus written() {
+        if (!out_.flush()) return failed("the results cannot be written", exitCimStatus);
+        return exitDone;
+    }
+
+    /// Has the host do its work, and prints what it caught the provider at.
+    template <class Work>
+    std::invoke_result_t<Work, ProviderHost&> withHost(const SchemaCatalogue& catalogue,
+                                                       Work work) {
+        // The logging library reads its configuration when it is loaded, and again while it runs.
+        std::optional<ScopedStderrLog> log;
+        if (commandLine_.log) log.emplace();
+        const std::string provider = providerFile(commandLine_, programFolder_);
+        ProviderHost host({provider, providerName(provider)}, catalogue, computerSystems());
+        auto result = work(host);
+        for (const std::string& violation : host.unload()) {
+            err_ << "caught: " << base::escapeForTerminal(violation) << '\n';
+        }
+        return result;
+    }
+
+    ComputerSystemSource computerSystems() const {
+        if (commandLine_.computerSystems) return {{}, *commandLine_.computerSystems};
+        const std::string companion = commandLine_.companion.empty()
+                                          ? findLibrary(Library::Companion, programFolder_).string()
+                                          : loaderPath(commandLine_.companion);
+        return {companion};
+    }
+
+    const CommandLine& commandLine_;
+    const fs::path& programFolder_;
+    std::ostream& out_;
+    std::ostream& err_;
+};
+
+/// Shows the text that the command line asked for (help, version) or earned (a complaint).
+ExitStatus show(const ParsedCommandLine& parsed) {
+    std::ostream& stream = parsed.status == exitDone ? std::cout : std::cerr;
     if (!(stream << parsed.text).flush()) {
         std::cerr << "cmpihost: the text cannot be written\n";
-        return parsed.status == cmpihost::exitDone ? cmpihost::exitCimStatus : parsed.status;
+        return parsed.status == exitDone ? exitCimStatus : parsed.status;
     }
     return parsed.status;
 }
 
 }  // namespace
+
+}  // namespace cmpihost
 
 int main(int argumentCount, char** arguments) {
     using namespace cmpihost;
@@ -28,7 +227,8 @@ int main(int argumentCount, char** arguments) {
         const ParsedCommandLine parsed = parseCommandLine(argumentCount, arguments);
         if (!parsed.commandLine) return show(parsed);
         const char* const invokedAs = argumentCount > 0 ? arguments[0] : "";
-        return run(*parsed.commandLine, programFolder(invokedAs), std::cout, std::cerr);
+        return Run(*parsed.commandLine, programFolder(invokedAs), std::cout, std::cerr)
+            .exitStatus();
     } catch (const std::exception& error) {
         std::cerr << "cmpihost: " << error.what() << '\n';
         return exitUsage;

@@ -36,6 +36,7 @@ constexpr std::string_view byteOrderMark = "\xEF\xBB\xBF";
 }  // namespace
 
 std::string Token::described() const {
+    // Descriptions in a schema are pages long.
     constexpr std::size_t most = 40;
     const std::string shown = text.size() > most ? text.substr(0, most) + "..." : text;
     switch (kind) {
@@ -130,6 +131,7 @@ Token Lexer::number(Position start) {
         return !hexadecimal && (text.back() == 'e' || text.back() == 'E') &&
                (peek() == '+' || peek() == '-');
     };
+    // With the letters behind it, so that "12x" is one wrong number, not a number and a name.
     while (isWordPart(peek()) || peek() == '.' || inExponent()) {
         text += take();
         hexadecimal = hexadecimal || text.back() == 'x' || text.back() == 'X';
@@ -171,6 +173,7 @@ std::string Lexer::quoted(Position start, char delimiter, const char* what) {
     take();
     std::string content;
     while (peek() != delimiter) {
+        // A quote that is missing is reported on its line, not at the end of the file.
         if (atEnd() || peek() == '\n')
             fail(start, std::string("the ") + what + " that begins here is not closed by " +
                             (delimiter == '"' ? "'\"'" : "'") + " on its line");
@@ -197,6 +200,7 @@ struct Digits {
     int base;
 };
 
+/// A lone 0 is read as octal, where it is the same number.
 Digits split(std::string_view unsignedText) {
     const std::string_view start = unsignedText.substr(0, 2);
     if (start == "0x" || start == "0X") return {unsignedText.substr(2), 16};
@@ -227,6 +231,7 @@ std::errc readInteger(std::string_view unsignedText, bool negative, Scalar& valu
         value = magnitude;
     } else if (magnitude > mostNegative) {
         return std::errc::result_out_of_range;
+        // This number has no positive counterpart that could be negated.
     } else if (magnitude == mostNegative) {
         value = std::numeric_limits<std::int64_t>::min();
     } else {

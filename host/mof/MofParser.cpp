@@ -143,6 +143,7 @@ void Parser::pragma(Document& to) {
     expect("(", "the name of the pragma");
     const std::string parameter = joinedTexts("the parameter of the pragma");
     expect(")", "the parameter of the pragma");
+    // The others (locale, namespace) do not matter to who asks for classes.
     if (base::equalsIgnoreCase(name, "include")) to.includes.push_back(parameter);
 }
 
@@ -221,6 +222,7 @@ std::vector<Feature> Parser::parameters() {
 
 void Parser::arraySuffix(Feature& to) {
     if (!accept("[")) return;
+    // The size has to be right and is then forgotten: nothing here is stored in arrays.
     if (next_.kind == TokenKind::Number) {
         const Token size = take();
         if (!fits(size.value, Type::UInt32) || size.value == Scalar(std::uint64_t{0})) {
@@ -361,6 +363,7 @@ Initializer Parser::list() {
     return result;
 }
 
+/// NULL alone is an array that is not there, not one with a null in it.
 Initializer Parser::listOrNull() {
     return acceptWord("null") ? Initializer{false, {Scalar()}} : list();
 }

@@ -29,6 +29,7 @@ std::vector<fs::path> mofFiles(const fs::path& folder) {
         throw std::runtime_error("the schema folder " + folder.string() +
                                  " cannot be read: " + error.message());
     }
+    // Folders have an order of their own on each machine; complaints must not.
     std::sort(files.begin(), files.end());
     return files;
 }
@@ -163,6 +164,7 @@ bool Schema::isKey(const std::string& className, const std::string& propertyName
 }
 
 bool Schema::isAssociation(const std::string& className) const {
+    // The qualifier is inherited: a subclass need not say it again.
     const mof::Class* level = find(className);
     while (level != nullptr && !mof::isSet(level->qualifiers, "Association")) {
         level = find(level->superclass);
@@ -190,6 +192,7 @@ CMPIType cmpiType(const mof::Feature& property) {
 }
 
 SchemaCatalogue::SchemaCatalogue(const Schema& schema) {
+    // All at once: the broker asks again for every property that a provider sets.
     for (const std::string& name : schema.classNames()) {
         declarations_.emplace(base::toLower(name), declarationOf(schema, *schema.find(name)));
     }

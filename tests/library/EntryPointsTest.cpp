@@ -6,7 +6,7 @@
 #include <fstream>
 #include <iterator>
 
-#include "host/broker/Request.h"
+#include "host/broker/RequestScope.h"
 #include "host/broker/ResultCollector.h"
 #include "library/LibraryFixture.h"
 

@@ -4,7 +4,7 @@
 #include <functional>
 #include <stdexcept>
 
-#include "host/broker/Request.h"
+#include "host/broker/RequestScope.h"
 #include "library/LibraryFixture.h"
 
 namespace {
@@ -80,7 +80,7 @@ class ThrowingResults : public LibraryFixture {
   protected:
     struct Handler {
         const char* name;
-        std::function<CMPIStatus(const CMPIContext*, const CMPIResult*, Request&)> call;
+        std::function<CMPIStatus(const CMPIContext*, const CMPIResult*, RequestScope&)> call;
     };
 
     // The five, each for one element.
@@ -91,28 +91,28 @@ class ThrowingResults : public LibraryFixture {
         const char* const association = "KORVA_RunningOS";
         return {
             {"OperatingSystem_EnumInstanceNames",
-             [=](auto* context, auto* result, Request& request) {
+             [=](auto* context, auto* result, RequestScope& request) {
                  return instances->ft->enumerateInstanceNames(
                      instances, context, result, request.makePath(path(system.className)));
              }},
             {"OperatingSystem_EnumInstances",
-             [=](auto* context, auto* result, Request& request) {
+             [=](auto* context, auto* result, RequestScope& request) {
                  return instances->ft->enumerateInstances(
                      instances, context, result, request.makePath(path(system.className)), nullptr);
              }},
             {"OperatingSystem_GetInstance",
-             [=](auto* context, auto* result, Request& request) {
+             [=](auto* context, auto* result, RequestScope& request) {
                  return instances->ft->getInstance(instances, context, result,
                                                    request.makePath(system), nullptr);
              }},
             {"OperatingSystem_AssociatorNames",
-             [=](auto* context, auto* result, Request& request) {
+             [=](auto* context, auto* result, RequestScope& request) {
                  return associations->ft->associatorNames(associations, context, result,
                                                           request.makePath(system), association,
                                                           nullptr, nullptr, nullptr);
              }},
             {"OperatingSystem_Associators",
-             [=](auto* context, auto* result, Request& request) {
+             [=](auto* context, auto* result, RequestScope& request) {
                  return associations->ft->associators(associations, context, result,
                                                       request.makePath(system), association,
                                                       nullptr, nullptr, nullptr, nullptr);
@@ -143,7 +143,7 @@ class ThrowingResults : public LibraryFixture {
 TEST_F(ThrowingResults, AreReportedOnceTheAdapterIsDestroyed) {
     for (const Handler& handler : handlers()) {
         for (const bool fromDone : {false, true}) {
-            Request request(broker);
+            RequestScope request(broker);
             ThrowingResult result(fromDone);
             recording::clear();
             const CMPIStatus status =

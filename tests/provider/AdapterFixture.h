@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "host/broker/ComputerSystemService.h"
-#include "host/broker/Request.h"
+#include "host/broker/RequestScope.h"
 #include "provider/SimulatedFixture.h"
 
 template <class Adapter>
@@ -53,7 +53,7 @@ class Adapters : public SimulatedFixture {
 
     cmpihost::ComputerSystemService computers{"host1"};
     cmpihost::Broker broker;
-    cmpihost::Request request{broker};
+    cmpihost::RequestScope request{broker};
     CMPIContext* context = request.makeContext({}, "root/cimv2");
 };
 

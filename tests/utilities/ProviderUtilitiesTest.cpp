@@ -12,7 +12,7 @@
 #include <vector>
 
 #include "host/broker/Broker.h"
-#include "host/broker/Request.h"
+#include "host/broker/RequestScope.h"
 
 namespace {
 
@@ -79,7 +79,7 @@ class UtilitiesTest : public testing::TestWithParam<bool> {
     }
 
     cmpihost::Broker broker;
-    cmpihost::Request request{broker};
+    cmpihost::RequestScope request{broker};
 };
 
 std::string brokerName(const testing::TestParamInfo<bool>& info) {

@@ -3,7 +3,7 @@
 
 #include "base/Ascii.h"
 #include "host/broker/Broker.h"
-#include "host/broker/Request.h"
+#include "host/broker/RequestScope.h"
 
 #include <cmpi/cmpift.h>
 #include <gmock/gmock.h>
@@ -112,7 +112,7 @@ inline TestCatalogue testClasses() {
 class BrokerTest : public ::testing::Test {
   protected:
     Broker broker;
-    Request request{broker};
+    RequestScope request{broker};
     const CMPIBroker* mb = broker.cmpi();
     CMPIStatus status = {CMPI_RC_ERROR, nullptr};
 

@@ -46,7 +46,7 @@ std::size_t nullSlotsOf(const Edt* object) {
 
 TEST(CompleteBroker, LeavesNoSlotEmptyInLiveOrDeadObjects) {
     Broker broker;
-    Request request(broker);
+    RequestScope request(broker);
     const CMPIBroker* const mb = broker.cmpi();
     EXPECT_EQ(nullSlots(*mb->bft, offsetof(CMPIBrokerFT, prepareAttachThread)), 0u);
     EXPECT_EQ(nullSlots(*mb->eft, sizeof(void*)), 0u);
@@ -76,7 +76,7 @@ TEST(CompleteBroker, LeavesNoSlotEmptyInLiveOrDeadObjects) {
 class SparseBroker : public ::testing::Test {
   protected:
     Broker broker{nullptr, BrokerOptions::sparse()};
-    Request request{broker};
+    RequestScope request{broker};
     const CMPIBroker* mb = broker.cmpi();
     CMPIObjectPath* path = CMNewObjectPath(mb, "", "TEST_Thing", nullptr);
 };
@@ -124,7 +124,7 @@ TEST_F(SparseBroker, TellsKeysAndMissingItemsInItsOwnWay) {
 TEST_F(SparseBroker, SharesObjectsWithACompleteOneAndRecognisesDeadOnes) {
     Broker complete;
     {
-        Request other(complete);
+        RequestScope other(complete);
         CMPIInstance* const instance = CMNewInstance(complete.cmpi(), path, nullptr);
         ASSERT_NE(instance, nullptr);
         EXPECT_EQ(valueOf(instance).path.className, "TEST_Thing");
@@ -238,7 +238,7 @@ TEST_F(ThreadTable, SpellsTheFileOfALibrary) {
 TEST_F(ThreadTable, CallsOfARequestCountForItsFaults) {
     FaultPlan plan({"newThread", 1});
     broker.setFaultPlan(&plan);
-    Request request(broker);
+    RequestScope request(broker);
     EXPECT_EQ(xft->newThread(leaveEarly, xft, 0), nullptr);
     void* const mutex = xft->newMutex(0);
     xft->lockMutex(mutex);

@@ -125,7 +125,7 @@ TEST_F(ObjectQuestions, WhatIsNoObjectIsAViolation) {
 TEST_F(ObjectQuestions, ClassesDescendAsTheCatalogueSays) {
     const TestCatalogue catalogue = testClasses();
     Broker schooled(&catalogue);
-    Request scope(schooled);
+    RequestScope scope(schooled);
     const CMPIBroker* const other = schooled.cmpi();
     const CMPIObjectPath* const small = CMNewObjectPath(other, "", "TEST_SmallThing", nullptr);
     for (const char* const ancestor : {"test_smallthing", "TEST_Thing", "CIM_Thing"}) {

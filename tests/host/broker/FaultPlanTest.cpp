@@ -146,7 +146,7 @@ TEST_F(Faults, ExactlyOneOfTheCallsOfAllThreadsIsTheNth) {
     std::vector<std::thread> threads;
     for (int t = 0; t < 4; ++t) {
         threads.emplace_back([&] {
-            Request own(broker);
+            RequestScope own(broker);
             for (int i = 0; i < 50; ++i) {
                 if (CMNewObjectPath(mb, "root", "TEST_Thing", nullptr) == nullptr) ++failures;
             }

@@ -21,7 +21,7 @@ class Lifetimes : public ::testing::Test {
     /// What `make` made in a request that has ended.
     template <class Make>
     auto afterItsRequest(Make make) {
-        Request request(broker);
+        RequestScope request(broker);
         return make();
     }
 };
@@ -60,7 +60,7 @@ TEST_F(Lifetimes, EveryKindOfObjectIsRecognisedAfterItsRequest) {
     const CMPIResult* result = nullptr;
     CMPIString* className = nullptr;
     {
-        Request request(broker);
+        RequestScope request(broker);
         ResultCollector collector(request);
         instance = CMNewInstance(mb, newPath(), nullptr);
         array = CMNewArray(mb, 1, CMPI_uint8, nullptr);
@@ -91,7 +91,7 @@ TEST_F(Lifetimes, EveryKindOfObjectIsRecognisedAfterItsRequest) {
 
 TEST_F(Lifetimes, ADeadObjectHandedToALiveOneIsRecognised) {
     CMPIObjectPath* kept = afterItsRequest([this] { return newPath(); });
-    Request request(broker);
+    RequestScope request(broker);
     EXPECT_EQ(CMNewInstance(mb, kept, &status), nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_INVALID_HANDLE);
     EXPECT_EQ(CMAddKey(newPath(), "Ref", &kept, CMPI_ref).rc, CMPI_RC_ERR_INVALID_HANDLE);
@@ -102,7 +102,7 @@ TEST_F(Lifetimes, ADeadObjectHandedToALiveOneIsRecognised) {
 }
 
 TEST_F(Lifetimes, ObjectsOfANestedRequestLiveUntilTheOuterOneEnds) {
-    Request outer(broker);
+    RequestScope outer(broker);
     CMPIObjectPath* const path = afterItsRequest([this] { return newPath(); });
     EXPECT_EQ(textOf(CMGetClassName(path, nullptr)), "TEST_Thing");
     EXPECT_THAT(broker.violations(), IsEmpty());
@@ -112,7 +112,7 @@ TEST_F(Lifetimes, ObjectsOfANestedRequestLiveUntilTheOuterOneEnds) {
 }
 
 TEST_F(Lifetimes, EndingARequestTwiceIsHarmless) {
-    Request request(broker);
+    RequestScope request(broker);
     newPath();
     request.end();
     request.end();
@@ -121,7 +121,7 @@ TEST_F(Lifetimes, EndingARequestTwiceIsHarmless) {
 
 TEST_F(Lifetimes, AnObjectMadeOutsideARequestOfItsBrokerIsAViolationButWorks) {
     Broker other;
-    Request request(other);
+    RequestScope request(other);
     CMPIObjectPath* const path = newPath();
     ASSERT_NE(path, nullptr);
     EXPECT_EQ(CMGetKeyCount(path, nullptr), 0u);
@@ -133,10 +133,10 @@ TEST_F(Lifetimes, AnObjectMadeOutsideARequestOfItsBrokerIsAViolationButWorks) {
 
 TEST_F(Lifetimes, BrokersKeepTheirRequestsApartOnOneThread) {
     Broker other;
-    Request first(broker);
+    RequestScope first(broker);
     CMPIObjectPath* const mine = newPath();
     {
-        Request second(other);
+        RequestScope second(other);
         CMPIObjectPath* const nested = newPath();
         EXPECT_EQ(CMAddKey(nested, "Ref", &mine, CMPI_ref).rc, CMPI_RC_OK);
     }
@@ -162,7 +162,7 @@ TEST_F(Lifetimes, ACloneLivesUntilItIsReleased) {
 }
 
 TEST_F(Lifetimes, EveryKindOfObjectButAResultCanBeCloned) {
-    Request request(broker);
+    RequestScope request(broker);
     CMPIInstance* const instance = CMClone(CMNewInstance(mb, newPath(), nullptr), &status);
     CMPIString* const string = CMClone(CMNewString(mb, "x", nullptr), &status);
     CMPIArray* const array = CMClone(CMNewArray(mb, 2, CMPI_uint8, nullptr), &status);
@@ -190,7 +190,7 @@ TEST_F(Lifetimes, EveryKindOfObjectButAResultCanBeCloned) {
 }
 
 TEST_F(Lifetimes, ACloneUsedOrReleasedAfterItsReleaseIsRecognised) {
-    Request request(broker);
+    RequestScope request(broker);
     CMPIObjectPath* const copy = CMClone(newPath(), nullptr);
     CMRelease(copy);
     EXPECT_EQ(CMGetKeyCount(copy, nullptr), 0u);
@@ -203,7 +203,7 @@ TEST_F(Lifetimes, ACloneUsedOrReleasedAfterItsReleaseIsRecognised) {
 }
 
 TEST_F(Lifetimes, ReleasingAnObjectOfTheRequestIsAViolationAndLeavesItAlive) {
-    Request request(broker);
+    RequestScope request(broker);
     CMPIObjectPath* const path = newPath();
     EXPECT_EQ(CMRelease(path).rc, CMPI_RC_ERR_INVALID_HANDLE);
     EXPECT_EQ(CMGetKeyCount(path, &status), 0u);
@@ -224,7 +224,7 @@ TEST(QuarantineOfObjects, KeepsTheYoungestUpToItsLimit) {
         Broker small(nullptr, withQuarantine(limit));
         CMPIObjectPath* last = nullptr;
         {
-            Request request(small);
+            RequestScope request(small);
             for (int i = 0; i < 25; ++i) {
                 const std::string name = "TEST_" + std::to_string(i);
                 last = CMNewObjectPath(small.cmpi(), "", name.c_str(), nullptr);
@@ -241,7 +241,7 @@ TEST(QuarantineOfObjects, KeepsTheYoungestUpToItsLimit) {
 TEST(QuarantineOfObjects, GivesAnObjectFreedEarlyOnePlace) {
     Broker small(nullptr, withQuarantine(3));
     {
-        Request request(small);
+        RequestScope request(small);
         CMPIObjectPath* paths[3];
         for (CMPIObjectPath*& path : paths)
             path = CMNewObjectPath(small.cmpi(), "", "TEST_Thing", nullptr);
@@ -261,15 +261,15 @@ TEST_F(Lifetimes, AVeryLongNameIsCutInTheReport) {
 }
 
 TEST_F(Lifetimes, RequestsSeeTheViolationsOfTheirOwnThreadAndOfInnerOnes) {
-    Request outer(broker);
+    RequestScope outer(broker);
     CMNewString(mb, nullptr, nullptr);
     std::thread([this] {
-        Request other(broker);
+        RequestScope other(broker);
         CMNewObjectPath(mb, nullptr, nullptr, nullptr);
         EXPECT_EQ(other.violations().size(), 1u);
     }).join();
     {
-        Request inner(broker);
+        RequestScope inner(broker);
         CMNewInstance(mb, nullptr, nullptr);
         EXPECT_EQ(inner.violations().size(), 1u);
     }
@@ -286,7 +286,7 @@ TEST_F(Lifetimes, RequestsRunInParallelOnOneBroker) {
         threads.emplace_back([&, t] {
             const std::string className = "TEST_" + std::to_string(t);
             for (int round = 0; round < 200; ++round) {
-                Request request(broker);
+                RequestScope request(broker);
                 CMPIObjectPath* const path =
                     CMNewObjectPath(mb, "root", className.c_str(), nullptr);
                 CMAddKey(path, "Name", className.c_str(), CMPI_chars);
@@ -306,7 +306,7 @@ TEST_F(Lifetimes, RequestsRunInParallelOnOneBroker) {
 }
 
 TEST_F(Lifetimes, AnAttachedThreadHasARequestOfItsOwn) {
-    Request request(broker);
+    RequestScope request(broker);
     CMPIContext* const prepared =
         CBPrepareAttachThread(mb, request.makeContext({5, {}, {}}, "root"));
     ASSERT_NE(prepared, nullptr);
@@ -325,7 +325,7 @@ TEST_F(Lifetimes, AnAttachedThreadHasARequestOfItsOwn) {
 }
 
 TEST_F(Lifetimes, AThreadDetachesOnlyWhenItIsAttachedAndWithAPreparedContext) {
-    Request request(broker);
+    RequestScope request(broker);
     CMPIContext* const context = request.makeContext({}, "root");
     CMPIContext* const prepared = CBPrepareAttachThread(mb, context);
     EXPECT_EQ(CBDetachThread(mb, prepared).rc, CMPI_RC_ERR_FAILED);
@@ -341,7 +341,7 @@ TEST_F(Lifetimes, AThreadDetachesOnlyWhenItIsAttachedAndWithAPreparedContext) {
 }
 
 TEST_F(Lifetimes, ARequestMakesAndReadsBackPathsAndInstances) {
-    Request request(broker);
+    RequestScope request(broker);
     const InstanceValue thing = {{"root", "TEST_Thing", {{"Name", "x"}}},
                                  {{"Name", "x"}, {"Size", Value::fromUnsigned(3, CMPI_uint16)}}};
     CMPIObjectPath* const path = request.makePath(thing.path);

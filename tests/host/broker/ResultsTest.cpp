@@ -106,7 +106,7 @@ class SchemaViolations : public ::testing::Test {
   protected:
     const TestCatalogue catalogue = testClasses();
     Broker broker{&catalogue};
-    Request request{broker};
+    RequestScope request{broker};
     ResultCollector collector{request};
     const CMPIBroker* mb = broker.cmpi();
     CMPIStatus status = {CMPI_RC_OK, nullptr};

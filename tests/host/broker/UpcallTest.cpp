@@ -43,7 +43,7 @@ TEST_F(Upcalls, AnUnknownClassGivesNullAndItsStatus) {
 TEST_F(Upcalls, ADeclaredClassWithoutAProviderIsNotSupported) {
     const TestCatalogue catalogue = testClasses();
     Broker schooled(&catalogue);
-    Request scope(schooled);
+    RequestScope scope(schooled);
     EXPECT_EQ(CBEnumInstances(schooled.cmpi(), context, newPath(), nullptr, &status), nullptr);
     EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
 }

@@ -1,4 +1,4 @@
-#include "host/cli/ProviderHost.h"
+#include "host/cli/ScopedStderrLog.h"
 
 #include <gmock/gmock.h>
 #include <signal.h>

@@ -1,5 +1,5 @@
-#ifndef HOST_BROKER_REQUEST_H
-#define HOST_BROKER_REQUEST_H
+#ifndef HOST_BROKER_REQUEST_SCOPE_H
+#define HOST_BROKER_REQUEST_SCOPE_H
 
 #include "host/broker/Broker.h"
 
@@ -10,17 +10,17 @@
 /// The scope in which the objects of a broker live.
 namespace cmpihost {
 
-class RequestScope;
+class ObjectScope;
 
 /// While a request is open on a thread, objects made by its broker on that thread belong to it.
 /// Requests nest: objects live until the outermost one of the broker on the thread ends. A use
 /// after that is a violation. Opened and ended on one thread, in reverse order of opening.
-class Request {
+class RequestScope {
   public:
-    explicit Request(Broker& broker);
-    ~Request();
-    Request(const Request&) = delete;
-    Request& operator=(const Request&) = delete;
+    explicit RequestScope(Broker& broker);
+    ~RequestScope();
+    RequestScope(const RequestScope&) = delete;
+    RequestScope& operator=(const RequestScope&) = delete;
 
     /// Ends the request before its scope does; later calls do nothing.
     void end() noexcept;
@@ -40,7 +40,7 @@ class Request {
     CMPIContext* makeContext(const RequestContext& context, const std::string& nameSpace);
 
   private:
-    std::unique_ptr<RequestScope> scope_;
+    std::unique_ptr<ObjectScope> scope_;
 };
 
 /// The content of an object of any broker. The object must be alive: else std::invalid_argument.

@@ -1,5 +1,5 @@
 // What a client sends is made into objects here, past the slots, so that no fault plan counts it.
-#include "host/broker/Request.h"
+#include "host/broker/RequestScope.h"
 
 #include "host/broker/Conversion.h"
 
@@ -7,32 +7,34 @@
 
 namespace cmpihost {
 
-Request::Request(Broker& broker) : scope_(std::make_unique<RequestScope>(broker.core())) {}
-Request::~Request() = default;
+RequestScope::RequestScope(Broker& broker) : scope_(std::make_unique<ObjectScope>(broker.core())) {}
+RequestScope::~RequestScope() = default;
 
-void Request::end() noexcept {
+void RequestScope::end() noexcept {
     scope_->end();
 }
-Broker& Request::broker() const noexcept {
+Broker& RequestScope::broker() const noexcept {
     return scope_->core().owner();
 }
-const std::vector<std::string>& Request::violations() const noexcept {
+const std::vector<std::string>& RequestScope::violations() const noexcept {
     return scope_->violations();
 }
 
-CMPIObjectPath* Request::makePath(const ObjectPathValue& value) {
+CMPIObjectPath* RequestScope::makePath(const ObjectPathValue& value) {
     return scope_->core().make<CMPIObjectPath>(std::make_shared<ObjectPathValue>(value));
 }
 
-CMPIInstance* Request::makeInstance(const InstanceValue& value) {
+CMPIInstance* RequestScope::makeInstance(const InstanceValue& value) {
     return cmpihost::makeInstance(scope_->core(), std::make_shared<InstanceValue>(value));
 }
 
-CMPIString* Request::makeString(const std::optional<std::string>& text) {
+CMPIString* RequestScope::makeString(const std::optional<std::string>& text) {
     return scope_->core().make<CMPIString>(text ? Characters(*text) : Characters());
 }
 
-CMPIContext* Request::makeContext(const RequestContext& context, const std::string& nameSpace) {
+CMPIContext* RequestScope::makeContext(const RequestContext& context,
+                                       const std::string& nameSpace) {
+    // The entry is there without a value, too: that is how a client without a name looks.
     const auto text = [](const std::optional<std::string>& given) {
         return given ? Value(*given) : Value::null(CMPI_string);
     };
@@ -40,6 +42,7 @@ CMPIContext* Request::makeContext(const RequestContext& context, const std::stri
         {CMPIInvocationFlags, Value::fromUnsigned(context.flags, CMPI_uint32)},
         {CMPIPrincipal, text(context.principal)}};
     BrokerCore& core = scope_->core();
+    // Providers must not count on entries that only some object managers hand out.
     if (!core.isSparse()) {
         entries.push_back({CMPIInitNameSpace, nameSpace});
         entries.push_back({CMPIRole, text(context.role)});
