@@ -5,14 +5,8 @@ if(KORVA_SANITIZE MATCHES "thread")
         ENVIRONMENT "TSAN_OPTIONS=suppressions=${CMAKE_CURRENT_SOURCE_DIR}/shared-by-design.supp")
 endif()
 
-# What the soak measures with is tested in the same program, where there is a soak.
-set(measuring)
-if(NOT KORVA_SANITIZE MATCHES "thread")
-    set(measuring ProcessState.cpp ProcessStateTest.cpp SoakOptions.cpp)
-endif()
 korva_test(concurrency_tests
-    SOURCES ConcurrencyTest.cpp ThreadGroup.cpp
-            ${measuring}
+    SOURCES ConcurrencyTest.cpp
     LIBRARIES korva_requests korva_simulated_host korva::vainstrumentation
     PROPERTIES ${load_properties})
 add_dependencies(concurrency_tests korvaosstatusfacade)

@@ -3,20 +3,27 @@
 // thread asks may show in the answer or in the record lines of another.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/syscall.h>
 #include <unistd.h>
 
+#include <algorithm>
+#include <atomic>
+#include <cstdio>
 #include <cstdlib>
 #include <fstream>
+#include <functional>
 #include <memory>
+#include <numeric>
 #include <ostream>
+#include <random>
 #include <sstream>
+#include <thread>
 #include <tuple>
 #include <utility>
 
 #include "framework/instrumentation/HostSource.h"
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
-#include "load/ThreadGroup.h"
 #include "support/FixtureTree.h"
 #include "support/Requests.h"
 #include "support/SimulatedHost.h"
@@ -24,7 +31,6 @@
 namespace {
 
 using namespace cmpihost;
-using namespace load;
 using testing::IsEmpty;
 
 constexpr std::size_t threadCount = 8;
@@ -90,52 +96,32 @@ bool sameAnswer(const Outcome& left, const Outcome& right) {
 /// Records without what threads may mix: channel, level, category, function and place, in order.
 using Shapes = std::vector<std::string>;
 
-bool isNumber(const std::string& text) {
-    return !text.empty() && text.find_first_not_of("0123456789") == std::string::npos;
-}
-
-// "TIME PROCESS THREAD CHANNEL LEVEL CATEGORY FUNCTION FILE:LINE TEXT": the fields before the text,
-// which alone may hold blanks. Fewer than eight: no record.
-std::vector<std::string> fieldsOf(const std::string& line) {
-    std::vector<std::string> fields;
-    std::size_t begin = 0;
-    while (fields.size() < 8) {
-        const std::size_t end = line.find(' ', begin);
-        if (end == std::string::npos) break;
-        fields.push_back(line.substr(begin, end - begin));
-        begin = end + 1;
-    }
-    return fields;
-}
-
-bool isTime(const std::string& text) {
-    return text.size() == std::string("2026-01-01T00:00:00.000Z").size() && text.back() == 'Z';
-}
-
-// Whether the line is one whole record, and no second one begins within it.
-bool isWhole(const std::string& line, const std::vector<std::string>& fields) {
-    if (fields.size() < 8 || !isTime(fields[0])) return false;
-    const std::string& place = fields[7];
-    return isNumber(fields[1]) && isNumber(fields[2]) &&
-           (fields[3] == "log" || fields[3] == "trace") && isNumber(fields[4]) &&
-           isNumber(place.substr(place.rfind(':') + 1)) &&
-           line.find("Z " + fields[1] + ' ', fields[0].size()) == std::string::npos;
-}
-
 // The shapes of the records of a log by the thread that wrote them. A line that is not one whole
-// record is filed under the thread -1.
+// record, "TIME PROCESS THREAD CHANNEL LEVEL CATEGORY FUNCTION FILE:LINE TEXT", of which the text
+// alone may hold blanks, is filed under the thread -1.
 std::map<long, Shapes> shapesByThread(const std::string& log) {
     std::map<long, Shapes> result;
     std::istringstream stream(log);
     for (std::string line; std::getline(stream, line);) {
-        const std::vector<std::string> fields = fieldsOf(line);
-        if (stream.eof() || !isWhole(line, fields)) {
+        int process = 0;
+        long thread = 0;
+        char channel[6] = "";
+        int begin = 0;
+        int end = 0;
+        std::sscanf(line.c_str(),
+                    "%*4d-%*2d-%*2dT%*2d:%*2d:%*2d.%*3dZ %d %ld %n%5s %*d %*s %*s %*[^: ]:%*d%n",
+                    &process, &thread, &begin, channel, &end);
+        const std::string text = line.substr(static_cast<std::size_t>(end));
+        const std::string shape =
+            line.substr(static_cast<std::size_t>(begin), static_cast<std::size_t>(end - begin));
+        const std::string second = "Z " + std::to_string(process) + ' ';
+        const bool whole = !stream.eof() && text[0] == ' ' &&
+                           text.find(second) == std::string::npos &&
+                           (channel == std::string("log") || channel == std::string("trace"));
+        if (whole)
+            result[thread].push_back(shape);
+        else
             result[-1].push_back(line);
-            continue;
-        }
-        std::string shape;
-        for (std::size_t field = 3; field < fields.size(); ++field) shape += fields[field] + ' ';
-        result[std::stol(fields[2])].push_back(shape);
     }
     return result;
 }
@@ -158,6 +144,64 @@ class GrowingFile {
     std::string path_;
     std::streamoff seen_ = 0;
 };
+
+/// What one thread of a group did.
+struct Member {
+    long thread;                     ///< its number in the records
+    std::vector<std::size_t> order;  ///< the tasks in the order in which it did them
+    std::vector<std::string> complaints;
+};
+
+std::vector<std::size_t> shuffledOrder(std::size_t rounds, std::size_t tasks, unsigned int seed) {
+    std::mt19937 random(seed);
+    std::vector<std::size_t> round(tasks);
+    std::iota(round.begin(), round.end(), std::size_t{0});
+    std::vector<std::size_t> result;
+    for (std::size_t number = 0; number < rounds; ++number) {
+        std::shuffle(round.begin(), round.end(), random);
+        result.insert(result.end(), round.begin(), round.end());
+    }
+    return result;
+}
+
+void note(Member& member, const std::string& complaint) {
+    if (!complaint.empty()) member.complaints.push_back(complaint);
+}
+
+/// Has `threads` threads do all of `tasks` tasks `rounds` times, each in an order of its own,
+/// starting together. `task` gets the number of a task and returns a complaint, empty for none.
+/// Until all are through, one more thread calls `meanwhile` again and again; what it complains
+/// about is in the last member, whose order is as long as it called.
+std::vector<Member> runThreadGroup(std::size_t threads, std::size_t rounds, std::size_t tasks,
+                                   const std::function<std::string(std::size_t)>& task,
+                                   const std::function<std::string()>& meanwhile) {
+    std::vector<Member> members(threads + 1);
+    std::atomic<std::size_t> waiting{threads};
+    std::atomic<std::size_t> running{threads};
+    std::vector<std::thread> workers;
+    for (std::size_t number = 0; number < threads; ++number) {
+        Member& member = members[number];
+        member.order = shuffledOrder(rounds, tasks, static_cast<unsigned int>(number));
+        workers.emplace_back([&] {
+            member.thread = ::syscall(SYS_gettid);
+            --waiting;
+            while (waiting > 0) std::this_thread::yield();
+            for (const std::size_t each : member.order) note(member, task(each));
+            --running;
+        });
+    }
+    Member& other = members.back();
+    workers.emplace_back([&] {
+        other.thread = ::syscall(SYS_gettid);
+        while (running > 0) {
+            other.order.push_back(other.order.size());
+            note(other, meanwhile());
+            std::this_thread::yield();
+        }
+    });
+    for (std::thread& worker : workers) worker.join();
+    return members;
+}
 
 /// Where the nodes come from, and how they are called.
 struct Host {

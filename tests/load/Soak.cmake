@@ -4,7 +4,7 @@ add_library(load_hosts MODULE Hosts.cpp)
 target_link_libraries(load_hosts PRIVATE korva_simulated_host korva::vainstrumentation)
 korva_shared_library(load_hosts)
 
-add_executable(soak ProcessState.cpp Soak.cpp SoakOptions.cpp Workload.cpp)
+add_executable(soak Soak.cpp Workload.cpp)
 set_target_properties(soak PROPERTIES UNITY_BUILD OFF)
 target_compile_definitions(soak PRIVATE
     KORVA_BINARY_DIR="${CMAKE_BINARY_DIR}" KORVA_LOAD_HOSTS="$<TARGET_FILE:load_hosts>")
@@ -14,7 +14,7 @@ add_dependencies(soak load_hosts korvaosstatusfacade)
 # korva_soak(<name> <option>...): a soak is one test.
 function(korva_soak name)
     add_test(NAME load.${name}
-        COMMAND "${CMAKE_CURRENT_SOURCE_DIR}/run" $<TARGET_FILE:soak> ${ARGN} --report)
+        COMMAND "${CMAKE_CURRENT_SOURCE_DIR}/run" $<TARGET_FILE:soak> ${ARGN})
     set_tests_properties(load.${name} PROPERTIES TIMEOUT 300 COST 100 LABELS slow)
 endfunction()
 
