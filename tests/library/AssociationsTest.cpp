@@ -161,25 +161,8 @@ TEST_F(Associations, FirstResultFromAnEndIsGivenEvenWhereNoneExists) {
     EXPECT_EQ(broker.takeViolations(), Texts(4, "path of KORVA_OperatingSystem without key Name"));
 }
 
-TEST_F(Associations, FirstOfTheKeysThatNameTheComputerDecides) {
-    const auto nameAskedFor = [this](std::vector<KeyBinding> keys) {
-        recording::clear();
-        associatorNames(path("KORVA_OperatingSystem", std::move(keys)), "KORVA_RunningOS");
-        return recording::takeRendered();
-    };
-    // The computer systems are enumerated whatever the key holds; that the mapping accepts either
-    // order shows in the absence of a message.
-    EXPECT_THAT(nameAskedFor({{"Name", "os1"}, {"CSName", "host1"}}),
-                testing::Not(HasSubstr("MESSAGE")));
-    EXPECT_THAT(nameAskedFor({{"CSName", "host1"}, {"Name", "os1"}}),
-                testing::Not(HasSubstr("MESSAGE")));
-    EXPECT_THAT(nameAskedFor({{"csname", "host1"}, {"NAME", "os1"}}),
-                HasSubstr("MESSAGE [File: OperatingSystemProvider.cpp, Line: #]: Could not find "
-                          "'CSName' or 'Name' Key in Moniker"));
-}
-
 TEST_F(Associations, SourceWithKeysButNotTheOneSoughtEndsWithAMessage) {
-    const std::vector<KeyBinding> keys = {{"Other", "x"}};
+    const std::vector<KeyBinding> keys = {{"csname", "host1"}, {"NAME", "x"}, {"Other", "x"}};
     for (const Association& association : {installed, running}) {
         EXPECT_THAT(farEnds(path("KORVA_OperatingSystem", keys), association,
                             "Could not find 'CSName' or 'Name' Key in Moniker"),

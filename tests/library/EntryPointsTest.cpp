@@ -2,9 +2,6 @@
 // object manager relies on before it knows what the provider is about.
 #include <dlfcn.h>
 #include <cstring>
-#include <filesystem>
-#include <fstream>
-#include <iterator>
 
 #include "host/broker/RequestScope.h"
 #include "host/broker/ResultCollector.h"
@@ -126,60 +123,6 @@ TEST_F(EntryPoints, CleanupSucceedsWhateverItIsToldAndRequestsFollow) {
     }
     EXPECT_TRUE(recording::take().empty());
     EXPECT_EQ(enumerateNames("KORVA_OperatingSystem").paths.size(), 1U);
-}
-
-std::size_t openFiles() {
-    const std::filesystem::directory_iterator files("/proc/self/fd");
-    return static_cast<std::size_t>(std::distance(begin(files), end(files)));
-}
-
-long residentKiB() {
-    std::ifstream status("/proc/self/status");
-    for (std::string word; status >> word;)
-        if (word == "VmRSS:") break;
-    long kibibytes = 0;
-    status >> kibibytes;
-    return kibibytes;
-}
-
-// The broker soon forgets the objects that have ended, whose shells it would keep for some time.
-class Reloading : public LibraryFixture {
-  protected:
-    Reloading() : LibraryFixture(forgetful()) {}
-
-  private:
-    static BrokerOptions forgetful() {
-        BrokerOptions options;
-        options.quarantine = 16;
-        return options;
-    }
-};
-
-TEST_F(Reloading, LoadingServingAndUnloadingAHundredTimesLeavesNothingBehind) {
-    std::size_t filesBefore = 0;
-    long memoryBefore = 0;
-    for (int round = 1; round <= 100; ++round) {
-        library.load();
-        EXPECT_EQ(enumerate("KORVA_OperatingSystem").instances.size(), 1U);
-        EXPECT_EQ(enumerate("KORVA_RunningOS").instances.size(), 1U);
-        recording::clear();
-        EXPECT_TRUE(library.unload(false));
-        if (round == 20) {
-            filesBefore = openFiles();
-            memoryBefore = residentKiB();
-        }
-    }
-    EXPECT_EQ(openFiles(), filesBefore);
-#ifdef KORVA_PLAIN_MEMORY
-    EXPECT_LT(residentKiB() - memoryBefore, 128);
-#else
-    static_cast<void>(memoryBefore);  // sanitizers keep what was freed
-#endif
-}
-
-TEST_F(EntryPoints, NoGenericFactoryIsOffered) {
-    EXPECT_EQ(library.symbol("_Generic_Create_InstanceMI"), nullptr);
-    EXPECT_EQ(library.symbol("_Generic_Create_AssociationMI"), nullptr);
 }
 
 TEST_F(EntryPoints, NoticeIsAText) {

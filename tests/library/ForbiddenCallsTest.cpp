@@ -14,11 +14,11 @@
 #include <cstddef>
 #include <cstdlib>
 #include <filesystem>
+#include <functional>
 #include <vector>
 
-#include "library/LibraryFixture.h"
-
 #include "framework/instrumentation/HostSource.h"
+#include "library/LibraryFixture.h"
 
 namespace {
 
@@ -102,17 +102,15 @@ class ForbiddenCalls : public LibraryFixture {
     }
 };
 
-TEST_F(ForbiddenCalls, ProcessesAreNoticedHere) {
-    EXPECT_EXIT(doForbidden([] { return ::fork() >= 0; }), KilledBySignal(SIGSYS), "");
-    EXPECT_EXIT(doForbidden([] { return ::vfork() >= 0; }), KilledBySignal(SIGSYS), "");
-    EXPECT_EXIT(doForbidden([] { return std::system("true") == 0; }), KilledBySignal(SIGSYS), "");
-    EXPECT_EXIT(doForbidden([] { return ::execl("/bin/true", "true", nullptr) == 0; }),
-                KilledBySignal(SIGSYS), "");
-}
-
-TEST_F(ForbiddenCalls, SocketsAreNoticedHere) {
-    EXPECT_EXIT(doForbidden([] { return opensSocket(AF_INET); }), KilledBySignal(SIGSYS), "");
-    EXPECT_EXIT(doForbidden([] { return opensSocket(AF_INET6); }), KilledBySignal(SIGSYS), "");
+TEST_F(ForbiddenCalls, AreNoticedHere) {
+    const std::function<bool()> forbidden[] = {
+        [] { return ::fork() >= 0; },
+        [] { return ::vfork() >= 0; },
+        [] { return std::system("true") == 0; },
+        [] { return ::execl("/bin/true", "true", nullptr) == 0; },
+        [] { return opensSocket(AF_INET); },
+        [] { return opensSocket(AF_INET6); }};
+    for (const auto& each : forbidden) EXPECT_EXIT(doForbidden(each), KilledBySignal(SIGSYS), "");
 }
 
 TEST_F(ForbiddenCalls, RequestsStartNoProcessAndUseNoNetwork) {

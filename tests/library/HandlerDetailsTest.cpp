@@ -5,7 +5,6 @@
 #include <iterator>
 #include <stdexcept>
 
-#include "host/broker/ResultCollector.h"
 #include "library/LibraryFixture.h"
 #include "support/Properties.h"
 
@@ -25,18 +24,6 @@ TEST_F(HandlerDetails, EveryInstanceCarriesAnEmptyDescriptionAndTheStatusOK) {
         EXPECT_EQ(text(instance, "Description"), "");
         EXPECT_EQ(text(instance, "Status"), "OK");
     }
-}
-
-TEST_F(HandlerDetails, ResultThatRefusesTheInstanceOfAGetStillGetsDone) {
-    const Outcome outcome =
-        invoke(requestFor(Operation::GetInstance, operatingSystemPath("host1", "Linux")),
-               [](ResultCollector& collector) {
-                   collector.failReturnInstance(1, CMPI_RC_ERR_FAILED);
-                   collector.failReturnDone(1, CMPI_RC_ERR_FAILED);
-               });
-    EXPECT_EQ(outcome.rc, CMPI_RC_OK);
-    EXPECT_EQ(outcome.refusedInstances.size(), 1U);
-    EXPECT_EQ(outcome.doneCount, 1U);
 }
 
 TEST_F(HandlerDetails, PropertyListReachesTheAdapterAsItCame) {
@@ -153,17 +140,6 @@ TEST_F(HandlerDetails, ExceptionsFromEveryDestructorAreReportedAsOne) {
     EXPECT_NE(records.find(message), std::string::npos);
     EXPECT_EQ(records.find(message), records.rfind(message));
     EXPECT_THAT(records, HasSubstr("markProviderExit"));
-}
-
-// While an exception is under way, the records of destructors must not stand in its way.
-TEST_F(HandlerDetails, ExceptionFromADestructorDoesNotReplaceTheFirstOne) {
-    recording::setHook([](const recording::Record& record) {
-        if (record.function[0] == '~') throw std::runtime_error("from a destructor");
-    });
-    host->throwFromCall(VA::SimulatedHost::Operation::ReadText, 1, std::runtime_error("the first"));
-    recording::clear();
-    EXPECT_EQ(enumerate("KORVA_OSElementCapabilities").rc, CMPI_RC_OK);
-    EXPECT_THAT(recording::takeRendered(), HasSubstr("]: the first\n"));
 }
 
 class HostileKeys : public LibraryFixture {
