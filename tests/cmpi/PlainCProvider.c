@@ -9,8 +9,6 @@ static const CMPIBroker* broker;
 
 static CMPIStatus plainCleanup(CMPIInstanceMI* mi, const CMPIContext* ctx,
                                CMPIBoolean terminating) {
-    (void)mi;
-    (void)ctx;
     if (!terminating) {
         CMReturn(CMPI_RC_DO_NOT_UNLOAD);
     }
@@ -21,7 +19,6 @@ static CMPIStatus plainEnumInstanceNames(CMPIInstanceMI* mi, const CMPIContext* 
                                          const CMPIResult* rslt, const CMPIObjectPath* op) {
     CMPIStatus status = {CMPI_RC_OK, NULL};
     CMPIEnumeration* names = CBEnumInstanceNames(broker, ctx, op, &status);
-    (void)mi;
     if (CMIsNullObject(names)) {
         CMReturnWithChars(broker, CMPI_RC_ERR_FAILED, "no enumeration");
     }
@@ -37,7 +34,6 @@ static CMPIStatus plainEnumInstances(CMPIInstanceMI* mi, const CMPIContext* ctx,
                                      const CMPIResult* rslt, const CMPIObjectPath* op,
                                      const char** properties) {
     CMPIEnumeration* instances = CBEnumInstances(broker, ctx, op, properties, NULL);
-    (void)mi;
     while (CMHasNext(instances, NULL)) {
         CMReturnInstance(rslt, CMGetNext(instances, NULL).value.inst);
     }
@@ -51,10 +47,6 @@ static CMPIStatus plainGetInstance(CMPIInstanceMI* mi, const CMPIContext* ctx,
     const CMPIUint32 users = 3;
     CMPIObjectPath* path = CMNewObjectPath(broker, "root/cimv2", "Plain_Class", NULL);
     CMPIInstance* instance;
-    (void)mi;
-    (void)ctx;
-    (void)op;
-    (void)properties;
     CMAddKey(path, "Name", "first", CMPI_chars);
     instance = CMNewInstance(broker, path, NULL);
     CMSetProperty(instance, "NumberOfUsers", &users, CMPI_uint32);
@@ -66,45 +58,24 @@ static CMPIStatus plainGetInstance(CMPIInstanceMI* mi, const CMPIContext* ctx,
 static CMPIStatus plainCreateInstance(CMPIInstanceMI* mi, const CMPIContext* ctx,
                                       const CMPIResult* rslt, const CMPIObjectPath* op,
                                       const CMPIInstance* inst) {
-    (void)mi;
-    (void)ctx;
-    (void)rslt;
-    (void)op;
-    (void)inst;
     CMReturn(CMPI_RC_ERR_ALREADY_EXISTS);
 }
 
 static CMPIStatus plainModifyInstance(CMPIInstanceMI* mi, const CMPIContext* ctx,
                                       const CMPIResult* rslt, const CMPIObjectPath* op,
                                       const CMPIInstance* inst, const char** properties) {
-    (void)mi;
-    (void)ctx;
-    (void)rslt;
-    (void)op;
-    (void)inst;
-    (void)properties;
     CMReturn(CMPI_RC_ERR_NO_SUCH_PROPERTY);
 }
 
 static CMPIStatus plainDeleteInstance(CMPIInstanceMI* mi, const CMPIContext* ctx,
                                       const CMPIResult* rslt, const CMPIObjectPath* op) {
     CMPIStatus status = {CMPI_RC_OK, NULL};
-    (void)mi;
-    (void)ctx;
-    (void)rslt;
-    (void)op;
     CMSetStatus(&status, CMPI_RC_ERR_ACCESS_DENIED);
     return status;
 }
 
 static CMPIStatus plainExecQuery(CMPIInstanceMI* mi, const CMPIContext* ctx, const CMPIResult* rslt,
                                  const CMPIObjectPath* op, const char* query, const char* lang) {
-    (void)mi;
-    (void)ctx;
-    (void)rslt;
-    (void)op;
-    (void)query;
-    (void)lang;
     CMReturn(CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED);
 }
 

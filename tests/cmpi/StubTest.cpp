@@ -6,7 +6,11 @@
 #include <string>
 #include <vector>
 
+#include "host/broker/Invoke.h"
+
 namespace {
+
+using namespace cmpihost;
 
 // A function for a slot of any MI. It returns a code of its own, so that slots can be told apart.
 template <int Code, class MI, class... Arguments>
@@ -14,35 +18,37 @@ CMPIStatus answer(MI*, Arguments...) {
     CMReturn(static_cast<CMPIrc>(Code));
 }
 
-constexpr decltype(CMPIInstanceMIFT::cleanup) stubCleanup = answer<1>;
-constexpr decltype(CMPIInstanceMIFT::enumerateInstanceNames) stubEnumInstanceNames = answer<2>;
-constexpr decltype(CMPIInstanceMIFT::enumerateInstances) stubEnumInstances = answer<3>;
-constexpr decltype(CMPIInstanceMIFT::getInstance) stubGetInstance = answer<4>;
-constexpr decltype(CMPIInstanceMIFT::createInstance) stubCreateInstance = answer<5>;
-constexpr decltype(CMPIInstanceMIFT::modifyInstance) stubModifyInstance = answer<6>;
-constexpr decltype(CMPIInstanceMIFT::deleteInstance) stubDeleteInstance = answer<7>;
-constexpr decltype(CMPIInstanceMIFT::execQuery) stubExecQuery = answer<8>;
+// SLOT(kind of MI, slot, function of that slot, its code)
+#define SLOTS(SLOT)                                                  \
+    SLOT(Instance, cleanup, stubCleanup, 1)                          \
+    SLOT(Instance, enumerateInstanceNames, stubEnumInstanceNames, 2) \
+    SLOT(Instance, enumerateInstances, stubEnumInstances, 3)         \
+    SLOT(Instance, getInstance, stubGetInstance, 4)                  \
+    SLOT(Instance, createInstance, stubCreateInstance, 5)            \
+    SLOT(Instance, modifyInstance, stubModifyInstance, 6)            \
+    SLOT(Instance, deleteInstance, stubDeleteInstance, 7)            \
+    SLOT(Instance, execQuery, stubExecQuery, 8)                      \
+    SLOT(Association, cleanup, stubAssociationCleanup, 11)           \
+    SLOT(Association, associators, stubAssociators, 12)              \
+    SLOT(Association, associatorNames, stubAssociatorNames, 13)      \
+    SLOT(Association, references, stubReferences, 14)                \
+    SLOT(Association, referenceNames, stubReferenceNames, 15)        \
+    SLOT(Method, cleanup, stubMethodCleanup, 21)                     \
+    SLOT(Method, invokeMethod, stubInvokeMethod, 22)                 \
+    SLOT(Property, cleanup, stubPropertyCleanup, 31)                 \
+    SLOT(Property, setProperty, stubSetProperty, 32)                 \
+    SLOT(Property, getProperty, stubGetProperty, 33)                 \
+    SLOT(Indication, cleanup, stubIndicationCleanup, 41)             \
+    SLOT(Indication, authorizeFilter, stubAuthorizeFilter, 42)       \
+    SLOT(Indication, mustPoll, stubMustPoll, 43)                     \
+    SLOT(Indication, activateFilter, stubActivateFilter, 44)         \
+    SLOT(Indication, deActivateFilter, stubDeActivateFilter, 45)     \
+    SLOT(Indication, enableIndications, stubEnableIndications, 46)   \
+    SLOT(Indication, disableIndications, stubDisableIndications, 47)
 
-constexpr decltype(CMPIAssociationMIFT::cleanup) stubAssociationCleanup = answer<11>;
-constexpr decltype(CMPIAssociationMIFT::associators) stubAssociators = answer<12>;
-constexpr decltype(CMPIAssociationMIFT::associatorNames) stubAssociatorNames = answer<13>;
-constexpr decltype(CMPIAssociationMIFT::references) stubReferences = answer<14>;
-constexpr decltype(CMPIAssociationMIFT::referenceNames) stubReferenceNames = answer<15>;
-
-constexpr decltype(CMPIMethodMIFT::cleanup) stubMethodCleanup = answer<21>;
-constexpr decltype(CMPIMethodMIFT::invokeMethod) stubInvokeMethod = answer<22>;
-
-constexpr decltype(CMPIPropertyMIFT::cleanup) stubPropertyCleanup = answer<31>;
-constexpr decltype(CMPIPropertyMIFT::setProperty) stubSetProperty = answer<32>;
-constexpr decltype(CMPIPropertyMIFT::getProperty) stubGetProperty = answer<33>;
-
-constexpr decltype(CMPIIndicationMIFT::cleanup) stubIndicationCleanup = answer<41>;
-constexpr decltype(CMPIIndicationMIFT::authorizeFilter) stubAuthorizeFilter = answer<42>;
-constexpr decltype(CMPIIndicationMIFT::mustPoll) stubMustPoll = answer<43>;
-constexpr decltype(CMPIIndicationMIFT::activateFilter) stubActivateFilter = answer<44>;
-constexpr decltype(CMPIIndicationMIFT::deActivateFilter) stubDeActivateFilter = answer<45>;
-constexpr decltype(CMPIIndicationMIFT::enableIndications) stubEnableIndications = answer<46>;
-constexpr decltype(CMPIIndicationMIFT::disableIndications) stubDisableIndications = answer<47>;
+#define DEFINE(kind, slot, function, code) \
+    constexpr decltype(CMPI##kind##MIFT::slot) function = answer<code>;
+SLOTS(DEFINE)
 
 const CMPIBroker* storedBroker = nullptr;
 const CMPIContext* contextOfHook = nullptr;
@@ -71,64 +77,31 @@ MI* make(const char* factory, const CMPIBroker* broker, const CMPIContext* ctx, 
 
 template <class MI>
 void expectHead(const MI* mi, const char* miName) {
-    ASSERT_NE(mi, nullptr);
+    ASSERT_NE(mi, nullptr) << miName;
     EXPECT_EQ(mi->hdl, nullptr);
     EXPECT_EQ(mi->ft->ftVersion, 200);
     EXPECT_EQ(mi->ft->miVersion, 200);
     EXPECT_STREQ(mi->ft->miName, miName);
 }
 
-TEST(CmpiStubs, InstanceTableHoldsThePrefixedFunctions) {
-    const auto* mi = make<CMPIInstanceMI>("Sample_Create_InstanceMI", nullptr, nullptr, nullptr);
-    ASSERT_NO_FATAL_FAILURE(expectHead(mi, "instanceSample"));
-    EXPECT_EQ(mi->ft->cleanup, stubCleanup);
-    EXPECT_EQ(mi->ft->enumerateInstanceNames, stubEnumInstanceNames);
-    EXPECT_EQ(mi->ft->enumerateInstances, stubEnumInstances);
-    EXPECT_EQ(mi->ft->getInstance, stubGetInstance);
-    EXPECT_EQ(mi->ft->createInstance, stubCreateInstance);
-    EXPECT_EQ(mi->ft->modifyInstance, stubModifyInstance);
-    EXPECT_EQ(mi->ft->deleteInstance, stubDeleteInstance);
-    EXPECT_EQ(mi->ft->execQuery, stubExecQuery);
-}
-
-TEST(CmpiStubs, AssociationTableHoldsThePrefixedFunctions) {
-    const auto* mi =
+TEST(CmpiStubs, TablesHoldTheirNamesAndThePrefixedFunctions) {
+    const auto* Instance =
+        make<CMPIInstanceMI>("Sample_Create_InstanceMI", nullptr, nullptr, nullptr);
+    const auto* Association =
         make<CMPIAssociationMI>("Sample_Create_AssociationMI", nullptr, nullptr, nullptr);
-    ASSERT_NO_FATAL_FAILURE(expectHead(mi, "associationSample"));
-    EXPECT_EQ(mi->ft->cleanup, stubAssociationCleanup);
-    EXPECT_EQ(mi->ft->associators, stubAssociators);
-    EXPECT_EQ(mi->ft->associatorNames, stubAssociatorNames);
-    EXPECT_EQ(mi->ft->references, stubReferences);
-    EXPECT_EQ(mi->ft->referenceNames, stubReferenceNames);
-}
-
-TEST(CmpiStubs, MethodTableHoldsThePrefixedFunctions) {
-    const auto* mi = make<CMPIMethodMI>("Sample_Create_MethodMI", nullptr, nullptr, nullptr);
-    ASSERT_NO_FATAL_FAILURE(expectHead(mi, "methodSample"));
-    EXPECT_EQ(mi->ft->cleanup, stubMethodCleanup);
-    EXPECT_EQ(mi->ft->invokeMethod, stubInvokeMethod);
-}
-
-TEST(CmpiStubs, PropertyTableHoldsThePrefixedFunctionsAndNoOrigin) {
-    const auto* mi = make<CMPIPropertyMI>("Sample_Create_PropertyMI", nullptr, nullptr, nullptr);
-    ASSERT_NO_FATAL_FAILURE(expectHead(mi, "propertySample"));
-    EXPECT_EQ(mi->ft->cleanup, stubPropertyCleanup);
-    EXPECT_EQ(mi->ft->setProperty, stubSetProperty);
-    EXPECT_EQ(mi->ft->getProperty, stubGetProperty);
-    EXPECT_EQ(mi->ft->setPropertyWithOrigin, nullptr);
-}
-
-TEST(CmpiStubs, IndicationTableHoldsThePrefixedFunctions) {
-    const auto* mi =
+    const auto* Method = make<CMPIMethodMI>("Sample_Create_MethodMI", nullptr, nullptr, nullptr);
+    const auto* Property =
+        make<CMPIPropertyMI>("Sample_Create_PropertyMI", nullptr, nullptr, nullptr);
+    const auto* Indication =
         make<CMPIIndicationMI>("Sample_Create_IndicationMI", nullptr, nullptr, nullptr);
-    ASSERT_NO_FATAL_FAILURE(expectHead(mi, "indicationSample"));
-    EXPECT_EQ(mi->ft->cleanup, stubIndicationCleanup);
-    EXPECT_EQ(mi->ft->authorizeFilter, stubAuthorizeFilter);
-    EXPECT_EQ(mi->ft->mustPoll, stubMustPoll);
-    EXPECT_EQ(mi->ft->activateFilter, stubActivateFilter);
-    EXPECT_EQ(mi->ft->deActivateFilter, stubDeActivateFilter);
-    EXPECT_EQ(mi->ft->enableIndications, stubEnableIndications);
-    EXPECT_EQ(mi->ft->disableIndications, stubDisableIndications);
+    ASSERT_NO_FATAL_FAILURE(expectHead(Instance, "instanceSample"));
+    ASSERT_NO_FATAL_FAILURE(expectHead(Association, "associationSample"));
+    ASSERT_NO_FATAL_FAILURE(expectHead(Method, "methodSample"));
+    ASSERT_NO_FATAL_FAILURE(expectHead(Property, "propertySample"));
+    ASSERT_NO_FATAL_FAILURE(expectHead(Indication, "indicationSample"));
+#define CHECK(kind, slot, function, code) EXPECT_EQ(kind->ft->slot, function) << #slot;
+    SLOTS(CHECK)
+    EXPECT_EQ(Property->ft->setPropertyWithOrigin, nullptr);
 }
 
 TEST(CmpiStubs, AFactoryStoresTheBrokerRunsTheHookAndLeavesTheStatusAlone) {
@@ -149,129 +122,73 @@ TEST(CmpiStubs, AFactoryReturnsTheSameMiEachTime) {
     EXPECT_EQ(first, make<CMPIInstanceMI>("Sample_Create_InstanceMI", nullptr, nullptr, nullptr));
 }
 
-// As much of an object manager as the provider in C calls: it enumerates three objects, notes what
-// the provider makes and what it returns.
-class PlainCProvider : public testing::Test {
-  protected:
-    PlainCProvider() {
-        notes.clear();
-        position = 0;
-        enumerationTable.hasNext = [](const CMPIEnumeration*, CMPIStatus*) -> CMPIBoolean {
-            return position < 3;
-        };
-        enumerationTable.getNext = [](const CMPIEnumeration*, CMPIStatus*) {
-            CMPIData item = {CMPI_ref, CMPI_goodValue, {0}};
-            item.value.ref = &paths[position++];
-            return item;
-        };
-        upCalls.enumerateInstanceNames = [](const CMPIBroker*, const CMPIContext*,
-                                            const CMPIObjectPath*, CMPIStatus*) {
-            notes.push_back("names");
-            return enumeration;
-        };
-        upCalls.enumerateInstances = [](const CMPIBroker*, const CMPIContext*,
-                                        const CMPIObjectPath*, const char** properties,
-                                        CMPIStatus*) {
-            notes.push_back(std::string("instances with ") + properties[0]);
-            return enumeration;
-        };
-        makers.newObjectPath = [](const CMPIBroker*, const char* ns, const char* cn, CMPIStatus*) {
-            notes.push_back(std::string("path ") + ns + ":" + cn);
-            return &paths[0];
-        };
-        makers.newInstance = [](const CMPIBroker*, const CMPIObjectPath*, CMPIStatus*) {
-            notes.push_back("instance");
-            return &madeInstance;
-        };
-        makers.newString = [](const CMPIBroker*, const char* text, CMPIStatus*) {
-            notes.push_back(std::string("string ") + text);
-            return &madeString;
-        };
-        pathTable.addKey = [](CMPIObjectPath*, const char* name, const CMPIValue* value,
-                              CMPIType type) {
-            EXPECT_EQ(type, CMPI_chars);
-            notes.push_back(std::string("key ") + name + "=" +
-                            reinterpret_cast<const char*>(value));
-            return CMPIStatus{CMPI_RC_OK, nullptr};
-        };
-        instanceTable.setProperty = [](const CMPIInstance*, const char* name,
-                                       const CMPIValue* value, CMPIType type) {
-            EXPECT_EQ(type, CMPI_uint32);
-            notes.push_back(std::string("property ") + name + "=" + std::to_string(value->uint32));
-            return CMPIStatus{CMPI_RC_OK, nullptr};
-        };
-        resultTable.returnObjectPath = [](const CMPIResult*, const CMPIObjectPath* path) {
-            notes.push_back("return path " + std::to_string(path - paths));
-            return CMPIStatus{CMPI_RC_OK, nullptr};
-        };
-        resultTable.returnInstance = [](const CMPIResult*, const CMPIInstance*) {
-            notes.push_back("return instance");
-            return CMPIStatus{CMPI_RC_OK, nullptr};
-        };
-        resultTable.returnDone = [](const CMPIResult*) {
-            notes.push_back("done");
-            return CMPIStatus{CMPI_RC_OK, nullptr};
-        };
+/// Serves three objects of any class, and keeps what was asked.
+class ThreeObjects final : public UpcallService {
+  public:
+    UpcallAnswer perform(Broker&, const OperationRequest& request) override {
+        asked = request;
+        UpcallAnswer answer;
+        for (const char* name : {"a", "b", "c"}) {
+            InstanceValue instance;
+            instance.path = {"root/cimv2", "Plain_Class", {{"Name", name}}};
+            answer.paths.push_back(instance.path);
+            answer.instances.push_back(instance);
+        }
+        return answer;
     }
 
-    using Notes = std::vector<std::string>;
-    static inline Notes notes;
-    static inline int position = 0;
-    static inline CMPIObjectPathFT pathTable = {};
-    static inline CMPIInstanceFT instanceTable = {};
-    static inline CMPIEnumerationFT enumerationTable = {};
-    static inline CMPIObjectPath paths[3] = {
-        {&notes, &pathTable}, {&notes, &pathTable}, {&notes, &pathTable}};
-    static inline CMPIInstance madeInstance = {&notes, &instanceTable};
-    static inline CMPIString madeString = {};
-    static inline CMPIEnumeration threeItems = {&notes, &enumerationTable};
-    static inline CMPIEnumeration* enumeration = &threeItems;
-
-    CMPIBrokerFT upCalls = {};
-    CMPIBrokerEncFT makers = {};
-    CMPIResultFT resultTable = {};
-    const CMPIBroker broker = {nullptr, &upCalls, &makers, nullptr, nullptr};
-    const CMPIResult result = {&notes, &resultTable};
-    CMPIInstanceMI* const mi = PlainProvider_Create_InstanceMI(&broker, nullptr, nullptr);
+    OperationRequest asked;
 };
 
-TEST_F(PlainCProvider, HandsOnEveryNameOfAnEnumeration) {
-    enumeration = &threeItems;
-    EXPECT_EQ(mi->ft->enumerateInstanceNames(mi, nullptr, &result, nullptr).rc, CMPI_RC_OK);
-    EXPECT_EQ(notes, (Notes{"names", "return path 0", "return path 1", "return path 2", "done"}));
+/// A provider written in C, under the broker.
+class PlainCProvider : public testing::Test {
+  protected:
+    Outcome ask(Operation operation) {
+        OperationRequest request;
+        request.operation = operation;
+        request.path = {"root/cimv2", "Plain_Class", {}};
+        request.properties = std::vector<std::string>{"Name"};
+        return invoke({mi, nullptr}, broker, request);
+    }
+
+    ThreeObjects service;
+    Broker broker;
+    CMPIInstanceMI* const mi = PlainProvider_Create_InstanceMI(broker.cmpi(), nullptr, nullptr);
+};
+
+TEST_F(PlainCProvider, HandsOnWhatTheObjectManagerEnumerates) {
+    broker.route("Plain_Class", service);
+    const Outcome names = ask(Operation::EnumerateInstanceNames);
+    EXPECT_EQ(names.rc, CMPI_RC_OK);
+    EXPECT_EQ(names.doneCount, 1U);
+    ASSERT_EQ(names.paths.size(), 3U);
+    EXPECT_EQ(toString(names.paths[2]), "root/cimv2:Plain_Class.Name=\"c\"");
+    EXPECT_EQ(ask(Operation::EnumerateInstances).instances.size(), 3U);
+    EXPECT_EQ(service.asked.properties, std::vector<std::string>{"Name"});
 }
 
 TEST_F(PlainCProvider, ReportsAMissingEnumerationWithText) {
-    enumeration = nullptr;
-    const CMPIStatus status = mi->ft->enumerateInstanceNames(mi, nullptr, &result, nullptr);
-    EXPECT_EQ(status.rc, CMPI_RC_ERR_FAILED);
-    EXPECT_EQ(status.msg, &madeString);
-    EXPECT_EQ(notes, (Notes{"names", "string no enumeration"}));
-}
-
-TEST_F(PlainCProvider, PassesThePropertyListToTheObjectManager) {
-    enumeration = &threeItems;
-    const char* properties[] = {"Name", nullptr};
-    mi->ft->enumerateInstances(mi, nullptr, &result, nullptr, properties);
-    EXPECT_EQ(notes, (Notes{"instances with Name", "return instance", "return instance",
-                            "return instance", "done"}));
+    const Outcome outcome = ask(Operation::EnumerateInstanceNames);
+    EXPECT_EQ(outcome.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(outcome.message, "no enumeration");
 }
 
 TEST_F(PlainCProvider, MakesAnInstanceWithKeyAndProperty) {
-    mi->ft->getInstance(mi, nullptr, &result, nullptr, nullptr);
-    EXPECT_EQ(notes, (Notes{"path root/cimv2:Plain_Class", "key Name=first", "instance",
-                            "property NumberOfUsers=3", "return instance", "done"}));
+    const Outcome outcome = ask(Operation::GetInstance);
+    ASSERT_EQ(outcome.instances.size(), 1U);
+    EXPECT_EQ(toString(outcome.instances[0].path), "root/cimv2:Plain_Class.Name=\"first\"");
+    ASSERT_NE(outcome.instances[0].property("NumberOfUsers"), nullptr);
+    EXPECT_EQ(*outcome.instances[0].property("NumberOfUsers"), Value::fromUnsigned(3, CMPI_uint32));
 }
 
 TEST_F(PlainCProvider, AnswersTheOtherOperationsWithTheirCodes) {
-    CMPIInstanceMIFT* const ft = mi->ft;
-    EXPECT_EQ(ft->createInstance(mi, nullptr, &result, nullptr, nullptr).rc, 11u);
-    EXPECT_EQ(ft->modifyInstance(mi, nullptr, &result, nullptr, nullptr, nullptr).rc, 12u);
-    EXPECT_EQ(ft->deleteInstance(mi, nullptr, &result, nullptr).rc, 2u);
-    EXPECT_EQ(ft->execQuery(mi, nullptr, &result, nullptr, nullptr, nullptr).rc, 14u);
-    EXPECT_EQ(ft->cleanup(mi, nullptr, 0).rc, 50u);
-    EXPECT_EQ(ft->cleanup(mi, nullptr, 1).rc, 0u);
-    EXPECT_STREQ(ft->miName, "instancePlainProvider");
+    EXPECT_EQ(ask(Operation::CreateInstance).rc, 11u);
+    EXPECT_EQ(ask(Operation::ModifyInstance).rc, 12u);
+    EXPECT_EQ(ask(Operation::DeleteInstance).rc, 2u);
+    EXPECT_EQ(ask(Operation::ExecQuery).rc, 14u);
+    EXPECT_EQ(mi->ft->cleanup(mi, nullptr, 0).rc, 50u);
+    EXPECT_EQ(mi->ft->cleanup(mi, nullptr, 1).rc, 0u);
+    EXPECT_STREQ(mi->ft->miName, "instancePlainProvider");
 }
 
 }  // namespace
