@@ -1,19 +1,101 @@
-// Writes the figures of a run as Markdown:
+// Writes the figures of a run, as Google Benchmark and callgrind leave them, as Markdown:
 // korva_bench_report INSTRUCTIONS.txt TIMES.json... [--before TIMES.json...]
-
-#include "bench/Figures.h"
 
 #include <algorithm>
 #include <cstdio>
 #include <exception>
+#include <fstream>
 #include <iostream>
+#include <iterator>
+#include <map>
+#include <nlohmann/json.hpp>
+#include <stdexcept>
 #include <string>
 #include <string_view>
 #include <vector>
 
 namespace {
 
-using bench::Figures;
+/// One benchmark: the quickest of its repetitions, and what was counted beside.
+struct Figure {
+    double nanoseconds = 0;
+    std::map<std::string, double> counts{};
+};
+
+/// Benchmarks by name, in the order of the list.
+class Figures {
+  public:
+    /// Reads files of Google Benchmark's JSON, as repetitions of one run; throws
+    /// std::runtime_error.
+    explicit Figures(const std::vector<std::string>& files) {
+        for (const std::string& file : files) add(file);
+    }
+
+    const std::vector<std::string>& names() const noexcept { return names_; }
+    bool has(const std::string& name) const { return figures_.count(name) != 0; }
+    /// The benchmark of that name, which must be there.
+    const Figure& at(const std::string& name) const { return figures_.at(name); }
+    const std::string& machine() const noexcept { return machine_; }
+
+  private:
+    void add(const std::string& file);
+
+    std::vector<std::string> names_;
+    std::map<std::string, Figure> figures_;
+    std::string machine_;
+};
+
+std::ifstream opened(const std::string& file) {
+    std::ifstream stream(file);
+    if (!stream) throw std::runtime_error("cannot read " + file);
+    return stream;
+}
+
+// Deviations of counts that are always 0 are written as NaN, which is no JSON.
+std::string withoutNaN(std::istream& stream) {
+    std::string text(std::istreambuf_iterator<char>(stream), {});
+    const std::string nan = ": NaN";
+    for (std::size_t place = text.find(nan); place != std::string::npos; place = text.find(nan))
+        text.replace(place, nan.size(), ": null");
+    return text;
+}
+
+std::string describe(const nlohmann::json& context) {
+    return std::to_string(context.at("num_cpus").get<int>()) + " processors of " +
+           std::to_string(context.at("mhz_per_cpu").get<int>()) + " MHz";
+}
+
+void Figures::add(const std::string& file) {
+    std::ifstream stream = opened(file);
+    const nlohmann::json all = nlohmann::json::parse(withoutNaN(stream));
+    machine_ = describe(all.at("context"));
+    // Repetitions that alternate leave the benchmarks in no order; the index is that of the list.
+    std::multimap<int, std::string> places;
+    for (const nlohmann::json& each : all.at("benchmarks")) {
+        if (each.at("run_type") != "iteration") continue;
+        const auto name = each.at("run_name").get<std::string>();
+        const auto time = each.at("cpu_time").get<double>();
+        const auto [place, isNew] = figures_.try_emplace(name, Figure{time});
+        if (isNew) places.emplace(each.at("family_index").get<int>(), name);
+        Figure& figure = place->second;
+        figure.nanoseconds = std::min(figure.nanoseconds, time);
+        for (const char* count : {"allocations", "opened", "peakBytes", "systemCalls"})
+            if (each.contains(count)) figure.counts[count] = each.at(count).get<double>();
+    }
+    for (const auto& [place, name] : places) names_.push_back(name);
+}
+
+/// Instructions a request by name ("EnumerateInstances KORVA_RunningOS/baseline"): lines of the
+/// name, a tab and the number. Throws std::runtime_error.
+std::map<std::string, double> readInstructions(const std::string& file) {
+    std::ifstream stream = opened(file);
+    std::map<std::string, double> instructions;
+    std::string name;
+    double number = 0;
+    while (std::getline(stream, name, '\t') && stream >> number >> std::ws)
+        instructions[name] = number;
+    return instructions;
+}
 
 bool beginsWith(std::string_view text, std::string_view beginning) {
     return text.substr(0, beginning.size()) == beginning;
@@ -70,8 +152,8 @@ std::vector<std::string> requestsOf(const Figures& figures, const std::string& g
     return requests;
 }
 
-const bench::Figure& figureOf(const Figures& figures, const std::string& group,
-                              const std::string& request, unsigned nodes, const char* who) {
+const Figure& figureOf(const Figures& figures, const std::string& group, const std::string& request,
+                       unsigned nodes, const char* who) {
     return figures.at(group + request + "/" + std::to_string(nodes) + "/" + who);
 }
 
@@ -93,16 +175,16 @@ void printHostRequests(const Figures& figures, const Figures& before, Verdict& v
                  "request that is not the first.\n\n"
                  "| request | time (µs) | before | ratio | limit | system calls | before | limit "
                  "|\n|---|--:|--:|--:|--:|--:|--:|--:|\n";
-    const auto calls = [](const bench::Figure& figure) {
+    const auto calls = [](const Figure& figure) {
         const auto found = figure.counts.find("systemCalls");
         return found == figure.counts.end() ? -1 : found->second;
     };
-    const auto cell = [&](const bench::Figure& figure) {
+    const auto cell = [&](const Figure& figure) {
         return calls(figure) < 0 ? "" : fixed(calls(figure), 0);
     };
     for (const HostLimit& row : hostLimits) {
         const std::string name = std::string("host/") + row.request + ", provider";
-        const bench::Figure& now = figures.at(name);
+        const Figure& now = figures.at(name);
         std::cout << "| " << row.request << " | " << microseconds(now.nanoseconds) << " | ";
         const bool compared = before.has(name);
         if (compared) {
@@ -125,8 +207,8 @@ void printRequests(const Figures& figures, const std::map<std::string, double>& 
            "| request | time | baseline | ratio | limit | instructions | baseline | ratio | "
            "allocations | baseline | opened |\n|---|--:|--:|--:|--:|--:|--:|--:|--:|--:|--:|\n";
     for (const std::string& request : requestsOf(figures, "request/")) {
-        const bench::Figure& ours = figureOf(figures, "request/", request, 1, "provider");
-        const bench::Figure& baseline = figureOf(figures, "request/", request, 1, "baseline");
+        const Figure& ours = figureOf(figures, "request/", request, 1, "provider");
+        const Figure& baseline = figureOf(figures, "request/", request, 1, "baseline");
         const double ratio = ours.nanoseconds / baseline.nanoseconds;
         const double ourWork = instructions.at(request + "/provider");
         const double baselineWork = instructions.at(request + "/baseline");
@@ -213,7 +295,7 @@ int main(int argc, char** argv) try {
     }
     const Figures figures({arguments.begin() + 1, before});
     const Figures figuresBefore({before == arguments.end() ? before : before + 1, arguments.end()});
-    const std::map<std::string, double> instructions = bench::readInstructions(arguments[0]);
+    const std::map<std::string, double> instructions = readInstructions(arguments[0]);
     std::cout << "# Benchmark figures\n\nWritten by `bench/run`; [benchmarks.md](benchmarks.md) "
                  "says what is measured and how. Processor time, the quickest of several "
                  "repetitions, on "
