@@ -2,18 +2,18 @@
 #ifndef BENCH_BENCHMARKS_H
 #define BENCH_BENCHMARKS_H
 
+#include "bench/BenchFixture.h"
 #include "bench/Logging.h"
-#include "bench/Setting.h"
 
 namespace bench {
 
 /// "request/…": every request of the list, by provider and baseline. "nodes/…": some of them with a
-/// growing number of nodes. `setting` outlives the benchmarks.
-void addRequestBenchmarks(Setting& setting);
+/// growing number of nodes. `fixture` outlives the benchmarks.
+void addRequestBenchmarks(BenchFixture& fixture);
 
 /// "host/…": the parts of the Linux host's snapshot, each from a new one, and whole requests on the
 /// real host.
-void addHostBenchmarks(Setting& setting);
+void addHostBenchmarks(BenchFixture& fixture);
 
 /// "logging/…": one record, filtered and written. They change the configuration.
 void addLoggingBenchmarks(LoggingConfiguration& logging);

@@ -23,6 +23,7 @@ void read(VA::NodeCursor& cursor) {
     (cursor.readProperty(ids, value), ...);
 }
 
+// One for each source, with the properties that it serves: the names are those of the figures.
 constexpr Part parts[] = {
     {"no value", [](VA::NodeCursor&) {}},
     {"computer name",
@@ -66,24 +67,24 @@ void measurePart(benchmark::State& state, const Part& part) {
     countOpened(state, [&] { readPart(*host, part); });
 }
 
-void measureRequest(benchmark::State& state, Setting& setting, Answerer answerer,
+void measureRequest(benchmark::State& state, BenchFixture& fixture, Answerer answerer,
                     const cmpihost::OperationRequest& request) {
-    setting.useRealHost();
+    fixture.useRealHost();
     for (auto iteration : state) {
         static_cast<void>(iteration);
-        benchmark::DoNotOptimize(setting.run(answerer, request));
+        benchmark::DoNotOptimize(fixture.run(answerer, request));
     }
-    const auto once = [&] { setting.run(answerer, request); };
+    const auto once = [&] { fixture.run(answerer, request); };
     countOpened(state, once);
     // Nothing where one process may not trace another.
     if (const auto calls = systemCallsOf(once))
         state.counters["systemCalls"] = static_cast<double>(calls->size());
-    setting.useSimulatedHost();
+    fixture.useSimulatedHost();
 }
 
 }  // namespace
 
-void addHostBenchmarks(Setting& setting) {
+void addHostBenchmarks(BenchFixture& fixture) {
     for (const Part& part : parts)
         benchmark::RegisterBenchmark(
             (std::string("host/snapshot: ") + part.name).c_str(),
@@ -93,8 +94,8 @@ void addHostBenchmarks(Setting& setting) {
         for (const Answerer answerer : {Answerer::Provider, Answerer::Baseline})
             benchmark::RegisterBenchmark(
                 (std::string("host/") + name + ", " + nameOf(answerer)).c_str(),
-                [&setting, answerer, name](benchmark::State& state) {
-                    measureRequest(state, setting, answerer, requestNamed(name));
+                [&fixture, answerer, name](benchmark::State& state) {
+                    measureRequest(state, fixture, answerer, requestNamed(name));
                 });
 }
 

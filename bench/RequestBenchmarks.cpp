@@ -24,47 +24,47 @@ constexpr const char* throughFacade[] = {
 };
 
 // One more request, for what is counted and not timed.
-void count(benchmark::State& state, Setting& setting, Answerer answerer,
+void count(benchmark::State& state, BenchFixture& fixture, Answerer answerer,
            const cmpihost::OperationRequest& request) {
     const Watch watch;
-    setting.run(answerer, request);
+    fixture.run(answerer, request);
     const Counts counts = watch.counts();
     state.counters["allocations"] = static_cast<double>(counts.allocations);
     state.counters["opened"] = static_cast<double>(counts.opened);
     state.counters["peakBytes"] = static_cast<double>(counts.peakBytes);
 }
 
-void measure(benchmark::State& state, Setting& setting, Answerer answerer,
+void measure(benchmark::State& state, BenchFixture& fixture, Answerer answerer,
              const cmpihost::OperationRequest& request, unsigned nodes) {
-    setting.setNodes(nodes);
+    fixture.setNodes(nodes);
     for (auto iteration : state) {
         static_cast<void>(iteration);
-        benchmark::DoNotOptimize(setting.run(answerer, request));
+        benchmark::DoNotOptimize(fixture.run(answerer, request));
     }
-    count(state, setting, answerer, request);
+    count(state, fixture, answerer, request);
 }
 
-void add(Setting& setting, const std::string& group, const std::string& name,
+void add(BenchFixture& fixture, const std::string& group, const std::string& name,
          const cmpihost::OperationRequest& request, unsigned nodes,
          Answerer against = Answerer::Baseline) {
     for (const Answerer answerer : {Answerer::Provider, against}) {
         benchmark::RegisterBenchmark(
             (group + "/" + name + "/" + std::to_string(nodes) + "/" + nameOf(answerer)).c_str(),
-            [&setting, answerer, &request, nodes](benchmark::State& state) {
-                measure(state, setting, answerer, request, nodes);
+            [&fixture, answerer, &request, nodes](benchmark::State& state) {
+                measure(state, fixture, answerer, request, nodes);
             });
     }
 }
 
 }  // namespace
 
-void addRequestBenchmarks(Setting& setting) {
-    for (const NamedRequest& each : requests()) add(setting, "request", each.name, each.request, 1);
+void addRequestBenchmarks(BenchFixture& fixture) {
+    for (const NamedRequest& each : requests()) add(fixture, "request", each.name, each.request, 1);
     for (const char* name : growing)
         for (const unsigned nodes : nodeCounts)
-            add(setting, "nodes", name, requestNamed(name), nodes);
+            add(fixture, "nodes", name, requestNamed(name), nodes);
     for (const char* name : throughFacade)
-        add(setting, "facade", name, requestNamed(name), 1, Answerer::Facade);
+        add(fixture, "facade", name, requestNamed(name), 1, Answerer::Facade);
 }
 
 }  // namespace bench

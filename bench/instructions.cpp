@@ -3,8 +3,8 @@
 
 #include <valgrind/callgrind.h>
 
+#include "bench/BenchFixture.h"
 #include "bench/Logging.h"
-#include "bench/Setting.h"
 
 #include <exception>
 #include <iostream>
@@ -14,10 +14,10 @@ namespace {
 
 constexpr int rounds = 100;
 
-void measure(bench::Setting& setting, bench::Answerer answerer, const NamedRequest& request) {
-    setting.run(answerer, request.request);
+void measure(bench::BenchFixture& fixture, bench::Answerer answerer, const NamedRequest& request) {
+    fixture.run(answerer, request.request);
     CALLGRIND_ZERO_STATS;
-    for (int round = 0; round < rounds; ++round) setting.run(answerer, request.request);
+    for (int round = 0; round < rounds; ++round) fixture.run(answerer, request.request);
     const std::string name = request.name + "/" + nameOf(answerer);
     CALLGRIND_DUMP_STATS_AT(name.c_str());
 }
@@ -33,12 +33,12 @@ int main(int argc, char** argv) try {
         return 0;
     }
     const bench::LoggingConfiguration logging;
-    bench::Setting setting;
-    setting.compareAnswers();
+    bench::BenchFixture fixture;
+    fixture.compareAnswers();
     for (const NamedRequest& request : bench::requests()) {
         if (request.name.find(part) == std::string::npos) continue;
-        measure(setting, bench::Answerer::Provider, request);
-        measure(setting, bench::Answerer::Baseline, request);
+        measure(fixture, bench::Answerer::Provider, request);
+        measure(fixture, bench::Answerer::Baseline, request);
     }
     return 0;
 } catch (const std::exception& caught) {

@@ -11,10 +11,10 @@ int main(int argc, char** argv) try {
     benchmark::Initialize(&argc, argv);
     if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 2;
     bench::LoggingConfiguration logging;
-    bench::Setting setting;
-    setting.compareAnswers();
-    bench::addRequestBenchmarks(setting);
-    bench::addHostBenchmarks(setting);
+    bench::BenchFixture fixture;
+    fixture.compareAnswers();
+    bench::addRequestBenchmarks(fixture);
+    bench::addHostBenchmarks(fixture);
     bench::addLoggingBenchmarks(logging);
     benchmark::RunSpecifiedBenchmarks();
     return 0;

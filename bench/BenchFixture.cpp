@@ -1,5 +1,5 @@
 // One broker and one host under all that is compared, so that only the answering library differs.
-#include "bench/Setting.h"
+#include "bench/BenchFixture.h"
 
 #include "framework/instrumentation/HostSource.h"
 
@@ -58,7 +58,7 @@ const char* nameOf(Answerer answerer) noexcept {
     return "baseline";
 }
 
-Setting::Setting()
+BenchFixture::BenchFixture()
     : host_(VA::SimulatedHost::withOneNode()),
       broker_(&schemaCatalogue()),
       computers_("simulated.example"),
@@ -71,11 +71,11 @@ Setting::Setting()
     useSimulatedHost();
 }
 
-Setting::~Setting() {
+BenchFixture::~BenchFixture() {
     VA::setHostSource(nullptr);
 }
 
-const ProviderLibrary& Setting::library(Answerer answerer) const {
+const ProviderLibrary& BenchFixture::library(Answerer answerer) const {
     switch (answerer) {
         case Answerer::Provider:
             return provider_;
@@ -87,27 +87,27 @@ const ProviderLibrary& Setting::library(Answerer answerer) const {
     return baseline_;
 }
 
-Outcome Setting::run(Answerer answerer, const OperationRequest& request) {
+Outcome BenchFixture::run(Answerer answerer, const OperationRequest& request) {
     Outcome outcome = invoke(library(answerer), broker_, request);
     if (!outcome.violations.empty()) throw std::runtime_error(outcome.violations.front());
     return outcome;
 }
 
-void Setting::setNodes(unsigned count) {
+void BenchFixture::setNodes(unsigned count) {
     host_->clearNodes();
     host_->addNodes(VA::SimulatedHost::plausibleNode(), count);
     reinterpret_cast<void (*)(unsigned)>(baseline_.symbol("setBaselineNodes"))(count);
 }
 
-void Setting::useRealHost() {
+void BenchFixture::useRealHost() {
     VA::setHostSource(nullptr);
 }
 
-void Setting::useSimulatedHost() {
+void BenchFixture::useSimulatedHost() {
     VA::setHostSource(host_);
 }
 
-void Setting::compareAnswers() {
+void BenchFixture::compareAnswers() {
     for (const NamedRequest& each : requests()) {
         const Outcome ours = run(Answerer::Provider, each.request);
         const Outcome baselines = run(Answerer::Baseline, each.request);

@@ -1,7 +1,7 @@
 // Where requests are measured: one broker, the provider on a simulated host, the facade in front of
 // it, and the baseline.
-#ifndef BENCH_SETTING_H
-#define BENCH_SETTING_H
+#ifndef BENCH_BENCH_FIXTURE_H
+#define BENCH_BENCH_FIXTURE_H
 
 #include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
@@ -15,7 +15,7 @@ namespace bench {
 /// The requests that are measured: for each of the five classes EnumerateInstances,
 /// EnumerateInstanceNames and GetInstance; for each hop of an association Associators and
 /// AssociatorNames; for each class the six operations that are refused. They are named by operation
-/// and class, or operation, source and association; paths are those of Setting's one node.
+/// and class, or operation, source and association; paths are those of BenchFixture's one node.
 const std::vector<NamedRequest>& requests();
 
 /// The request of that name, which must be one of them.
@@ -29,12 +29,12 @@ const char* nameOf(Answerer answerer) noexcept;
 
 /// The built libraries under the strict broker with the schema. The provider sees a simulated host
 /// with one node, and both its logging channels let nothing pass. One thread uses it.
-class Setting {
+class BenchFixture {
   public:
-    Setting();
-    ~Setting();
-    Setting(const Setting&) = delete;
-    Setting& operator=(const Setting&) = delete;
+    BenchFixture();
+    ~BenchFixture();
+    BenchFixture(const BenchFixture&) = delete;
+    BenchFixture& operator=(const BenchFixture&) = delete;
 
     /// Runs one request. Throws std::runtime_error when the broker has to complain.
     cmpihost::Outcome run(Answerer answerer, const cmpihost::OperationRequest& request);
