@@ -11,7 +11,7 @@ class FileDescriptor {
   public:
     /// Nothing open.
     FileDescriptor() = default;
-    /// Takes a descriptor over; -1, as system calls give it where they fail, is nothing open.
+    /// Takes a descriptor over; -1, which system calls return when they fail, is no descriptor.
     explicit FileDescriptor(int number) noexcept : number_(number) {}
     ~FileDescriptor() { reset(); }
     FileDescriptor(FileDescriptor&& other) noexcept : number_(other.release()) {}
@@ -22,7 +22,7 @@ class FileDescriptor {
 
     /// Opens a file with the flags and mode of open(2); no child process inherits it, it does not
     /// become the controlling terminal, and nobody is waited for (a FIFO without a reader, a
-    /// device). Where it is not open afterwards, errno tells why.
+    /// device). Where it is not open afterwards, errno says why.
     static FileDescriptor open(const char* path, int flags, mode_t mode = 0) noexcept;
 
     bool isOpen() const noexcept { return number_ >= 0; }

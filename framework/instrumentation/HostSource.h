@@ -10,8 +10,9 @@
 namespace VA {
 
 /// A walk over the nodes of one type: one stands behind each VA::Instrumentation, and its
-/// operations are those of that class, call for call. One thread uses it at a time; it must not
-/// outlive its source. Where the walk stands on no node, reads give false and the status is 0.
+/// operations are those of that class, one for one: valid() and next() are its `operator bool` and
+/// `operator++`, the others bear its names or shorter ones. One thread uses it at a time; it must
+/// not outlive its source. Where the walk stands on no node, reads give false and the status is 0.
 class __attribute__((visibility("default"))) NodeCursor {
   public:
     NodeCursor();
@@ -36,7 +37,7 @@ class __attribute__((visibility("default"))) NodeCursor {
 
     /// Tells in `value` whether the property is read-only on the current node; false, with `value`
     /// untouched, when that is not known.
-    virtual bool readOnlyProperty(NodeLexicon::Properties id, bool& value) = 0;
+    virtual bool isPropertyReadOnly(NodeLexicon::Properties id, bool& value) = 0;
 
     /// The status code of the current node, in the codes of Instrumentation::getNodeStatus.
     virtual unsigned int nodeStatus() = 0;
@@ -63,9 +64,9 @@ class __attribute__((visibility("default"))) HostSource {
 /// Any thread may call.
 __attribute__((visibility("default"))) void setHostSource(std::shared_ptr<HostSource> source);
 
-/// The Linux host that this code runs on, never null. `root` is the directory under which all files
-/// are looked for; what the kernel tells without a file (its names, its clocks, the limits of the
-/// process) is that of the running kernel.
+/// The Linux host that this code runs on (LinuxHost.cpp), never null. `root` is the directory under
+/// which all files are looked for; what the kernel gives without a file (its names, its clocks, the
+/// limits of the process) is that of the running kernel.
 __attribute__((visibility("default"))) std::shared_ptr<HostSource> makeLinuxHost(
     std::string root = "/");
 

@@ -1,6 +1,5 @@
-// The contract's class, and which host it reads: the one that was set last. A host source outlives
-// those who read it, and its successor: whoever constructed an Instrumentation goes on with the
-// host that was there.
+// The contract's class, and which host it reads: the one that was set last. A reader keeps its
+// source alive, even after another was set.
 #include "Instrumentation.h"
 
 #include <mutex>
@@ -84,7 +83,7 @@ bool Instrumentation::getProperty(NodeLexicon::Properties id, bool& value) {
 }
 
 bool Instrumentation::isPropertyReadOnly(NodeLexicon::Properties id, bool& value) {
-    return state_->cursor->readOnlyProperty(id, value);
+    return state_->cursor->isPropertyReadOnly(id, value);
 }
 
 unsigned int Instrumentation::getNodeStatus() {

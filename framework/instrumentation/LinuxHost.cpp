@@ -69,12 +69,13 @@ Number sum(Number first, Number second) {
 }
 
 // The values of one host at one time. Each source behind them is read once, when the first value
-// that needs it is asked for. What is not known is nothing. Must not outlive what it reads through.
+// that needs it is asked for. Returns nullopt for what is not known. Must not outlive what it reads
+// through.
 class Snapshot {
   public:
     Snapshot(const HostParts& parts, HostCache& cache) : parts_(parts), cache_(cache) {}
 
-    // What uname tells, where it is plain text.
+    // What uname gives; nullopt unless it is plain text.
     Text kernelName(std::string KernelNames::*part) {
         const auto& names = kernelNames_.value([this] { return parts_.kernel->names(); });
         if (!names || !isPlainText(*names.*part)) return std::nullopt;
@@ -214,7 +215,7 @@ class LinuxCursor final : public NodeCursor {
     bool readProperty(Properties id, bool& value) override { return read(flags, id, value); }
 
     // The name alone is asked about; nothing here can rename an operating system.
-    bool readOnlyProperty(Properties id, bool& value) override {
+    bool isPropertyReadOnly(Properties id, bool& value) override {
         if (!onNode_ || id != NodeLexicon::Name) return false;
         value = true;
         return true;

@@ -22,8 +22,8 @@ struct HostParts {
 }  // namespace Linux
 
 /// A Linux host: one operating system node. A walk takes one snapshot of it, reads each source at
-/// most once, and only when a value that it has to tell is asked for. Starts no process, asks no
-/// network, throws nothing but std::bad_alloc.
+/// most once, and only when a value from it is asked for. Starts no process, asks no network,
+/// throws nothing but std::bad_alloc.
 class LinuxHost final : public HostSource {
   public:
     explicit LinuxHost(Linux::HostParts parts);

@@ -172,7 +172,7 @@ void checkCursor(NodeCursor& cursor) {
         checkProperty<unsigned int>(cursor, id);
         checkProperty<bool>(cursor, id);
         bool readOnly = false;
-        cursor.readOnlyProperty(id, readOnly);
+        cursor.isPropertyReadOnly(id, readOnly);
     }
     fuzz::expect(cursor.nodeStatus() <= 26, "a status has a meaning");
     std::string name;

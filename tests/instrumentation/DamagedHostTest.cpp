@@ -229,25 +229,25 @@ TEST(DamagedFiles, LeaveTheOtherLimitInForce) {
 }
 
 TEST(DamagedFiles, AreNoSessions) {
-    using Users = std::optional<unsigned int>;
+    using Count = std::optional<unsigned int>;
     for (const Damage& damage : damages) {
         const std::string damaged = damage.description;
         SCOPED_TRACE(damaged);
         SilentHost one;
         damage.apply(one.tree(), "run/systemd/sessions/1");
         const bool unreadable = damaged == "PastTheCap" || damaged == "ReadError";
-        EXPECT_EQ(one.number(NumberOfUsers), unreadable ? std::nullopt : Users(1));
+        EXPECT_EQ(one.number(NumberOfUsers), unreadable ? std::nullopt : Count(1));
 
         SilentHost all;
         damage.apply(all.tree(), "run/systemd/sessions");
-        EXPECT_EQ(all.number(NumberOfUsers), damaged == "Folder" ? Users(0) : std::nullopt);
+        EXPECT_EQ(all.number(NumberOfUsers), damaged == "Folder" ? Count(0) : std::nullopt);
 
         SilentHost utmp;
         utmp.tree().remove("run/systemd");
         utmp.tree().write("run/utmp", "");
         damage.apply(utmp.tree(), "run/utmp");
         // None of the damages is a record of a user; only an empty file is one of whole records.
-        EXPECT_EQ(utmp.number(NumberOfUsers), damaged == "Empty" ? Users(0) : std::nullopt);
+        EXPECT_EQ(utmp.number(NumberOfUsers), damaged == "Empty" ? Count(0) : std::nullopt);
     }
 }
 

@@ -207,7 +207,7 @@ TEST_F(InstrumentationTest, SourcesOutsideTheLibraryMayDeriveFromTheSeam) {
             return true;
         }
         bool readProperty(Properties, bool&) override { return false; }
-        bool readOnlyProperty(Properties, bool&) override { return false; }
+        bool isPropertyReadOnly(Properties, bool&) override { return false; }
         unsigned int nodeStatus() override { return 26; }
         bool readComputerName(std::string&) override { return false; }
     };

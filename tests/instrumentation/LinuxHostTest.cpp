@@ -104,7 +104,7 @@ TEST_F(SnapshotTest, SelectingReadsNothingAndAskingForNamesOsReleaseOnly) {
     EXPECT_TRUE(cursor->readComputerName(name));
     EXPECT_EQ(text(Name), "Test Linux");
     bool readOnly = false;
-    EXPECT_TRUE(cursor->readOnlyProperty(Name, readOnly));
+    EXPECT_TRUE(cursor->isPropertyReadOnly(Name, readOnly));
     EXPECT_EQ(host.files->counts(), onceEach(readings.at("etc/os-release")));
     EXPECT_EQ(host.manager->calls, 0);
 }
@@ -156,7 +156,7 @@ TEST_F(SnapshotTest, NothingIsReadOnceTheWalkIsOver) {
     EXPECT_EQ(number(OSType), 4711u);
     bool flag = true;
     EXPECT_FALSE(cursor->readProperty(Distributed, flag));
-    EXPECT_FALSE(cursor->readOnlyProperty(Name, flag));
+    EXPECT_FALSE(cursor->isPropertyReadOnly(Name, flag));
     EXPECT_EQ(cursor->nodeStatus(), 0u);
     EXPECT_THAT(host.files->counts(), IsEmpty());
     cursor->next();
@@ -174,7 +174,7 @@ TEST_F(SnapshotTest, PropertyHasOneTypeOnlyAndOnlyTheNameIsKnownToBeReadOnly) {
         // No file of the fixture dates an installation.
         EXPECT_EQ(types, sources.count(id) != 0 && id != InstallDate ? 1 : 0) << id;
         bool readOnly = false;
-        EXPECT_EQ(cursor->readOnlyProperty(Properties(id), readOnly), id == 108) << id;
+        EXPECT_EQ(cursor->isPropertyReadOnly(Properties(id), readOnly), id == 108) << id;
         EXPECT_EQ(readOnly, id == 108) << id;
     }
 }

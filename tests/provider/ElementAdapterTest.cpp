@@ -135,7 +135,7 @@ class TaciturnCursor final : public VA::NodeCursor {
         return true;
     }
     bool readProperty(Properties, bool&) override { return true; }
-    bool readOnlyProperty(Properties, bool&) override { return true; }
+    bool isPropertyReadOnly(Properties, bool&) override { return true; }
     unsigned int nodeStatus() override { return 1; }
     bool readComputerName(std::string&) override { return true; }
 

@@ -61,7 +61,7 @@ class SimulatedHost::State {
     using Count = std::atomic<std::uint64_t>;
     static constexpr std::size_t operations = static_cast<std::size_t>(Operation::ComputerName) + 1;
     // Ids past those of the lexicon share the last place.
-    static constexpr std::size_t ids = NodeLexicon::FreeSpaceInPagingFiles + 2;
+    static constexpr std::size_t ids = largestPropertyId() + 2;
 
     Count& countOf(Operation operation) {
         return perOperation_[static_cast<std::size_t>(operation)];
@@ -125,7 +125,7 @@ class SimulatedHost::Cursor final : public NodeCursor {
         return read(Operation::ReadFlag, id, value);
     }
 
-    bool readOnlyProperty(Properties id, bool& value) override {
+    bool isPropertyReadOnly(Properties id, bool& value) override {
         state_->enter(Operation::ReadOnlyQuery, id);
         if (!node()) return false;
         const auto found = node()->readOnly.find(id);

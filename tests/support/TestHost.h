@@ -132,7 +132,7 @@ inline void readEverything(VA::NodeCursor& cursor) {
         cursor.readProperty(VA::NodeLexicon::Properties(id), text);
         cursor.readProperty(VA::NodeLexicon::Properties(id), number);
         cursor.readProperty(VA::NodeLexicon::Properties(id), flag);
-        cursor.readOnlyProperty(VA::NodeLexicon::Properties(id), flag);
+        cursor.isPropertyReadOnly(VA::NodeLexicon::Properties(id), flag);
     }
     cursor.readComputerName(text);
     cursor.nodeStatus();

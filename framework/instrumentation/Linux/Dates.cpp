@@ -56,13 +56,13 @@ std::optional<std::int64_t> BootTime::read(const HostFiles& files, const Kernel&
         return known->seconds;
     }
     const auto file = files.read(path);
-    const auto told = file ? parseBootTime(file->text) : std::nullopt;
-    if (!told) return clocks.seconds;
+    const auto recorded = file ? parseBootTime(file->text) : std::nullopt;
+    if (!recorded) return clocks.seconds;
     // The size of a file of the kernel's own is 0; those of others may change as they like.
-    if (clocks.exact && clocks.seconds == told && file->state.size == 0) {
-        slot_.put(std::make_shared<const Known>(Known{file->state, *told}));
+    if (clocks.exact && clocks.seconds == recorded && file->state.size == 0) {
+        slot_.put(std::make_shared<const Known>(Known{file->state, *recorded}));
     }
-    return told;
+    return recorded;
 }
 
 bool isPlausibleInstallDate(std::int64_t instant, std::optional<std::int64_t> boot,

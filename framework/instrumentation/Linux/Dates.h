@@ -9,10 +9,10 @@
 #include "Files.h"
 #include "Kernel.h"
 
-/// When a host was booted and installed, and how the element model is told.
+/// When a host was booted and installed, and the text that the element model takes of such a time.
 namespace VA::Linux {
 
-/// `seconds` since the epoch as "YYYY-MM-DD-HH:MM:SS" in the Gregorian calendar; nothing for an
+/// `seconds` since the epoch as "YYYY-MM-DD-HH:MM:SS" in the Gregorian calendar; nullopt for an
 /// instant outside the years 0 to 9999.
 std::optional<std::string> civilDateText(std::int64_t seconds);
 
@@ -21,15 +21,14 @@ std::optional<std::string> civilDateText(std::int64_t seconds);
 std::optional<std::string> zonedDateText(std::int64_t utcSeconds, long secondsWest);
 
 /// The `btime` line of proc/stat: when the host was booted, in seconds since the epoch, UTC.
-/// Nothing where there is no such line, or where it is not whole.
+/// Returns nullopt if there is no such line, or if it is not whole.
 std::optional<std::int64_t> parseBootTime(std::string_view procStat);
 
-/// When the host was booted: what proc/stat tells, else what the clocks do. Any number of threads
-/// may ask.
+/// When the host was booted: by proc/stat, else by the clocks. Any number of threads may ask.
 ///
 /// To make proc/stat, the kernel adds up the interrupts of all processors. It is not read again as
-/// long as it is the same file of the kernel's and the clocks tell, beyond doubt, the second that
-/// it told: they do until the time of day is set.
+/// long as it is the same file of the kernel's and the clocks give, beyond doubt, the same second
+/// as it did: they do until the time of day is set.
 class BootTime {
   public:
     std::optional<std::int64_t> read(const HostFiles& files, const Kernel& kernel);

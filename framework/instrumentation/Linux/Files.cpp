@@ -33,7 +33,7 @@ FileTime timeOf(const struct statx_timestamp& time) {
 }
 
 // Of the file at `path` or, where that is empty and AT_EMPTY_PATH is among the flags, of the open
-// file `file`. A file system on the network is asked anew: what it told before may be outdated.
+// file `file`. A file system on the network is asked anew: what it gave before may be outdated.
 std::optional<FileState> stateAt(int file, const char* path, int flags) {
     struct statx info;
     constexpr unsigned int needed = STATX_TYPE | STATX_INO | STATX_SIZE | STATX_MTIME | STATX_CTIME;
@@ -51,7 +51,7 @@ std::optional<FileState> stateAt(int file, const char* path, int flags) {
     return state;
 }
 
-// Reads to the end, or past `HostFiles::maxBytes`. The end is told by a read that gives less than
+// Reads to the end, or past `HostFiles::maxBytes`. The end shows as a read that gives less than
 // it could, without another that gives nothing, unless the file is larger than that: files of proc,
 // whose size is 0, come in one piece.
 std::optional<std::string> readAll(const base::FileDescriptor& file, std::uint64_t size) {
@@ -134,7 +134,7 @@ std::optional<FileContent> TrackedFiles::read(const std::string& path) {
     if (!state || state->kind != FileState::Kind::Regular) return std::nullopt;
     auto content = files_->read(path);
     failed_ = failed_ || (content ? !content->whole : errno != ENOENT);
-    // A size that is not that of the content, as in proc, goes with times that tell nothing.
+    // A size that is not that of the content, as in proc, goes with times that mean nothing.
     readWhole_ = readWhole_ && content && content->whole && content->text.size() == state->size &&
                  content->state == *state;
     return content;

@@ -23,7 +23,7 @@ struct FileTime {
     std::uint32_t nanoseconds = 0;
 };
 
-/// What tells a file, and a change of it: two looks that give equal states found the same file with
+/// What identifies a file and its state: two looks that give equal states found the same file with
 /// the same content, unless it was changed twice within the grain of its clock.
 struct FileState {
     enum class Kind { Regular, Directory, Other };
@@ -34,7 +34,7 @@ struct FileState {
     std::uint64_t size = 0;
     FileTime modified;  ///< the content
     FileTime changed;   ///< the content, or anything else that is kept about the file
-    std::optional<std::int64_t> birth;  ///< seconds; nothing where the file system does not know
+    std::optional<std::int64_t> birth;  ///< seconds; nullopt if the file system does not know
 };
 
 /// The birth does not count: it says nothing about a change.
@@ -48,8 +48,8 @@ struct FileContent {
 };
 
 /// Read access to the files below a root directory. Paths are relative to it; symbolic links are
-/// followed wherever they lead. What cannot be had is nothing; only std::bad_alloc is thrown. Any
-/// number of threads may read. Tests derive from it to count, or to replace answers.
+/// followed wherever they lead. Returns nullopt for what cannot be had; only std::bad_alloc is
+/// thrown. Any number of threads may read. Tests derive from it to count, or to replace answers.
 class HostFiles {
   public:
     using NameVisitor = std::function<void(std::string_view name)>;
@@ -61,20 +61,20 @@ class HostFiles {
     virtual ~HostFiles() = default;
 
     /// A look at a file or directory, without opening it; the empty path is the root. Where it
-    /// gives nothing, errno tells why.
+    /// gives nullopt, errno says why.
     virtual std::optional<FileState> state(const std::string& path) const;
 
-    /// The content of a regular file, which the files of proc are too; nothing where there is none,
-    /// or where it cannot be opened: errno tells which. Anything else at the path is opened and
+    /// The content of a regular file, which the files of proc are too; nullopt if there is none,
+    /// or if it cannot be opened: errno says which. Anything else at the path is opened and
     /// left, without waiting and without reading: where that could matter, look at its state first.
     virtual std::optional<FileContent> read(const std::string& path) const;
 
     /// The content where it is whole, else nothing.
     std::optional<std::string> text(const std::string& path) const;
 
-    /// Visits the names in a directory, without "." and "..", in no order; tells the state of the
-    /// directory before the first one. Nothing where not all of them could be read, so that those
-    /// that were visited are not to be used.
+    /// Visits the names in a directory, without "." and "..", in no order; passes the state of the
+    /// directory before the first one. Returns nullopt if not all of them could be read, so that
+    /// those that were visited are not to be used.
     virtual std::optional<FileState> forEachName(const std::string& path,
                                                  const NameVisitor& visit) const;
 
@@ -85,7 +85,7 @@ class HostFiles {
     std::string root_;  // with one slash at its end
 };
 
-/// The files that a value is made of: reads them, and tells later whether the value still holds.
+/// The files that a value is made of: reads them, and says later whether the value still holds.
 /// Each is looked at before it is opened; only what is a regular file, or a directory, is opened.
 /// One thread makes the value; then any number of threads may ask.
 class TrackedFiles {

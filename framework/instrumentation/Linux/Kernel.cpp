@@ -25,7 +25,7 @@ std::int64_t nanoseconds(const struct timespec& time) {
 
 struct Field {
     bool present = false;
-    std::optional<std::uint32_t> kiB;  // nothing where the line is malformed
+    std::optional<std::uint32_t> kiB;  // nullopt if the line is malformed
 };
 
 struct Fields {

@@ -7,23 +7,23 @@
 #include <string>
 #include <string_view>
 
-/// What the kernel tells, by its calls and in proc.
+/// What the kernel reports, by its calls and in proc.
 namespace VA::Linux {
 
 class HostFiles;
 
-/// What uname tells.
+/// What uname gives.
 struct KernelNames {
     std::string system, node, release;
 };
 
 /// When the host was booted, by its clocks, in seconds since the epoch, UTC.
 struct ClockedBoot {
-    std::optional<std::int64_t> seconds;  ///< nothing where a clock fails
-    bool exact = false;  ///< false where a second ended too near to tell, or nothing is told
+    std::optional<std::int64_t> seconds;  ///< nullopt if a clock fails
+    bool exact = false;  ///< false where a second ended too near to say, or `seconds` is nullopt
 };
 
-/// What the running kernel tells without a file. Tests derive from it to replace answers.
+/// What the running kernel reports without a file. Tests derive from it to replace answers.
 class Kernel {
   public:
     static constexpr std::uint64_t unlimited = std::numeric_limits<std::uint64_t>::max();
@@ -52,7 +52,7 @@ struct MemoryInfo {
     std::optional<std::uint32_t> swapFreeKiB;   ///< 0 on a host without swap
 };
 
-/// Nothing for a text that does not tell the total memory: that is no meminfo.
+/// Returns nullopt for a text without the total memory: that is no meminfo.
 ///
 /// Available memory is MemAvailable or, where a kernel has none, the sum of MemFree, Buffers and
 /// Cached. A host without a SwapTotal line has no swap; a line that is malformed leaves its value
@@ -63,7 +63,7 @@ std::optional<MemoryInfo> parseMemoryInfo(std::string_view meminfo);
 /// proc/sys/kernel.
 std::optional<std::uint64_t> parseNumberFile(std::string_view text);
 
-/// The values of a host's proc, at most 4294967295; nothing where it does not tell.
+/// The values of a host's proc, at most 4294967295; nullopt if it does not say.
 std::optional<MemoryInfo> readMemoryInfo(const HostFiles& files);
 std::optional<std::uint32_t> readMaxProcesses(const HostFiles& files);
 std::optional<std::uint32_t> countProcesses(const HostFiles& files);

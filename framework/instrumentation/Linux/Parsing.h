@@ -26,7 +26,7 @@ void forEachLine(std::string_view text, Visit visit) {
 /// True for one or more decimal digits and nothing else.
 bool isAllDigits(std::string_view text);
 
-/// The value of a text that is all digits; nothing for any other text, and for one past 64 bits.
+/// The value of a text that is all digits; nullopt for any other text, and for one past 64 bits.
 std::optional<std::uint64_t> parseDecimal(std::string_view text);
 
 /// `value`, or the largest 32-bit number where that is less.
@@ -45,7 +45,7 @@ constexpr std::uint32_t clampedSum(std::uint32_t first, std::uint32_t second) {
 bool isPlainText(std::string_view text);
 
 /// The value that `name` has in an environment file, shell-like assignments, one a line:
-/// os-release, and the session files of systemd. The last assignment wins; nothing where there is
+/// os-release, and the session files of systemd. The last assignment wins; nullopt if there is
 /// none.
 ///
 /// A value may stand in double quotes, where a backslash escapes $ " ` and itself; in single

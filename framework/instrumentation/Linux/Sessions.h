@@ -27,13 +27,13 @@ struct SessionCount {
 SessionCount countSystemdSessions(TrackedFiles& files);
 
 /// The number of user sessions in a utmp file: its USER_PROCESS records whose process passes
-/// `isAlive`. Nothing for a file that is not a whole number of records, and for one with such
-/// records of which none is alive: it may tell of the processes of another pid namespace.
+/// `isAlive`. Returns nullopt for a file that is not a whole number of records, and for one with
+/// such records of which none is alive: it may list the processes of another pid namespace.
 std::optional<std::uint32_t> countUtmpSessions(
     std::string_view utmp, const std::function<bool(std::int32_t pid)>& isAlive);
 
 /// The user sessions of a host: those that systemd lists or, where it lists none at all, those of
-/// run/utmp or var/run/utmp. Nothing where neither is known.
+/// run/utmp or var/run/utmp. Returns nullopt if neither is known.
 std::optional<std::uint32_t> countSessions(const HostFiles& files, const Kernel& kernel,
                                            FileCache<SessionCount>& cache);
 

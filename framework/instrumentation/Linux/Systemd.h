@@ -17,7 +17,7 @@ class SystemManager {
   public:
     virtual ~SystemManager() = default;
 
-    /// The state that the manager says the system is in, such as "running"; nothing where it does
+    /// The state that the manager says the system is in, such as "running"; nullopt if it does
     /// not answer. Never blocks for long.
     virtual std::optional<std::string> systemState() = 0;
 };
