@@ -38,6 +38,12 @@ inline std::optional<std::string> scalarText(const CMPIData& data) {
     }
 }
 
+/// Characters as an argument of type CMPI_chars: brokers take the pointer itself, not the address
+/// of one, as for other types.
+inline const CMPIValue* charsArgument(const char* characters) {
+    return reinterpret_cast<const CMPIValue*>(characters);
+}
+
 }  // namespace base
 
 #endif

@@ -4,8 +4,8 @@
 #include <map>
 #include <set>
 
+#include "CimError.h"
 #include "Operations.h"
-#include "Refusal.h"
 #include "base/Ascii.h"
 
 namespace VA::OSStatusFacade {
@@ -15,8 +15,8 @@ namespace {
 /// A way from the source over one association.
 struct Traversal {
     const Class& association;
-    const End& near;
-    const End& far;
+    const AssociationEnd& near;
+    const AssociationEnd& far;
 };
 
 bool isGiven(const char* filter) {
@@ -32,7 +32,8 @@ bool admits(const char* filter, const char* role) {
 }
 
 // The ways that a source of that class has. None from a path that can name no instance.
-std::vector<Traversal> traversalsFrom(const ClientRequest& request, const Filter& filter) {
+std::vector<Traversal> traversalsFrom(const ClientRequest& request,
+                                      const AssociationFilter& filter) {
     std::vector<Traversal> traversals;
     const Class* const source = request.knownClass();
     if (source == nullptr || !keyProblem(*source, keysOf(request.path())).empty())
@@ -62,25 +63,28 @@ struct Pair {
 // Adds the pair that a path names, if the source is at its near end. One without a far end, or
 // whose far end has no keys, ties the source to nothing.
 void addPair(std::vector<Pair>& pairs, const ClientRequest& request, const Traversal& traversal,
-             const Identity& source, const CMPIObjectPath* path, const CMPIInstance* instance) {
+             const CanonicalPath& source, const CMPIObjectPath* path,
+             const CMPIInstance* instance) {
     const CMPIObjectPath* const near = referenceOf(path, traversal.near.role);
     const CMPIObjectPath* const far = referenceOf(path, traversal.far.role);
     if (near == nullptr || far == nullptr || keysOf(far).empty()) return;
-    if (request.identityOf(near) == source)
+    if (request.canonicalPathOf(near) == source)
         pairs.push_back({traversal.far.elements, path, far, instance});
 }
 
-enum class Ask { names, instances };
+enum class ResultKind { objectPaths, instances };
 
-std::vector<Pair> pairsOf(const ClientRequest& request, const Filter& filter, Ask ask) {
+std::vector<Pair> pairsOf(const ClientRequest& request, const AssociationFilter& filter,
+                          ResultKind kind) {
     std::vector<Pair> pairs;
     const std::vector<Traversal> traversals = traversalsFrom(request, filter);
     if (traversals.empty()) return pairs;
-    const Identity source = request.identityOf(request.path());
+    const CanonicalPath source = request.canonicalPathOf(request.path());
     for (const Traversal& traversal : traversals) {
         const CMPIObjectPath* const classPath = request.newPath(traversal.association.name);
-        const Answer answer = ask == Ask::names ? request.enumerateInstanceNames(classPath)
-                                                : request.enumerateInstances(classPath);
+        const ResultCollector answer = kind == ResultKind::objectPaths
+                                           ? request.enumerateInstanceNames(classPath)
+                                           : request.enumerateInstances(classPath);
         requireWhole(answer, traversal.association.name);
         for (const CMPIObjectPath* path : answer.paths())
             addPair(pairs, request, traversal, source, path, nullptr);
@@ -90,16 +94,16 @@ std::vector<Pair> pairsOf(const ClientRequest& request, const Filter& filter, As
     return pairs;
 }
 
-/// The identities that came already.
-using Seen = std::set<Identity>;
+/// What was returned already.
+using Seen = std::set<CanonicalPath>;
 
 using Paths = std::vector<const CMPIObjectPath*>;
 using Instances = std::vector<const CMPIInstance*>;
 
 // The computer systems, which another provider of the object manager serves.
 Instances computerSystems(const ClientRequest& request, const Class& cimClass) {
-    const Refusal failure(CMPI_RC_ERR_FAILED,
-                          std::string("the object manager does not enumerate ") + cimClass.name);
+    const CimError failure(CMPI_RC_ERR_FAILED,
+                           std::string("the object manager does not enumerate ") + cimClass.name);
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     CMPIEnumeration* const enumeration = request.broker()->bft->enumerateInstances(
         request.broker(), request.context(), request.newPath(cimClass.name), nullptr, &status);
@@ -116,7 +120,7 @@ Instances computerSystems(const ClientRequest& request, const Class& cimClass) {
 
 Instances instancesOf(const ClientRequest& request, const Class& cimClass) {
     if (!cimClass.servedByProvider) return computerSystems(request, cimClass);
-    const Answer answer = request.enumerateInstances(request.newPath(cimClass.name));
+    const ResultCollector answer = request.enumerateInstances(request.newPath(cimClass.name));
     requireWhole(answer, cimClass.name);
     return answer.instances();
 }
@@ -127,42 +131,43 @@ class InstanceIndex {
     explicit InstanceIndex(const ClientRequest& request) : request_(request) {}
 
     /// Null when there is no such instance any more.
-    const CMPIInstance* find(const Identity& identity, const Class& cimClass) {
+    const CMPIInstance* find(const CanonicalPath& path, const Class& cimClass) {
         if (fetched_.insert(&cimClass).second)
             for (const CMPIInstance* instance : instancesOf(request_, cimClass))
-                instances_.emplace(request_.identityOf(pathOf(instance)), instance);
-        const auto found = instances_.find(identity);
+                instances_.emplace(request_.canonicalPathOf(pathOf(instance)), instance);
+        const auto found = instances_.find(path);
         return found == instances_.end() ? nullptr : found->second;
     }
 
   private:
     const ClientRequest& request_;
     std::set<const Class*> fetched_;
-    std::map<Identity, const CMPIInstance*> instances_;
+    std::map<CanonicalPath, const CMPIInstance*> instances_;
 };
 
 // Returns one path of each pair, but each once.
-void returnPathOfEach(const ClientRequest& request, const Filter& filter,
+void returnPathOfEach(const ClientRequest& request, const AssociationFilter& filter,
                       const CMPIObjectPath* Pair::*path) {
     Paths paths;
     Seen seen;
-    for (const Pair& pair : pairsOf(request, filter, Ask::names))
-        if (seen.insert(request.identityOf(pair.*path)).second) paths.push_back(pair.*path);
+    for (const Pair& pair : pairsOf(request, filter, ResultKind::objectPaths))
+        if (seen.insert(request.canonicalPathOf(pair.*path)).second) paths.push_back(pair.*path);
     request.returnPaths(paths);
 }
 
 }  // namespace
 
-void associatorNames(const ClientRequest& request, const Filter& filter) {
+void associatorNames(const ClientRequest& request, const AssociationFilter& filter) {
     returnPathOfEach(request, filter, &Pair::far);
 }
 
-void associators(const ClientRequest& request, const Filter& filter, const char** properties) {
+void associators(const ClientRequest& request, const AssociationFilter& filter,
+                 const char** properties) {
     Instances instances;
     InstanceIndex index(request);
     Seen seen;
-    for (const Pair& pair : pairsOf(request, filter, Ask::names)) {
-        const Identity far = request.identityOf(pair.far);
+    for (const Pair& pair : pairsOf(request, filter, ResultKind::objectPaths)) {
+        const CanonicalPath far = request.canonicalPathOf(pair.far);
         if (!seen.insert(far).second) continue;
         if (const CMPIInstance* instance = index.find(far, pair.farClass))
             instances.push_back(instance);
@@ -170,15 +175,17 @@ void associators(const ClientRequest& request, const Filter& filter, const char*
     request.returnInstances(instances, properties);
 }
 
-void referenceNames(const ClientRequest& request, const Filter& filter) {
+void referenceNames(const ClientRequest& request, const AssociationFilter& filter) {
     returnPathOfEach(request, filter, &Pair::path);
 }
 
-void references(const ClientRequest& request, const Filter& filter, const char** properties) {
+void references(const ClientRequest& request, const AssociationFilter& filter,
+                const char** properties) {
     Instances instances;
     Seen seen;
-    for (const Pair& pair : pairsOf(request, filter, Ask::instances))
-        if (seen.insert(request.identityOf(pair.path)).second) instances.push_back(pair.instance);
+    for (const Pair& pair : pairsOf(request, filter, ResultKind::instances))
+        if (seen.insert(request.canonicalPathOf(pair.path)).second)
+            instances.push_back(pair.instance);
     request.returnInstances(instances, properties);
 }
 

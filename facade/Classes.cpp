@@ -1,11 +1,11 @@
-// What the schema says of the classes, as a table: an object manager need not tell a provider about
+// What the schema says of the classes, as a table: an object manager need not give a provider the
 // ancestors, and asking one for each request would be slow.
 
 #include "Classes.h"
 
 #include <algorithm>
 
-#include "Refusal.h"
+#include "CimError.h"
 #include "base/Ascii.h"
 
 namespace VA::OSStatusFacade {
@@ -27,15 +27,15 @@ constexpr const char* installedAncestors[] = {"CIM_InstalledOS", "CIM_SystemComp
 constexpr const char* runningAncestors[] = {"CIM_RunningOS", "CIM_Dependency"};
 constexpr const char* elementCapabilitiesAncestors[] = {"CIM_ElementCapabilities"};
 
-constexpr Key operatingSystemKeys[] = {{"CSCreationClassName", false},
-                                       {"CSName", false},
-                                       {"CreationClassName", false},
-                                       {"Name", false}};
-constexpr Key computerSystemKeys[] = {{"CreationClassName", false}, {"Name", false}};
-constexpr Key capabilitiesKeys[] = {{"InstanceID", false}};
-constexpr Key installedKeys[] = {{"GroupComponent", true}, {"PartComponent", true}};
-constexpr Key runningKeys[] = {{"Antecedent", true}, {"Dependent", true}};
-constexpr Key elementCapabilitiesKeys[] = {{"ManagedElement", true}, {"Capabilities", true}};
+constexpr ClassKey operatingSystemKeys[] = {{"CSCreationClassName", false},
+                                            {"CSName", false},
+                                            {"CreationClassName", false},
+                                            {"Name", false}};
+constexpr ClassKey computerSystemKeys[] = {{"CreationClassName", false}, {"Name", false}};
+constexpr ClassKey capabilitiesKeys[] = {{"InstanceID", false}};
+constexpr ClassKey installedKeys[] = {{"GroupComponent", true}, {"PartComponent", true}};
+constexpr ClassKey runningKeys[] = {{"Antecedent", true}, {"Dependent", true}};
+constexpr ClassKey elementCapabilitiesKeys[] = {{"ManagedElement", true}, {"Capabilities", true}};
 
 constexpr Class classes[] = {
     {"KORVA_OperatingSystem", operatingSystemAncestors, operatingSystemKeys, true},
@@ -67,10 +67,10 @@ bool Class::isA(std::string_view other) const {
            });
 }
 
-const Key* Class::key(std::string_view wanted) const {
-    const Key* const found = std::find_if(keys.begin(), keys.end(), [wanted](const Key& each) {
-        return base::equalsIgnoreCase(each.name, wanted);
-    });
+const ClassKey* Class::key(std::string_view wanted) const {
+    const ClassKey* const found = std::find_if(
+        keys.begin(), keys.end(),
+        [wanted](const ClassKey& each) { return base::equalsIgnoreCase(each.name, wanted); });
     return found == keys.end() ? nullptr : found;
 }
 
@@ -95,7 +95,7 @@ std::string referenceProblem(const CMPIObjectPath* reference) {
     return known == nullptr ? "" : keyProblem(*known, bindings);
 }
 
-std::string valueProblem(const Key& key, const KeyBinding& binding) {
+std::string valueProblem(const ClassKey& key, const KeyBinding& binding) {
     if (!key.isReference)
         return binding.text() ? "" : std::string("key ") + key.name + " is no text";
     if (binding.reference() == nullptr) return std::string("key ") + key.name + " is no reference";
@@ -110,7 +110,7 @@ std::string keyProblem(const Class& cimClass, const std::vector<KeyBinding>& bin
     for (const KeyBinding& binding : bindings)
         if (cimClass.key(binding.name) == nullptr)
             return std::string(cimClass.name) + " has no key " + printable(binding.name);
-    for (const Key& key : cimClass.keys) {
+    for (const ClassKey& key : cimClass.keys) {
         const auto named = [&key](const KeyBinding& each) {
             return base::equalsIgnoreCase(each.name, key.name);
         };

@@ -11,7 +11,7 @@
 namespace VA::OSStatusFacade {
 
 /// A key of a class.
-struct Key {
+struct ClassKey {
     const char* name;
     bool isReference;
 };
@@ -20,8 +20,8 @@ struct Key {
 struct Class {
     const char* name;
     base::Span<const char* const> ancestors;
-    base::Span<const Key> keys;  ///< in the schema's order
-    bool servedByProvider;       ///< the provider behind the facade serves its instances
+    base::Span<const ClassKey> keys;  ///< in the schema's order
+    bool servedByProvider;            ///< the provider behind the facade serves its instances
 
     /// Whether `other` is the class itself or one of its ancestors.
     bool isA(std::string_view other) const;
@@ -29,18 +29,18 @@ struct Class {
     bool isAssociation() const { return keys.begin()->isReference; }
 
     /// The key of the wanted name, null if there is none.
-    const Key* key(std::string_view wanted) const;
+    const ClassKey* key(std::string_view wanted) const;
 };
 
 /// An end of an association: the reference that points to it, and the class of its elements.
-struct End {
+struct AssociationEnd {
     const char* role;
     const Class& elements;
 };
 
 struct Association {
     const Class& associationClass;
-    End ends[2];
+    AssociationEnd ends[2];
 };
 
 /// The class of that name, null if it is none that is known here.

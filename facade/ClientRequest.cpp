@@ -6,25 +6,26 @@
 #include <algorithm>
 #include <new>
 
-#include "Refusal.h"
+#include "CimError.h"
 #include "base/Ascii.h"
+#include "base/CmpiText.h"
 
 namespace VA::OSStatusFacade {
 
 // The functions of the result. The provider calls them: nothing may be thrown into it, where it
 // would count as a walk that broke off.
-struct Answer::Table {
+struct ResultCollector::Table {
     // Headers of a later level have the handle const; the object behind it is not.
-    static Answer& answerOf(const CMPIResult* result) {
-        return *static_cast<Answer*>(const_cast<void*>(result->hdl));
+    static ResultCollector& collectorOf(const CMPIResult* result) {
+        return *static_cast<ResultCollector*>(const_cast<void*>(result->hdl));
     }
 
     template <class Element>
     static CMPIStatus gather(const CMPIResult* result,
-                             std::vector<const Element*> Answer::*elements,
+                             std::vector<const Element*> ResultCollector::*elements,
                              const Element* element) noexcept {
         if (element == nullptr) return {CMPI_RC_ERR_INVALID_PARAMETER, nullptr};
-        Answer& answer = answerOf(result);
+        ResultCollector& answer = collectorOf(result);
         try {
             (answer.*elements).push_back(element);
         } catch (const std::bad_alloc&) {
@@ -43,13 +44,13 @@ struct Answer::Table {
         return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
     }
     static CMPIStatus returnInstance(const CMPIResult* result, const CMPIInstance* instance) {
-        return gather(result, &Answer::instances_, instance);
+        return gather(result, &ResultCollector::instances_, instance);
     }
     static CMPIStatus returnObjectPath(const CMPIResult* result, const CMPIObjectPath* path) {
-        return gather(result, &Answer::paths_, path);
+        return gather(result, &ResultCollector::paths_, path);
     }
     static CMPIStatus returnDone(const CMPIResult* result) {
-        answerOf(result).done_ = true;
+        collectorOf(result).done_ = true;
         return {CMPI_RC_OK, nullptr};
     }
     static CMPIStatus returnError(const CMPIResult*, const CMPIError*) {
@@ -57,11 +58,11 @@ struct Answer::Table {
     }
 };
 
-const CMPIResultFT Answer::table = {
+const CMPIResultFT ResultCollector::table = {
     CMPIVersion200,        Table::release,          Table::clone,      Table::returnData,
     Table::returnInstance, Table::returnObjectPath, Table::returnDone, Table::returnError};
 
-void Answer::requireRoom() const {
+void ResultCollector::requireRoom() const {
     if (full_) throw std::bad_alloc();
 }
 
@@ -73,42 +74,38 @@ bool contains(const std::vector<const char*>& names, const std::string& name) {
     });
 }
 
-// Of characters, brokers take the pointer itself, not the address of one.
-const CMPIValue* argument(const CMPIData& data) {
-    return data.type == CMPI_chars ? reinterpret_cast<const CMPIValue*>(data.value.chars)
-                                   : &data.value;
-}
-
 void copyProperties(const CMPIInstance* from, const std::vector<const char*>& names,
                     const CMPIInstance* to) {
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     const CMPICount count = from->ft->getPropertyCount(from, &status);
     if (status.rc != CMPI_RC_OK)
-        throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not count properties");
+        throw CimError(CMPI_RC_ERR_FAILED, "the object manager does not count properties");
     for (CMPICount index = 0; index < count; ++index) {
         CMPIString* name = nullptr;
         const CMPIData data = from->ft->getPropertyAt(from, index, &name, &status);
         if (status.rc != CMPI_RC_OK)
-            throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not tell a property");
+            throw CimError(CMPI_RC_ERR_FAILED, "the object manager does not tell a property");
         if ((data.state & CMPI_nullValue) != 0) continue;
         const std::string property = charactersOf(name);
         if (!contains(names, property)) continue;
-        status = to->ft->setProperty(to, property.c_str(), argument(data), data.type);
+        const CMPIValue* const value =
+            data.type == CMPI_chars ? base::charsArgument(data.value.chars) : &data.value;
+        status = to->ft->setProperty(to, property.c_str(), value, data.type);
         if (status.rc != CMPI_RC_OK)
-            throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not take a property");
+            throw CimError(CMPI_RC_ERR_FAILED, "the object manager does not take a property");
     }
 }
 
 // The instance with the properties of the list and its keys: a new one, or the instance itself
 // when the list is null. The list ends with a null; names compare without case, unknown ones are
-// passed over. Throws Refusal when the broker makes no instance.
+// passed over. Throws CimError when the broker makes no instance.
 const CMPIInstance* withProperties(const CMPIBroker* broker, const CMPIInstance* instance,
                                    const char** properties) {
     if (properties == nullptr) return instance;
     const CMPIObjectPath* const path = pathOf(instance);
     CMPIInstance* const result = broker->eft->newInstance(broker, path, nullptr);
     if (result == nullptr)
-        throw Refusal(CMPI_RC_ERR_FAILED, "the object manager makes no instance");
+        throw CimError(CMPI_RC_ERR_FAILED, "the object manager makes no instance");
 
     const std::vector<KeyBinding> keys = keysOf(path);
     std::vector<const char*> keyNames;
@@ -138,34 +135,34 @@ ClientRequest::ClientRequest(const Provider& provider, const CMPIContext* contex
       class_(findClass(className_)),
       nameSpace_(nameSpaceOf(path)) {}
 
-Identity ClientRequest::identityOf(const CMPIObjectPath* path) const {
-    return OSStatusFacade::identityOf(path, nameSpace_);
+CanonicalPath ClientRequest::canonicalPathOf(const CMPIObjectPath* path) const {
+    return OSStatusFacade::canonicalPathOf(path, nameSpace_);
 }
 
 CMPIObjectPath* ClientRequest::newPath(const char* className) const {
     CMPIObjectPath* const path =
         broker()->eft->newObjectPath(broker(), nameSpace_.c_str(), className, nullptr);
-    if (path == nullptr) throw Refusal(CMPI_RC_ERR_FAILED, "the object manager makes no path");
+    if (path == nullptr) throw CimError(CMPI_RC_ERR_FAILED, "the object manager makes no path");
     return path;
 }
 
-Answer ClientRequest::enumerateInstanceNames(const CMPIObjectPath* path) const {
+ResultCollector ClientRequest::enumerateInstanceNames(const CMPIObjectPath* path) const {
     CMPIInstanceMI* const mi = provider_.instances;
-    return Answer([&](const CMPIResult* result) {
+    return ResultCollector([&](const CMPIResult* result) {
         return mi->ft->enumerateInstanceNames(mi, context_, result, path);
     });
 }
 
-Answer ClientRequest::enumerateInstances(const CMPIObjectPath* path) const {
+ResultCollector ClientRequest::enumerateInstances(const CMPIObjectPath* path) const {
     CMPIInstanceMI* const mi = provider_.instances;
-    return Answer([&](const CMPIResult* result) {
+    return ResultCollector([&](const CMPIResult* result) {
         return mi->ft->enumerateInstances(mi, context_, result, path, nullptr);
     });
 }
 
-Answer ClientRequest::getInstance(const CMPIObjectPath* path) const {
+ResultCollector ClientRequest::getInstance(const CMPIObjectPath* path) const {
     CMPIInstanceMI* const mi = provider_.instances;
-    return Answer([&](const CMPIResult* result) {
+    return ResultCollector([&](const CMPIResult* result) {
         return mi->ft->getInstance(mi, context_, result, path, nullptr);
     });
 }
@@ -184,19 +181,19 @@ void ClientRequest::returnInstances(const std::vector<const CMPIInstance*>& inst
     result_->ft->returnDone(result_);
 }
 
-void requireServed(const Answer& answer, const std::string& className) {
+void requireServed(const ResultCollector& answer, const std::string& className) {
     if (answer.rc() == CMPI_RC_ERR_INVALID_CLASS)
-        throw Refusal(CMPI_RC_ERR_INVALID_CLASS, printable(className) + " is not served here");
+        throw CimError(CMPI_RC_ERR_INVALID_CLASS, printable(className) + " is not served here");
     if (answer.rc() != CMPI_RC_OK)
-        throw Refusal(answer.rc(), "the question about " + printable(className) + " is refused");
+        throw CimError(answer.rc(), "the question about " + printable(className) + " is refused");
 }
 
-void requireWhole(const Answer& answer, const std::string& className) {
+void requireWhole(const ResultCollector& answer, const std::string& className) {
     requireServed(answer, className);
     if (answer.isDone()) return;
     const Class* const known = findClass(className);
     if (known != nullptr && known->isAssociation() && answer.isEmpty()) return;
-    throw Refusal(CMPI_RC_ERR_FAILED, "the answer about " + printable(className) + " broke off");
+    throw CimError(CMPI_RC_ERR_FAILED, "the answer about " + printable(className) + " broke off");
 }
 
 }  // namespace VA::OSStatusFacade

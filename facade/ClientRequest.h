@@ -23,16 +23,16 @@ struct Provider {
 
 /// What the provider returned to one question. The elements belong to the broker, as all that a
 /// provider returns.
-class Answer {
+class ResultCollector {
   public:
     /// Calls `ask` with a CMPIResult that gathers here; `ask` returns the provider's status. Throws
     /// std::bad_alloc when something that was returned found no room, and what `ask` throws.
     template <class Ask>
-    explicit Answer(Ask ask) : status_(ask(&result_)) {
+    explicit ResultCollector(Ask ask) : status_(ask(&result_)) {
         requireRoom();
     }
-    Answer(const Answer&) = delete;
-    Answer& operator=(const Answer&) = delete;
+    ResultCollector(const ResultCollector&) = delete;
+    ResultCollector& operator=(const ResultCollector&) = delete;
 
     CMPIrc rc() const { return status_.rc; }
 
@@ -76,16 +76,16 @@ class ClientRequest {
     const Class* knownClass() const { return class_; }
 
     /// What a path stands for; where it has no namespace, it is in that of the request.
-    Identity identityOf(const CMPIObjectPath* path) const;
+    CanonicalPath canonicalPathOf(const CMPIObjectPath* path) const;
 
-    /// A new path in the namespace of the request. Throws Refusal when the broker makes none.
+    /// A new path in the namespace of the request. Throws CimError when the broker makes none.
     CMPIObjectPath* newPath(const char* className) const;
 
     /// Each asks the provider one question, as an object manager would. No property list goes with
     /// it: the list is applied to what is returned, and until then all keys are there to compare.
-    Answer enumerateInstanceNames(const CMPIObjectPath* path) const;
-    Answer enumerateInstances(const CMPIObjectPath* path) const;
-    Answer getInstance(const CMPIObjectPath* path) const;
+    ResultCollector enumerateInstanceNames(const CMPIObjectPath* path) const;
+    ResultCollector enumerateInstances(const CMPIObjectPath* path) const;
+    ResultCollector getInstance(const CMPIObjectPath* path) const;
 
     /// Give the results to the client and say that this is all. The property list is applied; null
     /// stands for all properties.
@@ -103,13 +103,13 @@ class ClientRequest {
     std::string nameSpace_;
 };
 
-/// Throws Refusal unless the provider serves the class.
-void requireServed(const Answer& answer, const std::string& className);
+/// Throws CimError unless the provider serves the class.
+void requireServed(const ResultCollector& answer, const std::string& className);
 
 /// The same, unless the answer is whole. One without a returnDone was broken off: of
 /// associations whose ends are nowhere that is how the provider says that there are none, anything
 /// else would look complete and is not.
-void requireWhole(const Answer& answer, const std::string& className);
+void requireWhole(const ResultCollector& answer, const std::string& className);
 
 }  // namespace VA::OSStatusFacade
 

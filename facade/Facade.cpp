@@ -8,8 +8,10 @@
 #include <exception>
 #include <string>
 
+#include "CimError.h"
 #include "Operations.h"
-#include "Refusal.h"
+#include "Trace.h"
+#include "base/SourceLocation.h"
 
 // The factories of the provider behind the facade, as an object manager would call them: each
 // returns its one record, with the broker that it was given last in use.
@@ -25,12 +27,45 @@ CMPIAssociationMI* OperatingSystemProvider_Create_AssociationMI(const CMPIBroker
 
 namespace VA::OSStatusFacade {
 
-// Of several factory calls the last one wins.
+using base::SourceLocation;
+
+// As the last call of either factory left it.
 static Provider provider;
 
-// Serves a request; whatever goes wrong becomes a status. No exception but the end of a thread that
-// the object manager cancels passes here. It may come while the refusal is recorded, too, and that
-// is done outside of the handlers: within one, nobody may catch it.
+static constexpr const char* sourceFile = "Facade.cpp";
+static const std::string category("Zumbrel.OSStatusFacade");
+
+// A message record, since those pass the log as it is shipped. It is put together here: the buffer
+// of VA::trace is shared by all threads.
+static void record(const std::string& text, SourceLocation handler) {
+    const std::string whole = std::string("MESSAGE [File: ") + sourceFile +
+                              ", Line: " + std::to_string(handler.line) + "]: " + text;
+    writeRecord(handler.function, sourceFile, handler.line, category, parameterRecordLevel,
+                [&whole] { return whole.c_str(); });
+}
+
+// Writes the one record of a request that failed, if any, and makes its status: the client is told
+// why, and so is the log, since the provider itself says nothing. Without memory for record or
+// message, those are left out. No exception leaves but the end of a cancelled thread.
+static CMPIStatus failure(CMPIrc rc, const char* text, SourceLocation handler, Recorded recorded) {
+    CMPIStatus status = {rc, nullptr};
+    try {
+        const CMPIBroker* const broker = provider.broker;
+        const std::string safe = printable(text, 400);
+        status.msg = broker->eft->newString(broker, safe.c_str(), nullptr);
+        if (recorded == Recorded::yes) record(safe, handler);
+    } catch (const abi::__forced_unwind&) {
+        throw;
+    } catch (...) {
+        // The client then gets the status alone.
+    }
+    return status;
+}
+
+// Serves a request; whatever goes wrong becomes a status. No exception leaves but the one that ends
+// a thread which the object manager cancels. That may also come while the failure is recorded: this
+// is done after the catch blocks, since within one the runtime ends the process when a cancellation
+// is caught.
 template <class Serve>
 static CMPIStatus guarded(Serve serve, SourceLocation handler = SourceLocation::current()) {
     CMPIrc rc = CMPI_RC_ERR_FAILED;
@@ -40,10 +75,10 @@ static CMPIStatus guarded(Serve serve, SourceLocation handler = SourceLocation::
     try {
         serve();
         return {CMPI_RC_OK, nullptr};
-    } catch (const Refusal& refusal) {
-        rc = refusal.rc();
-        recorded = refusal.recorded();
-        text = refusal.what();
+    } catch (const CimError& error) {
+        rc = error.rc();
+        recorded = error.recorded();
+        text = error.what();
         ownerOfText = std::current_exception();
     } catch (const abi::__forced_unwind&) {
         throw;
@@ -51,12 +86,12 @@ static CMPIStatus guarded(Serve serve, SourceLocation handler = SourceLocation::
         text = unexpected.what();
         ownerOfText = std::current_exception();
     } catch (...) {
-        // Of a type that tells nothing.
+        // Of a type without a text.
     }
-    return refuse(provider.broker, rc, text, handler, recorded);
+    return failure(rc, text, handler, recorded);
 }
 
-// Passes an operation on that is none of a reader's; the provider refuses it.
+// Passes a write operation or a query on to the provider, which refuses it.
 template <class Pass>
 static CMPIStatus passedOn(const char* operation, const CMPIObjectPath* path, Pass pass,
                            Recorded recorded = Recorded::yes,
@@ -65,10 +100,10 @@ static CMPIStatus passedOn(const char* operation, const CMPIObjectPath* path, Pa
         [&] {
             const CMPIStatus status = pass(provider.instances);
             if (status.rc != CMPI_RC_OK)
-                throw Refusal(status.rc,
-                              std::string(operation) + " is not supported for " +
-                                  printable(classNameOf(path)),
-                              recorded);
+                throw CimError(status.rc,
+                               std::string(operation) + " is not supported for " +
+                                   printable(classNameOf(path)),
+                               recorded);
         },
         handler);
 }
@@ -165,7 +200,7 @@ static CMPIStatus OSStatusFacade_AssociatorNames(CMPIAssociationMI*, const CMPIC
     });
 }
 
-// Of references, the result is the association.
+// The result class of references is the association.
 static CMPIStatus OSStatusFacade_References(CMPIAssociationMI*, const CMPIContext* context,
                                             const CMPIResult* result, const CMPIObjectPath* path,
                                             const char* resultClass, const char* role,
@@ -186,7 +221,7 @@ static CMPIStatus OSStatusFacade_ReferenceNames(CMPIAssociationMI*, const CMPICo
 }
 
 // Headers of a later level may have more slots at the ends of the tables: these stay null, and the
-// version tells that they are none of this library's.
+// version says that this library does not have them.
 #pragma GCC diagnostic push
 #pragma GCC diagnostic ignored "-Wmissing-field-initializers"
 

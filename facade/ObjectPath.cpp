@@ -1,5 +1,7 @@
 // Object managers differ in what they hand out: keys in any order and spelling, numbers where texts
-// are declared, paths without a namespace. Here they become identities, which compare as they are.
+// are declared, paths without a namespace. Here they become canonical paths, which compare as they
+// are. ProviderUtilities.cpp reads paths too, but leaves out what a broker fails to give: here the
+// request ends then, since a key that is missing without a word would name another instance.
 
 #include "ObjectPath.h"
 
@@ -9,7 +11,7 @@
 #include <array>
 #include <cstdio>
 
-#include "Refusal.h"
+#include "CimError.h"
 #include "base/Ascii.h"
 #include "base/CmpiText.h"
 
@@ -19,7 +21,7 @@ namespace {
 
 void requireOk(const CMPIStatus& status, const char* what) {
     if (status.rc != CMPI_RC_OK)
-        throw Refusal(CMPI_RC_ERR_FAILED, std::string("the object manager does not tell ") + what);
+        throw CimError(CMPI_RC_ERR_FAILED, std::string("the object manager does not tell ") + what);
 }
 
 bool isAbsent(const CMPIData& data) {
@@ -43,10 +45,10 @@ std::string withLength(const std::string& text) {
     return std::to_string(text.size()) + ":" + text;
 }
 
-// One text that stands for an identity and for no other.
-std::string textOf(const Identity& identity) {
-    std::string text = withLength(identity.classPath);
-    for (const auto& [name, value] : identity.keys) text += withLength(name) + withLength(value);
+// One text that stands for a canonical path and for no other.
+std::string textOf(const CanonicalPath& path) {
+    std::string text = withLength(path.classPath);
+    for (const auto& [name, value] : path.keys) text += withLength(name) + withLength(value);
     return text;
 }
 
@@ -79,7 +81,7 @@ std::string otherValue(const CMPIData& data) {
 
 std::string comparable(const KeyBinding& key, std::string_view nameSpace) {
     if (const CMPIObjectPath* reference = key.reference())
-        return "reference " + textOf(identityOf(reference, nameSpace));
+        return "reference " + textOf(canonicalPathOf(reference, nameSpace));
     const std::optional<std::string> text = key.text();
     if (!text) return "type " + std::to_string(key.data.type) + " " + otherValue(key.data);
     const bool withoutCase =
@@ -142,7 +144,7 @@ std::vector<KeyBinding> keysOf(const CMPIObjectPath* path) {
 const CMPIObjectPath* pathOf(const CMPIInstance* instance) {
     const CMPIObjectPath* const path = instance->ft->getObjectPath(instance, nullptr);
     if (path == nullptr)
-        throw Refusal(CMPI_RC_ERR_FAILED, "the object manager does not tell a path");
+        throw CimError(CMPI_RC_ERR_FAILED, "the object manager does not tell a path");
     return path;
 }
 
@@ -155,15 +157,15 @@ const CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* role) 
     return data.type == CMPI_ref && !isAbsent(data) ? data.value.ref : nullptr;
 }
 
-Identity identityOf(const CMPIObjectPath* path, std::string_view nameSpace) {
+CanonicalPath canonicalPathOf(const CMPIObjectPath* path, std::string_view nameSpace) {
     const std::string own = nameSpaceOf(path);
-    Identity identity;
-    identity.classPath =
+    CanonicalPath canonical;
+    canonical.classPath =
         base::toLower((own.empty() ? std::string(nameSpace) : own) + ":" + classNameOf(path));
     for (const KeyBinding& key : keysOf(path))
-        identity.keys.emplace_back(base::toLower(key.name), comparable(key, nameSpace));
-    std::sort(identity.keys.begin(), identity.keys.end());
-    return identity;
+        canonical.keys.emplace_back(base::toLower(key.name), comparable(key, nameSpace));
+    std::sort(canonical.keys.begin(), canonical.keys.end());
+    return canonical;
 }
 
 }  // namespace VA::OSStatusFacade

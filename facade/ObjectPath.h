@@ -13,7 +13,7 @@
 namespace VA::OSStatusFacade {
 
 // Reading object paths of any broker. Null paths are accepted: they have no class and no keys. What
-// the object manager has but fails to tell ends the request: these functions throw Refusal then.
+// the object manager has but fails to give ends the request: these functions throw CimError then.
 
 /// The characters of a broker's string, empty when there are none.
 std::string charactersOf(const CMPIString* string);
@@ -45,20 +45,20 @@ const CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* role);
 /// What a path stands for: two paths name the same instance exactly if these are equal. Names
 /// compare without case, values with case, but for those of CSName and Name, which the provider
 /// matches without. The order of keys and the host play no part.
-struct Identity {
+struct CanonicalPath {
     std::string classPath;                                  ///< namespace and class
     std::vector<std::pair<std::string, std::string>> keys;  ///< names and values, by name
 
-    friend bool operator==(const Identity& left, const Identity& right) {
+    friend bool operator==(const CanonicalPath& left, const CanonicalPath& right) {
         return left.classPath == right.classPath && left.keys == right.keys;
     }
-    friend bool operator<(const Identity& left, const Identity& right) {
+    friend bool operator<(const CanonicalPath& left, const CanonicalPath& right) {
         return std::tie(left.classPath, left.keys) < std::tie(right.classPath, right.keys);
     }
 };
 
 /// `nameSpace` is that of the request: it counts where a path has none.
-Identity identityOf(const CMPIObjectPath* path, std::string_view nameSpace);
+CanonicalPath canonicalPathOf(const CMPIObjectPath* path, std::string_view nameSpace);
 
 }  // namespace VA::OSStatusFacade
 

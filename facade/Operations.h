@@ -3,7 +3,7 @@
 
 #include "ClientRequest.h"
 
-// What a client may ask. Each operation answers one request, or throws Refusal.
+// What a client may ask. Each operation answers one request, or throws CimError.
 
 namespace VA::OSStatusFacade {
 
@@ -14,7 +14,7 @@ void enumerateInstances(const ClientRequest& request, const char** properties);
 void getInstance(const ClientRequest& request, const char** properties);
 
 /// What a client wants of the associations of a source; null filters nothing.
-struct Filter {
+struct AssociationFilter {
     const char* associationClass = nullptr;
     const char* farClass = nullptr;
     const char* role = nullptr;
@@ -30,10 +30,12 @@ struct Filter {
 // lead to computer systems cost one more, for the instances. Names of them, and all other
 // instances, need none.
 
-void associatorNames(const ClientRequest& request, const Filter& filter);
-void associators(const ClientRequest& request, const Filter& filter, const char** properties);
-void referenceNames(const ClientRequest& request, const Filter& filter);
-void references(const ClientRequest& request, const Filter& filter, const char** properties);
+void associatorNames(const ClientRequest& request, const AssociationFilter& filter);
+void associators(const ClientRequest& request, const AssociationFilter& filter,
+                 const char** properties);
+void referenceNames(const ClientRequest& request, const AssociationFilter& filter);
+void references(const ClientRequest& request, const AssociationFilter& filter,
+                const char** properties);
 
 }  // namespace VA::OSStatusFacade
 

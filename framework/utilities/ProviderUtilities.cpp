@@ -42,8 +42,8 @@ bool hasValue(const CMPIStatus& status, const CMPIData& key) {
     return status.rc == CMPI_RC_OK && (key.state & absent) == 0;
 }
 
-// Reads the key binding of a name. False when there is none, or none with a value: brokers tell so
-// by their status, any but OK, or by the state of the value. `key` is then not to be used.
+// Reads the key binding of a name. False when there is none, or none with a value: brokers show
+// that by their status, any but OK, or by the state of the value. `key` is then not to be used.
 bool readKey(const CMPIObjectPath* path, const char* name, CMPIData& key) {
     if (path == nullptr || name == nullptr) return false;
     CMPIStatus status = {CMPI_RC_OK, nullptr};
@@ -117,9 +117,7 @@ void set(CMPIInstance* instance, const char* name, Member CMPIValue::*member, Me
 
 void setCharacters(CMPIInstance* instance, const char* name, const char* characters) {
     if (instance == nullptr || characters == nullptr) return;
-    // Of characters, brokers take the pointer itself, not the address of one.
-    instance->ft->setProperty(instance, name, reinterpret_cast<const CMPIValue*>(characters),
-                              CMPI_chars);
+    instance->ft->setProperty(instance, name, base::charsArgument(characters), CMPI_chars);
 }
 
 // Sets an array property from `count` elements, each supplied by `element(index, value)`; a broker
@@ -198,8 +196,7 @@ CMPIObjectPath* ProviderUtilities::createObjectPath(
 
 void ProviderUtilities::setKeyProperty(CMPIObjectPath* path, const char* name, const char* value) {
     if (path == nullptr || value == nullptr) return;
-    // Of characters, brokers take the pointer itself, not the address of one.
-    path->ft->addKey(path, name, reinterpret_cast<const CMPIValue*>(value), CMPI_chars);
+    path->ft->addKey(path, name, base::charsArgument(value), CMPI_chars);
 }
 
 void ProviderUtilities::setKeyProperty(CMPIObjectPath* path, const char* name,
