@@ -147,7 +147,7 @@ static CMPIStatus ComputerSystem_ExecQuery(CMPIInstanceMI*, const CMPIContext*, 
 }
 
 // Headers of a later level may have more slots at the end of the table: these stay null, and the
-// version tells that they are none of this library's.
+// version says that this library does not have them.
 #pragma GCC diagnostic push
 #pragma GCC diagnostic ignored "-Wmissing-field-initializers"
 

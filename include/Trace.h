@@ -11,7 +11,8 @@
 #include <ZBLogger.h>
 #include <ZBMessageBuffer.h>
 
-/// The records that every unit writes: their texts, and the one way in which they are written.
+/// The records that every unit writes: their texts, and the one way in which they are written. The
+/// functions called `trace` only make a text; writeRecord() is what writes it.
 ///
 /// Each formatting function owns one static buffer of 512 bytes that all its callers share, on
 /// whatever thread: no lock is taken, so threads that format the same kind of record at the same
@@ -46,7 +47,7 @@ class RecordText {
     RecordText& operator<<(const char* text) {
         return *this << (text == nullptr ? std::string_view("(null)") : std::string_view(text));
     }
-    /// Of constants the length is known, and copying them takes a few moves.
+    /// The length of a constant is known, and copying it takes a few moves.
     RecordText& operator<<(std::string_view text) {
         const auto room = static_cast<std::size_t>(end_ - next_);
         if (text.size() > room) return *this = cut(text, next_, end_);

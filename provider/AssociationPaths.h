@@ -12,7 +12,8 @@ namespace VA::OSStatusProvider {
 
 /// A new path of class `farClass`, null when the broker makes none. When `nearEnd` has keys, the
 /// path gets those that `map`, from moniker to moniker, derives from them; what `map` throws passes
-/// through. Keys are counted, once there is a path, in a number of type `Count`.
+/// through. Keys are counted, once there is a path, in a number of type `Count`: associations
+/// differ in its width, and so in what they make of a path with 65536 keys.
 template <class Count, class Map>
 CMPIObjectPath* locateFarEnd(const CMPIBroker* broker, const std::string& nameSpace,
                              const char* farClass, const CMPIObjectPath* nearEnd, Map map) {

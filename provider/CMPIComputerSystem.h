@@ -9,7 +9,8 @@
 namespace VA::OSStatusProvider {
 
 /// The host's computer system, which another provider of the same object manager serves: asks the
-/// broker for its instances, and hands out those and their paths.
+/// broker for its instances, and hands out those and their paths. Records name its file
+/// CMPIComputerSystem.cpp, without the "OS" of the class: that name is fixed.
 ///
 /// One object serves one request on one thread. Enumeration and instances belong to the broker and
 /// are never released here.

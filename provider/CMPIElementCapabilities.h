@@ -12,7 +12,8 @@
 
 namespace VA::OSStatusProvider {
 
-/// Serves KORVA_OSElementCapabilities: the capabilities of the operating systems.
+/// Serves KORVA_OSElementCapabilities: the capabilities of the operating systems. Records name its
+/// file CMPIElementCapabilities.cpp, without the "OS" of the class: that name is fixed.
 ///
 /// The class of the path that it is built from decides what it walks: the association itself, or
 /// from one end to the other. Built from any other path it has no far end and never ends by itself;

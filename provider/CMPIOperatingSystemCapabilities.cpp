@@ -37,7 +37,7 @@ const ElementTraits<Capabilities> CMPIOperatingSystemCapabilities::traits = {
     filters,
     keys,
     properties,
-    false,  // values are shared
+    false,  // values are not shared: what a getter leaves unwritten is empty
     log,
 };
 

@@ -117,7 +117,8 @@ CMPIInstance* ComputerSystemAssociation::getAssociator(const char** properties) 
     return instance;
 }
 
-// These associations count keys in 16 bits.
+// These associations have always counted keys in 16 bits, other than CMPIOSElementCapabilities: a
+// path with 65536 keys counts as one without keys.
 
 CMPIObjectPath* ComputerSystemAssociation::locateComputerSystem(const CMPIObjectPath* objectPath) {
     const ParameterList parameters(" objectPath=", objectPath);

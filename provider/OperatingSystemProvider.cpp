@@ -33,7 +33,7 @@ static const CMPIBroker* broker = nullptr;
 // status OK; others pass through, as do those from outside the walk. All records are the handler's
 // own.
 template <class ClassSource>
-static CMPIStatus serve(Dispatch dispatch, ClassSource classSource, const Request& request,
+static CMPIStatus serve(Dispatch dispatch, ClassSource classSource, const HandlerRequest& request,
                         SourceLocation handler = SourceLocation::current()) {
     VA::markProviderEntry(loggerOperatingSystemProvider, sourceFile, handler.function,
                           handler.line);
@@ -66,13 +66,13 @@ static CMPIStatus OperatingSystem_Cleanup(CMPIInstanceMI*, const CMPIContext*, C
 static CMPIStatus OperatingSystem_EnumInstanceNames(CMPIInstanceMI*, const CMPIContext* ctx,
                                                     const CMPIResult* rslt,
                                                     const CMPIObjectPath* op) {
-    return serve(instanceDispatch, op, {broker, ctx, rslt, op, Wanted::objectPaths, nullptr});
+    return serve(instanceDispatch, op, {broker, ctx, rslt, op, ResultKind::objectPaths, nullptr});
 }
 
 static CMPIStatus OperatingSystem_EnumInstances(CMPIInstanceMI*, const CMPIContext* ctx,
                                                 const CMPIResult* rslt, const CMPIObjectPath* op,
                                                 const char** properties) {
-    return serve(instanceDispatch, op, {broker, ctx, rslt, op, Wanted::instances, properties});
+    return serve(instanceDispatch, op, {broker, ctx, rslt, op, ResultKind::instances, properties});
 }
 
 // The keys of the path have the adapter stand on the one element that they name; when they name
@@ -80,7 +80,7 @@ static CMPIStatus OperatingSystem_EnumInstances(CMPIInstanceMI*, const CMPIConte
 static CMPIStatus OperatingSystem_GetInstance(CMPIInstanceMI*, const CMPIContext* ctx,
                                               const CMPIResult* rslt, const CMPIObjectPath* op,
                                               const char** properties) {
-    return serve(instanceDispatch, op, {broker, ctx, rslt, op, Wanted::instances, properties});
+    return serve(instanceDispatch, op, {broker, ctx, rslt, op, ResultKind::instances, properties});
 }
 
 static CMPIStatus OperatingSystem_CreateInstance(CMPIInstanceMI*, const CMPIContext*,
@@ -116,7 +116,7 @@ static CMPIStatus OperatingSystem_Associators(CMPIAssociationMI*, const CMPICont
                                               const char* assocClass, const char*, const char*,
                                               const char*, const char** properties) {
     return serve(associatorDispatch, assocClass,
-                 {broker, ctx, rslt, op, Wanted::instances, properties});
+                 {broker, ctx, rslt, op, ResultKind::instances, properties});
 }
 
 static CMPIStatus OperatingSystem_AssociatorNames(CMPIAssociationMI*, const CMPIContext* ctx,
@@ -124,7 +124,7 @@ static CMPIStatus OperatingSystem_AssociatorNames(CMPIAssociationMI*, const CMPI
                                                   const char* assocClass, const char*, const char*,
                                                   const char*) {
     return serve(associatorDispatch, assocClass,
-                 {broker, ctx, rslt, op, Wanted::objectPaths, nullptr});
+                 {broker, ctx, rslt, op, ResultKind::objectPaths, nullptr});
 }
 
 static CMPIStatus OperatingSystem_References(CMPIAssociationMI*, const CMPIContext*,
@@ -140,7 +140,7 @@ static CMPIStatus OperatingSystem_ReferenceNames(CMPIAssociationMI*, const CMPIC
 }
 
 // Headers of a later level may have more slots at the ends of the tables: these stay null, and the
-// version tells that they are none of this library's.
+// version says that this library does not have them.
 #pragma GCC diagnostic push
 #pragma GCC diagnostic ignored "-Wmissing-field-initializers"
 

@@ -19,27 +19,27 @@
 namespace VA::OSStatusProvider {
 
 /// What a request is to be answered with.
-enum class Wanted { objectPaths, instances };
+enum class ResultKind { objectPaths, instances };
 
 /// What a handler was called with, as far as a walk needs it.
-struct Request {
+struct HandlerRequest {
     const CMPIBroker* broker;
     const CMPIContext* context;
     const CMPIResult* result;
     const CMPIObjectPath* objectPath;
-    Wanted wanted;
+    ResultKind resultKind;
     const char** properties;  ///< the client's list, null for object paths
 };
 
 /// Gives a path or an instance to the result; what the result says of it is ignored. False for
 /// null, which is not given: object managers do not survive it.
-inline bool returnResult(const Request& request, const CMPIObjectPath* path) {
+inline bool returnResult(const HandlerRequest& request, const CMPIObjectPath* path) {
     if (path == nullptr) return false;
     request.result->ft->returnObjectPath(request.result, path);
     return true;
 }
 
-inline bool returnResult(const Request& request, const CMPIInstance* instance) {
+inline bool returnResult(const HandlerRequest& request, const CMPIInstance* instance) {
     if (instance == nullptr) return false;
     request.result->ft->returnInstance(request.result, instance);
     return true;
@@ -47,19 +47,19 @@ inline bool returnResult(const Request& request, const CMPIInstance* instance) {
 
 /// Fetches the adapter's current element and returns it; false when there is none to return.
 template <class Adapter>
-bool returnElement(const Request& request, Adapter& adapter) {
-    // The broker may tell another class of the path when it is asked again, by the adapter.
+bool returnElement(const HandlerRequest& request, Adapter& adapter) {
+    // The broker may give another class for the path when the adapter asks it again.
     // CMPIOSElementCapabilities would then return pairs for ever.
     if (!adapter.enumerates()) return false;
-    return request.wanted == Wanted::objectPaths
+    return request.resultKind == ResultKind::objectPaths
                ? returnResult(request, adapter.getObjectPath())
                : returnResult(request, adapter.getCMPIInstance(request.properties));
 }
 
 /// The same for what is at the far end of the adapter's association.
 template <class Adapter>
-bool returnFarEnd(const Request& request, Adapter& adapter) {
-    return request.wanted == Wanted::objectPaths
+bool returnFarEnd(const HandlerRequest& request, Adapter& adapter) {
+    return request.resultKind == ResultKind::objectPaths
                ? returnResult(request, adapter.getAssociatorNames())
                : returnResult(request, adapter.getAssociator(request.properties));
 }
@@ -67,14 +67,14 @@ bool returnFarEnd(const Request& request, Adapter& adapter) {
 /// Builds the adapter, returns what it stands on until it ends, and reports the end. A null ends
 /// the walk too: a CMPIOSElementCapabilities from a class that is no end of the association has no
 /// other end.
-template <class Adapter, bool (*returnCurrent)(const Request&, Adapter&)>
-void walk(const Request& request) {
+template <class Adapter, bool (*returnCurrent)(const HandlerRequest&, Adapter&)>
+void walk(const HandlerRequest& request) {
     Adapter adapter(request.broker, request.context, request.objectPath);
     while (adapter && returnCurrent(request, adapter)) ++adapter;
     request.result->ft->returnDone(request.result);
 }
 
-using Walk = void (*)(const Request& request);
+using Walk = void (*)(const HandlerRequest& request);
 
 /// A class id, and the walk that serves requests for it.
 struct DispatchRow {
@@ -92,7 +92,8 @@ constexpr DispatchRow instanceDispatch[] = {
     {elementCapabilitiesId, walk<CMPIOSElementCapabilities, returnElement>},
 };
 
-/// By the association class that the request names.
+/// By the association class that the request names. Asked only by object managers that load the
+/// provider itself: the facade answers associators from the pairs that instanceDispatch returns.
 constexpr DispatchRow associatorDispatch[] = {
     {runningOSId, walk<CMPIRunningOS, returnFarEnd>},
     {elementCapabilitiesId, walk<CMPIOSElementCapabilities, returnFarEnd>},

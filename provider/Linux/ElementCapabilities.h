@@ -6,7 +6,8 @@
 namespace VA::OSStatusProvider {
 
 /// Maps the ends of KORVA_OSElementCapabilities onto each other: the capabilities' "InstanceID" is
-/// the operating system's "Name". Stateless.
+/// the operating system's "Name". Stateless. Records name its file Linux/ElementCapabilities.cpp,
+/// without the "OS" of the class: that name is fixed.
 class OSElementCapabilities {
   public:
     OSElementCapabilities();

@@ -1,4 +1,4 @@
-// Far ends are named by a single key, since the near end tells no other: object managers and the
+// Far ends are named by a single key, since the near end knows no other: object managers and the
 // adapters take it as a filter.
 
 #include "KeyMapping.h"

@@ -1,5 +1,5 @@
-// What the framework tells of an operating system, turned into the values that CIM has for it. Some
-// conversions look wrong and are not: clients know them as they are.
+// What the framework reports of an operating system, turned into the values that CIM has for it.
+// Some conversions look wrong and are not: clients know them as they are.
 
 #include "OperatingSystem.h"
 

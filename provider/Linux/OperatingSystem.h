@@ -133,7 +133,8 @@ class OperatingSystem {
     std::array<char, 26> dateTimeBuffer = {};  // of a CIM datetime: 25 characters and the NUL
 };
 
-/// State changes of the operating system, which offers none: both do nothing and return false.
+/// State changes of the operating system, which offers none: both do nothing and return false. Part
+/// of the contract, though nothing here calls them.
 bool executeReboot();
 bool executeShutdown();
 

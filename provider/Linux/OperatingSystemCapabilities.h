@@ -47,7 +47,8 @@ class OperatingSystemCapabilities {
     bool getHostShutdownBehavior(unsigned short& value);
 
   protected:
-    /// What operator++ applies once a derived class has set it; this one leaves it alone.
+    /// Part of the contract: what operator++ applies once a derived class has set it. This class
+    /// leaves it alone.
     bool filterSet = false;
     std::vector<Filter> filters;
 
