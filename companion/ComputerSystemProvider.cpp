@@ -1,7 +1,6 @@
 // The computer system is somebody else's class: a host whose object manager has no provider of it
 // gets this one, so that the operating system's associations have their other end. It serves one
 // instance, the host itself, under the name that the provider of the operating system uses.
-
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
 #include <cmpi/cmpimacs.h>

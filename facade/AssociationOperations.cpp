@@ -1,6 +1,5 @@
 // Requests about associations, answered from the pairs that the provider enumerates: its own
 // associators follow the first key that fits and know no filters, and it refuses references.
-
 #include <map>
 #include <set>
 
@@ -36,9 +35,10 @@ std::vector<Traversal> traversalsFrom(const ClientRequest& request,
                                       const AssociationFilter& filter) {
     std::vector<Traversal> traversals;
     const Class* const source = request.knownClass();
-    if (source == nullptr || !keyProblem(*source, keysOf(request.path())).empty())
+    if (source == nullptr || !keyProblem(*source, keysOf(request.path())).empty()) {
         return traversals;
-    for (const Association& association : associations())
+    }
+    for (const Association& association : associations()) {
         for (const int near : {0, 1}) {
             const Traversal traversal = {association.associationClass, association.ends[near],
                                          association.ends[1 - near]};
@@ -46,9 +46,11 @@ std::vector<Traversal> traversalsFrom(const ClientRequest& request,
                 admits(filter.associationClass, traversal.association) &&
                 admits(filter.farClass, traversal.far.elements) &&
                 admits(filter.role, traversal.near.role) &&
-                admits(filter.farRole, traversal.far.role))
+                admits(filter.farRole, traversal.far.role)) {
                 traversals.push_back(traversal);
+            }
         }
+    }
     return traversals;
 }
 
@@ -68,8 +70,9 @@ void addPair(std::vector<Pair>& pairs, const ClientRequest& request, const Trave
     const CMPIObjectPath* const near = referenceOf(path, traversal.near.role);
     const CMPIObjectPath* const far = referenceOf(path, traversal.far.role);
     if (near == nullptr || far == nullptr || keysOf(far).empty()) return;
-    if (request.canonicalPathOf(near) == source)
+    if (request.canonicalPathOf(near) == source) {
         pairs.push_back({traversal.far.elements, path, far, instance});
+    }
 }
 
 enum class ResultKind { objectPaths, instances };
@@ -86,10 +89,12 @@ std::vector<Pair> pairsOf(const ClientRequest& request, const AssociationFilter&
                                            ? request.enumerateInstanceNames(classPath)
                                            : request.enumerateInstances(classPath);
         requireWhole(answer, traversal.association.name);
-        for (const CMPIObjectPath* path : answer.paths())
+        for (const CMPIObjectPath* path : answer.paths()) {
             addPair(pairs, request, traversal, source, path, nullptr);
-        for (const CMPIInstance* instance : answer.instances())
+        }
+        for (const CMPIInstance* instance : answer.instances()) {
             addPair(pairs, request, traversal, source, pathOf(instance), instance);
+        }
     }
     return pairs;
 }
@@ -132,9 +137,11 @@ class InstanceIndex {
 
     /// Null when there is no such instance any more.
     const CMPIInstance* find(const CanonicalPath& path, const Class& cimClass) {
-        if (fetched_.insert(&cimClass).second)
-            for (const CMPIInstance* instance : instancesOf(request_, cimClass))
+        if (fetched_.insert(&cimClass).second) {
+            for (const CMPIInstance* instance : instancesOf(request_, cimClass)) {
                 instances_.emplace(request_.canonicalPathOf(pathOf(instance)), instance);
+            }
+        }
         const auto found = instances_.find(path);
         return found == instances_.end() ? nullptr : found->second;
     }
@@ -150,8 +157,9 @@ void returnPathOfEach(const ClientRequest& request, const AssociationFilter& fil
                       const CMPIObjectPath* Pair::*path) {
     Paths paths;
     Seen seen;
-    for (const Pair& pair : pairsOf(request, filter, ResultKind::objectPaths))
+    for (const Pair& pair : pairsOf(request, filter, ResultKind::objectPaths)) {
         if (seen.insert(request.canonicalPathOf(pair.*path)).second) paths.push_back(pair.*path);
+    }
     request.returnPaths(paths);
 }
 
@@ -169,8 +177,9 @@ void associators(const ClientRequest& request, const AssociationFilter& filter,
     for (const Pair& pair : pairsOf(request, filter, ResultKind::objectPaths)) {
         const CanonicalPath far = request.canonicalPathOf(pair.far);
         if (!seen.insert(far).second) continue;
-        if (const CMPIInstance* instance = index.find(far, pair.farClass))
+        if (const CMPIInstance* instance = index.find(far, pair.farClass)) {
             instances.push_back(instance);
+        }
     }
     request.returnInstances(instances, properties);
 }
@@ -183,9 +192,11 @@ void references(const ClientRequest& request, const AssociationFilter& filter,
                 const char** properties) {
     Instances instances;
     Seen seen;
-    for (const Pair& pair : pairsOf(request, filter, ResultKind::instances))
-        if (seen.insert(request.canonicalPathOf(pair.path)).second)
+    for (const Pair& pair : pairsOf(request, filter, ResultKind::instances)) {
+        if (seen.insert(request.canonicalPathOf(pair.path)).second) {
             instances.push_back(pair.instance);
+        }
+    }
     request.returnInstances(instances, properties);
 }
 

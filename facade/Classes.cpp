@@ -1,6 +1,5 @@
 // What the schema says of the classes, as a table: an object manager need not give a provider the
 // ancestors, and asking one for each request would be slow.
-
 #include "Classes.h"
 
 #include <algorithm>
@@ -75,8 +74,9 @@ const ClassKey* Class::key(std::string_view wanted) const {
 }
 
 const Class* findClass(std::string_view name) {
-    for (const Class& each : classes)
+    for (const Class& each : classes) {
         if (base::equalsIgnoreCase(each.name, name)) return &each;
+    }
     return nullptr;
 }
 
@@ -89,15 +89,17 @@ namespace {
 // What associations refer to has no references itself; that also limits the depth.
 std::string referenceProblem(const CMPIObjectPath* reference) {
     const std::vector<KeyBinding> bindings = keysOf(reference);
-    for (const KeyBinding& key : bindings)
+    for (const KeyBinding& key : bindings) {
         if (key.reference() != nullptr) return "key " + printable(key.name) + " is a reference";
+    }
     const Class* const known = findClass(classNameOf(reference));
     return known == nullptr ? "" : keyProblem(*known, bindings);
 }
 
 std::string valueProblem(const ClassKey& key, const KeyBinding& binding) {
-    if (!key.isReference)
+    if (!key.isReference) {
         return binding.text() ? "" : std::string("key ") + key.name + " is no text";
+    }
     if (binding.reference() == nullptr) return std::string("key ") + key.name + " is no reference";
     const std::string problem = referenceProblem(binding.reference());
     return problem.empty() ? "" : std::string(key.name) + ": " + problem;
@@ -107,17 +109,20 @@ std::string valueProblem(const ClassKey& key, const KeyBinding& binding) {
 
 std::string keyProblem(const Class& cimClass, const std::vector<KeyBinding>& bindings) {
     const std::string of = std::string(" of ") + cimClass.name;
-    for (const KeyBinding& binding : bindings)
-        if (cimClass.key(binding.name) == nullptr)
+    for (const KeyBinding& binding : bindings) {
+        if (cimClass.key(binding.name) == nullptr) {
             return std::string(cimClass.name) + " has no key " + printable(binding.name);
+        }
+    }
     for (const ClassKey& key : cimClass.keys) {
         const auto named = [&key](const KeyBinding& each) {
             return base::equalsIgnoreCase(each.name, key.name);
         };
         const auto found = std::find_if(bindings.begin(), bindings.end(), named);
         if (found == bindings.end()) return std::string("key ") + key.name + of + " is missing";
-        if (std::count_if(bindings.begin(), bindings.end(), named) > 1)
+        if (std::count_if(bindings.begin(), bindings.end(), named) > 1) {
             return std::string("key ") + key.name + of + " is there twice";
+        }
         std::string problem = valueProblem(key, *found);
         if (!problem.empty()) return problem;
     }

@@ -1,6 +1,5 @@
 // The facade asks the provider as an object manager would, and gathers what comes back before it
 // hands anything over: an answer that broke off must not look like a whole one.
-
 #include "ClientRequest.h"
 
 #include <algorithm>
@@ -78,21 +77,24 @@ void copyProperties(const CMPIInstance* from, const std::vector<const char*>& na
                     const CMPIInstance* to) {
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     const CMPICount count = from->ft->getPropertyCount(from, &status);
-    if (status.rc != CMPI_RC_OK)
+    if (status.rc != CMPI_RC_OK) {
         throw CimError(CMPI_RC_ERR_FAILED, "the object manager does not count properties");
+    }
     for (CMPICount index = 0; index < count; ++index) {
         CMPIString* name = nullptr;
         const CMPIData data = from->ft->getPropertyAt(from, index, &name, &status);
-        if (status.rc != CMPI_RC_OK)
+        if (status.rc != CMPI_RC_OK) {
             throw CimError(CMPI_RC_ERR_FAILED, "the object manager does not tell a property");
+        }
         if ((data.state & CMPI_nullValue) != 0) continue;
         const std::string property = charactersOf(name);
         if (!contains(names, property)) continue;
         const CMPIValue* const value =
             data.type == CMPI_chars ? base::charsArgument(data.value.chars) : &data.value;
         status = to->ft->setProperty(to, property.c_str(), value, data.type);
-        if (status.rc != CMPI_RC_OK)
+        if (status.rc != CMPI_RC_OK) {
             throw CimError(CMPI_RC_ERR_FAILED, "the object manager does not take a property");
+        }
     }
 }
 
@@ -104,16 +106,18 @@ const CMPIInstance* withProperties(const CMPIBroker* broker, const CMPIInstance*
     if (properties == nullptr) return instance;
     const CMPIObjectPath* const path = pathOf(instance);
     CMPIInstance* const result = broker->eft->newInstance(broker, path, nullptr);
-    if (result == nullptr)
+    if (result == nullptr) {
         throw CimError(CMPI_RC_ERR_FAILED, "the object manager makes no instance");
+    }
 
     const std::vector<KeyBinding> keys = keysOf(path);
     std::vector<const char*> keyNames;
     keyNames.reserve(keys.size() + 1);
     for (const KeyBinding& key : keys) keyNames.push_back(key.name.c_str());
     std::vector<const char*> names = keyNames;
-    for (const char** property = properties; *property != nullptr; ++property)
+    for (const char** property = properties; *property != nullptr; ++property) {
         names.push_back(*property);
+    }
     keyNames.push_back(nullptr);
     names.push_back(nullptr);
     // An object manager may have filled the new instance with all properties of its class: the
@@ -175,17 +179,20 @@ void ClientRequest::returnPaths(const std::vector<const CMPIObjectPath*>& paths)
 void ClientRequest::returnInstances(const std::vector<const CMPIInstance*>& instances,
                                     const char** properties) const {
     std::vector<const CMPIInstance*> answer = instances;
-    for (const CMPIInstance*& instance : answer)
+    for (const CMPIInstance*& instance : answer) {
         instance = withProperties(broker(), instance, properties);
+    }
     for (const CMPIInstance* instance : answer) result_->ft->returnInstance(result_, instance);
     result_->ft->returnDone(result_);
 }
 
 void requireServed(const ResultCollector& answer, const std::string& className) {
-    if (answer.rc() == CMPI_RC_ERR_INVALID_CLASS)
+    if (answer.rc() == CMPI_RC_ERR_INVALID_CLASS) {
         throw CimError(CMPI_RC_ERR_INVALID_CLASS, printable(className) + " is not served here");
-    if (answer.rc() != CMPI_RC_OK)
+    }
+    if (answer.rc() != CMPI_RC_OK) {
         throw CimError(answer.rc(), "the question about " + printable(className) + " is refused");
+    }
 }
 
 void requireWhole(const ResultCollector& answer, const std::string& className) {

@@ -1,6 +1,5 @@
 // What object managers load in the provider's place: two factories, two function tables, and the
 // handlers behind them. No exception leaves a handler, and every failure becomes a status.
-
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
 #include <cxxabi.h>
@@ -99,11 +98,12 @@ static CMPIStatus passedOn(const char* operation, const CMPIObjectPath* path, Pa
     return guarded(
         [&] {
             const CMPIStatus status = pass(provider.instances);
-            if (status.rc != CMPI_RC_OK)
+            if (status.rc != CMPI_RC_OK) {
                 throw CimError(status.rc,
                                std::string(operation) + " is not supported for " +
                                    printable(classNameOf(path)),
                                recorded);
+            }
         },
         handler);
 }

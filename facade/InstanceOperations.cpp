@@ -1,7 +1,6 @@
 // Requests for instances. The provider answers a path by some of its keys, and returns OK without
 // an instance when there is none: whether all keys name the instance, and which key does not, is
 // found out here.
-
 #include <algorithm>
 
 #include "CimError.h"
@@ -21,14 +20,16 @@ using CanonicalPaths = std::vector<CanonicalPath>;
 CMPIObjectPath* pathToAskFor(const ClientRequest& request, const Class& cimClass,
                              const std::vector<KeyBinding>& bindings) {
     CMPIObjectPath* const path = request.newPath(cimClass.name);
-    for (const ClassKey& key : cimClass.keys)
+    for (const ClassKey& key : cimClass.keys) {
         for (const KeyBinding& binding : bindings) {
             if (key.isReference || !base::equalsIgnoreCase(binding.name, key.name)) continue;
             const CMPIStatus status = path->ft->addKey(
                 path, key.name, base::charsArgument(binding.text()->c_str()), CMPI_chars);
-            if (status.rc != CMPI_RC_OK)
+            if (status.rc != CMPI_RC_OK) {
                 throw CimError(CMPI_RC_ERR_FAILED, "the object manager does not take a key");
+            }
         }
+    }
     return path;
 }
 
@@ -51,8 +52,9 @@ CimError notFound(const Class& cimClass, const CanonicalPath& wanted,
         if (wantedKey == wanted.keys.end() ||
             std::none_of(candidates.begin(), candidates.end(), [&](const CanonicalPath& candidate) {
                 return hasKey(candidate, *wantedKey);
-            }))
+            })) {
             unknown += std::string(unknown.empty() ? "" : ", ") + key.name;
+        }
     }
     return CimError(CMPI_RC_ERR_NOT_FOUND, std::string("no instance of ") + cimClass.name +
                                                " has this " + (unknown.empty() ? all : unknown));
@@ -76,8 +78,9 @@ void getInstance(const ClientRequest& request, const char** properties) {
     const Class* const known = request.knownClass();
     // The provider is asked all the same: its status is the client's, and its records show the
     // request. It refuses such a class; nothing it could return would be known here.
-    if (known == nullptr || !known->servedByProvider)
+    if (known == nullptr || !known->servedByProvider) {
         return requireServed(request.getInstance(request.path()), request.className());
+    }
     // An object manager may give other keys when it is asked again: the provider gets those that
     // were checked.
     const std::vector<KeyBinding> bindings = keysOf(request.path());
@@ -98,8 +101,9 @@ void getInstance(const ClientRequest& request, const char** properties) {
     if (!known->isAssociation()) {
         const ResultCollector names = request.enumerateInstanceNames(request.newPath(known->name));
         requireWhole(names, known->name);
-        for (const CMPIObjectPath* path : names.paths())
+        for (const CMPIObjectPath* path : names.paths()) {
             candidates.push_back(request.canonicalPathOf(path));
+        }
     }
     throw notFound(*known, wanted, candidates);
 }

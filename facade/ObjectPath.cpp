@@ -2,7 +2,6 @@
 // are declared, paths without a namespace. Here they become canonical paths, which compare as they
 // are. ProviderUtilities.cpp reads paths too, but leaves out what a broker fails to give: here the
 // request ends then, since a key that is missing without a word would name another instance.
-
 #include "ObjectPath.h"
 
 #include <cmpi/cmpift.h>
@@ -20,8 +19,9 @@ namespace VA::OSStatusFacade {
 namespace {
 
 void requireOk(const CMPIStatus& status, const char* what) {
-    if (status.rc != CMPI_RC_OK)
+    if (status.rc != CMPI_RC_OK) {
         throw CimError(CMPI_RC_ERR_FAILED, std::string("the object manager does not tell ") + what);
+    }
 }
 
 bool isAbsent(const CMPIData& data) {
@@ -80,8 +80,9 @@ std::string otherValue(const CMPIData& data) {
 }
 
 std::string comparable(const KeyBinding& key, std::string_view nameSpace) {
-    if (const CMPIObjectPath* reference = key.reference())
+    if (const CMPIObjectPath* reference = key.reference()) {
         return "reference " + textOf(canonicalPathOf(reference, nameSpace));
+    }
     const std::optional<std::string> text = key.text();
     if (!text) return "type " + std::to_string(key.data.type) + " " + otherValue(key.data);
     const bool withoutCase =
@@ -143,16 +144,18 @@ std::vector<KeyBinding> keysOf(const CMPIObjectPath* path) {
 
 const CMPIObjectPath* pathOf(const CMPIInstance* instance) {
     const CMPIObjectPath* const path = instance->ft->getObjectPath(instance, nullptr);
-    if (path == nullptr)
+    if (path == nullptr) {
         throw CimError(CMPI_RC_ERR_FAILED, "the object manager does not tell a path");
+    }
     return path;
 }
 
 const CMPIObjectPath* referenceOf(const CMPIObjectPath* path, const char* role) {
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     const CMPIData data = path->ft->getKey(path, role, &status);
-    if (status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY || status.rc == CMPI_RC_ERR_NOT_FOUND)
+    if (status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY || status.rc == CMPI_RC_ERR_NOT_FOUND) {
         return nullptr;
+    }
     requireOk(status, "a reference");
     return data.type == CMPI_ref && !isAbsent(data) ? data.value.ref : nullptr;
 }
@@ -162,8 +165,9 @@ CanonicalPath canonicalPathOf(const CMPIObjectPath* path, std::string_view nameS
     CanonicalPath canonical;
     canonical.classPath =
         base::toLower((own.empty() ? std::string(nameSpace) : own) + ":" + classNameOf(path));
-    for (const KeyBinding& key : keysOf(path))
+    for (const KeyBinding& key : keysOf(path)) {
         canonical.keys.emplace_back(base::toLower(key.name), comparable(key, nameSpace));
+    }
     std::sort(canonical.keys.begin(), canonical.keys.end());
     return canonical;
 }

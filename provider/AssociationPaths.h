@@ -30,9 +30,10 @@ CMPIObjectPath* locateFarEnd(const CMPIBroker* broker, const std::string& nameSp
 /// a path without it leaves the property out.
 inline void setReference(const CMPIObjectPath* path, CMPIInstance* instance, const char* role) {
     const CMPIObjectPath* reference = nullptr;
-    if (VA::ProviderUtilities::getKeyProperty(path, role, &reference))
+    if (VA::ProviderUtilities::getKeyProperty(path, role, &reference)) {
         // CMPI values hold paths as plain pointers; the instance only copies this one.
         VA::ProviderUtilities::setProperty(instance, role, const_cast<CMPIObjectPath*>(reference));
+    }
 }
 
 }  // namespace VA::OSStatusProvider

@@ -1,6 +1,5 @@
 // The computer system belongs to another provider: it is asked of the object manager, in a call
 // from within the request, and handed on as it came.
-
 #include "CMPIComputerSystem.h"
 
 #include <utility>
@@ -44,8 +43,9 @@ void CMPIOSComputerSystem::setObjectPath(const CMPIObjectPath* objectPath) {
     const ParameterList parameters(" objectPath=", objectPath);
     log.entering(parameters);
     // Without a path there is nothing to ask for; a broker might not survive the question.
-    if (objectPath == nullptr || !fetchFirst(objectPath))
+    if (objectPath == nullptr || !fetchFirst(objectPath)) {
         throw VA::ProviderException("Could not obtain an instance of Computer System");
+    }
     firstPending = true;
     log.exiting(parameters);
 }

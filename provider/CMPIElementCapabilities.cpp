@@ -1,7 +1,6 @@
 // The association of operating systems with their capabilities has ends, records and a walk of its
 // own shape, and so is no ComputerSystemAssociation. Some of its operations leave without an
 // exiting record; whoever reads the records relies on that.
-
 #include "CMPIElementCapabilities.h"
 
 #include "AssociationPaths.h"
@@ -72,8 +71,9 @@ bool CMPIOSElementCapabilities::setKeyedObjectPath(const CMPIObjectPath* objectP
     std::string name;
     std::string expectedName;
     if (!Utilities::getKeyProperty(end, "Name", name) ||
-        !Utilities::getKeyProperty(expected, "Name", expectedName) || name != expectedName)
+        !Utilities::getKeyProperty(expected, "Name", expectedName) || name != expectedName) {
         return false;
+    }
     operatingSystem.setObjectPath(end);
     return true;
 }
@@ -118,8 +118,9 @@ CMPIObjectPath* CMPIOSElementCapabilities::getAssociatorNames() {
 CMPIInstance* CMPIOSElementCapabilities::getAssociator(const char** properties) {
     log.entering(ParameterList(" properties=", properties));
     if (requestedClassId == operatingSystemId) return capabilities.getCMPIInstance(properties);
-    if (requestedClassId == operatingSystemCapabilitiesId)
+    if (requestedClassId == operatingSystemCapabilitiesId) {
         return operatingSystem.getCMPIInstance(properties);
+    }
     return nullptr;
 }
 
@@ -166,10 +167,11 @@ CMPIOSElementCapabilities& CMPIOSElementCapabilities::operator++() {
             hasCurrent = capabilities;
             break;
         case elementCapabilitiesId:
-            if (singleInstance)
+            if (singleInstance) {
                 hasCurrent = false;
-            else
+            } else {
                 advancePair();
+            }
             break;
     }
     log.exiting();

@@ -1,6 +1,5 @@
 // What KORVA_InstalledOS has of its own: names, roles, and the question for "PrimaryOS", which is
 // asked for the day when it can be answered.
-
 #include "CMPIInstalledOS.h"
 
 #include "ClassIds.h"
@@ -27,8 +26,9 @@ const AssociationTraits CMPIInstalledOS::traits = {
     },
     [](CMPIInstance* instance) {
         bool primary;
-        if (InstalledOS().isPrimaryOS(primary))
+        if (InstalledOS().isPrimaryOS(primary)) {
             VA::ProviderUtilities::setProperty(instance, "PrimaryOS", primary);
+        }
     },
     log,
 };

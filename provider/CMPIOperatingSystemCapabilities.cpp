@@ -1,6 +1,5 @@
 // What KORVA_OperatingSystemCapabilities publishes: keys and properties as tables, so that a reader
 // can hold them against the class in the schema.
-
 #include "CMPIOperatingSystemCapabilities.h"
 
 #include "ElementAdapter-inl.h"

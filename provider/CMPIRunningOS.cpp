@@ -1,5 +1,4 @@
 // What KORVA_RunningOS has of its own: names and roles.
-
 #include "CMPIRunningOS.h"
 
 #include "ClassIds.h"

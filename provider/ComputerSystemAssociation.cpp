@@ -1,6 +1,5 @@
 // KORVA_InstalledOS and KORVA_RunningOS differ in names and values only: what they do is here,
 // once, and their units hold the values. Records bear the file of the unit whose values are in use.
-
 #include "ComputerSystemAssociation.h"
 
 #include "AssociationPaths.h"
@@ -27,13 +26,14 @@ ComputerSystemAssociation::ComputerSystemAssociation(const AssociationTraits& _t
     requestedClassId = Utilities::getClassId(objectPath);
     traits.log.variable("requestedClassId", requestedClassId,
                         SourceLocation::named(traits.constructor));
-    if (requestedClassId == operatingSystemId)
+    if (requestedClassId == operatingSystemId) {
         computerSystem.setObjectPath(locateComputerSystem(objectPath));
-    else if (requestedClassId == traits.classId)
+    } else if (requestedClassId == traits.classId) {
         computerSystem.setObjectPath(
             Utilities::createObjectPath(broker, "KORVA_ComputerSystem", nameSpace));
-    else if (requestedClassId == computerSystemId)
+    } else if (requestedClassId == computerSystemId) {
         operatingSystem.setObjectPath(locateOperatingSystem(objectPath));
+    }
     traits.log.exiting(parameters, SourceLocation::named(traits.constructor));
 }
 
@@ -44,12 +44,13 @@ ComputerSystemAssociation::~ComputerSystemAssociation() noexcept(false) {
 ComputerSystemAssociation::operator bool() {
     traits.log.entering();
     bool current = false;
-    if (requestedClassId == operatingSystemId)
+    if (requestedClassId == operatingSystemId) {
         current = computerSystem;
-    else if (requestedClassId == traits.classId)
+    } else if (requestedClassId == traits.classId) {
         current = operatingSystem && computerSystem;
-    else if (requestedClassId == computerSystemId)
+    } else if (requestedClassId == computerSystemId) {
         current = operatingSystem;
+    }
     traits.log.exiting();
     return current;
 }
@@ -60,10 +61,12 @@ bool ComputerSystemAssociation::enumerates() const {
 
 ComputerSystemAssociation& ComputerSystemAssociation::operator++() {
     traits.log.entering();
-    if (requestedClassId == computerSystemId || requestedClassId == traits.classId)
+    if (requestedClassId == computerSystemId || requestedClassId == traits.classId) {
         ++operatingSystem;
-    if (requestedClassId == operatingSystemId || requestedClassId == traits.classId)
+    }
+    if (requestedClassId == operatingSystemId || requestedClassId == traits.classId) {
         ++computerSystem;
+    }
     traits.log.exiting();
     return *this;
 }
@@ -76,9 +79,11 @@ CMPIObjectPath* ComputerSystemAssociation::pathOf(End end) {
 CMPIObjectPath* ComputerSystemAssociation::getObjectPath() {
     traits.log.entering();
     CMPIObjectPath* path = Utilities::createObjectPath(broker, traits.className, nameSpace);
-    if (path != nullptr)
-        for (const Role& role : traits.roles)
+    if (path != nullptr) {
+        for (const Role& role : traits.roles) {
             Utilities::setKeyProperty(path, role.name, pathOf(role.end));
+        }
+    }
     traits.log.exiting();
     return path;
 }
@@ -109,10 +114,12 @@ CMPIInstance* ComputerSystemAssociation::getAssociator(const char** properties) 
     const ParameterList parameters(" properties=", properties);
     traits.log.entering(parameters);
     CMPIInstance* instance = nullptr;
-    if (requestedClassId == computerSystemId)
+    if (requestedClassId == computerSystemId) {
         instance = operatingSystem.getCMPIInstance(properties);
-    if (requestedClassId == operatingSystemId)
+    }
+    if (requestedClassId == operatingSystemId) {
         instance = computerSystem.getCMPIInstance(properties);
+    }
     traits.log.exiting(parameters);
     return instance;
 }

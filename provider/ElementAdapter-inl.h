@@ -62,9 +62,11 @@ CMPIObjectPath* ElementAdapter<Element>::getObjectPath() {
         VA::ProviderUtilities::createObjectPath(broker, traits.className, nameSpace);
     if (path != nullptr) {
         std::string value;
-        for (const Key<Element>& key : traits.keys)
-            if ((element.*key.getter)(value))
+        for (const Key<Element>& key : traits.keys) {
+            if ((element.*key.getter)(value)) {
                 VA::ProviderUtilities::setKeyProperty(path, key.name, value);
+            }
+        }
     }
     traits.log.exiting();
     return path;
@@ -96,10 +98,11 @@ void ElementAdapter<Element>::publish(const Property<Element>& property,
     Value& value = std::get<Value>(values);
     if (!(element.*getter)(value)) return;
     if constexpr (std::is_same_v<Value, std::string>) {
-        if (property.form == TextForm::dateTime)
+        if (property.form == TextForm::dateTime) {
             VA::ProviderUtilities::setProperty(broker, instance, property.name, value, true);
-        else
+        } else {
             VA::ProviderUtilities::setProperty(instance, property.name, value);
+        }
     } else if constexpr (std::is_class_v<Value>) {
         VA::ProviderUtilities::setProperty(broker, instance, property.name, value);
     } else {

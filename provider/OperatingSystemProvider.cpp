@@ -1,7 +1,6 @@
 // The face that the library shows to object managers: two factories, two function tables, and the
 // handlers behind them. A handler decides nothing itself: it names a dispatch table, and serve()
 // does what is common to all requests, their markers and their exceptions.
-
 #include <cmpi/cmpidt.h>
 #include <cmpi/cmpift.h>
 

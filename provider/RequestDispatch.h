@@ -102,8 +102,9 @@ constexpr DispatchRow associatorDispatch[] = {
 
 /// Null for a class that is not served.
 inline Walk findWalk(Dispatch dispatch, unsigned short classId) {
-    for (const DispatchRow& row : dispatch)
+    for (const DispatchRow& row : dispatch) {
         if (row.classId == classId) return row.walk;
+    }
     return nullptr;
 }
 

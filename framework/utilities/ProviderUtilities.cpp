@@ -146,10 +146,11 @@ void setKeys(CMPIInstance* instance, const CMPIObjectPath* path) {
     CMPIData key = {};
     for (unsigned int index = 0; index < count; ++index) {
         if (!readKeyAt(path, index, name, key)) continue;
-        if (key.type == CMPI_chars)
+        if (key.type == CMPI_chars) {
             setCharacters(instance, name, key.value.chars);
-        else
+        } else {
             set(instance, name, key.value, key.type);
+        }
     }
 }
 
@@ -169,8 +170,9 @@ unsigned short ProviderUtilities::getClassId(const CMPIObjectPath* path) {
 
 unsigned short ProviderUtilities::getClassId(const char* className) {
     if (className == nullptr) return unknownClass;
-    for (const ClassId& entry : catalogue)
+    for (const ClassId& entry : catalogue) {
         if (base::equalsIgnoreCase(entry.className, className)) return entry.id;
+    }
     return unknownClass;
 }
 
@@ -299,8 +301,9 @@ void ProviderUtilities::setProperty(const CMPIBroker* broker, CMPIInstance* inst
     if (broker == nullptr || instance == nullptr || !isCimDateTime(text)) return;
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     CMPIDateTime* moment = broker->eft->newDateTimeFromChars(broker, text.c_str(), &status);
-    if (moment != nullptr && status.rc == CMPI_RC_OK)
+    if (moment != nullptr && status.rc == CMPI_RC_OK) {
         set(instance, name, &CMPIValue::dateTime, moment, CMPI_dateTime);
+    }
 }
 
 void ProviderUtilities::transformObjectPathToMoniker(const CMPIObjectPath* path, Moniker& moniker) {
@@ -308,8 +311,9 @@ void ProviderUtilities::transformObjectPathToMoniker(const CMPIObjectPath* path,
     const char* name = nullptr;
     CMPIData key = {};
     std::string value;
-    for (unsigned int index = 0; index < count; ++index)
+    for (unsigned int index = 0; index < count; ++index) {
         if (readKeyAt(path, index, name, key) && keyText(key, value)) moniker.addKey(name, value);
+    }
 }
 
 void ProviderUtilities::transformMonikerToObjectPath(Moniker& moniker, CMPIObjectPath** path) {

@@ -1,6 +1,5 @@
 // Operating system and capabilities know each other by name alone; the direction decides the key
 // that holds it.
-
 #include "ElementCapabilities.h"
 
 #include "KeyMapping.h"

@@ -1,5 +1,4 @@
 // The mapping itself is shared with RunningOS; this one writes records of it.
-
 #include "InstalledOS.h"
 
 #include "KeyMapping.h"

@@ -1,6 +1,5 @@
 // Far ends are named by a single key, since the near end knows no other: object managers and the
 // adapters take it as a filter.
-
 #include "KeyMapping.h"
 
 #include <algorithm>

@@ -1,6 +1,5 @@
 // What the framework reports of an operating system, turned into the values that CIM has for it.
 // Some conversions look wrong and are not: clients know them as they are.
-
 #include "OperatingSystem.h"
 
 #include <strings.h>
@@ -137,14 +136,15 @@ bool OperatingSystem::getOSType(unsigned short& value) {
     if (!instrumentation.getProperty(OSType, raw)) return false;
     // The CIM value map is ahead of the framework's numbers by one, from 65 on by two, and names
     // nothing above 68.
-    if (raw == 0)
+    if (raw == 0) {
         value = 0;  // Unknown
-    else if (raw <= 64)
+    } else if (raw <= 64) {
         value = static_cast<unsigned short>(raw + 1);
-    else if (raw <= 68)
+    } else if (raw <= 68) {
         value = static_cast<unsigned short>(raw + 2);
-    else
+    } else {
         value = 1;  // Other
+    }
     return true;
 }
 
@@ -171,8 +171,9 @@ bool OperatingSystem::getDateTime(Properties id, std::string& value) {
     dateTimeBuffer = {};
     if (std::snprintf(dateTimeBuffer.data(), dateTimeBuffer.size(),
                       "%4u%02u%02u%02u%02u%02u.%06u%1c%03u", year, month, day, hour, minute, second,
-                      0U, sign, minutes) == 0)
+                      0U, sign, minutes) == 0) {
         return false;
+    }
     value = dateTimeBuffer.data();
     return true;
 }

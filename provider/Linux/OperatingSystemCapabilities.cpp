@@ -1,5 +1,4 @@
 // Each operating system has capabilities of its name; what they say is the same for all.
-
 #include "OperatingSystemCapabilities.h"
 
 #include <strings.h>

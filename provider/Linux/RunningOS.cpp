@@ -1,5 +1,4 @@
 // The mapping of InstalledOS without its records, which this class never had.
-
 #include "RunningOS.h"
 
 #include "KeyMapping.h"
