@@ -1,4 +1,4 @@
-// A file that somebody wrote by hand at three in the morning: each error is told with its line and
+// A file that somebody wrote by hand at three in the morning: each error is given with its line and
 // with what would have been right, and none of it is guessed at, because a log that is half
 // configured is found out when it is needed.
 #include "Configuration.h"

@@ -55,7 +55,7 @@ struct ParsedConfiguration {
     std::vector<ConfigurationError> errors;
 };
 
-/// Most bytes that a configuration may have, and most errors that are told of one.
+/// Most bytes that a configuration may have, and most errors that are reported of one.
 constexpr std::size_t configurationSizeLimit = 64 * 1024;
 constexpr std::size_t configurationErrorLimit = 10;
 

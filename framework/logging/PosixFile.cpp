@@ -13,7 +13,7 @@ namespace ZBLog {
 
 namespace {
 
-/// The same file under a number that is none of the standard streams'; errno tells why not.
+/// The same file under a number above those of the standard streams; errno says why not.
 base::FileDescriptor beyondStandardStreams(base::FileDescriptor opened) {
     if (!opened.isOpen() || opened.number() > STDERR_FILENO) return opened;
     return base::FileDescriptor(::fcntl(opened.number(), F_DUPFD_CLOEXEC, STDERR_FILENO + 1));

@@ -49,7 +49,7 @@ class LineSink : public Sink {
     void write(const Record& record) noexcept final;
 
   protected:
-    /// `name` is what the system's log is told.
+    /// `name` is the one that the system's log shows.
     LineSink(std::string name, Environment& environment);
 
     /// A descriptor, or the error that keeps it from being there.
@@ -78,7 +78,7 @@ class LineSink : public Sink {
     Environment& environment_;
     std::timed_mutex mutex_;
     bool torn_ = false;                      // the output ends in an unfinished line
-    std::atomic<unsigned long> dropped_{0};  // since the last line that told of them
+    std::atomic<unsigned long> dropped_{0};  // since the last line that reported them
     std::atomic<int> reason_{0};             // why the latest of them was dropped
     std::atomic<bool> stuck_{false};         // somebody timed out, and nobody wrote since
 };

@@ -18,7 +18,7 @@ struct PublishedProperty {
 
     constexpr bool isText() const { return type == CMPI_string || type == CMPI_dateTime; }
     constexpr bool isFlag() const { return type == CMPI_boolean; }
-    constexpr const char* told() const { return hostValue == nullptr ? value : hostValue; }
+    constexpr const char* hostText() const { return hostValue == nullptr ? value : hostValue; }
 };
 
 /// In the order in which they are published: creating the instance sets the keys first. The one

@@ -185,14 +185,14 @@ SimulatedHost::Node SimulatedHost::plausibleNode() {
     Node node;
     for (const PublishedProperty& property : operatingSystemProperties) {
         if (property.id == 0) continue;
-        const std::string told = property.told();
+        const std::string text = property.hostText();
         Value& value = node.properties[static_cast<Properties>(property.id)];
         if (property.isText())
-            value = told;
+            value = text;
         else if (property.isFlag())
-            value = told == "true";
+            value = text == "true";
         else
-            value = static_cast<unsigned int>(std::stoul(told));
+            value = static_cast<unsigned int>(std::stoul(text));
     }
     node.readOnly = {{NodeLexicon::Name, true}};
     return node;
