@@ -38,10 +38,6 @@ std::uintmax_t mappedSize(const fs::path& library) {
 
 class LibraryFile : public testing::Test {
   protected:
-    std::string file(const std::string& content) {
-        std::ofstream(folder_ / "x.so", std::ios::binary) << content;
-        return (folder_ / "x.so").string();
-    }
     static ProgramRun load(const std::string& library) {
         return cmpihost({"--provider", library, "ei", "X"});
     }
@@ -49,18 +45,6 @@ class LibraryFile : public testing::Test {
     const TemporaryDirectory directory_;
     const fs::path folder_ = directory_.path();
 };
-
-TEST_F(LibraryFile, ThatIsNoProviderExitsWithThree) {
-    const std::pair<std::string, const char*> rows[] = {
-        {(folder_ / "missing.so").string(), "missing.so: No such file or directory"},
-        {file("hello"), "x.so: not a shared library"},
-        {KORVA_FACTORYLESS, "OperatingSystemProvider_Create_InstanceMI"}};
-    for (const auto& [library, complaint] : rows) {
-        const ProgramRun run = load(library);
-        EXPECT_EQ(run.status, 3) << library;
-        EXPECT_THAT(run.err, HasSubstr(complaint));
-    }
-}
 
 TEST_F(LibraryFile, ThatIsANamedPipeExitsWithThree) {
     const std::string pipe = (folder_ / "pipe\x1b[31m").string();
@@ -97,21 +81,6 @@ TEST_F(LibraryFile, NamedLikeASchemaFileButAPipeExitsWithTwo) {
     EXPECT_EQ(run.status, 2);
     EXPECT_EQ(run.err, "cmpihost: the schema file " + (folder_ / "x.mof").string() +
                            " is not a regular file\n");
-}
-
-TEST_F(LibraryFile, OfTheOtherWordSizeExitsWithThreeAndSaysSo) {
-    std::string header(
-        "\x7f"
-        "ELF");
-    header += sizeof(void*) == 8 ? '\1' : '\2';
-    header += "\1\1";
-    header.resize(16);
-    header += std::string("\3\0\3\0", 4);
-    header.resize(64);
-    const ProgramRun run = load(file(header));
-    EXPECT_EQ(run.status, 3);
-    EXPECT_THAT(run.err, HasSubstr(sizeof(void*) == 8 ? "a 32-bit library, this host is 64-bit"
-                                                      : "a 64-bit library, this host is 32-bit"));
 }
 
 TEST_F(LibraryFile, WithoutFolderIsTakenFromTheCurrentOne) {

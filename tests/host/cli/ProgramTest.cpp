@@ -109,7 +109,11 @@ TEST(Program, PrintsWhatTheShippedLibrariesAnswer) {
     const std::string runningOS = "KORVA_RunningOS";
     const std::string wrong = "KORVA_OperatingSystem.Name=\"x\"";
     const std::vector<Words> runs = {
-        // Every class, and every path that is named.
+        // Every property in every form, every class, and every path that is named.
+        {"ei", "KORVA_OperatingSystem"},
+        {"--format", "mof", "ei", "KORVA_OperatingSystem"},
+        {"--format", "json", "ei", "KORVA_OperatingSystem"},
+        {"tree"},
         {"ein", "KORVA_OperatingSystem"},
         {"ein", "KORVA_OperatingSystemCapabilities"},
         {"ein", "KORVA_InstalledOS"},
@@ -200,13 +204,6 @@ TEST(Program, TellsHowTheLibrariesCleanedUp) {
     const ProgramRun throwing = cmpihost(request, {"STAND_IN_CLEANUP=throws"});
     EXPECT_EQ(throwing.status, 0);
     EXPECT_THAT(throwing.err, StartsWith("caught: an exception left cleanup\n"));
-}
-
-TEST(Program, PrintsHelpOnTheStandardOutput) {
-    const ProgramRun help = cmpihost({"--help"});
-    EXPECT_EQ(help.status, 0);
-    EXPECT_THAT(help.out, HasSubstr("Usage: cmpihost [OPTIONS] OPERATION ARGUMENT..."));
-    EXPECT_EQ(help.err, "");
 }
 
 TEST(Program, SaysThatItCannotWrite) {

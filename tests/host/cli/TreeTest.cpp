@@ -59,17 +59,6 @@ std::string drawn(const FakeHost& host) {
     return stream.str();
 }
 
-TEST(Tree, ShowsWhatIsInstalledAndRunningOnTheComputer) {
-    EXPECT_EQ(drawn(FakeHost()), R"(vm (KORVA_ComputerSystem)
-├── KORVA_InstalledOS
-│   └── Linux 12 (KORVA_OperatingSystem): installed (not known)
-│       └── KORVA_OSElementCapabilities
-│           └── Linux (KORVA_OperatingSystemCapabilities): name fixed, shutdown of the host: No effect
-└── KORVA_RunningOS
-    └── Linux 12 (KORVA_OperatingSystem): Enabled, health OK, up since (not known)
-)");
-}
-
 TEST(Tree, NamesWhatItKnowsAndNumbersWhatItCannotName) {
     FakeHost host;
     host.system = {{"Name", "Linux"},
