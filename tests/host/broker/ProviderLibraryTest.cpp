@@ -10,9 +10,7 @@
 #include <elf.h>
 #include <unistd.h>
 
-#include <atomic>
 #include <fstream>
-#include <thread>
 
 namespace cmpihost {
 namespace {
@@ -372,21 +370,6 @@ TEST_F(Invocation, AMissingInterfaceOrSlotIsNotSupported) {
     outcome = invoke({nullptr, &mi}, broker, request(Operation::ReferenceNames));
     EXPECT_EQ(outcome.rc, CMPI_RC_ERR_NOT_SUPPORTED);
     EXPECT_THAT(outcome.violations, ElementsAre("no function for ReferenceNames"));
-}
-
-TEST_F(Invocation, RunsOnSeveralThreadsAtOnce) {
-    std::vector<std::thread> threads;
-    std::atomic<int> good{0};
-    for (int t = 0; t < 4; ++t) {
-        threads.emplace_back([&] {
-            for (int round = 0; round < 50; ++round) {
-                if (run(request(Operation::EnumerateInstances)).instances.size() == 2) ++good;
-            }
-        });
-    }
-    for (std::thread& thread : threads) thread.join();
-    EXPECT_EQ(good, 200);
-    EXPECT_THAT(broker.violations(), IsEmpty());
 }
 
 TEST(Operations, HaveTheNamesOfTheirKind) {

@@ -90,14 +90,6 @@ TEST(PathParser, TakesAPathWhereTheClassDeclaresAReference) {
     EXPECT_EQ(reference.key("Number")->unsignedInteger(), 3U);
 }
 
-TEST(PathParser, TakesReferencesWithinReferences) {
-    const ObjectPathValue path =
-        parsed(R"(Link.Next="root/x:Link.Next=\"Link.From=\\\"root/y:Thing.Number=1\\\"\"")");
-    const ObjectPathValue& inner = path.keys.at(0).value.reference().key("Next")->reference();
-    EXPECT_EQ(inner.nameSpace, "root/x");
-    EXPECT_EQ(inner.key("From")->reference().nameSpace, "root/y");
-}
-
 TEST(PathParser, SaysAtWhichByteATextIsNoPath) {
     const char* const value =
         ": a text in quotes, an integer, TRUE or FALSE (a shell keeps the quotes when the path "

@@ -233,11 +233,6 @@ TEST_F(Printers, ShowNothingAsNothing) {
     EXPECT_EQ(printed(Format::Json, std::vector<ObjectPathValue>()), "[]\n");
 }
 
-TEST_F(Printers, SeparateInstancesByALine) {
-    const InstanceValue small{{"n", "X", {}}, {{"A", Value::fromUnsigned(1, CMPI_uint8)}}};
-    EXPECT_EQ(printed(Format::Table, std::vector{small, small}), "n:X\n  A  1\n\nn:X\n  A  1\n");
-}
-
 TEST_F(Printers, GiveRealsThatAreNoNumbersAsNull) {
     const InstanceValue odd{{"n", "X", {}},
                             {{"A", Value::fromReal(std::nan(""), CMPI_real64)},

@@ -38,23 +38,6 @@ TEST(MofParser, TakesKeywordsInAnyCase) {
     EXPECT_EQ(read.properties[2].defaultValue->items[0], Scalar(true));
 }
 
-TEST(MofParser, ReadsEveryType) {
-    const struct {
-        const char* name;
-        Type type;
-    } rows[] = {{"boolean", Type::Boolean},   {"string", Type::String}, {"char16", Type::Char16},
-                {"datetime", Type::DateTime}, {"uint8", Type::UInt8},   {"sint8", Type::SInt8},
-                {"uint16", Type::UInt16},     {"sint16", Type::SInt16}, {"uint32", Type::UInt32},
-                {"sint32", Type::SInt32},     {"uint64", Type::UInt64}, {"sint64", Type::SInt64},
-                {"real32", Type::Real32},     {"real64", Type::Real64}};
-    for (const auto& row : rows) {
-        const Class read = onlyClass(std::string("class A { ") + row.name + " P; };");
-        ASSERT_EQ(read.properties.size(), 1U);
-        EXPECT_EQ(read.properties[0].type, row.type) << row.name;
-        EXPECT_STREQ(nameOf(row.type), row.name);
-    }
-}
-
 TEST(MofParser, ReadsArraysAndTheirDefaults) {
     const Class read =
         onlyClass("class A { uint16 P[] = {1, 2}; string Q[3]; uint8 R[] = NULL; };");
