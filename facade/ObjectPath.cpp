@@ -1,7 +1,7 @@
 // Object managers differ in what they hand out: keys in any order and spelling, numbers where texts
 // are declared, paths without a namespace. Here they become canonical paths, which compare as they
 // are. ProviderUtilities.cpp reads paths too, but leaves out what a broker fails to give: here the
-// request ends then, since a key that is missing without a word would name another instance.
+// request ends then, since a path that silently lacks a key would name another instance.
 #include "ObjectPath.h"
 
 #include <cmpi/cmpift.h>

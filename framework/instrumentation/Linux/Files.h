@@ -69,7 +69,7 @@ class HostFiles {
     /// left, without waiting and without reading: where that could matter, look at its state first.
     virtual std::optional<FileContent> read(const std::string& path) const;
 
-    /// The content where it is whole, else nothing.
+    /// The content if it is whole, else nullopt.
     std::optional<std::string> text(const std::string& path) const;
 
     /// Visits the names in a directory, without "." and "..", in no order; passes the state of the

@@ -20,7 +20,7 @@ bool isUserSession(std::string_view sessionFile);
 /// The sessions that systemd lists.
 struct SessionCount {
     bool listed = false;                  ///< false where run/systemd/sessions cannot be read
-    std::optional<std::uint32_t> number;  ///< nothing, too, where a file in it cannot be read
+    std::optional<std::uint32_t> number;  ///< nullopt also if a file in it cannot be read
 };
 
 /// Counts such files in run/systemd/sessions. One that has gone since it was listed does not count.
