@@ -97,6 +97,7 @@ void BrokerCore::adopt(std::unique_ptr<ObjectBase> object) {
 void BrokerCore::adoptClone(std::unique_ptr<ObjectBase> object) {
     const std::lock_guard<std::mutex> lock(cloneMutex_);
     ObjectBase* const key = object.get();
+    // Found again by address: release gets nothing else.
     clones_.emplace(key, std::move(object));
 }
 
@@ -144,6 +145,7 @@ std::vector<std::string> BrokerCore::violations(bool take) {
 CMPIrc BrokerCore::inject(FaultPlan& plan, const CallName& call) {
     const auto failure = plan.onCall(call.text());
     if (!failure) return CMPI_RC_OK;
+    // With a value the call does its work, and only the status that it reports is wrong.
     if (!failure->withValue) throw Failure{failure->rc};
     return failure->rc;
 }

@@ -56,6 +56,7 @@ UpcallAnswer ComputerSystemService::find(const OperationRequest& request) const 
     answer.rc = CMPI_RC_ERR_NOT_FOUND;
     for (const std::string& name : names_) {
         InstanceValue instance = computerSystem(request.path.nameSpace, name);
+        // All keys count, as object managers ask for an instance by its whole path.
         if (instance.path != request.path) continue;
         answer.rc = CMPI_RC_OK;
         answer.instances.push_back(std::move(instance));

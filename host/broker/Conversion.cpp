@@ -125,6 +125,7 @@ void writeText(BrokerCore& core, CMPIValue& target, const Value& value) {
 
 }  // namespace
 
+/// The two types of plain characters are ways to hand text over; what is kept is a string.
 CMPIType storedType(CMPIType type) noexcept {
     return type == CMPI_chars || type == CMPI_charsptr ? CMPIType{CMPI_string} : type;
 }

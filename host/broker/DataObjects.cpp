@@ -13,6 +13,7 @@ const char* getCharPtr(const Object<CMPIString>& string, CMPIStatus*) {
 
 using DateTime = const Object<CMPIDateTime>;
 
+/// Read from the text each time: few providers ask, and the object stays one text.
 CMPIUint64 getBinaryFormat(DateTime& dateTime, CMPIStatus* status) {
     const auto binary = parseDateTime(dateTime.body);
     if (!binary || !binary->microseconds) return failWith<CMPIUint64>(status, CMPI_RC_ERR_FAILED);
@@ -54,6 +55,7 @@ CMPIStatus setElementAt(Array& array, const CallName& call, CMPICount index, con
                             " set to a " + cimTypeName(type));
         return statusOf(CMPI_RC_ERR_TYPE_MISMATCH);
     }
+    // A value that was made of this array keeps what it had.
     if (elements.use_count() != 1) elements = std::make_shared<std::vector<Value>>(*elements);
     (*elements)[index] = std::move(read);
     return statusOf(CMPI_RC_OK);
@@ -83,6 +85,7 @@ CMPIBoolean hasNext(Enumeration& enumeration, CMPIStatus*) {
     return enumeration.body.position < enumeration.body.items.size();
 }
 
+/// All items, those that getNext has handed out included.
 CMPIArray* toArray(Enumeration& enumeration, CMPIStatus*) {
     return makeArray(enumeration.core(), enumeration.body.itemType, enumeration.body.items);
 }

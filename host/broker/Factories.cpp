@@ -12,6 +12,7 @@ namespace cmpihost {
 namespace {
 
 /// More elements than any array of a provider has; beyond it lies a mistake, not memory.
+/// A size beyond this is a mistake of the provider; to allocate it would end the process.
 constexpr CMPICount mostElements = 1u << 24;
 
 CMPIInstance* newInstance(BrokerCore& core, const CallName& call, const CMPIObjectPath* path,
@@ -99,6 +100,7 @@ CMPIBoolean classPathIsA(BrokerCore& core, const CallName& call, const CMPIObjec
     const ObjectPathValue& given = *fromHandle(path, call).body;
     const ClassRelation relation = classRelation(core.catalogue(), given.className,
                                                  required(core, className, call, "class name"));
+    // Unknown is no: the provider must not rely on what no catalogue confirms.
     return relation == ClassRelation::Same || relation == ClassRelation::Subclass;
 }
 
@@ -158,6 +160,7 @@ std::optional<ObjectFacts> asKind(const void* handle, const CallName& call) {
 /// Null, retired and foreign pointers are violations and throw Failure.
 ObjectFacts factsOf(const void* handle, const CallName& call) {
     if (handle == nullptr) refuseNull(call, "object");
+    // A handle has no tag, so each kind looks whether the table is its own.
     for (const auto look : {&asKind<CMPIString>, &asKind<CMPIObjectPath>, &asKind<CMPIInstance>,
                             &asKind<CMPIArray>, &asKind<CMPIArgs>, &asKind<CMPIContext>,
                             &asKind<CMPIDateTime>, &asKind<CMPIEnumeration>, &asKind<CMPIResult>}) {
@@ -210,6 +213,7 @@ CMPIBrokerEncFT factoryTable(bool sparse) {
     static const CMPIBrokerEncFT complete = completeFactories();
     CMPIBrokerEncFT table = complete;
     if (sparse) {
+        // As version 1 of CMPI has it, without what came later.
         table.ftVersion = 1;
         table.newCMPIError = nullptr;
         table.openMessageFile = nullptr;

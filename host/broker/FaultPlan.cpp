@@ -64,6 +64,7 @@ std::optional<FaultPlan::Failure> FaultPlan::onCall(const std::string& call) {
     ++total_;
     ++calls_[call];
 
+    // Every fault counts the call, also when another one has already made it fail.
     std::optional<Failure> answer;
     for (Planned& planned : faults_) {
         const Fault& fault = planned.fault;

@@ -19,6 +19,7 @@ class NameList {
         pointers_.push_back(nullptr);
     }
     /// Null for no list.
+    /// An empty list is not a null one: it asks for no properties, null for all.
     const char** get() noexcept { return pointers_.empty() ? nullptr : pointers_.data(); }
 
   private:
@@ -137,6 +138,7 @@ Outcome invoke(const ManagementInterfaces& interfaces, Broker& broker,
     outcome.message = messageOf(status);  // an object of the request
     scope.end();
     outcome.violations = scope.violations();
+    // Last: with the objects gone, the contents are moved out instead of copied.
     Results results = collector.take();
     outcome.doneCount = results.doneCount;
     outcome.paths = std::move(results.paths);

@@ -11,6 +11,7 @@ namespace {
 /// Messages of providers go nowhere: this host keeps no log of its own.
 CMPIStatus dropMessage(BrokerCore&, const CallName& call, int, const char*, const char* text,
                        const CMPIString* string) {
+    // Looked at all the same: a dead object would crash an object manager that prints it.
     if (text == nullptr && string != nullptr) fromHandle(string, call);
     return statusOf(CMPI_RC_OK);
 }
@@ -63,6 +64,7 @@ std::vector<std::string> messageArguments(CMPICount count, std::va_list& argumen
     if (count > 10) throw Failure{CMPI_RC_ERR_INVALID_PARAMETER};
     std::vector<std::string> result;
     for (CMPICount i = 0; i < count; ++i) {
+        // A CMPIType is narrower than int and comes widened as well.
         const auto type = static_cast<CMPIType>(va_arg(arguments, int));
         result.push_back(messageArgument(type, arguments, call));
     }

@@ -183,7 +183,7 @@ class Factory {
 
     MI* call(Broker& broker, const CMPIContext* context) const {
         CMPIStatus status = {CMPI_RC_OK, nullptr};
-        MI* const made = callGuarded(broker.cmpi(), context, status);
+        MI* const made = callFactory(broker.cmpi(), context, status);
         if (status.rc != CMPI_RC_OK) {
             throw LoadError(where_ + " answered status " + std::to_string(status.rc) +
                             messageSuffix(status));
@@ -198,7 +198,7 @@ class Factory {
     using Generic = MI* (*)(const CMPIBroker*, const CMPIContext*, const char*, CMPIStatus*);
     using Named = MI* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
 
-    MI* callGuarded(const CMPIBroker* broker, const CMPIContext* context,
+    MI* callFactory(const CMPIBroker* broker, const CMPIContext* context,
                     CMPIStatus& status) const {
         try {
             if (generic_ != nullptr) return generic_(broker, context, provider_.c_str(), &status);

@@ -37,6 +37,7 @@ namespace {
 
 using Result = const Object<CMPIResult>;
 
+/// What comes after returnDone never reaches a client, so it must not reach a test either.
 void refuseAfterDone(Result& result, const std::string& what) {
     if (result.body->doneFault.calls == 0) return;
     result.core().report(what + " after returnDone");
@@ -87,6 +88,7 @@ CMPIStatus returnData(Result& result, const CallName& call, const CMPIValue* val
 }
 
 CMPIStatus returnDone(Result& result) {
+    // Counted even when it is one too many: callers want to see how many there were.
     const bool again = result.body->doneFault.calls > 0;
     const CMPIrc rc = result.body->doneFault.onCall();
     if (again) {
@@ -106,6 +108,7 @@ std::vector<Content> taken(std::vector<std::shared_ptr<Content>>& shared) {
     std::vector<Content> result;
     result.reserve(shared.size());
     for (const auto& content : shared) {
+        // A provider that is still at work may hold the object and change it later.
         if (content.use_count() == 1) {
             result.push_back(std::move(*content));
         } else {

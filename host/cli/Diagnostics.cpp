@@ -115,19 +115,20 @@ bool isRole(const Schema& schema, const std::string& name) {
 std::string linesOnUnknownNames(const std::string& start, const OperationRequest& request,
                                 const Schema& schema) {
     std::string lines;
-    const auto tell = [&](const std::string& what, const std::string& name) {
+    const auto addLine = [&](const std::string& what, const std::string& name) {
         lines += start + what + " '" + base::escapeForTerminal(name) + "'\n";
     };
     const std::string& source = request.path.className;
     for (const auto& name : {std::optional(source), request.assocClass, request.resultClass}) {
-        if (name && !mayBeClass(schema, *name)) tell("the schema has no class", *name);
+        if (name && !mayBeClass(schema, *name)) addLine("the schema has no class", *name);
     }
     for (const auto& name : {request.role, request.resultRole}) {
-        if (name && !isRole(schema, *name)) tell("no association of the schema has a role", *name);
+        if (name && !isRole(schema, *name))
+            addLine("no association of the schema has a role", *name);
     }
     for (const KeyBinding& key : request.path.keys) {
         if (schema.find(source) != nullptr && !schema.isKey(source, key.name)) {
-            tell("the class " + schema.find(source)->name + " declares no key", key.name);
+            addLine("the class " + schema.find(source)->name + " declares no key", key.name);
         }
     }
     return lines;

@@ -24,6 +24,7 @@ std::string fileName(Library library) {
 /// are installed in, then the usual ones.
 std::vector<fs::path> cmpiFolders(const fs::path& installed) {
     std::vector<fs::path> folders = {installed};
+    // Distributions disagree about the folder, and a package may come from another one.
     for (const char* libraries : {KORVA_LIBRARY_FOLDER, "lib", "lib64", "lib32"}) {
         folders.push_back(fs::path(libraries) / "cmpi");
     }

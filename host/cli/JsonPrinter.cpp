@@ -55,6 +55,7 @@ Json valueJson(const Value& value) {
         case TypeCategory::Reference:
             return toString(value.reference());
         case TypeCategory::Instance:
+            // Without a path: what is embedded has none of its own.
             return {{"class", value.instance().path.className},
                     {"properties", propertiesJson(value.instance())}};
         case TypeCategory::Array:

@@ -54,8 +54,10 @@ std::string valueText(const Value& value) {
         case TypeCategory::DateTime:
             return mof::stringLiteral(value.text());
         case TypeCategory::Reference:
+            // MOF has aliases for references, which would need the target in the same text.
             return mof::stringLiteral(toString(value.reference()));
         case TypeCategory::Instance:
+            // An embedded instance is a string with its declaration, as the CIM qualifier has it.
             return mof::stringLiteral(instanceText(value.instance()));
         case TypeCategory::Array:
             return listText(value.elements());

@@ -134,11 +134,13 @@ InstanceValue instance(const CommandLine& commandLine, const ObjectPathValue& pa
             throw UsageError("the property '" + base::escapeForTerminal(value.name) +
                              "' stands twice");
         }
+        // A key that the path gives already stays: the path says which instance is meant.
         const bool newKey = schema.isKey(path.className, value.name) &&
                             result.path.key(value.name) == nullptr && !value.value.isNull();
         if (newKey) result.path.keys.push_back({value.name, value.value});
         result.properties.push_back(std::move(value));
     }
+    // Object managers hand providers an instance whose key properties are set.
     for (const KeyBinding& key : path.keys) {
         if (seen.insert(base::toLower(key.name)).second) {
             result.properties.push_back({key.name, key.value});

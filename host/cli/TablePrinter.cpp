@@ -33,6 +33,7 @@ std::string unsignedText(std::uint64_t number, const Hints& hints) {
         !hints.names.empty()) {
         return signedText(static_cast<std::int64_t>(number), hints);
     }
+    // Below the next unit the number is as readable as it gets.
     const bool sized = hints.kilobytes && number >= 1024;
     return withNote(std::to_string(number), sized ? humanReadableSize(number) : "");
 }

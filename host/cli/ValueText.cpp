@@ -25,6 +25,7 @@ std::string instantText(std::uint64_t seconds) {
     static_assert(sizeof(std::time_t) == 8, "an instant of any year is to be shown");
     const auto instant = static_cast<std::time_t>(seconds);
     std::tm local{};
+    // In the zone of the reader: the offset of the provider says where the host stands.
     if (localtime_r(&instant, &local) == nullptr) return {};
     const long offset = local.tm_gmtoff / 60;
     const long minutes = offset < 0 ? -offset : offset;

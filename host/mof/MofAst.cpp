@@ -82,11 +82,13 @@ bool fits(const Scalar& scalar, Type type) {
         case Type::Reference:
             return std::holds_alternative<std::string>(scalar);
         case Type::Char16: {
+            // CIM characters are UCS-2: what is beyond has no place in 16 bits.
             const auto* character = std::get_if<Character>(&scalar);
             return character != nullptr && character->code <= 0xFFFF;
         }
         case Type::Real32:
         case Type::Real64:
+            // An integer may stand where a real is due, not the other way round.
             return std::holds_alternative<double>(scalar) ||
                    std::holds_alternative<std::uint64_t>(scalar) ||
                    std::holds_alternative<std::int64_t>(scalar);
@@ -104,6 +106,7 @@ const Qualifier* findQualifier(const std::vector<Qualifier>& qualifiers, const s
 bool isSet(const std::vector<Qualifier>& qualifiers, const std::string& name) {
     const Qualifier* qualifier = findQualifier(qualifiers, name);
     if (qualifier == nullptr) return false;
+    // Boolean qualifiers are mostly given by name alone.
     if (!qualifier->value) return true;
     const auto& items = qualifier->value->items;
     return items.size() == 1 && items.front() == Scalar(true);

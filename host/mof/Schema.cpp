@@ -83,6 +83,7 @@ Schema Schema::load(const fs::path& folder) {
 void Schema::add(const mof::Document& document) {
     for (const mof::Class& added : document.classes) {
         check(added);
+        // Of the class as it is kept: value maps are found by the address of the property.
         keepValueMaps(classes_.emplace(base::toLower(added.name), added).first->second);
     }
 }
@@ -134,6 +135,7 @@ std::vector<const mof::Feature*> Schema::properties(const std::string& className
     for (const mof::Class* level = find(className); level != nullptr;
          level = find(level->superclass)) {
         for (const mof::Feature& property : level->properties) {
+            // The nearest declaration counts: an override hides the inherited one.
             if (seen.insert(base::toLower(property.name)).second) result.push_back(&property);
         }
     }

@@ -35,6 +35,7 @@ bool isIntegerType(mof::Type type) {
 }  // namespace
 
 ValueMap::Entry ValueMap::entry(const std::string& range, const std::string& name) {
+    // A bound that is missing is open: "..5", "0x8000..", "..".
     const std::size_t dots = range.find("..");
     if (dots == std::string::npos) {
         if (range.empty()) throw std::runtime_error("the ValueMap has an empty entry");
@@ -56,6 +57,7 @@ ValueMap ValueMap::of(const mof::Feature& property) {
                                  " entries and Values " + std::to_string(names.size()));
     }
     for (std::size_t index = 0; index < names.size(); ++index) {
+        // Without a ValueMap the position of a name is its number.
         const std::string range = hasRanges ? ranges[index] : std::to_string(index);
         result.entries_.push_back(entry(range, names[index]));
     }
@@ -65,6 +67,7 @@ ValueMap ValueMap::of(const mof::Feature& property) {
 const std::string* ValueMap::find(std::int64_t number) const {
     const Entry* best = nullptr;
     const auto width = [](const Entry& entry) {
+        // Unsigned, since the width of ".." does not fit a signed number.
         return static_cast<std::uint64_t>(entry.highest) - static_cast<std::uint64_t>(entry.lowest);
     };
     for (const Entry& entry : entries_) {
