@@ -1,45 +1,28 @@
-// This machine, read a second time by other means: a shell, the C library, sysinfo.
+// This machine, read a second time by other means: a shell and its tools.
 #include <dlfcn.h>
-#include <glob.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
-#include <sys/sysinfo.h>
-#include <sys/utsname.h>
 #include <unistd.h>
 
-#include <cstdio>
 #include <cstdlib>
 #include <ctime>
-#include <fstream>
-#include <functional>
-#include <map>
 #include <string>
+#include <vector>
 
 #include "framework/instrumentation/Linux/Systemd.h"
 #include "framework/instrumentation/LinuxHost.h"
-#include "support/Properties.h"
+#include "support/ProgramRun.h"
 
 namespace {
 
 using namespace VA::NodeLexicon;
 
-// What a number, or the instant of a date, has to be, give or take the tolerance; nothing where the
-// property is to be absent.
-struct Expected {
-    std::optional<double> value;
-    double tolerance = 0;
-};
-
 std::string shell(const std::string& command) {
-    std::string output;
-    FILE* pipe = ::popen(command.c_str(), "r");
-    for (int c = std::fgetc(pipe); c != EOF; c = std::fgetc(pipe)) output += static_cast<char>(c);
-    ::pclose(pipe);
+    std::string output = runProgram("/bin/sh", {"-c", command}).out;
     while (!output.empty() && output.back() == '\n') output.pop_back();
     return output;
 }
 
-// The first number that a shell command prints; nothing where it prints none.
+// The number that a shell command prints; nothing where it prints none.
 std::optional<double> shellNumber(const std::string& command) {
     const std::string output = shell(command);
     char* end = nullptr;
@@ -47,126 +30,75 @@ std::optional<double> shellNumber(const std::string& command) {
     return end == output.c_str() ? std::nullopt : std::optional<double>(number);
 }
 
-std::optional<double> meminfoKiB(const std::string& row) {
-    return shellNumber("awk '$1 == \"" + row + ":\" {print $2}' /proc/meminfo 2>/dev/null");
+// Prints the sum of such rows of meminfo.
+std::string meminfo(const std::string& rows) {
+    return "awk '/^(" + rows + "):/ {sum += $2} END {if (NR) printf \"%.0f\", sum}' /proc/meminfo";
 }
 
-// A size that sysinfo tells, in kilobytes.
-double sysinfoKiB(unsigned long size(const struct sysinfo&)) {
-    struct sysinfo info {};
-    EXPECT_EQ(::sysinfo(&info), 0);
-    return static_cast<double>(size(info)) * info.mem_unit / 1024.0;
+// The seconds of a date that a walk tells, in the zone as it stood when the text was made.
+std::optional<double> instantOf(const std::optional<std::string>& text) {
+    if (!text) return std::nullopt;
+    EXPECT_EQ(text->size(), 19u) << *text;
+    const auto utc = shellNumber("date +%s -ud \"$(echo '" + *text + "' | sed 's/-/ /3')\"");
+    EXPECT_TRUE(utc) << *text;
+    const long west = ::timezone;
+    return utc.value_or(0) - static_cast<double>(west / 60 * 60);
 }
 
-double ram() {
-    return sysinfoKiB([](const struct sysinfo& info) { return info.totalram; });
-}
+constexpr const char* osRelease =
+    "for f in /etc/os-release /usr/lib/os-release; do if [ -e $f ]; then . $f; break; fi; done; ";
 
-double swap() {
-    return sysinfoKiB([](const struct sysinfo& info) { return info.totalswap; });
-}
+// In seconds, or parts of them.
+constexpr const char* boot = "awk -v now=$(date +%s) '{printf \"%.2f\", now - $1}' /proc/uptime";
 
-Expected totalSwap() {
-    return {swap(), 1.0};
-}
+constexpr const char* installation =
+    "now=$(date +%s); up=$(sed 's/[. ].*//' /proc/uptime); "
+    "for t in $(stat -c %W /) $(stat -Lc %Z /var/log/installer) $(stat -Lc %Z /etc/machine-id); do "
+    "if [ $t -ge 694224000 ] && [ $t -le $((now - up)) ]; then echo $t; break; fi; done";
 
-double instantOf(const std::string& text) {
-    struct tm parts {};
-    char end = 0;
-    EXPECT_EQ(std::sscanf(text.c_str(), "%4d-%2d-%2d-%2d:%2d:%2d%c", &parts.tm_year, &parts.tm_mon,
-                          &parts.tm_mday, &parts.tm_hour, &parts.tm_min, &parts.tm_sec, &end),
-              6)
-        << text;
-    parts.tm_year -= 1900;
-    parts.tm_mon -= 1;
-    const long west = ::timezone;  // as it stood when the text was made
-    return static_cast<double>(::timegm(&parts)) - static_cast<double>(west / 60 * 60);
-}
+constexpr const char* users =
+    "if cd /run/systemd/sessions; then "
+    "for s in *; do if [ -f \"$s\" ] && grep -qxE 'CLASS=user(-early)?(-light)?' \"$s\" && "
+    "! grep -qx STATE=closing \"$s\"; then echo x; fi; done | wc -l; "
+    "elif [ -r /run/utmp ] || [ -r /var/run/utmp ]; then who | wc -l; fi";
 
-double bootInstant() {
-    double up = 0;
-    std::ifstream("/proc/uptime") >> up;
-    return static_cast<double>(std::time(nullptr)) - up;
-}
+enum class Kind { Text, Date, Number, Flag };
 
-Expected installDate() {
-    for (const char* command : {"stat -c %W /", "stat -L -c %Z /var/log/installer 2>/dev/null",
-                                "stat -L -c %Z /etc/machine-id 2>/dev/null"}) {
-        const auto found = shellNumber(command);
-        if (found && *found > 694224000 - 1 && *found < bootInstant() + 1 &&
-            *found <= static_cast<double>(std::time(nullptr)))
-            return {found, 1.0};
-    }
-    return {};
-}
-
-Expected processes() {
-    glob_t found{};
-    EXPECT_EQ(::glob("/proc/[0-9]*", GLOB_ONLYDIR, nullptr, &found), 0);
-    const auto count = static_cast<double>(found.gl_pathc);
-    ::globfree(&found);
-    return {count, 100.0};  // others come and go meanwhile
-}
-
-Expected users() {
-    if (::access("/run/systemd/sessions", R_OK | X_OK) == 0) {
-        return {
-            shellNumber("cd /run/systemd/sessions; for s in *; do "
-                        "if [ -f \"$s\" ] && grep -qxE 'CLASS=user(-early)?(-light)?' \"$s\" && "
-                        "! grep -qx STATE=closing \"$s\"; then echo x; fi; done | wc -l")};
-    }
-    if (::access("/run/utmp", R_OK) == 0 || ::access("/var/run/utmp", R_OK) == 0)
-        return {shellNumber("who | wc -l"), 10.0};
-    return {};
-}
-
-const std::map<unsigned int, std::function<Expected()>> dates{
-    {InstallDate, installDate},
-    {LastBootUpTime,
-     [] {
-         return Expected{bootInstant(), 2.0};
-     }},
+// What a command prints of a property, give or take the tolerance; nothing where it is absent.
+struct Reading {
+    unsigned int id;
+    Kind kind;
+    std::string command;
+    double tolerance = 0;
 };
 
-const std::map<unsigned int, std::function<Expected()>> numbers{
-    {OSType, [] { return Expected{35}; }},
-    {NumberOfProcesses, processes},
-    {NumberOfUsers, users},
-    {NumberOfLicensedUsers, [] { return Expected{0}; }},
-    {TotalVirtualMemorySize,
-     [] {
-         return Expected{ram() + swap(), 8.0};
-     }},
-    {FreeVirtualMemory,
-     [] {
-         return Expected{meminfoKiB("MemAvailable").value() + meminfoKiB("SwapFree").value_or(0),
-                         ram() / 4};
-     }},
-    {FreePhysicalMemory,
-     [] {
-         return Expected{meminfoKiB("MemAvailable"), ram() / 4};
-     }},
-    {TotalVisibleMemorySize,
-     [] {
-         return Expected{ram(), 8.0};
-     }},
-    {TotalSwapSpaceSize, totalSwap},
-    {SizeStoredInPagingFiles, totalSwap},
-    {FreeSpaceInPagingFiles,
-     [] {
-         return Expected{sysinfoKiB([](const struct sysinfo& info) { return info.freeswap; }),
-                         swap() / 4};
-     }},
-};
-
-const std::map<unsigned int, bool> flags{{Distributed, false}};
-
-// The commands of the properties that a shell can read, by number.
-std::map<unsigned int, std::string> shellCommands(bool ofTexts) {
-    std::map<unsigned int, std::string> commands;
-    for (const PublishedProperty& each : operatingSystemProperties)
-        if (each.command != nullptr && each.isText() == ofTexts) commands[each.id] = each.command;
-    return commands;
+std::vector<Reading> readings() {
+    const double ram = shellNumber(meminfo("MemTotal")).value_or(0);
+    const double swap = shellNumber(meminfo("SwapTotal")).value_or(0);
+    const bool hasSessions = ::access("/run/systemd/sessions", R_OK | X_OK) == 0;
+    return {
+        {Name, Kind::Text, std::string(osRelease) + "echo \"${NAME:-$(uname -s)}\""},
+        {Version, Kind::Text,
+         std::string(osRelease) + "echo \"${VERSION_ID:-${BUILD_ID:-$(uname -r)}}\""},
+        {InstallDate, Kind::Date, installation, 1},
+        {LastBootUpTime, Kind::Date, boot, 2},
+        {OSType, Kind::Number, "echo 35"},
+        {MaxNumberOfProcesses, Kind::Number,
+         "cd /proc/sys/kernel; cat pid_max threads-max | sort -n | head -1"},
+        {MaxProcessMemorySize, Kind::Number, "ulimit -S -v | sed s/unlimited/0/"},
+        // others come and go meanwhile
+        {NumberOfProcesses, Kind::Number, "ls -d /proc/[0-9]* | wc -l", 100},
+        {NumberOfUsers, Kind::Number, users, hasSessions ? 0.0 : 10.0},
+        {NumberOfLicensedUsers, Kind::Number, "echo 0"},
+        {TotalVirtualMemorySize, Kind::Number, meminfo("MemTotal|SwapTotal"), 8},
+        {FreeVirtualMemory, Kind::Number, meminfo("MemAvailable|SwapFree"), ram / 4},
+        {FreePhysicalMemory, Kind::Number, meminfo("MemAvailable"), ram / 4},
+        {TotalVisibleMemorySize, Kind::Number, meminfo("MemTotal"), 8},
+        {TotalSwapSpaceSize, Kind::Number, meminfo("SwapTotal"), 1},
+        {SizeStoredInPagingFiles, Kind::Number, meminfo("SwapTotal"), 1},
+        {FreeSpaceInPagingFiles, Kind::Number, meminfo("SwapFree"), swap / 4},
+        {Distributed, Kind::Flag, "echo 0"},
+    };
 }
 
 class RealMachine : public testing::Test {
@@ -180,10 +112,11 @@ class RealMachine : public testing::Test {
         return found ? std::optional<T>(value) : std::nullopt;
     }
 
-    static void expectNear(std::optional<double> actual, const Expected& expected) {
-        ASSERT_EQ(actual.has_value(), expected.value.has_value());
+    static void expectNear(std::optional<double> actual, const Reading& expected) {
+        const auto value = shellNumber(expected.command);
+        ASSERT_EQ(actual.has_value(), value.has_value());
         if (actual) {
-            EXPECT_NEAR(*actual, std::min(*expected.value, 4294967295.0), expected.tolerance);
+            EXPECT_NEAR(*actual, std::min(*value, 4294967295.0), expected.tolerance);
         }
     }
 
@@ -192,37 +125,36 @@ class RealMachine : public testing::Test {
 };
 
 TEST_F(RealMachine, EveryPropertyAgreesWithAnIndependentReading) {
-    const auto textCommands = shellCommands(true);
-    const auto numberCommands = shellCommands(false);
-    for (unsigned int id = 0; id < 1000; ++id) {
-        SCOPED_TRACE(id);
-        const auto text = read<std::string>(id);
-        const auto number = read<unsigned int>(id);
-        if (textCommands.count(id) != 0) {
-            EXPECT_EQ(text, shell(textCommands.at(id)));
-        } else if (dates.count(id) != 0) {
-            expectNear(text ? std::optional(instantOf(*text)) : std::nullopt, dates.at(id)());
+    std::vector<bool> isRead(1000);
+    for (const Reading& expected : readings()) {
+        SCOPED_TRACE(expected.id);
+        isRead[expected.id] = true;
+        const auto text = read<std::string>(expected.id);
+        const auto number = read<unsigned int>(expected.id);
+        const auto flag = read<bool>(expected.id);
+        EXPECT_TRUE(!text || expected.kind == Kind::Text || expected.kind == Kind::Date);
+        EXPECT_TRUE(!number || expected.kind == Kind::Number);
+        EXPECT_TRUE(!flag || expected.kind == Kind::Flag);
+        if (expected.kind == Kind::Text) {
+            EXPECT_EQ(text, shell(expected.command));
+        } else if (expected.kind == Kind::Date) {
+            expectNear(instantOf(text), expected);
         } else {
-            EXPECT_FALSE(text) << "nothing here checks " << *text;
+            std::optional<double> value = number;
+            if (flag) value = *flag;
+            expectNear(value, expected);
         }
-        const auto actual = number ? std::optional<double>(*number) : std::nullopt;
-        if (numberCommands.count(id) != 0) {
-            expectNear(actual, {shellNumber(numberCommands.at(id))});
-        } else if (numbers.count(id) != 0) {
-            expectNear(actual, numbers.at(id)());
-        } else {
-            EXPECT_FALSE(number) << "nothing here checks " << *number;
-        }
-        const auto flag = flags.find(id);
-        EXPECT_EQ(read<bool>(id), flag == flags.end() ? std::nullopt : std::optional(flag->second));
+    }
+    for (unsigned int id = 0; id < isRead.size(); ++id) {
+        const bool found =
+            !isRead[id] && (read<std::string>(id) || read<unsigned int>(id) || read<bool>(id));
+        EXPECT_FALSE(found) << "nothing here checks " << id;
     }
 }
 
 TEST_F(RealMachine, MemoryOfOneWalkAddsUp) {
     const auto number = [&](Properties id) {
-        unsigned int value = 0;
-        EXPECT_TRUE(cursor->readProperty(id, value)) << id;
-        return std::uint64_t{value};
+        return std::uint64_t{read<unsigned int>(id).value()};
     };
     constexpr std::uint64_t most = 4294967295;
     EXPECT_EQ(number(TotalVirtualMemorySize),
@@ -234,20 +166,16 @@ TEST_F(RealMachine, MemoryOfOneWalkAddsUp) {
 }
 
 TEST_F(RealMachine, ComputerNameIsTheHostName) {
-    char expected[256] = "";
-    ASSERT_EQ(::gethostname(expected, sizeof expected), 0);
     std::string name;
     EXPECT_TRUE(cursor->readComputerName(name));
-    EXPECT_EQ(name, expected);
+    EXPECT_EQ(name, shell("uname -n"));
 }
 
 // The code that the host's own tool gives reason for; nothing where it says something else.
-std::optional<unsigned int> statusBySystemctl() {
-    const std::map<std::string, unsigned int> codes{
-        {"running", 1},     {"initializing", 2}, {"starting", 2}, {"degraded", 21},
-        {"maintenance", 8}, {"stopping", 16},    {"offline", 12}};
-    const auto found = codes.find(shell("systemctl is-system-running 2>/dev/null"));
-    return found == codes.end() ? std::nullopt : std::optional(found->second);
+std::optional<double> statusBySystemctl() {
+    return shellNumber(
+        "case $(systemctl is-system-running) in running) echo 1;; initializing|starting) echo 2;; "
+        "degraded) echo 21;; maintenance) echo 8;; stopping) echo 16;; offline) echo 12;; esac");
 }
 
 bool canAskSystemd() {
