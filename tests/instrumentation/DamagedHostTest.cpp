@@ -4,6 +4,8 @@
 
 #include <functional>
 
+#include "framework/instrumentation/Linux/Dates.h"
+#include "framework/instrumentation/Linux/Kernel.h"
 #include "support/TestHost.h"
 
 namespace {
@@ -120,21 +122,22 @@ TEST_F(Fallbacks, ProcessesAreAbsentWhereProcListsNone) {
     EXPECT_EQ(host.number(NumberOfProcesses), std::nullopt);
 }
 
-TEST_F(Fallbacks, MemoryIsAbsentWithoutMeminfo) {
-    for (const bool removed : {false, true}) {
-        tree().write("proc/meminfo", "");
-        if (removed) tree().remove("proc/meminfo");
-        for (const Properties id : memory) EXPECT_EQ(host.number(id), std::nullopt) << id;
+TEST_F(Fallbacks, VirtualMemoryIsAbsentWhereAPartIsAndNeverWraps) {
+    using Value = std::optional<unsigned int>;
+    const std::pair<const char*, std::vector<Value>> rows[] = {
+        {"MemTotal: 1000 kB\nMemAvailable: 600 kB\n", {1000, 600, 600, 1000, 0, 0, 0}},
+        {"MemTotal: 4000 kB\nMemFree: 100 kB\n", {4000, std::nullopt, std::nullopt, 4000, 0, 0, 0}},
+        {"MemTotal: 4000 kB\nMemAvailable: 5 kB\nSwapTotal: x kB\nSwapFree: 7 kB\n",
+         {std::nullopt, 12, 5, 4000, std::nullopt, std::nullopt, 7}},
+        {"MemTotal: 6597069766656 kB\nMemAvailable: 5497558138880 kB\n"
+         "SwapTotal: 4294967294 kB\nSwapFree: 1 kB\n",
+         {~0u, ~0u, ~0u, ~0u, 4294967294, 4294967294, 1}},
+    };
+    for (const auto& [meminfo, values] : rows) {
+        tree().write("proc/meminfo", meminfo);
+        for (std::size_t i = 0; i < values.size(); ++i)
+            EXPECT_EQ(host.number(memory[i]), values[i]) << meminfo << memory[i];
     }
-}
-
-TEST_F(Fallbacks, HostWithoutSwapReportsZeroSwapAndPhysicalForVirtual) {
-    tree().write("proc/meminfo", "MemTotal: 1000 kB\nMemAvailable: 600 kB\n");
-    EXPECT_EQ(host.number(TotalSwapSpaceSize), 0u);
-    EXPECT_EQ(host.number(SizeStoredInPagingFiles), 0u);
-    EXPECT_EQ(host.number(FreeSpaceInPagingFiles), 0u);
-    EXPECT_EQ(host.number(TotalVirtualMemorySize), 1000u);
-    EXPECT_EQ(host.number(FreeVirtualMemory), 600u);
 }
 
 TEST_F(Fallbacks, StatusIsRunningWhereNoSystemdRunsAndItsOwnWhereItDoes) {
@@ -251,34 +254,27 @@ TEST(DamagedFiles, AreNoSessions) {
     }
 }
 
-// A host whose files were cut at any byte tells what was there before or nothing.
-TEST(FilesCutShort, NoPrefixOfAFileGivesAValueThatTheWholeDoesNot) {
+// A file that was cut at any byte tells what the whole does, or nothing.
+TEST(FilesCutShort, TellWhatTheWholeDoesOrNothing) {
     TestHost host;
     host.tree().writeCompleteHost();
-    const std::pair<Properties, unsigned int> whole[] = {{TotalVisibleMemorySize, 16777216},
-                                                         {FreePhysicalMemory, 8388608},
-                                                         {FreeSpaceInPagingFiles, 1048576}};
-    const std::string meminfo = host.files->text("proc/meminfo").value();
+    const auto textOf = [&](const char* path) { return host.files->text(path).value(); };
+    const std::string meminfo = textOf("proc/meminfo");
+    const auto whole = VA::Linux::parseMemoryInfo(meminfo).value();
     for (std::size_t length = 0; length < meminfo.size(); ++length) {
-        host.tree().write("proc/meminfo", meminfo.substr(0, length));
-        for (const auto& [id, expected] : whole) {
-            const auto value = host.number(id);
-            const bool noSwapYet = id == FreeSpaceInPagingFiles && value == 0u;
-            EXPECT_TRUE(!value || value == expected || noSwapYet) << length << ' ' << *value;
-        }
+        const auto info = VA::Linux::parseMemoryInfo(meminfo.substr(0, length));
+        if (!info) continue;
+        EXPECT_EQ(info->totalKiB, whole.totalKiB);
+        EXPECT_EQ(info->availableKiB.value_or(*whole.availableKiB), whole.availableKiB) << length;
+        // No swap yet, or what there is of it.
+        const auto free = info->swapFreeKiB.value_or(0);
+        EXPECT_TRUE(free == 0 || free == whole.swapFreeKiB) << length << ' ' << free;
     }
-}
-
-TEST(FilesCutShort, NoPrefixOfProcStatGivesAnotherBootTime) {
-    TestHost host;
-    host.kernel->fixedBootTime = std::nullopt;
-    const std::string whole = "cpu  1 2 3 4\nbtime 1700000000\nprocesses 5\n";
-    for (std::size_t length = 0; length <= whole.size(); ++length) {
-        host.tree().write("proc/stat", whole.substr(0, length));
-        const auto text = host.text(LastBootUpTime);
-        EXPECT_TRUE(!text || text == "2023-11-14-22:13:20") << length << ' ' << *text;
+    const std::string stat = textOf("proc/stat");
+    for (std::size_t length = 0; length <= stat.size(); ++length) {
+        const auto boot = VA::Linux::parseBootTime(stat.substr(0, length));
+        EXPECT_EQ(boot.value_or(1700000000), 1700000000) << length;
     }
-    EXPECT_EQ(host.text(LastBootUpTime), "2023-11-14-22:13:20");
 }
 
 }  // namespace

@@ -51,48 +51,14 @@ std::string times(int count, const std::string& text) {
     return all;
 }
 
-TEST(PlainText, IsWordsInAnyScriptOfUpTo256Characters) {
-    for (const std::string& text :
-         {"a"s, "Debian GNU/Linux"s, "12 (x)"s, " a"s, "Größe"s, "Линукс"s, "龍蜥"s,
-          "\xf0\x9f\x90\xa7"s, "\xc2\xa0"s, "\xed\x9f\xbf"s, "\xef\xbf\xbd"s, "\xf4\x8f\xbf\xbf"s,
-          times(256, "x"), times(256, "ö")}) {
+TEST(PlainText, IsWordsInAnyScriptOfUpTo256CharactersWithoutControls) {
+    for (const std::string& text : {"a"s, "12 (x)"s, " a"s, "Größe"s, "龍蜥"s, "\xf0\x9f\x90\xa7"s,
+                                    "\xc2\xa0"s, times(256, "x"), times(256, "ö")})
         EXPECT_TRUE(isPlainText(text)) << text;
-    }
-}
-
-TEST(PlainText, IsNeitherBlankNorLongNorControlsNorWhatIsNotUtf8) {
-    for (const std::string& text : {
-             ""s,
-             " "s,
-             "    "s,
-             times(257, "x"),
-             times(257, "ö"),
-             "a\0b"s,
-             "a\tb"s,
-             "a\nb"s,
-             "\x1b[31m"s,
-             "\x7f"s,
-             "\xc2\x80"s,
-             "\xc2\x85"s,
-             "\xc2\x9f"s,
-             "\x80"s,  // continuation without a start
-             "\xff"s,
-             "\xfe"s,  // never a byte of UTF-8
-             "\xc3"s,
-             "a\xe2\x82"s,
-             "\xf0\x9f\x90"s,  // cut short
-             "\xc3("s,
-             "\xe2\x82("s,  // continuation missing
-             "\xc1\xbf"s,
-             "\xe0\x9f\xbf"s,
-             "\xf0\x8f\xbf\xbf"s,  // longer than need be
-             "\xed\xa0\x80"s,
-             "\xed\xbf\xbf"s,  // surrogates
-             "\xf4\x90\x80\x80"s,
-             "\xf8\x88\x80\x80\x80"s,  // past the last character
-         }) {
+    for (const std::string& text :
+         {""s, " "s, "    "s, times(257, "x"), times(257, "ö"), "a\0b"s, "a\tb"s, "a\nb"s,
+          "\x1b[31m"s, "\x7f"s, "\xc2\x80"s, "\xc2\x9f"s, "\xff"s, "a\xe2\x82"s, "\xed\xa0\x80"s})
         EXPECT_FALSE(isPlainText(text)) << testing::PrintToString(text);
-    }
 }
 
 TEST(EnvFile, ValueIsUnquotedAsAShellWould) {
