@@ -183,18 +183,6 @@ TEST_F(FileCacheTest, WhatCouldNotBeOpenedIsTriedAgain) {
     EXPECT_EQ(host.number(NumberOfUsers), 2u);
 }
 
-TEST_F(FileCacheTest, NothingIsMixedUpBetweenTwoRoots) {
-    TestHost second;
-    second.kernel->fixedNow = host.kernel->fixedNow;
-    second.tree().write("etc/os-release", other);
-    for (int i = 0; i < 2; ++i) {
-        EXPECT_EQ(host.text(Name), "Test Linux");
-        EXPECT_EQ(second.text(Name), "Other");
-        EXPECT_EQ(host.number(NumberOfUsers), 2u);
-        EXPECT_EQ(second.number(NumberOfUsers), std::nullopt);
-    }
-}
-
 // Sessions
 
 const Change sessionChanges[] = {

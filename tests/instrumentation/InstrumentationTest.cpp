@@ -7,7 +7,6 @@
 #include <vector>
 
 #include "framework/instrumentation/HostSource.h"
-#include "support/FixtureTree.h"
 #include "support/SimulatedHost.h"
 
 namespace {
@@ -139,45 +138,6 @@ TEST_F(InstrumentationTest, CurrentSourceIsTheOneThatWasSetAndWithNoneThisMachin
     EXPECT_EQ(type, 35u);
 }
 
-TEST_F(InstrumentationTest, ReadsALinuxHostUnderAnyRoot) {
-    FixtureTree tree;
-    tree.writeCompleteHost();
-    VA::setHostSource(VA::makeLinuxHost(tree.root()));
-    Instrumentation cursor;
-    ASSERT_TRUE(cursor.selectNode(OperatingSystemNode));
-    EXPECT_EQ(nameOf(cursor), "Test Linux");
-    unsigned int users = 0;
-    EXPECT_TRUE(cursor.getProperty(NumberOfUsers, users));
-    EXPECT_EQ(users, 2u);
-    bool readOnly = false;
-    EXPECT_TRUE(cursor.isPropertyReadOnly(Name, readOnly));
-    EXPECT_TRUE(readOnly);
-    EXPECT_EQ(cursor.getNodeStatus(), 1u);
-}
-
-TEST_F(InstrumentationTest, WrongOverloadFindsNothing) {
-    FixtureTree tree;
-    tree.writeCompleteHost();
-    const std::shared_ptr<VA::HostSource> sources[] = {SimulatedHost::withOneNode(),
-                                                       VA::makeLinuxHost(tree.root())};
-    for (const auto& source : sources) {
-        VA::setHostSource(source);
-        Instrumentation cursor;
-        cursor.selectNode(OperatingSystemNode);
-        std::string text;
-        unsigned int number = 0;
-        bool flag = false;
-        EXPECT_FALSE(cursor.getProperty(Name, number));
-        EXPECT_FALSE(cursor.getProperty(Name, flag));
-        EXPECT_FALSE(cursor.getProperty(OSType, text));
-        EXPECT_FALSE(cursor.getProperty(OSType, flag));
-        EXPECT_FALSE(cursor.getProperty(Distributed, text));
-        EXPECT_FALSE(cursor.getProperty(Distributed, number));
-        EXPECT_FALSE(cursor.getProperty(LastBootUpTime, number));
-        EXPECT_FALSE(cursor.getProperty(TotalSwapSpaceSize, text));
-    }
-}
-
 TEST_F(InstrumentationTest, SourceMayBeReplacedWhileManyThreadsRead) {
     std::vector<std::thread> threads;
     for (int i = 0; i < 8; ++i) {
@@ -193,34 +153,6 @@ TEST_F(InstrumentationTest, SourceMayBeReplacedWhileManyThreadsRead) {
         });
     }
     for (auto& thread : threads) thread.join();
-}
-
-TEST_F(InstrumentationTest, SourcesOutsideTheLibraryMayDeriveFromTheSeam) {
-    class Cursor final : public VA::NodeCursor {
-      public:
-        bool select(NodeType type) override { return type == NodeType(3); }
-        bool valid() override { return true; }
-        void next() override {}
-        bool readProperty(Properties, std::string&) override { return false; }
-        bool readProperty(Properties id, unsigned int& value) override {
-            value = id + 1;
-            return true;
-        }
-        bool readProperty(Properties, bool&) override { return false; }
-        bool isPropertyReadOnly(Properties, bool&) override { return false; }
-        unsigned int nodeStatus() override { return 26; }
-        bool readComputerName(std::string&) override { return false; }
-    };
-    class Source final : public VA::HostSource {
-        std::unique_ptr<VA::NodeCursor> openCursor() override { return std::make_unique<Cursor>(); }
-    };
-    VA::setHostSource(std::make_shared<Source>());
-    Instrumentation cursor;
-    EXPECT_TRUE(cursor.selectNode(NodeType(3)));
-    unsigned int value = 0;
-    EXPECT_TRUE(cursor.getProperty(Name, value));
-    EXPECT_EQ(value, 109u);
-    EXPECT_EQ(cursor.getNodeStatus(), 26u);
 }
 
 }  // namespace

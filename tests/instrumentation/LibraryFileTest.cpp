@@ -3,7 +3,6 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <cstdio>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
@@ -13,22 +12,15 @@
 #include <thread>
 
 #include "support/FixtureTree.h"
+#include "support/ProgramRun.h"
 
 namespace {
 
-std::string outputOf(const std::string& command) {
-    std::string output;
-    FILE* pipe = ::popen(command.c_str(), "r");
-    for (int c = std::fgetc(pipe); c != EOF; c = std::fgetc(pipe)) output += static_cast<char>(c);
-    EXPECT_EQ(::pclose(pipe), 0) << command;
-    return output;
-}
-
 std::set<std::string> linesOf(const std::string& command) {
-    std::istringstream output(outputOf(command));
-    std::set<std::string> lines;
-    for (std::string line; std::getline(output, line);) lines.insert(line);
-    return lines;
+    const ProgramRun run = runProgram("/bin/sh", {"-c", command});
+    EXPECT_EQ(run.status, 0) << command;
+    const auto all = lines(run.out);
+    return {all.begin(), all.end()};
 }
 
 // The part of `text` before the first `end`.

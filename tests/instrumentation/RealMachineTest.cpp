@@ -72,7 +72,7 @@ struct Reading {
     double tolerance = 0;
 };
 
-std::vector<Reading> readings() {
+std::vector<Reading> machineReadings() {
     const double ram = shellNumber(meminfo("MemTotal")).value_or(0);
     const double swap = shellNumber(meminfo("SwapTotal")).value_or(0);
     const bool hasSessions = ::access("/run/systemd/sessions", R_OK | X_OK) == 0;
@@ -126,7 +126,7 @@ class RealMachine : public testing::Test {
 
 TEST_F(RealMachine, EveryPropertyAgreesWithAnIndependentReading) {
     std::vector<bool> isRead(1000);
-    for (const Reading& expected : readings()) {
+    for (const Reading& expected : machineReadings()) {
         SCOPED_TRACE(expected.id);
         isRead[expected.id] = true;
         const auto text = read<std::string>(expected.id);

@@ -8,7 +8,6 @@
 #include <map>
 #include <optional>
 #include <stdexcept>
-#include <thread>
 #include <vector>
 
 namespace {
@@ -162,30 +161,6 @@ TEST_F(SimulatedHostTest, NthCallOfAllOrOfOneOperationAndEachLaterOneFails) {
         EXPECT_THROW(callEverything(), std::runtime_error);
         EXPECT_THROW(callEverything(), std::runtime_error);
     }
-}
-
-TEST_F(SimulatedHostTest, CursorsOfManyThreadsAreCountedTogetherWhileTheHostChanges) {
-    std::vector<std::thread> threads;
-    for (int i = 0; i < 8; ++i) {
-        threads.emplace_back([&] {
-            for (int round = 0; round < 200; ++round) {
-                callEverything();
-                Instrumentation cursor;
-                cursor.selectNode(OperatingSystemNode);
-                std::string first, second;
-                cursor.getComputerName(first);
-                cursor.getComputerName(second);
-                EXPECT_EQ(first, second);
-            }
-        });
-    }
-    for (int i = 0; i < 1000; ++i) {
-        host->setComputerName("name " + std::to_string(i));
-        host->setHook([](const SimulatedHost::Call&) {});
-    }
-    for (auto& thread : threads) thread.join();
-    EXPECT_EQ(host->calls(), 8u * 200 * 14);
-    EXPECT_EQ(host->calls(Operation::ReadText, Name), 8u * 200);
 }
 
 }  // namespace

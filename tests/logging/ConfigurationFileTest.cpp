@@ -156,6 +156,8 @@ TEST_F(ConfigurationFileTest, TellsOnceWhyThereIsNothingToRead) {
         {folder_.path(), false, "3000 [0: not a regular file]"},
         {fifo, false, "3000 [0: not a regular file]"},
         {"/dev/zero", false, "3000 [0: not a regular file]"},
+        // Its first page is never mapped.
+        {"/proc/self/mem", false, "3000 [0: cannot be read: Input/output error]"},
     };
     for (const auto& row : rows) {
         ConfigurationFile file({row.path, row.required}, environment_);

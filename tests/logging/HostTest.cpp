@@ -1,14 +1,10 @@
 // What the host does to the log: its clocks, its own log (datagrams to /dev/log, in a folder /dev
-// of the test's own), a disk that fails, a thread that is cancelled.
+// of the test's own), a thread that is cancelled.
 #include <gmock/gmock.h>
-#include <linux/filter.h>
-#include <linux/seccomp.h>
 #include <pthread.h>
 #include <sched.h>
 #include <sys/mount.h>
-#include <sys/prctl.h>
 #include <sys/socket.h>
-#include <sys/syscall.h>
 #include <sys/un.h>
 #include <syslog.h>
 #include <unistd.h>
@@ -17,7 +13,6 @@
 #include <atomic>
 #include <cerrno>
 #include <chrono>
-#include <cstddef>
 #include <cstring>
 #include <thread>
 
@@ -131,33 +126,6 @@ TEST(SystemLog, ReceivesEachRecordAsADatagramUnderTheNameOfTheProcess) {
     EXPECT_THAT(
         readFile(folder.path("variable")),
         testing::MatchesRegex("<31>" + from + "4000 Zumbrel.Test work Work.cpp:12 VARIABLE: x"));
-}
-
-/// Lets every read at a place fail from now on, for good; false if that cannot be set up.
-bool failReads() {
-    std::array<sock_filter, 4> program{{
-        BPF_STMT(BPF_LD | BPF_W | BPF_ABS, offsetof(seccomp_data, nr)),
-        BPF_JUMP(BPF_JMP | BPF_JEQ | BPF_K, SYS_pread64, 0, 1),
-        BPF_STMT(BPF_RET | BPF_K, SECCOMP_RET_ERRNO | EIO),
-        BPF_STMT(BPF_RET | BPF_K, SECCOMP_RET_ALLOW),
-    }};
-    const sock_fprog filter{static_cast<unsigned short>(program.size()), program.data()};
-    return ::prctl(PR_SET_NO_NEW_PRIVS, 1, 0, 0, 0) == 0 &&
-           ::prctl(PR_SET_SECCOMP, SECCOMP_MODE_FILTER, &filter) == 0;
-}
-
-TEST(ReadError, OfAConfigurationFileIsTold) {
-    const TemporaryDirectory folder;
-    writeFile(folder.path("zblog.conf"), "log.level = 1\n");
-    const int status = inChildProcess([&] {
-        if (!failReads()) return 1;
-        FakeEnvironment environment;
-        ConfigurationFile file({folder.path("zblog.conf"), false}, environment);
-        const auto read = file.readIfChanged();
-        if (!read || read->errors.size() != 1) return 2;
-        return read->errors[0].message == "cannot be read: Input/output error" ? 0 : 3;
-    });
-    EXPECT_EQ(status, 0);
 }
 
 TEST(Cancellation, MayHitAThreadWhileItWrites) {

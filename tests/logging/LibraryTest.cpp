@@ -1,10 +1,7 @@
 #include <dlfcn.h>
 #include <gmock/gmock.h>
 #include <malloc.h>
-#include <sys/mman.h>
-#include <unistd.h>
 
-#include <chrono>
 #include <cstdlib>
 #include <set>
 #include <stdexcept>
@@ -18,7 +15,6 @@ namespace {
 
 using namespace logging_test;
 using testing::Contains;
-using testing::ElementsAre;
 using testing::Not;
 
 constexpr const char* library = ZBLOG_LIBRARY;
@@ -60,30 +56,13 @@ class LoadedLibrary {
     void* handle_;
 };
 
-/// A configuration in memory, named by the environment while it lives.
-class ConfigurationInMemory {
-  public:
-    explicit ConfigurationInMemory(const std::string& content)
-        : descriptor_(::memfd_create("zblog.conf", MFD_CLOEXEC)) {
-        set(content);
-        ::setenv("ZBLOG_CONF", ("/proc/self/fd/" + std::to_string(descriptor_)).c_str(), 1);
-    }
-    ~ConfigurationInMemory() {
-        ::unsetenv("ZBLOG_CONF");
-        ::close(descriptor_);
-    }
-    ConfigurationInMemory(const ConfigurationInMemory&) = delete;
-    ConfigurationInMemory& operator=(const ConfigurationInMemory&) = delete;
-
-    void set(const std::string& content) const {
-        EXPECT_EQ(::ftruncate(descriptor_, 0), 0);
-        EXPECT_EQ(::pwrite(descriptor_, content.data(), content.size(), 0),
-                  static_cast<ssize_t>(content.size()));
-    }
-
-  private:
-    int descriptor_;
-};
+/// Names a configuration that logs everything to these files.
+void configure(const TemporaryDirectory& folder) {
+    folder.write("zblog.conf",
+                 "log.sink = file:" + folder.path("log") +
+                     "\nlog.records = all\ntrace.sink = file:" + folder.path("trace") + "\n");
+    ::setenv("ZBLOG_CONF", folder.path("zblog.conf").c_str(), 1);
+}
 
 /// The lines that a command of the shell writes; a symbol that is there twice, as constructors are,
 /// is one of them.
@@ -143,10 +122,7 @@ TEST(Library, TouchesNothingThatBelongsToTheProcess) {
 
 TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
     const TemporaryDirectory folder;
-    const ConfigurationInMemory configuration("log.sink = file:" + (folder.path("log")) +
-                                              "\nlog.records = all\n"
-                                              "trace.sink = file:" +
-                                              (folder.path("trace")) + "\n");
+    configure(folder);
     std::size_t descriptors = 0;
     std::size_t bytes = 0;
     for (int round = 0; round < 100; ++round) {
@@ -177,20 +153,6 @@ TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
     EXPECT_EQ(textsOf(readFile(folder.path("trace"))).size(), 100u);
 }
 
-TEST(Library, FollowsAConfigurationInMemoryThatChanges) {
-    const TemporaryDirectory folder;
-    const ConfigurationInMemory configuration("log.sink = off\n");
-    const LoadedLibrary loaded;
-    loaded.log("one");
-    configuration.set("log.sink = file:" + (folder.path("log")) + "\nlog.records = all\n");
-    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(10);
-    while (readFile(folder.path("log")).empty() && std::chrono::steady_clock::now() < deadline) {
-        loaded.log("two");
-        std::this_thread::sleep_for(std::chrono::milliseconds(20));
-    }
-    EXPECT_THAT(textsOf(readFile(folder.path("log"))), ElementsAre("two"));
-}
-
 TEST(Library, ReadsNoFileWhenTheEnvironmentNamesNone) {
     ::setenv("ZBLOG_CONF", "", 1);
     const LoadedLibrary loaded;
@@ -204,10 +166,9 @@ TEST(Library, ReadsNoFileWhenTheEnvironmentNamesNone) {
 /// A process that ends while its threads go on logging.
 TEST(Library, LetsAProcessEndWhileItsThreadsGoOn) {
     const TemporaryDirectory folder;
+    configure(folder);
     for (int round = 0; round < 10; ++round) {
         const int status = inChildProcess([&]() -> int {
-            const ConfigurationInMemory configuration("log.sink = file:" + (folder.path("log")) +
-                                                      "\nlog.records = all\n");
             static const LoadedLibrary& loaded =
                 *new LoadedLibrary;  // stays loaded until the process is gone
             for (int thread = 0; thread < 3; ++thread) {

@@ -35,13 +35,6 @@ class LoggerReloadTest : public testing::Test {
     ZBLog::Logger logger_{environment_};
 };
 
-TEST_F(LoggerReloadTest, ReadsItsFileWhenTheFirstRecordComes) {
-    configure(toFirst_);
-    write("one");
-    EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one"));
-    EXPECT_THAT(environment_.takeSystemLog(), IsEmpty());
-}
-
 TEST_F(LoggerReloadTest, FollowsAChangeAfterOneSecondAndNotBefore) {
     configure(toFirst_);
     write("one");
@@ -52,6 +45,7 @@ TEST_F(LoggerReloadTest, FollowsAChangeAfterOneSecondAndNotBefore) {
     write("three");
     EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one", "two"));
     EXPECT_THAT(textsOf(readFile(second_)), ElementsAre("three"));
+    EXPECT_THAT(environment_.takeSystemLog(), IsEmpty());
 }
 
 TEST_F(LoggerReloadTest, FollowsAChangeWhenItsClockWrapsAround) {
@@ -99,7 +93,7 @@ TEST_F(LoggerReloadTest, KeepsCountingLostRecordsWhenOnlyTheLevelChanges) {
     EXPECT_EQ(environment_.takeSystemLog().size(), 1u);
 }
 
-TEST_F(LoggerReloadTest, ReportsErrorsOnceAndKeepsTheDefaults) {
+TEST_F(LoggerReloadTest, ReportsTheErrorsOfEachContentOnceAndKeepsTheDefaults) {
     configure(toFirst_ + "log.level = high\n");
     for (int count = 0; count < 10; ++count) {
         write(count == 5 ? failure : "one");
@@ -113,12 +107,6 @@ TEST_F(LoggerReloadTest, ReportsErrorsOnceAndKeepsTheDefaults) {
             notInForce_,
             std::to_string(LOG_DAEMON | LOG_ERR) +
                 " korva-osstatus: log 3000 Zumbrel.Test work Work.cpp:12 " + failure));
-}
-
-TEST_F(LoggerReloadTest, ReportsAgainWhenTheFileChangesAndIsStillWrong) {
-    configure("x\n");
-    write("one");
-    environment_.takeSystemLog();
     reconfigure("y\n");
     write("one");
     EXPECT_THAT(
@@ -134,25 +122,6 @@ TEST_F(LoggerReloadTest, GoesBackToTheDefaultsWhenAGoodFileBecomesABadOne) {
     reconfigure(toFirst_);
     write("three");
     EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("one", "three"));
-}
-
-TEST_F(LoggerReloadTest, ReportsAMissingFileOnceIfItWasAskedFor) {
-    for (int count = 0; count < 10; ++count) {
-        write("one");
-        environment_.advance(1000);
-    }
-    EXPECT_THAT(
-        environment_.takeSystemLog(),
-        ElementsAre(warningOf(path_ + ": cannot be read: No such file or directory"), notInForce_));
-}
-
-TEST_F(LoggerReloadTest, SaysNothingAboutAMissingFileOfTheSystem) {
-    environment_.source.required = false;
-    write("one");
-    EXPECT_THAT(environment_.takeSystemLog(), IsEmpty());
-    reconfigure(toFirst_);
-    write("two");
-    EXPECT_THAT(textsOf(readFile(first_)), ElementsAre("two"));
 }
 
 TEST_F(LoggerReloadTest, LetsGoOfItsFileWhenAConfigurationIsPutInForce) {

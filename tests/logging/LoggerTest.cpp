@@ -114,12 +114,6 @@ TEST_F(LoggerTest, SendsEachChannelToItsOwnSink) {
     EXPECT_THAT(environment_.takeSystemLog(), ElementsAre(testing::EndsWith(" two")));
 }
 
-TEST_F(LoggerTest, WritesNothingWhereTheSinkIsOff) {
-    use(everythingTo(Destination::off));
-    write(failure, 3000);
-    EXPECT_TRUE(environment_.takeSystemLog().empty());
-}
-
 TEST_F(LoggerTest, LeavesErrnoAloneWhenItWritesAndWhenItReadsItsConfiguration) {
     use(to(folder_.path("missing/log")));
     errno = 4242;

@@ -16,19 +16,13 @@ namespace {
 
 using ZBLog::ZBMessageBuffer;
 
-TEST(MessageBuffer, GathersTextsInOrder) {
+TEST(MessageBuffer, GathersTextsInOrderAndIsEmptyAfterItsTextWasTaken) {
     ZBMessageBuffer buffer;
-    EXPECT_EQ(buffer.str(buffer << "ENTERING"
-                                << ": "
-                                << "G()"),
-              "ENTERING: G()");
-}
-
-TEST(MessageBuffer, IsEmptyAfterItsTextWasTaken) {
-    ZBMessageBuffer buffer;
+    const char* const none = nullptr;
     for (int twin = 0; twin < 2; ++twin) {
-        EXPECT_EQ(buffer.str(buffer << "METHOD: B() was invoked in A [Line: 7]"),
-                  "METHOD: B() was invoked in A [Line: 7]");
+        EXPECT_EQ(buffer.str(buffer << "METHOD" << none << ": "
+                                    << "G()"),
+                  "METHOD: G()");
     }
     EXPECT_EQ(buffer.str(buffer), "");
 }
@@ -40,12 +34,6 @@ TEST(MessageBuffer, TakenTextStaysWhileTheNextIsGathered) {
     static_cast<std::ostream&>(buffer) << 3;
     EXPECT_EQ(taken, "one");
     EXPECT_EQ(buffer.str(buffer), "two3");
-}
-
-TEST(MessageBuffer, TakesNullForNoText) {
-    ZBMessageBuffer buffer;
-    const char* const none = nullptr;
-    EXPECT_EQ(buffer.str(buffer << "a" << none << "b"), "ab");
 }
 
 TEST(MessageBuffer, HoldsTextOfAnyLength) {
@@ -185,7 +173,7 @@ struct Counted {
 
 using Pool = ZBLog::ObjectPool<Counted, 4>;
 
-TEST(ObjectPool, GivesBackWhatItWasGiven) {
+TEST(ObjectPool, KeepsAsManyAsItHasPlacesAndNothingAfterItsEnd) {
     Pool pool;
     EXPECT_EQ(pool.take(), nullptr);
     auto object = std::make_unique<Counted>();
@@ -193,20 +181,10 @@ TEST(ObjectPool, GivesBackWhatItWasGiven) {
     pool.give(std::move(object));
     EXPECT_EQ(pool.take().get(), address);
     EXPECT_EQ(pool.take(), nullptr);
-    EXPECT_EQ(living, 0);
-}
-
-TEST(ObjectPool, KeepsAsManyAsItHasPlaces) {
-    Pool pool;
     for (int count = 0; count < 10; ++count) pool.give(std::make_unique<Counted>());
     EXPECT_EQ(living, 4);
     pool.close();
     EXPECT_EQ(living, 0);
-}
-
-TEST(ObjectPool, KeepsNothingAfterItsEnd) {
-    Pool pool;
-    pool.close();
     pool.give(std::make_unique<Counted>());
     EXPECT_EQ(living, 0);
     EXPECT_EQ(pool.take(), nullptr);

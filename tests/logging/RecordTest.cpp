@@ -19,11 +19,7 @@ std::string escaped(const std::string& text, std::size_t room = LineBuffer::capa
 }
 
 TEST(LineBuffer, EscapesWhatCouldLeaveItsLine) {
-    EXPECT_EQ(escaped("MESSAGE [File: A, Line: 9]: Gr\xC3\xBC\xC3\x9F"),
-              "MESSAGE [File: A, Line: 9]: Gr\xC3\xBC\xC3\x9F");
-    EXPECT_EQ(escaped("a\n2025-01-01T00:00:00.000Z 1 1 log"),
-              "a\\x0A2025-01-01T00:00:00.000Z 1 1 log");
-    EXPECT_EQ(escaped("C:\\x41\x1b\xE2("), "C:\\\\x41\\x1B\\xE2(");
+    EXPECT_EQ(escaped("a b\\\n\xC3\x9F"), "a b\\\\\\x0A\xC3\x9F");
     EXPECT_EQ(escaped("a b", 6, EscapeStyle::logField), "a\\x20b");
 }
 
@@ -124,9 +120,7 @@ TEST(RecordLine, BeginsWithItsTimeInUtcWithMilliseconds) {
         const char* expected;
     } rows[] = {
         {{0, 0}, "1970-01-01T00:00:00.000Z "},
-        {{1000000000, 999999999}, "2001-09-09T01:46:40.999Z "},
         {{1709251199, 7000000}, "2024-02-29T23:59:59.007Z "},
-        {{1709251200, 0}, "2024-03-01T00:00:00.000Z "},
         {{-1, 500000000}, "1969-12-31T23:59:59.500Z "},
         {{253402300799, 0}, "9999-12-31T23:59:59.000Z "},
     };

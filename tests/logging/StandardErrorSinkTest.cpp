@@ -2,7 +2,6 @@
 
 #include <fcntl.h>
 #include <gmock/gmock.h>
-#include <sys/socket.h>
 #include <unistd.h>
 
 #include <array>
@@ -17,46 +16,43 @@ namespace {
 using namespace logging_test;
 using testing::ElementsAre;
 
-/// Two connected descriptors.
-struct Pair {
-    ~Pair() {
+/// A pipe that keeps each write apart, and whose reader never waits.
+struct Pipe {
+    Pipe() {
+        EXPECT_EQ(::pipe2(ends.data(), O_CLOEXEC | O_DIRECT), 0);
+        ::fcntl(ends[0], F_SETFL, O_NONBLOCK);
+    }
+    ~Pipe() {
         closeEnd(0);
         closeEnd(1);
     }
+    Pipe(const Pipe&) = delete;
+    Pipe& operator=(const Pipe&) = delete;
+
     void closeEnd(std::size_t end) {
         if (ends[end] >= 0) ::close(ends[end]);
         ends[end] = -1;
     }
+    void fill() const {
+        const std::string filler(4096, '\n');
+        ::fcntl(ends[1], F_SETFL, O_DIRECT | O_NONBLOCK);
+        while (::write(ends[1], filler.data(), filler.size()) > 0) {
+        }
+        ::fcntl(ends[1], F_SETFL, O_DIRECT);
+    }
+    /// What one write wrote; empty where there is none.
     std::string receive() const {
         std::array<char, 65536> buffer{};
         const ssize_t count = ::read(ends[0], buffer.data(), buffer.size());
         return count > 0 ? std::string(buffer.data(), static_cast<std::size_t>(count)) : "";
     }
+    /// What all of them wrote, without what filled the pipe.
+    std::string drain() const {
+        std::string all;
+        for (std::string next = receive(); !next.empty(); next = receive()) all += next;
+        return all.erase(0, all.find_first_not_of('\n'));
+    }
     std::array<int, 2> ends{-1, -1};
-};
-
-struct Pipe : Pair {
-    Pipe() { EXPECT_EQ(::pipe2(ends.data(), O_CLOEXEC), 0); }
-    void fill() const {
-        const std::string filler(4096, '\n');
-        ::fcntl(ends[1], F_SETFL, O_NONBLOCK);
-        while (::write(ends[1], filler.data(), filler.size()) > 0) {
-        }
-        ::fcntl(ends[1], F_SETFL, 0);
-    }
-    void drain() const {
-        ::fcntl(ends[0], F_SETFL, O_NONBLOCK);
-        while (!receive().empty()) {
-        }
-        ::fcntl(ends[0], F_SETFL, 0);
-    }
-};
-
-struct Datagrams : Pair {
-    Datagrams() {
-        EXPECT_EQ(::socketpair(AF_UNIX, SOCK_DGRAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0, ends.data()),
-                  0);
-    }
 };
 
 class StandardErrorSinkTest : public testing::Test {
@@ -66,20 +62,20 @@ class StandardErrorSinkTest : public testing::Test {
 };
 
 TEST_F(StandardErrorSinkTest, WritesEachRecordAtOnce) {
-    Datagrams datagrams;
+    const Pipe pipe;
     const std::string huge(100000, 'x');
     {
-        const StandardErrorAs standardError(datagrams.ends[1]);
+        const StandardErrorAs standardError(pipe.ends[1]);
         sink_.write(record("one"));
         sink_.write(record(huge));
         sink_.write(record("two"));
     }
-    EXPECT_THAT(textsOf(datagrams.receive()), ElementsAre("one"));
-    const std::string second = datagrams.receive();
+    EXPECT_THAT(textsOf(pipe.receive()), ElementsAre("one"));
+    const std::string second = pipe.receive();
     EXPECT_EQ(second.size(), 4095u);
     EXPECT_EQ(second.substr(second.size() - 6), "x\\...\n");
-    EXPECT_THAT(textsOf(datagrams.receive()), ElementsAre("two"));
-    EXPECT_EQ(datagrams.receive(), "");
+    EXPECT_THAT(textsOf(pipe.receive()), ElementsAre("two"));
+    EXPECT_EQ(pipe.receive(), "");
 }
 
 TEST_F(StandardErrorSinkTest, PipeThatNobodyReadsIsToldOnceAndRaisesNoSignal) {
@@ -125,7 +121,7 @@ TEST_F(StandardErrorSinkTest, TimesOutOnAFullPipeOnceAndGoesOnWhenItIsRead) {
             const StandardErrorAs standardError(pipe.ends[1]);
             sink_.write(record("one"));
         }
-        EXPECT_THAT(textsOf(pipe.receive()),
+        EXPECT_THAT(textsOf(pipe.drain()),
                     ElementsAre("50 records were dropped: Connection timed out", "one"));
     }
 }
@@ -142,14 +138,11 @@ TEST_F(StandardErrorSinkTest, WaitsOnWhenASignalInterruptsIt) {
             std::this_thread::sleep_for(std::chrono::milliseconds(20));
             ::pthread_kill(writer.native_handle(), SIGUSR1);
         }
-        received = pipe.receive();
+        received = pipe.drain();
         writer.join();
     }
     std::signal(SIGUSR1, SIG_DFL);
-    ::fcntl(pipe.ends[0], F_SETFL, O_NONBLOCK);
-    received += pipe.receive();
-    received.erase(0, received.find_first_not_of('\n'));  // what filled the pipe
-    EXPECT_THAT(textsOf(received), ElementsAre("one"));
+    EXPECT_THAT(textsOf(received + pipe.drain()), ElementsAre("one"));
     EXPECT_TRUE(environment_.takeSystemLog().empty());
 }
 

@@ -11,14 +11,6 @@ namespace {
 
 using Utilities = VA::ProviderUtilities;
 
-CMPIStringFT stringTable() {
-    CMPIStringFT table = {};
-    table.getCharPtr = [](const CMPIString* self, CMPIStatus*) {
-        return static_cast<const char*>(self->hdl);
-    };
-    return table;
-}
-
 /// What the one key of a path is to its broker; hdl of the path.
 struct Key {
     CMPIData data;
@@ -32,47 +24,40 @@ CMPIData tell(const CMPIObjectPath* self, CMPIStatus* status) {
     return key.data;
 }
 
-CMPIObjectPathFT pathTable() {
-    CMPIObjectPathFT table = {};
-    table.getKey = [](const CMPIObjectPath* self, const char*, CMPIStatus* status) {
-        return tell(self, status);
-    };
-    table.getKeyAt = [](const CMPIObjectPath* self, CMPICount, CMPIString** name,
-                        CMPIStatus* status) {
-        *name = static_cast<const Key*>(self->hdl)->name;
-        return tell(self, status);
-    };
-    table.getKeyCount = [](const CMPIObjectPath*, CMPIStatus*) { return CMPICount{1}; };
-    return table;
-}
-
-CMPIInstanceFT instanceTable() {
-    CMPIInstanceFT table = {};
-    table.setProperty = [](const CMPIInstance* self, const char* name, const CMPIValue*, CMPIType) {
-        static_cast<std::vector<std::string>*>(self->hdl)->push_back(name);
-        return CMPIStatus{CMPI_RC_OK, nullptr};
-    };
-    return table;
-}
-
 /// What a broker answers when it is asked for an instance; hdl of the broker.
 struct NewInstance {
     CMPIInstance* instance;
     CMPIrc rc;
 };
 
-CMPIBrokerEncFT brokerTable() {
-    CMPIBrokerEncFT table = {};
-    table.newInstance = [](const CMPIBroker* self, const CMPIObjectPath*, CMPIStatus* status) {
-        const NewInstance& made = *static_cast<const NewInstance*>(self->hdl);
-        *status = {made.rc, nullptr};
-        return made.instance;
-    };
-    return table;
-}
-
 class Keys : public testing::Test {
   protected:
+    Keys() {
+        strings.getCharPtr = [](const CMPIString* self, CMPIStatus*) {
+            return static_cast<const char*>(self->hdl);
+        };
+        paths.getKey = [](const CMPIObjectPath* self, const char*, CMPIStatus* status) {
+            return tell(self, status);
+        };
+        paths.getKeyAt = [](const CMPIObjectPath* self, CMPICount, CMPIString** given,
+                            CMPIStatus* status) {
+            *given = static_cast<const Key*>(self->hdl)->name;
+            return tell(self, status);
+        };
+        paths.getKeyCount = [](const CMPIObjectPath*, CMPIStatus*) { return CMPICount{1}; };
+        instances.setProperty = [](const CMPIInstance* self, const char* given, const CMPIValue*,
+                                   CMPIType) {
+            static_cast<std::vector<std::string>*>(self->hdl)->push_back(given);
+            return CMPIStatus{CMPI_RC_OK, nullptr};
+        };
+        services.newInstance = [](const CMPIBroker* self, const CMPIObjectPath*,
+                                  CMPIStatus* status) {
+            const NewInstance& answer = *static_cast<const NewInstance*>(self->hdl);
+            *status = {answer.rc, nullptr};
+            return answer.instance;
+        };
+    }
+
     /// The ways in which the key is read: as a text or a reference by its name, by the index into
     /// a moniker, and by the index into a new instance.
     std::string readers() {
@@ -107,9 +92,9 @@ class Keys : public testing::Test {
         EXPECT_EQ(readers(), "") << why;
     }
 
-    CMPIStringFT strings = stringTable();
-    CMPIObjectPathFT paths = pathTable();
-    CMPIInstanceFT instances = instanceTable();
+    CMPIStringFT strings = {};
+    CMPIObjectPathFT paths = {};
+    CMPIInstanceFT instances = {};
     char nameText[2] = "k";
     char valueText[2] = "v";
     CMPIString name = {nameText, &strings};
@@ -118,7 +103,7 @@ class Keys : public testing::Test {
     CMPIObjectPath path = {&key, &paths};
     std::vector<std::string> properties;
     CMPIInstance instance = {&properties, &instances};
-    CMPIBrokerEncFT services = brokerTable();
+    CMPIBrokerEncFT services = {};
     NewInstance made = {&instance, CMPI_RC_OK};
     CMPIBroker broker = {&made, nullptr, &services, nullptr, nullptr};
 };

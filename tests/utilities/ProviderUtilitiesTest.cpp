@@ -121,12 +121,6 @@ TEST_P(ObjectPaths, ClassIdsFollowTheClassNameWithoutLetterCase) {
     EXPECT_EQ(Utilities::getClassId(static_cast<const CMPIObjectPath*>(nullptr)), 0);
 }
 
-TEST_P(ObjectPaths, KeysAreCountedAndAClassPathHasNone) {
-    EXPECT_EQ(Utilities::getKeyCount(path("C")), 0U);
-    EXPECT_EQ(Utilities::getKeyCount(path("C", {{"a", "1"}, {"b", "2"}})), 2U);
-    EXPECT_EQ(Utilities::getKeyCount(nullptr), 0U);
-}
-
 TEST_P(ObjectPaths, NewPathHasItsNamespaceAndClassAndNoKeys) {
     CMPIObjectPath* created =
         Utilities::createObjectPath(broker.cmpi(), "KORVA_OperatingSystem", "root/x");
@@ -153,6 +147,8 @@ TEST_P(ObjectPaths, TextKeysAreAddedAndReplaced) {
     Utilities::setKeyProperty(target, "a", std::string("3"));
     const cmpihost::ObjectPathValue value = cmpihost::valueOf(target);
     ASSERT_EQ(value.keys.size(), 2U);
+    EXPECT_EQ(Utilities::getKeyCount(target), 2U);
+    EXPECT_EQ(Utilities::getKeyCount(nullptr), 0U);
     EXPECT_EQ(*value.key("a"), Value("3"));
     EXPECT_EQ(*value.key("b"), Value("2"));
 }
@@ -368,12 +364,9 @@ TEST_P(Instances, TextBecomesADateTimeWhereItIsFlaggedAsOne) {
 
 TEST_P(Instances, EveryCimDateTimeIsHandedToABrokerAndLeftOutWhereThatMakesNone) {
     const std::pair<std::string, unsigned int> rows[] = {
-        {"20090317081542.000000-060", 1}, {"00000101000000.000000+000", 1},
-        {"20090231235960.999999-999", 1}, {"20090317******.******+000", 1},
-        {"****0317081542.000000+***", 1}, {"99999999235959.999999:000", 1},
-        {"00000011******.******:000", 1}, {"00000011132312.125000:***", 0},
-        {"   00000000000.000000+000", 0}, {"20090300000000.000000+000", 0},
-        {"2009031708154*.000000+000", 0}, {"", 0},
+        {"20090317081542.000000-060", 1}, {"****0317081542.000000+***", 1},
+        {"99999999235959.999999:000", 1}, {"00000011132312.125000:***", 0},
+        {"20090300000000.000000+000", 0}, {"", 0},
     };
     for (auto [text, calls] : rows) {
         for (const CMPIrc rc : {CMPI_RC_OK, CMPI_RC_ERR_FAILED}) {
