@@ -11,6 +11,7 @@
 #include "framework/instrumentation/Linux/Systemd.h"
 #include "framework/instrumentation/LinuxHost.h"
 #include "support/ProgramRun.h"
+#include "support/Properties.h"
 
 namespace {
 
@@ -45,9 +46,6 @@ std::optional<double> instantOf(const std::optional<std::string>& text) {
     return utc.value_or(0) - static_cast<double>(west / 60 * 60);
 }
 
-constexpr const char* osRelease =
-    "for f in /etc/os-release /usr/lib/os-release; do if [ -e $f ]; then . $f; break; fi; done; ";
-
 // In seconds, or parts of them.
 constexpr const char* boot = "awk -v now=$(date +%s) '{printf \"%.2f\", now - $1}' /proc/uptime";
 
@@ -76,16 +74,10 @@ std::vector<Reading> machineReadings() {
     const double ram = shellNumber(meminfo("MemTotal")).value_or(0);
     const double swap = shellNumber(meminfo("SwapTotal")).value_or(0);
     const bool hasSessions = ::access("/run/systemd/sessions", R_OK | X_OK) == 0;
-    return {
-        {Name, Kind::Text, std::string(osRelease) + "echo \"${NAME:-$(uname -s)}\""},
-        {Version, Kind::Text,
-         std::string(osRelease) + "echo \"${VERSION_ID:-${BUILD_ID:-$(uname -r)}}\""},
+    std::vector<Reading> all{
         {InstallDate, Kind::Date, installation, 1},
         {LastBootUpTime, Kind::Date, boot, 2},
         {OSType, Kind::Number, "echo 35"},
-        {MaxNumberOfProcesses, Kind::Number,
-         "cd /proc/sys/kernel; cat pid_max threads-max | sort -n | head -1"},
-        {MaxProcessMemorySize, Kind::Number, "ulimit -S -v | sed s/unlimited/0/"},
         // others come and go meanwhile
         {NumberOfProcesses, Kind::Number, "ls -d /proc/[0-9]* | wc -l", 100},
         {NumberOfUsers, Kind::Number, users, hasSessions ? 0.0 : 10.0},
@@ -99,6 +91,10 @@ std::vector<Reading> machineReadings() {
         {FreeSpaceInPagingFiles, Kind::Number, meminfo("SwapFree"), swap / 4},
         {Distributed, Kind::Flag, "echo 0"},
     };
+    for (const PublishedProperty& each : operatingSystemProperties)
+        if (each.command != nullptr)
+            all.push_back({each.id, each.isText() ? Kind::Text : Kind::Number, each.command});
+    return all;
 }
 
 class RealMachine : public testing::Test {
