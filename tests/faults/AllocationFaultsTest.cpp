@@ -12,7 +12,7 @@ using Texts = std::vector<std::string>;
 
 class AllocationFaults : public FaultsOfHandler {
   protected:
-    AllocationFaults() : FaultsOfHandler(withoutQuarantine()) {}
+    AllocationFaults() : FaultsOfHandler(withoutQuarantine) {}
     ~AllocationFaults() override { allocations::release(); }
 
     void expectDue(const Attempt& attempt) const {
@@ -64,7 +64,7 @@ INSTANTIATE_TEST_SUITE_P(Of, AllocationFaults, testing::ValuesIn(servingHandlers
 /// A provider that was loaded a moment ago: its log has no buffers yet.
 class JustLoaded : public FaultFixture {
   public:
-    JustLoaded() : FaultFixture(withoutQuarantine()) {}
+    JustLoaded() : FaultFixture(withoutQuarantine) {}
     void TestBody() override {}
 
     // False when no allocation failed.

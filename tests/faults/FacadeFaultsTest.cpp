@@ -12,17 +12,11 @@ namespace {
 using namespace cmpihost;
 using Texts = std::vector<std::string>;
 
-LoadOptions byName() {
-    LoadOptions options;
-    options.providerName = "OSStatusFacade";
-    return options;
-}
-
 class FacadeFaults : public FaultsOfHandler {
   protected:
     FacadeFaults()
-        : FaultsOfHandler(withoutQuarantine()),
-          facade(KORVA_BINARY_DIR "/lib/libkorvaosstatusfacade.so.1", broker, byName()) {
+        : FaultsOfHandler(withoutQuarantine),
+          facade(KORVA_BINARY_DIR "/lib/libkorvaosstatusfacade.so.1", broker, {"OSStatusFacade"}) {
         answering = &facade;
     }
     ~FacadeFaults() override {

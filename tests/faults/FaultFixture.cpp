@@ -70,12 +70,6 @@ std::vector<std::string> facadeHandlers() {
     return handlersOf(facadeRequests(names));
 }
 
-BrokerOptions withoutQuarantine() {
-    BrokerOptions options;
-    options.quarantine = 0;
-    return options;
-}
-
 FaultFixture::FaultFixture(BrokerOptions options) : LibraryFixture(options) {
     VA::SimulatedHost::Node bare;
     bare.properties[VA::NodeLexicon::Name] = std::string("other");
@@ -159,12 +153,8 @@ void FaultFixture::expectSame(const Answer& reference, const Answer& answer) {
     EXPECT_EQ(recordsOf(answer), recordsOf(reference));
 }
 
-std::string shortNameOf(const std::string& handler) {
-    return handler.substr(handler.find('_') + 1);
-}
-
 std::string nameOf(const testing::TestParamInfo<std::string>& info) {
-    return shortNameOf(info.param);
+    return info.param.substr(info.param.find('_') + 1);
 }
 
 std::string recordsOf(const Answer& answer) {

@@ -16,7 +16,8 @@ std::vector<std::string> servingHandlers();
 std::vector<std::string> facadeHandlers();
 
 /// A broker that keeps no shells of ended objects, which are blocks of memory too.
-cmpihost::BrokerOptions withoutQuarantine();
+inline const cmpihost::BrokerOptions withoutQuarantine = {cmpihost::BrokerOptions::Shape::Complete,
+                                                          0};
 
 /// What a request left behind.
 struct Answer {
@@ -66,16 +67,16 @@ class FaultFixture : public LibraryFixture {
     std::size_t recordsLeft = 0;
 };
 
-/// Runs a test once for each request of a handler.
-class EachRequestFixture : public FaultFixture {
+/// Runs a test once for each request of the handler that is its parameter.
+class FaultsOfHandler : public FaultFixture, public testing::WithParamInterface<std::string> {
   protected:
     using FaultFixture::FaultFixture;
 
-    /// Calls `body` for each of the requests that the handler serves, with its reference at hand;
+    /// Calls `body` for each of the requests, with its reference at hand;
     /// at the end the request is to be answered again as if nothing had happened.
     template <class Body>
-    void forEachRequestOf(const std::string& handler, Body body) {
-        for (const NamedRequest& each : requestsOf(handler)) {
+    void forEachRequest(Body body) {
+        for (const NamedRequest& each : requestsOf(GetParam())) {
             SCOPED_TRACE(each.name);
             asked = each;
             reference = answerTo(asked);
@@ -92,19 +93,7 @@ class EachRequestFixture : public FaultFixture {
     std::vector<std::string> referenceViolations;
 };
 
-/// The same for the handler that is the test's parameter.
-class FaultsOfHandler : public EachRequestFixture, public testing::WithParamInterface<std::string> {
-  protected:
-    using EachRequestFixture::EachRequestFixture;
-
-    template <class Body>
-    void forEachRequest(Body body) {
-        forEachRequestOf(GetParam(), std::move(body));
-    }
-};
-
 /// The handler's name as it stands in the name of a test.
-std::string shortNameOf(const std::string& handler);
 std::string nameOf(const testing::TestParamInfo<std::string>& info);
 
 /// The rendered records, one string.
