@@ -24,13 +24,6 @@ void PrintTo(const Library& library, std::ostream* out) {
     *out << library.name;
 }
 
-LoadOptions optionsFor(const char* name, bool association) {
-    LoadOptions options;
-    options.providerName = name;
-    options.association = association;
-    return options;
-}
-
 class DistributionHeaders : public testing::TestWithParam<Library> {
   protected:
     DistributionHeaders() {
@@ -50,10 +43,10 @@ class DistributionHeaders : public testing::TestWithParam<Library> {
 
     SchemaCatalogue catalogue{Schema::load(KORVA_SOURCE_DIR "/schema")};
     Broker broker{&catalogue};
-    ProviderLibrary provider{std::string(folder) + GetParam().file, broker,
-                             optionsFor(GetParam().name, true)};
-    ProviderLibrary companion{std::string(folder) + "libkorvacomputersystemprovider.so.1", broker,
-                              optionsFor("ComputerSystemProvider", false)};
+    ProviderLibrary provider{std::string(folder) + GetParam().file, broker, {GetParam().name}};
+    ProviderLibrary companion{std::string(folder) + "libkorvacomputersystemprovider.so.1",
+                              broker,
+                              {"ComputerSystemProvider", true, true, false}};
 };
 
 INSTANTIATE_TEST_SUITE_P(Of, DistributionHeaders,

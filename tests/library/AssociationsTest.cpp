@@ -229,10 +229,8 @@ TEST_F(Associations, ClassThatIsNoAssociationIsInvalid) {
 }
 
 TEST_F(Associations, PropertyListReachesTheFarEndAndIsNotApplied) {
-    OperationRequest request;
-    request.operation = Operation::Associators;
-    request.path = computerSystemPath("host1");
-    request.assocClass = "KORVA_InstalledOS";
+    OperationRequest request =
+        requestFor(Operation::Associators, computerSystemPath("host1"), "KORVA_InstalledOS");
     request.properties = std::vector<std::string>{"Name"};
     const Outcome listed = invoke(request);
     ASSERT_EQ(listed.instances.size(), 1U);
@@ -247,9 +245,8 @@ TEST_F(Associations, PropertyListReachesTheFarEndAndIsNotApplied) {
 
 TEST_F(Associations, ReferencesOmittedFromThePropertyListAreSetAllTheSame) {
     for (const Association& association : {installed, running, capabilities}) {
-        OperationRequest request;
-        request.operation = Operation::EnumerateInstances;
-        request.path = path(association.className);
+        OperationRequest request =
+            requestFor(Operation::EnumerateInstances, path(association.className));
         request.properties = std::vector<std::string>{"PrimaryOS"};
         const Outcome outcome = invoke(request);
         ASSERT_EQ(outcome.instances.size(), 1U);

@@ -11,7 +11,7 @@ using testing::IsEmpty;
 using Texts = std::vector<std::string>;
 using namespace associations;
 
-constexpr const char* className = "KORVA_OperatingSystemCapabilities";
+constexpr const char* capabilitiesClass = "KORVA_OperatingSystemCapabilities";
 
 // The properties of an instance in their order, each as "type name=value".
 Texts properties(const InstanceValue& instance) {
@@ -23,17 +23,10 @@ Texts properties(const InstanceValue& instance) {
 }
 
 /// Requests for KORVA_OperatingSystemCapabilities.
-class CapabilitiesRequests : public LibraryFixture {
-  protected:
-    void expectDone(const Outcome& outcome) {
-        EXPECT_EQ(outcome.rc, CMPI_RC_OK);
-        EXPECT_FALSE(outcome.message.has_value());
-        EXPECT_EQ(outcome.doneCount, 1U);
-    }
-};
+class CapabilitiesRequests : public LibraryFixture {};
 
 TEST_F(CapabilitiesRequests, InstanceCarriesItsFourPropertiesInOrderAndOfTheirTypes) {
-    const Outcome outcome = enumerate(className);
+    const Outcome outcome = enumerate(capabilitiesClass);
     expectDone(outcome);
     ASSERT_EQ(outcome.instances.size(), 1U);
     EXPECT_EQ(toString(outcome.instances[0].path),
@@ -52,7 +45,7 @@ TEST_F(CapabilitiesRequests, NameIsEditableWhereItIsNotReadOnlyAndUnknownWhereTh
     host->addNode(node);
     node.readOnly = {};
     host->addNode(node);
-    const Outcome outcome = enumerate(className);
+    const Outcome outcome = enumerate(capabilitiesClass);
     expectDone(outcome);
     ASSERT_EQ(outcome.instances.size(), 2U);
     EXPECT_THAT(
@@ -66,7 +59,7 @@ TEST_F(CapabilitiesRequests, NameIsEditableWhereItIsNotReadOnlyAndUnknownWhereTh
 
 TEST_F(CapabilitiesRequests, NamesComeOnePerNode) {
     setNodes({"a", "b"});
-    const Outcome outcome = enumerateNames(className);
+    const Outcome outcome = enumerateNames(capabilitiesClass);
     expectDone(outcome);
     EXPECT_THAT(texts(outcome.paths),
                 ElementsAre("root/cimv2:KORVA_OperatingSystemCapabilities.InstanceID=\"a\"",
@@ -77,7 +70,8 @@ TEST_F(CapabilitiesRequests, KeysOfThePathNarrowNothing) {
     setNodes({"a", "b"});
     for (const ObjectPathValue& asked :
          {capabilitiesPath("zzz"), capabilitiesPath("b"), capabilitiesPath("a"),
-          capabilitiesPath(""), path(className), path(className, {{"Other", "b"}})}) {
+          capabilitiesPath(""), path(capabilitiesClass),
+          path(capabilitiesClass, {{"Other", "b"}})}) {
         const Outcome outcome = get(asked);
         expectDone(outcome);
         EXPECT_THAT(texts(outcome.instances),
@@ -108,7 +102,7 @@ TEST_F(CapabilitiesRequests, PropertyListIsNotApplied) {
 TEST_F(CapabilitiesRequests, OfANamelessNodeHaveNoKeyAndOnlyTheShutdownBehaviour) {
     host->clearNodes();
     host->addNode({});
-    const Outcome instances = enumerate(className);
+    const Outcome instances = enumerate(capabilitiesClass);
     expectDone(instances);
     ASSERT_EQ(instances.instances.size(), 1U);
     EXPECT_EQ(toString(instances.instances[0].path),
@@ -116,7 +110,7 @@ TEST_F(CapabilitiesRequests, OfANamelessNodeHaveNoKeyAndOnlyTheShutdownBehaviour
     EXPECT_THAT(properties(instances.instances[0]), ElementsAre("uint16 HostShutdownBehavior=3"));
     EXPECT_THAT(broker.takeViolations(),
                 ElementsAre("path of KORVA_OperatingSystemCapabilities without key InstanceID"));
-    const Outcome names = enumerateNames(className);
+    const Outcome names = enumerateNames(capabilitiesClass);
     expectDone(names);
     EXPECT_THAT(texts(names.paths), ElementsAre("root/cimv2:KORVA_OperatingSystemCapabilities"));
     EXPECT_THAT(broker.takeViolations(),
@@ -125,8 +119,8 @@ TEST_F(CapabilitiesRequests, OfANamelessNodeHaveNoKeyAndOnlyTheShutdownBehaviour
 
 TEST_F(CapabilitiesRequests, WithoutANodeThereAreNone) {
     setNodes({});
-    for (const Outcome& outcome :
-         {enumerateNames(className), enumerate(className), get(capabilitiesPath("Linux"))}) {
+    for (const Outcome& outcome : {enumerateNames(capabilitiesClass), enumerate(capabilitiesClass),
+                                   get(capabilitiesPath("Linux"))}) {
         expectDone(outcome);
         EXPECT_THAT(outcome.paths, IsEmpty());
         EXPECT_THAT(outcome.instances, IsEmpty());

@@ -73,14 +73,11 @@ TEST_F(EntryPoints, LaterFactorySuppliesTheBrokerOfBothTables) {
     first.setFaultPlan(&firstCalls);
     second.setFaultPlan(&secondCalls);
     const auto serveBoth = [&](Broker& running) {
-        OperationRequest names;
-        names.operation = Operation::EnumerateInstanceNames;
-        names.path = path("KORVA_OperatingSystem");
-        EXPECT_EQ(cmpihost::invoke(library, running, names).paths.size(), 1U);
-        names.operation = Operation::AssociatorNames;
-        names.path = capabilitiesPath("Linux");
-        names.assocClass = "KORVA_OSElementCapabilities";
-        EXPECT_EQ(cmpihost::invoke(library, running, names).paths.size(), 1U);
+        for (const OperationRequest& names :
+             {requestFor(Operation::EnumerateInstanceNames, path("KORVA_OperatingSystem")),
+              requestFor(Operation::AssociatorNames, capabilitiesPath("Linux"),
+                         "KORVA_OSElementCapabilities")})
+            EXPECT_EQ(cmpihost::invoke(library, running, names).paths.size(), 1U);
     };
 
     instanceFactory(first.cmpi(), nullptr, nullptr);
@@ -101,11 +98,10 @@ TEST_F(EntryPoints, AssociationFactoryAloneMakesTheBrokerAvailable) {
     LoadOptions options;
     options.instance = false;
     const ProviderLibrary alone(providerFile, broker, options);
-    OperationRequest request;
-    request.operation = Operation::AssociatorNames;
-    request.path = operatingSystemPath("host1", "Linux");
-    request.assocClass = "KORVA_RunningOS";
-    const Outcome outcome = cmpihost::invoke(alone, broker, request);
+    const Outcome outcome =
+        cmpihost::invoke(alone, broker,
+                         requestFor(Operation::AssociatorNames,
+                                    operatingSystemPath("host1", "Linux"), "KORVA_RunningOS"));
     EXPECT_EQ(outcome.paths.size(), 1U);
     EXPECT_EQ(outcome.doneCount, 1U);
 }

@@ -88,6 +88,12 @@ Outcome LibraryFixture::associators(const ObjectPathValue& source,
     return invoke(request);
 }
 
+void expectDone(const Outcome& outcome) {
+    EXPECT_EQ(outcome.rc, CMPI_RC_OK);
+    EXPECT_FALSE(outcome.message.has_value());
+    EXPECT_EQ(outcome.doneCount, 1U);
+}
+
 void LibraryFixture::setNodes(const std::vector<std::string>& names) {
     host->clearNodes();
     for (const std::string& name : names) {

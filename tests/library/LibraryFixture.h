@@ -25,6 +25,9 @@ std::vector<std::string> texts(const std::vector<cmpihost::InstanceValue>& insta
 /// A property as text, "(absent)" when the instance has none of that name.
 std::string text(const cmpihost::InstanceValue& instance, const std::string& property);
 
+/// Expects that a request was served: status, no message, and the end reported once.
+void expectDone(const cmpihost::Outcome& outcome);
+
 /// One request for each of the five handlers that serve, all of which meet the instrumentation.
 std::vector<NamedRequest> oneRequestOfEachHandler();
 

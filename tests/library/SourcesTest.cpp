@@ -69,10 +69,7 @@ class Sources : public Associations {
 
     Texts farEndsFiltered(Operation operation, const Row& row, const Association& association,
                           const Filters& filters, const std::string& message) {
-        OperationRequest request;
-        request.operation = operation;
-        request.path = row.source;
-        request.assocClass = association.className;
+        OperationRequest request = requestFor(operation, row.source, association.className);
         request.resultClass = filters.resultClass;
         request.role = filters.role;
         request.resultRole = filters.resultRole;

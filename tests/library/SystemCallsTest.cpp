@@ -1,7 +1,4 @@
 // How many system calls a request takes that is not the first one: monitoring asks every minute.
-#include <sys/syscall.h>
-#include <unistd.h>
-
 #include <chrono>
 #include <filesystem>
 #include <thread>
@@ -35,15 +32,6 @@ class SystemCalls : public LibraryFixture {
         return calls.value_or(std::vector<long>());
     }
 };
-
-TEST_F(SystemCalls, AreCountedHere) {
-    EXPECT_THAT(*systemCallsOf([] {
-        ::syscall(SYS_gettid);
-        ::close(-1);
-        ::syscall(SYS_gettid);
-    }),
-                testing::ElementsAre(SYS_gettid, SYS_close, SYS_gettid));
-}
 
 TEST_F(SystemCalls, OfThisHostAreFew) {
     VA::setHostSource(nullptr);

@@ -119,10 +119,8 @@ TEST_F(Upcall, StaysInTheNamespaceOfTheRequest) {
 }
 
 TEST_F(Upcall, PropertyListOfTheRequestIsNotPassedOn) {
-    OperationRequest request;
-    request.operation = Operation::Associators;
-    request.path = operatingSystemPath("h", "n");
-    request.assocClass = "KORVA_RunningOS";
+    OperationRequest request =
+        requestFor(Operation::Associators, operatingSystemPath("h", "n"), "KORVA_RunningOS");
     request.properties = Texts{"Name"};
     invoke(request);
     EXPECT_THAT(service.take(),

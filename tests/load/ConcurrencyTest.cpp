@@ -46,9 +46,7 @@ struct Server {
 class LoadedProvider {
   public:
     explicit LoadedProvider(const Server& server)
-        : name_(server.name),
-          broker_(&schemaCatalogue()),
-          library_(server.file, broker_, byName(name_)) {
+        : name_(server.name), broker_(&schemaCatalogue()), library_(server.file, broker_, {name_}) {
         broker_.route(ComputerSystemService::className, computers_);
     }
 
@@ -64,12 +62,6 @@ class LoadedProvider {
     }
 
   private:
-    static LoadOptions byName(const std::string& name) {
-        LoadOptions options;
-        options.providerName = name;
-        return options;
-    }
-
     template <class MI>
     bool callAgain(const std::string& factory, MI* interface) {
         using Factory = MI* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);

@@ -29,13 +29,6 @@ constexpr int thisMachine = -1;
 constexpr Turn turns[] = {{thisMachine, true},  {1, false}, {20, true},  {0, false},
                           {thisMachine, false}, {1, true},  {20, false}, {0, true}};
 
-// Few shells are kept: the memory that they take is the broker's.
-BrokerOptions options() {
-    BrokerOptions result;
-    result.quarantine = 0;
-    return result;
-}
-
 struct CloseLibrary {
     void operator()(void* handle) const noexcept { ::dlclose(handle); }
 };
@@ -49,19 +42,13 @@ LibraryHandle simulate(unsigned int nodes) {
     return hosts;
 }
 
-LoadOptions facadeOptions() {
-    LoadOptions result;
-    result.providerName = "OSStatusFacade";
-    return result;
-}
-
 }  // namespace
 
 Workload::Workload()
     : computers_("host1"),
-      broker_(nullptr, options()),
+      broker_(nullptr, {BrokerOptions::Shape::Complete, 0}),  // no shells: they take memory
       provider_(std::string(folder) + "libkorzbosstatusprofileprovider.so.1", broker_),
-      facade_(std::string(folder) + "libkorvaosstatusfacade.so.1", broker_, facadeOptions()) {
+      facade_(std::string(folder) + "libkorvaosstatusfacade.so.1", broker_, {"OSStatusFacade"}) {
     findOutNames();
     broker_.route(ComputerSystemService::className, computers_);
     facade_.unload();
