@@ -4,13 +4,18 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <cstdio>
+#include <cstdlib>
 #include <string>
 #include <string_view>
 
 namespace fuzz {
 
 /// Prints the text and ends the program, which libFuzzer counts as a finding.
-[[noreturn]] void broken(const std::string& invariant);
+[[noreturn]] inline void broken(const std::string& invariant) {
+    std::fprintf(stderr, "Broken invariant: %s\n", invariant.c_str());
+    std::abort();
+}
 
 /// `invariant` is a sentence that holds.
 inline void expect(bool holds, const char* invariant) {
