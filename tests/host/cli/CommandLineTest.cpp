@@ -68,33 +68,11 @@ TEST(CommandLine, GathersThePropertyList) {
     EXPECT_THAT(*accepted({"ei", "X", "gi"}).properties, ElementsAre("gi"));
 }
 
-TEST(CommandLine, TakesTheFiltersOfAssociations) {
-    const CommandLine line = accepted({"ain", "X", "--assoc-class", "A", "--result-class", "B",
-                                       "--role", "C", "--result-role", "D"});
-    EXPECT_EQ(line.assocClass, "A");
-    EXPECT_EQ(line.resultClass, "B");
-    EXPECT_EQ(line.role, "C");
-    EXPECT_EQ(line.resultRole, "D");
-    EXPECT_EQ(accepted({"rin", "X", "--result-class", "B", "--role", "C"}).role, "C");
-    EXPECT_FALSE(accepted({"ai", "X"}).assocClass.has_value());
-}
-
 TEST(CommandLine, TakesAssignmentsThatBeginLikeOptionsOrLists) {
     const CommandLine line = accepted({"mi", "X.A=\"b\"", "Level=-5", "States={2, 11}", "Text="});
     EXPECT_THAT(line.assignments, ElementsAre("Level=-5", "States={2, 11}", "Text="));
     EXPECT_EQ(line.path, "X.A=\"b\"");
     EXPECT_THAT(accepted({"ci", "X", "--", "--a="}).assignments, ElementsAre("--a="));
-}
-
-TEST(CommandLine, TakesAQueryWithLanguageAndNamespace) {
-    const CommandLine line = accepted({"xq", "SELECT * FROM X"});
-    EXPECT_EQ(line.operation, Operation::ExecQuery);
-    EXPECT_EQ(line.query, "SELECT * FROM X");
-    EXPECT_EQ(line.queryLanguage, "WQL");
-    EXPECT_EQ(line.nameSpace, "root/cimv2");
-    const CommandLine other = accepted({"xq", "q", "--lang", "DMTF:CQL", "--namespace", "interop"});
-    EXPECT_EQ(other.queryLanguage, "DMTF:CQL");
-    EXPECT_EQ(other.nameSpace, "interop");
 }
 
 /// The complaint about words that are refused, without the hint at the help.

@@ -47,25 +47,6 @@ class RequestBuilder : public testing::Test {
     Schema schema_;
 };
 
-TEST_F(RequestBuilder, PassesPathPropertiesAndFiltersOn) {
-    CommandLine line;
-    line.operation = Operation::Associators;
-    line.path = "interop:Thing.Name=\"a\"";
-    line.properties = std::vector<std::string>{"On"};
-    line.assocClass = "A";
-    line.resultClass = "B";
-    line.role = "C";
-    line.resultRole = "D";
-    const OperationRequest request = built(line);
-    EXPECT_EQ(request.operation, Operation::Associators);
-    EXPECT_EQ(request.path, (ObjectPathValue{"interop", "Thing", {{"Name", Value("a")}}}));
-    EXPECT_THAT(*request.properties, ElementsAre("On"));
-    EXPECT_EQ(request.assocClass, "A");
-    EXPECT_EQ(request.resultClass, "B");
-    EXPECT_EQ(request.role, "C");
-    EXPECT_EQ(request.resultRole, "D");
-}
-
 TEST_F(RequestBuilder, GivesValuesTheTypesOfTheClass) {
     const Value two = Value::fromUnsigned(2, CMPI_uint16);
     const char* const date = "20240102030405.000000+000";
