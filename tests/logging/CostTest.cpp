@@ -131,10 +131,6 @@ class CostTest : public testing::Test {
     const std::string text_ = "ENTERING: G() in A [Line: 3],Parameters List: P";
 };
 
-TEST_F(CostTest, SystemCallsAreNoticedHere) {
-    EXPECT_EQ(withoutSystemCalls([] { ::getppid(); }), 1000 + SIGSYS);
-}
-
 TEST_F(CostTest, FilteredRecordIsFree) {
     expectFree([&] {
         logger_.write(record(text_, 4000));
