@@ -23,13 +23,13 @@ endfunction()
 # The address sanitizer keeps freed memory: only files and threads count then, and what it reports itself.
 if(NOT KORVA_SANITIZE)
     korva_soak(TwoHundredThousandRequestsLeaveMemoryFilesAndThreadsAsTheyWere
-        --requests 200000 --settle 20000)
+        --requests 180000 --settle 20000)
     korva_soak(RequestsOnEightThreadsLeaveMemoryFilesAndThreadsAsTheyWere
-        --requests 40000 --settle 8000 --threads 8)
+        --requests 32000 --settle 8000 --threads 8)
 else()
-    korva_soak(RequestsLeaveFilesAndThreadsAsTheyWere --requests 4000 --no-memory)
+    korva_soak(RequestsLeaveFilesAndThreadsAsTheyWere --settle 1000 --requests 3000 --no-memory)
     korva_soak(RequestsOnEightThreadsLeaveFilesAndThreadsAsTheyWere
-        --requests 4000 --threads 8 --no-memory)
+        --settle 1000 --requests 3000 --threads 8 --no-memory)
 endif()
 
 # In 32-bit valgrind needs the symbols of the 32-bit loader, for which there is no package among those of
