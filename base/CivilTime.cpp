@@ -34,7 +34,8 @@ bool isLeap(std::int64_t year) {
 
 CivilTime civilFromSeconds(std::int64_t seconds) noexcept {
     const std::int64_t days = floorDivide(seconds, secondsPerDay);
-    const auto second = static_cast<int>(seconds - days * secondsPerDay);
+    // Of the least count of seconds, its days in seconds would already be too small for the type.
+    const auto second = static_cast<int>((seconds % secondsPerDay + secondsPerDay) % secondsPerDay);
 
     const std::int64_t cycle = floorDivide(days - firstOfMarch2000, daysPer400Years);
     std::int64_t rest = days - firstOfMarch2000 - cycle * daysPer400Years;
