@@ -135,6 +135,12 @@ TEST_F(ConfigurationFileTest, IsNotReadWhileItRests) {
     }
 }
 
+TEST_F(ConfigurationFileTest, TellsAnotherReasonWhyItCannotBeRead) {
+    EXPECT_EQ(readingOf(file_), "3000 [0: cannot be read: No such file or directory]");
+    std::filesystem::create_symlink(path_, path_);
+    EXPECT_EQ(readingOf(file_), "3000 [0: cannot be read: Too many levels of symbolic links]");
+}
+
 TEST_F(ConfigurationFileTest, TellsOnceWhyThereIsNothingToRead) {
     const std::string missing = folder_.path("missing"), link = folder_.path("link"),
                       fifo = folder_.path("fifo"), tooLong = folder_.path("long");
