@@ -1,3 +1,5 @@
+// Written here since the C library's functions for characters go by the locale of the process,
+// which is the object manager's.
 #include "base/Ascii.h"
 
 #include <algorithm>

@@ -25,7 +25,7 @@ class [[gnu::visibility("hidden")]] ZBMessageBuffer::MessageStream final : publi
     static void release(std::unique_ptr<MessageStream> stream) noexcept;
 
     void append(std::string_view text) {
-        gathering().append(text);
+        activeText().append(text);
     }
 
     std::ostream& stream() noexcept {
@@ -55,7 +55,7 @@ class [[gnu::visibility("hidden")]] ZBMessageBuffer::MessageStream final : publi
     bool isWorthKeeping() const noexcept;
     void resetStream() noexcept;
 
-    std::string& gathering() noexcept {
+    std::string& activeText() noexcept {
         return texts_[current_];
     }
 
@@ -87,9 +87,9 @@ void ZBMessageBuffer::MessageStream::release(std::unique_ptr<MessageStream> stre
 }
 
 const std::string& ZBMessageBuffer::MessageStream::take() noexcept {
-    const std::string& taken = gathering();
+    const std::string& taken = activeText();
     current_ ^= 1;
-    gathering().clear();
+    activeText().clear();
     if (streamed_) resetStream();
     return taken;
 }
@@ -97,13 +97,13 @@ const std::string& ZBMessageBuffer::MessageStream::take() noexcept {
 ZBMessageBuffer::MessageStream::int_type ZBMessageBuffer::MessageStream::overflow(
     int_type character) {
     if (!traits_type::eq_int_type(character, traits_type::eof())) {
-        gathering().push_back(traits_type::to_char_type(character));
+        activeText().push_back(traits_type::to_char_type(character));
     }
     return traits_type::not_eof(character);
 }
 
 std::streamsize ZBMessageBuffer::MessageStream::xsputn(const char* text, std::streamsize count) {
-    gathering().append(text, static_cast<std::size_t>(count));
+    activeText().append(text, static_cast<std::size_t>(count));
     return count;
 }
 

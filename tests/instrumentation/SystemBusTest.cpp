@@ -21,7 +21,7 @@ using namespace std::chrono_literals;
 using testing::HasSubstr;
 using VA::Linux::SystemdBus;
 
-constexpr auto patience = 30s;  // for an answer on a machine under any load
+constexpr auto timeout = 30s;  // for an answer on a machine under any load
 
 enum class Reply {
     State,
@@ -183,7 +183,7 @@ class SystemBusTest : public testing::Test {
     }
 
     // The state that is told while `bus` answers, or nobody does.
-    std::optional<std::string> state(std::chrono::milliseconds deadline = patience) {
+    std::optional<std::string> state(std::chrono::milliseconds deadline = timeout) {
         const auto start = std::chrono::steady_clock::now();
         auto found = SystemdBus(socket, SystemdBus::defaultLibrary, {}, deadline).systemState();
         time = std::chrono::steady_clock::now() - start;
@@ -227,7 +227,7 @@ TEST_F(SystemBusTest, BusThatGivesNoStateHasNoAnswerAtOnce) {
     for (const auto reply : {Reply::Error, Reply::OtherType, Reply::HangUp}) {
         const FakeDBus bus(socket, reply, "running");
         EXPECT_EQ(state(), std::nullopt) << static_cast<int>(reply);
-        EXPECT_LT(time, patience / 2);
+        EXPECT_LT(time, timeout / 2);
     }
 }
 
@@ -244,7 +244,7 @@ TEST_F(SystemBusTest, HostWithoutABusHasNoAnswerAtOnce) {
     for (const bool isFile : {false, true}) {
         if (isFile) tree.write("run/dbus/system_bus_socket", "a file is no socket");
         EXPECT_EQ(state(), std::nullopt);
-        EXPECT_LT(time, patience / 2);
+        EXPECT_LT(time, timeout / 2);
     }
 }
 

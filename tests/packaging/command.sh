@@ -1,4 +1,4 @@
-# The command that registers: choice of object managers, options, failures, manners.
+# The command that registers: choice of object managers, options, failures, messages.
 # shellcheck shell=sh
 # shellcheck source=managers.sh
 . ./managers.sh
