@@ -1,11 +1,11 @@
 #include <pthread.h>
 
 #include <cstring>
-#include <fstream>
 #include <functional>
 
 #include "facade/FacadeFixture.h"
 #include "support/GoldenFile.h"
+#include "support/ProcessMap.h"
 
 // The factories and their tables, the records of requests, and the file's coming and going.
 
@@ -69,19 +69,12 @@ TEST_F(FacadeEntryPoints, CleanupSucceedsAndRequestsFollow) {
               1U);
 }
 
-bool mapped(const std::string& name) {
-    std::ifstream maps("/proc/self/maps");
-    for (std::string line; std::getline(maps, line);)
-        if (line.find(name) != std::string::npos) return true;
-    return false;
-}
-
 TEST_F(FacadeEntryPoints, IsGoneWithTheProviderAfterEachOfAHundredUses) {
     facade.unload();
     library.unload();
     for (int round = 0; round < 100; ++round) {
         facade.load();
-        EXPECT_TRUE(mapped("libkorvaosstatusfacade"));
+        EXPECT_TRUE(isMapped("libkorvaosstatusfacade"));
         EXPECT_EQ(ask(Operation::EnumerateInstances, path("KORVA_OperatingSystem"), Texts{})
                       .instances.size(),
                   1U);
@@ -91,8 +84,8 @@ TEST_F(FacadeEntryPoints, IsGoneWithTheProviderAfterEachOfAHundredUses) {
             2U);
         EXPECT_EQ(ask(Operation::GetInstance, capabilitiesPath("x")).rc, CMPI_RC_ERR_NOT_FOUND);
         EXPECT_TRUE(facade.unload(false));
-        EXPECT_FALSE(mapped("libkorvaosstatusfacade"));
-        EXPECT_FALSE(mapped("libkorzbosstatusprofileprovider"));
+        EXPECT_FALSE(isMapped("libkorvaosstatusfacade"));
+        EXPECT_FALSE(isMapped("libkorzbosstatusprofileprovider"));
     }
 }
 

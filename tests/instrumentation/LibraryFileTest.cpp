@@ -4,7 +4,6 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
-#include <fstream>
 #include <iterator>
 #include <set>
 #include <sstream>
@@ -12,6 +11,7 @@
 #include <thread>
 
 #include "support/FixtureTree.h"
+#include "support/ProcessMap.h"
 #include "support/ProgramRun.h"
 
 namespace {
@@ -88,14 +88,6 @@ TEST(LibraryFile, NeedsTheSystemsOwnLibrariesAloneAndBearsItsVersion) {
     }
     EXPECT_GE(needed, 2);
     EXPECT_EQ(soname, "libvainstrumentation.so.1");
-}
-
-bool isMapped(const std::string& name) {
-    std::ifstream maps("/proc/self/maps");
-    for (std::string line; std::getline(maps, line);) {
-        if (line.find(name) != std::string::npos) return true;
-    }
-    return false;
 }
 
 std::ptrdiff_t openDescriptors() {

@@ -5,12 +5,12 @@
 #include <gtest/gtest.h>
 
 #include <cstdio>
-#include <fstream>
 #include <map>
 #include <memory>
 #include <string>
 #include <vector>
 
+#include "support/ProcessMap.h"
 #include "support/ProgramRun.h"
 
 namespace {
@@ -61,13 +61,6 @@ std::vector<std::string> undefinedSymbols(const std::string& file) {
         names.push_back(name.substr(0, name.find('@')));
     }
     return names;
-}
-
-bool mapped(const std::string& name) {
-    std::ifstream maps("/proc/self/maps");
-    for (std::string line; std::getline(maps, line);)
-        if (line.find(name) != std::string::npos) return true;
-    return false;
 }
 
 TEST(LibraryFile, BearsItsSoname) {
@@ -170,9 +163,9 @@ void expectGoneAfterUnloading(const std::string& file, const char* factory) {
         void* handle = dlopen(file.c_str(), RTLD_NOW | RTLD_GLOBAL);
         ASSERT_NE(handle, nullptr) << dlerror();
         EXPECT_NE(dlsym(handle, factory), nullptr);
-        EXPECT_TRUE(mapped("libkorzbosstatusprofileprovider"));
+        EXPECT_TRUE(isMapped("libkorzbosstatusprofileprovider"));
         EXPECT_EQ(dlclose(handle), 0);
-        for (const char* library : libraries) EXPECT_FALSE(mapped(library));
+        for (const char* library : libraries) EXPECT_FALSE(isMapped(library));
     }
 }
 

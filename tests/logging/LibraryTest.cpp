@@ -8,6 +8,7 @@
 #include <thread>
 #include <vector>
 
+#include "support/ProcessMap.h"
 #include "support/ProgramRun.h"
 #include "tests/logging/LoggingSupport.h"
 
@@ -71,10 +72,6 @@ std::set<std::string> outputOf(const std::string& command) {
     return {written.begin(), written.end()};
 }
 
-bool isMapped() {
-    return readFile("/proc/self/maps").find("libzblog.so") != std::string::npos;
-}
-
 TEST(Library, ExportsTheTwoClassesAndNothingElse) {
     const std::string text = "[abi:cxx11]";
     EXPECT_THAT(
@@ -126,10 +123,10 @@ TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
     std::size_t descriptors = 0;
     std::size_t bytes = 0;
     for (int round = 0; round < 100; ++round) {
-        ASSERT_FALSE(isMapped());
+        ASSERT_FALSE(isMapped("libzblog.so"));
         {
             const LoadedLibrary loaded;
-            ASSERT_TRUE(isMapped());
+            ASSERT_TRUE(isMapped("libzblog.so"));
             void* buffer = nullptr;
             loaded.get<Construct>("_ZN5ZBLog15ZBMessageBufferC1Ev")(&buffer);
             loaded.get<Append>("_ZN5ZBLog15ZBMessageBufferlsEPKc")(&buffer, "round");
@@ -140,7 +137,7 @@ TEST(Library, IsGoneAfterEachOfAHundredUnloads) {
             std::thread([&] { loaded.log("of a thread"); }).join();
             loaded.get<Construct>("_ZN5ZBLog15ZBMessageBufferD1Ev")(&buffer);
         }
-        ASSERT_FALSE(isMapped());
+        ASSERT_FALSE(isMapped("libzblog.so"));
         if (round == 0) descriptors = openDescriptors();
         ASSERT_EQ(openDescriptors(), descriptors);
         if (round == 50) bytes = ::mallinfo2().uordblks;

@@ -5,12 +5,11 @@
 
 #include "host/broker/Invoke.h"
 #include "host/broker/ResultCollector.h"
+#include "support/ProcessMap.h"
 
 #include <dlfcn.h>
 #include <elf.h>
 #include <unistd.h>
-
-#include <fstream>
 
 namespace cmpihost {
 namespace {
@@ -26,15 +25,6 @@ LoadOptions instanceOnly(const char* provider) {
     options.providerName = provider;
     options.association = false;
     return options;
-}
-
-bool inProcessMap(const std::string& file) {
-    std::ifstream map("/proc/self/maps");
-    std::string line;
-    while (std::getline(map, line)) {
-        if (line.find(file) != std::string::npos) return true;
-    }
-    return false;
 }
 
 class Library : public ::testing::Test {
@@ -72,7 +62,7 @@ TEST_F(Library, LoadsOnlyTheInterfacesThatAreAskedFor) {
 
 TEST_F(Library, LeavesTheProcessWhenItIsDestroyed) {
     { ProviderLibrary library(testFile, broker, {"Good", false}); }
-    EXPECT_FALSE(inProcessMap(testFile));
+    EXPECT_FALSE(isMapped(testFile));
 }
 
 TEST_F(Library, IsCleanedUpOnceForEachInterface) {
@@ -192,7 +182,7 @@ TEST_F(Library, AFactoryThatFailsIsTold) {
         EXPECT_EQ(problem(testFile, instanceOnly(row.provider)),
                   testFile + ": factory of the Instance MI" + row.complaint);
     }
-    EXPECT_FALSE(inProcessMap(testFile));
+    EXPECT_FALSE(isMapped(testFile));
 }
 
 TEST_F(Library, WhatAnObjectManagerMightNotForgiveInATableIsAViolation) {
