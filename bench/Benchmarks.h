@@ -1,4 +1,4 @@
-// The groups of benchmarks; docs/benchmarks.md lists what each measures.
+// The groups of benchmarks; docs/dev/benchmarks.md lists what each measures.
 #ifndef BENCH_BENCHMARKS_H
 #define BENCH_BENCHMARKS_H
 

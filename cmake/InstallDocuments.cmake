@@ -28,12 +28,12 @@ korva_man_page(provider zblog.conf 5)
 korva_man_page(provider korva-osstatus 7)
 korva_man_page(provider korva-osstatus-register 8)
 
-# In the folders of the source, so that the links from one to another hold.
+# Documents for users, in the folders of the source, so that the links from one to another hold. Those for
+# developers (docs/dev, CONTRIBUTING.md) stay with the source.
 file(GLOB korva_documents CONFIGURE_DEPENDS "${PROJECT_SOURCE_DIR}/docs/*.md")
 install(FILES ${korva_documents} DESTINATION "${CMAKE_INSTALL_DOCDIR}/docs" COMPONENT provider)
 install(FILES "${PROJECT_SOURCE_DIR}/README.md" "${PROJECT_SOURCE_DIR}/CHANGELOG.md"
-              "${PROJECT_SOURCE_DIR}/CONTRIBUTING.md" "${PROJECT_SOURCE_DIR}/SECURITY.md"
-              "${PROJECT_SOURCE_DIR}/LICENSE"
+              "${PROJECT_SOURCE_DIR}/SECURITY.md" "${PROJECT_SOURCE_DIR}/LICENSE"
         DESTINATION "${CMAKE_INSTALL_DOCDIR}" COMPONENT provider)
 install(FILES "${PROJECT_SOURCE_DIR}/packaging/examples/zblog.conf"
         DESTINATION "${KORVA_SHARE_DIR}/examples" COMPONENT provider)

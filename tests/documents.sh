@@ -3,11 +3,10 @@
 # the root folder. A dead link or a command that fails ends the run and is named.
 set -eu
 cd "$(dirname "$0")/.."
-sh tests/links.sh ./*.md docs/*.md
+sh tests/links.sh ./*.md docs/*.md docs/dev/*.md
 script=$(mktemp)
 trap 'rm -f "$script"' EXIT
-for document in README.md docs/*.md; do
-    [ -e "$document" ] || continue
+for document in ./*.md docs/*.md docs/dev/*.md; do
     awk '/^```sh$/ {inside = 1; next} /^```/ {inside = 0} inside' "$document" >"$script"
     [ -s "$script" ] || continue
     echo "commands of $document"
