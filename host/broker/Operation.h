@@ -18,6 +18,7 @@ enum class Operation {
     ModifyInstance,
     DeleteInstance,
     ExecQuery,
+    InvokeMethod,
     Associators,
     AssociatorNames,
     References,
@@ -26,12 +27,10 @@ enum class Operation {
 
 /// "EnumerateInstances" and so on.
 constexpr const char* operationName(Operation operation) noexcept {
-    constexpr const char* names[] = {"EnumerateInstances", "EnumerateInstanceNames",
-                                     "GetInstance",        "CreateInstance",
-                                     "ModifyInstance",     "DeleteInstance",
-                                     "ExecQuery",          "Associators",
-                                     "AssociatorNames",    "References",
-                                     "ReferenceNames"};
+    constexpr const char* names[] = {
+        "EnumerateInstances", "EnumerateInstanceNames", "GetInstance", "CreateInstance",
+        "ModifyInstance",     "DeleteInstance",         "ExecQuery",   "InvokeMethod",
+        "Associators",        "AssociatorNames",        "References",  "ReferenceNames"};
     return names[static_cast<unsigned>(operation)];
 }
 

@@ -1,100 +1,16 @@
-// Commands, their arguments and their help stand in tables; CLI11 reads the words and prints the
-// help from the same description, so that the two cannot differ.
+// CLI11 reads the words and prints the help from the same tables, so that the two cannot differ.
 #include "host/cli/CommandLine.h"
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
+#include <type_traits>
 
 #include "base/Utf8.h"
+#include "host/cli/Commands.h"
 
 namespace cmpihost {
 
 namespace {
-
-/// What stands behind a command beside its path.
-enum class Takes { Nothing, Properties, Assignments, Query, Namespace };
-enum class Filters { None, References, Associators };
-
-struct Command {
-    const char* name;
-    const char* help;
-    /// None draws the host.
-    std::optional<Operation> operation;
-    /// The help on PATH; null: it takes none.
-    const char* path;
-    Takes takes;
-    Filters filters = Filters::None;
-};
-
-constexpr const char* classPath = "Path of the class: [NAMESPACE:]CLASS";
-constexpr const char* instancePath = "Path of the instance: [NAMESPACE:]CLASS.KEY=VALUE,...";
-constexpr const char* sourcePath = "Path of the instance to start from";
-
-constexpr Command commands[] = {
-    {"ei", "Enumerate the instances of a class", Operation::EnumerateInstances, classPath,
-     Takes::Properties},
-    {"ein", "Enumerate the names of the instances of a class", Operation::EnumerateInstanceNames,
-     classPath, Takes::Nothing},
-    {"gi", "Get one instance", Operation::GetInstance, instancePath, Takes::Properties},
-    {"ci", "Create an instance", Operation::CreateInstance, classPath, Takes::Assignments},
-    {"mi", "Modify an instance", Operation::ModifyInstance, instancePath, Takes::Assignments},
-    {"di", "Delete an instance", Operation::DeleteInstance, instancePath, Takes::Nothing},
-    {"ai", "Get the instances that are associated with an instance", Operation::Associators,
-     sourcePath, Takes::Properties, Filters::Associators},
-    {"ain", "Get the names of the associated instances", Operation::AssociatorNames, sourcePath,
-     Takes::Nothing, Filters::Associators},
-    {"ri", "Get the association instances that refer to an instance", Operation::References,
-     sourcePath, Takes::Properties, Filters::References},
-    {"rin", "Get the names of those association instances", Operation::ReferenceNames, sourcePath,
-     Takes::Nothing, Filters::References},
-    {"xq", "Execute a query", Operation::ExecQuery, nullptr, Takes::Query},
-    {"tree", "Draw the host, what is installed and running on it", std::nullopt, nullptr,
-     Takes::Namespace},
-};
-
-struct Filter {
-    const char* name;
-    std::optional<std::string> CommandLine::*value;
-    const char* typeName;
-    const char* helpOnAssociators;
-    /// Null: references have no such filter.
-    const char* helpOnReferences;
-};
-
-constexpr Filter filters[] = {
-    {"--assoc-class", &CommandLine::assocClass, "CLASS", "Class of the association", nullptr},
-    {"--result-class", &CommandLine::resultClass, "CLASS", "Class of the far end",
-     "Class of the association"},
-    {"--role", &CommandLine::role, "NAME", "Reference that points to the source",
-     "Reference that points to the source"},
-    {"--result-role", &CommandLine::resultRole, "NAME", "Reference that points to the far end",
-     nullptr},
-};
-
-constexpr const char* description =
-    "Embedded CIM host: loads a CMPI provider library as an object manager does, runs one\n"
-    "operation on it and prints what it returns. It loads the facade, which asks the provider\n"
-    "and answers as WBEM clients expect.";
-
-constexpr const char* pathHelp =
-    "Paths:\n"
-    "  root/cimv2:KORVA_OperatingSystem\n"
-    "  'KORVA_OperatingSystem.CSName=\"myhost\",Name=\"Debian GNU/Linux\"'\n"
-    "  The namespace is root/cimv2 when a path names none. In a text key, \\\" and \\\\ stand for\n"
-    "  \" and \\. Single quotes around the path keep the shell away from it.\n"
-    "  The path of an instance can lack keys when only one instance has those that it gives.\n";
-
-constexpr const char* statusHelp =
-    "\n"
-    "Exit status:\n"
-    "  0  done\n"
-    "  1  the provider answered a CIM status other than OK, named on the standard error, or the\n"
-    "     results cannot be written\n"
-    "  2  wrong usage, or a path that lacks keys and that none or several instances fit\n"
-    "  3  the library does not load\n"
-    "\n"
-    "What the host catches the provider at (a null result, an undeclared property, an object used\n"
-    "after its request) is told on the standard error in lines that begin with 'caught:'.";
 
 std::string strip(const std::string& text) {
     constexpr const char* blanks = " \t\r\n";
@@ -115,11 +31,41 @@ void appendNames(const std::string& list, std::vector<std::string>& to) {
     }
 }
 
-Format parseFormat(const std::string& word) {
-    if (word == "table") return Format::Table;
-    if (word == "mof") return Format::Mof;
-    if (word == "json") return Format::Json;
-    throw CLI::ValidationError("--format", "expected table, mof or json, found '" + word + "'");
+/// What a word stands for.
+template <class Meaning>
+struct Word {
+    const char* text;
+    Meaning meaning;
+};
+
+constexpr Word<Format> formats[] = {
+    {"table", Format::Table}, {"mof", Format::Mof}, {"json", Format::Json}};
+constexpr Word<LogLevel> logLevels[] = {
+    {"failures", LogLevel::Failures}, {"3000", LogLevel::Calls}, {"4000", LogLevel::Everything}};
+constexpr Word<LogChannel> logChannels[] = {
+    {"log", LogChannel::Log}, {"trace", LogChannel::Trace}, {"cmpi", LogChannel::Cmpi}};
+
+/// Throws CLI::ValidationError for a word that the table does not have.
+template <class Meaning, std::size_t count>
+Meaning meaningOf(const std::string& word, const Word<Meaning> (&table)[count],
+                  const char* option) {
+    std::string known;
+    for (std::size_t index = 0; index < count; ++index) {
+        if (word == table[index].text) return table[index].meaning;
+        known += std::string(index == 0 ? "" : index + 1 < count ? ", " : " or ");
+        known += table[index].text;
+    }
+    throw CLI::ValidationError(option, "expected " + known + ", found '" + word + "'");
+}
+
+/// LEVEL[,CHANNEL]
+LogRequest parseLog(const std::string& text) {
+    const std::size_t comma = text.find(',');
+    LogRequest request;
+    request.level = meaningOf(text.substr(0, comma), logLevels, "--log");
+    if (comma != std::string::npos)
+        request.channel = meaningOf(text.substr(comma + 1), logChannels, "--log");
+    return request;
 }
 
 /// An option or argument with a text that is not empty.
@@ -136,7 +82,8 @@ CLI::Option* addText(CLI::App& to, const char* name, const char* typeName, Text&
 }
 
 /// The arguments behind the program's name, last one first. An empty value that stands behind a
-/// sign of equality becomes an argument of its own: the parser would take the next argument for it.
+/// sign of equality becomes an argument of its own: the parser would take the next argument for it,
+/// as it would for --log without a value.
 std::vector<std::string> splitArguments(int argumentCount, const char* const* arguments) {
     std::vector<std::string> result;
     bool options = true;
@@ -146,12 +93,22 @@ std::vector<std::string> splitArguments(int argumentCount, const char* const* ar
         const bool emptyValue = options && argument.compare(0, 2, "--") == 0 &&
                                 argument.find('=') == argument.size() - 1;
         if (emptyValue) argument.pop_back();
+        if (options && argument == "--log" && !emptyValue) argument = "--log=4000";
         result.push_back(std::move(argument));
         if (emptyValue) result.emplace_back();
     }
     std::reverse(result.begin(), result.end());
     return result;
 }
+
+/// An optional value is part of the option's word, so no blank stands before it.
+class HelpFormatter : public CLI::Formatter {
+  public:
+    std::string make_option_opts(const CLI::Option* option) const override {
+        const std::string text = CLI::Formatter::make_option_opts(option);
+        return text.compare(0, 3, " [=") == 0 ? text.substr(1) : text;
+    }
+};
 
 /// The command line as CLI11 fills it, and the description of it all.
 class CommandLineParser {
@@ -162,8 +119,10 @@ class CommandLineParser {
   private:
     static ParsedCommandLine refused(const std::string& complaint);
     std::string withoutCommand(const CLI::ParseError& error) const;
+    std::string name() const { return app_.get_subcommands().front()->get_name(); }
     void addHostOptions();
-    void addCommand(const Command& command);
+    void addHostOption(const OptionRow& row);
+    void addCommand(const CommandRow& row);
     void addArguments(CLI::App& to, Takes takes);
     void addFilters(CLI::App& to, Filters which);
     void collectProperties();
@@ -175,17 +134,18 @@ class CommandLineParser {
     std::optional<std::string> propertyOption_;
 };
 
-CommandLineParser::CommandLineParser() : app_(description, "cmpihost") {
+CommandLineParser::CommandLineParser() : app_(programHelp, "cmpihost") {
     app_.set_version_flag("--version", "cmpihost " KORVA_VERSION, "Print the version");
     app_.set_help_flag("-h,--help", "Print this help");
     app_.footer(std::string(pathHelp) + statusHelp);
     app_.require_subcommand(1);
     // As wide as the longest option with its type, so that every help stands on the line of its
     // option.
+    app_.formatter(std::make_shared<HelpFormatter>());
     app_.get_formatter()->column_width(34);
-    app_.get_formatter()->label("SUBCOMMAND", "OPERATION ARGUMENT...");
+    app_.get_formatter()->label("SUBCOMMAND", "COMMAND ARGUMENT...");
     addHostOptions();
-    for (const Command& command : commands) addCommand(command);
+    for (const CommandRow& row : commandRows()) addCommand(row);
 }
 
 ParsedCommandLine CommandLineParser::parse(int argumentCount, const char* const* arguments) {
@@ -198,9 +158,11 @@ ParsedCommandLine CommandLineParser::parse(int argumentCount, const char* const*
     } catch (const CLI::ParseError& error) {
         return refused(app_.get_subcommands().empty() ? withoutCommand(error) : error.what());
     }
-    // Refused, not ignored: a script that asks for JSON would take the picture for it.
-    if (result_.tree && result_.format != Format::Table)
-        return refused("--format: tree draws a picture, it has no other form");
+    // Refused, not ignored: a script that asks for one thing would take another for it.
+    const bool operation = result_.command == Command::Operation;
+    if (!operation && result_.format == Format::Mof)
+        return refused("--format: " + name() + " has the forms table and json");
+    if (!operation && result_.value) return refused("--value: " + name() + " prints no values");
     collectProperties();
     return {result_, {}, exitDone};
 }
@@ -217,52 +179,64 @@ ParsedCommandLine CommandLineParser::refused(const std::string& complaint) {
 std::string CommandLineParser::withoutCommand(const CLI::ParseError& error) const {
     if (dynamic_cast<const CLI::RequiredError*>(&error) == nullptr) return error.what();
     const std::vector<std::string> unknown = app_.remaining();
-    return unknown.empty() ? "An operation is required"
-                           : "There is no operation '" + unknown.front() + "'";
+    return unknown.empty() ? "A command is required"
+                           : "There is no command '" + unknown.front() + "'";
 }
 
 void CommandLineParser::addHostOptions() {
-    CLI::Option* provider =
-        addText(app_, "--provider", "FILE", result_.provider,
-                "Library of the provider; without it the facade beside this program,\n"
-                "which asks the provider");
-    app_.add_flag("--bare", result_.bare,
-                  "Ask the provider itself, and complete no path that lacks keys")
-        ->excludes(provider);
+    for (const OptionRow& row : optionRows()) addHostOption(row);
     app_.add_option_function<std::string>(
-            "--format", [this](const std::string& word) { result_.format = parseFormat(word); },
-            "How results are printed: table (the default), mof or json;\n"
-            "not for tree")
+            "--format",
+            [this](const std::string& word) {
+                result_.format = meaningOf(word, formats, "--format");
+            },
+            "How results are printed: table (the default), mof or json")
         ->type_name("FORMAT");
-    app_.add_flag("--log", result_.log, "Show the records of the provider on the standard error");
-    addText(app_, "--schema", "DIR", result_.schema,
-            "Folder of the MOF files; without it the one beside this program");
-    CLI::Option* companion =
-        addText(app_, "--companion", "FILE", result_.companion,
-                "Library that serves the computer system; without it the one beside this\n"
-                "program, else this program itself");
-    app_.add_option("--computer-systems", result_.computerSystems,
-                    "Answer for so many computer systems without that library, 0 to 1000, to see\n"
-                    "what then happens")
-        ->check(CLI::Range(0, 1000))
-        ->excludes(companion)
-        ->type_name("N");
+    app_.add_option_function<std::string>(
+            "--log", [this](const std::string& text) { result_.log = parseLog(text); },
+            "Show what providers record on the standard error. LEVEL: failures, 3000\n"
+            "(calls with parameters, too) or 4000 (everything, the default); CHANNEL:\n"
+            "log, trace or cmpi; without it log and cmpi")
+        ->option_text("[=LEVEL[,CHANNEL]]");
+    CLI::Option* systems = app_.add_option("--computer-systems", result_.computerSystems,
+                                           "Answer for so many computer systems without that "
+                                           "library, 0 to 1000, to see\n"
+                                           "what then happens");
+    systems->check(CLI::Range(0, 1000))->excludes(app_.get_option("--companion"))->type_name("N");
+    app_.get_option("--bare")->excludes("--provider")->option_text(" ");
+    app_.get_option("--name")->needs("--provider")->option_text("NAME");
 }
 
-void CommandLineParser::addCommand(const Command& command) {
-    CLI::App& added = *app_.add_subcommand(command.name, command.help);
-    // Options of the program may stand behind the operation, too.
+void CommandLineParser::addHostOption(const OptionRow& row) {
+    const auto add = [&](auto CommandLine::*field) {
+        using Field = std::decay_t<decltype(result_.*field)>;
+        if constexpr (std::is_same_v<Field, bool>) {
+            app_.add_flag(row.name, result_.*field, row.help);
+        } else {
+            // One value for each mention, also where several mentions add up.
+            addText(app_, row.name, row.valueName, result_.*field, row.help)
+                ->allow_extra_args(false)
+                ->option_text(row.valueName);
+        }
+    };
+    std::visit(add, row.field);
+}
+
+void CommandLineParser::addCommand(const CommandRow& row) {
+    CLI::App& added = *app_.add_subcommand(row.name, row.help);
+    // Options of the program may stand behind the command, too.
     added.fallthrough();
-    added.group(command.operation ? "Operations" : "Pictures");
-    if (command.operation) added.footer(pathHelp);
-    added.callback([this, operation = command.operation] {
-        result_.tree = !operation;
-        result_.operation = operation.value_or(result_.operation);
+    added.group(row.command == Command::Operation ? "Operations" : "Overviews");
+    added.footer(std::string(row.path == nullptr ? "" : pathHelp) + "\nExample:\n  cmpihost " +
+                 row.example);
+    added.callback([this, &row] {
+        result_.command = row.command;
+        result_.operation = row.operation;
     });
-    if (command.path != nullptr)
-        added.add_option("PATH", result_.path, command.path)->required()->type_name("");
-    addArguments(added, command.takes);
-    addFilters(added, command.filters);
+    if (row.path != nullptr)
+        added.add_option("PATH", result_.path, row.path)->required()->type_name("");
+    addArguments(added, row.takes);
+    addFilters(added, row.filters);
 }
 
 void CommandLineParser::addArguments(CLI::App& to, Takes takes) {
@@ -282,6 +256,16 @@ void CommandLineParser::addArguments(CLI::App& to, Takes takes) {
                           "Values of properties; a list stands in braces: NAME={1, 2}")
                 ->type_name("");
             return;
+        case Takes::Method:
+            addText(to, "METHOD", "", result_.method, "Name of the method")->required();
+            to.add_option("NAME=VALUE", result_.assignments,
+                          "Values of parameters; a list stands in braces: NAME={1, 2}")
+                ->type_name("");
+            return;
+        case Takes::Subject:
+            addText(to, "CLASS[.PROPERTY]", "", result_.subject, "The class, or one property of it")
+                ->required();
+            return;
         case Takes::Query:
             addText(to, "QUERY", "", result_.query, "Text of the query")->required();
             addText(to, "--lang", "NAME", result_.queryLanguage, "Language of the query")
@@ -297,10 +281,10 @@ void CommandLineParser::addArguments(CLI::App& to, Takes takes) {
 
 void CommandLineParser::addFilters(CLI::App& to, Filters which) {
     if (which == Filters::None) return;
-    for (const Filter& filter : filters) {
+    for (const FilterRow& row : filterRows()) {
         const char* help =
-            which == Filters::Associators ? filter.helpOnAssociators : filter.helpOnReferences;
-        if (help != nullptr) addText(to, filter.name, filter.typeName, result_.*filter.value, help);
+            which == Filters::Associators ? row.helpOnAssociators : row.helpOnReferences;
+        if (help != nullptr) addText(to, row.name, row.valueName, result_.*row.field, help);
     }
 }
 
@@ -314,10 +298,8 @@ void CommandLineParser::collectProperties() {
 }
 
 std::string CommandLineParser::help() {
-    // The operations are few and alike: the help of the program shows all of them in full.
     const std::vector<CLI::App*> chosen = app_.get_subcommands();
-    return chosen.empty() ? app_.help("", CLI::AppFormatMode::All)
-                          : chosen.front()->help("cmpihost");
+    return chosen.empty() ? app_.help() : chosen.front()->help("cmpihost");
 }
 
 }  // namespace

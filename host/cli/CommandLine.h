@@ -11,33 +11,69 @@
 
 namespace cmpihost {
 
-/// The exit statuses of the program. exitCimStatus also says that results cannot be written.
-enum ExitStatus { exitDone = 0, exitCimStatus = 1, exitUsage = 2, exitNotLoaded = 3 };
+/// The exit statuses of the program. exitCimStatus also says that results cannot be written,
+/// exitNotLoaded that a registration cannot be read; exitCaught wins over exitDone, exitCimStatus
+/// and exitNothingFound.
+enum ExitStatus {
+    exitDone = 0,
+    exitCimStatus = 1,
+    exitUsage = 2,
+    exitNotLoaded = 3,
+    exitNothingFound = 4,
+    exitCaught = 5
+};
+
+/// What the user wants to see: the answer to an operation, or something about host and schema.
+enum class Command { Operation, Tree, Classes, Describe, Namespaces };
+
+/// How much of what providers record is shown: failures only, the coarser level (3000, calls with
+/// their parameters), or everything.
+enum class LogLevel { Failures, Calls, Everything };
+
+/// The two channels of the logging library, and what providers log through the broker.
+enum class LogChannel { Log, Trace, Cmpi };
+
+struct LogRequest {
+    LogLevel level = LogLevel::Everything;
+    /// None: the log and the broker's; the trace repeats the log.
+    std::optional<LogChannel> channel{};
+};
 
 /// What the user asks for, as written: no text is looked into yet.
 struct CommandLine {
-    /// The provider's library; empty: the facade beside this program, or what `bare` says.
+    /// The provider's library, asked for every class; empty: who is registered, or what `bare`
+    /// says.
     std::string provider;
+    /// The name that the library's factories carry; empty: the one that it exports.
+    std::string miName;
+    /// Registration files and folders of them; empty: the ones beside this program.
+    std::vector<std::string> registrations;
     /// Ask the provider beside this program, without the facade, and leave paths as they are.
     bool bare = false;
-    /// The folder of the MOF files; empty: the one beside this program.
-    std::string schema;
+    /// MOF files and folders of them; empty: the folder beside this program.
+    std::vector<std::string> schemas;
     Format format = Format::Table;
-    bool log = false;
+    /// The property whose bare values are printed, in place of whole results.
+    std::optional<std::string> value;
+    std::optional<LogRequest> log;
+    /// Tell how long loading, the request and the output took.
+    bool time = false;
     /// The library that serves the computer system; empty: the one beside this program, if any.
     std::string companion;
     /// How many computer systems the host is to serve itself, in place of that library.
     std::optional<unsigned> computerSystems;
-    /// Draw the host instead of running an operation.
-    bool tree = false;
 
+    Command command = Command::Operation;
     Operation operation = Operation::EnumerateInstances;
     /// The class or instance; not for ExecQuery.
     std::string path;
     /// None: all properties.
     std::optional<std::vector<std::string>> properties;
-    /// Name=value, for CreateInstance and ModifyInstance.
+    /// Name=value, for CreateInstance, ModifyInstance and InvokeMethod.
     std::vector<std::string> assignments;
+    std::string method;
+    /// The class or property to describe: CLASS or CLASS.PROPERTY.
+    std::string subject;
 
     std::optional<std::string> assocClass;
     std::optional<std::string> resultClass;

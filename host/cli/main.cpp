@@ -27,11 +27,11 @@ namespace {
 
 namespace fs = std::filesystem;
 
-Schema loadSchema(const std::string& given, const fs::path& programFolder) {
+Schema loadSchema(const std::vector<std::string>& given, const fs::path& programFolder) {
     try {
-        return Schema::load(given.empty() ? schemaFolder(programFolder) : fs::path(given));
+        return Schema::load(given.empty() ? schemaFolder(programFolder) : fs::path(given.front()));
     } catch (const std::runtime_error& error) {
-        const char* hint = given.empty() ? " (--schema DIR names another folder)" : "";
+        const char* hint = given.empty() ? " (--schema PATH names others)" : "";
         throw UsageError(base::escapeForTerminal(error.what()) + hint);
     }
 }
@@ -116,9 +116,16 @@ class Run {
   private:
     ExitStatus execute() {
         // The schema goes first: a wrong path is reported without loading any library.
-        const Schema schema = loadSchema(commandLine_.schema, programFolder_);
+        const Schema schema = loadSchema(commandLine_.schemas, programFolder_);
         const SchemaCatalogue catalogue(schema);
-        return commandLine_.tree ? drawHost(schema, catalogue) : runOperation(schema, catalogue);
+        switch (commandLine_.command) {
+            case Command::Operation:
+                return runOperation(schema, catalogue);
+            case Command::Tree:
+                return drawHost(schema, catalogue);
+            default:
+                return failed("this command is not there yet", exitUsage);
+        }
     }
 
     ExitStatus runOperation(const Schema& schema, const SchemaCatalogue& catalogue) {

@@ -38,7 +38,7 @@ PagesReferToPagesThatThereAre() {
 PageOfTheHostHasItsOptions() {
     need_tool mandoc mandoc
     host=$KORVA_BINARY_DIR/bin/cmpihost
-    operations="ei ein gi ai ain ri rin ci mi di xq tree"
+    operations="ei ein gi ai ain ri rin ci mi di im xq tree classes describe namespaces"
     {
         "$host" --help
         for operation in $operations; do "$host" "$operation" --help; done

@@ -34,9 +34,11 @@ TEST(CommandLine, KnowsEveryOperation) {
         EXPECT_EQ(line.operation, row.operation) << row.word;
         EXPECT_EQ(line.path, "ns:Class");
         EXPECT_FALSE(line.properties.has_value());
-        EXPECT_EQ(line.provider + line.schema + line.companion, "");
+        EXPECT_EQ(line.provider + line.miName + line.companion, "");
+        EXPECT_TRUE(line.schemas.empty() && line.registrations.empty());
         EXPECT_EQ(line.format, Format::Table);
-        EXPECT_FALSE(line.log || line.bare || line.tree) << row.word;
+        EXPECT_EQ(line.command, Command::Operation);
+        EXPECT_FALSE(line.log || line.bare || line.time || line.value) << row.word;
     }
 }
 
@@ -48,13 +50,53 @@ TEST(CommandLine, TakesOptionsBeforeAndAfterTheOperation) {
         EXPECT_EQ(line.provider, "p.so");
         EXPECT_EQ(line.format, Format::Json);
         EXPECT_TRUE(line.log);
-        EXPECT_EQ(line.schema, "d");
+        EXPECT_THAT(line.schemas, ElementsAre("d"));
     }
     EXPECT_TRUE(accepted({"--bare", "ei", "X"}).bare);
     EXPECT_TRUE(accepted({"ei", "X", "--bare"}).bare);
     EXPECT_EQ(accepted({"--format", "mof", "ei", "X"}).format, Format::Mof);
     EXPECT_EQ(accepted({"--format", "table", "ei", "X"}).format, Format::Table);
-    EXPECT_TRUE(accepted({"--format", "table", "tree"}).tree);
+    EXPECT_EQ(accepted({"tree", "--time", "--name=N", "--provider=p"}).miName, "N");
+    EXPECT_TRUE(accepted({"--time", "tree"}).time);
+    EXPECT_EQ(accepted({"--value", "A", "ei", "X"}).value, "A");
+    EXPECT_THAT(accepted({"--schema", "a", "--schema", "b", "ei", "X"}).schemas,
+                ElementsAre("a", "b"));
+    EXPECT_THAT(accepted({"ei", "--registration=a", "X", "--registration", "b"}).registrations,
+                ElementsAre("a", "b"));
+}
+
+TEST(CommandLine, KnowsTheCommandsThatAskNoSingleProvider) {
+    EXPECT_EQ(accepted({"tree", "--format", "json"}).command, Command::Tree);
+    EXPECT_EQ(accepted({"classes"}).command, Command::Classes);
+    EXPECT_EQ(accepted({"namespaces"}).command, Command::Namespaces);
+    const CommandLine line = accepted({"describe", "X.P"});
+    EXPECT_EQ(line.command, Command::Describe);
+    EXPECT_EQ(line.subject, "X.P");
+}
+
+TEST(CommandLine, TakesAMethodWithItsParameters) {
+    const CommandLine line = accepted({"im", "X", "Stop", "How=1", "When="});
+    EXPECT_EQ(line.operation, Operation::InvokeMethod);
+    EXPECT_EQ(line.path + line.method, "XStop");
+    EXPECT_THAT(line.assignments, ElementsAre("How=1", "When="));
+}
+
+TEST(CommandLine, TakesALevelAndAChannelOfTheLogOrNone) {
+    const struct {
+        const char* word;
+        LogLevel level;
+        std::optional<LogChannel> channel;
+    } rows[] = {{"--log", LogLevel::Everything, std::nullopt},
+                {"--log=failures", LogLevel::Failures, std::nullopt},
+                {"--log=3000", LogLevel::Calls, std::nullopt},
+                {"--log=4000,log", LogLevel::Everything, LogChannel::Log},
+                {"--log=3000,trace", LogLevel::Calls, LogChannel::Trace},
+                {"--log=failures,cmpi", LogLevel::Failures, LogChannel::Cmpi}};
+    for (const auto& row : rows) {
+        const CommandLine line = accepted({row.word, "ei", "X"});
+        EXPECT_EQ(line.log->level, row.level) << row.word;
+        EXPECT_EQ(line.log->channel, row.channel) << row.word;
+    }
 }
 
 TEST(CommandLine, GathersThePropertyList) {
@@ -86,15 +128,14 @@ std::string refusal(const std::vector<const char*>& words) {
 }
 
 TEST(CommandLine, RefusesWhatItDoesNotKnow) {
-    const char* const otherForm = "--format: tree draws a picture, it has no other form";
     const struct {
         std::vector<const char*> words;
         const char* complaint;
     } rows[] = {
-        {{}, "An operation is required"},
-        {{"--log"}, "An operation is required"},
-        {{"zz"}, "There is no operation 'zz'"},
-        {{"\x1b[31m"}, "There is no operation '\\x1b[31m'"},
+        {{}, "A command is required"},
+        {{"--log"}, "A command is required"},
+        {{"zz"}, "There is no command 'zz'"},
+        {{"\x1b[31m"}, "There is no command '\\x1b[31m'"},
         {{"ei"}, "PATH is required"},
         {{"xq"}, "QUERY is required"},
         {{"ein", "X", "Name"}, "The following argument was not expected: Name"},
@@ -107,10 +148,14 @@ TEST(CommandLine, RefusesWhatItDoesNotKnow) {
         {{"--format", "xml", "ei", "X"}, "--format: expected table, mof or json, found 'xml'"},
         {{"--format", "mof", "--format", "json", "ei", "X"},
          "--format: At Most 1 required but received 2"},
-        {{"--format", "json", "tree"}, otherForm},
-        {{"tree", "--format", "json"}, otherForm},
-        {{"--format", "mof", "tree"}, otherForm},
-        {{"tree", "--format", "mof"}, otherForm},
+        {{"--format", "mof", "tree"}, "--format: tree has the forms table and json"},
+        {{"classes", "--format", "mof"}, "--format: classes has the forms table and json"},
+        {{"tree", "--value", "Name"}, "--value: tree prints no values"},
+        {{"--name", "N", "ei", "X"}, "--name requires --provider"},
+        {{"im", "X"}, "METHOD is required"},
+        {{"describe"}, "CLASS[.PROPERTY] is required"},
+        {{"--log=2000", "tree"}, "--log: expected failures, 3000 or 4000, found '2000'"},
+        {{"--log=3000,", "tree"}, "--log: expected log, trace or cmpi, found ''"},
         {{"--colour", "ei", "X"}, "The following argument was not expected: --colour"},
         {{"--provider", "p.so", "--bare", "ei", "X"}, "--provider excludes --bare"},
         {{"--companion", "c.so", "--computer-systems", "2", "tree"},
@@ -127,6 +172,8 @@ TEST(CommandLine, RefusesAnEmptyValueHoweverItIsWritten) {
         {"--result-class", {"ri", "X"}}, {"--role", {"rin", "X"}},
         {"--result-role", {"ain", "X"}}, {"--lang", {"xq", "q"}},
         {"--namespace", {"xq", "q"}},    {"--namespace", {"tree"}},
+        {"--name", {"ei", "X"}},         {"--registration", {"ei", "X"}},
+        {"--value", {"ei", "X"}},
     };
     for (const auto& [option, operation] : rows) {
         const std::string sign = std::string(option) + "=";
@@ -160,16 +207,19 @@ TEST(CommandLine, DescribesEverythingInItsHelp) {
     const ParsedCommandLine result = parsedLine({"--help"});
     EXPECT_FALSE(result.commandLine.has_value());
     EXPECT_EQ(result.status, exitDone);
-    for (const char* word :
-         {"Usage: cmpihost [OPTIONS] OPERATION ARGUMENT...", "--provider FILE", "--format FORMAT",
-          "--log", "--bare", "\n  --schema DIR                    Folder of", "--version",
-          "--assoc-class", "--result-class", "--role", "--result-role", "--properties", "--lang",
-          "--namespace", "Exit status:"}) {
-        EXPECT_THAT(result.text, HasSubstr(word));
+    for (const char* line :
+         {"Usage: cmpihost [OPTIONS] COMMAND ARGUMENT...\n", "\n  --provider FILE   ",
+          "\n  --name NAME  ", "\n  --registration PATH  ", "\n  --schema PATH  ", "\n  --bare   ",
+          "\n  --format FORMAT  ", "\n  --value PROPERTY  ", "\n  --log[=LEVEL[,CHANNEL]]  ",
+          "\n  --time  ", "\n  --version  ", "\nOperations:\n", "\nOverviews:\n", "\nPaths:\n",
+          "\nExit status:\n"}) {
+        EXPECT_THAT(result.text, HasSubstr(line));
     }
-    for (const char* line : {"Operations:", "Pictures:", "Paths:", "ei", "ein", "gi", "ci", "mi",
-                             "di", "xq", "ai", "ain", "ri", "rin", "tree"}) {
-        EXPECT_THAT(result.text, HasSubstr(std::string("\n") + line + "\n"));
+    for (const char* command : {"ei", "ein", "gi", "ci", "mi", "di", "ai", "ain", "ri", "rin", "im",
+                                "xq", "tree", "classes", "describe", "namespaces"}) {
+        EXPECT_THAT(result.text, HasSubstr("\n  " + std::string(command) + "   "));
+        EXPECT_THAT(parsedLine({command, "--help"}).text,
+                    HasSubstr("\nExample:\n  cmpihost " + std::string(command)));
     }
 }
 
