@@ -1,20 +1,41 @@
 #!/bin/sh
-# Follows the links of the documents, then runs every command that they show in a block marked "sh", from
-# the root folder. A dead link or a command that fails ends the run and is named.
+# Checks the documents: documents.sh [PRESET]...
+# Counts the words of those for users, follows the links of all, and runs every command that they show in a
+# block marked "sh", from the root folder: each works once ./run has built its part. A block marked "sh PRESET"
+# needs all of that preset's build, and is run if the preset is named here. The first thing that is wrong ends
+# the run and is named.
 set -eu
 cd "$(dirname "$0")/.."
+
+limit=9000
+words=$(cat README.md docs/*.md | wc -w)
+[ "$words" -le "$limit" ] || {
+    echo "README.md and docs/*.md have $words words, which is more than $limit" >&2
+    exit 1
+}
+echo "$words words for users, of $limit"
+
 sh tests/links.sh ./*.md docs/*.md docs/dev/*.md
+
 script=$(mktemp)
-trap 'rm -f "$script"' EXIT
+trap 'rm -f "$script" "$script.errors"' EXIT
 for document in ./*.md docs/*.md docs/dev/*.md; do
-    awk '/^```sh$/ {inside = 1; next} /^```/ {inside = 0} inside' "$document" >"$script"
+    # A document's blocks are one script: a later one may use what an earlier one made.
+    awk -v presets=" $* " -v document="$document" '
+        /^ *```/ && inside { inside = run = 0; next }
+        /^ *```/ {
+            inside = 1
+            if ($1 != "```sh") next
+            run = NF == 1 || index(presets, " " $2 " ")
+            if (!run) print "left out, needs the build of " $2 ": " document ":" NR >"/dev/stderr"
+            next
+        }
+        run' "$document" >"$script"
     [ -s "$script" ] || continue
     echo "commands of $document"
     sh -eu "$script" >/dev/null 2>"$script.errors" || {
         cat "$script.errors" "$script" >&2
-        rm -f "$script.errors"
         echo "a command of $document failed" >&2
         exit 1
     }
-    rm -f "$script.errors"
 done
