@@ -4,16 +4,17 @@
 
 namespace cmpihost {
 
-std::unique_ptr<Printer> makePrinter(Format format, std::ostream& stream, const Schema& schema) {
+std::unique_ptr<Printer> makePrinter(Format format, std::ostream& stream, const Schema& schema,
+                                     const Terminal& terminal) {
     switch (format) {
         case Format::Mof:
             return makeMofPrinter(stream);
         case Format::Json:
-            return makeJsonPrinter(stream);
+            return makeJsonPrinter(stream, schema);
         case Format::Table:
             break;
     }
-    return makeTablePrinter(stream, schema);
+    return makeTablePrinter(stream, schema, terminal);
 }
 
 }  // namespace cmpihost

@@ -1,10 +1,8 @@
 // The table is for people. Whatever comes from a provider may hold control characters, so all of it
-// is escaped in the last step, when it is written.
+// is escaped as the terminal needs it, before it is broken into lines and written.
 #include <algorithm>
-#include <limits>
 
 #include "base/Ascii.h"
-#include "base/Utf8.h"
 #include "host/cli/PathParser.h"
 #include "host/cli/Printer.h"
 #include "host/cli/ValueText.h"
@@ -23,27 +21,20 @@ std::string withNote(const std::string& text, const std::string& note) {
     return note.empty() ? text : text + " (" + note + ")";
 }
 
-std::string signedText(std::int64_t number, const Hints& hints) {
-    const std::string* name = hints.names.find(number);
-    return withNote(std::to_string(number), name == nullptr ? "" : *name);
-}
-
-std::string unsignedText(std::uint64_t number, const Hints& hints) {
-    if (number <= static_cast<std::uint64_t>(std::numeric_limits<std::int64_t>::max()) &&
-        !hints.names.empty()) {
-        return signedText(static_cast<std::int64_t>(number), hints);
-    }
+std::string integerText(const Value& value, const Hints& hints) {
+    const std::string* const name = nameOf(value, hints.names);
+    if (name != nullptr) return withNote(value.toText(), *name);
     // Below the next unit the number is as readable as it gets.
-    const bool sized = hints.kilobytes && number >= 1024;
-    return withNote(std::to_string(number), sized ? humanReadableSize(number) : "");
+    const bool sized = hints.kilobytes && categoryOf(value) == TypeCategory::Unsigned &&
+                       value.unsignedInteger() >= 1024;
+    return withNote(value.toText(), sized ? humanReadableSize(value.unsignedInteger()) : "");
 }
 
 std::string scalarText(const Value& value, const Hints& hints) {
     switch (categoryOf(value)) {
         case TypeCategory::Unsigned:
-            return unsignedText(value.unsignedInteger(), hints);
         case TypeCategory::Signed:
-            return signedText(value.signedInteger(), hints);
+            return integerText(value, hints);
         case TypeCategory::Boolean:
             return value.boolean() ? "TRUE" : "FALSE";
         case TypeCategory::Character:
@@ -72,9 +63,15 @@ std::string valueText(const Value& value, const Hints& hints) {
     return result.empty() ? "{}" : result;
 }
 
+/// References stay in one piece, for a path that is broken cannot be copied into a request.
+bool canBreak(const Value& value) {
+    return (value.type() & ~CMPI_ARRAY) != CMPI_ref;
+}
+
 class TablePrinter final : public Printer {
   public:
-    TablePrinter(std::ostream& stream, const Schema& schema) : stream_(stream), schema_(schema) {}
+    TablePrinter(std::ostream& stream, const Schema& schema, const Terminal& terminal)
+        : stream_(stream), schema_(schema), terminal_(terminal) {}
 
     void print(const std::vector<InstanceValue>& instances) override {
         bool first = true;
@@ -86,42 +83,44 @@ class TablePrinter final : public Printer {
     }
 
     void print(const std::vector<ObjectPathValue>& paths) override {
-        for (const ObjectPathValue& path : paths) {
-            stream_ << base::escapeForTerminal(toString(path)) << '\n';
-        }
+        for (const ObjectPathValue& path : paths)
+            stream_ << terminal_.shown(toString(path)) << '\n';
     }
 
   private:
     void print(const InstanceValue& instance) {
-        std::size_t width = 0;
+        std::size_t longest = 0;
         for (const PropertyValue& property : instance.properties) {
-            width = std::max(width, base::countUtf8(base::escapeForTerminal(property.name)));
+            longest = std::max(longest, columnsOf(terminal_.shown(property.name)));
         }
-        stream_ << base::escapeForTerminal(toString(instance.path)) << '\n';
+        stream_ << terminal_.shown(toString(instance.path)) << '\n';
         for (const PropertyValue& property : instance.properties) {
-            const std::string name = base::escapeForTerminal(property.name);
+            const std::string name = terminal_.shown(property.name);
             const Hints hints = hintsOf(instance.path.className, property.name);
-            stream_ << "  " << name << std::string(width - base::countUtf8(name) + 2, ' ')
-                    << base::escapeForTerminal(valueText(property.value, hints)) << '\n';
+            const std::string text = terminal_.shown(valueText(property.value, hints));
+            const std::size_t width = canBreak(property.value) ? terminal_.width : 0;
+            stream_ << "  " << name << std::string(longest - columnsOf(name) + 2, ' ')
+                    << wrap(text, width, longest + 4) << '\n';
         }
     }
 
     Hints hintsOf(const std::string& className, const std::string& propertyName) const {
         const mof::Feature* property = schema_.findProperty(className, propertyName);
-        const bool kilobytes =
-            property != nullptr &&
-            base::equalsIgnoreCase(mof::text(property->qualifiers, "Units"), "KiloBytes");
-        return {schema_.valueMap(className, propertyName), kilobytes};
+        const std::string units = property == nullptr ? "" : unitsOf(*property);
+        return {schema_.valueMap(className, propertyName),
+                base::equalsIgnoreCase(units, "KiloBytes") || units == "kibibyte"};
     }
 
     std::ostream& stream_;
     const Schema& schema_;
+    const Terminal terminal_;
 };
 
 }  // namespace
 
-std::unique_ptr<Printer> makeTablePrinter(std::ostream& stream, const Schema& schema) {
-    return std::make_unique<TablePrinter>(stream, schema);
+std::unique_ptr<Printer> makeTablePrinter(std::ostream& stream, const Schema& schema,
+                                          const Terminal& terminal) {
+    return std::make_unique<TablePrinter>(stream, schema, terminal);
 }
 
 }  // namespace cmpihost

@@ -2,8 +2,8 @@
 // provider answers and not what the host knows.
 #include "host/cli/Tree.h"
 
-#include "base/Utf8.h"
 #include "host/cli/Diagnostics.h"
+#include "host/cli/Json.h"
 #include "host/cli/ValueText.h"
 
 namespace cmpihost {
@@ -25,7 +25,7 @@ class TreeBuilder {
     std::vector<TreeNode> roots() const {
         std::vector<TreeNode> result;
         for (const InstanceValue& computer : enumerated(computerSystem)) {
-            TreeNode root{labelled(computer, text(computer, "Name"))};
+            TreeNode root = node(computer, text(computer, "Name"));
             root.branches.push_back(associated(computer, installedOn, &TreeBuilder::installed));
             root.branches.push_back(associated(computer, runningOn, &TreeBuilder::running));
             result.push_back(std::move(root));
@@ -63,26 +63,28 @@ class TreeBuilder {
         request.path = source.path;
         // One association at a time, as the answer does not say which one led to an instance.
         request.assocClass = association;
-        TreeNode node{association};
+        TreeNode result{association};
+        result.isAssociation = true;
         for (const InstanceValue& farEnd : answered(request)) {
-            node.branches.push_back((this->*branch)(farEnd));
+            result.branches.push_back((this->*branch)(farEnd));
         }
-        return node;
+        return result;
     }
 
     TreeNode installed(const InstanceValue& system) const {
-        TreeNode node{labelled(system, text(system, "Name") + " " + text(system, "Version")) +
-                      ": installed " + moment(system, "InstallDate")};
-        node.branches.push_back(
+        TreeNode result = node(system, text(system, "Name") + " " + text(system, "Version"),
+                               ": installed " + moment(system, "InstallDate"));
+        result.branches.push_back(
             associated(system, elementCapabilities, &TreeBuilder::capabilities));
-        return node;
+        return result;
     }
 
     /// The state of what runs; what it can do hangs on the installed one, which is the same system.
     TreeNode running(const InstanceValue& system) const {
-        return {labelled(system, text(system, "Name") + " " + text(system, "Version")) + ": " +
-                named(system, "EnabledState") + ", health " + named(system, "HealthState") +
-                ", up since " + moment(system, "LastBootUpTime")};
+        return node(system, text(system, "Name") + " " + text(system, "Version"),
+                    ": " + named(system, "EnabledState") + ", health " +
+                        named(system, "HealthState") + ", up since " +
+                        moment(system, "LastBootUpTime"));
     }
 
     TreeNode capabilities(const InstanceValue& instance) const {
@@ -90,12 +92,14 @@ class TreeBuilder {
         const char* name = editable == nullptr || editable->isNull() ? "not known"
                            : editable->boolean()                     ? "editable"
                                                                      : "fixed";
-        return {labelled(instance, text(instance, "InstanceID")) + ": name " + name +
-                ", shutdown of the host: " + named(instance, "HostShutdownBehavior")};
+        return node(instance, text(instance, "InstanceID"),
+                    std::string(": name ") + name +
+                        ", shutdown of the host: " + named(instance, "HostShutdownBehavior"));
     }
 
-    static std::string labelled(const InstanceValue& instance, const std::string& label) {
-        return label + " (" + instance.path.className + ")";
+    static TreeNode node(const InstanceValue& instance, const std::string& label,
+                         const std::string& remark = {}) {
+        return {label + " (" + instance.path.className + ")" + remark, {}, instance};
     }
 
     static std::string text(const InstanceValue& instance, const char* property) {
@@ -107,8 +111,8 @@ class TreeBuilder {
     std::string named(const InstanceValue& instance, const char* property) const {
         const Value* value = instance.property(property);
         if (value == nullptr || value->isNull()) return "(not known)";
-        const std::string* name = schema_.valueMap(instance.path.className, property)
-                                      .find(static_cast<std::int64_t>(value->unsignedInteger()));
+        const std::string* name =
+            nameOf(*value, schema_.valueMap(instance.path.className, property));
         return name == nullptr ? value->toText() : *name;
     }
 
@@ -123,21 +127,80 @@ class TreeBuilder {
     const Schema& schema_;
 };
 
-void drawBranches(const TreeNode& node, const std::string& margin, std::ostream& stream) {
+/// What stands before a branch, and before the lines of what hangs on it.
+struct Lines {
+    const char* branch;
+    const char* lastBranch;
+    const char* below;
+    const char* belowLast;
+};
+
+constexpr Lines drawn = {"├── ", "└── ", "│   ", "    "};
+constexpr Lines typed = {"|-- ", "`-- ", "|   ", "    "};
+
+/// A text on the lines that the terminal has room for beside the margin: all but the first begin
+/// with the margin and what leads to the branches below.
+std::string wrapped(const std::string& text, const std::string& margin, const char* hanging,
+                    const Terminal& terminal) {
+    const std::size_t taken = columnsOf(margin) + columnsOf(hanging);
+    const std::size_t room = terminal.width > taken ? terminal.width - taken : 0;
+    std::string result = wrap(terminal.shown(text), room);
+    const std::string lineEnd = '\n' + margin + hanging;
+    for (std::size_t at = result.find('\n'); at != std::string::npos;
+         at = result.find('\n', at + lineEnd.size())) {
+        result.replace(at, 1, lineEnd);
+    }
+    return result;
+}
+
+void drawBranches(const TreeNode& node, const std::string& margin, std::ostream& stream,
+                  const Terminal& terminal) {
+    const Lines& lines = terminal.utf8 ? drawn : typed;
     for (std::size_t index = 0; index < node.branches.size(); ++index) {
         const bool last = index + 1 == node.branches.size();
         const TreeNode& branch = node.branches[index];
-        stream << margin << (last ? "└── " : "├── ") << base::escapeForTerminal(branch.text)
-               << '\n';
-        drawBranches(branch, margin + (last ? "    " : "│   "), stream);
+        const std::string below = margin + (last ? lines.belowLast : lines.below);
+        const char* const hanging = branch.branches.empty() ? lines.belowLast : lines.below;
+        stream << margin << (last ? lines.lastBranch : lines.branch)
+               << wrapped(branch.text, below, hanging, terminal) << '\n';
+        drawBranches(branch, below, stream, terminal);
     }
+}
+
+Json nodeJson(const TreeNode& node, const std::string& association, const Schema& schema);
+
+void addNodes(Json& list, const TreeNode& node, const std::string& association,
+              const Schema& schema) {
+    for (const TreeNode& branch : node.branches) {
+        if (branch.isAssociation) {
+            addNodes(list, branch, branch.text, schema);
+        } else {
+            list.push_back(nodeJson(branch, association, schema));
+        }
+    }
+}
+
+Json nodeJson(const TreeNode& node, const std::string& association, const Schema& schema) {
+    Json object = {{"label", node.text}};
+    if (!association.empty()) object["association"] = association;
+    if (node.element) object["element"] = instanceJson(*node.element, schema);
+    Json branches = Json::array();
+    addNodes(branches, node, {}, schema);
+    object["branches"] = std::move(branches);
+    return object;
 }
 
 }  // namespace
 
-void drawTree(const TreeNode& root, std::ostream& stream) {
-    stream << base::escapeForTerminal(root.text) << '\n';
-    drawBranches(root, "", stream);
+void drawTree(const TreeNode& root, std::ostream& stream, const Terminal& terminal) {
+    stream << terminal.shown(root.text) << '\n';
+    drawBranches(root, "", stream, terminal);
+}
+
+void writeTreeJson(const std::vector<TreeNode>& roots, std::ostream& stream, const Schema& schema) {
+    Json list = Json::array();
+    for (const TreeNode& root : roots) list.push_back(nodeJson(root, {}, schema));
+    writeJson(list, stream);
 }
 
 std::vector<TreeNode> hostTree(const Ask& ask, const std::string& nameSpace, const Schema& schema) {

@@ -2,9 +2,13 @@
 // names) stands beside the exact value, never in its place.
 #include "host/cli/ValueText.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <ctime>
+#include <limits>
 
+#include "base/CimDateTime.h"
+#include "base/CivilTime.h"
 #include "base/Utf8.h"
 #include "host/broker/DateTimeText.h"
 
@@ -39,6 +43,56 @@ std::string intervalText(std::uint64_t seconds) {
     const unsigned rest = static_cast<unsigned>(seconds % 86400);
     return formatted("%u %s %02u:%02u:%02u", days, days == 1 ? "day" : "days", rest / 3600,
                      rest / 60 % 60, rest % 60);
+}
+
+/// The microseconds behind a count of seconds, if any.
+std::string fractionText(int microseconds) {
+    return microseconds == 0 ? std::string() : formatted(".%06d", microseconds);
+}
+
+std::string isoInstant(const base::CimDateTime& text) {
+    const base::CivilTime written = {*text.year, *text.month,  *text.day,
+                                     *text.hour, *text.minute, *text.second};
+    if (written.day > base::daysInMonth(written.year, written.month)) return {};
+    const base::CivilTime utc =
+        base::civilFromSeconds(base::secondsFromCivil(written) - *text.utcOffset * 60);
+    if (utc.year < 1 || utc.year > 9999) return {};
+    return formatted("%04d-%02d-%02dT%02d:%02d:%02d", static_cast<int>(utc.year), utc.month,
+                     utc.day, utc.hour, utc.minute, utc.second) +
+           fractionText(*text.microsecond) + "Z";
+}
+
+std::string isoDuration(const base::CimDateTime& text) {
+    const std::string seconds =
+        *text.second == 0 && *text.microsecond == 0
+            ? std::string()
+            : std::to_string(*text.second) + fractionText(*text.microsecond) + "S";
+    const auto part = [](int count, const char* letter) {
+        return count == 0 ? std::string() : std::to_string(count) + letter;
+    };
+    const std::string days = part(*text.days, "D");
+    const std::string time = part(*text.hour, "H") + part(*text.minute, "M") + seconds;
+    if (days.empty() && time.empty()) return "PT0S";
+    return "P" + days + (time.empty() ? "" : "T" + time);
+}
+
+constexpr struct {
+    const char* power;
+    const char* prefix;
+} prefixes[] = {{"10^3", "kilo"},   {"10^6", "mega"},   {"10^9", "giga"},  {"10^12", "tera"},
+                {"10^-3", "milli"}, {"10^-6", "micro"}, {"10^-9", "nano"}, {"2^10", "kibi"},
+                {"2^20", "mebi"},   {"2^30", "gibi"},   {"2^40", "tebi"}};
+
+/// A programmatic unit in words, as far as it is a unit with a power that has a prefix.
+std::string unitWords(const std::string& programmatic) {
+    std::string dense = programmatic;
+    dense.erase(std::remove(dense.begin(), dense.end(), ' '), dense.end());
+    const std::size_t times = dense.find('*');
+    if (times == std::string::npos) return programmatic;
+    for (const auto& row : prefixes) {
+        if (dense.substr(times + 1) == row.power) return row.prefix + dense.substr(0, times);
+    }
+    return programmatic;
 }
 
 }  // namespace
@@ -102,6 +156,27 @@ std::string humanReadableDateTime(const std::string& cimText) {
     if (!parsed || !parsed->microseconds || cimText.find('*') != std::string::npos) return {};
     const std::uint64_t seconds = *parsed->microseconds / microsecondsPerSecond;
     return parsed->interval ? intervalText(seconds) : instantText(seconds);
+}
+
+std::string isoDateTime(const std::string& cimText) {
+    const auto parsed = base::parseCimDateTime(cimText);
+    if (!parsed || cimText.find('*') != std::string::npos) return {};
+    return parsed->isInterval ? isoDuration(*parsed) : isoInstant(*parsed);
+}
+
+const std::string* nameOf(const Value& value, const ValueMap& names) {
+    const TypeCategory category = categoryOf(value);
+    if (category == TypeCategory::Signed) return names.find(value.signedInteger());
+    if (category != TypeCategory::Unsigned) return nullptr;
+    const std::uint64_t number = value.unsignedInteger();
+    const bool named =
+        number <= static_cast<std::uint64_t>(std::numeric_limits<std::int64_t>::max());
+    return named ? names.find(static_cast<std::int64_t>(number)) : nullptr;
+}
+
+std::string unitsOf(const mof::Feature& feature) {
+    const std::string units = mof::text(feature.qualifiers, "Units");
+    return units.empty() ? unitWords(mof::text(feature.qualifiers, "PUnit")) : units;
 }
 
 std::string characterText(std::uint64_t code) {

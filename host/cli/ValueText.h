@@ -5,6 +5,7 @@
 #include <string>
 
 #include "host/broker/Value.h"
+#include "host/mof/ValueMap.h"
 
 namespace cmpihost {
 
@@ -36,6 +37,20 @@ std::string humanReadableSize(std::uint64_t kibibytes);
 /// +01:00"), an interval as "3 days 04:05:06". Empty for a text that is neither, and for one that
 /// leaves digits open with '*'.
 std::string humanReadableDateTime(const std::string& cimText);
+
+/// A CIM datetime by ISO 8601: an instant in UTC ("2024-01-02T03:04:05Z"), an interval as a
+/// duration
+/// ("P3DT4H5M6S"), microseconds only where there are any ("PT0.500000S"). Empty for a text that is
+/// neither, and for one that leaves digits open with '*'.
+std::string isoDateTime(const std::string& cimText);
+
+/// The name of an integer, or null: it has none, or the value is something else.
+const std::string* nameOf(const Value& value, const ValueMap& names);
+
+/// The unit in which a property counts, in words: its qualifier Units as written ("KiloBytes"),
+/// else its PUnit, with a prefix in place of the usual powers ("byte * 2^10" is "kibibyte"). Empty
+/// for none.
+std::string unitsOf(const mof::Feature& feature);
 
 /// The text of a CMPI_char16 in UTF-8.
 std::string characterText(std::uint64_t code);

@@ -1,6 +1,7 @@
 // One run is one process: everything is loaded for a single request and unloaded before the exit,
 // so that what the broker catches while the provider cleans up is reported too.
 #include <time.h>
+#include <unistd.h>
 
 #include <exception>
 #include <filesystem>
@@ -140,7 +141,8 @@ class Run {
             return exitCimStatus;
         }
         // The libraries are gone by now, with whatever they may have left to write themselves.
-        printResult(request, result, schema, *makePrinter(commandLine_.format, out_, schema));
+        printResult(request, result, schema,
+                    *makePrinter(commandLine_.format, out_, schema, terminalOf(STDOUT_FILENO)));
         err_ << notesOn(request, result, schema);
         return written();
     }
@@ -165,7 +167,11 @@ class Run {
                 };
                 return hostTree(ask, nameSpace, schema);
             });
-            for (const TreeNode& root : roots) drawTree(root, out_);
+            if (commandLine_.format == Format::Json) {
+                writeTreeJson(roots, out_, schema);
+            } else {
+                for (const TreeNode& root : roots) drawTree(root, out_, terminalOf(STDOUT_FILENO));
+            }
         } catch (const TreeFailure& failure) {
             return failed(failure.what(), exitCimStatus);
         }

@@ -63,15 +63,16 @@ InstanceValue machine() {
              {"Part", Value::fromInstance(inner)}}};
 }
 
-std::string printed(Format format, const std::vector<InstanceValue>& instances) {
+std::string printed(Format format, const std::vector<InstanceValue>& instances,
+                    const Terminal& terminal = {}) {
     std::ostringstream stream;
-    makePrinter(format, stream, schema())->print(instances);
+    makePrinter(format, stream, schema(), terminal)->print(instances);
     return stream.str();
 }
 
 std::string printed(Format format, const std::vector<ObjectPathValue>& paths) {
     std::ostringstream stream;
-    makePrinter(format, stream, schema())->print(paths);
+    makePrinter(format, stream, schema(), {})->print(paths);
     return stream.str();
 }
 

@@ -55,7 +55,7 @@ class FakeHost {
 std::string drawn(const FakeHost& host) {
     static const Schema schema = Schema::load(KORVA_SOURCE_DIR "/schema");
     std::ostringstream stream;
-    for (const TreeNode& root : hostTree(host, "root/cimv2", schema)) drawTree(root, stream);
+    for (const TreeNode& root : hostTree(host, "root/cimv2", schema)) drawTree(root, stream, {});
     return stream.str();
 }
 
