@@ -18,14 +18,14 @@ double shownReal(const Value& value) {
     return shown;
 }
 
-Json listJson(const std::vector<Value>& elements, const Schema& schema) {
-    Json list = Json::array();
+JsonValue listJson(const std::vector<Value>& elements, const Schema& schema) {
+    JsonValue list = JsonValue::array();
     for (const Value& element : elements) list.push_back(valueJson(element, schema));
     return list;
 }
 
-void addProperties(Json& object, const InstanceValue& instance, const Schema& schema) {
-    Json properties = Json::object();
+void addProperties(JsonValue& object, const InstanceValue& instance, const Schema& schema) {
+    JsonValue properties = JsonValue::object();
     Annotations annotations;
     const std::string& className = instance.path.className;
     for (const PropertyValue& property : instance.properties) {
@@ -37,44 +37,44 @@ void addProperties(Json& object, const InstanceValue& instance, const Schema& sc
     std::move(annotations).addTo(object);
 }
 
-Json embeddedJson(const InstanceValue& instance, const Schema& schema) {
+JsonValue embeddedJson(const InstanceValue& instance, const Schema& schema) {
     // Without a path: what is embedded has none of its own.
-    Json object = {{"class", instance.path.className}};
+    JsonValue object = {{"class", instance.path.className}};
     addProperties(object, instance, schema);
     return object;
 }
 
-Json nameJson(const Value& value, const ValueMap& meanings) {
+JsonValue nameJson(const Value& value, const ValueMap& meanings) {
     const std::string* const name = nameOf(value, meanings);
-    return name == nullptr ? Json() : Json(*name);
+    return name == nullptr ? JsonValue() : JsonValue(*name);
 }
 
-Json timeJson(const Value& value) {
+JsonValue timeJson(const Value& value) {
     if (categoryOf(value) != TypeCategory::DateTime) return nullptr;
     const std::string text = isoDateTime(value.text());
-    return text.empty() ? Json() : Json(text);
+    return text.empty() ? JsonValue() : JsonValue(text);
 }
 
 /// What `one` gives for a value, or for each element of an array. Null when that is nothing at all.
 template <class One>
-Json eachJson(const Value& value, One one) {
+JsonValue eachJson(const Value& value, One one) {
     if (categoryOf(value) != TypeCategory::Array) return one(value);
-    Json list = Json::array();
+    JsonValue list = JsonValue::array();
     bool any = false;
     for (const Value& element : value.elements()) {
         list.push_back(one(element));
         any = any || !list.back().is_null();
     }
-    return any ? list : Json();
+    return any ? list : JsonValue();
 }
 
-void addUnlessNull(Json& object, const std::string& name, Json value) {
+void addUnlessNull(JsonValue& object, const std::string& name, JsonValue value) {
     if (!value.is_null()) object[name] = std::move(value);
 }
 
 }  // namespace
 
-Json valueJson(const Value& value, const Schema& schema) {
+JsonValue valueJson(const Value& value, const Schema& schema) {
     switch (categoryOf(value)) {
         case TypeCategory::Unsigned:
             return value.unsignedInteger();
@@ -109,27 +109,27 @@ void Annotations::add(const std::string& name, const Value& value, const ValueMa
     if (!units.empty()) units_[name] = units;
 }
 
-void Annotations::addTo(Json& object) && {
+void Annotations::addTo(JsonValue& object) && {
     object["names"] = std::move(names_);
     object["times"] = std::move(times_);
     object["units"] = std::move(units_);
 }
 
-Json pathJson(const ObjectPathValue& path, const Schema& schema) {
-    Json keys = Json::object();
+JsonValue pathJson(const ObjectPathValue& path, const Schema& schema) {
+    JsonValue keys = JsonValue::object();
     for (const KeyBinding& key : path.keys) keys[key.name] = valueJson(key.value, schema);
     return {{"class", path.className}, {"path", toString(path)}, {"keys", std::move(keys)}};
 }
 
-Json instanceJson(const InstanceValue& instance, const Schema& schema) {
-    Json object = pathJson(instance.path, schema);
+JsonValue instanceJson(const InstanceValue& instance, const Schema& schema) {
+    JsonValue object = pathJson(instance.path, schema);
     addProperties(object, instance, schema);
     return object;
 }
 
-void writeJson(const Json& document, std::ostream& stream) {
+void writeJson(const JsonValue& document, std::ostream& stream) {
     // A provider's text may be no UTF-8, and what is printed has to be JSON all the same.
-    stream << document.dump(2, ' ', false, Json::error_handler_t::replace) << '\n';
+    stream << document.dump(2, ' ', false, JsonValue::error_handler_t::replace) << '\n';
 }
 
 }  // namespace cmpihost

@@ -12,10 +12,10 @@
 namespace cmpihost {
 
 /// Members stay in the order in which they were added.
-using Json = nlohmann::ordered_json;
+using JsonValue = nlohmann::ordered_json;
 
 /// A value with its JSON type; what an embedded instance holds is looked up in the schema.
-Json valueJson(const Value& value, const Schema& schema);
+JsonValue valueJson(const Value& value, const Schema& schema);
 
 /// What stands beside the values of an object, each kind in a member of its own and by the names of
 /// the values: `names` (of numbers), `times` (datetimes in ISO 8601) and `units`.
@@ -26,22 +26,22 @@ class Annotations {
              const mof::Feature* declaration);
 
     /// Adds the three members, also those that are empty.
-    void addTo(Json& object) &&;
+    void addTo(JsonValue& object) &&;
 
   private:
-    Json names_ = Json::object();
-    Json times_ = Json::object();
-    Json units_ = Json::object();
+    JsonValue names_ = JsonValue::object();
+    JsonValue times_ = JsonValue::object();
+    JsonValue units_ = JsonValue::object();
 };
 
 /// `class`, `path` and `keys`.
-Json pathJson(const ObjectPathValue& path, const Schema& schema);
+JsonValue pathJson(const ObjectPathValue& path, const Schema& schema);
 
 /// The same with `properties` and their annotations.
-Json instanceJson(const InstanceValue& instance, const Schema& schema);
+JsonValue instanceJson(const InstanceValue& instance, const Schema& schema);
 
 /// Writes a whole document and a line end.
-void writeJson(const Json& document, std::ostream& stream);
+void writeJson(const JsonValue& document, std::ostream& stream);
 
 }  // namespace cmpihost
 

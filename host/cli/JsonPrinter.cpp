@@ -10,7 +10,7 @@ class JsonPrinter final : public Printer {
     JsonPrinter(std::ostream& stream, const Schema& schema) : stream_(stream), schema_(schema) {}
 
     void print(const std::vector<InstanceValue>& instances) override {
-        Json list = Json::array();
+        JsonValue list = JsonValue::array();
         for (const InstanceValue& instance : instances) {
             list.push_back(instanceJson(instance, schema_));
         }
@@ -18,7 +18,7 @@ class JsonPrinter final : public Printer {
     }
 
     void print(const std::vector<ObjectPathValue>& paths) override {
-        Json list = Json::array();
+        JsonValue list = JsonValue::array();
         for (const ObjectPathValue& path : paths) list.push_back(pathJson(path, schema_));
         writeJson(list, stream_);
     }

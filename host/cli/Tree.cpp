@@ -160,16 +160,16 @@ void drawBranches(const TreeNode& node, const std::string& margin, std::ostream&
         const bool last = index + 1 == node.branches.size();
         const TreeNode& branch = node.branches[index];
         const std::string below = margin + (last ? lines.belowLast : lines.below);
-        const char* const hanging = branch.branches.empty() ? lines.belowLast : lines.below;
+        const char* const hanging = branch.branches.empty() ? "" : lines.below;
         stream << margin << (last ? lines.lastBranch : lines.branch)
                << wrapped(branch.text, below, hanging, terminal) << '\n';
         drawBranches(branch, below, stream, terminal);
     }
 }
 
-Json nodeJson(const TreeNode& node, const std::string& association, const Schema& schema);
+JsonValue nodeJson(const TreeNode& node, const std::string& association, const Schema& schema);
 
-void addNodes(Json& list, const TreeNode& node, const std::string& association,
+void addNodes(JsonValue& list, const TreeNode& node, const std::string& association,
               const Schema& schema) {
     for (const TreeNode& branch : node.branches) {
         if (branch.isAssociation) {
@@ -180,11 +180,11 @@ void addNodes(Json& list, const TreeNode& node, const std::string& association,
     }
 }
 
-Json nodeJson(const TreeNode& node, const std::string& association, const Schema& schema) {
-    Json object = {{"label", node.text}};
+JsonValue nodeJson(const TreeNode& node, const std::string& association, const Schema& schema) {
+    JsonValue object = {{"label", node.text}};
     if (!association.empty()) object["association"] = association;
     if (node.element) object["element"] = instanceJson(*node.element, schema);
-    Json branches = Json::array();
+    JsonValue branches = JsonValue::array();
     addNodes(branches, node, {}, schema);
     object["branches"] = std::move(branches);
     return object;
@@ -198,7 +198,7 @@ void drawTree(const TreeNode& root, std::ostream& stream, const Terminal& termin
 }
 
 void writeTreeJson(const std::vector<TreeNode>& roots, std::ostream& stream, const Schema& schema) {
-    Json list = Json::array();
+    JsonValue list = JsonValue::array();
     for (const TreeNode& root : roots) list.push_back(nodeJson(root, {}, schema));
     writeJson(list, stream);
 }

@@ -7,8 +7,10 @@
 
 using Words = std::vector<std::string>;
 
-/// Runs the built cmpihost, in UTC unless the environment names another zone.
-inline ProgramRun cmpihost(const Words& arguments, const Words& environment = {"TZ=UTC0"}) {
+/// Runs the built cmpihost, in UTC and with UTF-8 unless the environment says otherwise.
+inline ProgramRun cmpihost(const Words& arguments, Words environment = {}) {
+    // The first of two variables of one name counts.
+    environment.insert(environment.end(), {"TZ=UTC0", "LC_ALL=C.UTF-8"});
     return runProgram(KORVA_CMPIHOST, arguments, environment);
 }
 

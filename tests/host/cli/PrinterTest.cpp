@@ -24,7 +24,9 @@ const Schema& schema() {
             "\"Rest\"}] uint16 Kind; "
             "[ValueMap{\"2\", \"11\"}, Values{\"OK\", \"In Service\"}] uint16 States[];"
             "[ValueMap{\"-1\"}, Values{\"Below\"}] sint8 Level;"
-            "[Units(\"KiloBytes\")] uint64 Memory; [Units(\"KiloBytes\")] uint64 Small; };",
+            "[Units(\"KiloBytes\")] uint64 Memory; [Units(\"KiloBytes\")] uint64 Small; };"
+            "class Part { [PUnit(\"meter * 10^-3\"), ValueMap{\"3\"}, Values{\"Wide\"}]"
+            " uint8 Size; };",
             "x.mof"));
         return loaded;
     }();
@@ -50,6 +52,10 @@ InstanceValue machine() {
              {"Largest", Value::fromUnsigned(18446744073709551615U)},
              {"Least", Value::fromSigned(INT64_MIN)},
              {"Started", Value::fromText("20240102030405.000000+000", CMPI_dateTime)},
+             {"Spans", Value::fromArray(CMPI_dateTime, {Value::fromText("00000003040506.000000:000",
+                                                                        CMPI_dateTime),
+                                                        Value::null(CMPI_dateTime)})},
+             {"Opened", Value::fromText("2024**********.******+000", CMPI_dateTime)},
              {"Empty", Value("")},
              {"Unset", Value::null(CMPI_string)},
              {"Raw", Value("a\n\x1b[31m\xFF")},
@@ -98,6 +104,8 @@ TEST_F(Printers, ShowAnInstanceAsATable) {
               "  Largest  18446744073709551615\n"
               "  Least    -9223372036854775808\n"
               "  Started  20240102030405.000000+000 (2024-01-02 03:04:05 +00:00)\n"
+              "  Spans    00000003040506.000000:000 (3 days 04:05:06), NULL\n"
+              "  Opened   2024**********.******+000\n"
               "  Empty    \"\"\n"
               "  Unset    NULL\n"
               "  Raw      a\\n\\x1b[31m\\xff\n"
@@ -109,6 +117,25 @@ TEST_F(Printers, ShowAnInstanceAsATable) {
               "  Letter   \xC3\xA9\n"
               "  Other    a/b:Machine.Name=\"x\"\n"
               "  Part     instance of Part\n");
+}
+
+TEST_F(Printers, BreakLongTextsForTheTerminalButNoPaths) {
+    const Value other = Value::fromReference({"a/b", "Machine", {{"Name", Value("x y z x y z")}}});
+    const InstanceValue wide{
+        machinePath(),
+        {{"Text", Value("caf\u00e9 one two three four five")},
+         {"Words",
+          Value::fromArray(CMPI_string, {Value("one, two"), Value("three"), Value("four, five")})},
+         {"Other", other},
+         {"All", Value::fromArray(CMPI_ref, {other})}}};
+    EXPECT_EQ(printed(Format::Table, std::vector{wide}, {32, false}),
+              "root/cimv2:Machine.Name=\"m\\\"1\"\n"
+              "  Text   caf\\u00e9 one two three\n"
+              "         four five\n"
+              "  Words  \"one, two\", \"three\",\n"
+              "         \"four, five\"\n"
+              "  Other  a/b:Machine.Name=\"x y z x y z\"\n"
+              "  All    a/b:Machine.Name=\"x y z x y z\"\n");
 }
 
 TEST_F(Printers, ShowSizesAndNamesFromTheirBoundsOn) {
@@ -136,6 +163,8 @@ TEST_F(Printers, ShowAnInstanceAsMof) {
               "    Largest = 18446744073709551615;\n"
               "    Least = -9223372036854775808;\n"
               "    Started = \"20240102030405.000000+000\";\n"
+              "    Spans = {\"00000003040506.000000:000\", NULL};\n"
+              "    Opened = \"2024**********.******+000\";\n"
               "    Empty = \"\";\n"
               "    Unset = NULL;\n"
               "    Raw = \"a\\n\\x001B[31m\xEF\xBF\xBD\";\n"
@@ -159,6 +188,9 @@ TEST_F(Printers, ShowAnInstanceAsJson) {
   {
     "class": "Machine",
     "path": "root/cimv2:Machine.Name=\"m\\\"1\"",
+    "keys": {
+      "Name": "m\"1"
+    },
     "properties": {
       "Name": "m\"1",
       "Kind": 36,
@@ -173,6 +205,11 @@ TEST_F(Printers, ShowAnInstanceAsJson) {
       "Largest": 18446744073709551615,
       "Least": -9223372036854775808,
       "Started": "20240102030405.000000+000",
+      "Spans": [
+        "00000003040506.000000:000",
+        null
+      ],
+      "Opened": "2024**********.******+000",
       "Empty": "",
       "Unset": null,
 )json"
@@ -187,13 +224,46 @@ TEST_F(Printers, ShowAnInstanceAsJson) {
       "Ratio": 0.1,
       "Whole": 3.0,
       "Letter": "é",
-      "Other": "a/b:Machine.Name=\"x\"",
+      "Other": {
+        "class": "Machine",
+        "path": "a/b:Machine.Name=\"x\"",
+        "keys": {
+          "Name": "x"
+        }
+      },
       "Part": {
         "class": "Part",
         "properties": {
           "Size": 3
+        },
+        "names": {
+          "Size": "Wide"
+        },
+        "times": {},
+        "units": {
+          "Size": "millimeter"
         }
       }
+    },
+    "names": {
+      "Kind": "LINUX",
+      "States": [
+        "OK",
+        "In Service",
+        null
+      ],
+      "Level": "Below"
+    },
+    "times": {
+      "Started": "2024-01-02T03:04:05Z",
+      "Spans": [
+        "P3DT4H5M6S",
+        null
+      ]
+    },
+    "units": {
+      "Memory": "KiloBytes",
+      "Small": "KiloBytes"
     }
   }
 ]
@@ -217,11 +287,17 @@ TEST_F(Printers, ShowPathsOneByOne) {
     EXPECT_EQ(printed(Format::Json, paths), R"json([
   {
     "class": "Machine",
-    "path": "root/cimv2:Machine.Name=\"m\\\"1\""
+    "path": "root/cimv2:Machine.Name=\"m\\\"1\"",
+    "keys": {
+      "Name": "m\"1"
+    }
   },
   {
     "class": "Machine",
-    "path": "root:Machine.Name=\"a\nb\""
+    "path": "root:Machine.Name=\"a\nb\"",
+    "keys": {
+      "Name": "a\nb"
+    }
   }
 ]
 )json");
@@ -256,6 +332,40 @@ TEST(HumanReadableSize, HasTheLargestUnitThatLeavesAtLeastOneAndRoundsIntoTheNex
                                                           {4294967295, "4.0 TiB"},
                                                           {18446744073709551615U, "16.0 ZiB"}};
     for (const auto& [kibibytes, text] : rows) EXPECT_EQ(humanReadableSize(kibibytes), text);
+}
+
+TEST(IsoDateTime, IsTheTrueInstantInUtcOrADuration) {
+    const std::pair<const char*, const char*> rows[] = {
+        {"20240102030405.000000+000", "2024-01-02T03:04:05Z"},
+        {"20240102080405.123456+300", "2024-01-02T03:04:05.123456Z"},
+        {"20240101213405.000000-330", "2024-01-02T03:04:05Z"},
+        {"19691231235959.000000+000", "1969-12-31T23:59:59Z"},
+        {"00010101000000.000000+001", ""},
+        {"99991231235959.000000-001", ""},
+        {"20230229000000.000000+000", ""},
+        {"2024010203****.000000+000", ""},
+        {"00000003040506.000000:000", "P3DT4H5M6S"},
+        {"00000010000000.000000:000", "P10D"},
+        {"00000000010000.000001:000", "PT1H0.000001S"},
+        {"00000000000000.000000:000", "PT0S"},
+        {"000000030405**.******:000", ""},
+        {"yesterday", ""}};
+    for (const auto& [cimText, iso] : rows) EXPECT_EQ(isoDateTime(cimText), iso) << cimText;
+}
+
+TEST(UnitsOf, AreTheWordsOfTheSchemaElseThoseOfTheProgrammaticUnit) {
+    const std::pair<const char*, const char*> rows[] = {
+        {"Units(\"KiloBytes\"), PUnit(\"byte * 10^3\")", "KiloBytes"},
+        {"PUnit(\"byte * 2^10\")", "kibibyte"},
+        {"PUnit(\"second*10^-6\")", "microsecond"},
+        {"PUnit(\"percent\")", "percent"},
+        {"PUnit(\"bit / second * 10^6 * 3\")", "bit / second * 10^6 * 3"},
+        {"Key", ""}};
+    for (const auto& [qualifiers, units] : rows) {
+        const mof::Document document =
+            mof::parse("class A { [" + std::string(qualifiers) + "] uint64 P; };", "x.mof");
+        EXPECT_EQ(unitsOf(document.classes[0].properties[0]), units);
+    }
 }
 
 TEST_F(Printers, ShowAnInstantInTheZoneOfTheReaderAndAnInterval) {

@@ -52,10 +52,16 @@ class FakeHost {
     }
 };
 
-std::string drawn(const FakeHost& host) {
-    static const Schema schema = Schema::load(KORVA_SOURCE_DIR "/schema");
+const Schema& schema() {
+    static const Schema instance = Schema::load(KORVA_SOURCE_DIR "/schema");
+    return instance;
+}
+
+std::string drawn(const FakeHost& host, const Terminal& terminal = {}) {
     std::ostringstream stream;
-    for (const TreeNode& root : hostTree(host, "root/cimv2", schema)) drawTree(root, stream, {});
+    for (const TreeNode& root : hostTree(host, "root/cimv2", schema())) {
+        drawTree(root, stream, terminal);
+    }
     return stream.str();
 }
 
@@ -91,6 +97,72 @@ TEST(Tree, WithoutAComputerShowsTheOperatingSystemsAlone) {
     └── KORVA_OSElementCapabilities
         └── Linux (KORVA_OperatingSystemCapabilities): name fixed, shutdown of the host: No effect
 )");
+}
+
+TEST(Tree, IsDrawnWithAsciiWhereTheLocaleHasNoLinesAndWithinItsWidth) {
+    FakeHost host;
+    EXPECT_EQ(drawn(host, {60, false}), R"(vm (KORVA_ComputerSystem)
+|-- KORVA_InstalledOS
+|   `-- Linux 12 (KORVA_OperatingSystem): installed (not
+|       |   known)
+|       `-- KORVA_OSElementCapabilities
+|           `-- Linux (KORVA_OperatingSystemCapabilities):
+|               name fixed, shutdown of the host: No effect
+`-- KORVA_RunningOS
+    `-- Linux 12 (KORVA_OperatingSystem): Enabled, health
+        OK, up since (not known)
+)");
+    EXPECT_EQ(drawn(host, {0, false}).find("└"), std::string::npos);
+}
+
+TEST(Tree, HasAFormForPrograms) {
+    FakeHost host;
+    host.hasComputer = false;
+    host.system = {{"Name", "Linux"}, {"HealthState", Value::fromUnsigned(5, CMPI_uint16)}};
+    host.capabilities = {};
+    std::ostringstream stream;
+    writeTreeJson(hostTree(host, "root/cimv2", schema()), stream, schema());
+    EXPECT_EQ(stream.str(), R"json([
+  {
+    "label": "no KORVA_ComputerSystem, so nothing is associated",
+    "branches": [
+      {
+        "label": "Linux (not known) (KORVA_OperatingSystem): installed (not known)",
+        "element": {
+          "class": "KORVA_OperatingSystem",
+          "path": "KORVA_OperatingSystem",
+          "keys": {},
+          "properties": {
+            "Name": "Linux",
+            "HealthState": 5
+          },
+          "names": {
+            "HealthState": "OK"
+          },
+          "times": {},
+          "units": {}
+        },
+        "branches": [
+          {
+            "label": "(not known) (KORVA_OperatingSystemCapabilities): name not known, shutdown of the host: (not known)",
+            "association": "KORVA_OSElementCapabilities",
+            "element": {
+              "class": "KORVA_OperatingSystemCapabilities",
+              "path": "KORVA_OperatingSystemCapabilities",
+              "keys": {},
+              "properties": {},
+              "names": {},
+              "times": {},
+              "units": {}
+            },
+            "branches": []
+          }
+        ]
+      }
+    ]
+  }
+]
+)json");
 }
 
 TEST(Tree, WritesControlCharactersOut) {
