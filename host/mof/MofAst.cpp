@@ -3,6 +3,7 @@
 #include "host/mof/MofAst.h"
 
 #include <iterator>
+#include <utility>
 
 #include "base/Ascii.h"
 
@@ -103,8 +104,7 @@ const Qualifier* findQualifier(const std::vector<Qualifier>& qualifiers, const s
     return nullptr;
 }
 
-bool isSet(const std::vector<Qualifier>& qualifiers, const std::string& name) {
-    const Qualifier* qualifier = findQualifier(qualifiers, name);
+bool isSet(const Qualifier* qualifier) {
     if (qualifier == nullptr) return false;
     // Boolean qualifiers are mostly given by name alone.
     if (!qualifier->value) return true;
@@ -112,18 +112,29 @@ bool isSet(const std::vector<Qualifier>& qualifiers, const std::string& name) {
     return items.size() == 1 && items.front() == Scalar(true);
 }
 
-std::vector<std::string> texts(const std::vector<Qualifier>& qualifiers, const std::string& name) {
+bool isSet(const std::vector<Qualifier>& qualifiers, const std::string& name) {
+    return isSet(findQualifier(qualifiers, name));
+}
+
+std::vector<std::string> texts(const Qualifier* qualifier) {
     std::vector<std::string> result;
-    const Qualifier* qualifier = findQualifier(qualifiers, name);
     if (qualifier == nullptr || !qualifier->value) return result;
     for (const Scalar& item : qualifier->value->items)
         if (const auto* string = std::get_if<std::string>(&item)) result.push_back(*string);
     return result;
 }
 
+std::vector<std::string> texts(const std::vector<Qualifier>& qualifiers, const std::string& name) {
+    return texts(findQualifier(qualifiers, name));
+}
+
+std::string text(const Qualifier* qualifier) {
+    std::vector<std::string> all = texts(qualifier);
+    return all.empty() ? std::string() : std::move(all.front());
+}
+
 std::string text(const std::vector<Qualifier>& qualifiers, const std::string& name) {
-    const std::vector<std::string> all = texts(qualifiers, name);
-    return all.empty() ? std::string() : all.front();
+    return text(findQualifier(qualifiers, name));
 }
 
 }  // namespace cmpihost::mof

@@ -67,11 +67,39 @@ struct Initializer {
     std::vector<Scalar> items;
 };
 
+/// How a qualifier passes from a class to its subclasses. What is absent is not told.
+struct Flavor {
+    /// ToSubclass; false: Restricted.
+    std::optional<bool> toSubclass{};
+    /// EnableOverride; false: DisableOverride.
+    std::optional<bool> overridable{};
+    bool translatable = false;
+
+    bool operator==(const Flavor& other) const {
+        return toSubclass == other.toSubclass && overridable == other.overridable &&
+               translatable == other.translatable;
+    }
+};
+
 struct Qualifier {
     std::string name;
     Position position;
     /// Absent where the qualifier stands alone, which says "true".
-    std::optional<Initializer> value;
+    std::optional<Initializer> value{};
+    Flavor flavor{};
+};
+
+/// The declaration of a qualifier: "Qualifier Key : boolean = false, Scope(property), ...".
+struct QualifierType {
+    std::string name;
+    std::string file;
+    Position position;
+    Type type = Type::String;
+    bool array = false;
+    std::optional<Initializer> defaultValue{};
+    /// What it may stand on, as written: "class", "any".
+    std::vector<std::string> scopes{};
+    Flavor flavor{};
 };
 
 /// A property, a reference or the parameter of a method.
@@ -101,10 +129,18 @@ struct Class {
     std::vector<Method> methods;
 };
 
-/// The classes of one text in their order, and the files that its include pragmas name.
+/// A file that an include pragma names.
+struct Include {
+    std::string file;
+    Position position;
+};
+
+/// What one text holds, each in its order.
 struct Document {
+    std::string file;
+    std::vector<QualifierType> qualifierTypes;
     std::vector<Class> classes;
-    std::vector<std::string> includes;
+    std::vector<Include> includes;
 };
 
 /// The type of that name (without case); absent for a name that is no intrinsic type.
@@ -120,13 +156,17 @@ bool fits(const Scalar& scalar, Type type);
 /// The qualifier of that name (without case), or null.
 const Qualifier* findQualifier(const std::vector<Qualifier>& qualifiers, const std::string& name);
 
-/// Whether a boolean qualifier is there and true.
+/// Whether a boolean qualifier is there (not null) and true.
+bool isSet(const Qualifier* qualifier);
 bool isSet(const std::vector<Qualifier>& qualifiers, const std::string& name);
 
-/// The texts of a qualifier: one for a string, many for a list; empty when absent or no strings.
+/// The texts of a qualifier: one for a string, many for a list; empty when absent (null) or no
+/// strings.
+std::vector<std::string> texts(const Qualifier* qualifier);
 std::vector<std::string> texts(const std::vector<Qualifier>& qualifiers, const std::string& name);
 
 /// The text of a string qualifier; empty when absent.
+std::string text(const Qualifier* qualifier);
 std::string text(const std::vector<Qualifier>& qualifiers, const std::string& name);
 
 }  // namespace cmpihost::mof

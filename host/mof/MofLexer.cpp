@@ -73,6 +73,13 @@ char Lexer::take() {
     return c;
 }
 
+std::string_view Lexer::takeWithinLine(std::size_t length) {
+    const std::string_view taken = text_.substr(offset_, length);
+    for (const char c : taken) position_.column += base::startsUtf8(c) ? 1 : 0;
+    offset_ += length;
+    return taken;
+}
+
 void Lexer::skipBlockComment() {
     const Position start = position_;
     // Both marks go at once, for "/*/" does not end what it begins.
@@ -118,9 +125,9 @@ Token Lexer::next() {
 }
 
 Token Lexer::word(TokenKind kind, Position start) {
-    std::string text(1, take());
-    while (isWordPart(peek())) text += take();
-    return {kind, start, std::move(text), {}};
+    std::size_t length = 1;
+    while (isWordPart(peek(length))) ++length;
+    return {kind, start, std::string(takeWithinLine(length)), {}};
 }
 
 Token Lexer::number(Position start) {
@@ -172,16 +179,21 @@ void Lexer::appendEscape(std::string& to, const char* within) {
 std::string Lexer::quoted(Position start, char delimiter, const char* what) {
     take();
     std::string content;
-    while (peek() != delimiter) {
+    // Most of a schema is the insides of strings: what stands for itself is taken at once.
+    const auto takeRun = [&] {
+        const std::string_view rest = text_.substr(offset_);
+        std::size_t length = 0;
+        while (length < rest.size() && rest[length] != delimiter && rest[length] != '\\' &&
+               rest[length] != '\n')
+            ++length;
+        content += takeWithinLine(length);
+    };
+    for (takeRun(); peek() != delimiter; takeRun()) {
         // A quote that is missing is reported on its line, not at the end of the file.
         if (atEnd() || peek() == '\n')
             fail(start, std::string("the ") + what + " that begins here is not closed by " +
                             (delimiter == '"' ? "'\"'" : "'") + " on its line");
-        if (peek() == '\\') {
-            appendEscape(content, what);
-        } else {
-            content += take();
-        }
+        appendEscape(content, what);
     }
     take();
     return content;

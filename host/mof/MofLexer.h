@@ -36,6 +36,8 @@ class Lexer {
   private:
     char peek(std::size_t ahead = 0) const;
     char take();
+    /// Takes so many bytes, none of them the end of a line.
+    std::string_view takeWithinLine(std::size_t length);
     bool atEnd() const { return offset_ >= text_.size(); }
     void skipBlanksAndComments();
     void skipBlockComment();

@@ -3,13 +3,12 @@
 #include "host/mof/Schema.h"
 
 #include <algorithm>
-#include <fstream>
-#include <iterator>
 #include <stdexcept>
 #include <unordered_set>
+#include <utility>
 
 #include "base/Ascii.h"
-#include "host/mof/MofParser.h"
+#include "host/mof/SchemaFiles.h"
 
 namespace cmpihost {
 
@@ -17,74 +16,36 @@ namespace {
 
 namespace fs = std::filesystem;
 
-std::vector<fs::path> mofFiles(const fs::path& folder) {
-    std::vector<fs::path> files;
-    std::error_code error;
-    for (fs::directory_iterator entry(folder, error), end; !error && entry != end;
-         entry.increment(error)) {
-        if (base::equalsIgnoreCase(entry->path().extension().string(), ".mof"))
-            files.push_back(entry->path());
-    }
-    if (error) {
-        throw std::runtime_error("the schema folder " + folder.string() +
-                                 " cannot be read: " + error.message());
-    }
-    // Folders have an order of their own on each machine; complaints must not.
-    std::sort(files.begin(), files.end());
-    return files;
+const mof::Feature* ownProperty(const mof::Class& declared, std::string_view name) {
+    for (const mof::Feature& property : declared.properties)
+        if (base::equalsIgnoreCase(property.name, name)) return &property;
+    return nullptr;
 }
 
-std::string contentOf(const fs::path& file) {
-    // Opening a named pipe would wait for its other end.
-    std::error_code error;
-    const fs::file_status status = fs::status(file, error);
-    if (fs::exists(status) && !fs::is_regular_file(status)) {
-        throw std::runtime_error("the schema file " + file.string() + " is not a regular file");
-    }
-    std::ifstream stream(file, std::ios::binary);
-    std::string content{std::istreambuf_iterator<char>(stream), std::istreambuf_iterator<char>()};
-    if (!stream) throw std::runtime_error("the schema file " + file.string() + " cannot be read");
-    return content;
-}
-
-/// In the order of mof::Type.
-constexpr CMPIType elementTypes[] = {CMPI_boolean, CMPI_string, CMPI_char16, CMPI_dateTime,
-                                     CMPI_uint8,   CMPI_sint8,  CMPI_uint16, CMPI_sint16,
-                                     CMPI_uint32,  CMPI_sint32, CMPI_uint64, CMPI_sint64,
-                                     CMPI_real32,  CMPI_real64, CMPI_ref};
-static_assert(std::size(elementTypes) == static_cast<std::size_t>(mof::Type::Reference) + 1);
-
-ClassDeclaration declarationOf(const Schema& schema, const mof::Class& source) {
-    ClassDeclaration result;
-    result.name = source.name;
-    result.superclass = source.superclass;
-    result.association = schema.isAssociation(source.name);
-    for (const mof::Feature* property : schema.properties(source.name)) {
-        result.properties.push_back({property->name, cmpiType(*property),
-                                     schema.isKey(source.name, property->name),
-                                     property->referenceClass});
-    }
-    return result;
+std::string listed(const std::vector<fs::path>& paths) {
+    std::string text;
+    for (const fs::path& path : paths) text += (text.empty() ? "" : ", ") + path.string();
+    return text;
 }
 
 }  // namespace
 
-Schema Schema::load(const fs::path& folder) {
+Schema Schema::load(const std::vector<fs::path>& paths) {
     Schema schema;
-    for (const fs::path& file : mofFiles(folder)) {
-        schema.add(mof::parse(contentOf(file), file.string()));
-    }
-    if (schema.classes_.empty()) {
-        throw std::runtime_error("the schema folder " + folder.string() + " holds no MOF class");
-    }
+    for (mof::Document& document : readSchemaFiles(paths)) schema.add(std::move(document));
+    if (schema.classes_.empty())
+        throw std::runtime_error("the schema " + listed(paths) + " holds no MOF class");
     return schema;
 }
 
-void Schema::add(const mof::Document& document) {
-    for (const mof::Class& added : document.classes) {
+void Schema::add(mof::Document document) {
+    for (const mof::QualifierType& type : document.qualifierTypes) qualifierTypes_.add(type);
+    for (mof::Class& added : document.classes) {
         check(added);
+        subclasses_[base::toLower(added.superclass)].push_back(added.name);
+        std::string name = base::toLower(added.name);
         // Of the class as it is kept: value maps are found by the address of the property.
-        keepValueMaps(classes_.emplace(base::toLower(added.name), added).first->second);
+        keepValueMaps(classes_.emplace(std::move(name), std::move(added)).first->second);
     }
 }
 
@@ -113,18 +74,16 @@ void Schema::keepValueMaps(const mof::Class& added) {
     }
 }
 
-const mof::Class* Schema::find(const std::string& className) const {
+const mof::Class* Schema::find(std::string_view className) const {
     const auto found = classes_.find(base::toLower(className));
     return found == classes_.end() ? nullptr : &found->second;
 }
 
-const mof::Feature* Schema::findProperty(const std::string& className,
-                                         const std::string& propertyName) const {
+const mof::Feature* Schema::findProperty(std::string_view className,
+                                         std::string_view propertyName) const {
     for (const mof::Class* level = find(className); level != nullptr;
          level = find(level->superclass)) {
-        for (const mof::Feature& property : level->properties) {
-            if (base::equalsIgnoreCase(property.name, propertyName)) return &property;
-        }
+        if (const mof::Feature* property = ownProperty(*level, propertyName)) return property;
     }
     return nullptr;
 }
@@ -142,30 +101,26 @@ std::vector<const mof::Feature*> Schema::properties(const std::string& className
     return result;
 }
 
-bool Schema::isA(const std::string& className, const std::string& ancestor) const {
-    std::string name = className;
+bool Schema::isA(std::string_view className, std::string_view ancestor) const {
+    std::string_view name = className;
     while (!name.empty() && !base::equalsIgnoreCase(name, ancestor)) {
         const mof::Class* level = find(name);
-        name = level == nullptr ? std::string() : level->superclass;
+        name = level == nullptr ? std::string_view() : std::string_view(level->superclass);
     }
     return !name.empty();
 }
 
-bool Schema::isKey(const std::string& className, const std::string& propertyName) const {
+bool Schema::isKey(std::string_view className, std::string_view propertyName) const {
     for (const mof::Class* level = find(className); level != nullptr;
          level = find(level->superclass)) {
-        for (const mof::Feature& property : level->properties) {
-            // An override need not say Key again.
-            if (base::equalsIgnoreCase(property.name, propertyName) &&
-                mof::isSet(property.qualifiers, "Key")) {
-                return true;
-            }
-        }
+        // An override need not say Key again.
+        const mof::Feature* property = ownProperty(*level, propertyName);
+        if (property != nullptr && mof::isSet(property->qualifiers, "Key")) return true;
     }
     return false;
 }
 
-bool Schema::isAssociation(const std::string& className) const {
+bool Schema::isAssociation(std::string_view className) const {
     // The qualifier is inherited: a subclass need not say it again.
     const mof::Class* level = find(className);
     while (level != nullptr && !mof::isSet(level->qualifiers, "Association")) {
@@ -174,12 +129,14 @@ bool Schema::isAssociation(const std::string& className) const {
     return level != nullptr;
 }
 
-const ValueMap& Schema::valueMap(const std::string& className,
-                                 const std::string& propertyName) const {
+const ValueMap& Schema::valueMap(std::string_view className, std::string_view propertyName) const {
     static const ValueMap none;
-    const mof::Feature* property = findProperty(className, propertyName);
-    const auto found = valueMaps_.find(property);
-    return found == valueMaps_.end() ? none : found->second;
+    for (const mof::Class* level = find(className); level != nullptr;
+         level = find(level->superclass)) {
+        const auto found = valueMaps_.find(ownProperty(*level, propertyName));
+        if (found != valueMaps_.end()) return found->second;
+    }
+    return none;
 }
 
 std::vector<std::string> Schema::classNames() const {
@@ -188,21 +145,20 @@ std::vector<std::string> Schema::classNames() const {
     return names;
 }
 
-CMPIType cmpiType(const mof::Feature& property) {
-    const CMPIType type = elementTypes[static_cast<std::size_t>(property.type)];
-    return property.array ? static_cast<CMPIType>(type | CMPI_ARRAY) : type;
-}
-
-SchemaCatalogue::SchemaCatalogue(const Schema& schema) {
-    // All at once: the broker asks again for every property that a provider sets.
-    for (const std::string& name : schema.classNames()) {
-        declarations_.emplace(base::toLower(name), declarationOf(schema, *schema.find(name)));
-    }
-}
-
-const ClassDeclaration* SchemaCatalogue::find(std::string_view className) const {
-    const auto found = declarations_.find(base::toLower(className));
-    return found == declarations_.end() ? nullptr : &found->second;
+std::vector<std::string> Schema::subclasses(std::string_view className, bool anyDegree) const {
+    std::vector<std::string> names;
+    const auto append = [&](std::string_view name) {
+        const auto found = subclasses_.find(base::toLower(name));
+        if (found != subclasses_.end())
+            names.insert(names.end(), found->second.begin(), found->second.end());
+    };
+    append(className);
+    for (std::size_t index = 0; anyDegree && index < names.size(); ++index)
+        append(std::string(names[index]));
+    std::sort(names.begin(), names.end(), [](const std::string& left, const std::string& right) {
+        return base::toLower(left) < base::toLower(right);
+    });
+    return names;
 }
 
 }  // namespace cmpihost

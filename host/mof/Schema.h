@@ -3,19 +3,25 @@
 
 #include <filesystem>
 #include <map>
+#include <mutex>
+#include <optional>
 #include <string>
 #include <string_view>
+#include <unordered_map>
+#include <utility>
 #include <vector>
 
 #include "host/broker/ClassCatalogue.h"
 #include "host/mof/MofAst.h"
+#include "host/mof/QualifierTypes.h"
 #include "host/mof/ValueMap.h"
 
 namespace cmpihost {
 
 /// The classes that the host knows, read from MOF files. Names compare without case. A superclass
-/// that no file declares (those of the CIM schema) is known by its name alone. Immutable once
-/// loaded, so any thread may read it.
+/// that no file declares (those of the CIM schema, for the shipped classes) is known by its name
+/// alone. Immutable once loaded, so any thread may read it; what it hands out lives as long as it.
+/// host/mof/ResolvedClass.h lists a class with all that it inherits.
 class Schema {
   public:
     /// Moves, but does not copy: value maps are found by the addresses of their properties.
@@ -23,61 +29,86 @@ class Schema {
     Schema(Schema&&) = default;
     Schema& operator=(Schema&&) = default;
 
-    /// Reads every *.mof file of the folder, in the order of their names. An include pragma adds
-    /// nothing, for all files of the folder are read anyway. Throws mof::MofError for a file that
-    /// is no MOF, std::runtime_error when the folder or a file in it cannot be read, a *.mof is
-    /// no regular file, or there is no class.
-    static Schema load(const std::filesystem::path& folder);
+    /// Reads folders and files as readSchemaFiles does; the order of classes does not matter.
+    /// Throws what that throws, what add throws, and std::runtime_error when there is no class.
+    static Schema load(const std::vector<std::filesystem::path>& paths);
+    static Schema load(const std::filesystem::path& path) {
+        return load(std::vector<std::filesystem::path>{path});
+    }
 
-    /// Adds the classes of one text. Throws mof::MofError, also for a class that is there already,
-    /// one that descends from itself, and ValueMap and Values that do not match.
-    void add(const mof::Document& document);
+    /// Adds the classes and the qualifier declarations of one text. Throws mof::MofError, also for
+    /// a class that is there already, one that descends from itself, a qualifier that is declared
+    /// in two ways, and ValueMap and Values that do not match.
+    void add(mof::Document document);
 
     /// The class, or null.
-    const mof::Class* find(const std::string& className) const;
+    const mof::Class* find(std::string_view className) const;
 
     /// The property of the class as its nearest declaration in the line of superclasses has it,
-    /// or null.
-    const mof::Feature* findProperty(const std::string& className,
-                                     const std::string& propertyName) const;
+    /// or null. A qualifier that it does not repeat is found by propertyQualifier.
+    const mof::Feature* findProperty(std::string_view className,
+                                     std::string_view propertyName) const;
 
     /// All properties of the class: its own in the order of their declaration, then those that
     /// only a superclass declares. Empty for an unknown class.
     std::vector<const mof::Feature*> properties(const std::string& className) const;
 
+    /// The qualifier of a property, its own or inherited; null for none.
+    const mof::Qualifier* propertyQualifier(std::string_view className,
+                                            std::string_view propertyName,
+                                            std::string_view qualifierName) const;
+
     /// Whether the class is the other one or descends from it.
-    bool isA(const std::string& className, const std::string& ancestor) const;
+    bool isA(std::string_view className, std::string_view ancestor) const;
 
     /// Whether the property is a key, by its own declaration or one that it overrides.
-    bool isKey(const std::string& className, const std::string& propertyName) const;
+    bool isKey(std::string_view className, std::string_view propertyName) const;
 
     /// Whether the class or one that it descends from is declared as an association.
-    bool isAssociation(const std::string& className) const;
+    bool isAssociation(std::string_view className) const;
 
-    /// The names of the numbers of a property; empty for one that has none or is unknown.
-    const ValueMap& valueMap(const std::string& className, const std::string& propertyName) const;
+    /// The names of the numbers of a property, its own or those of the property that it overrides;
+    /// empty for one that has none or is unknown.
+    const ValueMap& valueMap(std::string_view className, std::string_view propertyName) const;
 
     /// The names of all classes as declared, in alphabetical order.
     std::vector<std::string> classNames() const;
+
+    /// The names of the classes that descend from a class directly, or in any degree, in
+    /// alphabetical order. The class itself need not be declared; an empty name gives the roots.
+    std::vector<std::string> subclasses(std::string_view className, bool anyDegree = false) const;
+
+    /// The qualifiers that the MOF declares, and how qualifiers pass to subclasses.
+    const QualifierTypes& qualifierTypes() const { return qualifierTypes_; }
 
   private:
     void check(const mof::Class& added) const;
     void keepValueMaps(const mof::Class& added);
 
     std::map<std::string, mof::Class> classes_;
+    /// The names of direct subclasses by the name of their superclass in lower case.
+    std::unordered_map<std::string, std::vector<std::string>> subclasses_;
+    QualifierTypes qualifierTypes_;
     /// Read once, when their class is added: a wrong one is an error in the file, not at its use.
-    std::map<const mof::Feature*, ValueMap> valueMaps_;
+    std::unordered_map<const mof::Feature*, ValueMap> valueMaps_;
 };
 
-/// A schema as the broker asks for it. Takes what it needs when it is made, so the schema may go.
+/// A schema as the broker asks for it. What a class declares and inherits is put together when the
+/// class is first asked for.
 class SchemaCatalogue final : public ClassCatalogue {
   public:
-    explicit SchemaCatalogue(const Schema& schema);
+    /// Of a schema that outlives the catalogue, or of one that it keeps.
+    explicit SchemaCatalogue(const Schema& schema) : schema_(schema) {}
+    explicit SchemaCatalogue(Schema&& schema) : kept_(std::move(schema)), schema_(*kept_) {}
 
     const ClassDeclaration* find(std::string_view className) const override;
 
   private:
-    std::map<std::string, ClassDeclaration> declarations_;
+    const std::optional<Schema> kept_{};
+    const Schema& schema_;
+    mutable std::mutex mutex_;
+    /// By the declared class. Under mutex_; the declarations themselves do not change.
+    mutable std::unordered_map<const mof::Class*, ClassDeclaration> declarations_;
 };
 
 /// The CMPI type of a declared property, with CMPI_ARRAY for an array.

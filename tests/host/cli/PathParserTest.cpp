@@ -17,7 +17,7 @@ const SchemaCatalogue& catalogue() {
                        "[Association] class Link { [Key] Thing REF From; "
                        "[Key] Link REF Next; };",
                        "x.mof"));
-        return SchemaCatalogue(schema);
+        return SchemaCatalogue(std::move(schema));
     }();
     return instance;
 }

@@ -86,22 +86,57 @@ TEST(MofParser, ReadsMethodsApartFromProperties) {
     ASSERT_EQ(read.properties.size(), 1U);
 }
 
-TEST(MofParser, PassesOverInstancesAndQualifierDeclarations) {
+TEST(MofParser, PassesOverInstances) {
     const Document read = parse(
-        "#pragma locale (\"en_US\")\n"
-        "Qualifier Key : boolean = false, Scope(property, reference), Flavor(DisableOverride);\n"
-        "Qualifier Values : string[], Scope(any);\n"
+        "#pragma locale (\"en_US\")\n#pragma namespace (\"root/cimv2\")\n"
         "instance of A as $a { P = 1; [Key] Q = {\"x\", \"y\"}; R = NULL; S = $b; };\n"
-        "class B as $c {};",
+        "class B as $c { B REF Next = $d; };",
         "x.mof");
     ASSERT_EQ(read.classes.size(), 1U);
     EXPECT_EQ(read.classes[0].name, "B");
 }
 
+TEST(MofParser, ReadsQualifierDeclarations) {
+    const Document read = parse(
+        "Qualifier Key : boolean = false, Scope(property, reference), Flavor(DisableOverride);\n"
+        "Qualifier Values : string[], Scope(any), Flavor(Translatable, ToSubclass);\n"
+        "Qualifier Abstract : boolean = false, Scope(class),\n"
+        "  Flavor(Restricted, EnableOverride);\n"
+        "Qualifier MaxLen : uint32 = null, Scope(property);",
+        "x.mof");
+    ASSERT_EQ(read.qualifierTypes.size(), 4U);
+    const QualifierType& key = read.qualifierTypes[0];
+    EXPECT_EQ(key.name, "Key");
+    EXPECT_EQ(key.type, Type::Boolean);
+    EXPECT_FALSE(key.array);
+    EXPECT_EQ(key.defaultValue->items[0], Scalar(false));
+    EXPECT_THAT(key.scopes, testing::ElementsAre("property", "reference"));
+    EXPECT_EQ(key.flavor, (Flavor{std::nullopt, false, false}));
+    EXPECT_TRUE(read.qualifierTypes[1].array);
+    EXPECT_FALSE(read.qualifierTypes[1].defaultValue.has_value());
+    EXPECT_EQ(read.qualifierTypes[1].flavor, (Flavor{true, std::nullopt, true}));
+    EXPECT_EQ(read.qualifierTypes[2].flavor, (Flavor{false, true, false}));
+    EXPECT_EQ(read.qualifierTypes[3].flavor, Flavor());
+    EXPECT_EQ(read.qualifierTypes[3].position.line, 5U);
+}
+
+TEST(MofParser, ReadsTheFlavorsOfAQualifierAndPassesOverUnknownOnes) {
+    const auto flavorOf = [](const std::string& words) {
+        return onlyClass("[Q : " + words + "] class A {};").qualifiers.at(0).flavor;
+    };
+    EXPECT_EQ(flavorOf("restricted"), (Flavor{false, std::nullopt, false}));
+    EXPECT_EQ(flavorOf("ToSubclass DisableOverride Translatable"), (Flavor{true, false, true}));
+    EXPECT_EQ(flavorOf("EnableOverride"), (Flavor{std::nullopt, true, false}));
+    EXPECT_EQ(flavorOf("ToInstance"), Flavor());
+}
+
 TEST(MofParser, KeepsTheNamesOfIncludedFiles) {
     const Document read =
         parse("#pragma include (\"a.mof\")\n#PRAGMA Include(\"b\" \".mof\")", "x.mof");
-    EXPECT_THAT(read.includes, testing::ElementsAre("a.mof", "b.mof"));
+    ASSERT_EQ(read.includes.size(), 2U);
+    EXPECT_EQ(read.includes[0].file, "a.mof");
+    EXPECT_EQ(read.includes[1].file, "b.mof");
+    EXPECT_EQ(read.includes[1].position.line, 2U);
 }
 
 TEST(MofParser, ReadsAHundredThousandQualifiersInAMoment) {

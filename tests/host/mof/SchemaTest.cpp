@@ -1,16 +1,13 @@
-// Classes with what they inherit, the names of their numbers, and the folder that they are read
-// from.
+// Classes with what they inherit, and the names of their numbers.
 #include "host/mof/Schema.h"
 
 #include <gmock/gmock.h>
 
 #include "host/broker/Value.h"
 #include "host/mof/MofParser.h"
-#include "support/TemporaryDirectory.h"
 
 namespace {
 
-namespace fs = std::filesystem;
 using namespace cmpihost;
 using testing::ElementsAre;
 using testing::HasSubstr;
@@ -65,12 +62,39 @@ TEST(Schema, InheritsKeysAndAssociationsFromSuperclassesDeclaredOrNot) {
     EXPECT_TRUE(schema.isA("Foreign", "cim_elsewhere"));
 }
 
+TEST(Schema, ListsSubclassesOfClassesDeclaredOrNot) {
+    Schema schema = schemaOf(family);
+    schema.add(mof::parse("class Deep : dERIVED {}; class alone : BASE {};", "y.mof"));
+    EXPECT_THAT(schema.subclasses("BASE"), ElementsAre("alone", "Derived"));
+    EXPECT_THAT(schema.subclasses("Base", true), ElementsAre("alone", "Deep", "Derived"));
+    EXPECT_THAT(schema.subclasses("CIM_Elsewhere"), ElementsAre("Foreign"));
+    EXPECT_THAT(schema.subclasses(""), ElementsAre("Base", "Link"));
+    EXPECT_THAT(schema.subclasses("Deep", true), ElementsAre());
+}
+
+TEST(Schema, InheritsTheNamesOfNumbersUnlessAnOverrideBringsItsOwn) {
+    const Schema schema = schemaOf(
+        "class C : B { [Override(\"State\"), ValueMap{\"1\"}, Values{\"own\"}] uint16 State; };"
+        "class B : A { [Override(\"State\")] uint16 STATE; };"
+        "class A { [ValueMap{\"1\"}, Values{\"one\"}] uint16 State; };");
+    EXPECT_EQ(*schema.valueMap("B", "State").find(1), "one");
+    EXPECT_EQ(*schema.valueMap("C", "State").find(1), "own");
+    EXPECT_TRUE(schema.valueMap("B", "Weight").empty());
+}
+
 TEST(Schema, RefusesClassesThatAreDeclaredTwiceOrDescendFromThemselves) {
     EXPECT_EQ(complaintAbout("class A {};\nclass a {};"),
               "x.mof:2:7: class 'a' is declared twice, first at x.mof:1");
     EXPECT_EQ(complaintAbout("class A : A {};"), "x.mof:1:7: class 'A' descends from itself");
     EXPECT_EQ(complaintAbout("class A : B {};\nclass B : C {};\nclass C : A {};"),
               "x.mof:3:7: class 'C' descends from itself");
+}
+
+TEST(Schema, RefusesAQualifierThatIsDeclaredInTwoWays) {
+    const std::string once = "Qualifier Q : string, Scope(any), Flavor(Restricted);\n";
+    EXPECT_EQ(complaintAbout(once + once + "class A {};"), "no error");
+    EXPECT_EQ(complaintAbout(once + "Qualifier q : string, Scope(any);"),
+              "x.mof:2:11: qualifier 'q' is declared otherwise than at x.mof:1");
 }
 
 TEST(SchemaCatalogue, ShowsTheBrokerClassesWithTheirOwnPropertiesBeforeInheritedOnes) {
@@ -108,42 +132,6 @@ TEST(SchemaCatalogue, GivesEveryTypeOfMofItsCmpiType) {
             EXPECT_STREQ(mof::nameOf(property.type), name);
         }
     }
-}
-
-class SchemaFolder : public testing::Test {
-  protected:
-    void write(const char* name, const std::string& text) { directory_.write(name, text); }
-    static std::string refusal(const fs::path& folder) {
-        return complaint([&] { Schema::load(folder); });
-    }
-
-    const TemporaryDirectory directory_;
-    const fs::path folder_ = directory_.path();
-};
-
-TEST_F(SchemaFolder, IsReadFileByFile) {
-    write("a.mof", "#pragma include (\"b.mof\")\nclass A : B {};");
-    write("b.MOF", "class B { uint8 P; };");
-    write("readme.txt", "no MOF at all");
-    const Schema schema = Schema::load(folder_);
-    EXPECT_THAT(schema.classNames(), ElementsAre("A", "B"));
-    EXPECT_NE(schema.findProperty("A", "P"), nullptr);
-}
-
-TEST_F(SchemaFolder, WithAFileThatCannotBeReadSaysWhichOne) {
-    write("a.mof", "class A {");
-    EXPECT_THAT(refusal(folder_), HasSubstr("/a.mof:1:10: expected a type"));
-    fs::remove(folder_ / "a.mof");
-    fs::create_symlink(folder_ / "missing", folder_ / "a.mof");
-    EXPECT_EQ(refusal(folder_),
-              "the schema file " + (folder_ / "a.mof").string() + " cannot be read");
-}
-
-TEST_F(SchemaFolder, WithoutAClassIsRefused) {
-    const std::string start = "the schema folder " + folder_.string();
-    EXPECT_EQ(refusal(folder_), start + " holds no MOF class");
-    EXPECT_EQ(refusal(folder_ / "missing"),
-              start + "/missing cannot be read: No such file or directory");
 }
 
 ValueMap mapOf(const std::string& qualifiers, const std::string& type = "uint16") {

@@ -1,0 +1,46 @@
+// A whole CIM schema has more than a thousand classes, of which a run of the host meets a few.
+#include <iterator>
+
+#include "host/mof/Schema.h"
+
+namespace cmpihost {
+
+namespace {
+
+/// In the order of mof::Type.
+constexpr CMPIType elementTypes[] = {CMPI_boolean, CMPI_string, CMPI_char16, CMPI_dateTime,
+                                     CMPI_uint8,   CMPI_sint8,  CMPI_uint16, CMPI_sint16,
+                                     CMPI_uint32,  CMPI_sint32, CMPI_uint64, CMPI_sint64,
+                                     CMPI_real32,  CMPI_real64, CMPI_ref};
+static_assert(std::size(elementTypes) == static_cast<std::size_t>(mof::Type::Reference) + 1);
+
+ClassDeclaration declarationOf(const Schema& schema, const mof::Class& source) {
+    ClassDeclaration result;
+    result.name = source.name;
+    result.superclass = source.superclass;
+    result.association = schema.isAssociation(source.name);
+    for (const mof::Feature* property : schema.properties(source.name)) {
+        result.properties.push_back({property->name, cmpiType(*property),
+                                     schema.isKey(source.name, property->name),
+                                     property->referenceClass});
+    }
+    return result;
+}
+
+}  // namespace
+
+CMPIType cmpiType(const mof::Feature& property) {
+    const CMPIType type = elementTypes[static_cast<std::size_t>(property.type)];
+    return property.array ? static_cast<CMPIType>(type | CMPI_ARRAY) : type;
+}
+
+const ClassDeclaration* SchemaCatalogue::find(std::string_view className) const {
+    const mof::Class* const declared = schema_.find(className);
+    if (declared == nullptr) return nullptr;
+    const std::lock_guard<std::mutex> lock(mutex_);
+    const auto [place, isNew] = declarations_.try_emplace(declared);
+    if (isNew) place->second = declarationOf(schema_, *declared);
+    return &place->second;
+}
+
+}  // namespace cmpihost
