@@ -30,7 +30,8 @@ namespace fs = std::filesystem;
 
 Schema loadSchema(const std::vector<std::string>& given, const fs::path& programFolder) {
     try {
-        return Schema::load(given.empty() ? schemaFolder(programFolder) : fs::path(given.front()));
+        if (given.empty()) return Schema::load(schemaFolder(programFolder));
+        return Schema::load(std::vector<fs::path>(given.begin(), given.end()));
     } catch (const std::runtime_error& error) {
         const char* hint = given.empty() ? " (--schema PATH names others)" : "";
         throw UsageError(base::escapeForTerminal(error.what()) + hint);
