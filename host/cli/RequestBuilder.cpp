@@ -193,6 +193,8 @@ OperationRequest buildRequest(const CommandLine& commandLine, const Schema& sche
         return request;
     }
     request.path = parsePath(commandLine.path, &catalogue);
+    // The provider need not look for what is not printed.
+    if (commandLine.value && !request.properties) request.properties = {*commandLine.value};
     const bool modifies = request.operation == Operation::ModifyInstance;
     if (modifies || request.operation == Operation::CreateInstance) {
         request.instance = instance(commandLine, request.path, schema, catalogue);

@@ -11,6 +11,7 @@
 #include <type_traits>
 
 #include "base/Utf8.h"
+#include "host/cli/BareValues.h"
 #include "host/cli/CommandLine.h"
 #include "host/cli/Diagnostics.h"
 #include "host/cli/InstallPaths.h"
@@ -132,6 +133,7 @@ class Run {
 
     ExitStatus runOperation(const Schema& schema, const SchemaCatalogue& catalogue) {
         OperationRequest request = buildRequest(commandLine_, schema, catalogue);
+        if (commandLine_.value) checkValueName(*commandLine_.value, request, schema);
         const OperationResult result = withHost(catalogue, [&](ProviderHost& host) {
             return commandLine_.bare || !lacksKeys(request, catalogue) ? host.run(request)
                                                                        : completed(host, request);
@@ -142,10 +144,18 @@ class Run {
             return exitCimStatus;
         }
         // The libraries are gone by now, with whatever they may have left to write themselves.
-        printResult(request, result, schema,
-                    *makePrinter(commandLine_.format, out_, schema, terminalOf(STDOUT_FILENO)));
+        printResult(request, result, schema, *printer(schema));
+        if (commandLine_.value) {
+            const std::string note = noteOnValues(*commandLine_.value, result);
+            if (!note.empty()) err_ << "note: " << note << '\n';
+        }
         err_ << notesOn(request, result, schema);
         return written();
+    }
+
+    std::unique_ptr<Printer> printer(const Schema& schema) const {
+        if (commandLine_.value) return makeValuePrinter(out_, *commandLine_.value);
+        return makePrinter(commandLine_.format, out_, schema, terminalOf(STDOUT_FILENO));
     }
 
     /// Has the request answered once its path has all keys. The path is printed: a script can give
