@@ -3,10 +3,12 @@
 
 #include <cstdint>
 #include <optional>
+#include <ostream>
 #include <string>
 #include <variant>
 #include <vector>
 
+#include "host/cli/Terminal.h"
 #include "host/mof/Schema.h"
 
 /// What the schema says about classes, as plain data that a printer writes in any form. Every text
@@ -41,10 +43,10 @@ struct FeatureDescription {
     std::string description;
     /// In the order of the MOF; empty for none.
     std::vector<ValueMeaning> values;
-    /// PUnit or Units as written; empty for none.
+    /// Units, else PUnit, as written; empty for none.
     std::string units;
     std::optional<std::uint64_t> maxLength;
-    /// As MOF writes it ("5", "\"text\"", "{1, 2}"); absent for none.
+    /// As MOF writes it ("5", "\"text\"", "{1, 2}"); absent for none and for NULL.
     std::optional<std::string> defaultValue;
     /// What takes its place where it is deprecated, as written; absent where it is not.
     std::optional<std::vector<std::string>> deprecated;
@@ -61,8 +63,8 @@ struct PropertyDescription : FeatureDescription {
     /// The superclass that it comes from as far as the schema tells: set where `origin` overrides
     /// the property of a class that the schema does not have.
     std::string inheritedFrom;
-    /// Where its value comes from on the managed host, as MappingStrings tells it without the
-    /// "File.Linux|": "/proc/meminfo|MemTotal".
+    /// Where its value comes from, as MappingStrings tells it: "/proc/meminfo: MemTotal" for
+    /// "File.Linux|/proc/meminfo|MemTotal", other forms with their name: "Call.Linux: uname".
     std::vector<std::string> sources;
 };
 
@@ -103,6 +105,14 @@ std::vector<ClassSummary> classSummaries(const Schema& schema);
 /// UsageError, with the names that are near, when the schema has no such class or the class no such
 /// member.
 Description describe(const Schema& schema, const std::string& subject);
+
+/// For people: what a description says, wrapped at the terminal's width; of a class a line for each
+/// property and method with the first sentence of its description.
+void print(const Description& description, const Terminal& terminal, std::ostream& stream);
+
+/// A line for each class: its name, its superclass ('-' for none) and its kind.
+void print(const std::vector<ClassSummary>& classes, const Terminal& terminal,
+           std::ostream& stream);
 
 }  // namespace cmpihost
 
