@@ -64,7 +64,8 @@ void DescriptionPrinter::paragraphs(const std::string& text, std::size_t indent)
     std::size_t start = 0;
     for (std::size_t end = 0; end != std::string::npos; start = end + 1) {
         end = text.find('\n', start);
-        const std::string line = terminal_.shown(text.substr(start, end - start));
+        std::string line = terminal_.shown(text.substr(start, end - start));
+        line.erase(line.find_last_not_of(' ') + 1);
         const bool margin = start > 0 && !line.empty();
         stream_ << (margin ? std::string(indent, ' ') : "") << wrap(line, terminal_.width, indent)
                 << '\n';

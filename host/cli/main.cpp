@@ -13,6 +13,7 @@
 #include "base/Utf8.h"
 #include "host/cli/BareValues.h"
 #include "host/cli/CommandLine.h"
+#include "host/cli/Describe.h"
 #include "host/cli/Diagnostics.h"
 #include "host/cli/InstallPaths.h"
 #include "host/cli/PathCompletion.h"
@@ -126,6 +127,12 @@ class Run {
                 return runOperation(schema, catalogue);
             case Command::Tree:
                 return drawHost(schema, catalogue);
+            case Command::Classes:
+                print(classSummaries(schema), terminalOf(STDOUT_FILENO), out_);
+                return written();
+            case Command::Describe:
+                print(describe(schema, commandLine_.subject), terminalOf(STDOUT_FILENO), out_);
+                return written();
             default:
                 return failed("this command is not there yet", exitUsage);
         }
