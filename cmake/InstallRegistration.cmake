@@ -31,9 +31,12 @@ foreach(part parts client sfcb sfcb-broker pegasus-server pegasus)
 endforeach()
 
 # The libraries are elsewhere when they are installed.
-set(KORVA_REGISTERED_FOLDER lib)
+set(KORVA_REGISTERED_FOLDERS lib)
 configure_file("${korva_register_source}/libraries.sh.in" "${korva_register_dir}/libraries.sh" @ONLY)
-set(KORVA_REGISTERED_FOLDER "${KORVA_CMPI_LIBDIR}")
+set(KORVA_REGISTERED_FOLDERS "\"${KORVA_CMPI_LIBDIR}\"")
+if(KORVA_CMPI_LIBDIR MATCHES "^lib(64)?/cmpi$")
+    set(KORVA_REGISTERED_FOLDERS "lib64/cmpi lib/cmpi")
+endif()
 configure_file("${korva_register_source}/libraries.sh.in"
                "${CMAKE_BINARY_DIR}/generated/register/libraries.sh" @ONLY)
 install(FILES "${CMAKE_BINARY_DIR}/generated/register/libraries.sh"

@@ -144,7 +144,7 @@ RunsInEveryShell() {
 ShellScriptsAreWithoutFault() {
     need_tool shellcheck shellcheck
     packaging=$KORVA_SOURCE_DIR/packaging
-    expect_success shellcheck -x "$packaging/korva-osstatus-register" "$packaging/build-packages" \
+    expect_success shellcheck -x "$packaging/korva-osstatus-register" "$packaging/build-packages" "$packaging/source-archive" \
         "$packaging/try-packages" "$packaging"/try/*.sh "$packaging"/register/*.sh \
         "$packaging"/register/*.sh.in "$packaging"/debian/*/p*
     expect_success shellcheck stand-in ./*.sh

@@ -207,6 +207,8 @@ ProvidersFollowTheLibrariesToAnotherFolder() {
     grep -qx "KORVA_CMPI_LIBDIR:STRING=lib64/cmpi" "$work/build/CMakeCache.txt" ||
         fail "the providers do not go to lib64/cmpi"
     expect_text "libdir=\${prefix}/lib64" "$(cat "$work/build/generated/zblog.pc")"
+    # Packages of both word sizes share this one.
+    expect_success cmp "$work/build/generated/register/libraries.sh" "$KORVA_BINARY_DIR/generated/register/libraries.sh"
 }
 
 HostKnowsAnotherFolderOfTheProviders() {
