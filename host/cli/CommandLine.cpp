@@ -7,6 +7,8 @@
 
 #include "base/Utf8.h"
 #include "host/cli/Commands.h"
+#include "host/cli/Diagnostics.h"
+#include "host/cli/Suggestion.h"
 
 namespace cmpihost {
 
@@ -50,12 +52,15 @@ template <class Meaning, std::size_t count>
 Meaning meaningOf(const std::string& word, const Word<Meaning> (&table)[count],
                   const char* option) {
     std::string known;
+    std::vector<std::string> names;
     for (std::size_t index = 0; index < count; ++index) {
         if (word == table[index].text) return table[index].meaning;
+        names.emplace_back(table[index].text);
         known += std::string(index == 0 ? "" : index + 1 < count ? ", " : " or ");
         known += table[index].text;
     }
-    throw CLI::ValidationError(option, "expected " + known + ", found '" + word + "'");
+    throw CLI::ValidationError(
+        option, "expected " + known + ", found '" + word + "'" + didYouMean(word, names));
 }
 
 /// LEVEL[,CHANNEL]
@@ -117,9 +122,11 @@ class CommandLineParser {
     ParsedCommandLine parse(int argumentCount, const char* const* arguments);
 
   private:
-    static ParsedCommandLine refused(const std::string& complaint);
-    std::string withoutCommand(const CLI::ParseError& error) const;
-    std::string name() const { return app_.get_subcommands().front()->get_name(); }
+    ParsedCommandLine refused(const std::string& complaint) const;
+    std::string complaint(const CLI::ParseError& error) const;
+    std::string complaintAbout(const std::vector<std::string>& unknown) const;
+    std::vector<std::string> optionNames() const;
+    std::string name() const;
     void addHostOptions();
     void addHostOption(const OptionRow& row);
     void addCommand(const CommandRow& row);
@@ -156,7 +163,7 @@ ParsedCommandLine CommandLineParser::parse(int argumentCount, const char* const*
     } catch (const CLI::CallForHelp&) {
         return {std::nullopt, help(), exitDone};
     } catch (const CLI::ParseError& error) {
-        return refused(app_.get_subcommands().empty() ? withoutCommand(error) : error.what());
+        return refused(complaint(error));
     }
     // Refused, not ignored: a script that asks for one thing would take another for it.
     const bool operation = result_.command == Command::Operation;
@@ -167,20 +174,53 @@ ParsedCommandLine CommandLineParser::parse(int argumentCount, const char* const*
     return {result_, {}, exitDone};
 }
 
-ParsedCommandLine CommandLineParser::refused(const std::string& complaint) {
+ParsedCommandLine CommandLineParser::refused(const std::string& complaint) const {
     return {std::nullopt,
-            "cmpihost: " + base::escapeForTerminal(complaint) +
-                "\nRun cmpihost --help for more information.\n",
+            messageLines(base::escapeForTerminal(complaint)) +
+                noteLine("cmpihost " + (name().empty() ? "" : name() + " ") + "--help tells more"),
             exitUsage};
 }
 
-/// The complaint about arguments among which there is no command. CLI11's own speaks of
-/// subcommands, a word that the help does not know.
-std::string CommandLineParser::withoutCommand(const CLI::ParseError& error) const {
-    if (dynamic_cast<const CLI::RequiredError*>(&error) == nullptr) return error.what();
-    const std::vector<std::string> unknown = app_.remaining();
-    return unknown.empty() ? "A command is required"
-                           : "There is no command '" + unknown.front() + "'";
+/// CLI11's own complaints speak of subcommands, a word that the help does not know, and suggest
+/// nothing.
+std::string CommandLineParser::complaint(const CLI::ParseError& error) const {
+    const bool missing = dynamic_cast<const CLI::RequiredError*>(&error) != nullptr;
+    if (!missing && dynamic_cast<const CLI::ExtrasError*>(&error) == nullptr) return error.what();
+    const std::vector<std::string> unknown = app_.remaining(true);
+    if (!unknown.empty()) return complaintAbout(unknown);
+    return name().empty() ? "a command is required" : error.what();
+}
+
+std::string CommandLineParser::complaintAbout(const std::vector<std::string>& unknown) const {
+    const auto isOption = [](const std::string& word) { return word.substr(0, 1) == "-"; };
+    const auto option = std::find_if(unknown.begin(), unknown.end(), isOption);
+    if (option != unknown.end()) {
+        const std::string written = option->substr(0, option->find('='));
+        return (name().empty() ? "there is" : name() + " has") + " no option '" + written + "'" +
+               didYouMean(written, optionNames());
+    }
+    if (!name().empty()) return name() + " takes no argument '" + unknown.front() + "'";
+    std::vector<std::string> commands;
+    for (const CommandRow& row : commandRows()) commands.emplace_back(row.name);
+    return "there is no command '" + unknown.front() + "'" + didYouMean(unknown.front(), commands);
+}
+
+/// Of the program and of the command, if there is one.
+std::vector<std::string> CommandLineParser::optionNames() const {
+    std::vector<const CLI::App*> apps = {&app_};
+    for (const CLI::App* command : app_.get_subcommands()) apps.push_back(command);
+    std::vector<std::string> names;
+    for (const CLI::App* app : apps) {
+        for (const CLI::Option* option : app->get_options())
+            for (const std::string& word : option->get_lnames()) names.push_back("--" + word);
+    }
+    return names;
+}
+
+/// The command; empty when there is none.
+std::string CommandLineParser::name() const {
+    const std::vector<CLI::App*> chosen = app_.get_subcommands();
+    return chosen.empty() ? std::string() : chosen.front()->get_name();
 }
 
 void CommandLineParser::addHostOptions() {

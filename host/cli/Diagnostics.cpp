@@ -1,13 +1,9 @@
-// What goes to the standard error beside results. Statuses bear the names of the CIM standard, and
-// what the schema knows better than the provider (a misspelt name) becomes a note or a hint: the
-// provider itself answers with nothing at all.
+// Statuses bear the names of the CIM standard, because those are what manuals and search engines
+// know.
 #include "host/cli/Diagnostics.h"
 
 #include <algorithm>
-#include <optional>
-#include <vector>
 
-#include "base/Ascii.h"
 #include "base/Utf8.h"
 
 namespace cmpihost {
@@ -46,104 +42,21 @@ constexpr StatusRow statuses[] = {
     {CMPI_RC_ERROR, "CMPI_RC_ERROR"},
 };
 
-/// GetInstance is to return one instance.
-std::string noteOnCount(const OperationResult& result) {
-    const std::size_t count = result.instances.size();
-    if (count == 1) return {};
-    return count == 0 ? "note: no instance was returned; an object manager answers " +
-                            statusText(CMPI_RC_ERR_NOT_FOUND) + "\n"
-                      : "note: " + std::to_string(count) +
-                            " instances were returned; an object manager takes the first\n";
-}
+}  // namespace
 
-/// The classes whose properties the answer can hold.
-std::vector<std::string> classesOf(const OperationRequest& request, const OperationResult& result) {
-    std::vector<std::string> classes;
-    if (request.operation == Operation::EnumerateInstances ||
-        request.operation == Operation::GetInstance) {
-        classes.push_back(request.path.className);
-    }
-    for (const InstanceValue& instance : result.instances) {
-        const std::string& name = instance.path.className;
-        const auto isSame = [&](const std::string& other) {
-            return base::equalsIgnoreCase(name, other);
-        };
-        if (std::none_of(classes.begin(), classes.end(), isSame)) classes.push_back(name);
-    }
-    return classes;
-}
-
-/// A class that the schema does not know may declare anything.
-bool declares(const Schema& schema, const std::string& className, const std::string& property) {
-    return schema.find(className) == nullptr || schema.findProperty(className, property) != nullptr;
-}
-
-std::string notesOnNames(const OperationRequest& request, const OperationResult& result,
-                         const Schema& schema) {
-    const std::vector<std::string> classes = classesOf(request, result);
-    std::string notes;
-    for (const std::string& name : request.properties.value_or(std::vector<std::string>())) {
-        const auto declaresIt = [&](const std::string& className) {
-            return declares(schema, className, name);
-        };
-        if (!classes.empty() && std::none_of(classes.begin(), classes.end(), declaresIt)) {
-            // Never null: a class that the schema does not know counts as declaring everything.
-            notes += "note: the class " + schema.find(classes.front())->name +
-                     " declares no property '" + base::escapeForTerminal(name) + "'\n";
-        }
-    }
-    return notes;
-}
-
-/// The classes of the CIM schema are ancestors that no file needs to declare.
-bool mayBeClass(const Schema& schema, const std::string& name) {
-    return schema.find(name) != nullptr || base::equalsIgnoreCase(name.substr(0, 4), "CIM_");
-}
-
-/// Whether any association has the role: which one is meant may be what the user got wrong.
-bool isRole(const Schema& schema, const std::string& name) {
-    const std::vector<std::string> classes = schema.classNames();
-    return std::any_of(classes.begin(), classes.end(), [&](const std::string& className) {
-        const mof::Feature* property = schema.findProperty(className, name);
-        return schema.isAssociation(className) && property != nullptr &&
-               property->type == mof::Type::Reference;
-    });
-}
-
-/// A line that begins with `start` for each name of an association request that is most likely
-/// misspelt.
-std::string linesOnUnknownNames(const std::string& start, const OperationRequest& request,
-                                const Schema& schema) {
+std::string messageLines(const std::string& text) {
     std::string lines;
-    const auto addLine = [&](const std::string& what, const std::string& name) {
-        lines += start + what + " '" + base::escapeForTerminal(name) + "'\n";
-    };
-    const std::string& source = request.path.className;
-    for (const auto& name : {std::optional(source), request.assocClass, request.resultClass}) {
-        if (name && !mayBeClass(schema, *name)) addLine("the schema has no class", *name);
-    }
-    for (const auto& name : {request.role, request.resultRole}) {
-        if (name && !isRole(schema, *name))
-            addLine("no association of the schema has a role", *name);
-    }
-    for (const KeyBinding& key : request.path.keys) {
-        if (schema.find(source) != nullptr && !schema.isKey(source, key.name)) {
-            addLine("the class " + schema.find(source)->name + " declares no key", key.name);
-        }
+    for (std::size_t start = 0; start < text.size();) {
+        const std::size_t end = std::min(text.find('\n', start), text.size());
+        lines += "cmpihost: " + text.substr(start, end - start) + "\n";
+        start = end + 1;
     }
     return lines;
 }
 
-bool isEmpty(const OperationResult& result) {
-    return result.paths.empty() && result.instances.empty();
+std::string noteLine(const std::string& text) {
+    return messageLines("note: " + text);
 }
-
-bool yieldsInstances(Operation operation) {
-    return operation == Operation::EnumerateInstances || operation == Operation::GetInstance ||
-           operation == Operation::Associators || operation == Operation::References;
-}
-
-}  // namespace
 
 std::string statusText(CMPIrc rc) {
     const std::string number = std::to_string(static_cast<unsigned>(rc));
@@ -153,36 +66,17 @@ std::string statusText(CMPIrc rc) {
     return "CMPI status " + number;
 }
 
-std::string failureText(const OperationResult& result) {
+std::string requestText(const OperationRequest& request) {
+    const ObjectPathValue& path = request.path;
+    std::string text = operationName(request.operation);
+    if (!path.className.empty()) text += " of " + base::escapeForTerminal(path.className);
+    return text + " in " + base::escapeForTerminal(path.nameSpace);
+}
+
+std::string failureText(const OperationRequest& request, const OperationResult& result) {
     const std::string message = base::escapeForTerminal(result.message.value_or(std::string()));
-    return statusText(result.rc) + (message.empty() ? "" : ": " + message);
-}
-
-std::string notesOn(const OperationRequest& request, const OperationResult& result,
-                    const Schema& schema) {
-    std::string notes;
-    if (request.operation == Operation::GetInstance) notes = noteOnCount(result);
-    if (isAssociationOperation(request.operation) && isEmpty(result)) {
-        notes += linesOnUnknownNames("note: ", request, schema);
-    }
-    if (yieldsInstances(request.operation)) notes += notesOnNames(request, result, schema);
-    return notes;
-}
-
-std::string hintFor(const OperationRequest& request, const OperationResult& failure,
-                    const Schema& schema) {
-    const bool associators = request.operation == Operation::Associators ||
-                             request.operation == Operation::AssociatorNames;
-    if (!associators || failure.rc != CMPI_RC_ERR_INVALID_CLASS) return {};
-    std::string unknown = linesOnUnknownNames("hint: ", request, schema);
-    // The name is right as far as the schema knows, so there is nothing to advise.
-    if (request.assocClass) return unknown;
-    std::string names;
-    for (const std::string& name : schema.classNames()) {
-        if (schema.isAssociation(name)) names += (names.empty() ? "" : ", ") + name;
-    }
-    return unknown + "hint: name the association with --assoc-class" +
-           (names.empty() ? "" : ", one of " + names) + "\n";
+    return requestText(request) + ": " + statusText(result.rc) +
+           (message.empty() ? "" : ": " + message);
 }
 
 }  // namespace cmpihost

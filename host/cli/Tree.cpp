@@ -45,7 +45,7 @@ class TreeBuilder {
 
     std::vector<InstanceValue> answered(const OperationRequest& request) const {
         OperationResult result = ask_(request);
-        if (result.rc != CMPI_RC_OK) throw TreeFailure(failureText(result));
+        if (result.rc != CMPI_RC_OK) throw TreeFailure(failureText(request, result));
         return std::move(result.instances);
     }
 

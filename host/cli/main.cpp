@@ -3,10 +3,14 @@
 #include <time.h>
 #include <unistd.h>
 
+#include <chrono>
+#include <cstdlib>
 #include <exception>
 #include <filesystem>
+#include <iomanip>
 #include <iostream>
 #include <optional>
+#include <sstream>
 #include <stdexcept>
 #include <type_traits>
 
@@ -15,12 +19,14 @@
 #include "host/cli/CommandLine.h"
 #include "host/cli/Describe.h"
 #include "host/cli/Diagnostics.h"
+#include "host/cli/Explanation.h"
 #include "host/cli/InstallPaths.h"
+#include "host/cli/NameNotes.h"
 #include "host/cli/PathCompletion.h"
 #include "host/cli/PathParser.h"
 #include "host/cli/ProviderHost.h"
+#include "host/cli/ProviderRecords.h"
 #include "host/cli/RequestBuilder.h"
-#include "host/cli/ScopedStderrLog.h"
 #include "host/cli/Tree.h"
 #include "host/mof/Schema.h"
 
@@ -80,6 +86,10 @@ bool yieldsNothing(Operation operation) {
     return operation == Operation::ModifyInstance || operation == Operation::DeleteInstance;
 }
 
+bool isNotFound(const OperationResult& result) {
+    return result.rc == CMPI_RC_ERR_NOT_FOUND;
+}
+
 void printResult(const OperationRequest& request, OperationResult result, const Schema& schema,
                  Printer& printer) {
     if (yieldsNothing(request.operation)) return;
@@ -95,6 +105,35 @@ void printResult(const OperationRequest& request, OperationResult result, const 
     printer.print(result.instances);
 }
 
+/// How long each part of the work took.
+class Stopwatch {
+  public:
+    using Time = std::chrono::duration<double, std::milli>;
+
+    /// Adds the time since the last lap to a part.
+    void lap(Time Stopwatch::*part) {
+        const auto now = std::chrono::steady_clock::now();
+        this->*part += now - last_;
+        last_ = now;
+    }
+
+    /// The line for the standard error.
+    std::string line() const {
+        std::ostringstream text;
+        text << std::fixed << std::setprecision(1) << "time: load " << load.count()
+             << " ms (schema, libraries), request " << request.count()
+             << " ms (the providers' answer), output " << output.count() << " ms";
+        return messageLines(text.str());
+    }
+
+    Time load{};
+    Time request{};
+    Time output{};
+
+  private:
+    std::chrono::steady_clock::time_point last_ = std::chrono::steady_clock::now();
+};
+
 /// Carries a command line out: loads the provider, runs the operation, writes the results to `out`
 /// and everything else (failures, what the broker caught, notes) to `err`. Libraries and MOF files
 /// that the command line does not name are looked for around `programFolder`.
@@ -107,7 +146,9 @@ class Run {
     /// Does it all, and turns what is thrown on the way into a complaint and its exit status.
     ExitStatus exitStatus() {
         try {
-            return execute();
+            const ExitStatus status = execute();
+            if (commandLine_.time) err_ << stopwatch_.line();
+            return caught_ ? exitCaught : status;
         } catch (const ProviderNotFound& error) {
             return failed(error.what(), exitNotLoaded);
         } catch (const LoadError& error) {
@@ -141,23 +182,46 @@ class Run {
     ExitStatus runOperation(const Schema& schema, const SchemaCatalogue& catalogue) {
         OperationRequest request = buildRequest(commandLine_, schema, catalogue);
         if (commandLine_.value) checkValueName(*commandLine_.value, request, schema);
+        std::string notes;
         const OperationResult result = withHost(catalogue, [&](ProviderHost& host) {
-            return commandLine_.bare || !lacksKeys(request, catalogue) ? host.run(request)
-                                                                       : completed(host, request);
+            OperationResult answer = commandLine_.bare || !lacksKeys(request, catalogue)
+                                         ? host.run(request)
+                                         : completed(host, request);
+            stopwatch_.lap(&Stopwatch::request);
+            // Before the questions that explain the answer make records of their own.
+            const std::string records = recordNotes(request, answer);
+            notes = notesOn(request, answer, schema, host) + records;
+            return answer;
         });
-        if (result.rc != CMPI_RC_OK) {
-            failed(failureText(result), exitCimStatus);
-            err_ << hintFor(request, result, schema);
-            return exitCimStatus;
-        }
         // The libraries are gone by now, with whatever they may have left to write themselves.
-        printResult(request, result, schema, *printer(schema));
-        if (commandLine_.value) {
-            const std::string note = noteOnValues(*commandLine_.value, result);
-            if (!note.empty()) err_ << "note: " << note << '\n';
+        const bool done = result.rc == CMPI_RC_OK;
+        if (done) {
+            printResult(request, result, schema, *printer(schema));
+            notes += noteOnBareValues(result);
+        } else {
+            failed(failureText(request, result), exitCimStatus);
         }
-        err_ << notesOn(request, result, schema);
-        return written();
+        err_ << notes;
+        if (written() != exitDone) return exitCimStatus;
+        const bool nothingFound = request.operation == Operation::GetInstance &&
+                                  (done ? result.instances.empty() : isNotFound(result));
+        if (nothingFound) return exitNothingFound;
+        return done ? exitDone : exitCimStatus;
+    }
+
+    std::string noteOnBareValues(const OperationResult& result) const {
+        if (!commandLine_.value) return {};
+        const std::string note = noteOnValues(*commandLine_.value, result);
+        return note.empty() ? note : noteLine(note);
+    }
+
+    /// What helps to understand an answer: names that may be misspelt, and why there is nothing.
+    std::string notesOn(const OperationRequest& request, const OperationResult& answer,
+                        const Schema& schema, ProviderHost& host) const {
+        const std::string names = notesOnNames(request, answer, schema);
+        if (!names.empty() || !isEmptyAnswer(request, answer)) return names;
+        return reasonForNothing(
+            request, schema, [&](const OperationRequest& question) { return host.run(question); });
     }
 
     std::unique_ptr<Printer> printer(const Schema& schema) const {
@@ -171,39 +235,54 @@ class Run {
         OperationResult names = host.ask(namesRequest(request.path));
         if (names.rc != CMPI_RC_OK) return names;
         request.path = completedPath(request.path, names.paths);
-        err_ << "cmpihost: completed the path: " << base::escapeForTerminal(toString(request.path))
-             << '\n';
+        err_ << messageLines("completed the path: " +
+                             base::escapeForTerminal(toString(request.path)));
         return host.run(request);
     }
 
     ExitStatus drawHost(const Schema& schema, const SchemaCatalogue& catalogue) {
         const std::string nameSpace = parseNamespace(commandLine_.nameSpace);
-        try {
-            const std::vector<TreeNode> roots = withHost(catalogue, [&](ProviderHost& host) {
-                const Ask ask = [&host](const OperationRequest& request) {
-                    return host.ask(request);
-                };
-                return hostTree(ask, nameSpace, schema);
-            });
-            if (commandLine_.format == Format::Json) {
-                writeTreeJson(roots, out_, schema);
-            } else {
-                for (const TreeNode& root : roots) drawTree(root, out_, terminalOf(STDOUT_FILENO));
+        std::vector<TreeNode> roots;
+        const std::string failure = withHost(catalogue, [&](ProviderHost& host) -> std::string {
+            const Ask ask = [&host](const OperationRequest& request) { return host.ask(request); };
+            try {
+                roots = hostTree(ask, nameSpace, schema);
+            } catch (const TreeFailure& error) {
+                return error.what();
             }
-        } catch (const TreeFailure& failure) {
-            return failed(failure.what(), exitCimStatus);
+            stopwatch_.lap(&Stopwatch::request);
+            return {};
+        });
+        if (!failure.empty()) return failed(failure, exitCimStatus);
+        if (commandLine_.format == Format::Json) {
+            writeTreeJson(roots, out_, schema);
+        } else {
+            for (const TreeNode& root : roots) drawTree(root, out_, terminalOf(STDOUT_FILENO));
         }
         return written();
     }
 
+    /// The failures that the provider recorded, where the answer is one or holds nothing; not what
+    /// its message says already.
+    std::string recordNotes(const OperationRequest& request, const OperationResult& answer) const {
+        std::string notes;
+        if (answer.rc == CMPI_RC_OK && !isEmptyAnswer(request, answer)) return notes;
+        for (const std::string& record : failures_.texts()) {
+            if (record != answer.message)
+                notes += noteLine("the provider recorded: " + base::escapeForTerminal(record));
+        }
+        return notes;
+    }
+
     ExitStatus failed(const std::string& complaint, ExitStatus status) {
-        err_ << "cmpihost: " << complaint << '\n';
+        err_ << messageLines(complaint);
         return status;
     }
 
     ExitStatus written() {
-        if (!out_.flush()) return failed("the results cannot be written", exitCimStatus);
-        return exitDone;
+        const bool done = static_cast<bool>(out_.flush());
+        stopwatch_.lap(&Stopwatch::output);
+        return done ? exitDone : failed("the results cannot be written", exitCimStatus);
     }
 
     /// Has the host do its work, and prints what it caught the provider at.
@@ -211,15 +290,24 @@ class Run {
     std::invoke_result_t<Work, ProviderHost&> withHost(const SchemaCatalogue& catalogue,
                                                        Work work) {
         // The logging library reads its configuration when it is loaded, and again while it runs.
-        std::optional<ScopedStderrLog> log;
-        if (commandLine_.log) log.emplace();
+        std::optional<ScopedLogConfiguration> log;
+        const std::string configuration = logConfiguration();
+        if (!configuration.empty()) log.emplace(configuration);
         const std::string provider = providerFile(commandLine_, programFolder_);
         ProviderHost host({provider, providerName(provider)}, catalogue, computerSystems());
+        stopwatch_.lap(&Stopwatch::load);
         auto result = work(host);
         for (const std::string& violation : host.unload()) {
             err_ << "caught: " << base::escapeForTerminal(violation) << '\n';
+            caught_ = true;
         }
         return result;
+    }
+
+    /// A configuration that the user names goes before the host's own.
+    std::string logConfiguration() const {
+        if (commandLine_.log) return stderrConfiguration(*commandLine_.log);
+        return std::getenv("ZBLOG_CONF") == nullptr ? failures_.configuration() : std::string();
     }
 
     ComputerSystemSource computerSystems() const {
@@ -234,6 +322,9 @@ class Run {
     const fs::path& programFolder_;
     std::ostream& out_;
     std::ostream& err_;
+    Stopwatch stopwatch_;
+    const FailureRecords failures_;
+    bool caught_ = false;
 };
 
 /// Shows the text that the command line asked for (help, version) or earned (a complaint).
@@ -261,7 +352,7 @@ int main(int argumentCount, char** arguments) {
         return Run(*parsed.commandLine, programFolder(invokedAs), std::cout, std::cerr)
             .exitStatus();
     } catch (const std::exception& error) {
-        std::cerr << "cmpihost: " << error.what() << '\n';
+        std::cerr << messageLines(error.what());
         return exitUsage;
     }
 }

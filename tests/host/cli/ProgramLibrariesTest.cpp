@@ -118,15 +118,16 @@ TEST_F(ProgramElsewhere, WithoutItsLibraryExitsWithThreeAndTellsThePlaces) {
     } rows[] = {{{"ei", "X"},
                  "cmpihost: no library of the facade was found; looked for\n",
                  "lib/libkorvaosstatusfacade.so.1\n",
-                 "\n(--provider FILE names one)\n"},
+                 "\ncmpihost: (--provider FILE names one)\n"},
                 {{"--bare", "ei", "X"},
                  "cmpihost: no library of the provider was found; looked for\n",
                  "lib/libkorzbosstatusprofileprovider.so.1\n",
-                 "\n(--provider FILE names one, without --bare)\n"}};
+                 "\ncmpihost: (--provider FILE names one, without --bare)\n"}};
     for (const auto& row : rows) {
         const ProgramRun run = installed(row.arguments);
         EXPECT_EQ(run.status, 3);
-        EXPECT_THAT(run.err, StartsWith(row.complaint + ("  " + (folder_ / row.place).string())));
+        EXPECT_THAT(run.err,
+                    StartsWith(row.complaint + ("cmpihost:   " + (folder_ / row.place).string())));
         EXPECT_THAT(run.err, EndsWith(row.hint));
     }
 }

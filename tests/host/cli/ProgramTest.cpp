@@ -195,13 +195,13 @@ TEST(Program, TellsHowTheLibrariesCleanedUp) {
     const Words request =
         withStandIn({"--companion", KORVA_STAND_IN, "ein", "KORVA_OperatingSystem"});
     const ProgramRun failing = cmpihost(request, {"STAND_IN_CLEANUP=fails"});
-    EXPECT_EQ(failing.status, 0);
+    EXPECT_EQ(failing.status, 5);
     EXPECT_EQ(failing.err,
               "caught: cleanup answered status 1\n"
               "caught: cleanup answered status 1\n"
               "caught: cleanup answered status 1\n");
     const ProgramRun throwing = cmpihost(request, {"STAND_IN_CLEANUP=throws"});
-    EXPECT_EQ(throwing.status, 0);
+    EXPECT_EQ(throwing.status, 5);
     EXPECT_THAT(throwing.err, StartsWith("caught: an exception left cleanup\n"));
 }
 
