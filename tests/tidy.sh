@@ -11,7 +11,7 @@ folder=build/$preset/tidy
 mkdir -p "$folder"
 
 # Each file of the product once, without the options that only g++ knows.
-awk -v product="\"file\": \"$PWD/((base|companion|facade|framework|host|provider)/|build/$preset/host/)" '
+awk -v product="\"file\": \"$PWD/((base|companion|examples|facade|framework|host|provider)/|build/$preset/host/)" '
     /^{/ { entry = "" }
     { entry = entry $0 "\n" }
     /^}/ {
