@@ -37,15 +37,24 @@ Object* required(Object* object, const CMPIStatus& status, const char* what) {
     throw CimError(CMPI_RC_ERR_FAILED, std::string("the object manager gives no ") + what);
 }
 
-/// A copy; empty for null.
+/// A copy; throws CimError for null.
 inline std::string text(const CMPIString* string) {
-    const char* const characters =
-        CMIsNullObject(string) ? nullptr : CMGetCharsPtr(string, nullptr);
-    return characters == nullptr ? std::string() : characters;
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    required(string, status, "text");
+    const char* const characters = CMGetCharsPtr(string, &status);
+    require(status, "the characters of a text");
+    if (characters == nullptr) throw CimError(CMPI_RC_ERR_FAILED, "a text has no characters");
+    return characters;
+}
+
+inline std::string nameSpace(const CMPIObjectPath* path) {
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    return text(required(CMGetNameSpace(path, &status), status, "namespace"));
 }
 
 inline std::string className(const CMPIObjectPath* path) {
-    return text(CMGetClassName(path, nullptr));
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    return text(required(CMGetClassName(path, &status), status, "class name"));
 }
 
 /// Names of classes and roles are the same in any letter case.
@@ -53,17 +62,19 @@ inline bool sameName(const std::string& left, const std::string& right) {
     return strcasecmp(left.c_str(), right.c_str()) == 0;
 }
 
-/// The key of a path; throws CimError when the path has none of that name.
+/// The value of a key; throws CimError when the path lacks it.
 inline CMPIData keyOf(const CMPIObjectPath* path, const char* name) {
     CMPIStatus status = {CMPI_RC_OK, nullptr};
     const CMPIData key = CMGetKey(path, name, &status);
-    require(status, "key ", name);
-    return key;
+    if (status.rc == CMPI_RC_OK && !CMIsNullValue(key)) return key;
+    throw CimError(CMPI_RC_ERR_INVALID_PARAMETER, std::string("the path lacks the key ") + name);
 }
 
-inline std::string textKeyOf(const CMPIObjectPath* path, const char* name) {
-    const CMPIData key = keyOf(path, name);
-    return key.type == CMPI_string && !CMIsNullValue(key) ? text(key.value.string) : std::string();
+/// The text of a key. Object managers differ in the type that they give it.
+inline std::string text(const CMPIData& key) {
+    if (key.type == CMPI_string) return text(key.value.string);
+    if (key.type == CMPI_chars && key.value.chars != nullptr) return key.value.chars;
+    throw CimError(CMPI_RC_ERR_INVALID_PARAMETER, "a key is no text");
 }
 
 inline void addKey(CMPIObjectPath* path, const char* name, const std::string& value) {
@@ -84,25 +95,33 @@ void set(CMPIInstance* instance, const char* name, Value value, CMPIType type) {
     require(CMSetProperty(instance, name, &value, type), "property ", name);
 }
 
-/// Whether a path that a client gave means the object of a path that the provider made.
+inline bool samePath(const CMPIObjectPath* given, const CMPIObjectPath* own);
+
+inline bool sameKey(const char* name, const CMPIData& given, const CMPIData& own) {
+    if (own.type == CMPI_ref) {
+        return given.type == CMPI_ref && samePath(given.value.ref, own.value.ref);
+    }
+    const std::string left = text(given);
+    const std::string right = text(own);
+    const bool isClass =
+        sameName(name, "CreationClassName") || sameName(name, "CSCreationClassName");
+    return isClass ? sameName(left, right) : left == right;
+}
+
+/// Whether a path that a client gave means the object of a path that the provider made. Keys are
+/// texts or references. Throws CimError when the given path lacks a key.
 inline bool samePath(const CMPIObjectPath* given, const CMPIObjectPath* own) {
     if (!sameName(className(given), className(own))) return false;
-    const CMPICount count = CMGetKeyCount(own, nullptr);
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    const CMPICount count = CMGetKeyCount(own, &status);
+    require(status, "the count of keys");
+    if (count == 0) throw CimError(CMPI_RC_ERR_FAILED, "a path has no keys");
     for (CMPICount index = 0; index < count; ++index) {
         CMPIString* keyName = nullptr;
-        const CMPIData key = CMGetKeyAt(own, index, &keyName, nullptr);
+        const CMPIData key = CMGetKeyAt(own, index, &keyName, &status);
+        require(status, "a key");
         const std::string name = text(keyName);
-        CMPIStatus status = {CMPI_RC_OK, nullptr};
-        const CMPIData other = CMGetKey(given, name.c_str(), &status);
-        if (status.rc != CMPI_RC_OK || CMIsNullValue(other) || other.type != key.type) return false;
-        if (key.type == CMPI_ref) {
-            if (!samePath(other.value.ref, key.value.ref)) return false;
-            continue;
-        }
-        const std::string left = text(other.value.string);
-        const std::string right = text(key.value.string);
-        const bool holdsClass = name == "CreationClassName" || name == "CSCreationClassName";
-        if (holdsClass ? !sameName(left, right) : left != right) return false;
+        if (!sameKey(name.c_str(), keyOf(given, name.c_str()), key)) return false;
     }
     return true;
 }

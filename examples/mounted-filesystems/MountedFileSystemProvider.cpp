@@ -42,17 +42,17 @@ struct Host {
 using MountedFileSystem = FileSystems::value_type;
 
 CMPIObjectPath* newPath(const Request& request, const char* ofClass) {
-    const std::string nameSpace = text(CMGetNameSpace(request.path, nullptr));
     CMPIStatus status = {CMPI_RC_OK, nullptr};
-    CMPIObjectPath* path = CMNewObjectPath(broker, nameSpace.c_str(), ofClass, &status);
+    CMPIObjectPath* path =
+        CMNewObjectPath(broker, nameSpace(request.path).c_str(), ofClass, &status);
     return required(path, status, "object path");
 }
 
 CMPIObjectPath* fileSystemPath(const Request& request, const Host& host,
                                const MountedFileSystem& item) {
     CMPIObjectPath* path = newPath(request, fileSystemClass);
-    addKey(path, "CSCreationClassName", textKeyOf(host.path, "CreationClassName"));
-    addKey(path, "CSName", textKeyOf(host.path, "Name"));
+    addKey(path, "CSCreationClassName", text(keyOf(host.path, "CreationClassName")));
+    addKey(path, "CSName", text(keyOf(host.path, "Name")));
     addKey(path, "CreationClassName", fileSystemClass);
     addKey(path, "Name", item.first);
     return path;
@@ -76,7 +76,11 @@ CMPIInstance* newInstance(const Request& request, const CMPIObjectPath* path, co
     }
     for (; *keys != nullptr; ++keys) {
         const CMPIData key = keyOf(path, *keys);
-        set(instance, *keys, key.value, key.type);
+        if (key.type == CMPI_ref) {
+            set(instance, *keys, key.value.ref, CMPI_ref);
+        } else {
+            setText(instance, *keys, text(key));
+        }
     }
     return instance;
 }
@@ -198,7 +202,11 @@ bool passesRole(const char* filter, const char* role) {
 
 /// Clients may name a superclass, and the object manager knows the classes.
 bool passesClass(const char* filter, const CMPIObjectPath* path) {
-    return filter == nullptr || CMClassPathIsA(broker, path, filter, nullptr);
+    if (filter == nullptr) return true;
+    CMPIStatus status = {CMPI_RC_OK, nullptr};
+    const bool passes = CMClassPathIsA(broker, path, filter, &status);
+    require(status, "to compare classes");
+    return passes;
 }
 
 template <class Visit>
