@@ -55,3 +55,6 @@ korva_pkg_config(vaprovider "Object paths, instances and monikers on any CMPI br
                  " -DCMPI_PLATFORM_LINUX_GENERIC_GNU${korva_pkg_config_cmpi}")
 korva_pkg_config(vainstrumentation "Cursors over the managed nodes of a host" "")
 korva_pkg_config(zblog "Log and trace of a management agent" "")
+
+# Examples, to be copied: whole projects, which are built with the package.
+install(DIRECTORY "${PROJECT_SOURCE_DIR}/examples/" DESTINATION "${KORVA_SHARE_DIR}/examples" COMPONENT development)

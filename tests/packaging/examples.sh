@@ -1,0 +1,48 @@
+# The installed examples, built with the installed development package, and the guide that goes through them.
+# shellcheck shell=sh
+: "${work:?}" "${KORVA_BINARY_DIR:?}" "${KORVA_SOURCE_DIR:?}" "${KORVA_WORD_SIZE:?}"
+tree=$work/destination/usr
+DESTDIR=$work/destination expect_success cmake --install "$KORVA_BINARY_DIR" --prefix /usr
+export CXXFLAGS="-m$KORVA_WORD_SIZE -Wall -Wextra -Wpedantic -Wshadow -Wconversion -Werror"
+# Blocks marked "shell" of a document, as one script; those marked "text".
+blocks() { awk -v mark="\`\`\`$1" '/^```/ { inside = $0 == mark; next } inside' "$2"; }
+
+build_example() {
+    expect_success cmake -S "$tree/share/korva-osstatus/examples/mounted-filesystems" -B "$work/build" \
+        -DCMAKE_PREFIX_PATH="$tree"
+    expect_success cmake --build "$work/build"
+}
+
+ExampleIsBuiltAndItsTestsPass() {
+    build_example
+    expect_success ctest --test-dir "$work/build" --output-on-failure
+    expect_text "100% tests passed, 0 tests failed out of 2" "$output"
+}
+
+ExampleExportsNothingButItsFactories() {
+    build_example
+    expect_equal "the exported symbols" "MountedFileSystemProvider_Create_AssociationMI
+MountedFileSystemProvider_Create_InstanceMI" \
+        "$(nm -D --defined-only --format=posix "$work/build/libexamplemountedfilesystems.so" | cut -d ' ' -f 1 | LC_ALL=C sort)"
+}
+
+ExampleAnswersFromWhereItIsInstalled() {
+    build_example
+    expect_success cmake --install "$work/build" --prefix "$tree"
+    expect_success "$tree/bin/cmpihost" --schema "$tree/share/mounted-filesystems" \
+        --registration "$tree/share/mounted-filesystems" --registration "$tree/share/korva-osstatus/registration" \
+        ein EXAMPLE_MountedFileSystem
+    expect_text 'Name="/' "$output"
+}
+
+GuideLeadsFromAnEmptyFolderToAnswers() {
+    guide=$KORVA_SOURCE_DIR/docs/writing-a-provider.md
+    blocks shell "$guide" >"$work/commands"
+    blocks text "$guide" >"$work/promised"
+    mkdir "$work/empty"
+    cd "$work/empty" || fail "no folder"
+    PATH=$tree/bin:$PATH PREFIX=$tree expect_success sh -eu "$work/commands"
+    printf '%s\n' "$output" | sed "s/\"$(uname -n)\"/\"vm\"/g" >"$work/printed"
+    expect_equal "what the guide promises, and is not printed" "" \
+        "$(grep -vxF -f "$work/printed" "$work/promised")"
+}
