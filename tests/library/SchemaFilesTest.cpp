@@ -1,7 +1,11 @@
 // The shipped MOF files: object managers and clients know the provider by them.
 #include <gtest/gtest.h>
 
+#include <filesystem>
+#include <fstream>
+#include <map>
 #include <set>
+#include <sstream>
 #include <variant>
 
 #include "host/mof/MofAst.h"
@@ -15,9 +19,10 @@ namespace mof = cmpihost::mof;
 
 /// Every qualifier that the files use is declared by the standard with this scope.
 const std::set<std::string> standardQualifiers = {
-    "Aggregate", "Aggregation", "ArrayType", "Association", "Description", "Gauge",
-    "Key",       "Max",         "MaxLen",    "Min",         "Override",    "Propagated",
-    "Required",  "ValueMap",    "Units",     "Values",      "Version",     "Weak"};
+    "Aggregate", "Aggregation", "ArrayType",      "Association", "Description",
+    "Gauge",     "Key",         "MappingStrings", "Max",         "MaxLen",
+    "Min",       "Override",    "Propagated",     "Required",    "ValueMap",
+    "Units",     "Values",      "Version",        "Weak"};
 
 const Schema& shipped() {
     static const Schema schema = Schema::load(KORVA_SOURCE_DIR "/schema");
@@ -74,6 +79,87 @@ TEST(ShippedSchema, DescribesEveryPropertyInStandardQualifiers) {
             EXPECT_TRUE(overridden.empty() || overridden == property.name) << overridden;
         }
     }
+}
+
+/// The rows of the tables in docs/properties.md about published properties, by "CLASS.PROPERTY".
+std::map<std::string, std::string> documentedRows() {
+    std::map<std::string, std::string> rows;
+    std::ifstream document(KORVA_SOURCE_DIR "/docs/properties.md");
+    std::string className;
+    for (std::string line; std::getline(document, line);) {
+        if (line.compare(0, 3, "## ") == 0) className = line.substr(3);
+        const bool published = line.find("| always |") == std::string::npos;
+        if (line.compare(0, 3, "| `") == 0 && className.compare(0, 6, "KORVA_") == 0 && published)
+            rows[className + "." + line.substr(3, line.find('`', 3) - 3)] = line;
+    }
+    return rows;
+}
+
+/// What stands between backticks.
+std::vector<std::string> codeIn(const std::string& text) {
+    std::vector<std::string> parts;
+    std::istringstream pieces(text);
+    bool code = false;
+    for (std::string piece; std::getline(pieces, piece, '`'); code = !code)
+        if (code) parts.push_back(piece);
+    return parts;
+}
+
+/// "File.Linux|/proc/meminfo|MemTotal" cut at its bars.
+std::vector<std::string> partsOf(const std::string& source) {
+    std::vector<std::string> parts;
+    std::istringstream pieces(source);
+    for (std::string piece; std::getline(pieces, piece, '|');) parts.push_back(piece);
+    return parts;
+}
+
+/// The row of a property, with those of the properties that it refers to.
+std::string rowOf(const std::string& className, const std::string& property,
+                  const std::map<std::string, std::string>& rows) {
+    std::string text = rows.at(className + "." + property);
+    for (const std::string& part : codeIn(text)) {
+        const auto other = rows.find(className + "." + part);
+        if (part != property && other != rows.end()) text += other->second;
+    }
+    return text;
+}
+
+void expectSameFiles(const std::vector<std::string>& sources, const std::string& row) {
+    std::string files;
+    for (const std::string& source : sources) {
+        const std::vector<std::string> parts = partsOf(source);
+        if (parts.at(0) != "File.Linux") continue;
+        files += parts.at(1) + "\n";
+        const std::string name = std::filesystem::path(parts.at(1)).filename();
+        EXPECT_NE(row.find(name), std::string::npos) << source;
+        if (parts.size() > 2) {
+            EXPECT_NE(row.find(parts[2]), std::string::npos) << source;
+        }
+    }
+    for (const std::string& part : codeIn(row)) {
+        if (part.front() == '/') {
+            EXPECT_NE(files.find(part), std::string::npos) << part;
+        }
+    }
+}
+
+TEST(ShippedSchema, TellsWhereTheValuesOfAllPublishedPropertiesComeFromAsTheDocumentDoes) {
+    const std::map<std::string, std::string> rows = documentedRows();
+    std::size_t documented = 0;
+    for (const std::string& className : shipped().classNames()) {
+        for (const mof::Feature& property : shipped().find(className)->properties) {
+            SCOPED_TRACE(className + "." + property.name);
+            const std::vector<std::string> sources =
+                mof::texts(property.qualifiers, "MappingStrings");
+            const bool isEnd = property.type == mof::Type::Reference;
+            const bool isDocumented = rows.count(className + "." + property.name) > 0;
+            EXPECT_EQ(!sources.empty(), isEnd || isDocumented);
+            if (!isDocumented) continue;
+            ++documented;
+            expectSameFiles(sources, rowOf(className, property.name, rows));
+        }
+    }
+    EXPECT_EQ(documented, rows.size());
 }
 
 struct NamedNumber {

@@ -132,6 +132,6 @@ AChangeOfAClassIsNoticed() {
     echo "// A comment." >>"$work/schema/KORVA_RunningOS.mof"
     expect_equal "the versions" "$(cat "$work/before")" "$(class_versions "$work/schema")"
     sed -i 's/Max ( 1 )/Max ( 2 )/' "$work/schema/KORVA_RunningOS.mof"
-    expect_equal "the classes that changed" "KORVA_RunningOS 1.0.0" \
-        "$(class_versions "$work/schema" | grep -vxF -f "$work/before" | cut -d ' ' -f 1,2)"
+    expect_equal "the classes that changed" KORVA_RunningOS \
+        "$(class_versions "$work/schema" | grep -vxF -f "$work/before" | cut -d ' ' -f 1)"
 }
