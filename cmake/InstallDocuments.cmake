@@ -30,7 +30,7 @@ korva_man_page(provider korva-osstatus-register 8)
 
 # Documents for users, in the folders of the source, so that the links from one to another hold. Those for
 # developers (docs/dev, CONTRIBUTING.md) stay with the source.
-file(GLOB korva_documents CONFIGURE_DEPENDS "${PROJECT_SOURCE_DIR}/docs/*.md")
+file(GLOB korva_documents CONFIGURE_DEPENDS "${PROJECT_SOURCE_DIR}/docs/*.md" "${PROJECT_SOURCE_DIR}/docs/*.schema.json")
 install(FILES ${korva_documents} DESTINATION "${CMAKE_INSTALL_DOCDIR}/docs" COMPONENT provider)
 install(FILES "${PROJECT_SOURCE_DIR}/README.md" "${PROJECT_SOURCE_DIR}/CHANGELOG.md"
               "${PROJECT_SOURCE_DIR}/SECURITY.md" "${PROJECT_SOURCE_DIR}/LICENSE"

@@ -31,7 +31,7 @@ void addProperties(JsonValue& object, const InstanceValue& instance, const Schem
     for (const PropertyValue& property : instance.properties) {
         properties[property.name] = valueJson(property.value, schema);
         annotations.add(property.name, property.value, schema.valueMap(className, property.name),
-                        schema.findProperty(className, property.name));
+                        unitsOf(schema, className, property.name));
     }
     object["properties"] = std::move(properties);
     std::move(annotations).addTo(object);
@@ -101,11 +101,10 @@ JsonValue valueJson(const Value& value, const Schema& schema) {
 }
 
 void Annotations::add(const std::string& name, const Value& value, const ValueMap& meanings,
-                      const mof::Feature* declaration) {
+                      const std::string& units) {
     addUnlessNull(names_, name,
                   eachJson(value, [&](const Value& one) { return nameJson(one, meanings); }));
     addUnlessNull(times_, name, eachJson(value, timeJson));
-    const std::string units = declaration == nullptr ? "" : unitsOf(*declaration);
     if (!units.empty()) units_[name] = units;
 }
 

@@ -21,9 +21,9 @@ JsonValue valueJson(const Value& value, const Schema& schema);
 /// the values: `names` (of numbers), `times` (datetimes in ISO 8601) and `units`.
 class Annotations {
   public:
-    /// Notes what there is to say about a value. `declaration` may be null: nothing is known.
+    /// Notes what there is to say about a value; an empty text says nothing about its units.
     void add(const std::string& name, const Value& value, const ValueMap& meanings,
-             const mof::Feature* declaration);
+             const std::string& units);
 
     /// Adds the three members, also those that are empty.
     void addTo(JsonValue& object) &&;

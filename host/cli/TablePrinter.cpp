@@ -105,8 +105,7 @@ class TablePrinter final : public Printer {
     }
 
     Hints hintsOf(const std::string& className, const std::string& propertyName) const {
-        const mof::Feature* property = schema_.findProperty(className, propertyName);
-        const std::string units = property == nullptr ? "" : unitsOf(*property);
+        const std::string units = unitsOf(schema_, className, propertyName);
         return {schema_.valueMap(className, propertyName),
                 base::equalsIgnoreCase(units, "KiloBytes") || units == "kibibyte"};
     }

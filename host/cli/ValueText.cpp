@@ -174,9 +174,15 @@ const std::string* nameOf(const Value& value, const ValueMap& names) {
     return named ? names.find(static_cast<std::int64_t>(number)) : nullptr;
 }
 
-std::string unitsOf(const mof::Feature& feature) {
-    const std::string units = mof::text(feature.qualifiers, "Units");
-    return units.empty() ? unitWords(mof::text(feature.qualifiers, "PUnit")) : units;
+std::string unitsOf(const Schema& schema, const std::string& className,
+                    const std::string& propertyName) {
+    const auto text = [&](const char* qualifierName) {
+        const mof::Qualifier* const qualifier =
+            schema.propertyQualifier(className, propertyName, qualifierName);
+        return qualifier == nullptr ? std::string() : mof::text({*qualifier}, qualifierName);
+    };
+    const std::string units = text("Units");
+    return units.empty() ? unitWords(text("PUnit")) : units;
 }
 
 std::string characterText(std::uint64_t code) {

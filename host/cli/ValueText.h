@@ -5,7 +5,7 @@
 #include <string>
 
 #include "host/broker/Value.h"
-#include "host/mof/ValueMap.h"
+#include "host/mof/Schema.h"
 
 namespace cmpihost {
 
@@ -50,7 +50,8 @@ const std::string* nameOf(const Value& value, const ValueMap& names);
 /// The unit in which a property counts, in words: its qualifier Units as written ("KiloBytes"),
 /// else its PUnit, with a prefix in place of the usual powers ("byte * 2^10" is "kibibyte"). Empty
 /// for none.
-std::string unitsOf(const mof::Feature& feature);
+std::string unitsOf(const Schema& schema, const std::string& className,
+                    const std::string& propertyName);
 
 /// The text of a CMPI_char16 in UTF-8.
 std::string characterText(std::uint64_t code);

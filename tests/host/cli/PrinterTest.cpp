@@ -362,9 +362,12 @@ TEST(UnitsOf, AreTheWordsOfTheSchemaElseThoseOfTheProgrammaticUnit) {
         {"PUnit(\"bit / second * 10^6 * 3\")", "bit / second * 10^6 * 3"},
         {"Key", ""}};
     for (const auto& [qualifiers, units] : rows) {
-        const mof::Document document =
-            mof::parse("class A { [" + std::string(qualifiers) + "] uint64 P; };", "x.mof");
-        EXPECT_EQ(unitsOf(document.classes[0].properties[0]), units);
+        Schema declared;
+        declared.add(mof::parse("class A { [" + std::string(qualifiers) +
+                                    "] uint64 P; }; class B : A { [Override(\"P\")] uint64 P; };",
+                                "x.mof"));
+        EXPECT_EQ(unitsOf(declared, "A", "P"), units);
+        EXPECT_EQ(unitsOf(declared, "B", "P"), units);
     }
 }
 

@@ -2,7 +2,11 @@
 // libraries that ship on a host that is the same everywhere. What whole runs print stands in runs/.
 #include <gmock/gmock.h>
 
+#include <algorithm>
+#include <nlohmann/json.hpp>
+
 #include "host/cli/Cmpihost.h"
+#include "host/cli/JsonForm.h"
 #include "support/GoldenFile.h"
 
 namespace {
@@ -17,6 +21,20 @@ std::string replaced(std::string text, const std::string& part, const std::strin
     return text;
 }
 
+/// The form of what a command prints as JSON; empty: it prints none.
+std::string jsonForm(const Words& arguments) {
+    const std::pair<const char*, const char*> rows[] = {
+        {"ei", "instances"}, {"gi", "instances"},   {"ai", "instances"}, {"ri", "instances"},
+        {"ein", "paths"},    {"ain", "paths"},      {"rin", "paths"},    {"ci", "paths"},
+        {"tree", "tree"},    {"im", "methodResult"}};
+    const bool json = std::find(arguments.begin(), arguments.end(), "json") != arguments.end();
+    for (const auto& [command, form] : rows) {
+        const auto found = std::find(arguments.begin(), arguments.end(), command);
+        if (json && found != arguments.end()) return form;
+    }
+    return {};
+}
+
 /// The command lines as one types them, each with what it printed. What differs from machine to
 /// machine has a name of its own.
 std::string transcript(const std::vector<Words>& runs, const Words& environment) {
@@ -29,6 +47,10 @@ std::string transcript(const std::vector<Words>& runs, const Words& environment)
             text += plain ? " " + word : " '" + word + "'";
         }
         text += "\n" + run.out;
+        const std::string form = run.status == 0 ? jsonForm(arguments) : "";
+        if (!form.empty()) {
+            EXPECT_EQ(complaintOnJson(run.out, form), "") << text;
+        }
         for (const std::string& line : lines(run.err)) text += "! " + line + "\n";
         text += "exit " + std::to_string(run.status) + "\n\n";
     }
@@ -145,6 +167,19 @@ TEST(Program, PrintsWhatTheShippedLibrariesAnswer) {
         {"--format", "json", "ri", system, "--result-class", runningOS},
         {"--format", "json", "rin", system, "--result-class", runningOS},
         {"ri", system, "--role", "PartComponent", "--properties", ""},
+        {"ai", system, "--result-class", "KORVA_OperatingSystemCapabilities"},
+        {"--format", "mof", "ai", system, "--role", "ManagedElement"},
+        {"--format", "json", "ai", system, "--role", "ManagedElement"},
+        {"--format", "json", "ain", system, "--role", "ManagedElement"},
+        {"--format", "mof", "ein", "KORVA_OperatingSystemCapabilities"},
+        // Bare values.
+        {"ei", "KORVA_OperatingSystem", "--value", "operationalstatus"},
+        {"gi", "KORVA_OperatingSystem", "--value", "LastBootUpTime"},
+        {"ai", "KORVA_OperatingSystem", "--value", "InstanceID"},
+        {"ri", system, "--result-class", runningOS, "--value", "Dependent"},
+        {"ein", "KORVA_OperatingSystem", "--value", "CSName"},
+        {"ein", "KORVA_OperatingSystem", "--value", "Version"},
+        {"ei", "KORVA_OperatingSystem", "--value", "NumberOfUser"},
         // Paths that lack keys.
         {"gi", "KORVA_OperatingSystem", "--properties", ""},
         {"ai", "KORVA_OperatingSystem", "--properties", ""},
@@ -189,6 +224,23 @@ TEST(Program, PrintsWhatTheShippedLibrariesAnswer) {
     expectGolden(
         KORVA_TEST_DATA "/cli/runs/Shipped.txt",
         transcript(runs, {"LD_LIBRARY_PATH=" KORVA_BINARY_DIR "/fixture-host", "TZ=UTC0"}));
+}
+
+TEST(Program, GivesTheTreeToProgramsWithTheElementsOfItsNodes) {
+    const ProgramRun run = cmpihost({"--format", "json", "tree"},
+                                    {"LD_LIBRARY_PATH=" KORVA_BINARY_DIR "/fixture-host"});
+    ASSERT_EQ(run.status, 0) << run.err;
+    EXPECT_EQ(complaintOnJson(run.out, "tree"), "");
+    const nlohmann::json computer = nlohmann::json::parse(run.out)[0];
+    EXPECT_EQ(computer["element"]["keys"]["Name"], "fixture.example");
+    EXPECT_FALSE(computer.contains("association"));
+    const nlohmann::json installed = computer["branches"][0];
+    EXPECT_EQ(installed["association"], "KORVA_InstalledOS");
+    EXPECT_EQ(installed["branches"][0]["association"], "KORVA_OSElementCapabilities");
+    const nlohmann::json running = computer["branches"][1];
+    EXPECT_EQ(running["association"], "KORVA_RunningOS");
+    EXPECT_EQ(running["element"]["times"]["LastBootUpTime"], "2023-11-14T22:13:20Z");
+    EXPECT_EQ(running["branches"], nlohmann::json::array());
 }
 
 TEST(Program, TellsHowTheLibrariesCleanedUp) {
