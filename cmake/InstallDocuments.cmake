@@ -21,7 +21,7 @@ endfunction()
 if(KORVA_CMPIHOST)
     korva_man_page(tools cmpihost 1)
     # The licences of the libraries whose code is in it want to go along.
-    install(FILES "${PROJECT_SOURCE_DIR}/packaging/debian/copyright.tools" RENAME copyright.cmpihost
+    install(FILES "${PROJECT_SOURCE_DIR}/packaging/debian/korva-osstatus-tools.copyright" RENAME copyright.cmpihost
             DESTINATION "${CMAKE_INSTALL_DOCDIR}" COMPONENT tools)
 endif()
 korva_man_page(provider zblog.conf 5)

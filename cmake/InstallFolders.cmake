@@ -22,3 +22,5 @@ if(CMAKE_INSTALL_LIBDIR MATCHES "^lib(32|64)$")
 endif()
 set(KORVA_CMPI_LIBDIR "${korva_cmpi_libdir_default}"
     CACHE STRING "Folder that object managers load providers from, relative to the prefix")
+set(KORVA_MANAGER_LIBDIR "${KORVA_CMPI_LIBDIR}" CACHE STRING
+    "Folder that object managers are pointed to, where links in it lead to KORVA_CMPI_LIBDIR")

@@ -33,8 +33,8 @@ endforeach()
 # The libraries are elsewhere when they are installed.
 set(KORVA_REGISTERED_FOLDERS lib)
 configure_file("${korva_register_source}/libraries.sh.in" "${korva_register_dir}/libraries.sh" @ONLY)
-set(KORVA_REGISTERED_FOLDERS "\"${KORVA_CMPI_LIBDIR}\"")
-if(KORVA_CMPI_LIBDIR MATCHES "^lib(64)?/cmpi$")
+set(KORVA_REGISTERED_FOLDERS "\"${KORVA_MANAGER_LIBDIR}\"")
+if(KORVA_MANAGER_LIBDIR MATCHES "^lib(64)?/cmpi$")
     set(KORVA_REGISTERED_FOLDERS "lib64/cmpi lib/cmpi")
 endif()
 configure_file("${korva_register_source}/libraries.sh.in"
