@@ -24,10 +24,12 @@ bring() {
 set_up_machine() {
     mkdir -p "$machine/usr/bin" "$machine/dev" "$machine/tmp" "$machine/var/log"
     mkdir -p "$machine/var/lib/dpkg/info" "$machine/var/lib/dpkg/updates" "$machine/var/lib/dpkg/triggers"
-    touch "$machine/var/lib/dpkg/status" "$machine/dev/null"
+    mkdir -p "$machine/etc/alternatives" "$machine/var/lib/dpkg/alternatives"
+    touch "$machine/var/lib/dpkg/status" "$machine/var/log/alternatives.log" "$machine/dev/null"
     ln -s usr/bin "$machine/bin"
     ln -s ../var "$machine/usr/var"
-    for name in sh basename cat cp dirname grep id ln mkdir mktemp mv od readlink rm rmdir sed touch tr; do
+    for name in sh basename cat cp dirname grep id ln mkdir mktemp mv od readlink rm rmdir sed touch tr \
+        update-alternatives; do
         bring $name
     done
     [ "$architecture" = "$(dpkg --print-architecture)" ] || on_machine --add-architecture "$architecture"
@@ -84,7 +86,8 @@ InstallationRegistersTheFacade() {
     expect_equal "what is staged" "location: korvaosstatusfacade
 provider: OSStatusFacade" \
         "$(sed -n 's/^ *\(provider:\|location:\)/\1/p' "$machine/var/lib/sfcb/stage/regs/korva-osstatus.reg" | sort -u)"
-    [ -e "$machine/usr/lib/cmpi/libkorvaosstatusfacade.so" ] || fail "its library is missing"
+    expect_equal "its library" "/usr/lib/$triplet/cmpi/libkorvaosstatusfacade.so" \
+        "$(as_root chroot "$machine" /usr/bin/readlink -f /usr/lib/cmpi/libkorvaosstatusfacade.so | sed 's/.1.0.0$//')"
 }
 
 InstallationNeedsNoObjectManager() {
@@ -101,9 +104,21 @@ InstallationSurvivesAFailingObjectManager() {
     expect_text "the schema is missing" "$output"
 }
 
+InstallationTellsThatRegisteringFailed() {
+    on_machine --unpack "$(package provider)"
+    printf '#!/bin/sh\nexit 1\n' >"$machine/usr/sbin/korva-osstatus-register"
+    on_machine --configure korva-osstatus-provider
+    expect_equal "the state of the provider" installed "$(state_of provider)"
+    expect_text "korva-osstatus-provider: registering failed; mend what is told above, then run:\
+ korva-osstatus-register register" "$output"
+    on_machine -r korva-osstatus-provider
+    expect_text "korva-osstatus-provider: unregistering failed" "$output"
+}
+
 InstalledHostReportsTheOperatingSystem() {
     install_all
-    expect_success env -i "$machine/usr/bin/cmpihost" ein KORVA_OperatingSystem
+    expect_success env -i "$machine/usr/bin/cmpihost" \
+        --provider "$machine/usr/lib/$triplet/cmpi/libkorvaosstatusfacade.so" ein KORVA_OperatingSystem
     expect_text 'KORVA_OperatingSystem.CSCreationClassName="KORVA_ComputerSystem"' "$output"
 }
 

@@ -3,6 +3,10 @@
 : "${work:?}" "${KORVA_BINARY_DIR:?}" "${KORVA_WORD_SIZE:?}"
 packages=$KORVA_BINARY_DIR/packages
 architecture=amd64
-[ "$KORVA_WORD_SIZE" = 64 ] || architecture=i386
+triplet=x86_64-linux-gnu
+if [ "$KORVA_WORD_SIZE" = 32 ]; then
+    architecture=i386
+    triplet=i386-linux-gnu
+fi
 
 package() { echo "$packages/korva-osstatus-$1_1.0.0-1_$architecture.deb"; }
