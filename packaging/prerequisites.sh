@@ -56,3 +56,7 @@ lint_packages="clang-format clang-tidy shellcheck git"
 build_packages="cmake ninja-build g++ libc6-dev googletest libcli11-dev nlohmann-json3-dev \
     libvalijson-dev"
 [ "$(dpkg --print-architecture 2>/dev/null)" = i386 ] || build_packages="$build_packages g++-multilib"
+
+# What packs; binutils of i386 are for its packages on another machine.
+# shellcheck disable=SC2034
+package_packages="debhelper dpkg-dev xz-utils binutils-i686-linux-gnu"
