@@ -14,7 +14,7 @@ EachComponentIsPacked() {
     mv "$work/tree/usr/lib" "$work/libraries"
     mkdir "$work/tree/usr/lib"
     mv "$work/libraries" "$work/tree/usr/lib/$triplet"
-    cd "$packages/source"
+    cd "$packages/source" || fail "no folder to pack in"
     expect_success env KORVA_INSTALLED_TREE="$work/tree" DEB_BUILD_OPTIONS=noautodbgsym \
         dpkg-architecture "-a$architecture" -c debian/rules binary
     for name in provider companion dev tools; do
