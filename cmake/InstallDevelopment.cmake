@@ -57,4 +57,5 @@ korva_pkg_config(vainstrumentation "Cursors over the managed nodes of a host" ""
 korva_pkg_config(zblog "Log and trace of a management agent" "")
 
 # Examples, to be copied: whole projects, which are built with the package.
-install(DIRECTORY "${PROJECT_SOURCE_DIR}/examples/" DESTINATION "${KORVA_SHARE_DIR}/examples" COMPONENT development)
+install(DIRECTORY "${PROJECT_SOURCE_DIR}/examples/" DESTINATION "${KORVA_SHARE_DIR}/examples"
+        COMPONENT development USE_SOURCE_PERMISSIONS)

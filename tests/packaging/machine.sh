@@ -32,7 +32,9 @@ set_up_machine() {
         update-alternatives; do
         bring $name
     done
-    [ "$architecture" = "$(dpkg --print-architecture)" ] || on_machine --add-architecture "$architecture"
+    for name in "$architecture" "$other"; do
+        [ "$name" = "$(dpkg --print-architecture)" ] || on_machine --add-architecture "$name"
+    done
 }
 
 set_up_machine
@@ -232,4 +234,56 @@ UpgradeKeepsAChangedRotation() {
     echo "# ours" >>"$machine/etc/logrotate.d/korva-osstatus"
     install_later_provider
     expect_text "# ours" "$(cat "$machine/etc/logrotate.d/korva-osstatus")"
+}
+
+# Makes one of the packages that of the other architecture, as far as its places go: other_package NAME
+other_package() {
+    dpkg-deb -R "$(package "$1")" "$work/other"
+    mv "$work/other/usr/lib/$triplet" "$work/other/usr/lib/$other_triplet"
+    sed -i "s/^Architecture: .*/Architecture: $other/; s/$triplet/$other_triplet/" \
+        "$work/other/DEBIAN/control" "$work/other/DEBIAN"/p*
+    dpkg-deb --root-owner-group -b "$work/other" "$work/$1-other.deb" >/dev/null
+    rm -r "$work/other"
+    echo "$work/$1-other.deb"
+}
+
+# What object managers find is what is in the folder of that architecture: expect_links TRIPLET
+expect_links() {
+    for name in libkorvaosstatusfacade libkorzbosstatusprofileprovider libkorvacomputersystemprovider; do
+        expect_equal "the link to $name" "/usr/lib/$1/cmpi/$name.so.1.0.0" \
+            "$(as_root chroot "$machine" /usr/bin/readlink -f "/usr/lib/cmpi/$name.so")"
+    done
+}
+
+install_both_architectures() {
+    with_sfcb
+    install provider companion
+    on_machine -i "$(other_package provider)" "$(other_package companion)"
+}
+
+ArchitectureThatComesSecondLeavesTheLinksAndTellsWhatSwitches() {
+    install_both_architectures
+    expect_text "korva-osstatus: /usr/lib/cmpi keeps leading to /usr/lib/$triplet/cmpi.
+korva-osstatus: for /usr/lib/$other_triplet/cmpi instead, run this and restart the object manager:
+    update-alternatives --set korva-osstatus /usr/lib/$other_triplet/cmpi/libkorvaosstatusfacade.so" "$output"
+    expect_links "$triplet"
+    expect_success as_root chroot "$machine" /usr/bin/update-alternatives --set korva-osstatus \
+        "/usr/lib/$other_triplet/cmpi/libkorvaosstatusfacade.so"
+    expect_links "$other_triplet"
+    install provider companion
+    expect_links "$other_triplet"
+}
+
+ArchitectureThatStaysTakesTheLinksAndIsStillRegistered() {
+    install_both_architectures
+    forget_calls
+    on_machine -P "korva-osstatus-companion:$architecture" "korva-osstatus-provider:$architecture"
+    expect_links "$other_triplet"
+    [ ! -e "$machine/usr/calls" ] || fail "sfcb was told: $(calls)"
+    on_machine -P "korva-osstatus-companion:$other" "korva-osstatus-provider:$other"
+    expect_told "sfcbunstage -r korva-osstatus-companion.reg
+sfcbrepos -f
+sfcbunstage -r korva-osstatus.reg
+sfcbrepos -f"
+    [ ! -e "$machine/usr/lib/cmpi" ] || fail "$(ls "$machine/usr/lib/cmpi") is left"
 }
