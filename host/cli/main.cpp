@@ -18,6 +18,7 @@
 #include "host/cli/BareValues.h"
 #include "host/cli/CommandLine.h"
 #include "host/cli/Describe.h"
+#include "host/cli/DescribeJson.h"
 #include "host/cli/Diagnostics.h"
 #include "host/cli/Explanation.h"
 #include "host/cli/InstallPaths.h"
@@ -169,14 +170,23 @@ class Run {
             case Command::Tree:
                 return drawHost(schema, catalogue);
             case Command::Classes:
-                print(classSummaries(schema), terminalOf(STDOUT_FILENO), out_);
-                return written();
+                return told(classSummaries(schema));
             case Command::Describe:
-                print(describe(schema, commandLine_.subject), terminalOf(STDOUT_FILENO), out_);
-                return written();
+                return told(describe(schema, commandLine_.subject));
             default:
                 return failed("this command is not there yet", exitUsage);
         }
+    }
+
+    /// Prints what is known without asking a provider.
+    template <class Knowledge>
+    ExitStatus told(const Knowledge& knowledge) {
+        if (commandLine_.format == Format::Json) {
+            writeJson(knowledge, out_);
+        } else {
+            print(knowledge, terminalOf(STDOUT_FILENO), out_);
+        }
+        return written();
     }
 
     ExitStatus runOperation(const Schema& schema, const SchemaCatalogue& catalogue) {

@@ -6,7 +6,7 @@
 #include <nlohmann/json.hpp>
 
 #include "host/cli/Cmpihost.h"
-#include "host/cli/JsonForm.h"
+#include "host/cli/OutputForm.h"
 #include "support/GoldenFile.h"
 
 namespace {
@@ -21,12 +21,22 @@ std::string replaced(std::string text, const std::string& part, const std::strin
     return text;
 }
 
-/// The form of what a command prints as JSON; empty: it prints none.
+/// The form of what a command prints as JSON, by the word that tells it; empty: it prints none.
 std::string jsonForm(const Words& arguments) {
     const std::pair<const char*, const char*> rows[] = {
-        {"ei", "instances"}, {"gi", "instances"},   {"ai", "instances"}, {"ri", "instances"},
-        {"ein", "paths"},    {"ain", "paths"},      {"rin", "paths"},    {"ci", "paths"},
-        {"tree", "tree"},    {"im", "methodResult"}};
+        {"ei", "instances"},
+        {"gi", "instances"},
+        {"ai", "instances"},
+        {"ri", "instances"},
+        {"classes", "classes"},
+        {"KORVA_InstalledOS", "describedClass"},
+        {"korva_operatingsystem.freephysicalmemory", "describedProperty"},
+        {"ein", "paths"},
+        {"ain", "paths"},
+        {"rin", "paths"},
+        {"ci", "paths"},
+        {"tree", "tree"},
+        {"im", "methodResult"}};
     const bool json = std::find(arguments.begin(), arguments.end(), "json") != arguments.end();
     for (const auto& [command, form] : rows) {
         const auto found = std::find(arguments.begin(), arguments.end(), command);
@@ -48,6 +58,9 @@ std::string transcript(const std::vector<Words>& runs, const Words& environment)
         }
         text += "\n" + run.out;
         const std::string form = run.status == 0 ? jsonForm(arguments) : "";
+        if (run.status == 0 && std::count(arguments.begin(), arguments.end(), "mof") > 0) {
+            EXPECT_EQ(complaintOnMof(run.out), "") << text;
+        }
         if (!form.empty()) {
             EXPECT_EQ(complaintOnJson(run.out, form), "") << text;
         }
@@ -172,6 +185,14 @@ TEST(Program, PrintsWhatTheShippedLibrariesAnswer) {
         {"--format", "json", "ai", system, "--role", "ManagedElement"},
         {"--format", "json", "ain", system, "--role", "ManagedElement"},
         {"--format", "mof", "ein", "KORVA_OperatingSystemCapabilities"},
+        // The classes.
+        {"classes"},
+        {"--format", "json", "classes"},
+        {"describe", "KORVA_OSElementCapabilities"},
+        {"--format", "json", "describe", "KORVA_InstalledOS"},
+        {"describe", "KORVA_OperatingSystem.EnabledState"},
+        {"--format", "json", "describe", "korva_operatingsystem.freephysicalmemory"},
+        {"describe", "KORVA_OperatingSystem.RequestStateChange"},
         // Bare values.
         {"ei", "KORVA_OperatingSystem", "--value", "operationalstatus"},
         {"gi", "KORVA_OperatingSystem", "--value", "LastBootUpTime"},

@@ -1,4 +1,4 @@
-#include "host/cli/JsonForm.h"
+#include "host/cli/OutputForm.h"
 
 #include <fstream>
 #include <nlohmann/json.hpp>
@@ -7,6 +7,8 @@
 #include <valijson/schema_parser.hpp>
 #include <valijson/validation_results.hpp>
 #include <valijson/validator.hpp>
+
+#include "host/mof/MofParser.h"
 
 namespace {
 
@@ -35,4 +37,13 @@ std::string complaintOnJson(const std::string& text, const std::string& form) {
         complaint += ": " + error.description + '\n';
     }
     return complaint;
+}
+
+std::string complaintOnMof(const std::string& text) {
+    try {
+        cmpihost::mof::parse(text, "output");
+    } catch (const cmpihost::mof::MofError& error) {
+        return error.what();
+    }
+    return {};
 }

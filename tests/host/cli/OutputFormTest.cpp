@@ -1,5 +1,5 @@
 // What the schema of the output refuses: a schema that takes anything would prove nothing.
-#include "host/cli/JsonForm.h"
+#include "host/cli/OutputForm.h"
 
 #include <gtest/gtest.h>
 
@@ -73,6 +73,11 @@ TEST(JsonSchema, RefusesAnInstanceThatLacksAMember) {
         damaged[0].erase(member.key());
         EXPECT_NE(complaintOnJson(damaged.dump()), "") << member.key();
     }
+}
+
+TEST(Mof, IsRefusedWhereItIsNone) {
+    EXPECT_EQ(complaintOnMof("instance of A {\n    B = 1;\n};\n"), "");
+    EXPECT_NE(complaintOnMof("instance of A {\n    B = 1\n};\n"), "");
 }
 
 }  // namespace
