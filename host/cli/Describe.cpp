@@ -3,10 +3,10 @@
 #include "host/cli/Describe.h"
 
 #include <algorithm>
-#include <iterator>
 
 #include "base/Ascii.h"
 #include "base/Utf8.h"
+#include "host/broker/Value.h"
 #include "host/cli/PathParser.h"
 #include "host/cli/Suggestion.h"
 #include "host/mof/MofLexer.h"
@@ -49,10 +49,13 @@ ClassSummary summaryOf(const Schema& schema, const mof::Class& declared) {
 struct ScalarText {
     std::string operator()(std::monostate) const { return "NULL"; }
     std::string operator()(bool value) const { return value ? "TRUE" : "FALSE"; }
+    std::string operator()(double value) const {
+        return mof::realLiteral(Value::fromReal(value).toText());
+    }
     std::string operator()(mof::Character value) const { return mof::characterLiteral(value.code); }
     std::string operator()(const std::string& value) const { return mof::stringLiteral(value); }
-    template <class Number>
-    std::string operator()(Number value) const {
+    template <class Integer>
+    std::string operator()(Integer value) const {
         return std::to_string(value);
     }
 };
@@ -100,8 +103,12 @@ void describeFeature(const ResolvedFeature& feature, FeatureDescription& to) {
     if (to.units.empty()) to.units = textOf(qualifiers, "PUnit");
     to.maxLength = maxLengthOf(qualifiers);
     to.defaultValue = defaultText(feature.defaultValue);
-    if (const mof::Qualifier* deprecated = findQualifier(qualifiers, "Deprecated"))
-        to.deprecated = mof::texts(deprecated);
+    if (const mof::Qualifier* deprecated = findQualifier(qualifiers, "Deprecated")) {
+        to.deprecated.emplace();
+        // The standard's way to say that nothing takes its place.
+        for (std::string& instead : mof::texts(deprecated))
+            if (!base::equalsIgnoreCase(instead, "No value")) to.deprecated->push_back(instead);
+    }
 }
 
 /// "File.Linux|/proc/meminfo|MemTotal" for people.

@@ -48,7 +48,7 @@ struct FeatureDescription {
     std::optional<std::uint64_t> maxLength;
     /// As MOF writes it ("5", "\"text\"", "{1, 2}"); absent for none and for NULL.
     std::optional<std::string> defaultValue;
-    /// What takes its place where it is deprecated, as written; absent where it is not.
+    /// What takes its place where it is deprecated, perhaps nothing; absent where it is not.
     std::optional<std::vector<std::string>> deprecated;
 };
 

@@ -11,14 +11,8 @@ namespace cmpihost {
 
 namespace {
 
-/// A real constant of MOF always has a point with a digit after it.
 std::string mofReal(const Value& value) {
-    if (!std::isfinite(value.real())) return "NULL";
-    std::string text = value.toText();
-    if (text.find('.') == std::string::npos) {
-        text.insert(std::min(text.find('e'), text.size()), ".0");
-    }
-    return text;
+    return std::isfinite(value.real()) ? mof::realLiteral(value.toText()) : "NULL";
 }
 
 std::string valueText(const Value& value);

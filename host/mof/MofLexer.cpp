@@ -2,6 +2,7 @@
 // positions count characters, which no generated scanner would give for free.
 #include "host/mof/MofLexer.h"
 
+#include <algorithm>
 #include <charconv>
 #include <limits>
 #include <utility>
@@ -309,6 +310,12 @@ std::string stringLiteral(std::string_view text) {
 
 std::string characterLiteral(char32_t code) {
     return "'" + (code < 0x80 ? literalPart(code, '\'') : hexadecimalEscape(code)) + "'";
+}
+
+std::string realLiteral(std::string number) {
+    if (number.find('.') == std::string::npos)
+        number.insert(std::min(number.find('e'), number.size()), ".0");
+    return number;
 }
 
 }  // namespace cmpihost::mof

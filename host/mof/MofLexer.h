@@ -67,6 +67,10 @@ std::string stringLiteral(std::string_view text);
 /// character as an escape.
 std::string characterLiteral(char32_t code);
 
+/// A finite real number, written in the fewest digits, as a real constant of MOF: that always has a
+/// point with a digit after it.
+std::string realLiteral(std::string number);
+
 }  // namespace cmpihost::mof
 
 #endif

@@ -5,6 +5,7 @@
 #include "fuzz/Invariant.h"
 #include "host/mof/MofLexer.h"
 #include "host/mof/MofParser.h"
+#include "host/mof/ResolvedClass.h"
 #include "host/mof/Schema.h"
 
 using namespace cmpihost;
@@ -32,6 +33,15 @@ void checkSchema(const Schema& schema) {
             schema.isKey(name, property->name);
             schema.valueMap(name, property->name);
         }
+    }
+    for (const std::string& name : schema.classNames()) {
+        const std::optional<ResolvedClass> resolved = resolvedClass(schema, name);
+        fuzz::expect(resolved.has_value(), "a class can be resolved");
+        fuzz::expect(resolved->properties.size() == schema.properties(name).size(),
+                     "a class has the same properties in both lists");
+        fuzz::expect(resolved->superclasses.empty() ||
+                         !schema.subclasses(resolved->superclasses.front()->name).empty(),
+                     "a superclass has subclasses");
     }
     const SchemaCatalogue catalogue(schema);
     for (const std::string& name : schema.classNames())

@@ -264,6 +264,45 @@ TEST(Program, GivesTheTreeToProgramsWithTheElementsOfItsNodes) {
     EXPECT_EQ(running["branches"], nlohmann::json::array());
 }
 
+TEST(Program, DescribesWhatTheSchemaDeclares) {
+    const char* const other = KORVA_TEST_DATA "/cli/othermof";
+    const std::vector<Words> runs = {
+        {"classes"},
+        {"describe", "KORVA_OperatingSystemCapabilities"},
+        {"describe", "korva_operatingsystem.ENABLEDSTATE"},
+        {"describe", "KORVA_OperatingSystem.FreePhysicalMemory"},
+        {"describe", "KORVA_RunningOS"},
+        {"describe", "KORVA_RunningOS.Dependent"},
+        {"--schema", other, "classes"},
+        {"--schema", other, "describe", "Device"},
+        {"--schema", other, "describe", "Disk"},
+        {"--schema", other, "describe", "Attached"},
+        {"--schema", other, "describe", "Alarm"},
+        {"--schema", other, "describe", "Disk.Id"},
+        {"--schema", other, "describe", "Disk.State"},
+        {"--schema", other, "describe", "Disk.Capacity"},
+        {"--schema", other, "describe", "Disk.Partitions"},
+        {"--schema", other, "describe", "Disk.Size"},
+        {"--schema", other, "describe", "Disk.Kind"},
+        {"--schema", other, "describe", "Disk.Weight"},
+        {"--schema", other, "describe", "Disk.Count"},
+        {"--schema", other, "describe", "Disk.RequestState"},
+        // A file of a schema, and several of them.
+        {"--schema", KORVA_TEST_DATA "/cli/othermof/Other.mof", "classes"},
+        {"--schema", KORVA_SOURCE_DIR "/schema/KORVA_RunningOS.mof", "--schema", other, "classes"},
+        {"--schema", KORVA_SOURCE_DIR "/schema", "--schema", other, "classes"},
+        // Names that are no names of the schema.
+        {"describe", "OperatingSystem"},
+        {"describe", "KORVA_OperatingSystem.OSTyp"},
+        {"describe", "KORVA_OperatingSystem."},
+        {"describe", "Unknown"},
+        {"--schema", other, "describe", "Disk.RequestStat"},
+        {"describe"},
+    };
+    expectGolden(KORVA_TEST_DATA "/cli/runs/Schema.txt",
+                 replaced(transcript(runs, {"TZ=UTC0"}), KORVA_SOURCE_DIR, "SOURCE"));
+}
+
 TEST(Program, TellsHowTheLibrariesCleanedUp) {
     const Words request =
         withStandIn({"--companion", KORVA_STAND_IN, "ein", "KORVA_OperatingSystem"});
