@@ -2,12 +2,13 @@
 # shellcheck shell=sh
 : "${work:?}" "${KORVA_BINARY_DIR:?}" "${KORVA_SOURCE_DIR:?}" "${KORVA_WORD_SIZE:?}"
 tree=$work/destination/usr
-DESTDIR=$work/destination expect_success cmake --install "$KORVA_BINARY_DIR" --prefix /usr
+install_tree() { DESTDIR=$work/destination expect_success cmake --install "$KORVA_BINARY_DIR" --prefix /usr; }
 export CXXFLAGS="-m$KORVA_WORD_SIZE -Wall -Wextra -Wpedantic -Wshadow -Wconversion -Werror"
 # Blocks marked "shell" of a document, as one script; those marked "text".
 blocks() { awk -v mark="\`\`\`$1" '/^```/ { inside = $0 == mark; next } inside' "$2"; }
 
 build_example() {
+    install_tree
     expect_success cmake -S "$tree/share/korva-osstatus/examples/mounted-filesystems" -B "$work/build" \
         -DCMAKE_PREFIX_PATH="$tree"
     expect_success cmake --build "$work/build"
@@ -36,6 +37,7 @@ ExampleAnswersFromWhereItIsInstalled() {
 }
 
 GuideLeadsFromAnEmptyFolderToAnswers() {
+    install_tree
     guide=$KORVA_SOURCE_DIR/docs/writing-a-provider.md
     blocks shell "$guide" >"$work/commands"
     blocks text "$guide" >"$work/promised"
@@ -45,4 +47,16 @@ GuideLeadsFromAnEmptyFolderToAnswers() {
     printf '%s\n' "$output" | sed "s/\"$(uname -n)\"/\"vm\"/g" >"$work/printed"
     expect_equal "what the guide promises, and is not printed" "" \
         "$(grep -vxF -f "$work/printed" "$work/promised")"
+}
+
+FaultsOfTheGuideAreThoseThatTheHostCatches() {
+    # Backquotes, not commands.
+    # shellcheck disable=SC2016
+    # The first column of the table: patterns between backquotes, whose fixed parts stand between "…".
+    sed -n '/^| `caught:` |/,/^$/s/^| \(.*`\) | .*/\1/p' "$KORVA_SOURCE_DIR/docs/writing-a-provider.md" |
+        sed 1d | tr '`' '\n' | sed 's/…/\n/g' | sed 's/^[ ,:]*//; s/[ ,:]*$//' | grep . | sort -u >"$work/parts"
+    [ "$(wc -l <"$work/parts")" -gt 20 ] || fail "the table of the guide is not found"
+    while read -r part; do
+        grep -rqF -- "$part" "$KORVA_SOURCE_DIR/host/broker" || fail "the host says nothing like '$part'"
+    done <"$work/parts"
 }
