@@ -346,4 +346,4 @@ CMPIStatus MountsReferenceNames(CMPIAssociationMI*, const CMPIContext* context,
 // The tables of those functions, and the exported functions that hand them out:
 // MountedFileSystemProvider_Create_InstanceMI and MountedFileSystemProvider_Create_AssociationMI.
 CMInstanceMIStub(Mounts, MountedFileSystemProvider, broker, CMNoHook)
-    CMAssociationMIStub(Mounts, MountedFileSystemProvider, broker, CMNoHook)
+CMAssociationMIStub(Mounts, MountedFileSystemProvider, broker, CMNoHook)

@@ -4,8 +4,9 @@
 tree=$work/destination/usr
 install_tree() { DESTDIR=$work/destination expect_success cmake --install "$KORVA_BINARY_DIR" --prefix /usr; }
 export CXXFLAGS="-m$KORVA_WORD_SIZE -Wall -Wextra -Wpedantic -Wshadow -Wconversion -Werror"
-# Blocks marked "shell" of a document, as one script; those marked "text".
-blocks() { awk -v mark="\`\`\`$1" '/^```/ { inside = $0 == mark; next } inside' "$2"; }
+guide=$KORVA_SOURCE_DIR/docs/writing-a-provider.md
+# The lines of the guide's blocks that are marked so.
+blocks() { awk -v mark="\`\`\`$1" '/^```/ { inside = $0 == mark; next } inside' "$guide"; }
 
 build_example() {
     install_tree
@@ -38,9 +39,8 @@ ExampleAnswersFromWhereItIsInstalled() {
 
 GuideLeadsFromAnEmptyFolderToAnswers() {
     install_tree
-    guide=$KORVA_SOURCE_DIR/docs/writing-a-provider.md
-    blocks shell "$guide" >"$work/commands"
-    blocks text "$guide" >"$work/promised"
+    blocks shell >"$work/commands"
+    blocks text >"$work/promised"
     mkdir "$work/empty"
     cd "$work/empty" || fail "no folder"
     PATH=$tree/bin:$PATH PREFIX=$tree expect_success sh -eu "$work/commands"
@@ -49,11 +49,18 @@ GuideLeadsFromAnEmptyFolderToAnswers() {
         "$(grep -vxF -f "$work/printed" "$work/promised")"
 }
 
+ExcerptsOfTheGuideAreInTheExample() {
+    { blocks mof && blocks cpp && blocks reg; } >"$work/excerpts"
+    [ "$(wc -l <"$work/excerpts")" -gt 15 ] || fail "the excerpts of the guide are not found"
+    cat "$KORVA_SOURCE_DIR"/examples/mounted-filesystems/*.* >"$work/example"
+    expect_equal "what the example does not have" "" "$(grep -vxF -f "$work/example" "$work/excerpts")"
+}
+
 FaultsOfTheGuideAreThoseThatTheHostCatches() {
     # Backquotes, not commands.
     # shellcheck disable=SC2016
     # The first column of the table: patterns between backquotes, whose fixed parts stand between "…".
-    sed -n '/^| `caught:` |/,/^$/s/^| \(.*`\) | .*/\1/p' "$KORVA_SOURCE_DIR/docs/writing-a-provider.md" |
+    sed -n '/^| `caught:` |/,/^$/s/^| \(.*`\) | .*/\1/p' "$guide" |
         sed 1d | tr '`' '\n' | sed 's/…/\n/g' | sed 's/^[ ,:]*//; s/[ ,:]*$//' | grep . | sort -u >"$work/parts"
     [ "$(wc -l <"$work/parts")" -gt 20 ] || fail "the table of the guide is not found"
     while read -r part; do
