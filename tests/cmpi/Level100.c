@@ -75,7 +75,7 @@ static CMPIStatus oldGetProperty(CMPIPropertyMI* mi, const CMPIContext* ctx, con
 
 CMPropertyMIStub(old, OldProvider, broker, CMNoHook)
 
-    int level100StubVersion(void) {
+int level100StubVersion(void) {
     const CMPIPropertyMI* mi = OldProvider_Create_PropertyMI(NULL, NULL, NULL);
     return broker == NULL ? mi->ft->miVersion : -1;
 }

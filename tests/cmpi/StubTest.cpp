@@ -56,14 +56,13 @@ const CMPIContext* contextOfHook = nullptr;
 }  // namespace
 
 CMInstanceMIStub(stub, Sample, storedBroker, contextOfHook = ctx)
-    CMAssociationMIStub(stub, Sample, storedBroker, CMNoHook)
-        CMMethodMIStub(stub, Sample, storedBroker, CMNoHook)
-            CMPropertyMIStub(stub, Sample, storedBroker, CMNoHook)
-                CMIndicationMIStub(stub, Sample, storedBroker, CMNoHook)
+CMAssociationMIStub(stub, Sample, storedBroker, CMNoHook)
+CMMethodMIStub(stub, Sample, storedBroker, CMNoHook)
+CMPropertyMIStub(stub, Sample, storedBroker, CMNoHook)
+CMIndicationMIStub(stub, Sample, storedBroker, CMNoHook)
 
-                    extern "C" CMPIInstanceMI* PlainProvider_Create_InstanceMI(const CMPIBroker*,
-                                                                               const CMPIContext*,
-                                                                               CMPIStatus*);
+extern "C" CMPIInstanceMI* PlainProvider_Create_InstanceMI(const CMPIBroker*, const CMPIContext*,
+                                                           CMPIStatus*);
 
 namespace {
 

@@ -204,7 +204,7 @@ CMPIStatus ReferenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResu
 }  // namespace
 
 CMInstanceMIStub(, OperatingSystemProvider, broker, CMNoHook)
-    CMAssociationMIStub(, OperatingSystemProvider, broker, CMNoHook)
-        CMInstanceMIStub(, OSStatusFacade, broker, CMNoHook)
-            CMAssociationMIStub(, OSStatusFacade, broker, CMNoHook)
-                CMInstanceMIStub(, ComputerSystemProvider, broker, CMNoHook)
+CMAssociationMIStub(, OperatingSystemProvider, broker, CMNoHook)
+CMInstanceMIStub(, OSStatusFacade, broker, CMNoHook)
+CMAssociationMIStub(, OSStatusFacade, broker, CMNoHook)
+CMInstanceMIStub(, ComputerSystemProvider, broker, CMNoHook)
