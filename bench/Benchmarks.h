@@ -18,6 +18,9 @@ void addHostBenchmarks(BenchFixture& fixture);
 /// "logging/…": one record, filtered and written. They change the configuration.
 void addLoggingBenchmarks(LoggingConfiguration& logging);
 
+/// "schema/…": a generated schema of the size of the CIM schema, read and asked.
+void addSchemaBenchmarks();
+
 }  // namespace bench
 
 #endif

@@ -16,6 +16,7 @@ int main(int argc, char** argv) try {
     bench::addRequestBenchmarks(fixture);
     bench::addHostBenchmarks(fixture);
     bench::addLoggingBenchmarks(logging);
+    bench::addSchemaBenchmarks();
     benchmark::RunSpecifiedBenchmarks();
     return 0;
 } catch (const std::exception& caught) {
