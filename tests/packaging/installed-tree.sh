@@ -24,7 +24,7 @@ DocumentsForUsersAreThereAndLinkToEachOtherOnly() {
     install_tree --component provider
     cd "$tree/share/doc/korva-osstatus" || fail "no documents"
     expect_equal "the folder" "$(printf '%s\n' CHANGELOG.md LICENSE README.md SECURITY.md docs)" "$(ls)"
-    expect_equal "the documents" "$(cd "$KORVA_SOURCE_DIR/docs" && ls ./*.md)" "$(cd docs && ls ./*)"
+    expect_equal "the documents" "$(cd "$KORVA_SOURCE_DIR/docs" && ls ./*.md ./*.json)" "$(cd docs && ls ./*)"
     expect_success sh "$KORVA_SOURCE_DIR/tests/links.sh" ./*.md docs/*.md
 }
 
