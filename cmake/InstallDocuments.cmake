@@ -1,4 +1,4 @@
-# Man pages, documents, the example of a logging configuration, and the rotation of log files.
+# Man pages, the completion of the shells, documents, the example of a logging configuration, and the rotation of log files.
 find_program(KORVA_GZIP gzip REQUIRED)
 
 # korva_gzip(<file> <compressed file>): without name and time, so that every build gives the same.
@@ -20,6 +20,10 @@ endfunction()
 
 if(KORVA_CMPIHOST)
     korva_man_page(tools cmpihost 1)
+    install(FILES "${PROJECT_SOURCE_DIR}/completion/cmpihost.bash" RENAME cmpihost
+            DESTINATION "${CMAKE_INSTALL_DATADIR}/bash-completion/completions" COMPONENT tools)
+    install(FILES "${PROJECT_SOURCE_DIR}/completion/_cmpihost"
+            DESTINATION "${CMAKE_INSTALL_DATADIR}/zsh/site-functions" COMPONENT tools)
     # The licences of the libraries whose code is in it want to go along.
     install(FILES "${PROJECT_SOURCE_DIR}/packaging/debian/korva-osstatus-tools.copyright" RENAME copyright.cmpihost
             DESTINATION "${CMAKE_INSTALL_DOCDIR}" COMPONENT tools)

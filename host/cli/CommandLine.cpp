@@ -242,7 +242,11 @@ void CommandLineParser::addHostOptions() {
                                            "Answer for so many computer systems without that "
                                            "library, 0 to 1000, to see\n"
                                            "what then happens");
-    systems->check(CLI::Range(0, 1000))->excludes(app_.get_option("--companion"))->type_name("N");
+    systems->check(CLI::Range(0, 1000))
+        ->excludes(app_.get_option("--companion"))
+        ->type_name("N")
+        ->group("");
+    app_.get_option("--companion")->group("");
     app_.get_option("--bare")->excludes("--provider")->option_text(" ");
     app_.get_option("--name")->needs("--provider")->option_text("NAME");
 }
