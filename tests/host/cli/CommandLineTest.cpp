@@ -162,8 +162,6 @@ TEST(CommandLine, RefusesWhatItDoesNotKnow) {
         {{"--colour", "ei", "X"}, "ei has no option '--colour'"},
         {{"--vlaue", "Name"}, "there is no option '--vlaue'; did you mean --value?"},
         {{"--provider", "p.so", "--bare", "ei", "X"}, "--provider excludes --bare"},
-        {{"--companion", "c.so", "--computer-systems", "2", "tree"},
-         "--companion excludes --computer-systems"},
     };
     for (const auto& row : rows) EXPECT_EQ(refusal(row.words), row.complaint);
     for (const char* number : {"-1", "1001", "x"}) refusal({"--computer-systems", number, "tree"});
@@ -172,12 +170,11 @@ TEST(CommandLine, RefusesWhatItDoesNotKnow) {
 TEST(CommandLine, RefusesAnEmptyValueHoweverItIsWritten) {
     const std::vector<std::pair<const char*, std::vector<const char*>>> rows = {
         {"--provider", {"ei", "X"}},     {"--schema", {"ei", "X"}},
-        {"--companion", {"ei", "X"}},    {"--assoc-class", {"ai", "X"}},
-        {"--result-class", {"ri", "X"}}, {"--role", {"rin", "X"}},
-        {"--result-role", {"ain", "X"}}, {"--lang", {"xq", "q"}},
-        {"--namespace", {"xq", "q"}},    {"--namespace", {"tree"}},
-        {"--name", {"ei", "X"}},         {"--registration", {"ei", "X"}},
-        {"--value", {"ei", "X"}},
+        {"--assoc-class", {"ai", "X"}},  {"--result-class", {"ri", "X"}},
+        {"--role", {"rin", "X"}},        {"--result-role", {"ain", "X"}},
+        {"--lang", {"xq", "q"}},         {"--namespace", {"xq", "q"}},
+        {"--namespace", {"tree"}},       {"--name", {"ei", "X"}},
+        {"--registration", {"ei", "X"}}, {"--value", {"ei", "X"}},
     };
     for (const auto& [option, operation] : rows) {
         const std::string sign = std::string(option) + "=";
