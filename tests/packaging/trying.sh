@@ -30,9 +30,14 @@ RefusesWhatIsNoPreset() {
 RefusesPresetsWithoutPackages() {
     make_packages 1.0.0-1 i386
     refused "$work/build/packages/korva-osstatus-provider_*_amd64.deb is missing;\
- packaging/build-packages amd64 makes it" amd64
+ packaging/build-packages makes it" amd64
     rm "$work/build/packages"/*-tools_*
     refused "$work/build/packages/korva-osstatus-tools_*_i386.deb is missing" i386
+}
+
+RefusesASourceThatIsNotThere() {
+    make_packages 1.0.0-1 amd64
+    refused "$work/build/packages/korva-osstatus_*.dsc is missing; packaging/build-packages makes it" --source amd64
 }
 
 RefusesToChooseAmongVersions() {

@@ -1,57 +1,19 @@
-# Called by try-packages, in a mount namespace of its own: tries the packages of one architecture on
-# one system: one-system.sh ARCHITECTURE SUITE MIRROR PACKAGES WORK
-# PACKAGES is the folder of the packages, WORK an empty folder that the system is made in.
+# Tries the packages of one architecture on one system.
 # shellcheck shell=sh
 # Functions are run by check, and dpkg-query fills in what stands in its format.
 # shellcheck disable=SC2317,SC2016
-set -eu
-architecture=$1
-suite=$2
-mirror=$3
-packages=$4
-work=$5
-root=$work/root
-log=$work/log
+# shellcheck source=system.sh
+. "$(dirname "$0")/system.sh"
+: "${architecture:?}" "${packages:?}" "${work:?}" "${root:?}" "${log:?}" "${status:?}"
 stand_in=$(dirname "$0")/../../tests/packaging/stand-in
 manager=/opt/manager
 own="korva-osstatus-provider korva-osstatus-companion korva-osstatus-dev korva-osstatus-tools"
-status=0
-
-# check WHAT COMMAND...: runs it, tells whether it did well, and goes on.
-check() {
-    what=$1
-    shift
-    # In a condition, a function would go on behind a command that fails.
-    set +e
-    (set -e; "$@") >"$log" 2>&1
-    code=$?
-    set -e
-    if [ "$code" -eq 0 ]; then
-        echo "ok      $what"
-    else
-        echo "FAILED  $what"
-        tail -n 40 "$log" | sed 's/^/        /'
-        status=1
-    fi
-}
-
-# ---- the system
-
-inside() {
-    env -i PATH=/usr/sbin:/usr/bin:/sbin:/bin LC_ALL=C DEBIAN_FRONTEND=noninteractive \
-        chroot "$root" "$@"
-}
-
-make_system() {
-    debootstrap --variant=minbase --arch="$architecture" "$suite" "$root" "$mirror"
-    mount -t proc proc "$root/proc"
-    inside apt-get -qq clean
-}
 
 # The packages go in twice: as they are, and as later ones.
 bring_packages() {
     mkdir "$root/packages" "$root/later"
-    for package in "$packages"/korva-osstatus-*_"$architecture".deb; do
+    for name in $own; do
+        package=$(echo "$packages/${name}"_*_"$architecture.deb")
         cp "$package" "$root/packages/"
         version=$(dpkg-deb -f "$package" Version)
         dpkg-deb -R "$package" "$work/unpacked"
@@ -74,7 +36,7 @@ everything() {
         cd "$root"
         set -- . -xdev \( -path ".$manager" -o -path ./var/lib/dpkg -o -path ./var/lib/apt -o -path ./var/cache/apt \
             -o -path ./var/cache/debconf -o -path ./var/cache/ldconfig -o -path ./var/log/apt \
-            -o -path ./var/log/dpkg.log \) -prune -o
+            -o -path ./var/log/dpkg.log -o -path ./var/log/alternatives.log \) -prune -o
         find "$@" -printf '%y %m %u %g %p %l\n' | LC_ALL=C sort
         find "$@" -type f -exec cksum {} + | LC_ALL=C sort -k 3
     )
@@ -108,37 +70,25 @@ all_have_version() {
 has_word_size_of_the_architecture() {
     class=2
     [ "$architecture" = amd64 ] || class=1
-    for file in bin/cmpihost lib/cmpi/libkorvaosstatusfacade.so \
-        lib/cmpi/libkorzbosstatusprofileprovider.so lib/libvaprovider.so.1; do
-        [ "$(od -An -tu1 -j4 -N1 "$(readlink -f "$root/usr/$file")" | tr -d ' ')" = "$class" ] || {
+    for file in bin/cmpihost lib/cmpi/libkorvaosstatusfacade.so lib/cmpi/libkorzbosstatusprofileprovider.so \
+        lib/cmpi/libkorvacomputersystemprovider.so lib/*/libvaprovider.so.1; do
+        [ "$(inside sh -c "od -An -tu1 -j4 -N1 /usr/$file" | tr -d ' ')" = "$class" ] || {
             echo "$file has another word size"
             return 1
         }
     done
 }
 
-# shows PATTERN ARGUMENT...: the installed host, asked so, prints a line like that.
-shows() {
-    pattern=$1
-    shift
-    inside cmpihost "$@" >"$work/shown"
-    grep -Eq -e "$pattern" "$work/shown" || {
-        echo "no line like '$pattern':"
-        cat "$work/shown"
-        return 1
-    }
-}
-
 asks_the_host() {
     check "cmpihost ei KORVA_OperatingSystem shows this Debian" \
-        shows '^  Name  +Debian GNU/Linux$' ei KORVA_OperatingSystem
-    check "... and its version" shows '^  Version  +12$' ei KORVA_OperatingSystem
-    check "cmpihost ein KORVA_OperatingSystem" shows ',Name="Debian GNU/Linux"$' ein KORVA_OperatingSystem
+        shows '^  Name  +Debian GNU/Linux$' cmpihost ei KORVA_OperatingSystem
+    check "... and its version" shows '^  Version  +12$' cmpihost ei KORVA_OperatingSystem
+    check "cmpihost ein KORVA_OperatingSystem" shows ',Name="Debian GNU/Linux"$' cmpihost ein KORVA_OperatingSystem
     path=$(inside cmpihost ein KORVA_OperatingSystem 2>>"$log") || true
     check "cmpihost ai from it to the computer system" \
-        shows '^  CreationClassName  +KORVA_ComputerSystem$' ai "$path" --assoc-class KORVA_RunningOS
-    check "cmpihost rin from it, which the facade answers" shows '^root/cimv2:KORVA_RunningOS[.]' rin "$path"
-    check "cmpihost tree" shows 'Debian GNU/Linux 12 .KORVA_OperatingSystem.: Enabled' tree
+        shows '^  CreationClassName  +KORVA_ComputerSystem$' cmpihost ai "$path" --assoc-class KORVA_RunningOS
+    check "cmpihost rin from it, which the facade answers" shows '^root/cimv2:KORVA_RunningOS[.]' cmpihost rin "$path"
+    check "cmpihost tree" shows 'Debian GNU/Linux 12 .KORVA_OperatingSystem.: Enabled' cmpihost tree
 }
 
 # ---- the registration
@@ -177,8 +127,6 @@ nothing_is_left() {
     known_packages | diff "$work/packages.before" -
 }
 
-check "a fresh system" make_system
-[ "$status" -eq 0 ] || exit 1
 check "packages of a later version" bring_packages
 check "an object manager that keeps what it is told" bring_object_manager
 version=$(dpkg-deb -f "$(find "$root/packages" -name '*-provider_*.deb')" Version)
