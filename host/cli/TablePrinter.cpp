@@ -63,9 +63,10 @@ std::string valueText(const Value& value, const Hints& hints) {
     return result.empty() ? "{}" : result;
 }
 
-/// References stay in one piece, for a path that is broken cannot be copied into a request.
+/// Texts and lists only. A path that is broken could not be copied into a request.
 bool canBreak(const Value& value) {
-    return (value.type() & ~CMPI_ARRAY) != CMPI_ref;
+    const bool list = value.isArray() && value.type() != CMPI_refA;
+    return list || categoryOf(value) == TypeCategory::Text;
 }
 
 class TablePrinter final : public Printer {

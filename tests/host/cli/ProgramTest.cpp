@@ -8,6 +8,7 @@
 #include "host/cli/Cmpihost.h"
 #include "host/cli/OutputForm.h"
 #include "support/GoldenFile.h"
+#include "support/PseudoTerminal.h"
 
 namespace {
 
@@ -30,7 +31,8 @@ std::string jsonForm(const Words& arguments) {
         {"ri", "instances"},
         {"classes", "classes"},
         {"KORVA_InstalledOS", "describedClass"},
-        {"korva_operatingsystem.freephysicalmemory", "describedProperty"},
+        {"KORVA_OperatingSystem.FreePhysicalMemory", "describedProperty"},
+        {"Disk.RequestState", "describedMethod"},
         {"ein", "paths"},
         {"ain", "paths"},
         {"rin", "paths"},
@@ -185,14 +187,6 @@ TEST(Program, PrintsWhatTheShippedLibrariesAnswer) {
         {"--format", "json", "ai", system, "--role", "ManagedElement"},
         {"--format", "json", "ain", system, "--role", "ManagedElement"},
         {"--format", "mof", "ein", "KORVA_OperatingSystemCapabilities"},
-        // The classes.
-        {"classes"},
-        {"--format", "json", "classes"},
-        {"describe", "KORVA_OSElementCapabilities"},
-        {"--format", "json", "describe", "KORVA_InstalledOS"},
-        {"describe", "KORVA_OperatingSystem.EnabledState"},
-        {"--format", "json", "describe", "korva_operatingsystem.freephysicalmemory"},
-        {"describe", "KORVA_OperatingSystem.RequestStateChange"},
         // Bare values.
         {"ei", "KORVA_OperatingSystem", "--value", "operationalstatus"},
         {"gi", "KORVA_OperatingSystem", "--value", "LastBootUpTime"},
@@ -287,6 +281,11 @@ TEST(Program, DescribesWhatTheSchemaDeclares) {
         {"--schema", other, "describe", "Disk.Weight"},
         {"--schema", other, "describe", "Disk.Count"},
         {"--schema", other, "describe", "Disk.RequestState"},
+        // For programs.
+        {"--format", "json", "classes"},
+        {"--format", "json", "describe", "KORVA_InstalledOS"},
+        {"--format", "json", "describe", "KORVA_OperatingSystem.FreePhysicalMemory"},
+        {"--schema", other, "--format", "json", "describe", "Disk.RequestState"},
         // A file of a schema, and several of them.
         {"--schema", KORVA_TEST_DATA "/cli/othermof/Other.mof", "classes"},
         {"--schema", KORVA_SOURCE_DIR "/schema/KORVA_RunningOS.mof", "--schema", other, "classes"},
@@ -301,6 +300,49 @@ TEST(Program, DescribesWhatTheSchemaDeclares) {
     };
     expectGolden(KORVA_TEST_DATA "/cli/runs/Schema.txt",
                  replaced(transcript(runs, {"TZ=UTC0"}), KORVA_SOURCE_DIR, "SOURCE"));
+}
+
+TEST(Program, BreaksLinesForATerminalAndDrawsWithAsciiWhereItHasNoUtf8) {
+    const PseudoTerminal terminal;
+    terminal.setColumns(45);
+    const auto shown = [&](const std::string& arguments, const char* locale) {
+        const ProgramRun run = runProgram(
+            "/bin/sh",
+            {"-c", "exec \"$0\" " + arguments + " >\"$1\"", KORVA_CMPIHOST, terminal.name()},
+            {locale, "TZ=UTC0", "LD_LIBRARY_PATH=" KORVA_BINARY_DIR "/fixture-host"});
+        EXPECT_EQ(run.status, 0) << run.err;
+        return replaced(terminal.read(), "\r\n", "\n");
+    };
+    EXPECT_EQ(shown("tree", "LC_ALL=C"), R"(fixture.example (KORVA_ComputerSystem)
+|-- KORVA_InstalledOS
+|   `-- Fixture Linux 12.5
+|       |   (KORVA_OperatingSystem):
+|       |   installed 2022-04-15 05:20:00
+|       |   +00:00
+|       `-- KORVA_OSElementCapabilities
+|           `-- Fixture Linux
+|               (KORVA_OperatingSystemCapabilities):
+|               name fixed, shutdown of the
+|               host: No effect
+`-- KORVA_RunningOS
+    `-- Fixture Linux 12.5
+        (KORVA_OperatingSystem): Enabled,
+        health OK, up since 2023-11-14
+        22:13:20 +00:00
+)");
+    EXPECT_THAT(shown("tree", "LC_ALL=C.UTF-8"), HasSubstr("\n├── KORVA_InstalledOS\n"));
+    EXPECT_EQ(shown("ei KORVA_OperatingSystem InstallDate Status OperationalStatus", "LC_ALL=C"),
+              "root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\"KORVA_ComputerSystem\","
+              "CSName=\"fixture.example\",CreationClassName=\"KORVA_OperatingSystem\","
+              "Name=\"Fixture Linux\"\n"
+              "  CSCreationClassName  KORVA_ComputerSystem\n"
+              "  CSName               fixture.example\n"
+              "  CreationClassName    KORVA_OperatingSystem\n"
+              "  Name                 Fixture Linux\n"
+              "  InstallDate          20220415052000.000000+000 (2022-04-15 05:20:00 +00:00)\n"
+              "  OperationalStatus    2 (OK), 11 (In\n"
+              "                       Service)\n"
+              "  Status               OK\n");
 }
 
 TEST(Program, TellsHowTheLibrariesCleanedUp) {
