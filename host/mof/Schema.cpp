@@ -88,6 +88,16 @@ const mof::Feature* Schema::findProperty(std::string_view className,
     return nullptr;
 }
 
+const mof::Method* Schema::findMethod(std::string_view className,
+                                      std::string_view methodName) const {
+    for (const mof::Class* level = find(className); level != nullptr;
+         level = find(level->superclass)) {
+        for (const mof::Method& method : level->methods)
+            if (base::equalsIgnoreCase(method.result.name, methodName)) return &method;
+    }
+    return nullptr;
+}
+
 std::vector<const mof::Feature*> Schema::properties(const std::string& className) const {
     std::vector<const mof::Feature*> result;
     std::unordered_set<std::string> seen;

@@ -53,6 +53,9 @@ class Schema {
     /// only a superclass declares. Empty for an unknown class.
     std::vector<const mof::Feature*> properties(const std::string& className) const;
 
+    /// The method of the class as its nearest declaration has it, or null.
+    const mof::Method* findMethod(std::string_view className, std::string_view methodName) const;
+
     /// The qualifier of a property, its own or inherited; null for none.
     const mof::Qualifier* propertyQualifier(std::string_view className,
                                             std::string_view propertyName,

@@ -139,6 +139,54 @@ TEST(MofParser, KeepsTheNamesOfIncludedFiles) {
     EXPECT_EQ(read.includes[1].position.line, 2U);
 }
 
+TEST(MofParser, ReadsEveryProductionOfTheGrammar) {
+    const Document read = parse(R"mof(
+        #pragma include ("Core/CIM_Core.mof")
+        #pragma locale ("de_DE")
+        Qualifier ValueMap : string[], Scope(property, method, parameter);
+        Qualifier Counted : uint16[3] = { 1, 0x2, 11b }, Scope(any),
+            Flavor(EnableOverride, ToSubclass);
+        /* All constants. */
+        [Abstract, Version("2." "41"), UMLPackagePath ( "CIM::Core" ),
+         Bool(FALSE), Real(-1.5e+3), Char('\x41'),
+         List { 1, -2, 017, 0xFF, 101b, NULL } : Restricted]
+        class CIM_Everything : CIM_Base {
+              [Key, Override("Id"), MaxLen(256):DisableOverride]
+           string Id = "a" "b";
+              [ArrayType("Ordered"), EmbeddedInstance("CIM_Base")]
+           string Parts[10] = { "x", "y" };
+           datetime When = "19980525133015.000000-300";
+           char16 Letter = 'B';
+           real32 Ratio = .5;  real64 Big = -1.0E+10;
+           sint64 Low = -9223372036854775808;  uint64 High = 0xFFFFFFFFFFFFFFFF;
+           boolean Flags[] = { true, FALSE, Null };
+              [Static, Exception(false)]
+           CIM_Everything REF Best = "CIM_Everything.Id=\"b\"";
+              [Description("Does it.")]
+           uint32 Do([IN, Required] CIM_Base REF What[],
+             [OUT, IN(false)] datetime Until, real64 How);
+           boolean Undo();
+        };
+        [Association, Aggregation] class CIM_Holds { [Key, Aggregate] CIM_Base REF Whole;
+            [Key, Min(1)] CIM_Everything REF Part; };
+        [Indication] class CIM_Told {};
+        [Description("One.")] instance of CIM_Holds as $One {
+            Whole = "CIM_Base.Id=1"; [Read] Part = $Two; };
+    )mof",
+                                "x.mof");
+    EXPECT_EQ(read.includes.size(), 1U);
+    EXPECT_EQ(read.qualifierTypes.size(), 2U);
+    ASSERT_EQ(read.classes.size(), 3U);
+    const Class& everything = read.classes[0];
+    EXPECT_EQ(everything.qualifiers.size(), 7U);
+    EXPECT_EQ(everything.properties.size(), 10U);
+    EXPECT_EQ(everything.properties[3].defaultValue->items[0], Scalar(Character{'B'}));
+    EXPECT_EQ(everything.properties[9].defaultValue->items[0], Scalar("CIM_Everything.Id=\"b\""));
+    ASSERT_EQ(everything.methods.size(), 2U);
+    EXPECT_TRUE(everything.methods[0].parameters[0].array);
+    EXPECT_EQ(everything.methods[1].result.type, Type::Boolean);
+}
+
 TEST(MofParser, ReadsAHundredThousandQualifiersInAMoment) {
     std::string list = "[Q0";
     for (int index = 1; index < 100000; ++index) {
@@ -168,6 +216,7 @@ TEST(MofParser, SaysWhereAndWhatWasExpected) {
         {"class A { text P; };", "1:11: 'text' is no type, and no REF follows it"},
         {"class A { string ; };", "1:18: expected a name after the type 'string', found ';'"},
         {"class A { string P; uint8 p; };", "1:27: property 'p' is declared twice in class 'A'"},
+        {"class A { uint8 M(); uint8 m(); };", "1:28: method 'm' is declared twice in class 'A'"},
         {"class A { [Key, key] string P; };", "1:17: qualifier 'key' stands twice in one list"},
         {"class A { [Key string P; };", "1:16: expected ']' after the qualifiers, found 'string'"},
         {"class A { [] string P; };", "1:12: expected the name of a qualifier, found ']'"},

@@ -51,6 +51,16 @@ TEST(Schema, FindsClassesAndTheNearestDeclarationOfAPropertyWithoutCase) {
     EXPECT_EQ(schema.findProperty("Nobody", "Id"), nullptr);
 }
 
+TEST(Schema, FindsTheNearestDeclarationOfAMethodWithoutCase) {
+    const Schema schema = schemaOf(
+        "class A { uint32 Start(); uint32 Stop(); };"
+        "class B : A { uint32 START(uint8 Speed); };");
+    EXPECT_EQ(schema.findMethod("b", "start")->parameters.size(), 1U);
+    EXPECT_EQ(schema.findMethod("B", "stop")->result.name, "Stop");
+    EXPECT_EQ(schema.findMethod("B", "Reset"), nullptr);
+    EXPECT_EQ(schema.findMethod("C", "Start"), nullptr);
+}
+
 TEST(Schema, InheritsKeysAndAssociationsFromSuperclassesDeclaredOrNot) {
     const Schema schema = schemaOf(family);
     EXPECT_TRUE(schema.isKey("Derived", "ID"));
