@@ -39,11 +39,30 @@ class Call {
           context_(scope.makeContext(request.context, request.path.nameSpace)),
           path_(scope.makePath(request.path)),
           result_(result),
-          properties_(request.properties) {}
+          properties_(request.properties),
+          out_(request.operation == Operation::InvokeMethod ? scope.makeArguments({}) : nullptr) {}
 
     CMPIStatus run(const ManagementInterfaces& interfaces) {
-        return isAssociationOperation(request_.operation) ? runAssociation(interfaces.association)
-                                                          : runInstance(interfaces.instance);
+        const Interface which = interfaceFor(request_.operation);
+        if (!interfaces.has(which)) return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
+        switch (which) {
+            case Interface::Instance:
+                return runInstance(interfaces.instance);
+            case Interface::Association:
+                return runAssociation(interfaces.association);
+            case Interface::Method:
+                return slot(interfaces.method, interfaces.method->ft->invokeMethod,
+                            request_.method.c_str(), scope_.makeArguments(request_.arguments),
+                            out_);
+            case Interface::Property:
+                break;
+        }
+        return runProperty(interfaces.property);
+    }
+
+    /// The arguments that the provider has set. Before the request ends.
+    std::vector<NamedValue> outArguments() const {
+        return out_ == nullptr ? std::vector<NamedValue>() : valueOf(out_);
     }
 
   private:
@@ -62,7 +81,6 @@ class Call {
     }
 
     CMPIStatus runInstance(CMPIInstanceMI* mi) {
-        if (mi == nullptr) return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
         const CMPIInstanceMIFT& table = *mi->ft;
         switch (request_.operation) {
             case Operation::EnumerateInstances:
@@ -87,7 +105,6 @@ class Call {
     }
 
     CMPIStatus runAssociation(CMPIAssociationMI* mi) {
-        if (mi == nullptr) return {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
         const CMPIAssociationMIFT& table = *mi->ft;
         const char* const resultClass = textOf(request_.resultClass);
         const char* const role = textOf(request_.role);
@@ -105,12 +122,21 @@ class Call {
         }
     }
 
+    CMPIStatus runProperty(CMPIPropertyMI* mi) {
+        const char* const name = request_.property.c_str();
+        return request_.operation == Operation::GetProperty
+                   ? slot(mi, mi->ft->getProperty, name)
+                   : slot(mi, mi->ft->setProperty, name, scope_.makeData(request_.value));
+    }
+
     RequestScope& scope_;
     const OperationRequest& request_;
     const CMPIContext* context_;
     const CMPIObjectPath* path_;
     const CMPIResult* result_;
     NameList properties_;
+    /// Null for any other operation than a method.
+    CMPIArgs* out_;
 };
 
 std::optional<std::string> messageOf(const CMPIStatus& status) {
@@ -131,11 +157,13 @@ Outcome invoke(const ManagementInterfaces& interfaces, Broker& broker,
     ResultCollector collector(scope);
     if (setup) setup(collector);
 
-    const CMPIStatus status = Call(scope, request, collector.cmpi()).run(interfaces);
+    Call call(scope, request, collector.cmpi());
+    const CMPIStatus status = call.run(interfaces);
 
     Outcome outcome;
     outcome.rc = status.rc;
-    outcome.message = messageOf(status);  // an object of the request
+    outcome.message = messageOf(status);  // an object of the request, as are the arguments
+    outcome.arguments = call.outArguments();
     scope.end();
     outcome.violations = scope.violations();
     // Last: with the objects gone, the contents are moved out instead of copied.
@@ -145,12 +173,16 @@ Outcome invoke(const ManagementInterfaces& interfaces, Broker& broker,
     outcome.instances = std::move(results.instances);
     outcome.refusedPaths = std::move(results.refusedPaths);
     outcome.refusedInstances = std::move(results.refusedInstances);
+    if (!results.data.empty()) outcome.value = std::move(results.data.front());
     return outcome;
 }
 
 Outcome invoke(const ProviderLibrary& library, Broker& broker, const OperationRequest& request,
                const CollectorSetup& setup) {
-    return invoke(library.interfaces(), broker, request, setup);
+    Outcome outcome = invoke(library.interfaces(), broker, request, setup);
+    const Interface which = interfaceFor(request.operation);
+    if (!library.interfaces().has(which)) outcome.message = library.whyMissing(which);
+    return outcome;
 }
 
 }  // namespace cmpihost

@@ -28,7 +28,8 @@ struct Outcome : OperationResult {
 using CollectorSetup = std::function<void(ResultCollector&)>;
 
 /// Opens a request, builds context and path, calls the slot of the operation and ends the request.
-/// An interface or slot that is missing answers CMPI_RC_ERR_NOT_SUPPORTED. An exception that leaves
+/// An interface or slot that is missing answers CMPI_RC_ERR_NOT_SUPPORTED; of an interface that a
+/// library lacks the message says so. An exception that leaves
 /// the provider goes on to the caller once the request has ended. Several threads may invoke at
 /// once.
 Outcome invoke(const ManagementInterfaces& interfaces, Broker& broker,

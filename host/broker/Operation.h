@@ -18,25 +18,48 @@ enum class Operation {
     ModifyInstance,
     DeleteInstance,
     ExecQuery,
-    InvokeMethod,
     Associators,
     AssociatorNames,
     References,
-    ReferenceNames
+    ReferenceNames,
+    InvokeMethod,
+    GetProperty,
+    SetProperty
 };
 
 /// "EnumerateInstances" and so on.
 constexpr const char* operationName(Operation operation) noexcept {
-    constexpr const char* names[] = {
-        "EnumerateInstances", "EnumerateInstanceNames", "GetInstance", "CreateInstance",
-        "ModifyInstance",     "DeleteInstance",         "ExecQuery",   "InvokeMethod",
-        "Associators",        "AssociatorNames",        "References",  "ReferenceNames"};
+    constexpr const char* names[] = {"EnumerateInstances", "EnumerateInstanceNames",
+                                     "GetInstance",        "CreateInstance",
+                                     "ModifyInstance",     "DeleteInstance",
+                                     "ExecQuery",          "Associators",
+                                     "AssociatorNames",    "References",
+                                     "ReferenceNames",     "InvokeMethod",
+                                     "GetProperty",        "SetProperty"};
     return names[static_cast<unsigned>(operation)];
+}
+
+/// The management interfaces of CMPI that the host drives; each answers operations of its own.
+enum class Interface { Instance, Association, Method, Property };
+constexpr Interface allInterfaces[] = {Interface::Instance, Interface::Association,
+                                       Interface::Method, Interface::Property};
+
+/// "Instance" and so on, as it stands in the names of factories.
+constexpr const char* interfaceName(Interface which) noexcept {
+    constexpr const char* names[] = {"Instance", "Association", "Method", "Property"};
+    return names[static_cast<unsigned>(which)];
+}
+
+/// The interface that answers the operation.
+constexpr Interface interfaceFor(Operation operation) noexcept {
+    if (operation < Operation::Associators) return Interface::Instance;
+    if (operation <= Operation::ReferenceNames) return Interface::Association;
+    return operation == Operation::InvokeMethod ? Interface::Method : Interface::Property;
 }
 
 /// Whether it starts from an instance and asks for what associations tie to it.
 constexpr bool isAssociationOperation(Operation operation) noexcept {
-    return operation >= Operation::Associators;
+    return interfaceFor(operation) == Interface::Association;
 }
 
 /// What accompanies a request: flags, and who sent it.
@@ -65,6 +88,12 @@ struct OperationRequest {
     std::optional<std::string> resultClass{};
     std::optional<std::string> role{};
     std::optional<std::string> resultRole{};
+    /// For InvokeMethod, with the arguments that go in.
+    std::string method{};
+    std::vector<NamedValue> arguments{};
+    /// For GetProperty and SetProperty, with the value that is set.
+    std::string property{};
+    Value value{};
     RequestContext context{};
 };
 
@@ -75,6 +104,10 @@ struct OperationResult {
     std::optional<std::string> message{};
     std::vector<ObjectPathValue> paths{};
     std::vector<InstanceValue> instances{};
+    /// What a method returned, or the value of a property; none: the provider returned no data.
+    std::optional<Value> value{};
+    /// The arguments that came out of a method.
+    std::vector<NamedValue> arguments{};
 };
 
 }  // namespace cmpihost

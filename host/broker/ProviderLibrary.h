@@ -1,43 +1,32 @@
 #ifndef HOST_BROKER_PROVIDER_LIBRARY_H
 #define HOST_BROKER_PROVIDER_LIBRARY_H
 
-#include "host/broker/Broker.h"
+#include "host/broker/LibraryFile.h"
+#include "host/broker/ManagementInterfaces.h"
 
-#include <cmpi/cmpift.h>
-
-#include <stdexcept>
+#include <optional>
 #include <string>
-#include <vector>
 
 /// A CMPI library, loaded as an object manager loads it.
 namespace cmpihost {
 
-/// Why a library could not be loaded (no library of this process, an unresolved symbol, no factory,
-/// one that failed); what() is one line that names the file.
-class LoadError : public std::runtime_error {
-  public:
-    using std::runtime_error::runtime_error;
-};
-
 struct LoadOptions {
-    std::string providerName = "OperatingSystemProvider";
+    /// The MI name that the factories carry; empty: the only one among the exported ones. A library
+    /// that has nothing but generic factories gets its file's name between "lib" and ".so".
+    std::string providerName{};
     /// Symbols go into the global scope, as real object managers do.
     bool global = true;
-    /// Which management interfaces the library must have.
+    /// Whether these interfaces are made where the library has them.
     bool instance = true;
     bool association = true;
+    /// What the factories find in their context as sfcbProviderParameters; none: no such entry.
+    std::optional<std::string> parameters{};
 };
 
-/// The two interfaces that the host drives; either may be null.
-struct ManagementInterfaces {
-    CMPIInstanceMI* instance = nullptr;
-    CMPIAssociationMI* association = nullptr;
-};
-
-/// A loaded library and its management interfaces. The factory `_Generic_Create_<kind>MI` is looked
-/// up first, then `<provider name>_Create_<kind>MI`. What an object manager might not forgive in
-/// the interfaces' tables (a version below 100, an MI version above it, a null slot) is a
-/// violation. One thread loads and unloads.
+/// A loaded library and its management interfaces, of which one is enough. The factory
+/// `_Generic_Create_<kind>MI` is looked up first, then `<MI name>_Create_<kind>MI`. What an object
+/// manager might not forgive in the interfaces' tables is a violation. One thread loads and
+/// unloads, while no other one uses the library; any threads may ask it in between.
 class ProviderLibrary final : public UpcallService {
   public:
     /// Loads; throws LoadError. `broker` outlives the library.
@@ -48,10 +37,16 @@ class ProviderLibrary final : public UpcallService {
     ProviderLibrary& operator=(const ProviderLibrary&) = delete;
 
     const std::string& file() const noexcept { return file_; }
+    /// The MI name, given or found.
+    const std::string& providerName() const noexcept { return provider_; }
     bool loaded() const noexcept { return handle_ != nullptr; }
     ManagementInterfaces interfaces() const noexcept { return interfaces_; }
     CMPIInstanceMI* instanceMI() const noexcept { return interfaces_.instance; }
     CMPIAssociationMI* associationMI() const noexcept { return interfaces_.association; }
+
+    /// Why an interface is missing, in a sentence that names the file, the interface and the
+    /// factory that the library lacks.
+    std::string whyMissing(Interface which) const;
 
     /// Calls cleanup of every interface, then closes the library. Not terminating: a provider that
     /// answers CMPI_RC_DO_NOT_UNLOAD or CMPI_RC_NEVER_UNLOAD stays loaded, and the result is false.
@@ -71,6 +66,7 @@ class ProviderLibrary final : public UpcallService {
     std::string file_;
     Broker& broker_;
     LoadOptions options_;
+    std::string provider_;
     void* handle_ = nullptr;
     ManagementInterfaces interfaces_;
 };

@@ -32,8 +32,16 @@ CMPIString* RequestScope::makeString(const std::optional<std::string>& text) {
     return scope_->core().make<CMPIString>(text ? Characters(*text) : Characters());
 }
 
-CMPIContext* RequestScope::makeContext(const RequestContext& context,
-                                       const std::string& nameSpace) {
+CMPIArgs* RequestScope::makeArguments(const std::vector<NamedValue>& values) {
+    return scope_->core().make<CMPIArgs>(values);
+}
+
+CMPIData RequestScope::makeData(const Value& value) {
+    return writeValue(scope_->core(), value);
+}
+
+CMPIContext* RequestScope::makeContext(const RequestContext& context, const std::string& nameSpace,
+                                       const std::vector<NamedValue>& more) {
     // The entry is there without a value, too: that is how a client without a name looks.
     const auto text = [](const std::optional<std::string>& given) {
         return given ? Value(*given) : Value::null(CMPI_string);
@@ -47,6 +55,7 @@ CMPIContext* RequestScope::makeContext(const RequestContext& context,
         entries.push_back({CMPIInitNameSpace, nameSpace});
         entries.push_back({CMPIRole, text(context.role)});
     }
+    entries.insert(entries.end(), more.begin(), more.end());
     return core.make<CMPIContext>(std::move(entries));
 }
 
@@ -68,6 +77,9 @@ ObjectPathValue valueOf(const CMPIObjectPath* path) {
 }
 InstanceValue valueOf(const CMPIInstance* instance) {
     return *alive(instance).body.value;
+}
+std::vector<NamedValue> valueOf(const CMPIArgs* arguments) {
+    return alive(arguments).body;
 }
 
 }  // namespace cmpihost

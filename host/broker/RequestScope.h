@@ -36,8 +36,11 @@ class RequestScope {
     CMPIInstance* makeInstance(const InstanceValue& value);
     /// None: a string without characters (its pointer is null), as some object managers hand out.
     CMPIString* makeString(const std::optional<std::string>& text);
-    /// CMPIInvocationFlags, CMPIPrincipal, CMPIInitNameSpace and CMPIRole.
-    CMPIContext* makeContext(const RequestContext& context, const std::string& nameSpace);
+    CMPIArgs* makeArguments(const std::vector<NamedValue>& values);
+    CMPIData makeData(const Value& value);
+    /// CMPIInvocationFlags, CMPIPrincipal, CMPIInitNameSpace and CMPIRole, then `more`.
+    CMPIContext* makeContext(const RequestContext& context, const std::string& nameSpace,
+                             const std::vector<NamedValue>& more = {});
 
   private:
     std::unique_ptr<ObjectScope> scope_;
@@ -46,6 +49,7 @@ class RequestScope {
 /// The content of an object of any broker. The object must be alive: else std::invalid_argument.
 ObjectPathValue valueOf(const CMPIObjectPath* path);
 InstanceValue valueOf(const CMPIInstance* instance);
+std::vector<NamedValue> valueOf(const CMPIArgs* arguments);
 
 }  // namespace cmpihost
 

@@ -163,11 +163,19 @@ TEST_F(Library, AnUnresolvedSymbolIsTold) {
 
 TEST_F(Library, AMissingFactoryIsTold) {
     const std::string plain = libraries + "broker_test_plain.so";
-    EXPECT_EQ(problem(plain, {"Good"}),
-              plain + ": neither _Generic_Create_InstanceMI nor Good_Create_InstanceMI");
-    EXPECT_EQ(
-        problem(testFile, {"LowVersion"}),
-        testFile + ": neither _Generic_Create_AssociationMI nor LowVersion_Create_AssociationMI");
+    const auto complaint = [](const std::string& file, const std::string& name) {
+        return file +
+               ": no CMPI provider: it exports none of\n"
+               "  _Generic_Create_InstanceMI\n"
+               "  _Generic_Create_AssociationMI\n"
+               "  _Generic_Create_MethodMI\n"
+               "  _Generic_Create_PropertyMI\n  " +
+               name + "_Create_InstanceMI\n  " + name + "_Create_AssociationMI\n  " + name +
+               "_Create_MethodMI\n  " + name + "_Create_PropertyMI";
+    };
+    EXPECT_EQ(problem(plain, {"Good"}), complaint(plain, "Good"));
+    EXPECT_EQ(problem(plain, {}), complaint(plain, "NAME"));
+    EXPECT_EQ(problem(testFile, {"Nobody"}), complaint(testFile, "Nobody"));
 }
 
 TEST_F(Library, AFactoryThatFailsIsTold) {
@@ -357,14 +365,31 @@ TEST_F(Invocation, AMissingInterfaceOrSlotIsNotSupported) {
 
     CMPIAssociationMIFT table{};
     CMPIAssociationMI mi = {nullptr, &table};
-    outcome = invoke({nullptr, &mi}, broker, request(Operation::ReferenceNames));
+    ManagementInterfaces interfaces;
+    interfaces.association = &mi;
+    outcome = invoke(interfaces, broker, request(Operation::ReferenceNames));
     EXPECT_EQ(outcome.rc, CMPI_RC_ERR_NOT_SUPPORTED);
     EXPECT_THAT(outcome.violations, ElementsAre("no function for ReferenceNames"));
+}
+
+TEST_F(Invocation, AMissingInterfaceIsToldWithTheFactoryThatIsLacking) {
+    for (const auto& [operation, kind] : {std::pair(Operation::InvokeMethod, "method"),
+                                          {Operation::GetProperty, "property"},
+                                          {Operation::SetProperty, "property"}}) {
+        const Outcome outcome = run(request(operation));
+        std::string factory = std::string("Good_Create_") + kind + "MI";
+        factory[12] = static_cast<char>(std::toupper(factory[12]));
+        EXPECT_EQ(outcome.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+        EXPECT_EQ(outcome.message, std::string("libbroker_test_providers.so has no ") + kind +
+                                       " interface: it exports no " + factory);
+        EXPECT_THAT(outcome.violations, IsEmpty());
+    }
 }
 
 TEST(Operations, HaveTheNamesOfTheirKind) {
     EXPECT_STREQ(operationName(Operation::EnumerateInstances), "EnumerateInstances");
     EXPECT_STREQ(operationName(Operation::ReferenceNames), "ReferenceNames");
+    EXPECT_STREQ(operationName(Operation::SetProperty), "SetProperty");
 }
 
 }  // namespace
