@@ -3,8 +3,8 @@
 #ifndef BENCH_BENCH_FIXTURE_H
 #define BENCH_BENCH_FIXTURE_H
 
-#include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
+#include "support/ComputerSystemService.h"
 #include "support/Requests.h"
 #include "support/SimulatedHost.h"
 

@@ -7,6 +7,7 @@
 
 #include <cmpi/cmpift.h>
 
+#include <functional>
 #include <memory>
 #include <string>
 #include <vector>
@@ -44,6 +45,18 @@ struct UpcallAnswer : OperationResult {
     CMPIrc failRc = CMPI_RC_ERR_FAILED;
 };
 
+/// What a provider logged or traced through its broker.
+struct ProviderMessage {
+    bool trace = false;
+    /// The CMPISeverity of a logged message, the CMPILevel of a traced one.
+    int level = 0;
+    /// The message's identifier, or the traced component; empty: none was given.
+    std::string source{};
+    std::string text{};
+};
+/// Several threads may call it at once. What it throws becomes CMPI_RC_ERR_FAILED.
+using MessageSink = std::function<void(const ProviderMessage&)>;
+
 /// Stands for the provider of one or more classes. Up-calls arrive on the thread of the request; a
 /// service that several threads may reach at once must cope with that.
 class UpcallService {
@@ -61,8 +74,8 @@ class UpcallService {
 
 /// A broker with all its tables, for one or more providers. Objects that providers make through it
 /// belong to the RequestScope that is open on the thread. Several threads may run requests at once;
-/// catalogue, routes and fault plan are set while none runs. The broker outlives its requests and
-/// loaded libraries.
+/// catalogue, routes, message sink and fault plan are set while none runs. The broker outlives its
+/// requests and loaded libraries.
 class Broker {
   public:
     /// `catalogue` outlives the broker; null: nothing is checked against a schema.
@@ -75,9 +88,15 @@ class Broker {
     const CMPIBroker* cmpi() const noexcept;
 
     /// Up-calls for the class go to `service`, which outlives its use; a later route replaces an
-    /// earlier one. Up-calls for a class without route: null and CMPI_RC_ERR_INVALID_CLASS, or
-    /// CMPI_RC_ERR_NOT_SUPPORTED when the catalogue knows the class.
+    /// earlier one.
     void route(const std::string& className, UpcallService& service);
+    /// Up-calls for all classes without a route go to `service`, which outlives its use. Without
+    /// one they get null and CMPI_RC_ERR_INVALID_CLASS, or CMPI_RC_ERR_NOT_SUPPORTED when the
+    /// catalogue knows the class.
+    void routeOthers(UpcallService& service);
+
+    /// Shows what providers log and trace to `sink`, on the threads that do; none: nowhere.
+    void setMessageSink(MessageSink sink);
 
     /// Null: no faults, no counting. The plan outlives its use.
     void setFaultPlan(FaultPlan* plan) noexcept;

@@ -176,7 +176,8 @@ UpcallService* BrokerCore::serviceFor(const OperationRequest& request) const {
     if (association) {
         if (UpcallService* const found = serviceOf(*association)) return found;
     }
-    return serviceOf(request.path.className);
+    UpcallService* const found = serviceOf(request.path.className);
+    return found == nullptr ? others_ : found;
 }
 
 UpcallAnswer BrokerCore::perform(const OperationRequest& request) {
@@ -199,6 +200,12 @@ const CMPIBroker* Broker::cmpi() const noexcept {
 }
 void Broker::route(const std::string& className, UpcallService& service) {
     core_->route(className, service);
+}
+void Broker::routeOthers(UpcallService& service) {
+    core_->routeOthers(service);
+}
+void Broker::setMessageSink(MessageSink sink) {
+    core_->setMessageSink(std::move(sink));
 }
 void Broker::setFaultPlan(FaultPlan* plan) noexcept {
     core_->setFaultPlan(plan);

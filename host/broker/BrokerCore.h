@@ -106,6 +106,11 @@ class BrokerCore {
     void setFaultPlan(FaultPlan* plan) noexcept { plan_.store(plan, std::memory_order_release); }
 
     void route(const std::string& className, UpcallService& service);
+    void routeOthers(UpcallService& service) noexcept { others_ = &service; }
+    void setMessageSink(MessageSink sink) { messageSink_ = std::move(sink); }
+    void show(const ProviderMessage& message) const {
+        if (messageSink_) messageSink_(message);
+    }
     UpcallAnswer perform(const OperationRequest& request);
 
     std::vector<std::string> violations(bool take);
@@ -131,6 +136,9 @@ class BrokerCore {
 
     std::atomic<FaultPlan*> plan_{nullptr};
     std::vector<std::pair<std::string, UpcallService*>> services_;
+    /// Answers for the classes that have none of the services; may be null.
+    UpcallService* others_ = nullptr;
+    MessageSink messageSink_;
 
     mutable std::mutex findingsMutex_;
     std::vector<std::string> violations_;

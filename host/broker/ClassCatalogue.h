@@ -46,8 +46,9 @@ class ClassCatalogue {
     ClassCatalogue& operator=(const ClassCatalogue&) = default;
 };
 
-/// How a class stands to another one. Unknown: the chain of superclasses leaves the catalogue
-/// before the ancestor is met.
+/// How a class stands to another one. Unknown: the chain of superclasses leaves the catalogue, and
+/// the few classes of the CIM schema that are known by their names alone, before the ancestor is
+/// met.
 enum class ClassRelation { Same, Subclass, Unrelated, Unknown };
 
 /// The relation of `className` to `ancestor`. A null catalogue knows only equal names.

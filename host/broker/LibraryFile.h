@@ -10,8 +10,7 @@
 namespace cmpihost {
 
 /// Why a library could not be loaded (not found, no library of this process, an unresolved symbol,
-/// no factory, one that failed); what() names the file and is one line, or several where it lists
-/// names or places.
+/// no factory, one that failed); what() is one line that names the file.
 class LoadError : public std::runtime_error {
   public:
     using std::runtime_error::runtime_error;

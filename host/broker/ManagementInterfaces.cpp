@@ -139,13 +139,18 @@ std::string nameInFactory(const std::string& function) {
     return {};
 }
 
+std::string listed(const std::vector<std::string>& names) {
+    std::string text;
+    for (const std::string& name : names) text += (text.empty() ? "" : ", ") + name;
+    return text;
+}
+
 /// What was looked for in vain: both names of all factories.
 std::string noFactory(const std::string& file, const std::string& provider) {
-    std::string text = file + ": no CMPI provider: it exports none of";
-    for (const char* name : {"_Generic", provider.c_str()}) {
-        for (const Interface which : allInterfaces) text += "\n  " + factoryName(name, which);
-    }
-    return text;
+    std::vector<std::string> names;
+    for (const Interface which : allInterfaces) names.push_back(factoryName(provider, which));
+    for (const Interface which : allInterfaces) names.push_back(factoryName("_Generic", which));
+    return file + ": not a CMPI provider: it exports none of " + listed(names);
 }
 
 }  // namespace
@@ -177,9 +182,7 @@ std::string providerName(const std::string& file, const std::vector<std::string>
     if (names.size() == 1) return names.front();
     if (names.empty() && generic) return otherwise;
     if (names.empty()) throw LoadError(noFactory(file, "NAME"));
-    std::string text = file + ": several providers, choose one with --name NAME:";
-    for (const std::string& name : names) text += "\n  " + name;
-    throw LoadError(text);
+    throw LoadError(file + ": several providers (" + listed(names) + "): choose with --name NAME");
 }
 
 ManagementInterfaces makeInterfaces(const ProviderSource& source, Broker& broker,

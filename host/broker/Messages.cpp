@@ -8,12 +8,23 @@ namespace cmpihost {
 
 namespace {
 
-/// Messages of providers go nowhere: this host keeps no log of its own.
-CMPIStatus dropMessage(BrokerCore&, const CallName& call, int, const char*, const char* text,
-                       const CMPIString* string) {
-    // Looked at all the same: a dead object would crash an object manager that prints it.
-    if (text == nullptr && string != nullptr) fromHandle(string, call);
+/// Hands a message to whoever shows it. The string counts where there is no text.
+CMPIStatus show(BrokerCore& core, const CallName& call, bool trace, int level, const char* source,
+                const char* text, const CMPIString* string) {
+    // Looked at even when nobody listens: a dead object would crash an object manager that prints.
+    if (text == nullptr && string != nullptr) text = fromHandle(string, call).body.get();
+    core.show({trace, level, source == nullptr ? "" : source, text == nullptr ? "" : text});
     return statusOf(CMPI_RC_OK);
+}
+
+CMPIStatus logMessage(BrokerCore& core, const CallName& call, int severity, const char* id,
+                      const char* text, const CMPIString* string) {
+    return show(core, call, false, severity, id, text, string);
+}
+
+CMPIStatus traceMessage(BrokerCore& core, const CallName& call, int level, const char* component,
+                        const char* text, const CMPIString* string) {
+    return show(core, call, true, level, component, text, string);
 }
 
 /// There are no message files: texts come from the provider's defaults.
@@ -122,8 +133,8 @@ CMPIString* getMessage2(const CMPIBroker* broker, const char*, CMPIMsgFileHandle
 
 void bindMessages(CMPIBrokerEncFT& table) {
     using FT = CMPIBrokerEncFT;
-    bind<&FT::logMessage, &dropMessage>(table, "logMessage");
-    bind<&FT::trace, &dropMessage>(table, "trace");
+    bind<&FT::logMessage, &logMessage>(table, "logMessage");
+    bind<&FT::trace, &traceMessage>(table, "trace");
     bind<&FT::openMessageFile, &openMessageFile>(table, "openMessageFile");
     bind<&FT::closeMessageFile, &notSupported<CMPIStatus, BrokerCore, CMPIMsgFileHandle>>(
         table, "closeMessageFile");

@@ -194,6 +194,43 @@ CMPIEnumeration* references(BrokerCore& core, const CallName& call, const CMPICo
                    {nullptr, resultClass, role, nullptr, properties}, status);
 }
 
+/// The arguments that come out take the place of those of the same name.
+CMPIData invokeMethod(BrokerCore& core, const CallName& call, const CMPIContext* context,
+                      const CMPIObjectPath* path, const char* method, const CMPIArgs* in,
+                      CMPIArgs* out, CMPIStatus* status) {
+    OperationRequest request = requestOf(Operation::InvokeMethod, call, context, path);
+    request.method = required(core, method, call, "method");
+    // Providers leave lists out that would be empty.
+    if (in != nullptr) request.arguments = fromHandle(in, call).body;
+    auto* const outArguments = out == nullptr ? nullptr : &fromHandle(out, call).body;
+    std::optional<UpcallAnswer> answer = answerTo(core, request, status);
+    if (!answer) return noData(CMPI_badValue);
+    if (outArguments != nullptr) {
+        for (NamedValue& each : answer->arguments)
+            putNamed(*outArguments, each.name, std::move(each.value));
+    }
+    return answer->value ? writeValue(core, *answer->value) : noData(CMPI_nullValue);
+}
+
+CMPIStatus setProperty(BrokerCore& core, const CallName& call, const CMPIContext* context,
+                       const CMPIObjectPath* path, const char* name, const CMPIValue* value,
+                       CMPIType type) {
+    OperationRequest request = requestOf(Operation::SetProperty, call, context, path);
+    request.property = required(core, name, call, "name");
+    request.value = readValue(value, type, call);
+    return statusAnswer(core, request);
+}
+
+CMPIData getProperty(BrokerCore& core, const CallName& call, const CMPIContext* context,
+                     const CMPIObjectPath* path, const char* name, CMPIStatus* status) {
+    OperationRequest request = requestOf(Operation::GetProperty, call, context, path);
+    request.property = required(core, name, call, "name");
+    const std::optional<UpcallAnswer> answer = answerTo(core, request, status);
+    if (!answer) return noData(CMPI_badValue);
+    // Success without data: the provider does not have the property.
+    return answer->value ? writeValue(core, *answer->value) : missingItem(core, status);
+}
+
 /// A clone, since the thread may still use it when the request that prepared it has ended.
 CMPIContext* prepareAttachThread(BrokerCore& core, const CallName& call,
                                  const CMPIContext* context) {
@@ -228,7 +265,6 @@ CMPIStatus detachThread(BrokerCore& core, const CallName& call, const CMPIContex
 CMPIBrokerFT completeUpcalls() {
     using FT = CMPIBrokerFT;
     using Context = const CMPIContext*;
-    using Path = const CMPIObjectPath*;
     using Text = const char*;
     FT table{};
     table.brokerCapabilities = CMPI_MB_InstanceManipulation | CMPI_MB_AssociationTraversal;
@@ -251,14 +287,9 @@ CMPIBrokerFT completeUpcalls() {
     bind<&FT::deliverIndication,
          &notSupported<CMPIStatus, BrokerCore, Context, Text, const CMPIInstance*>>(
         table, "deliverIndication");
-    bind<&FT::setProperty,
-         &notSupported<CMPIStatus, BrokerCore, Context, Path, Text, const CMPIValue*, CMPIType>>(
-        table, "setProperty");
-    bind<&FT::getProperty, &notSupported<CMPIData, BrokerCore, Context, Path, Text, CMPIStatus*>>(
-        table, "getProperty");
-    bind<&FT::invokeMethod, &notSupported<CMPIData, BrokerCore, Context, Path, Text,
-                                          const CMPIArgs*, CMPIArgs*, CMPIStatus*>>(table,
-                                                                                    "invokeMethod");
+    bind<&FT::setProperty, &setProperty>(table, "setProperty");
+    bind<&FT::getProperty, &getProperty>(table, "getProperty");
+    bind<&FT::invokeMethod, &invokeMethod>(table, "invokeMethod");
     return table;
 }
 

@@ -11,19 +11,9 @@ namespace fs = std::filesystem;
 
 namespace {
 
-/// In the order of Library.
-constexpr const char* fileNames[] = {"libkorzbosstatusprofileprovider.so",
-                                     "libkorvaosstatusfacade.so",
-                                     "libkorvacomputersystemprovider.so"};
-
-std::string fileName(Library library) {
-    return fileNames[static_cast<std::size_t>(library)];
-}
-
-/// The folders that object managers load providers from, below a prefix: the one that the providers
-/// are installed in, then the usual ones.
-std::vector<fs::path> cmpiFolders(const fs::path& installed) {
-    std::vector<fs::path> folders = {installed};
+/// The folders below a prefix that object managers load providers from.
+std::vector<fs::path> cmpiFolders() {
+    std::vector<fs::path> folders;
     // Distributions disagree about the folder, and a package may come from another one.
     for (const char* libraries : {KORVA_LIBRARY_FOLDER, "lib", "lib64", "lib32"}) {
         folders.push_back(fs::path(libraries) / "cmpi");
@@ -46,41 +36,27 @@ fs::path schemaFolder(const fs::path& programFolder) {
     return programFolder.parent_path() / "share/korva-osstatus/schema";
 }
 
+fs::path registrationFolder(const fs::path& programFolder) {
+    return programFolder.parent_path() / "share/korva-osstatus/registration";
+}
+
 fs::path installedProviderFolder() {
     return KORVA_CMPI_FOLDER;
 }
 
-std::vector<fs::path> candidates(Library library, const fs::path& programFolder,
-                                 const fs::path& installed) {
-    const std::string name = fileName(library);
-    const std::string soname = name + ".1";
+std::vector<fs::path> libraryFolders(const fs::path& programFolder, const fs::path& installed) {
     const fs::path prefix = programFolder.parent_path();
     // A library beside the program belongs to it, so it goes before whatever is installed. An
     // absolute folder of providers takes the place of the prefix.
-    std::vector<fs::path> result = {prefix / "lib" / soname, programFolder / soname};
-    for (const fs::path& folder : cmpiFolders(installed)) {
-        for (const std::string& file : {name, soname}) {
-            fs::path candidate = prefix / folder / file;
-            if (std::find(result.begin(), result.end(), candidate) == result.end()) {
+    std::vector<fs::path> result = {prefix / "lib", programFolder, prefix / installed};
+    for (const fs::path& root : {prefix, fs::path("/usr"), fs::path("/usr/local")}) {
+        for (const fs::path& folder : cmpiFolders()) {
+            fs::path candidate = root / folder;
+            if (std::find(result.begin(), result.end(), candidate) == result.end())
                 result.push_back(std::move(candidate));
-            }
         }
     }
     return result;
-}
-
-fs::path findLibrary(Library library, const fs::path& programFolder, const fs::path& installed) {
-    for (const fs::path& candidate : candidates(library, programFolder, installed)) {
-        std::error_code error;
-        if (fs::is_regular_file(candidate, error)) return candidate;
-    }
-    return {};
-}
-
-std::string providerName(const fs::path& file) {
-    // By the beginning of the file's name: with or without a version behind it.
-    const bool facade = file.filename().string().rfind(fileName(Library::Facade), 0) == 0;
-    return facade ? "OSStatusFacade" : "OperatingSystemProvider";
 }
 
 }  // namespace cmpihost

@@ -16,28 +16,19 @@ std::filesystem::path programFolder(const std::string& invokedAs,
 /// The folder of the MOF files that belongs to a program in that folder.
 std::filesystem::path schemaFolder(const std::filesystem::path& programFolder);
 
+/// The folder of the registration files that belongs to it.
+std::filesystem::path registrationFolder(const std::filesystem::path& programFolder);
+
 /// The folder that the providers are installed in: below the prefix, or absolute.
 std::filesystem::path installedProviderFolder();
 
-/// The libraries that belong to the program: the provider, the facade in front of it, and the
-/// computer system's provider.
-enum class Library { Provider, Facade, Companion };
-
-/// Where a library can be for a program in that folder, best place first: the library folder beside
-/// it, the folder itself, the folder that the providers are installed in (below the folder that
-/// holds the program's, or absolute), the folders that object managers usually load providers from.
-std::vector<std::filesystem::path> candidates(
-    Library library, const std::filesystem::path& programFolder,
+/// Where the libraries of providers can be for a program in that folder, best place first: the
+/// library folder beside it, the folder itself, the folder that the providers are installed in
+/// (below the folder that holds the program's, or absolute), the folders that object managers
+/// usually load providers from, below that folder and in the system.
+std::vector<std::filesystem::path> libraryFolders(
+    const std::filesystem::path& programFolder,
     const std::filesystem::path& installed = installedProviderFolder());
-
-/// The first candidate that exists; empty when none does.
-std::filesystem::path findLibrary(
-    Library library, const std::filesystem::path& programFolder,
-    const std::filesystem::path& installed = installedProviderFolder());
-
-/// The provider's name that the factories of a library carry: the facade's, if the file is named
-/// like the facade's library, else the provider's.
-std::string providerName(const std::filesystem::path& file);
 
 }  // namespace cmpihost
 

@@ -66,8 +66,13 @@ std::string complaint(const std::string& className, const std::vector<ObjectPath
 }  // namespace
 
 bool lacksKeys(const OperationRequest& request, const ClassCatalogue& catalogue) {
-    const ClassDeclaration* declaration = catalogue.find(request.path.className);
-    if (!mayBeCompleted(request.operation) || declaration == nullptr) return false;
+    if (!mayBeCompleted(request.operation)) return false;
+    const std::string& className = request.path.className;
+    const ClassDeclaration* declaration = catalogue.find(className);
+    if (declaration == nullptr) {
+        // The classes of the CIM schema are ancestors that no file needs to declare.
+        return request.path.keys.empty() && base::equalsIgnoreCase(className.substr(0, 4), "CIM_");
+    }
     const auto isLacking = [&](const PropertyDeclaration& property) {
         return property.key && request.path.key(property.name) == nullptr;
     };

@@ -1,56 +1,55 @@
 #ifndef HOST_CLI_PROVIDER_HOST_H
 #define HOST_CLI_PROVIDER_HOST_H
 
+#include <filesystem>
 #include <memory>
 #include <string>
 #include <vector>
 
 #include "host/broker/Broker.h"
-#include "host/broker/ComputerSystemService.h"
-#include "host/broker/Invoke.h"
 #include "host/broker/ProviderLibrary.h"
+#include "host/broker/Registrations.h"
+#include "host/broker/Router.h"
 
 namespace cmpihost {
 
-/// The provider that is asked.
-struct ProviderSource {
-    std::string library;
-    /// The provider's name, which the library's factories carry.
-    std::string name;
-};
-
-/// Who serves the computer system, beside the provider.
-struct ComputerSystemSource {
-    /// The library of its provider; empty: the host serves it itself.
+/// Who answers in a host.
+struct HostSetup {
+    Registrations registrations{};
+    /// Where the libraries of the registrations are looked for, beside their own folders.
+    std::vector<std::filesystem::path> libraryFolders{};
+    /// The one library that is asked for everything; empty: who is registered.
     std::string library{};
-    /// How many the host serves itself.
-    unsigned count = 1;
+    /// Its MI name; empty: the one that it exports.
+    std::string miName{};
+    /// Takes what providers log through their broker.
+    MessageSink messageSink{};
 };
 
-/// One provider library in a broker, beside the provider of the computer system, which answers its
-/// up-calls. One thread uses it.
+/// A broker with its provider libraries. One thread uses it.
 class ProviderHost {
   public:
-    /// Loads the libraries; throws LoadError. `catalogue` outlives the host.
-    ProviderHost(const ProviderSource& provider, const ClassCatalogue& catalogue,
-                 const ComputerSystemSource& computerSystems = {});
+    /// Loads the one library, if there is one; throws LoadError. `catalogue` outlives the host.
+    ProviderHost(HostSetup setup, const ClassCatalogue& catalogue);
 
-    /// Runs one operation of the provider. An exception that leaves the provider becomes
-    /// CMPI_RC_ERR_FAILED with a message that says so.
-    OperationResult run(const OperationRequest& request);
-
-    /// The same, but requests for the computer system's class go to its provider.
+    /// Runs one operation. An exception that leaves a provider becomes CMPI_RC_ERR_FAILED with a
+    /// message that says so. Throws LoadError.
     OperationResult ask(const OperationRequest& request);
 
-    /// Unloads the library and hands out all that the broker caught since it was loaded.
+    /// The same, but what the one library does not have is asked of who is registered: the source
+    /// of an association may be another provider's.
+    OperationResult askAnyone(const OperationRequest& request);
+
+    /// Why libraries that providers needed did not load.
+    std::vector<std::string> takeLoadErrors();
+
+    /// Unloads all libraries and hands out all that the broker caught since it was made.
     std::vector<std::string> unload();
 
   private:
     Broker broker_;
-    /// The library that serves the computer system; null: the host does.
-    std::unique_ptr<ProviderLibrary> companion_;
-    ComputerSystemService computerSystems_;
-    ProviderLibrary library_;
+    Router router_;
+    std::unique_ptr<ProviderLibrary> library_;
 };
 
 }  // namespace cmpihost

@@ -13,6 +13,7 @@
 #include <sstream>
 #include <stdexcept>
 #include <type_traits>
+#include <utility>
 
 #include "base/Utf8.h"
 #include "host/cli/BareValues.h"
@@ -54,26 +55,42 @@ std::string loaderPath(const std::string& given) {
     return bare && fs::exists(given, error) ? "./" + given : given;
 }
 
-/// There is no library to load; what() is safe to print on a terminal.
+/// There is no library or registration to go by; what() is safe to print on a terminal.
 class ProviderNotFound : public std::runtime_error {
   public:
     using std::runtime_error::runtime_error;
 };
 
-std::string providerFile(const CommandLine& commandLine, const fs::path& programFolder) {
-    if (!commandLine.provider.empty()) return loaderPath(commandLine.provider);
-    const Library wanted = commandLine.bare ? Library::Provider : Library::Facade;
-    const fs::path found = findLibrary(wanted, programFolder);
-    if (found.empty()) {
-        std::string text = std::string("no library of the ") +
-                           (commandLine.bare ? "provider" : "facade") + " was found; looked for";
-        for (const fs::path& candidate : candidates(wanted, programFolder)) {
-            text += "\n  " + base::escapeForTerminal(candidate.string());
-        }
-        throw ProviderNotFound(text + "\n(--provider FILE names one" +
-                               (commandLine.bare ? ", without --bare)" : ")"));
+/// The library that is asked for everything; empty: who is registered is asked.
+std::string soleLibrary(const CommandLine& commandLine, const std::vector<fs::path>& folders) {
+    if (!commandLine.bare)
+        return commandLine.provider.empty() ? std::string() : loaderPath(commandLine.provider);
+    const std::string found = findLibrary("korzbosstatusprofileprovider", folders).string();
+    if (found.find('/') != std::string::npos) return found;
+    std::string text;
+    for (const fs::path& folder : folders) text += (text.empty() ? "" : ", ") + folder.string();
+    throw ProviderNotFound(
+        base::escapeForTerminal(found + " was not found; looked for in " + text) +
+        " (--provider FILE names a library, without --bare)");
+}
+
+Registrations readRegistrations(const CommandLine& commandLine, const fs::path& programFolder) {
+    const auto& given = commandLine.registrations;
+    const fs::path shipped = registrationFolder(programFolder);
+    std::error_code error;
+    if (given.empty() && !fs::is_directory(shipped, error)) {
+        if (commandLine.bare || !commandLine.provider.empty()) return {};
+        throw ProviderNotFound("there are no registrations in " +
+                               base::escapeForTerminal(shipped.string()) +
+                               " (--registration PATH names others, --provider FILE a library)");
     }
-    return found.string();
+    try {
+        return Registrations::read(given.empty()
+                                       ? std::vector<fs::path>{shipped}
+                                       : std::vector<fs::path>(given.begin(), given.end()));
+    } catch (const std::runtime_error& wrong) {
+        throw ProviderNotFound(base::escapeForTerminal(wrong.what()));
+    }
 }
 
 bool yieldsPaths(Operation operation) {
@@ -146,10 +163,18 @@ class Run {
 
     /// Does it all, and turns what is thrown on the way into a complaint and its exit status.
     ExitStatus exitStatus() {
+        const ExitStatus status = executed();
+        const bool stays = status == exitUsage || status == exitNotLoaded;
+        if (stays || (!notLoaded_ && !caught_)) return status;
+        return notLoaded_ ? exitNotLoaded : exitCaught;
+    }
+
+  private:
+    ExitStatus executed() {
         try {
             const ExitStatus status = execute();
             if (commandLine_.time) err_ << stopwatch_.line();
-            return caught_ ? exitCaught : status;
+            return status;
         } catch (const ProviderNotFound& error) {
             return failed(error.what(), exitNotLoaded);
         } catch (const LoadError& error) {
@@ -159,7 +184,6 @@ class Run {
         }
     }
 
-  private:
     ExitStatus execute() {
         // The schema goes first: a wrong path is reported without loading any library.
         const Schema schema = loadSchema(commandLine_.schemas, programFolder_);
@@ -195,7 +219,7 @@ class Run {
         std::string notes;
         const OperationResult result = withHost(catalogue, [&](ProviderHost& host) {
             OperationResult answer = commandLine_.bare || !lacksKeys(request, catalogue)
-                                         ? host.run(request)
+                                         ? host.ask(request)
                                          : completed(host, request);
             stopwatch_.lap(&Stopwatch::request);
             // Before the questions that explain the answer make records of their own.
@@ -231,7 +255,7 @@ class Run {
         const std::string names = notesOnNames(request, answer, schema);
         if (!names.empty() || !isEmptyAnswer(request, answer)) return names;
         return reasonForNothing(
-            request, schema, [&](const OperationRequest& question) { return host.run(question); });
+            request, schema, [&](const OperationRequest& question) { return host.ask(question); });
     }
 
     std::unique_ptr<Printer> printer(const Schema& schema) const {
@@ -242,19 +266,19 @@ class Run {
     /// Has the request answered once its path has all keys. The path is printed: a script can give
     /// it in full the next time, and a person sees what was asked.
     OperationResult completed(ProviderHost& host, OperationRequest& request) {
-        OperationResult names = host.ask(namesRequest(request.path));
+        OperationResult names = host.askAnyone(namesRequest(request.path));
         if (names.rc != CMPI_RC_OK) return names;
         request.path = completedPath(request.path, names.paths);
         err_ << messageLines("completed the path: " +
                              base::escapeForTerminal(toString(request.path)));
-        return host.run(request);
+        return host.ask(request);
     }
 
     ExitStatus drawHost(const Schema& schema, const SchemaCatalogue& catalogue) {
         const std::string nameSpace = parseNamespace(commandLine_.nameSpace);
         std::vector<TreeNode> roots;
         const std::string failure = withHost(catalogue, [&](ProviderHost& host) -> std::string {
-            const Ask ask = [&host](const OperationRequest& request) { return host.ask(request); };
+            const Ask ask = [&host](const OperationRequest& each) { return host.askAnyone(each); };
             try {
                 roots = hostTree(ask, nameSpace, schema);
             } catch (const TreeFailure& error) {
@@ -303,10 +327,18 @@ class Run {
         std::optional<ScopedLogConfiguration> log;
         const std::string configuration = logConfiguration();
         if (!configuration.empty()) log.emplace(configuration);
-        const std::string provider = providerFile(commandLine_, programFolder_);
-        ProviderHost host({provider, providerName(provider)}, catalogue, computerSystems());
+        HostSetup setup;
+        setup.registrations = readRegistrations(commandLine_, programFolder_);
+        setup.libraryFolders = libraryFolders(programFolder_);
+        setup.library = soleLibrary(commandLine_, setup.libraryFolders);
+        setup.miName = commandLine_.bare ? "OperatingSystemProvider" : commandLine_.miName;
+        ProviderHost host(std::move(setup), catalogue);
         stopwatch_.lap(&Stopwatch::load);
         auto result = work(host);
+        for (const std::string& error : host.takeLoadErrors()) {
+            failed(base::escapeForTerminal(error), exitNotLoaded);
+            notLoaded_ = true;
+        }
         for (const std::string& violation : host.unload()) {
             err_ << "caught: " << base::escapeForTerminal(violation) << '\n';
             caught_ = true;
@@ -320,20 +352,14 @@ class Run {
         return std::getenv("ZBLOG_CONF") == nullptr ? failures_.configuration() : std::string();
     }
 
-    ComputerSystemSource computerSystems() const {
-        if (commandLine_.computerSystems) return {{}, *commandLine_.computerSystems};
-        const std::string companion = commandLine_.companion.empty()
-                                          ? findLibrary(Library::Companion, programFolder_).string()
-                                          : loaderPath(commandLine_.companion);
-        return {companion};
-    }
-
     const CommandLine& commandLine_;
     const fs::path& programFolder_;
     std::ostream& out_;
     std::ostream& err_;
     Stopwatch stopwatch_;
     const FailureRecords failures_;
+    /// Whether a library that a provider needed did not load, and whether anything was caught.
+    bool notLoaded_ = false;
     bool caught_ = false;
 };
 

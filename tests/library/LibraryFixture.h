@@ -9,8 +9,8 @@
 #include <string>
 #include <vector>
 
-#include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
+#include "support/ComputerSystemService.h"
 #include "support/RecordingLog.h"
 #include "support/Requests.h"
 #include "support/SimulatedHost.h"

@@ -22,8 +22,8 @@
 #include <utility>
 
 #include "framework/instrumentation/HostSource.h"
-#include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
+#include "support/ComputerSystemService.h"
 #include "support/FixtureTree.h"
 #include "support/Requests.h"
 #include "support/SimulatedHost.h"

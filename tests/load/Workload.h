@@ -5,8 +5,8 @@
 #include <random>
 #include <vector>
 
-#include "host/broker/ComputerSystemService.h"
 #include "host/broker/ProviderLibrary.h"
+#include "support/ComputerSystemService.h"
 #include "support/Requests.h"
 
 namespace load {

@@ -7,10 +7,10 @@
 #include <fstream>
 #include <iterator>
 
-#include "host/broker/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
 #include "host/broker/ProviderLibrary.h"
 #include "host/mof/Schema.h"
+#include "support/ComputerSystemService.h"
 #include "support/TemporaryDirectory.h"
 
 namespace {

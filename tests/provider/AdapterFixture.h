@@ -5,9 +5,9 @@
 #include <utility>
 #include <vector>
 
-#include "host/broker/ComputerSystemService.h"
 #include "host/broker/RequestScope.h"
 #include "provider/SimulatedFixture.h"
+#include "support/ComputerSystemService.h"
 
 template <class Adapter>
 bool stands(Adapter& adapter) {

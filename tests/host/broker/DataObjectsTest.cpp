@@ -1,7 +1,7 @@
 // The objects that only carry data, as a provider sees them through their tables.
 #include "BrokerFixture.h"
 
-#include "host/broker/ComputerSystemService.h"
+#include "support/ComputerSystemService.h"
 
 #include <ctime>
 

@@ -4,8 +4,8 @@
 
 #include "BrokerFixture.h"
 
-#include "host/broker/ComputerSystemService.h"
 #include "host/broker/ResultCollector.h"
+#include "support/ComputerSystemService.h"
 
 #include <algorithm>
 #include <atomic>

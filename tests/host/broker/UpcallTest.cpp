@@ -1,8 +1,8 @@
 // What a provider gets that asks for objects of other classes.
 #include "BrokerFixture.h"
 
-#include "host/broker/ComputerSystemService.h"
 #include "host/broker/ProviderLibrary.h"
+#include "support/ComputerSystemService.h"
 
 #include <new>
 #include <utility>

@@ -1,5 +1,5 @@
 // Stands for the provider that owns the computer systems in an object manager, and fails on demand.
-#include "host/broker/ComputerSystemService.h"
+#include "support/ComputerSystemService.h"
 
 namespace cmpihost {
 
