@@ -238,15 +238,6 @@ void CommandLineParser::addHostOptions() {
             "(calls with parameters, too) or 4000 (everything, the default); CHANNEL:\n"
             "log, trace or cmpi; without it log and cmpi")
         ->option_text("[=LEVEL[,CHANNEL]]");
-    CLI::Option* systems = app_.add_option("--computer-systems", result_.computerSystems,
-                                           "Answer for so many computer systems without that "
-                                           "library, 0 to 1000, to see\n"
-                                           "what then happens");
-    systems->check(CLI::Range(0, 1000))
-        ->excludes(app_.get_option("--companion"))
-        ->type_name("N")
-        ->group("");
-    app_.get_option("--companion")->group("");
     app_.get_option("--bare")->excludes("--provider")->option_text(" ");
     app_.get_option("--name")->needs("--provider")->option_text("NAME");
 }

@@ -58,10 +58,6 @@ struct CommandLine {
     std::optional<LogRequest> log;
     /// Tell how long loading, the request and the output took.
     bool time = false;
-    /// The library that serves the computer system; empty: the one beside this program, if any.
-    std::string companion;
-    /// How many computer systems the host is to serve itself, in place of that library.
-    std::optional<unsigned> computerSystems;
 
     Command command = Command::Operation;
     Operation operation = Operation::EnumerateInstances;

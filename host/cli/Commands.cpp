@@ -88,9 +88,6 @@ const std::vector<OptionRow>& optionRows() {
          "Print the values of this property only, one a line"},
         {"--time", nullptr, &CommandLine::time,
          "Tell on the standard error how long loading, request and output took"},
-        {"--companion", "FILE", &CommandLine::companion,
-         "Library that serves the computer system; without it the one beside this\n"
-         "program, else this program itself"},
     };
     return rows;
 }

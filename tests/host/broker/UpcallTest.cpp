@@ -60,12 +60,85 @@ TEST_F(Upcalls, NullArgumentsAreViolations) {
 TEST_F(Upcalls, ServicesThatTheHostDoesNotHaveSaySo) {
     EXPECT_EQ(CBDeliverIndication(mb, context, "root", newInstance()).rc,
               CMPI_RC_ERR_NOT_SUPPORTED);
-    EXPECT_EQ(CBSetProperty(mb, context, newPath(), "A", "x", CMPI_chars).rc,
-              CMPI_RC_ERR_NOT_SUPPORTED);
-    EXPECT_EQ(CBGetProperty(mb, context, newPath(), "A", &status).state, CMPI_notFound);
-    EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
-    CBInvokeMethod(mb, context, newPath(), "Run", nullptr, nullptr, &status);
-    EXPECT_EQ(status.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+}
+
+/// Answers with a value and two arguments, and keeps what it was asked.
+class MethodService final : public UpcallService {
+  public:
+    OperationRequest asked;
+    UpcallAnswer answer;
+
+    UpcallAnswer perform(Broker&, const OperationRequest& request) override {
+        asked = request;
+        return answer;
+    }
+};
+
+TEST_F(Upcalls, AMethodGetsItsArgumentsAndGivesItsOwnAndAValue) {
+    MethodService service;
+    service.answer.value = Value::fromUnsigned(7, CMPI_uint32);
+    service.answer.arguments = {{"Text", "out"}, {"Count", Value::fromUnsigned(2, CMPI_uint16)}};
+    broker.routeOthers(service);
+    CMPIArgs* const in = CMNewArgs(mb, nullptr);
+    CMPIArgs* const out = CMNewArgs(mb, nullptr);
+    CMAddArg(in, "Text", "in", CMPI_chars);
+    CMAddArg(out, "text", "before", CMPI_chars);
+    EXPECT_EQ(shown(CBInvokeMethod(mb, context, newPath(), "Run", in, out, &status)), "uint32 7");
+    EXPECT_EQ(status.rc, CMPI_RC_OK);
+    EXPECT_STREQ(operationName(service.asked.operation), "InvokeMethod");
+    EXPECT_EQ(service.asked.method, "Run");
+    ASSERT_EQ(service.asked.arguments.size(), 1U);
+    EXPECT_EQ(service.asked.arguments[0].value, Value("in"));
+    EXPECT_EQ(shown(CMGetArg(out, "Text", nullptr)), "string out");
+    EXPECT_EQ(shown(CMGetArg(out, "Count", nullptr)), "uint16 2");
+
+    service.answer = {};
+    EXPECT_EQ(shown(CBInvokeMethod(mb, context, newPath(), "Run", nullptr, nullptr, &status)),
+              "null null");
+    service.answer.rc = CMPI_RC_ERR_METHOD_NOT_FOUND;
+    EXPECT_EQ(shown(CBInvokeMethod(mb, context, newPath(), "Run", in, out, &status)), "bad");
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_METHOD_NOT_FOUND);
+    EXPECT_THAT(broker.violations(), IsEmpty());
+    CBInvokeMethod(mb, context, newPath(), nullptr, in, out, &status);
+    EXPECT_THAT(broker.violations(), ElementsAre("CMPIBrokerFT.invokeMethod: null method"));
+}
+
+TEST_F(Upcalls, APropertyIsSetAndGot) {
+    MethodService service;
+    broker.route("TEST_Thing", service);
+    EXPECT_EQ(CBSetProperty(mb, context, newPath(), "A", "x", CMPI_chars).rc, CMPI_RC_OK);
+    EXPECT_STREQ(operationName(service.asked.operation), "SetProperty");
+    EXPECT_EQ(service.asked.property, "A");
+    EXPECT_EQ(service.asked.value, Value("x"));
+    // Success without a value: there is no such property.
+    EXPECT_EQ(shown(CBGetProperty(mb, context, newPath(), "B", &status)), "missing");
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    EXPECT_STREQ(operationName(service.asked.operation), "GetProperty");
+    service.answer.value = Value("y");
+    EXPECT_EQ(shown(CBGetProperty(mb, context, newPath(), "B", &status)), "string y");
+    EXPECT_EQ(status.rc, CMPI_RC_OK);
+    service.answer.rc = CMPI_RC_ERR_ACCESS_DENIED;
+    EXPECT_EQ(CBSetProperty(mb, context, newPath(), "A", nullptr, CMPI_string).rc,
+              CMPI_RC_ERR_ACCESS_DENIED);
+    EXPECT_EQ(service.asked.value, Value::null(CMPI_string));
+    EXPECT_EQ(shown(CBGetProperty(mb, context, newPath(), "B", &status)), "bad");
+    EXPECT_EQ(status.rc, CMPI_RC_ERR_ACCESS_DENIED);
+}
+
+TEST_F(Upcalls, WhatProvidersLogAndTraceReachesTheListener) {
+    EXPECT_EQ(CMLogMessage(mb, CMPI_SEV_ERROR, "ID1", "unheard", nullptr).rc, CMPI_RC_OK);
+    std::vector<std::string> heard;
+    broker.setMessageSink([&](const ProviderMessage& message) {
+        heard.push_back((message.trace ? "trace " : "log ") + std::to_string(message.level) + ' ' +
+                        message.source + ": " + message.text);
+    });
+    CMPIString* const text = CMNewString(mb, "a string", nullptr);
+    EXPECT_EQ(CMLogMessage(mb, CMPI_SEV_ERROR, "ID1", "a text", text).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMLogMessage(mb, CMPI_SEV_INFO, nullptr, nullptr, text).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMTraceMessage(mb, CMPI_LEV_VERBOSE, "part", "a text", nullptr).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMTraceMessage(mb, CMPI_LEV_INFO, "part", nullptr, nullptr).rc, CMPI_RC_OK);
+    EXPECT_THAT(heard, ElementsAre("log 1 ID1: a text", "log 2 : a string", "trace 3 part: a text",
+                                   "trace 1 part: "));
 }
 
 class ComputerSystems : public Upcalls {

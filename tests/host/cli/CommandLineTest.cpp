@@ -34,7 +34,7 @@ TEST(CommandLine, KnowsEveryOperation) {
         EXPECT_EQ(line.operation, row.operation) << row.word;
         EXPECT_EQ(line.path, "ns:Class");
         EXPECT_FALSE(line.properties.has_value());
-        EXPECT_EQ(line.provider + line.miName + line.companion, "");
+        EXPECT_EQ(line.provider + line.miName, "");
         EXPECT_TRUE(line.schemas.empty() && line.registrations.empty());
         EXPECT_EQ(line.format, Format::Table);
         EXPECT_EQ(line.command, Command::Operation);
@@ -162,9 +162,9 @@ TEST(CommandLine, RefusesWhatItDoesNotKnow) {
         {{"--colour", "ei", "X"}, "ei has no option '--colour'"},
         {{"--vlaue", "Name"}, "there is no option '--vlaue'; did you mean --value?"},
         {{"--provider", "p.so", "--bare", "ei", "X"}, "--provider excludes --bare"},
+        {{"--companion", "tree"}, "The following argument was not expected: --companion"},
     };
     for (const auto& row : rows) EXPECT_EQ(refusal(row.words), row.complaint);
-    for (const char* number : {"-1", "1001", "x"}) refusal({"--computer-systems", number, "tree"});
 }
 
 TEST(CommandLine, RefusesAnEmptyValueHoweverItIsWritten) {
@@ -186,8 +186,7 @@ TEST(CommandLine, RefusesAnEmptyValueHoweverItIsWritten) {
         }
     }
     EXPECT_EQ(refusal({"xq", ""}), "QUERY: the value is empty");
-    for (const char* option : {"--format=", "--computer-systems=", "--log="})
-        refusal({option, "ei", "X"});
+    for (const char* option : {"--format=", "--log="}) refusal({option, "ei", "X"});
 }
 
 TEST(CommandLine, TakesAnEmptyListOfPropertiesBehindASignOfEquality) {
@@ -196,12 +195,6 @@ TEST(CommandLine, TakesAnEmptyListOfPropertiesBehindASignOfEquality) {
     EXPECT_TRUE(line.log);
     EXPECT_THAT(*accepted({"gi", "X", "--properties=", "A"}).properties, ElementsAre("A"));
     EXPECT_THAT(*accepted({"gi", "X", "--properties=A="}).properties, ElementsAre("A="));
-}
-
-TEST(CommandLine, TakesANumberOfComputerSystemsFromNoneToAThousand) {
-    EXPECT_EQ(accepted({"--computer-systems", "0", "tree"}).computerSystems, 0U);
-    EXPECT_EQ(accepted({"tree", "--computer-systems", "1000"}).computerSystems, 1000U);
-    EXPECT_EQ(accepted({"tree"}).computerSystems, std::nullopt);
 }
 
 TEST(CommandLine, DescribesEverythingInItsHelp) {

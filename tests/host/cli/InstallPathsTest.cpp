@@ -2,6 +2,7 @@
 
 #include <gmock/gmock.h>
 
+#include "host/broker/LibraryFile.h"
 #include "support/TemporaryDirectory.h"
 
 namespace {
@@ -17,66 +18,52 @@ class InstallPaths : public testing::Test {
         }
     }
     void touch(const char* file) { directory_.write(file, ""); }
-    fs::path found() { return findLibrary(Library::Provider, prefix_ / "bin"); }
+    fs::path found(const fs::path& installed = installedProviderFolder()) {
+        return findLibrary("thing", libraryFolders(prefix_ / "bin", installed));
+    }
 
     const TemporaryDirectory directory_;
     const fs::path prefix_ = directory_.path();
 };
 
-TEST_F(InstallPaths, LookForTheSchemaBesideTheProgramsFolder) {
+TEST_F(InstallPaths, LookForSchemaAndRegistrationsBesideTheProgramsFolder) {
     EXPECT_EQ(schemaFolder("/opt/x/bin"), "/opt/x/share/korva-osstatus/schema");
+    EXPECT_EQ(registrationFolder("/opt/x/bin"), "/opt/x/share/korva-osstatus/registration");
 }
 
 TEST_F(InstallPaths, PreferTheLibraryFolderThenTheProgramsThenTheObjectManagers) {
-    EXPECT_EQ(found(), "");
-    touch("lib64/cmpi/libkorzbosstatusprofileprovider.so");
-    EXPECT_EQ(found(), prefix_ / "lib64/cmpi/libkorzbosstatusprofileprovider.so");
-    touch("lib/cmpi/libkorzbosstatusprofileprovider.so");
-    EXPECT_EQ(found(), prefix_ / "lib/cmpi/libkorzbosstatusprofileprovider.so");
-    touch("bin/libkorzbosstatusprofileprovider.so.1");
-    EXPECT_EQ(found(), prefix_ / "bin/libkorzbosstatusprofileprovider.so.1");
-    touch("lib/libkorzbosstatusprofileprovider.so.1");
-    EXPECT_EQ(found(), prefix_ / "lib/libkorzbosstatusprofileprovider.so.1");
+    EXPECT_EQ(found(), "libthing.so");
+    for (const char* file :
+         {"lib64/cmpi/libthing.so.1", "lib64/cmpi/libthing.so", "lib/cmpi/libthing.so",
+          "bin/libthing.so.1", "lib/libthing.so.1", "lib/libthing.so"}) {
+        touch(file);
+        EXPECT_EQ(found(), prefix_ / file);
+    }
 }
 
 TEST_F(InstallPaths, KnowTheFolderThatTheProvidersAreInstalledIn) {
     fs::create_directories(prefix_ / "agents");
-    touch("lib/cmpi/libkorzbosstatusprofileprovider.so");
-    touch("lib/cmpi/libkorvacomputersystemprovider.so");
-    EXPECT_EQ(findLibrary(Library::Provider, prefix_ / "bin", "agents"),
-              prefix_ / "lib/cmpi/libkorzbosstatusprofileprovider.so");
-    touch("agents/libkorzbosstatusprofileprovider.so");
-    touch("agents/libkorvacomputersystemprovider.so");
-    for (const fs::path& installed : {fs::path("agents"), prefix_ / "agents"}) {
-        EXPECT_EQ(findLibrary(Library::Provider, prefix_ / "bin", installed),
-                  prefix_ / "agents/libkorzbosstatusprofileprovider.so");
-        EXPECT_EQ(findLibrary(Library::Companion, prefix_ / "bin", installed),
-                  prefix_ / "agents/libkorvacomputersystemprovider.so");
-    }
+    touch("lib/cmpi/libthing.so");
+    EXPECT_EQ(found("agents"), prefix_ / "lib/cmpi/libthing.so");
+    touch("agents/libthing.so");
+    for (const fs::path& installed : {fs::path("agents"), prefix_ / "agents"})
+        EXPECT_EQ(found(installed), prefix_ / "agents/libthing.so");
     EXPECT_EQ(installedProviderFolder(), KORVA_CMPI_FOLDER);
 }
 
-TEST_F(InstallPaths, HoldTheFacadeBesideTheProvider) {
-    touch("lib/libkorzbosstatusprofileprovider.so.1");
-    EXPECT_EQ(findLibrary(Library::Facade, prefix_ / "bin"), "");
-    touch("lib/libkorvaosstatusfacade.so.1");
-    EXPECT_EQ(findLibrary(Library::Facade, prefix_ / "bin"),
-              prefix_ / "lib/libkorvaosstatusfacade.so.1");
-}
-
-TEST_F(InstallPaths, TellTheNameOfAProviderByTheFileOfItsLibrary) {
-    for (const char* file : {"libkorvaosstatusfacade.so", "/x/libkorvaosstatusfacade.so.1"}) {
-        EXPECT_EQ(providerName(file), "OSStatusFacade") << file;
-    }
-    for (const char* file :
-         {"libkorzbosstatusprofileprovider.so.1", "/libkorvaosstatusfacade.so/other.so", "x.so"}) {
-        EXPECT_EQ(providerName(file), "OperatingSystemProvider") << file;
-    }
+TEST_F(InstallPaths, KnowTheFoldersOfTheSystem) {
+    const std::vector<fs::path> folders = libraryFolders("/opt/x/bin");
+    for (const char* folder : {"/usr/lib/cmpi", "/usr/lib64/cmpi", "/usr/local/lib/cmpi"})
+        EXPECT_THAT(folders, testing::Contains(fs::path(folder)));
 }
 
 TEST_F(InstallPaths, DoNotTakeAFolderForALibrary) {
-    fs::create_directories(prefix_ / "lib/libkorzbosstatusprofileprovider.so.1");
-    EXPECT_EQ(found(), "");
+    fs::create_directories(prefix_ / "lib/libthing.so");
+    EXPECT_EQ(found(), "libthing.so");
+}
+
+TEST_F(InstallPaths, TakeALocationThatIsAPathAsItStands) {
+    EXPECT_EQ(findLibrary("/a/b.so", {prefix_}), "/a/b.so");
 }
 
 TEST_F(InstallPaths, KnowTheFolderOfTheRunningProgram) {

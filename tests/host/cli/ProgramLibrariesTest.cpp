@@ -39,7 +39,7 @@ std::uintmax_t mappedSize(const fs::path& library) {
 class LibraryFile : public testing::Test {
   protected:
     static ProgramRun load(const std::string& library) {
-        return cmpihost({"--provider", library, "ei", "X"});
+        return cmpihost({"--provider", library, "--name", "OSStatusFacade", "ei", "X"});
     }
 
     const TemporaryDirectory directory_;
@@ -53,10 +53,6 @@ TEST_F(LibraryFile, ThatIsANamedPipeExitsWithThree) {
         "cmpihost: " + (folder_ / "pipe\\x1b[31m: not a regular file\n").string();
     EXPECT_EQ(load(pipe).status, 3);
     EXPECT_EQ(load(pipe).err, complaint);
-    const ProgramRun companion =
-        cmpihost({"--provider", KORVA_STAND_IN, "--companion", pipe, "ei", "X"});
-    EXPECT_EQ(companion.status, 3);
-    EXPECT_EQ(companion.err, complaint);
 }
 
 TEST_F(LibraryFile, ThatIsCutOffExitsWithThree) {
@@ -76,8 +72,8 @@ TEST_F(LibraryFile, ThatIsCutOffExitsWithThree) {
 
 TEST_F(LibraryFile, NamedLikeASchemaFileButAPipeExitsWithTwo) {
     ASSERT_EQ(mkfifo((folder_ / "x.mof").c_str(), 0600), 0);
-    const ProgramRun run =
-        cmpihost({"--provider", KORVA_STAND_IN, "--schema", folder_.string(), "ei", "X"});
+    const ProgramRun run = cmpihost(
+        {"--provider", KORVA_STAND_IN, "--name", "N", "--schema", folder_.string(), "ei", "X"});
     EXPECT_EQ(run.status, 2);
     EXPECT_EQ(run.err, "cmpihost: the schema file " + (folder_ / "x.mof").string() +
                            " is not a regular file\n");
@@ -85,9 +81,9 @@ TEST_F(LibraryFile, NamedLikeASchemaFileButAPipeExitsWithTwo) {
 
 TEST_F(LibraryFile, WithoutFolderIsTakenFromTheCurrentOne) {
     fs::copy_file(KORVA_STAND_IN, folder_ / "standin.so");
-    const ProgramRun run =
-        runProgram("/usr/bin/env", {"-C", folder_.string(), KORVA_CMPIHOST, "--provider",
-                                    "standin.so", "ein", "KORVA_OperatingSystem"});
+    const ProgramRun run = runProgram(
+        "/usr/bin/env", {"-C", folder_.string(), KORVA_CMPIHOST, "--provider", "standin.so",
+                         "--name", "OSStatusFacade", "ein", "KORVA_OperatingSystem"});
     EXPECT_EQ(run.status, 0) << run.err;
     EXPECT_THAT(run.out, HasSubstr(moonName));
 }
@@ -101,35 +97,45 @@ class ProgramElsewhere : public LibraryFile {
             fs::create_directories(folder_ / folder);
         }
         fs::copy_file(KORVA_CMPIHOST, folder_ / "bin/cmpihost");
-        fs::copy(KORVA_SOURCE_DIR "/schema", folder_ / "share/korva-osstatus/schema");
+        fs::copy(KORVA_SOURCE_DIR "/schema", share_ / "schema");
+        fs::copy(KORVA_SOURCE_DIR "/schema/registration", share_ / "registration");
     }
     ProgramRun installed(const Words& arguments) const {
         return runProgram((folder_ / "bin/cmpihost").string(), arguments);
     }
     void install(const char* name) const { fs::copy_file(KORVA_STAND_IN, folder_ / "lib" / name); }
+
+    const fs::path share_ = folder_ / "share/korva-osstatus";
 };
 
 TEST_F(ProgramElsewhere, WithoutItsLibraryExitsWithThreeAndTellsThePlaces) {
-    const struct {
-        Words arguments;
-        const char* complaint;
-        const char* place;
-        const char* hint;
-    } rows[] = {{{"ei", "X"},
-                 "cmpihost: no library of the facade was found; looked for\n",
-                 "lib/libkorvaosstatusfacade.so.1\n",
-                 "\ncmpihost: (--provider FILE names one)\n"},
-                {{"--bare", "ei", "X"},
-                 "cmpihost: no library of the provider was found; looked for\n",
-                 "lib/libkorzbosstatusprofileprovider.so.1\n",
-                 "\ncmpihost: (--provider FILE names one, without --bare)\n"}};
-    for (const auto& row : rows) {
-        const ProgramRun run = installed(row.arguments);
-        EXPECT_EQ(run.status, 3);
-        EXPECT_THAT(run.err,
-                    StartsWith(row.complaint + ("cmpihost:   " + (folder_ / row.place).string())));
-        EXPECT_THAT(run.err, EndsWith(row.hint));
-    }
+    const std::string places =
+        "; looked for in " + (folder_ / "lib").string() + ", " + (folder_ / "bin").string() + ", ";
+    const ProgramRun bare = installed({"--bare", "ei", "X"});
+    EXPECT_EQ(bare.status, 3);
+    EXPECT_THAT(bare.err,
+                StartsWith("cmpihost: libkorzbosstatusprofileprovider.so was not found" + places));
+    EXPECT_THAT(bare.err, EndsWith(" (--provider FILE names a library, without --bare)\n"));
+
+    const ProgramRun registered = installed({"ei", "KORVA_OperatingSystem"});
+    EXPECT_EQ(registered.status, 3);
+    EXPECT_THAT(registered.err,
+                StartsWith("cmpihost: " + (share_ / "registration/korva-osstatus.reg").string() +
+                           ":1: the provider of KORVA_OperatingSystem: libkorvaosstatusfacade.so: "
+                           "cannot open shared object file"));
+    EXPECT_THAT(registered.err, HasSubstr("; looked for in " + (share_ / "registration").string() +
+                                          ", " + (folder_ / "lib").string() + ", "));
+}
+
+TEST_F(ProgramElsewhere, WithoutRegistrationsNeedsToBeToldTheLibrary) {
+    fs::remove_all(share_ / "registration");
+    const ProgramRun run = installed({"ei", "KORVA_OperatingSystem"});
+    EXPECT_EQ(run.status, 3);
+    EXPECT_EQ(run.err, "cmpihost: there are no registrations in " +
+                           (share_ / "registration").string() +
+                           " (--registration PATH names others, --provider FILE a library)\n");
+    install("libkorzbosstatusprofileprovider.so.1");
+    EXPECT_THAT(installed({"--bare", "ein", "KORVA_OperatingSystem"}).out, HasSubstr(moonName));
 }
 
 TEST_F(ProgramElsewhere, LoadsTheFacadeBesideItselfOrTheProviderWhenItIsToAskThat) {
@@ -144,16 +150,17 @@ TEST_F(ProgramElsewhere, LoadsTheFacadeBesideItselfOrTheProviderWhenItIsToAskTha
     EXPECT_EQ(installed(facade).status, 3);
 }
 
-TEST_F(ProgramElsewhere, ServesComputerSystemsItselfWithoutACompanion) {
-    install("libkorvaosstatusfacade.so.1");
-    const std::string start =
-        "root/cimv2:KORVA_ComputerSystem.CreationClassName=\"KORVA_ComputerSystem\",Name=\"" +
-        nodeName();
-    const std::string first = start + "\"\n";
-    EXPECT_EQ(installed({"ein", "KORVA_ComputerSystem"}).out, first);
-    EXPECT_EQ(installed({"--computer-systems", "0", "ein", "KORVA_ComputerSystem"}).out, "");
-    EXPECT_EQ(installed({"--computer-systems", "3", "ein", "KORVA_ComputerSystem"}).out,
-              first + start + "-2\"\n" + start + "-3\"\n");
+/// Asks the provider that is installed for what another one serves.
+TEST_F(ProgramElsewhere, ThatLacksALibraryForAnUpcallExitsWithThree) {
+    install("libkorzbosstatusprofileprovider.so.1");
+    const ProgramRun run = installed({"--bare", "ein", "KORVA_ComputerSystem"});
+    EXPECT_EQ(run.status, 3);
+    EXPECT_EQ(run.out, "");
+    EXPECT_THAT(run.err, StartsWith("cmpihost: an up-call for KORVA_ComputerSystem: "));
+    EXPECT_THAT(run.err, HasSubstr("korva-osstatus-companion.reg:1: the provider of "
+                                   "KORVA_ComputerSystem: libkorvacomputersystemprovider.so: "));
+    install("libkorvacomputersystemprovider.so.1");
+    EXPECT_EQ(installed({"--bare", "ein", "KORVA_OperatingSystem"}).status, 0);
 }
 
 }  // namespace
