@@ -162,7 +162,7 @@ TEST(CommandLine, RefusesWhatItDoesNotKnow) {
         {{"--colour", "ei", "X"}, "ei has no option '--colour'"},
         {{"--vlaue", "Name"}, "there is no option '--vlaue'; did you mean --value?"},
         {{"--provider", "p.so", "--bare", "ei", "X"}, "--provider excludes --bare"},
-        {{"--companion", "tree"}, "The following argument was not expected: --companion"},
+        {{"--companion", "tree"}, "tree has no option '--companion'"},
     };
     for (const auto& row : rows) EXPECT_EQ(refusal(row.words), row.complaint);
 }
