@@ -4,7 +4,7 @@
 
 #include "faults/CountUp.h"
 #include "host/broker/Broker.h"
-#include "host/broker/ComputerSystemService.h"
+#include "support/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
 #include "host/broker/ProviderLibrary.h"
 
