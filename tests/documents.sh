@@ -1,9 +1,9 @@
 #!/bin/sh
-# Checks the documents: documents.sh [PRESET]...
+# Checks the documents: documents.sh [NEED]...
 # Counts the words of those for users, follows the links of all, and runs every command that they show in a
-# block marked "sh", from the root folder: each works once ./run has built its part. A block marked "sh PRESET"
-# needs all of that preset's build, and is run if the preset is named here. The first thing that is wrong ends
-# the run and is named.
+# block marked "sh", from the root folder: each works once ./run has built its part. A block marked "sh NEED"
+# also needs the whole build of that preset, or that command, and is run if the need is named here. The first
+# thing that is wrong ends the run and is named.
 set -eu
 cd "$(dirname "$0")/.."
 
@@ -21,13 +21,13 @@ script=$(mktemp)
 trap 'rm -f "$script" "$script.errors"' EXIT
 for document in ./*.md docs/*.md docs/dev/*.md; do
     # A document's blocks are one script: a later one may use what an earlier one made.
-    awk -v presets=" $* " -v document="$document" '
+    awk -v needs=" $* " -v document="$document" '
         /^ *```/ && inside { inside = run = 0; next }
         /^ *```/ {
             inside = 1
             if ($1 != "```sh") next
-            run = NF == 1 || index(presets, " " $2 " ")
-            if (!run) print "left out, needs the build of " $2 ": " document ":" NR >"/dev/stderr"
+            run = NF == 1 || index(needs, " " $2 " ")
+            if (!run) print "left out, needs " $2 ": " document ":" NR >"/dev/stderr"
             next
         }
         run' "$document" >"$script"
