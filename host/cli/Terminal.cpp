@@ -38,7 +38,7 @@ constexpr WidthRange unusualWidths[] = {
     {0x1F300, 0x1F64F, 2}, {0x1F680, 0x1F6FF, 2}, {0x1F900, 0x1F9FF, 2}, {0x20000, 0x3FFFD, 2},
 };
 
-std::size_t columnsOf(char32_t codePoint) {
+std::size_t columnsOfCharacter(char32_t codePoint) {
     for (const WidthRange& range : unusualWidths) {
         if (codePoint < range.low) break;
         if (codePoint <= range.high) return range.columns;
@@ -98,7 +98,7 @@ Terminal terminalOf(int descriptor) {
 
 std::size_t columnsOf(std::string_view text) {
     std::size_t columns = 0;
-    while (!text.empty()) columns += columnsOf(base::takeUtf8(text).codePoint);
+    while (!text.empty()) columns += columnsOfCharacter(base::takeUtf8(text).codePoint);
     return columns;
 }
 

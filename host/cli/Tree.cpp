@@ -135,8 +135,8 @@ struct Lines {
     const char* belowLast;
 };
 
-constexpr Lines drawn = {"├── ", "└── ", "│   ", "    "};
-constexpr Lines typed = {"|-- ", "`-- ", "|   ", "    "};
+constexpr Lines drawnLines = {"├── ", "└── ", "│   ", "    "};
+constexpr Lines typedLines = {"|-- ", "`-- ", "|   ", "    "};
 
 /// A text on the lines that the terminal has room for beside the margin: all but the first begin
 /// with the margin and what leads to the branches below.
@@ -155,7 +155,7 @@ std::string wrapped(const std::string& text, const std::string& margin, const ch
 
 void drawBranches(const TreeNode& node, const std::string& margin, std::ostream& stream,
                   const Terminal& terminal) {
-    const Lines& lines = terminal.utf8 ? drawn : typed;
+    const Lines& lines = terminal.utf8 ? drawnLines : typedLines;
     for (std::size_t index = 0; index < node.branches.size(); ++index) {
         const bool last = index + 1 == node.branches.size();
         const TreeNode& branch = node.branches[index];
