@@ -31,9 +31,10 @@ MountedFileSystemProvider_Create_InstanceMI" \
 ExampleAnswersFromWhereItIsInstalled() {
     build_example
     expect_success cmake --install "$work/build" --prefix "$tree"
-    expect_success "$tree/bin/cmpihost" --schema "$tree/share/mounted-filesystems" \
-        --registration "$tree/share/mounted-filesystems" --registration "$tree/share/korva-osstatus/registration" \
-        ein EXAMPLE_MountedFileSystem
+    own=$tree/share/mounted-filesystems
+    shipped=$tree/share/korva-osstatus
+    expect_success "$tree/bin/cmpihost" --schema "$own" --registration "$own" \
+        --schema "$shipped/schema" --registration "$shipped/registration" ein EXAMPLE_MountedFileSystem
     expect_text 'Name="/' "$output"
 }
 
