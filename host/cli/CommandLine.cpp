@@ -9,6 +9,7 @@
 #include "host/cli/Commands.h"
 #include "host/cli/Diagnostics.h"
 #include "host/cli/Suggestion.h"
+#include "host/cli/Terminal.h"
 
 namespace cmpihost {
 
@@ -106,12 +107,35 @@ std::vector<std::string> splitArguments(int argumentCount, const char* const* ar
     return result;
 }
 
-/// An optional value is part of the option's word, so no blank stands before it.
+/// Whether the operation is one that the operating system provider has.
+bool isShown(Operation operation) {
+    return operation == Operation::EnumerateInstances ||
+           operation == Operation::EnumerateInstanceNames || operation == Operation::GetInstance ||
+           isAssociationOperation(operation);
+}
+
+std::string commandFooter(const CommandRow& row) {
+    const std::string paths = row.path == nullptr ? "" : std::string(pathHelp) + "\n";
+    const bool refused = row.command == Command::Operation && !isShown(row.operation);
+    return paths + "Example" +
+           (refused ? ", which the operating system provider refuses (CIM_ERR_NOT_SUPPORTED)"
+                    : "") +
+           ":\n  cmpihost " + row.example +
+           "\n\nThe options that cmpihost --help tells can stand here, too.";
+}
+
+/// An optional value is part of the option's word, so no blank stands before it. The help fits a
+/// terminal of the usual width.
 class HelpFormatter : public CLI::Formatter {
   public:
     std::string make_option_opts(const CLI::Option* option) const override {
         const std::string text = CLI::Formatter::make_option_opts(option);
         return text.compare(0, 3, " [=") == 0 ? text.substr(1) : text;
+    }
+
+    std::string make_option_desc(const CLI::Option* option) const override {
+        constexpr std::size_t terminalWidth = 80;
+        return wrap(CLI::Formatter::make_option_desc(option), terminalWidth - get_column_width());
     }
 };
 
@@ -149,7 +173,8 @@ CommandLineParser::CommandLineParser() : app_(programHelp, "cmpihost") {
     // As wide as the longest option with its type, so that every help stands on the line of its
     // option.
     app_.formatter(std::make_shared<HelpFormatter>());
-    app_.get_formatter()->column_width(34);
+    app_.get_formatter()->column_width(28);
+    app_.get_formatter()->label("Positionals", "Arguments");
     app_.get_formatter()->label("SUBCOMMAND", "COMMAND ARGUMENT...");
     addHostOptions();
     for (const CommandRow& row : commandRows()) addCommand(row);
@@ -225,31 +250,29 @@ std::string CommandLineParser::name() const {
 
 void CommandLineParser::addHostOptions() {
     for (const OptionRow& row : optionRows()) addHostOption(row);
-    app_.add_option_function<std::string>(
-            "--format",
-            [this](const std::string& word) {
-                result_.format = meaningOf(word, formats, "--format");
-            },
-            "How results are printed: table (the default), mof or json")
-        ->type_name("FORMAT");
-    app_.add_option_function<std::string>(
-            "--log", [this](const std::string& text) { result_.log = parseLog(text); },
-            "Show what providers record on the standard error. LEVEL: failures, 3000\n"
-            "(calls with parameters, too) or 4000 (everything, the default); CHANNEL:\n"
-            "log, trace or cmpi; without it log and cmpi")
-        ->option_text("[=LEVEL[,CHANNEL]]");
     app_.get_option("--bare")->excludes("--provider")->option_text(" ");
     app_.get_option("--name")->needs("--provider")->option_text("NAME");
 }
 
 void CommandLineParser::addHostOption(const OptionRow& row) {
+    const auto addParsed = [&](auto parse) {
+        app_.add_option_function<std::string>(row.name, parse, row.help)
+            ->option_text(row.valueName);
+    };
     const auto add = [&](auto CommandLine::*field) {
-        using Field = std::decay_t<decltype(result_.*field)>;
+        auto& value = result_.*field;
+        using Field = std::decay_t<decltype(value)>;
         if constexpr (std::is_same_v<Field, bool>) {
-            app_.add_flag(row.name, result_.*field, row.help);
+            app_.add_flag(row.name, value, row.help);
+        } else if constexpr (std::is_same_v<Field, Format>) {
+            addParsed([&value, &row](const std::string& word) {
+                value = meaningOf(word, formats, row.name);
+            });
+        } else if constexpr (std::is_same_v<Field, std::optional<LogRequest>>) {
+            addParsed([&value](const std::string& text) { value = parseLog(text); });
         } else {
             // One value for each mention, also where several mentions add up.
-            addText(app_, row.name, row.valueName, result_.*field, row.help)
+            addText(app_, row.name, row.valueName, value, row.help)
                 ->allow_extra_args(false)
                 ->option_text(row.valueName);
         }
@@ -262,8 +285,7 @@ void CommandLineParser::addCommand(const CommandRow& row) {
     // Options of the program may stand behind the command, too.
     added.fallthrough();
     added.group(row.command == Command::Operation ? "Operations" : "Overviews");
-    added.footer(std::string(row.path == nullptr ? "" : pathHelp) + "\nExample:\n  cmpihost " +
-                 row.example);
+    added.footer(commandFooter(row));
     added.callback([this, &row] {
         result_.command = row.command;
         result_.operation = row.operation;

@@ -42,15 +42,15 @@ const std::vector<CommandRow>& commandRows() {
                   "mi 'KORVA_OperatingSystem.Name=\"Test\"' OSType=36"),
         operation("di", "Delete an instance", Operation::DeleteInstance, instancePath,
                   Takes::Nothing, Filters::None, "di 'KORVA_OperatingSystem.Name=\"Test\"'"),
-        operation("ai", "Get the instances that are associated with an instance",
-                  Operation::Associators, sourcePath, Takes::Properties, Filters::Associators,
+        operation("ai", "Get the instances associated with an instance", Operation::Associators,
+                  sourcePath, Takes::Properties, Filters::Associators,
                   "ai KORVA_OperatingSystem --assoc-class KORVA_RunningOS"),
         operation("ain", "Get the names of the associated instances", Operation::AssociatorNames,
                   sourcePath, Takes::Nothing, Filters::Associators, "ain KORVA_OperatingSystem"),
-        operation("ri", "Get the association instances that refer to an instance",
-                  Operation::References, sourcePath, Takes::Properties, Filters::References,
+        operation("ri", "Get the associations that refer to an instance", Operation::References,
+                  sourcePath, Takes::Properties, Filters::References,
                   "ri KORVA_OperatingSystem --result-class KORVA_RunningOS"),
-        operation("rin", "Get the names of those association instances", Operation::ReferenceNames,
+        operation("rin", "Get the names of those associations", Operation::ReferenceNames,
                   sourcePath, Takes::Nothing, Filters::References, "rin KORVA_OperatingSystem"),
         operation("im", "Invoke a method", Operation::InvokeMethod, objectPath, Takes::Method,
                   Filters::None, "im KORVA_OperatingSystem RequestStateChange RequestedState=2"),
@@ -61,9 +61,9 @@ const std::vector<CommandRow>& commandRows() {
         overview("classes", "List the classes of the schema", Command::Classes, Takes::Nothing,
                  "classes"),
         overview("describe", "Describe a class or one of its properties", Command::Describe,
-                 Takes::Subject, "describe KORVA_OperatingSystem.OSType"),
-        overview("namespaces", "List the namespaces that providers are registered for",
-                 Command::Namespaces, Takes::Nothing, "namespaces"),
+                 Takes::Subject, "describe KORVA_OperatingSystem.FreePhysicalMemory"),
+        overview("namespaces", "List the namespaces that have providers", Command::Namespaces,
+                 Takes::Nothing, "namespaces"),
     };
     return rows;
 }
@@ -71,21 +71,27 @@ const std::vector<CommandRow>& commandRows() {
 const std::vector<OptionRow>& optionRows() {
     static const std::vector<OptionRow> rows = {
         {"--provider", "FILE", &CommandLine::provider,
-         "Library of a provider, asked for every class; without it the provider\n"
-         "that is registered for the class"},
+         "Library of a provider, asked for every class; without it the provider that is registered "
+         "for the class"},
         {"--name", "NAME", &CommandLine::miName,
          "Name of the provider in that library; without it the one that it exports"},
         {"--registration", "PATH", &CommandLine::registrations,
-         "File or folder (*.reg) that says which provider serves which class, again\n"
-         "for more; without it the folder beside this program"},
+         "File, or folder of *.reg, that says which provider serves which class; can be given "
+         "again; without it the folder beside this program"},
         {"--schema", "PATH", &CommandLine::schemas,
-         "MOF file or folder of MOF files, again for more; without it the folder\n"
-         "beside this program"},
+         "MOF file or folder of MOF files; can be given again; without it the folder beside this "
+         "program"},
         {"--bare", nullptr, &CommandLine::bare,
-         "Ask the operating system provider without its facade, and complete no\n"
-         "path that lacks keys"},
+         "Ask the operating system provider without its facade, and complete no path that lacks "
+         "keys"},
+        {"--format", "FORMAT", &CommandLine::format,
+         "How results are printed: table (the default), mof or json"},
         {"--value", "PROPERTY", &CommandLine::value,
          "Print the values of this property only, one a line"},
+        {"--log", "[=LEVEL[,CHANNEL]]", &CommandLine::log,
+         "Show what providers record on the standard error. LEVEL: failures, 3000 (calls with "
+         "parameters, too) or 4000 (everything, the default). CHANNEL: log, trace or cmpi; without "
+         "it log and cmpi"},
         {"--time", nullptr, &CommandLine::time,
          "Tell on the standard error how long loading, request and output took"},
     };
@@ -106,29 +112,33 @@ const std::vector<FilterRow>& filterRows() {
 }
 
 const char* const programHelp =
-    "Embedded CIM host: loads CMPI provider libraries as an object manager does, runs one\n"
-    "operation on them and prints what they return.";
+    "Embedded CIM host: loads CMPI provider libraries as an object manager does,\n"
+    "runs one operation on them and prints what they return.";
 
 const char* const pathHelp =
     "Paths:\n"
     "  root/cimv2:KORVA_OperatingSystem\n"
     "  'KORVA_OperatingSystem.CSName=\"myhost\",Name=\"Debian GNU/Linux\"'\n"
-    "  The namespace is root/cimv2 when a path names none. In a text key, \\\" and \\\\ stand for\n"
-    "  \" and \\. Single quotes around the path keep the shell away from it.\n"
-    "  The path of an instance can lack keys when only one instance has those that it gives.\n";
+    "  The namespace is root/cimv2 when a path names none. In a text key, \\\" and\n"
+    "  \\\\ stand for \" and \\. Single quotes around the path keep the shell away\n"
+    "  from it. The path of an instance can lack keys when only one instance has\n"
+    "  those that it gives.\n";
 
 const char* const statusHelp =
     "\n"
     "Exit status:\n"
     "  0  done\n"
-    "  1  the provider answered a CIM status other than OK, named on the standard error, or the\n"
-    "     results cannot be written\n"
-    "  2  wrong usage, or a path that lacks keys and that none or several instances fit\n"
+    "  1  the provider answered a CIM status other than OK, named on the standard\n"
+    "     error, or the results cannot be written\n"
+    "  2  wrong usage, or a path that lacks keys and that none or several instances\n"
+    "     fit\n"
     "  3  a library or registration does not load\n"
-    "  4  gi found no instance: the provider returned none, or answered CIM_ERR_NOT_FOUND\n"
-    "  5  the host caught the provider at something, whatever else is true of 0, 1 and 4\n"
+    "  4  gi found no instance: the provider returned none, or answered\n"
+    "     CIM_ERR_NOT_FOUND\n"
+    "  5  the host caught the provider at something, in place of 0, 1 and 4\n"
     "\n"
-    "What the host catches the provider at (a null result, an undeclared property, an object used\n"
-    "after its request) is told on the standard error in lines that begin with 'caught:'.";
+    "What the host catches the provider at (a null result, an undeclared property,\n"
+    "an object used after its request) is told on the standard error in lines that\n"
+    "begin with 'caught:'.";
 
 }  // namespace cmpihost

@@ -29,14 +29,15 @@ struct CommandRow {
 };
 
 /// The field of the command line that an option sets.
-using OptionField = std::variant<bool CommandLine::*, std::string CommandLine::*,
-                                 std::optional<std::string> CommandLine::*,
-                                 std::vector<std::string> CommandLine::*>;
+using OptionField =
+    std::variant<bool CommandLine::*, std::string CommandLine::*,
+                 std::optional<std::string> CommandLine::*, std::vector<std::string> CommandLine::*,
+                 Format CommandLine::*, std::optional<LogRequest> CommandLine::*>;
 
-/// An option of the program that takes any text, or none.
+/// An option of the program.
 struct OptionRow {
     const char* name;
-    /// Null: the option takes no value.
+    /// As the help writes it behind the name; null: the option takes no value.
     const char* valueName;
     OptionField field;
     const char* help;

@@ -213,7 +213,7 @@ TEST(CommandLine, DescribesEverythingInItsHelp) {
                                 "xq", "tree", "classes", "describe", "namespaces"}) {
         EXPECT_THAT(result.text, HasSubstr("\n  " + std::string(command) + "   "));
         EXPECT_THAT(parsedLine({command, "--help"}).text,
-                    HasSubstr("\nExample:\n  cmpihost " + std::string(command)));
+                    testing::ContainsRegex("\nExample[^:]*:\n  cmpihost " + std::string(command)));
     }
 }
 
