@@ -34,7 +34,7 @@ for document in ./*.md docs/*.md docs/dev/*.md; do
     [ -s "$script" ] || continue
     echo "commands of $document"
     sh -eu "$script" >/dev/null 2>"$script.errors" || {
-        cat "$script.errors" "$script" >&2
+        tail -n 20 "$script.errors" | cat "$script" - >&2
         echo "a command of $document failed" >&2
         exit 1
     }
