@@ -24,6 +24,7 @@
 #include "host/cli/Explanation.h"
 #include "host/cli/InstallPaths.h"
 #include "host/cli/NameNotes.h"
+#include "host/cli/Namespaces.h"
 #include "host/cli/PathCompletion.h"
 #include "host/cli/PathParser.h"
 #include "host/cli/ProviderHost.h"
@@ -197,9 +198,10 @@ class Run {
                 return told(classSummaries(schema));
             case Command::Describe:
                 return told(describe(schema, commandLine_.subject));
-            default:
-                return failed("this command is not there yet", exitUsage);
+            case Command::Namespaces:
+                return told(namespaceSummaries(readRegistrations(commandLine_, programFolder_)));
         }
+        return failed("no such command", exitUsage);
     }
 
     /// Prints what is known without asking a provider.

@@ -297,6 +297,9 @@ TEST(Program, DescribesWhatTheSchemaDeclares) {
         {"describe", "Unknown"},
         {"--schema", other, "describe", "Disk.RequestStat"},
         {"describe"},
+        {"namespaces"},
+        {"--format", "json", "namespaces"},
+        {"--registration", "/missing.reg", "namespaces"},
     };
     expectGolden(KORVA_TEST_DATA "/cli/runs/Schema.txt",
                  replaced(transcript(runs, {"TZ=UTC0"}), KORVA_SOURCE_DIR, "SOURCE"));
