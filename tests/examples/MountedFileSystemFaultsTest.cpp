@@ -4,9 +4,9 @@
 
 #include "faults/CountUp.h"
 #include "host/broker/Broker.h"
-#include "support/ComputerSystemService.h"
 #include "host/broker/Invoke.h"
 #include "host/broker/ProviderLibrary.h"
+#include "support/ComputerSystemService.h"
 
 namespace {
 
