@@ -1,4 +1,4 @@
-# Builds the source package on a system that has nothing but what it says that it needs, and no network:
+# Builds the source packages on a system that has nothing but what it says that it needs, and no network:
 # twice, by users of different habits in different folders. Both must come to the same bytes.
 # shellcheck shell=sh
 # Functions are run by check.
@@ -7,11 +7,15 @@
 . "$(dirname "$0")/system.sh"
 : "${packages:?}" "${work:?}" "${root:?}" "${status:?}"
 
+# A system of 32 bit in a folder of one of 64 bit has the latter's name for rpmbuild.
+target=x86_64
+[ "$architecture" = amd64 ] || target=i686
+
 bring_source() {
     mkdir "$root/source"
-    cp "$packages"/korva-osstatus_*.dsc "$packages"/korva-osstatus_*.tar.xz "$root/source/"
-    inside sh -c 'apt-get -y --no-install-recommends install build-essential &&
-        apt-get -y --no-install-recommends build-dep /source/*.dsc'
+    cp "$packages"/korva-osstatus_*.dsc "$packages"/korva-osstatus_*.tar.xz "$packages"/*.src.rpm "$root/source/"
+    inside sh -c 'apt-get -y --no-install-recommends install build-essential rpm debugedit elfutils cpio file \
+        pkg-config && apt-get -y --no-install-recommends build-dep /source/*.dsc'
 }
 
 # build FOLDER UMASK VARIABLE=VALUE...
@@ -27,12 +31,14 @@ build() {
         cd "$0"
         umask "$1"
         dpkg-source -x /source/*.dsc tree
-        cd tree
-        dpkg-buildpackage -us -uc -b' "$folder" "$mask"
+        (cd tree && dpkg-buildpackage -us -uc -b)
+        rpmbuild --rebuild --nodeps --target "$2" --define "_topdir $0/rpm" --define "_buildhost localhost" \
+            /source/*.src.rpm
+        mv rpm/RPMS/*/*.rpm .' "$folder" "$mask" "$target"
 }
 
 gave_the_same() {
-    for folder in build/one srv/elsewhere/two; do (cd "$root/$folder" && sha256sum -- *.deb); done >"$work/sums"
+    for folder in build/one srv/elsewhere/two; do (cd "$root/$folder" && sha256sum -- *.deb *.rpm); done >"$work/sums"
     sort "$work/sums" | uniq -u >"$work/differing"
     cat "$work/sums"
     [ -s "$work/sums" ] && [ ! -s "$work/differing" ]
