@@ -107,7 +107,7 @@ std::vector<std::string> splitArguments(int argumentCount, const char* const* ar
     return result;
 }
 
-/// Whether the operation is one that the operating system provider has.
+/// Whether the operation is one that OperatingSystemProvider has.
 bool isShown(Operation operation) {
     return operation == Operation::EnumerateInstances ||
            operation == Operation::EnumerateInstanceNames || operation == Operation::GetInstance ||
@@ -118,8 +118,7 @@ std::string commandFooter(const CommandRow& row) {
     const std::string paths = row.path == nullptr ? "" : std::string(pathHelp) + "\n";
     const bool refused = row.command == Command::Operation && !isShown(row.operation);
     return paths + "Example" +
-           (refused ? ", which the operating system provider refuses (CIM_ERR_NOT_SUPPORTED)"
-                    : "") +
+           (refused ? ", which OperatingSystemProvider refuses (CIM_ERR_NOT_SUPPORTED)" : "") +
            ":\n  cmpihost " + row.example +
            "\n\nThe options that cmpihost --help tells can stand here, too.";
 }

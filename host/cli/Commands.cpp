@@ -82,8 +82,7 @@ const std::vector<OptionRow>& optionRows() {
          "MOF file or folder of MOF files; can be given again; without it the folder beside this "
          "program"},
         {"--bare", nullptr, &CommandLine::bare,
-         "Ask the operating system provider without its facade, and complete no path that lacks "
-         "keys"},
+         "Ask OperatingSystemProvider without its facade, and complete no path that lacks keys"},
         {"--format", "FORMAT", &CommandLine::format,
          "How results are printed: table (the default), mof or json"},
         {"--value", "PROPERTY", &CommandLine::value,
