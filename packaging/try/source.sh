@@ -23,7 +23,8 @@ build() {
     folder=$1
     mask=$2
     shift 2
-    # What stands there is for the shell in the system.
+    # What stands there is for the shell in the system. The build ids that debugedit gives follow from the length
+    # of the folder's name, whatever it is: rpmbuild works in one like that of build-packages.
     # shellcheck disable=SC2016
     unshare --net env -i PATH=/usr/sbin:/usr/bin:/sbin:/bin "$@" chroot "$root" sh -c '
         set -e
@@ -32,9 +33,10 @@ build() {
         umask "$1"
         dpkg-source -x /source/*.dsc tree
         (cd tree && dpkg-buildpackage -us -uc -b)
-        rpmbuild --rebuild --nodeps --target "$2" --define "_topdir $0/rpm" --define "_buildhost localhost" \
+        top=$(mktemp -d)
+        rpmbuild --rebuild --nodeps --target "$2" --define "_topdir $top" --define "_buildhost localhost" \
             /source/*.src.rpm
-        mv rpm/RPMS/*/*.rpm .' "$folder" "$mask" "$target"
+        mv "$top"/RPMS/*/*.rpm .' "$folder" "$mask" "$target"
 }
 
 gave_the_same() {
