@@ -17,7 +17,7 @@ bring_packages() {
         cp "$package" "$root/packages/"
         version=$(dpkg-deb -f "$package" Version)
         dpkg-deb -R "$package" "$work/unpacked"
-        sed -i "s/^Version: .*/&+later/; s/(= $version)/(= $version+later)/" "$work/unpacked/DEBIAN/control"
+        sed -i "s/^Version: .*/&+later/; s/(= $version)/(= $version+later)/g" "$work/unpacked/DEBIAN/control"
         dpkg-deb --root-owner-group -b "$work/unpacked" "$root/later/"
         rm -r "$work/unpacked"
     done
