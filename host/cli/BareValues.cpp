@@ -4,6 +4,7 @@
 
 #include "base/Ascii.h"
 #include "base/Utf8.h"
+#include "host/cli/MethodAnswer.h"
 #include "host/cli/PathParser.h"
 #include "host/cli/Suggestion.h"
 #include "host/cli/ValueText.h"
@@ -28,8 +29,19 @@ std::string classOfResults(const OperationRequest& request) {
     return request.operation == Operation::ExecQuery ? std::string() : request.path.className;
 }
 
+/// The names of what the answer of a method can have; none when the schema does not have it.
+std::vector<std::string> answerNames(const OperationRequest& request, const Schema& schema) {
+    std::vector<std::string> names;
+    const Schema answers = answerSchema(request, schema);
+    for (const mof::Feature* feature : answers.properties(request.path.className)) {
+        names.push_back(feature->name);
+    }
+    return names;
+}
+
 /// The names of what the results can have.
 std::vector<std::string> possibleNames(const OperationRequest& request, const Schema& schema) {
+    if (request.operation == Operation::InvokeMethod) return answerNames(request, schema);
     const std::string base = classOfResults(request);
     std::vector<std::string> names;
     for (const std::string& className : schema.classNames()) {
@@ -84,17 +96,22 @@ void checkValueName(const std::string& property, const OperationRequest& request
     if (schema.find(request.path.className) == nullptr) return;
     const std::string base = classOfResults(request);
     if (!base.empty() && schema.find(base) == nullptr) return;
+    const bool method = request.operation == Operation::InvokeMethod;
     const std::vector<std::string> names = possibleNames(request, schema);
     const auto isMeant = [&](const std::string& name) {
         return base::equalsIgnoreCase(name, property);
     };
+    if (method && names.empty()) return;
     if (std::any_of(names.begin(), names.end(), isMeant)) return;
-    const bool keysOnly = yieldsKeysOnly(request.operation);
     const std::string kind = yieldsAssociations(request.operation) ? "association" : "class";
-    throw UsageError("--value: " +
-                     (base.empty() ? "no " + kind + " of the schema declares a "
-                                   : "the class " + schema.find(base)->name + " declares no ") +
-                     (keysOnly ? "key '" : "property '") + base::escapeForTerminal(property) + "'" +
+    const std::string who =
+        method ? "the method " + base::escapeForTerminal(request.method) + " answers with no "
+        : base.empty() ? "no " + kind + " of the schema declares a "
+                       : "the class " + schema.find(base)->name + " declares no ";
+    const char* const what = method                              ? "value"
+                             : yieldsKeysOnly(request.operation) ? "key"
+                                                                 : "property";
+    throw UsageError("--value: " + who + what + " '" + base::escapeForTerminal(property) + "'" +
                      didYouMean(property, names));
 }
 
