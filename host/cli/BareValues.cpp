@@ -56,6 +56,18 @@ std::vector<std::string> possibleNames(const OperationRequest& request, const Sc
     return names;
 }
 
+/// Who does not have the value, and as what.
+std::string whatLacksIt(const OperationRequest& request, const std::string& base,
+                        const Schema& schema) {
+    if (request.operation == Operation::InvokeMethod) {
+        return "the method " + base::escapeForTerminal(request.method) + " answers with no";
+    }
+    const std::string what = yieldsKeysOnly(request.operation) ? "key" : "property";
+    if (!base.empty()) return "the class " + schema.find(base)->name + " declares no " + what;
+    const std::string kind = yieldsAssociations(request.operation) ? "association" : "class";
+    return "no " + kind + " of the schema declares a " + what;
+}
+
 std::string bareText(const Value& value) {
     if (categoryOf(value) == TypeCategory::Boolean) return value.boolean() ? "TRUE" : "FALSE";
     if (categoryOf(value) == TypeCategory::Character) return characterText(value.unsignedInteger());
@@ -93,26 +105,17 @@ class ValuePrinter final : public Printer {
 
 void checkValueName(const std::string& property, const OperationRequest& request,
                     const Schema& schema) {
-    if (schema.find(request.path.className) == nullptr) return;
     const std::string base = classOfResults(request);
+    if (schema.find(request.path.className) == nullptr) return;
     if (!base.empty() && schema.find(base) == nullptr) return;
-    const bool method = request.operation == Operation::InvokeMethod;
     const std::vector<std::string> names = possibleNames(request, schema);
     const auto isMeant = [&](const std::string& name) {
         return base::equalsIgnoreCase(name, property);
     };
-    if (method && names.empty()) return;
-    if (std::any_of(names.begin(), names.end(), isMeant)) return;
-    const std::string kind = yieldsAssociations(request.operation) ? "association" : "class";
-    const std::string who =
-        method ? "the method " + base::escapeForTerminal(request.method) + " answers with no "
-        : base.empty() ? "no " + kind + " of the schema declares a "
-                       : "the class " + schema.find(base)->name + " declares no ";
-    const char* const what = method                              ? "value"
-                             : yieldsKeysOnly(request.operation) ? "key"
-                                                                 : "property";
-    throw UsageError("--value: " + who + what + " '" + base::escapeForTerminal(property) + "'" +
-                     didYouMean(property, names));
+    const bool isUnknownMethod = request.operation == Operation::InvokeMethod && names.empty();
+    if (isUnknownMethod || std::any_of(names.begin(), names.end(), isMeant)) return;
+    throw UsageError("--value: " + whatLacksIt(request, base, schema) + " '" +
+                     base::escapeForTerminal(property) + "'" + didYouMean(property, names));
 }
 
 std::unique_ptr<Printer> makeValuePrinter(std::ostream& stream, const std::string& property) {

@@ -191,7 +191,8 @@ ParsedCommandLine CommandLineParser::parse(int argumentCount, const char* const*
     }
     // Refused, not ignored: a script that asks for one thing would take another for it.
     const bool operation = result_.command == Command::Operation;
-    if (!operation && result_.format == Format::Mof)
+    const bool hasMof = operation && result_.operation != Operation::InvokeMethod;
+    if (!hasMof && result_.format == Format::Mof)
         return refused("--format: " + name() + " has the forms table and json");
     if (!operation && result_.value) return refused("--value: " + name() + " prints no values");
     collectProperties();

@@ -9,7 +9,9 @@
 #include "base/Utf8.h"
 #include "host/broker/DateTimeText.h"
 #include "host/cli/PathParser.h"
+#include "host/cli/Suggestion.h"
 #include "host/mof/MofParser.h"
+#include "host/mof/ResolvedClass.h"
 
 namespace cmpihost {
 
@@ -66,12 +68,13 @@ mof::Initializer constantOrText(const std::string& text, const mof::Feature& pro
 /// The value that a user gives to a property as text, in the type that the class declares. Texts
 /// and datetimes are taken as they stand, a reference is a path, every other value and the list of
 /// an array (in braces) is a constant as MOF writes it, NULL included. A single constant given to
-/// an array is a list of one.
+/// an array is a list of one. The parameter of a method takes values in the same way; `kind` says
+/// which of the two it is.
 Value assignedValue(const std::string& text, const mof::Feature& property,
-                    const ClassCatalogue* catalogue) {
+                    const ClassCatalogue* catalogue, const std::string& kind) {
     const auto refuse = [&](const std::string& why) {
-        throw UsageError("'" + base::escapeForTerminal(text) + "' is " + why +
-                         " for the property '" + property.name + "'");
+        throw UsageError("'" + base::escapeForTerminal(text) + "' is " + why + " for the " + kind +
+                         " '" + property.name + "'");
     };
     mof::Initializer value;
     try {
@@ -120,7 +123,51 @@ PropertyValue property(const Assignment& assignment, const std::string& classNam
         throw UsageError("the class '" + className + "' has no property '" +
                          base::escapeForTerminal(assignment.name) + "'");
     }
-    return {declared->name, assignedValue(assignment.text, *declared, &catalogue)};
+    return {declared->name, assignedValue(assignment.text, *declared, &catalogue, "property")};
+}
+
+/// The method as its class declares it, absent when the schema does not have it.
+std::optional<ResolvedMethod> findMethod(const std::string& className, const std::string& name,
+                                         const Schema& schema) {
+    const auto resolved = resolvedClass(schema, className);
+    if (!resolved) return std::nullopt;
+    for (const ResolvedMethod& method : resolved->methods) {
+        if (base::equalsIgnoreCase(method.result.declared->name, name)) return method;
+    }
+    return std::nullopt;
+}
+
+NamedValue argument(const Assignment& assignment, const ResolvedMethod& method,
+                    const ClassCatalogue& catalogue) {
+    std::vector<std::string> names;
+    for (const ResolvedFeature& parameter : method.parameters) {
+        const mof::Feature& declared = *parameter.declared;
+        names.push_back(declared.name);
+        if (base::equalsIgnoreCase(declared.name, assignment.name))
+            return {declared.name,
+                    assignedValue(assignment.text, declared, &catalogue, "parameter")};
+    }
+    throw UsageError("the method '" + method.result.declared->name + "' has no parameter '" +
+                     base::escapeForTerminal(assignment.name) + "'" +
+                     didYouMean(assignment.name, names));
+}
+
+/// The arguments of a method; whether there is such a method is for the provider to say.
+std::vector<NamedValue> arguments(const CommandLine& commandLine, const std::string& className,
+                                  const Schema& schema, const ClassCatalogue& catalogue) {
+    const auto method = findMethod(className, commandLine.method, schema);
+    std::vector<NamedValue> result;
+    NameSet seen;
+    for (const std::string& text : commandLine.assignments) {
+        const Assignment assignment = split(text);
+        if (!seen.insert(base::toLower(assignment.name)).second) {
+            throw UsageError("the parameter '" + base::escapeForTerminal(assignment.name) +
+                             "' stands twice");
+        }
+        result.push_back(method ? argument(assignment, *method, catalogue)
+                                : NamedValue{assignment.name, Value(assignment.text)});
+    }
+    return result;
 }
 
 /// Keys of the path that the assignments do not set are properties of the instance too.
@@ -193,6 +240,11 @@ OperationRequest buildRequest(const CommandLine& commandLine, const Schema& sche
         return request;
     }
     request.path = parsePath(commandLine.path, &catalogue);
+    if (request.operation == Operation::InvokeMethod) {
+        request.method = commandLine.method;
+        request.arguments = arguments(commandLine, request.path.className, schema, catalogue);
+        return request;
+    }
     // The provider need not look for what is not printed.
     if (commandLine.value && !request.properties) request.properties = {*commandLine.value};
     const bool modifies = request.operation == Operation::ModifyInstance;

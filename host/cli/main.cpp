@@ -23,6 +23,7 @@
 #include "host/cli/Diagnostics.h"
 #include "host/cli/Explanation.h"
 #include "host/cli/InstallPaths.h"
+#include "host/cli/MethodAnswer.h"
 #include "host/cli/NameNotes.h"
 #include "host/cli/Namespaces.h"
 #include "host/cli/PathCompletion.h"
@@ -219,7 +220,7 @@ class Run {
         OperationRequest request = buildRequest(commandLine_, schema, catalogue);
         if (commandLine_.value) checkValueName(*commandLine_.value, request, schema);
         std::string notes;
-        const OperationResult result = withHost(catalogue, [&](ProviderHost& host) {
+        OperationResult result = withHost(catalogue, [&](ProviderHost& host) {
             OperationResult answer = commandLine_.bare || !lacksKeys(request, catalogue)
                                          ? host.ask(request)
                                          : completed(host, request);
@@ -232,7 +233,12 @@ class Run {
         // The libraries are gone by now, with whatever they may have left to write themselves.
         const bool done = result.rc == CMPI_RC_OK;
         if (done) {
-            printResult(request, result, schema, *printer(schema));
+            if (request.operation == Operation::InvokeMethod) {
+                result.instances = {answerInstance(request, result)};
+                printAnswer(request, result, schema);
+            } else {
+                printResult(request, result, schema, *printer(schema));
+            }
             notes += noteOnBareValues(result);
         } else {
             failed(failureText(request, result), exitCimStatus);
@@ -243,6 +249,16 @@ class Run {
                                   (done ? result.instances.empty() : isNotFound(result));
         if (nothingFound) return exitNothingFound;
         return done ? exitDone : exitCimStatus;
+    }
+
+    void printAnswer(const OperationRequest& request, const OperationResult& result,
+                     const Schema& schema) {
+        if (commandLine_.format == Format::Json && !commandLine_.value) {
+            writeAnswerJson(request, result, schema, out_);
+        } else {
+            const Schema answers = answerSchema(request, schema);
+            printer(answers)->print(result.instances);
+        }
     }
 
     std::string noteOnBareValues(const OperationResult& result) const {
