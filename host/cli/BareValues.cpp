@@ -60,7 +60,7 @@ std::vector<std::string> possibleNames(const OperationRequest& request, const Sc
 std::string whatLacksIt(const OperationRequest& request, const std::string& base,
                         const Schema& schema) {
     if (request.operation == Operation::InvokeMethod) {
-        return "the method " + base::escapeForTerminal(request.method) + " answers with no";
+        return "the method " + base::escapeForTerminal(request.method) + " answers with no value";
     }
     const std::string what = yieldsKeysOnly(request.operation) ? "key" : "property";
     if (!base.empty()) return "the class " + schema.find(base)->name + " declares no " + what;

@@ -152,11 +152,12 @@ NamedValue argument(const Assignment& assignment, const ResolvedMethod& method,
                      didYouMean(assignment.name, names));
 }
 
-/// The arguments of a method; whether there is such a method is for the provider to say.
-std::vector<NamedValue> arguments(const CommandLine& commandLine, const std::string& className,
-                                  const Schema& schema, const ClassCatalogue& catalogue) {
-    const auto method = findMethod(className, commandLine.method, schema);
-    std::vector<NamedValue> result;
+/// Fills the method and its arguments in; whether there is such a method is for the provider to
+/// say.
+void addInvocation(OperationRequest& request, const CommandLine& commandLine, const Schema& schema,
+                   const ClassCatalogue& catalogue) {
+    const auto method = findMethod(request.path.className, commandLine.method, schema);
+    request.method = method ? method->result.declared->name : commandLine.method;
     NameSet seen;
     for (const std::string& text : commandLine.assignments) {
         const Assignment assignment = split(text);
@@ -164,10 +165,9 @@ std::vector<NamedValue> arguments(const CommandLine& commandLine, const std::str
             throw UsageError("the parameter '" + base::escapeForTerminal(assignment.name) +
                              "' stands twice");
         }
-        result.push_back(method ? argument(assignment, *method, catalogue)
-                                : NamedValue{assignment.name, Value(assignment.text)});
+        request.arguments.push_back(method ? argument(assignment, *method, catalogue)
+                                           : NamedValue{assignment.name, Value(assignment.text)});
     }
-    return result;
 }
 
 /// Keys of the path that the assignments do not set are properties of the instance too.
@@ -241,8 +241,7 @@ OperationRequest buildRequest(const CommandLine& commandLine, const Schema& sche
     }
     request.path = parsePath(commandLine.path, &catalogue);
     if (request.operation == Operation::InvokeMethod) {
-        request.method = commandLine.method;
-        request.arguments = arguments(commandLine, request.path.className, schema, catalogue);
+        addInvocation(request, commandLine, schema, catalogue);
         return request;
     }
     // The provider need not look for what is not printed.

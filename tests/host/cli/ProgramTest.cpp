@@ -85,6 +85,8 @@ TEST(Program, PrintsWhatAStandInAnswers) {
     const std::string moon =
         "root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\"KORVA_ComputerSystem\","
         "CSName=\"moon\",CreationClassName=\"KORVA_OperatingSystem\",Name=\"Test \\\"OS\\\"\"";
+    const char* const other = KORVA_TEST_DATA "/cli/othermof";
+    const std::string disk = "Disk.Id=\"1\"";
     std::vector<Words> runs = {
         {"ei", "KORVA_OperatingSystem"},
         {"ein", "KORVA_OperatingSystem"},
@@ -107,7 +109,17 @@ TEST(Program, PrintsWhatAStandInAnswers) {
         {"--format", "json", "di", "Changeable.A=1"},
         // What the broker caught, once of a provider that publishes more than the schema knows.
         {"ei", "KORVA_InstalledOS"},
-        {"--schema", KORVA_TEST_DATA "/cli/othermof", "ei", "KORVA_OperatingSystem"},
+        {"--schema", other, "ei", "KORVA_OperatingSystem"},
+        // A method: what it returned and what came out.
+        {"--schema", other, "im", disk, "requeststate", "State=2"},
+        {"--schema", other, "--format", "json", "im", disk, "RequestState", "state=1"},
+        {"--schema", other, "im", disk, "RequestState", "State=1", "--value", "When"},
+        {"--schema", other, "im", disk, "RequestState", "State=1", "--value", "State"},
+        {"--schema", other, "im", disk, "RequestState", "State=on"},
+        {"--schema", other, "im", disk, "RequestState", "States=1"},
+        {"--schema", other, "im", disk, "RequestState", "State=1", "state=2"},
+        {"--schema", other, "im", disk, "RequestStat", "Anything=1"},
+        {"--schema", other, "--format", "mof", "im", disk, "RequestState"},
         // Failures tell what was asked.
         {"di", "X.A=1"},
         {"mi", "KORVA_OperatingSystem.Name=\"x\"", "Version=2", "OSType=36"},

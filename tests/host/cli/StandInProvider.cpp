@@ -201,9 +201,36 @@ CMPIStatus ReferenceNames(CMPIAssociationMI*, const CMPIContext*, const CMPIResu
     return done(result);
 }
 
+CMPIStatus MethodCleanup(CMPIMethodMI*, const CMPIContext*, CMPIBoolean) {
+    return status(CMPI_RC_OK);
+}
+
+/// RequestState of a Disk: refuses all but the state 1, and names the disk itself as the worker.
+CMPIStatus InvokeMethod(CMPIMethodMI*, const CMPIContext*, const CMPIResult* result,
+                        const CMPIObjectPath* path, const char* method, const CMPIArgs* in,
+                        CMPIArgs* out) {
+    if (std::string(method) != "RequestState") {
+        return failure(CMPI_RC_ERR_METHOD_NOT_FOUND, std::string("no ") + method);
+    }
+    const CMPIData state = CMGetArg(in, "State", nullptr);
+    const CMPIUint32 answer = state.type == CMPI_uint16 && state.value.uint16 == 1 ? 0 : 1;
+    CMPIValue when;
+    when.dateTime = CMNewDateTimeFromChars(broker, "20240102030405.000000+000", nullptr);
+    CMAddArg(out, "When", &when, CMPI_dateTime);
+    CMPIValue worker;
+    worker.array = CMNewArray(broker, 1, CMPI_ref, nullptr);
+    CMPIValue disk;
+    disk.ref = const_cast<CMPIObjectPath*>(path);
+    CMSetArrayElementAt(worker.array, 0, &disk, CMPI_ref);
+    CMAddArg(out, "Worker", &worker, CMPI_refA);
+    CMReturnData(result, &answer, CMPI_uint32);
+    return done(result);
+}
+
 }  // namespace
 
 CMInstanceMIStub(, OperatingSystemProvider, broker, CMNoHook)
+CMMethodMIStub(, OperatingSystemProvider, broker, CMNoHook)
 CMAssociationMIStub(, OperatingSystemProvider, broker, CMNoHook)
 CMInstanceMIStub(, OSStatusFacade, broker, CMNoHook)
 CMAssociationMIStub(, OSStatusFacade, broker, CMNoHook)
