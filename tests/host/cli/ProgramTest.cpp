@@ -30,6 +30,7 @@ std::string jsonForm(const Words& arguments) {
         {"ai", "instances"},
         {"ri", "instances"},
         {"classes", "classes"},
+        {"namespaces", "namespaces"},
         {"KORVA_InstalledOS", "describedClass"},
         {"KORVA_OperatingSystem.FreePhysicalMemory", "describedProperty"},
         {"Disk.RequestState", "describedMethod"},
