@@ -272,6 +272,11 @@ ProviderLibrary& Router::libraryFor(const Registration& registration) {
     return library;
 }
 
+std::chrono::nanoseconds Router::loadTime() const {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    return loadTime_;
+}
+
 ProviderLibrary& Router::loadOnce(const Registration& registration) {
     const std::string key = keyOf(registration);
     const std::lock_guard<std::recursive_mutex> loading(loading_);
@@ -281,6 +286,7 @@ ProviderLibrary& Router::loadOnce(const Registration& registration) {
         throw LoadError("lib" + registration.location + ".so is needed while it is being loaded");
     }
     beingLoaded_.insert(key);
+    const auto start = std::chrono::steady_clock::now();
     std::unique_ptr<ProviderLibrary> made;
     try {
         made = load(registration);
@@ -290,6 +296,8 @@ ProviderLibrary& Router::loadOnce(const Registration& registration) {
     }
     beingLoaded_.erase(key);
     const std::lock_guard<std::mutex> lock(mutex_);
+    // One that was loaded for another is part of that one's time.
+    if (beingLoaded_.empty()) loadTime_ += std::chrono::steady_clock::now() - start;
     inOrder_.push_back(std::move(made));
     libraries_.emplace(key, inOrder_.back().get());
     return *inOrder_.back();

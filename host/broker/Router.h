@@ -5,6 +5,7 @@
 #include "host/broker/ProviderLibrary.h"
 #include "host/broker/Registrations.h"
 
+#include <chrono>
 #include <filesystem>
 #include <map>
 #include <memory>
@@ -65,6 +66,9 @@ class Router final : public UpcallService {
     /// later loads them again.
     void unload() noexcept;
 
+    /// How long loading libraries took so far.
+    std::chrono::nanoseconds loadTime() const;
+
     const Registrations& registrations() const noexcept { return registrations_; }
 
   private:
@@ -104,6 +108,7 @@ class Router final : public UpcallService {
     std::map<std::string, ProviderLibrary*> libraries_;
     std::vector<std::unique_ptr<ProviderLibrary>> inOrder_;
     std::vector<std::string> loadErrors_;
+    std::chrono::nanoseconds loadTime_{};
 };
 
 }  // namespace cmpihost

@@ -1,6 +1,7 @@
 #ifndef HOST_CLI_PROVIDER_HOST_H
 #define HOST_CLI_PROVIDER_HOST_H
 
+#include <chrono>
 #include <filesystem>
 #include <memory>
 #include <string>
@@ -42,6 +43,9 @@ class ProviderHost {
 
     /// Why libraries that providers needed did not load.
     std::vector<std::string> takeLoadErrors();
+
+    /// How long loading libraries took while requests ran: each when it was first needed.
+    std::chrono::nanoseconds loadTime() const { return router_.loadTime(); }
 
     /// Unloads all libraries and hands out all that the broker caught since it was made.
     std::vector<std::string> unload();

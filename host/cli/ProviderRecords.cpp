@@ -13,6 +13,8 @@
 #include <sstream>
 #include <system_error>
 
+#include "base/Utf8.h"
+
 namespace cmpihost {
 
 namespace fs = std::filesystem;
@@ -43,6 +45,18 @@ std::string messageOf(const std::string& record) {
     const std::size_t message = record.find(" MESSAGE [File: ");
     const std::size_t end = record.find("]: ", std::min(message, record.size()));
     return end == std::string::npos ? std::string() : record.substr(end + 3);
+}
+
+bool isFailure(const ProviderMessage& message) {
+    return !message.trace && message.level == CMPI_SEV_ERROR;
+}
+
+/// The name of a severity or of a level of the trace; a number that has none as it is.
+std::string levelName(const ProviderMessage& message) {
+    constexpr const char* severities[] = {"error", "info", "warning"};
+    constexpr const char* levels[] = {"info", "warning", "verbose"};
+    if (message.level < 1 || message.level > 3) return std::to_string(message.level);
+    return (message.trace ? levels : severities)[message.level - 1];
 }
 
 }  // namespace
@@ -103,6 +117,26 @@ std::vector<std::string> FailureRecords::texts() const {
         if (!text.empty() && !known) result.push_back(text);
     }
     return result;
+}
+
+void BrokerMessages::take(const ProviderMessage& message) {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    if (isFailure(message)) failures_.push_back(message.text);
+    if (!isShown(message)) return;
+    stream_ << "cmpi " << (message.trace ? "trace " : "log ") << levelName(message) << ' '
+            << base::escapeForTerminal(message.source) << (message.source.empty() ? "" : ": ")
+            << base::escapeForTerminal(message.text) << '\n';
+}
+
+std::vector<std::string> BrokerMessages::failures() const {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    return failures_;
+}
+
+bool BrokerMessages::isShown(const ProviderMessage& message) const {
+    if (!request_ || request_->channel.value_or(LogChannel::Cmpi) != LogChannel::Cmpi) return false;
+    if (request_->level == LogLevel::Failures) return isFailure(message);
+    return request_->level == LogLevel::Everything || !message.trace;
 }
 
 }  // namespace cmpihost

@@ -2,10 +2,14 @@
 #define HOST_CLI_PROVIDER_RECORDS_H
 
 #include <filesystem>
+#include <mutex>
+#include <optional>
+#include <ostream>
 #include <string>
 #include <vector>
 
 #include "base/FileDescriptor.h"
+#include "host/broker/Broker.h"
 #include "host/cli/CommandLine.h"
 
 namespace cmpihost {
@@ -49,6 +53,29 @@ class FailureRecords {
 
   private:
     std::filesystem::path folder_;
+};
+
+/// What providers log and trace through the broker: shown in lines that begin with "cmpi", as far
+/// as the request wants it, and its failures kept.
+class BrokerMessages {
+  public:
+    /// Without a request nothing is shown. The stream outlives the object.
+    BrokerMessages(const std::optional<LogRequest>& request, std::ostream& stream)
+        : request_(request), stream_(stream) {}
+
+    /// For the broker's sink. Any threads may call it.
+    void take(const ProviderMessage& message);
+
+    /// The texts of the failures that were logged so far, in their order.
+    std::vector<std::string> failures() const;
+
+  private:
+    bool isShown(const ProviderMessage& message) const;
+
+    const std::optional<LogRequest> request_;
+    std::ostream& stream_;
+    mutable std::mutex mutex_;
+    std::vector<std::string> failures_;
 };
 
 }  // namespace cmpihost

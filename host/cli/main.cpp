@@ -3,14 +3,11 @@
 #include <time.h>
 #include <unistd.h>
 
-#include <chrono>
 #include <cstdlib>
 #include <exception>
 #include <filesystem>
-#include <iomanip>
 #include <iostream>
 #include <optional>
-#include <sstream>
 #include <stdexcept>
 #include <type_traits>
 #include <utility>
@@ -31,6 +28,7 @@
 #include "host/cli/ProviderHost.h"
 #include "host/cli/ProviderRecords.h"
 #include "host/cli/RequestBuilder.h"
+#include "host/cli/Stopwatch.h"
 #include "host/cli/Tree.h"
 #include "host/mof/Schema.h"
 
@@ -125,35 +123,6 @@ void printResult(const OperationRequest& request, OperationResult result, const 
     printer.print(result.instances);
 }
 
-/// How long each part of the work took.
-class Stopwatch {
-  public:
-    using Time = std::chrono::duration<double, std::milli>;
-
-    /// Adds the time since the last lap to a part.
-    void lap(Time Stopwatch::*part) {
-        const auto now = std::chrono::steady_clock::now();
-        this->*part += now - last_;
-        last_ = now;
-    }
-
-    /// The line for the standard error.
-    std::string line() const {
-        std::ostringstream text;
-        text << std::fixed << std::setprecision(1) << "time: load " << load.count()
-             << " ms (schema, libraries), request " << request.count()
-             << " ms (the providers' answer), output " << output.count() << " ms";
-        return messageLines(text.str());
-    }
-
-    Time load{};
-    Time request{};
-    Time output{};
-
-  private:
-    std::chrono::steady_clock::time_point last_ = std::chrono::steady_clock::now();
-};
-
 /// Carries a command line out: loads the provider, runs the operation, writes the results to `out`
 /// and everything else (failures, what the broker caught, notes) to `err`. Libraries and MOF files
 /// that the command line does not name are looked for around `programFolder`.
@@ -161,7 +130,11 @@ class Run {
   public:
     Run(const CommandLine& commandLine, const fs::path& programFolder, std::ostream& out,
         std::ostream& err)
-        : commandLine_(commandLine), programFolder_(programFolder), out_(out), err_(err) {}
+        : commandLine_(commandLine),
+          programFolder_(programFolder),
+          out_(out),
+          err_(err),
+          messages_(commandLine.log, err) {}
 
     /// Does it all, and turns what is thrown on the way into a complaint and its exit status.
     ExitStatus exitStatus() {
@@ -175,7 +148,7 @@ class Run {
     ExitStatus executed() {
         try {
             const ExitStatus status = execute();
-            if (commandLine_.time) err_ << stopwatch_.line();
+            if (commandLine_.time) err_ << messageLines(stopwatch_.text());
             return status;
         } catch (const ProviderNotFound& error) {
             return failed(error.what(), exitNotLoaded);
@@ -190,6 +163,7 @@ class Run {
         // The schema goes first: a wrong path is reported without loading any library.
         const Schema schema = loadSchema(commandLine_.schemas, programFolder_);
         const SchemaCatalogue catalogue(schema);
+        stopwatch_.lap(&Stopwatch::load);
         switch (commandLine_.command) {
             case Command::Operation:
                 return runOperation(schema, catalogue);
@@ -319,7 +293,11 @@ class Run {
     std::string recordNotes(const OperationRequest& request, const OperationResult& answer) const {
         std::string notes;
         if (answer.rc == CMPI_RC_OK && !isEmptyAnswer(request, answer)) return notes;
-        for (const std::string& record : failures_.texts()) {
+        std::vector<std::string> records = failures_.texts();
+        for (const std::string& message : messages_.failures()) records.push_back(message);
+        // What is shown anyway need not be told again.
+        if (commandLine_.log) records.clear();
+        for (const std::string& record : records) {
             if (record != answer.message)
                 notes += noteLine("the provider recorded: " + base::escapeForTerminal(record));
         }
@@ -350,9 +328,11 @@ class Run {
         setup.libraryFolders = libraryFolders(programFolder_);
         setup.library = soleLibrary(commandLine_, setup.libraryFolders);
         setup.miName = commandLine_.bare ? "OperatingSystemProvider" : commandLine_.miName;
+        setup.messageSink = [this](const ProviderMessage& message) { messages_.take(message); };
         ProviderHost host(std::move(setup), catalogue);
         stopwatch_.lap(&Stopwatch::load);
         auto result = work(host);
+        stopwatch_.move(host.loadTime(), &Stopwatch::request, &Stopwatch::load);
         for (const std::string& error : host.takeLoadErrors()) {
             failed(base::escapeForTerminal(error), exitNotLoaded);
             notLoaded_ = true;
@@ -376,6 +356,7 @@ class Run {
     std::ostream& err_;
     Stopwatch stopwatch_;
     const FailureRecords failures_;
+    BrokerMessages messages_;
     /// Whether a library that a provider needed did not load, and whether anything was caught.
     bool notLoaded_ = false;
     bool caught_ = false;

@@ -131,4 +131,28 @@ TEST(ScopedLogConfiguration, TellsThatNothingCanBeWrittenAndLeavesNoFileOpen) {
     EXPECT_EQ(openFiles(), before);
 }
 
+/// What is shown of one message of each kind.
+std::string shown(const std::optional<LogRequest>& request) {
+    std::ostringstream stream;
+    BrokerMessages messages(request, stream);
+    messages.take({false, CMPI_SEV_ERROR, "disk", "is full\n"});
+    messages.take({false, CMPI_SEV_INFO, "", "started"});
+    messages.take({true, CMPI_LEV_VERBOSE, "reader", "line 1"});
+    messages.take({false, 7, "", "odd"});
+    EXPECT_THAT(messages.failures(), testing::ElementsAre("is full\n"));
+    return stream.str();
+}
+
+TEST(BrokerMessages, AreShownAsFarAsTheRequestWantsThem) {
+    const std::string error = "cmpi log error disk: is full\\n\n";
+    const std::string logged = "cmpi log info started\n";
+    EXPECT_EQ(shown(std::nullopt), "");
+    EXPECT_EQ(shown(LogRequest()),
+              error + logged + "cmpi trace verbose reader: line 1\ncmpi log 7 odd\n");
+    EXPECT_EQ(shown(LogRequest{LogLevel::Calls, LogChannel::Cmpi}),
+              error + logged + "cmpi log 7 odd\n");
+    EXPECT_EQ(shown(LogRequest{LogLevel::Failures, std::nullopt}), error);
+    EXPECT_EQ(shown(LogRequest{LogLevel::Everything, LogChannel::Log}), "");
+}
+
 }  // namespace
