@@ -35,23 +35,38 @@ PagesReferToPagesThatThereAre() {
     expect_text "korva-osstatus.7: zblog.conf.5" "$(dead_references "$work/pages")"
 }
 
+host=$KORVA_BINARY_DIR/bin/cmpihost
+
+# The commands in the help of the host.
+commands() { "$host" --help | sed -n '/^Operations:/,/^Paths:/s/^  \([a-z][a-z]*\) .*/\1/p'; }
+
 PageOfTheHostHasItsOptions() {
     need_tool mandoc mandoc
-    host=$KORVA_BINARY_DIR/bin/cmpihost
-    operations="ei ein gi ai ain ri rin ci mi di im xq tree classes describe namespaces"
     {
         "$host" --help
-        for operation in $operations; do "$host" "$operation" --help; done
+        for command in $(commands); do "$host" "$command" --help; done
     } | options_in >"$work/told"
     expect_equal options "$(cat "$work/told")" "$(text cmpihost.1 | options_in)"
 }
 
-PageOfTheHostHasItsOperations() {
+PageOfTheHostHasItsCommands() {
+    expect_equal commands "$(commands | sort)" \
+        "$(sed -n '/^\.Ss Commands/,/^\.El/s/^\.It Cm \([a-z]*\).*/\1/p' "$pages/cmpihost.1" | sort)"
+    [ "$(commands | wc -l)" -eq 16 ] || fail "not sixteen commands: $(commands)"
+}
+
+PageOfTheHostHasItsExitStatuses() {
+    expect_equal statuses "$("$host" --help | sed -n '/^Exit status:/,$s/^  \([0-9]\)  .*/\1/p')" \
+        "$(sed -n '/^\.Sh EXIT STATUS/,/^\.El/s/^\.It \([0-9]\)$/\1/p' "$pages/cmpihost.1")"
+}
+
+PageOfTheHostHasItsExamples() {
     need_tool mandoc mandoc
-    "$KORVA_BINARY_DIR/bin/cmpihost" --help | sed -n '/^Operations:/,$s/^\([a-z][a-z]*\)$/\1/p' |
-        sort >"$work/told"
-    expect_equal operations "$(cat "$work/told")" "$(sed -n 's/^\.It Cm \([a-z]*\) [AO][rp] .*/\1/p' "$pages/cmpihost.1" | sort)"
-    [ "$(wc -l <"$work/told")" -eq 12 ] || fail "not twelve operations: $(cat "$work/told")"
+    for command in $(commands); do
+        example=$("$host" "$command" --help | sed -n 's/^  \(cmpihost .*\)/\1/p')
+        [ -n "$example" ] || fail "no example of $command"
+        expect_text "$example" "$(text cmpihost.1)"
+    done
 }
 
 PageOfTheRegisterCommandHasItsOptions() {
