@@ -77,7 +77,7 @@ _cmpihost_values() {
         --log) echo "failures 3000 4000" {failures,3000,4000},{log,trace,cmpi} ;;
         --value | --properties) _cmpihost_members "$class" Properties ;;
         --assoc-class | --result-class) _cmpihost_classes ;;
-        --namespace) _cmpihost_ask namespaces ;;
+        --namespace) _cmpihost_ask namespaces | awk 'NF { print $1 }' ;;
         --name | --role | --result-role | --lang) ;;
         *) return 1 ;;
     esac

@@ -89,6 +89,7 @@ ei KORVA_RunningOS --properties = D|Dependent
 --schema /nonexistent ei K|
 ei Unknown ''|
 xq x --lang ''|
+tree --namespace ro|root/cimv2
 ROWS
     touch "$work/a file.mof"
     expect_equal files "$work/a file.mof" "$(bash_offers --schema "$work/a f")"
@@ -97,7 +98,7 @@ ROWS
 ZshOffersClassesPropertiesAndValues() {
     zsh_offers "cmpihost ei KORVA_R" "cmpihost --time ein root/cimv2:KORVA_I" "cmpihost ei KORVA_RunningOS " \
         "cmpihost describe KORVA_RunningOS." "cmpihost ain X --assoc-class KORVA_R" "cmpihost --format " \
-        "cmpihost --log=failures," "cmpihost --schema /nonexistent ei K" >"$work/offered"
+        "cmpihost --log=failures," "cmpihost tree --namespace " "cmpihost --schema /nonexistent ei K" >"$work/offered"
     expect_equal offers "KORVA_RunningOS
 KORVA_InstalledOS
 Antecedent Dependent
@@ -105,6 +106,7 @@ Antecedent Dependent
 KORVA_RunningOS
 json mof table
 failures,cmpi failures,log failures,trace
+root/cimv2
 " "$(cat "$work/offered")
 "
 }
