@@ -52,14 +52,14 @@ class FakeHost {
     }
 };
 
-const Schema& schema() {
+const Schema& classesOfTheTree() {
     static const Schema instance = Schema::load(KORVA_SOURCE_DIR "/schema");
     return instance;
 }
 
 std::string drawn(const FakeHost& host, const Terminal& terminal = {}) {
     std::ostringstream stream;
-    for (const TreeNode& root : hostTree(host, "root/cimv2", schema())) {
+    for (const TreeNode& root : hostTree(host, "root/cimv2", classesOfTheTree())) {
         drawTree(root, stream, terminal);
     }
     return stream.str();
@@ -121,7 +121,7 @@ TEST(Tree, HasAFormForPrograms) {
     host.system = {{"Name", "Linux"}, {"HealthState", Value::fromUnsigned(5, CMPI_uint16)}};
     host.capabilities = {};
     std::ostringstream stream;
-    writeTreeJson(hostTree(host, "root/cimv2", schema()), stream, schema());
+    writeTreeJson(hostTree(host, "root/cimv2", classesOfTheTree()), stream, classesOfTheTree());
     EXPECT_EQ(stream.str(), R"json([
   {
     "label": "no KORVA_ComputerSystem, so nothing is associated",
