@@ -126,15 +126,30 @@ PropertyValue property(const Assignment& assignment, const std::string& classNam
     return {declared->name, assignedValue(assignment.text, *declared, &catalogue, "property")};
 }
 
-/// The method as its class declares it, absent when the schema does not have it.
+/// "it has A, B" behind a complaint about a name; the nearest ones where some are near.
+std::string instead(const std::string& name, const std::vector<std::string>& known) {
+    std::string text = didYouMean(name, known);
+    if (!text.empty()) return text;
+    for (const std::string& each : known) text += (text.empty() ? "; it has " : ", ") + each;
+    return text.empty() ? "; it has none" : text;
+}
+
+/// The method as its class declares it, absent when the class may inherit it from one that the
+/// schema does not have.
 std::optional<ResolvedMethod> findMethod(const std::string& className, const std::string& name,
                                          const Schema& schema) {
     const auto resolved = resolvedClass(schema, className);
     if (!resolved) return std::nullopt;
+    std::vector<std::string> names;
     for (const ResolvedMethod& method : resolved->methods) {
-        if (base::equalsIgnoreCase(method.result.declared->name, name)) return method;
+        names.push_back(method.result.declared->name);
+        if (base::equalsIgnoreCase(names.back(), name)) return method;
     }
-    return std::nullopt;
+    const auto& above = resolved->superclasses;
+    const mof::Class& last = above.empty() ? *resolved->declared : *above.back();
+    if (!last.superclass.empty()) return std::nullopt;
+    throw UsageError("the class '" + resolved->declared->name + "' has no method '" +
+                     base::escapeForTerminal(name) + "'" + instead(name, names));
 }
 
 NamedValue argument(const Assignment& assignment, const ResolvedMethod& method,
@@ -149,11 +164,11 @@ NamedValue argument(const Assignment& assignment, const ResolvedMethod& method,
     }
     throw UsageError("the method '" + method.result.declared->name + "' has no parameter '" +
                      base::escapeForTerminal(assignment.name) + "'" +
-                     didYouMean(assignment.name, names));
+                     instead(assignment.name, names));
 }
 
-/// Fills the method and its arguments in; whether there is such a method is for the provider to
-/// say.
+/// Fills the method and its arguments in; whether a class that the schema does not wholly have has
+/// such a method is for the provider to say.
 void addInvocation(OperationRequest& request, const CommandLine& commandLine, const Schema& schema,
                    const ClassCatalogue& catalogue) {
     const auto method = findMethod(request.path.className, commandLine.method, schema);
