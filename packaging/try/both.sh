@@ -13,8 +13,10 @@ bring_packages() {
     mkdir "$root/amd64" "$root/i386" "$root/opt/i386"
     for name in provider companion; do cp "$packages/korva-osstatus-${name}"_*_i386.deb "$root/i386/"; done
     for name in provider companion tools; do cp "$packages/korva-osstatus-${name}"_*_amd64.deb "$root/amd64/"; done
-    # One system has one cmpihost; that of i386 is there to ask the libraries of its word size.
+    # One system has one cmpihost; that of i386 is there to ask the libraries of its word size. It looks for
+    # the schema beside itself.
     dpkg-deb -x "$packages/korva-osstatus-tools"_*_i386.deb "$root/opt/i386"
+    ln -s /usr/share/korva-osstatus "$root/opt/i386/usr/share/"
 }
 install_from() { inside sh -c "apt-get -y install /$1/*.deb"; }
 leads_to() { [ "$(inside readlink -f "/usr/lib/cmpi/$facade")" = "/usr/lib/$1/cmpi/$facade.1.0.0" ]; }
