@@ -6,6 +6,7 @@
 #include <type_traits>
 
 #include "base/Utf8.h"
+#include "host/cli/ArgumentWords.h"
 #include "host/cli/Commands.h"
 #include "host/cli/Diagnostics.h"
 #include "host/cli/Suggestion.h"
@@ -14,65 +15,6 @@
 namespace cmpihost {
 
 namespace {
-
-std::string strip(const std::string& text) {
-    constexpr const char* blanks = " \t\r\n";
-    const std::size_t start = text.find_first_not_of(blanks);
-    return start == std::string::npos
-               ? std::string()
-               : text.substr(start, text.find_last_not_of(blanks) - start + 1);
-}
-
-/// The names between commas; an empty text holds none.
-void appendNames(const std::string& list, std::vector<std::string>& to) {
-    std::size_t start = 0;
-    while (start < list.size()) {
-        const std::size_t comma = std::min(list.find(',', start), list.size());
-        const std::string name = strip(list.substr(start, comma - start));
-        if (!name.empty()) to.push_back(name);
-        start = comma + 1;
-    }
-}
-
-/// What a word stands for.
-template <class Meaning>
-struct Word {
-    const char* text;
-    Meaning meaning;
-};
-
-constexpr Word<Format> formats[] = {
-    {"table", Format::Table}, {"mof", Format::Mof}, {"json", Format::Json}};
-constexpr Word<LogLevel> logLevels[] = {
-    {"failures", LogLevel::Failures}, {"3000", LogLevel::Calls}, {"4000", LogLevel::Everything}};
-constexpr Word<LogChannel> logChannels[] = {
-    {"log", LogChannel::Log}, {"trace", LogChannel::Trace}, {"cmpi", LogChannel::Cmpi}};
-
-/// Throws CLI::ValidationError for a word that the table does not have.
-template <class Meaning, std::size_t count>
-Meaning meaningOf(const std::string& word, const Word<Meaning> (&table)[count],
-                  const char* option) {
-    std::string known;
-    std::vector<std::string> names;
-    for (std::size_t index = 0; index < count; ++index) {
-        if (word == table[index].text) return table[index].meaning;
-        names.emplace_back(table[index].text);
-        known += std::string(index == 0 ? "" : index + 1 < count ? ", " : " or ");
-        known += table[index].text;
-    }
-    throw CLI::ValidationError(
-        option, "expected " + known + ", found '" + word + "'" + didYouMean(word, names));
-}
-
-/// LEVEL[,CHANNEL]
-LogRequest parseLog(const std::string& text) {
-    const std::size_t comma = text.find(',');
-    LogRequest request;
-    request.level = meaningOf(text.substr(0, comma), logLevels, "--log");
-    if (comma != std::string::npos)
-        request.channel = meaningOf(text.substr(comma + 1), logChannels, "--log");
-    return request;
-}
 
 /// An option or argument with a text that is not empty.
 template <class Text>
@@ -85,26 +27,6 @@ CLI::Option* addText(CLI::App& to, const char* name, const char* typeName, Text&
     return to.add_option(name, value, help)
         ->type_name(typeName)
         ->check(CLI::Validator(complaint, {}));
-}
-
-/// The arguments behind the program's name, last one first. An empty value that stands behind a
-/// sign of equality becomes an argument of its own: the parser would take the next argument for it,
-/// as it would for --log without a value.
-std::vector<std::string> splitArguments(int argumentCount, const char* const* arguments) {
-    std::vector<std::string> result;
-    bool options = true;
-    for (int index = 1; index < argumentCount; ++index) {
-        std::string argument = arguments[index];
-        options = options && argument != "--";
-        const bool emptyValue = options && argument.compare(0, 2, "--") == 0 &&
-                                argument.find('=') == argument.size() - 1;
-        if (emptyValue) argument.pop_back();
-        if (options && argument == "--log" && !emptyValue) argument = "--log=4000";
-        result.push_back(std::move(argument));
-        if (emptyValue) result.emplace_back();
-    }
-    std::reverse(result.begin(), result.end());
-    return result;
 }
 
 /// Whether the operation is one that OperatingSystemProvider has.
@@ -188,6 +110,8 @@ ParsedCommandLine CommandLineParser::parse(int argumentCount, const char* const*
         return {std::nullopt, help(), exitDone};
     } catch (const CLI::ParseError& error) {
         return refused(complaint(error));
+    } catch (const UsageError& error) {
+        return refused(error.what());
     }
     // Refused, not ignored: a script that asks for one thing would take another for it.
     const bool operation = result_.command == Command::Operation;
@@ -265,11 +189,9 @@ void CommandLineParser::addHostOption(const OptionRow& row) {
         if constexpr (std::is_same_v<Field, bool>) {
             app_.add_flag(row.name, value, row.help);
         } else if constexpr (std::is_same_v<Field, Format>) {
-            addParsed([&value, &row](const std::string& word) {
-                value = meaningOf(word, formats, row.name);
-            });
+            addParsed([&value](const std::string& word) { value = parseFormat(word); });
         } else if constexpr (std::is_same_v<Field, std::optional<LogRequest>>) {
-            addParsed([&value](const std::string& text) { value = parseLog(text); });
+            addParsed([&value](const std::string& text) { value = parseLogRequest(text); });
         } else {
             // One value for each mention, also where several mentions add up.
             addText(app_, row.name, row.valueName, value, row.help)
