@@ -69,6 +69,7 @@ std::string statusText(CMPIrc rc) {
 std::string requestText(const OperationRequest& request) {
     const ObjectPathValue& path = request.path;
     std::string text = operationName(request.operation);
+    if (!request.method.empty()) text += " " + base::escapeForTerminal(request.method);
     if (!path.className.empty()) text += " of " + base::escapeForTerminal(path.className);
     return text + " in " + base::escapeForTerminal(path.nameSpace);
 }

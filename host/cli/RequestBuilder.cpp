@@ -120,8 +120,11 @@ PropertyValue property(const Assignment& assignment, const std::string& classNam
     if (schema.find(className) == nullptr) return {assignment.name, Value(assignment.text)};
     const mof::Feature* declared = schema.findProperty(className, assignment.name);
     if (declared == nullptr) {
+        std::vector<std::string> names;
+        for (const mof::Feature* known : schema.properties(className)) names.push_back(known->name);
         throw UsageError("the class '" + className + "' has no property '" +
-                         base::escapeForTerminal(assignment.name) + "'");
+                         base::escapeForTerminal(assignment.name) + "'" +
+                         didYouMean(assignment.name, names));
     }
     return {declared->name, assignedValue(assignment.text, *declared, &catalogue, "property")};
 }

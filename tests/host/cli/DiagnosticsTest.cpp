@@ -26,6 +26,11 @@ TEST(FailureText, NamesTheRequestAndLeavesOutControlCharacters) {
               "GetInstance of A\\tB in root/\\n: CIM_ERR_ACCESS_DENIED (2)");
     result.message = "go\x1b[31m away";
     request = {};
+    request.operation = Operation::InvokeMethod;
+    request.method = "Stop";
+    request.path = {"ns", "Disk", {}};
+    EXPECT_EQ(requestText(request), "InvokeMethod Stop of Disk in ns");
+    request = {};
     request.operation = Operation::ExecQuery;
     request.path.nameSpace = "ns";
     EXPECT_EQ(failureText(request, result),
