@@ -122,6 +122,7 @@ TEST_F(RequestBuilder, RefusesValuesThatDoNotFit) {
          "NULL), found 'maybe'"},
         {{"Size=1 2"}, "the value of 'Size': expected nothing after the value, found '2'"},
         {{"Weight=1"}, "the class 'Thing' has no property 'Weight'"},
+        {{"Nmae=x"}, "the class 'Thing' has no property 'Nmae'; did you mean Name?"},
         {{"On=TRUE", "on=FALSE"}, "the property 'On' stands twice"},
         {{"On"}, "expected NAME=VALUE, found 'On'"},
         {{"=1"}, "expected NAME=VALUE, found '=1'"},
