@@ -38,9 +38,10 @@ const ClassDeclaration* SchemaCatalogue::find(std::string_view className) const 
     const mof::Class* const declared = schema_.find(className);
     if (declared == nullptr) return nullptr;
     const std::lock_guard<std::mutex> lock(mutex_);
-    const auto [place, isNew] = declarations_.try_emplace(declared);
-    if (isNew) place->second = declarationOf(schema_, *declared);
-    return &place->second;
+    auto found = declarations_.find(declared);
+    if (found == declarations_.end())
+        found = declarations_.emplace(declared, declarationOf(schema_, *declared)).first;
+    return &found->second;
 }
 
 }  // namespace cmpihost
