@@ -10,9 +10,10 @@ facade=libkorvaosstatusfacade.so
 bring_packages() {
     inside dpkg --add-architecture i386
     inside apt-get -qq update
-    mkdir "$root/amd64" "$root/i386" "$root/opt/i386"
+    mkdir "$root/amd64" "$root/i386" "$root/later" "$root/opt/i386"
     for name in provider companion; do cp "$packages/korva-osstatus-${name}"_*_i386.deb "$root/i386/"; done
     for name in provider companion tools; do cp "$packages/korva-osstatus-${name}"_*_amd64.deb "$root/amd64/"; done
+    for package in "$root"/amd64/*.deb "$root"/i386/*.deb; do make_later "$package" "$root/later/"; done
     # One system has one cmpihost; that of i386 is there to ask the libraries of its word size. It looks for
     # the schema beside itself.
     dpkg-deb -x "$packages/korva-osstatus-tools"_*_i386.deb "$root/opt/i386"
@@ -44,6 +45,9 @@ check "the folder is switched" \
     inside update-alternatives --set korva-osstatus "/usr/lib/i386-linux-gnu/cmpi/$facade"
 check "i386 answers, from the folder of object managers" asks_i386 /usr/lib/cmpi
 check "amd64 answers all the same" asks_amd64
+check "apt-get install of later versions of both" install_from later
+check "the folder still leads to i386" leads_to i386-linux-gnu
+check "i386 answers, from the folder of object managers" asks_i386 /usr/lib/cmpi
 check "the folder is switched back" \
     inside update-alternatives --set korva-osstatus "/usr/lib/x86_64-linux-gnu/cmpi/$facade"
 check "apt-get remove of amd64" inside apt-get -y remove korva-osstatus-provider:amd64

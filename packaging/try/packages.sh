@@ -15,11 +15,7 @@ bring_packages() {
     for name in $own; do
         package=$(echo "$packages/${name}"_*_"$architecture.deb")
         cp "$package" "$root/packages/"
-        version=$(dpkg-deb -f "$package" Version)
-        dpkg-deb -R "$package" "$work/unpacked"
-        sed -i "s/^Version: .*/&+later/; s/(= $version)/(= $version+later)/g" "$work/unpacked/DEBIAN/control"
-        dpkg-deb --root-owner-group -b "$work/unpacked" "$root/later/"
-        rm -r "$work/unpacked"
+        make_later "$package" "$root/later/"
     done
 }
 

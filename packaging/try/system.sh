@@ -44,6 +44,15 @@ make_system() {
     inside apt-get -qq clean
 }
 
+# make_later PACKAGE FOLDER: the same as a later version, which goes with the later ones of its kind.
+make_later() {
+    version=$(dpkg-deb -f "$1" Version)
+    dpkg-deb -R "$1" "$work/unpacked"
+    sed -i "s/^Version: .*/&+later/; s/(= $version)/(= $version+later)/g" "$work/unpacked/DEBIAN/control"
+    dpkg-deb --root-owner-group -b "$work/unpacked" "$2"
+    rm -r "$work/unpacked"
+}
+
 # shows PATTERN COMMAND...: the command, run in the system, prints a line like that.
 shows() {
     pattern=$1
