@@ -77,10 +77,6 @@ std::string listed(const std::vector<std::string>& names) {
     return text;
 }
 
-std::string keyOf(const Registration& registration) {
-    return registration.provider + '\n' + registration.location;
-}
-
 }  // namespace
 
 Router::Router(Broker& broker, const ClassCatalogue& catalogue, Registrations registrations,
@@ -88,7 +84,7 @@ Router::Router(Broker& broker, const ClassCatalogue& catalogue, Registrations re
     : broker_(broker),
       catalogue_(catalogue),
       registrations_(std::move(registrations)),
-      folders_(std::move(folders)) {
+      libraries_(broker, std::move(folders)) {
     broker_.routeOthers(*this);
 }
 
@@ -144,14 +140,9 @@ std::vector<std::string> Router::takeLoadErrors() {
 }
 
 void Router::unload() noexcept {
-    std::vector<std::unique_ptr<ProviderLibrary>> going;
-    {
-        const std::lock_guard<std::mutex> lock(mutex_);
-        libraries_.clear();
-        going = std::exchange(inOrder_, {});
-    }
-    // A provider may make up-calls in cleanup to one that was loaded before it.
-    while (!going.empty()) going.pop_back();
+    // While it cleans up, its up-calls go by registration.
+    std::exchange(sole_, nullptr).reset();
+    libraries_.unload();
 }
 
 std::vector<Router::Target> Router::targetsOf(const OperationRequest& request) const {
@@ -188,7 +179,7 @@ std::vector<Router::Target> Router::associationTargets(const OperationRequest& r
             if (relation != ClassRelation::Same && relation != ClassRelation::Subclass) continue;
         }
         const auto isSame = [&](const Target& other) {
-            return keyOf(*other.registration) == keyOf(each);
+            return providerKey(*other.registration) == providerKey(each);
         };
         if (std::none_of(targets.begin(), targets.end(), isSame))
             targets.push_back({&each, request.path.className});
@@ -241,7 +232,7 @@ OperationResult Router::joined(const std::vector<Target>& targets, const Operati
     for (const Target& target : targets) {
         OperationRequest each = request;
         each.path.className = target.className;
-        OperationResult result = call(libraryFor(*target.registration), each);
+        OperationResult result = call(libraries_.of(*target.registration), each);
         if (targets.size() == 1) return result;
         if (result.rc != CMPI_RC_OK) {
             const std::string& className = target.registration->className;
@@ -252,78 +243,6 @@ OperationResult Router::joined(const std::vector<Target>& targets, const Operati
         append(all.instances, result.instances, once);
     }
     return all;
-}
-
-ProviderLibrary* Router::loaded(const std::string& key) const {
-    const std::lock_guard<std::mutex> lock(mutex_);
-    const auto found = libraries_.find(key);
-    return found == libraries_.end() ? nullptr : found->second;
-}
-
-ProviderLibrary& Router::libraryFor(const Registration& registration) {
-    ProviderLibrary* const known = loaded(keyOf(registration));
-    ProviderLibrary& library = known != nullptr ? *known : loadOnce(registration);
-    for (const Interface type : registration.types) {
-        if (library.interfaces().has(type)) continue;
-        throw LoadError(registration.file.string() + ":" + std::to_string(registration.line) +
-                        ": the provider of " + registration.className + ": " +
-                        library.whyMissing(type));
-    }
-    return library;
-}
-
-std::chrono::nanoseconds Router::loadTime() const {
-    const std::lock_guard<std::mutex> lock(mutex_);
-    return loadTime_;
-}
-
-ProviderLibrary& Router::loadOnce(const Registration& registration) {
-    const std::string key = keyOf(registration);
-    const std::lock_guard<std::recursive_mutex> loading(loading_);
-    // Another thread may have been faster.
-    if (ProviderLibrary* const known = loaded(key)) return *known;
-    if (beingLoaded_.count(key) != 0) {
-        throw LoadError("lib" + registration.location + ".so is needed while it is being loaded");
-    }
-    beingLoaded_.insert(key);
-    const auto start = std::chrono::steady_clock::now();
-    std::unique_ptr<ProviderLibrary> made;
-    try {
-        made = load(registration);
-    } catch (...) {
-        beingLoaded_.erase(key);
-        throw;
-    }
-    beingLoaded_.erase(key);
-    const std::lock_guard<std::mutex> lock(mutex_);
-    // One that was loaded for another is part of that one's time.
-    if (beingLoaded_.empty()) loadTime_ += std::chrono::steady_clock::now() - start;
-    inOrder_.push_back(std::move(made));
-    libraries_.emplace(key, inOrder_.back().get());
-    return *inOrder_.back();
-}
-
-std::unique_ptr<ProviderLibrary> Router::load(const Registration& registration) const {
-    std::vector<std::filesystem::path> folders = {registration.file.parent_path()};
-    // A bare name would be searched by the loader.
-    if (folders.front().empty()) folders.front() = ".";
-    folders.insert(folders.end(), folders_.begin(), folders_.end());
-    LoadOptions options;
-    options.providerName = registration.provider;
-    options.parameters = registration.parameters;
-    const std::string file = findLibrary(registration.location, folders).string();
-    try {
-        return std::make_unique<ProviderLibrary>(file, broker_, options);
-    } catch (const LoadError& error) {
-        std::string text = error.what();
-        if (file.find('/') == std::string::npos) {
-            std::vector<std::string> names;
-            for (const std::filesystem::path& folder : folders) names.push_back(folder.string());
-            text += "; looked for in " + listed(names);
-        }
-        throw LoadError(registration.file.string() + ":" + std::to_string(registration.line) +
-                        ": the provider of " + registration.className + ": " + text);
-    }
 }
 
 }  // namespace cmpihost

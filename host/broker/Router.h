@@ -2,16 +2,14 @@
 #define HOST_BROKER_ROUTER_H
 
 #include "host/broker/Broker.h"
-#include "host/broker/ProviderLibrary.h"
-#include "host/broker/Registrations.h"
+#include "host/broker/RegisteredLibraries.h"
 
 #include <chrono>
 #include <filesystem>
-#include <map>
 #include <memory>
 #include <mutex>
-#include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 /// Sends operations to the providers that are registered for them.
@@ -30,21 +28,22 @@ namespace cmpihost {
 /// registration names, CMPI_RC_ERR_INVALID_CLASS for an unknown class, else
 /// CMPI_RC_ERR_NOT_SUPPORTED, each with a message.
 ///
-/// A library is loaded when it is first needed, once a provider name. Any threads may ask at once;
-/// while one loads a library, others wait only if they need one that is not loaded either.
+/// Any threads may ask at once; RegisteredLibraries says when one waits for another.
 class Router final : public UpcallService {
   public:
-    /// Takes the broker's up-calls. Libraries are looked for in the folder of the registration
-    /// file, in `folders`, and by the dynamic loader. Broker and catalogue outlive the router.
+    /// Takes the broker's up-calls. Libraries are looked for in `folders` too. Broker and catalogue
+    /// outlive the router.
     Router(Broker& broker, const ClassCatalogue& catalogue, Registrations registrations,
            std::vector<std::filesystem::path> folders);
     ~Router() override { unload(); }
     Router(const Router&) = delete;
     Router& operator=(const Router&) = delete;
 
-    /// From now on this library answers all requests of clients, and the up-calls for classes that
-    /// are not registered. It outlives its use. Called while no request runs.
-    void answerWith(ProviderLibrary& library) noexcept { sole_ = &library; }
+    /// Until unload() this library answers all requests of clients, and the up-calls for classes
+    /// that are not registered. Called while no request runs.
+    void answerWith(std::unique_ptr<ProviderLibrary> library) noexcept {
+        sole_ = std::move(library);
+    }
 
     /// Answers a client. An exception that leaves a provider becomes CMPI_RC_ERR_FAILED with a
     /// message that says so. Throws LoadError for a library that is needed and does not load, or
@@ -62,12 +61,12 @@ class Router final : public UpcallService {
     /// Why libraries that up-calls needed did not load, each once.
     std::vector<std::string> takeLoadErrors();
 
-    /// Unloads all libraries, the last one first. Called while no request runs; what is asked
-    /// later loads them again.
+    /// Unloads the one library, then those of the registered providers. Called while no request
+    /// runs.
     void unload() noexcept;
 
-    /// How long loading libraries took so far.
-    std::chrono::nanoseconds loadTime() const;
+    /// How long loading registered libraries took so far.
+    std::chrono::nanoseconds loadTime() const { return libraries_.loadTime(); }
 
     const Registrations& registrations() const noexcept { return registrations_; }
 
@@ -88,27 +87,15 @@ class Router final : public UpcallService {
     template <class Call>
     OperationResult joined(const std::vector<Target>& targets, const OperationRequest& request,
                            const Call& call);
-    ProviderLibrary& libraryFor(const Registration& registration);
-    ProviderLibrary& loadOnce(const Registration& registration);
-    ProviderLibrary* loaded(const std::string& key) const;
-    std::unique_ptr<ProviderLibrary> load(const Registration& registration) const;
 
     Broker& broker_;
     const ClassCatalogue& catalogue_;
     const Registrations registrations_;
-    const std::vector<std::filesystem::path> folders_;
-    ProviderLibrary* sole_ = nullptr;
-
-    /// Held while a library is loaded; recursive, as a factory may make an up-call that needs
-    /// another library.
-    std::recursive_mutex loading_;
-    std::set<std::string> beingLoaded_;
-    /// Guards what follows, never while a provider is called.
-    mutable std::mutex mutex_;
-    std::map<std::string, ProviderLibrary*> libraries_;
-    std::vector<std::unique_ptr<ProviderLibrary>> inOrder_;
+    RegisteredLibraries libraries_;
+    std::unique_ptr<ProviderLibrary> sole_;
+    /// Guards what follows.
+    std::mutex mutex_;
     std::vector<std::string> loadErrors_;
-    std::chrono::nanoseconds loadTime_{};
 };
 
 }  // namespace cmpihost

@@ -13,8 +13,8 @@ ProviderHost::ProviderHost(HostSetup setup, const ClassCatalogue& catalogue)
     if (setup.library.empty()) return;
     LoadOptions options;
     options.providerName = std::move(setup.miName);
-    library_ = std::make_unique<ProviderLibrary>(setup.library, broker_, std::move(options));
-    router_.answerWith(*library_);
+    router_.answerWith(
+        std::make_unique<ProviderLibrary>(setup.library, broker_, std::move(options)));
 }
 
 OperationResult ProviderHost::ask(const OperationRequest& request) {
@@ -30,7 +30,6 @@ std::vector<std::string> ProviderHost::takeLoadErrors() {
 }
 
 std::vector<std::string> ProviderHost::unload() {
-    library_.reset();
     router_.unload();
     return broker_.takeViolations();
 }

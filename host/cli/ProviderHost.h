@@ -3,7 +3,6 @@
 
 #include <chrono>
 #include <filesystem>
-#include <memory>
 #include <string>
 #include <vector>
 
@@ -53,7 +52,6 @@ class ProviderHost {
   private:
     Broker broker_;
     Router router_;
-    std::unique_ptr<ProviderLibrary> library_;
 };
 
 }  // namespace cmpihost

@@ -5,6 +5,7 @@
 
 #include "support/ProcessMap.h"
 
+#include <dlfcn.h>
 #include <thread>
 
 namespace cmpihost {
@@ -102,8 +103,8 @@ TEST_F(RoutedRequest, IsRefusedWithTheReasonWhereNobodyIsRegistered) {
 
 TEST_F(RoutedRequest, GoesToTheOneLibraryThatAnswersAll) {
     Router router(broker, catalogue, registered(good("TEST_Thing", "instance")), {folder});
-    ProviderLibrary sole(folder + "/libbroker_test_generic.so", broker);
-    router.answerWith(sole);
+    router.answerWith(
+        std::make_unique<ProviderLibrary>(folder + "/libbroker_test_generic.so", broker));
     // It has no slot for it, but is asked; what it lacks is told by who is registered.
     const OperationRequest names = request(Operation::EnumerateInstanceNames, "TEST_Thing");
     EXPECT_EQ(router.ask(names).rc, CMPI_RC_ERR_NOT_SUPPORTED);
@@ -111,6 +112,23 @@ TEST_F(RoutedRequest, GoesToTheOneLibraryThatAnswersAll) {
     EXPECT_EQ(router.askAnyone(request(Operation::GetInstance, "TEST_Other")).rc,
               CMPI_RC_ERR_NOT_SUPPORTED);
     EXPECT_EQ(router.perform(broker, names).paths.size(), 2U);
+}
+
+TEST_F(RoutedRequest, OfACleanupMeetsNoLibraryThatHasGone) {
+    const std::pair<const char*, CMPIrc> rows[] = {{"TEST_Thing", CMPI_RC_ERR_FAILED},
+                                                   {"TEST_Other", CMPI_RC_ERR_NOT_SUPPORTED}};
+    for (const auto& [className, status] : rows) {
+        Router router(broker, catalogue, registered(good("TEST_Thing", "instance")), {folder});
+        router.answerWith(
+            std::make_unique<ProviderLibrary>(folder + "/libbroker_test_generic.so", broker));
+        router.askAnyone(request(Operation::EnumerateInstanceNames, "TEST_Thing"));
+        void* const handle = dlopen(library.c_str(), RTLD_NOW | RTLD_NOLOAD);
+        *static_cast<const char**>(dlsym(handle, "askedInCleanup")) = className;
+        router.unload();
+        EXPECT_EQ(*static_cast<const CMPIrc*>(dlsym(handle, "statusInCleanup")), status);
+        dlclose(handle);
+        EXPECT_FALSE(isMapped(library));
+    }
 }
 
 TEST_F(RoutedRequest, OfAProviderFailsAndIsToldWhenItsLibraryIsMissing) {

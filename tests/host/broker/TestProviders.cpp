@@ -12,6 +12,9 @@ CMPI_EXPORT int refuseUnload = 0;
 /// Calls of cleanup of both interfaces, and of those with terminating set.
 CMPI_EXPORT int cleanups = 0;
 CMPI_EXPORT int terminations = 0;
+/// Set: cleanup asks for the names of that class, with this status.
+CMPI_EXPORT const char* askedInCleanup = nullptr;
+CMPI_EXPORT CMPIrc statusInCleanup = CMPI_RC_OK;
 }
 
 namespace {
@@ -56,18 +59,26 @@ void setText(CMPIInstance* instance, const char* name, const char* text) {
     CMSetProperty(instance, name, text == nullptr ? "(null)" : text, CMPI_chars);
 }
 
-CMPIStatus cleanup(CMPIBoolean terminating) {
+CMPIStatus cleanup(const CMPIContext* context, CMPIBoolean terminating) {
     ++cleanups;
     if (terminating != 0) ++terminations;
+    if (askedInCleanup != nullptr) {
+        CMPIStatus status = done();
+        CBEnumInstanceNames(broker, context,
+                            CMNewObjectPath(broker, "root/cimv2", askedInCleanup, nullptr),
+                            &status);
+        statusInCleanup = status.rc;
+    }
     return done(refuseUnload != 0 ? CMPI_RC_DO_NOT_UNLOAD : CMPI_RC_OK);
 }
 
-CMPIStatus instanceCleanup(CMPIInstanceMI*, const CMPIContext*, CMPIBoolean terminating) {
-    return cleanup(terminating);
+CMPIStatus instanceCleanup(CMPIInstanceMI*, const CMPIContext* context, CMPIBoolean terminating) {
+    return cleanup(context, terminating);
 }
 
-CMPIStatus associationCleanup(CMPIAssociationMI*, const CMPIContext*, CMPIBoolean terminating) {
-    return cleanup(terminating);
+CMPIStatus associationCleanup(CMPIAssociationMI*, const CMPIContext* context,
+                              CMPIBoolean terminating) {
+    return cleanup(context, terminating);
 }
 
 CMPIStatus enumerateInstanceNames(CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
