@@ -31,6 +31,11 @@ struct ElfStart {
     Elf32_Half machine;
 };
 
+/// Whether the front of a library says that it is of the other word size.
+bool isOfOtherWordSize(const ElfStart& start) {
+    return std::memcmp(start.ident, ELFMAG, SELFMAG) == 0 && start.ident[EI_CLASS] != ownClass;
+}
+
 /// The bytes of a file.
 class Bytes {
   public:
@@ -187,6 +192,12 @@ class SymbolTable {
     std::uint64_t gnuHash_ = 0;
 };
 
+bool isOfOtherWordSize(const fs::path& file) {
+    ElfStart start{};
+    std::ifstream(file, std::ios::binary).read(reinterpret_cast<char*>(&start), sizeof start);
+    return isOfOtherWordSize(start);
+}
+
 }  // namespace
 
 void examineLibrary(const std::string& file) {
@@ -204,7 +215,7 @@ void examineLibrary(const std::string& file) {
     if (!start || std::memcmp(start->ident, ELFMAG, SELFMAG) != 0 || start->type != ET_DYN) {
         refuse("not a shared library");
     }
-    if (start->ident[EI_CLASS] != ownClass) {
+    if (isOfOtherWordSize(*start)) {
         refuse(is64Bit ? "a 32-bit library, this host is 64-bit"
                        : "a 64-bit library, this host is 32-bit");
     }
@@ -218,13 +229,16 @@ std::vector<std::string> exportedFunctions(const fs::path& file) {
 fs::path findLibrary(const std::string& location, const std::vector<fs::path>& folders) {
     if (location.find('/') != std::string::npos) return location;
     const std::string name = "lib" + location + ".so";
+    fs::path other;
     for (const fs::path& folder : folders) {
         for (const std::string& file : {name, name + ".1"}) {
             std::error_code error;
-            if (fs::is_regular_file(folder / file, error)) return folder / file;
+            if (!fs::is_regular_file(folder / file, error)) continue;
+            if (!isOfOtherWordSize(folder / file)) return folder / file;
+            if (other.empty()) other = folder / file;
         }
     }
-    return name;
+    return other.empty() ? fs::path(name) : other;
 }
 
 }  // namespace cmpihost

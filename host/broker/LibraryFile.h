@@ -26,8 +26,9 @@ void examineLibrary(const std::string& file);
 std::vector<std::string> exportedFunctions(const std::filesystem::path& file);
 
 /// The library lib<location>.so, or that with .1 behind it, in the first of the folders that holds
-/// it; the bare name lib<location>.so, which the dynamic loader searches for, when none does. A
-/// location that is a path is taken as it stands.
+/// it in the word size of this process, or else in the other one; the bare name lib<location>.so,
+/// which the dynamic loader searches for, when none does. A location that is a path is taken as it
+/// stands.
 std::filesystem::path findLibrary(const std::string& location,
                                   const std::vector<std::filesystem::path>& folders);
 

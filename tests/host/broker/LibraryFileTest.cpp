@@ -67,5 +67,15 @@ TEST(LibraryFile, IsFoundInTheFirstFolderThatHoldsIt) {
     EXPECT_EQ(findLibrary("./y.so", folders), "./y.so");
 }
 
+TEST(LibraryFile, OfTheOtherWordSizeIsTakenOnlyWhereThereIsNoOther) {
+    std::string foreign = contentOf(providers);
+    foreign[4] = foreign[4] == 1 ? 2 : 1;
+    const TemporaryDirectory folder;
+    folder.write("a/libx.so", foreign);
+    folder.write("b/libx.so", contentOf(providers));
+    EXPECT_EQ(findLibrary("x", {folder.path("a"), folder.path("b")}), folder.path("b/libx.so"));
+    EXPECT_EQ(findLibrary("x", {folder.path(""), folder.path("a")}), folder.path("a/libx.so"));
+}
+
 }  // namespace
 }  // namespace cmpihost
