@@ -32,13 +32,19 @@ std::string listed(const std::vector<fs::path>& paths) {
 
 Schema Schema::load(const std::vector<fs::path>& paths) {
     Schema schema;
-    for (mof::Document& document : readSchemaFiles(paths)) schema.add(std::move(document));
+    for (mof::Document& document : readSchemaFiles(paths)) schema.addClasses(std::move(document));
+    schema.pairInheritedLists();
     if (schema.classes_.empty())
         throw std::runtime_error("the schema " + listed(paths) + " holds no MOF class");
     return schema;
 }
 
 void Schema::add(mof::Document document) {
+    addClasses(std::move(document));
+    pairInheritedLists();
+}
+
+void Schema::addClasses(mof::Document document) {
     for (const mof::QualifierType& type : document.qualifierTypes) qualifierTypes_.add(type);
     for (mof::Class& added : document.classes) {
         check(added);
@@ -64,13 +70,33 @@ void Schema::check(const mof::Class& added) const {
 
 void Schema::keepValueMaps(const mof::Class& added) {
     for (const mof::Feature& property : added.properties) {
-        try {
-            ValueMap map = ValueMap::of(property);
-            if (!map.empty()) valueMaps_.emplace(&property, std::move(map));
-        } catch (const std::runtime_error& error) {
-            throw mof::MofError(added.file, property.position,
-                                "property '" + property.name + "': " + error.what());
-        }
+        const mof::Qualifier* const values = mof::findQualifier(property.qualifiers, "Values");
+        const mof::Qualifier* const valueMap = mof::findQualifier(property.qualifiers, "ValueMap");
+        keepValueMap(added, property, values, valueMap);
+        if ((values == nullptr) != (valueMap == nullptr))
+            withOneList_.emplace_back(&added, &property);
+    }
+}
+
+void Schema::keepValueMap(const mof::Class& owner, const mof::Feature& property,
+                          const mof::Qualifier* values, const mof::Qualifier* valueMap) {
+    try {
+        ValueMap map = ValueMap::of(property.type, values, valueMap);
+        if (!map.empty()) valueMaps_[&property] = std::move(map);
+    } catch (const std::runtime_error& error) {
+        throw mof::MofError(owner.file, property.position,
+                            "property '" + property.name + "': " + error.what());
+    }
+}
+
+/// When all classes are there: superclasses may come last.
+void Schema::pairInheritedLists() {
+    for (const auto& [owner, property] : withOneList_) {
+        const auto* const values = propertyQualifier(owner->name, property->name, "Values");
+        const auto* const valueMap = propertyQualifier(owner->name, property->name, "ValueMap");
+        // Lists of different length do not belong together.
+        if (valueMap != nullptr && mof::texts(values).size() == mof::texts(valueMap).size())
+            keepValueMap(*owner, *property, values, valueMap);
     }
 }
 

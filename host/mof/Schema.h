@@ -70,8 +70,9 @@ class Schema {
     /// Whether the class or one that it descends from is declared as an association.
     bool isAssociation(std::string_view className) const;
 
-    /// The names of the numbers of a property, its own or those of the property that it overrides;
-    /// empty for one that has none or is unknown.
+    /// The names of the numbers of a property, its own or those of the property that it overrides:
+    /// Values and ValueMap may come from different declarations. Empty for one that has none or is
+    /// unknown.
     const ValueMap& valueMap(std::string_view className, std::string_view propertyName) const;
 
     /// The names of all classes as declared, in alphabetical order.
@@ -86,7 +87,11 @@ class Schema {
 
   private:
     void check(const mof::Class& added) const;
+    void addClasses(mof::Document document);
     void keepValueMaps(const mof::Class& added);
+    void keepValueMap(const mof::Class& owner, const mof::Feature& property,
+                      const mof::Qualifier* values, const mof::Qualifier* valueMap);
+    void pairInheritedLists();
 
     std::map<std::string, mof::Class> classes_;
     /// The names of direct subclasses by the name of their superclass in lower case.
@@ -94,6 +99,8 @@ class Schema {
     QualifierTypes qualifierTypes_;
     /// Read once, when their class is added: a wrong one is an error in the file, not at its use.
     std::unordered_map<const mof::Feature*, ValueMap> valueMaps_;
+    /// Properties with one of the two lists only, which may go with an inherited one.
+    std::vector<std::pair<const mof::Class*, const mof::Feature*>> withOneList_;
 };
 
 /// A schema as the broker asks for it. What a class declares and inherits is put together when the

@@ -46,12 +46,13 @@ ValueMap::Entry ValueMap::entry(const std::string& range, const std::string& nam
 }
 
 /// A qualifier of a property that is no integer (strings have them too) names no numbers.
-ValueMap ValueMap::of(const mof::Feature& property) {
+ValueMap ValueMap::of(mof::Type type, const mof::Qualifier* values,
+                      const mof::Qualifier* valueMap) {
     ValueMap result;
-    const std::vector<std::string> names = mof::texts(property.qualifiers, "Values");
-    const std::vector<std::string> ranges = mof::texts(property.qualifiers, "ValueMap");
-    const bool hasRanges = mof::findQualifier(property.qualifiers, "ValueMap") != nullptr;
-    if (names.empty() || !isIntegerType(property.type)) return result;
+    const std::vector<std::string> names = mof::texts(values);
+    const std::vector<std::string> ranges = mof::texts(valueMap);
+    const bool hasRanges = valueMap != nullptr;
+    if (names.empty() || !isIntegerType(type)) return result;
     if (hasRanges && ranges.size() != names.size()) {
         throw std::runtime_error("ValueMap lists " + std::to_string(ranges.size()) +
                                  " entries and Values " + std::to_string(names.size()));

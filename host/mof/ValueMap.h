@@ -12,10 +12,12 @@ namespace cmpihost {
 /// The names of the numbers of one property, from its qualifiers ValueMap and Values.
 class ValueMap {
   public:
-    /// Empty for a property without Values, and for one whose ValueMap lists no integers.
-    /// Without ValueMap the Values count from 0. Throws std::runtime_error when the two lists
-    /// differ in length or an entry of the ValueMap is neither an integer nor a range.
-    static ValueMap of(const mof::Feature& property);
+    /// Of the qualifiers Values and ValueMap of a property, null for one that is missing. Empty
+    /// without Values, and for a property that is no integer. Without ValueMap the Values count
+    /// from 0. Throws std::runtime_error when the two lists differ in length or an entry of the
+    /// ValueMap is neither an integer nor a range.
+    static ValueMap of(mof::Type type, const mof::Qualifier* values,
+                       const mof::Qualifier* valueMap);
 
     bool empty() const { return entries_.empty(); }
 

@@ -92,6 +92,22 @@ TEST(Schema, InheritsTheNamesOfNumbersUnlessAnOverrideBringsItsOwn) {
     EXPECT_TRUE(schema.valueMap("B", "Weight").empty());
 }
 
+TEST(Schema, PairsNamesAndNumbersOfDifferentDeclarations) {
+    const Schema schema = schemaOf(
+        "class B : A { [Override(\"P\"), Values{\"cinq\", \"six\"}] uint16 P;"
+        " [Override(\"Q\"), ValueMap{\"7\", \"8\"}] uint16 Q;"
+        " [Override(\"R\"), Values{\"zero\"}] uint16 R; };"
+        "class A { [ValueMap{\"5\", \"6\"}, Values{\"five\", \"six\"}] uint16 P;"
+        " [ValueMap{\"5\", \"6\"}, Values{\"five\", \"six\"}] uint16 Q;"
+        " [ValueMap{\"5\", \"6\"}, Values{\"five\", \"six\"}] uint16 R; };");
+    EXPECT_EQ(*schema.valueMap("B", "P").find(5), "cinq");
+    EXPECT_EQ(schema.valueMap("B", "P").find(0), nullptr);
+    EXPECT_EQ(*schema.valueMap("B", "Q").find(7), "five");
+    EXPECT_EQ(schema.valueMap("B", "Q").find(5), nullptr);
+    EXPECT_EQ(*schema.valueMap("B", "R").find(0), "zero");
+    EXPECT_EQ(*schema.valueMap("A", "P").find(5), "five");
+}
+
 TEST(Schema, RefusesClassesThatAreDeclaredTwiceOrDescendFromThemselves) {
     EXPECT_EQ(complaintAbout("class A {};\nclass a {};"),
               "x.mof:2:7: class 'a' is declared twice, first at x.mof:1");
@@ -147,7 +163,9 @@ TEST(SchemaCatalogue, GivesEveryTypeOfMofItsCmpiType) {
 ValueMap mapOf(const std::string& qualifiers, const std::string& type = "uint16") {
     const mof::Document document =
         mof::parse("class A { [" + qualifiers + "] " + type + " P; };", "x.mof");
-    return ValueMap::of(document.classes.at(0).properties.at(0));
+    const mof::Feature& property = document.classes.at(0).properties.at(0);
+    return ValueMap::of(property.type, mof::findQualifier(property.qualifiers, "Values"),
+                        mof::findQualifier(property.qualifiers, "ValueMap"));
 }
 
 TEST(ValueMap, NamesNumbersByTheNarrowestAndFirstEntryThatHoldsThem) {
