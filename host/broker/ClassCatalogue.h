@@ -3,6 +3,7 @@
 
 #include <cmpi/cmpidt.h>
 
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -40,15 +41,18 @@ class ClassCatalogue {
     /// catalogue.
     virtual const ClassDeclaration* find(std::string_view className) const = 0;
 
+    /// The superclass of a class (name without case), empty for a root class; none where it is not
+    /// known. More classes may be known by it than are declared.
+    virtual std::optional<std::string_view> superclassOf(std::string_view className) const;
+
   protected:
     ClassCatalogue() = default;
     ClassCatalogue(const ClassCatalogue&) = default;
     ClassCatalogue& operator=(const ClassCatalogue&) = default;
 };
 
-/// How a class stands to another one. Unknown: the chain of superclasses leaves the catalogue, and
-/// the few classes of the CIM schema that are known by their names alone, before the ancestor is
-/// met.
+/// How a class stands to another one. Unknown: the chain of superclasses leaves what the catalogue
+/// knows before the ancestor is met.
 enum class ClassRelation { Same, Subclass, Unrelated, Unknown };
 
 /// The relation of `className` to `ancestor`. A null catalogue knows only equal names.

@@ -104,7 +104,8 @@ class Schema {
 };
 
 /// A schema as the broker asks for it. What a class declares and inherits is put together when the
-/// class is first asked for.
+/// class is first asked for. The superclasses of the few CIM classes that the shipped ones descend
+/// from are known in any schema.
 class SchemaCatalogue final : public ClassCatalogue {
   public:
     /// Of a schema that outlives the catalogue, or of one that it keeps.
@@ -112,6 +113,7 @@ class SchemaCatalogue final : public ClassCatalogue {
     explicit SchemaCatalogue(Schema&& schema) : kept_(std::move(schema)), schema_(*kept_) {}
 
     const ClassDeclaration* find(std::string_view className) const override;
+    std::optional<std::string_view> superclassOf(std::string_view className) const override;
 
   private:
     const std::optional<Schema> kept_{};
