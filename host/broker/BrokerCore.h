@@ -154,6 +154,7 @@ class BrokerCore {
 
 /// The tables of a broker. A sparse one lacks slots.
 CMPIBrokerFT upcallTable(bool sparse);
+void bindAttachment(CMPIBrokerFT& table);
 CMPIBrokerEncFT factoryTable(bool sparse);
 void bindMessages(CMPIBrokerEncFT& table);
 CMPIBrokerExtFT threadTable(bool sparse);

@@ -231,37 +231,6 @@ CMPIData getProperty(BrokerCore& core, const CallName& call, const CMPIContext* 
     return answer->value ? writeValue(core, *answer->value) : missingItem(core, status);
 }
 
-/// A clone, since the thread may still use it when the request that prepared it has ended.
-CMPIContext* prepareAttachThread(BrokerCore& core, const CallName& call,
-                                 const CMPIContext* context) {
-    return core.makeClone<CMPIContext>(fromHandle(context, call).body);
-}
-
-CMPIStatus attachThread(BrokerCore& core, const CallName& call, const CMPIContext* context) {
-    fromHandle(context, call);
-    // detachThread deletes it, on this thread.
-    std::make_unique<ObjectScope>(core, ObjectScope::Kind::AttachedThread).release();
-    return statusOf(CMPI_RC_OK);
-}
-
-CMPIStatus detachThread(BrokerCore& core, const CallName& call, const CMPIContext* context) {
-    const Object<CMPIContext>& object = fromHandle(context, call);
-    ObjectScope* const innermost = ObjectScope::innermost();
-    if (innermost == nullptr || &innermost->core() != &core ||
-        innermost->kind() != ObjectScope::Kind::AttachedThread) {
-        core.report("detachThread on a thread that is not attached");
-        return statusOf(CMPI_RC_ERR_FAILED);
-    }
-    // The scope ends in any case: a wrong context does not make the thread attached again.
-    const std::unique_ptr<ObjectScope> scope(innermost);
-    if (object.arena() != nullptr) {
-        core.report("detachThread with a context that is none of prepareAttachThread");
-        return statusOf(CMPI_RC_ERR_INVALID_HANDLE);
-    }
-    core.releaseObject(object);
-    return statusOf(CMPI_RC_OK);
-}
-
 CMPIBrokerFT completeUpcalls() {
     using FT = CMPIBrokerFT;
     using Context = const CMPIContext*;
@@ -270,9 +239,7 @@ CMPIBrokerFT completeUpcalls() {
     table.brokerCapabilities = CMPI_MB_InstanceManipulation | CMPI_MB_AssociationTraversal;
     table.brokerVersion = CMPICurrentVersion;
     table.brokerName = "cmpihost";
-    bind<&FT::prepareAttachThread, &prepareAttachThread>(table, "prepareAttachThread");
-    bind<&FT::attachThread, &attachThread>(table, "attachThread");
-    bind<&FT::detachThread, &detachThread>(table, "detachThread");
+    bindAttachment(table);
     bind<&FT::enumerateInstanceNames, &enumerateInstanceNames>(table, "enumerateInstanceNames");
     bind<&FT::enumerateInstances, &enumerateInstances>(table, "enumerateInstances");
     bind<&FT::getInstance, &getInstance>(table, "getInstance");
