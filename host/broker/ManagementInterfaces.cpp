@@ -145,8 +145,23 @@ std::string listed(const std::vector<std::string>& names) {
     return text;
 }
 
+/// The MI names of the factories among functions, each once.
+std::vector<std::string> namesIn(const std::vector<std::string>& functions) {
+    std::vector<std::string> names;
+    for (const std::string& function : functions) {
+        std::string name = nameInFactory(function);
+        if (!name.empty() && name != "_Generic") names.push_back(std::move(name));
+    }
+    std::sort(names.begin(), names.end());
+    names.erase(std::unique(names.begin(), names.end()), names.end());
+    return names;
+}
+
 /// What was looked for in vain: both names of all factories.
 std::string noFactory(const std::string& file, const std::string& provider) {
+    const std::vector<std::string> others = namesIn(exportedFunctions(file));
+    if (!others.empty())
+        return file + ": there is no provider " + provider + " in it, but " + listed(others);
     std::vector<std::string> names;
     for (const Interface which : allInterfaces) names.push_back(factoryName(provider, which));
     for (const Interface which : allInterfaces) names.push_back(factoryName("_Generic", which));
@@ -167,18 +182,10 @@ std::string factoryName(const std::string& provider, Interface which) {
 
 std::string providerName(const std::string& file, const std::vector<std::string>& functions,
                          const std::string& otherwise) {
-    std::vector<std::string> names;
-    bool generic = false;
-    for (const std::string& function : functions) {
-        const std::string name = nameInFactory(function);
-        if (name == "_Generic") {
-            generic = true;
-        } else if (!name.empty()) {
-            names.push_back(name);
-        }
-    }
-    std::sort(names.begin(), names.end());
-    names.erase(std::unique(names.begin(), names.end()), names.end());
+    const std::vector<std::string> names = namesIn(functions);
+    const bool generic = std::any_of(functions.begin(), functions.end(), [](const auto& each) {
+        return nameInFactory(each) == "_Generic";
+    });
     if (names.size() == 1) return names.front();
     if (names.empty() && generic) return otherwise;
     if (names.empty()) throw LoadError(noFactory(file, "NAME"));
