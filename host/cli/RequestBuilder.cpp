@@ -273,19 +273,4 @@ OperationRequest buildRequest(const CommandLine& commandLine, const Schema& sche
     return request;
 }
 
-InstanceValue withoutUnlisted(InstanceValue instance, const std::vector<std::string>& list,
-                              const Schema& schema) {
-    NameSet kept;
-    for (const std::string& name : list) kept.insert(base::toLower(name));
-    for (const KeyBinding& key : instance.path.keys) kept.insert(base::toLower(key.name));
-    const auto unlisted = [&](const PropertyValue& property) {
-        return kept.count(base::toLower(property.name)) == 0 &&
-               !schema.isKey(instance.path.className, property.name);
-    };
-    auto& properties = instance.properties;
-    properties.erase(std::remove_if(properties.begin(), properties.end(), unlisted),
-                     properties.end());
-    return instance;
-}
-
 }  // namespace cmpihost

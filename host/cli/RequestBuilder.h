@@ -14,10 +14,6 @@ namespace cmpihost {
 OperationRequest buildRequest(const CommandLine& commandLine, const Schema& schema,
                               const ClassCatalogue& catalogue);
 
-/// The instance without the properties that the list does not name. Keys stay, as clients expect.
-InstanceValue withoutUnlisted(InstanceValue instance, const std::vector<std::string>& list,
-                              const Schema& schema);
-
 }  // namespace cmpihost
 
 #endif

@@ -26,6 +26,7 @@
 #include "host/cli/ProviderHost.h"
 #include "host/cli/ProviderRecords.h"
 #include "host/cli/RequestBuilder.h"
+#include "host/cli/Results.h"
 #include "host/cli/Sources.h"
 #include "host/cli/Stopwatch.h"
 #include "host/cli/Tree.h"
@@ -37,34 +38,8 @@ namespace fs = std::filesystem;
 
 namespace {
 
-bool yieldsPaths(Operation operation) {
-    return operation == Operation::EnumerateInstanceNames ||
-           operation == Operation::AssociatorNames || operation == Operation::ReferenceNames ||
-           operation == Operation::CreateInstance;
-}
-
-/// Not even an empty list in JSON: there is no result to be empty.
-bool yieldsNothing(Operation operation) {
-    return operation == Operation::ModifyInstance || operation == Operation::DeleteInstance;
-}
-
 bool isNotFound(const OperationResult& result) {
     return result.rc == CMPI_RC_ERR_NOT_FOUND;
-}
-
-void printResult(const OperationRequest& request, OperationResult result, const Schema& schema,
-                 Printer& printer) {
-    if (yieldsNothing(request.operation)) return;
-    if (yieldsPaths(request.operation)) {
-        printer.print(result.paths);
-        return;
-    }
-    if (request.properties) {
-        for (InstanceValue& instance : result.instances) {
-            instance = withoutUnlisted(std::move(instance), *request.properties, schema);
-        }
-    }
-    printer.print(result.instances);
 }
 
 /// The work and what its parts have in common.

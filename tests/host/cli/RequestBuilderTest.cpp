@@ -1,4 +1,5 @@
 #include "host/cli/RequestBuilder.h"
+#include "host/cli/Results.h"
 
 #include <gmock/gmock.h>
 
