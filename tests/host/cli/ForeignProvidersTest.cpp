@@ -107,6 +107,23 @@ TEST(ForeignProviders, LoadByThemselves) {
     EXPECT_EQ(things.err, "");
 }
 
+TEST(ForeignProviders, AreCheckedByWhatTheFileOfASuperclassDeclares) {
+    const TemporaryDirectory folder;
+    folder.write("a.mof", "class TEST_Part : STD_Base { };");
+    const auto names = [&](const char* superclass) {
+        folder.write("b.mof", superclass);
+        return cmpihost({"--schema", folder.path(), "--provider",
+                         libraryFolder + "libforeign_parts.so", "--name", "Parts", "ein",
+                         "root/x:TEST_Part"});
+    };
+    EXPECT_EQ(names("class STD_Base { [Key] string Id; };").err, "");
+    const ProgramRun other = names("class STD_Base { [Key] uint8 Id; [Key] string Site; };");
+    EXPECT_EQ(other.err,
+              "caught: TEST_Part.Id is uint8, not string\n"
+              "caught: path of TEST_Part without key Site\n");
+    EXPECT_EQ(other.status, 5);
+}
+
 TEST(ForeignProviders, TellWhichInterfaceIsMissing) {
     const std::string first = "root/test:TEST_Thing.Name=\"first\"";
     const ProgramRun instances = cmpihost(alone("libforeign_links.so", {"ein", "TEST_Thing"}));
