@@ -9,6 +9,7 @@
 #include "host/broker/Value.h"
 #include "host/cli/PathParser.h"
 #include "host/cli/Suggestion.h"
+#include "host/cli/ValueText.h"
 #include "host/mof/MofLexer.h"
 #include "host/mof/ResolvedClass.h"
 
@@ -100,7 +101,7 @@ void describeFeature(const ResolvedFeature& feature, FeatureDescription& to) {
     to.description = textOf(qualifiers, "Description");
     to.values = valuesOf(qualifiers);
     to.units = textOf(qualifiers, "Units");
-    if (to.units.empty()) to.units = textOf(qualifiers, "PUnit");
+    if (to.units.empty()) to.units = unitWords(textOf(qualifiers, "PUnit"));
     to.maxLength = maxLengthOf(qualifiers);
     to.defaultValue = defaultText(feature.defaultValue);
     if (const mof::Qualifier* deprecated = findQualifier(qualifiers, "Deprecated")) {

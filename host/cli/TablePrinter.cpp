@@ -2,7 +2,6 @@
 // is escaped as the terminal needs it, before it is broken into lines and written.
 #include <algorithm>
 
-#include "base/Ascii.h"
 #include "host/cli/PathParser.h"
 #include "host/cli/Printer.h"
 #include "host/cli/ValueText.h"
@@ -14,7 +13,7 @@ namespace {
 /// What the schema says about the numbers of a property.
 struct Hints {
     const ValueMap& names;
-    bool kilobytes = false;
+    std::optional<SizeUnit> size = std::nullopt;
 };
 
 std::string withNote(const std::string& text, const std::string& note) {
@@ -25,9 +24,10 @@ std::string integerText(const Value& value, const Hints& hints) {
     const std::string* const name = nameOf(value, hints.names);
     if (name != nullptr) return withNote(value.toText(), *name);
     // Below the next unit the number is as readable as it gets.
-    const bool sized = hints.kilobytes && categoryOf(value) == TypeCategory::Unsigned &&
+    const bool sized = hints.size && categoryOf(value) == TypeCategory::Unsigned &&
                        value.unsignedInteger() >= 1024;
-    return withNote(value.toText(), sized ? humanReadableSize(value.unsignedInteger()) : "");
+    return withNote(value.toText(),
+                    sized ? humanReadableSize(value.unsignedInteger(), *hints.size) : "");
 }
 
 std::string scalarText(const Value& value, const Hints& hints) {
@@ -106,9 +106,8 @@ class TablePrinter final : public Printer {
     }
 
     Hints hintsOf(const std::string& className, const std::string& propertyName) const {
-        const std::string units = unitsOf(schema_, className, propertyName);
         return {schema_.valueMap(className, propertyName),
-                base::equalsIgnoreCase(units, "KiloBytes") || units == "kibibyte"};
+                sizeUnit(unitsOf(schema_, className, propertyName))};
     }
 
     std::ostream& stream_;

@@ -7,6 +7,7 @@
 #include <ctime>
 #include <limits>
 
+#include "base/Ascii.h"
 #include "base/CimDateTime.h"
 #include "base/CivilTime.h"
 #include "base/Utf8.h"
@@ -83,18 +84,6 @@ constexpr struct {
                 {"10^-3", "milli"}, {"10^-6", "micro"}, {"10^-9", "nano"}, {"2^10", "kibi"},
                 {"2^20", "mebi"},   {"2^30", "gibi"},   {"2^40", "tebi"}};
 
-/// A programmatic unit in words, as far as it is a unit with a power that has a prefix.
-std::string unitWords(const std::string& programmatic) {
-    std::string dense = programmatic;
-    dense.erase(std::remove(dense.begin(), dense.end(), ' '), dense.end());
-    const std::size_t times = dense.find('*');
-    if (times == std::string::npos) return programmatic;
-    for (const auto& row : prefixes) {
-        if (dense.substr(times + 1) == row.power) return row.prefix + dense.substr(0, times);
-    }
-    return programmatic;
-}
-
 }  // namespace
 
 TypeCategory categoryOf(const Value& value) {
@@ -129,17 +118,29 @@ TypeCategory categoryOf(const Value& value) {
     }
 }
 
-std::string humanReadableSize(std::uint64_t kibibytes) {
-    constexpr const char* units[] = {"KiB", "MiB", "GiB", "TiB", "PiB", "EiB", "ZiB"};
-    std::size_t unit = 0;
-    std::uint64_t whole = kibibytes;
+std::optional<SizeUnit> sizeUnit(const std::string& units) {
+    constexpr struct {
+        const char* words;
+        SizeUnit unit;
+    } rows[] = {{"Bytes", SizeUnit::Bytes},         {"byte", SizeUnit::Bytes},
+                {"KiloBytes", SizeUnit::Kibibytes}, {"kibibyte", SizeUnit::Kibibytes},
+                {"MegaBytes", SizeUnit::Mebibytes}, {"mebibyte", SizeUnit::Mebibytes}};
+    for (const auto& row : rows)
+        if (base::equalsIgnoreCase(units, row.words)) return row.unit;
+    return std::nullopt;
+}
+
+std::string humanReadableSize(std::uint64_t count, SizeUnit counted) {
+    constexpr const char* units[] = {"B", "KiB", "MiB", "GiB", "TiB", "PiB", "EiB", "ZiB", "YiB"};
+    auto unit = static_cast<std::size_t>(counted);
+    std::uint64_t whole = count;
     std::uint64_t rest = 0;
     while (whole >= 1024) {
         rest = whole % 1024;
         whole /= 1024;
         ++unit;
     }
-    if (unit == 0) return std::to_string(whole) + " KiB";
+    if (whole == count) return std::to_string(whole) + ' ' + units[unit];
     // In integers, so that the digits are the same on every machine. What rounds up to 1024 is one
     // of the next unit.
     std::uint64_t tenths = whole * 10 + (rest * 10 + 512) / 1024;
@@ -172,6 +173,17 @@ const std::string* nameOf(const Value& value, const ValueMap& names) {
     const bool named =
         number <= static_cast<std::uint64_t>(std::numeric_limits<std::int64_t>::max());
     return named ? names.find(static_cast<std::int64_t>(number)) : nullptr;
+}
+
+std::string unitWords(const std::string& programmatic) {
+    std::string dense = programmatic;
+    dense.erase(std::remove(dense.begin(), dense.end(), ' '), dense.end());
+    const std::size_t times = dense.find('*');
+    if (times == std::string::npos) return programmatic;
+    for (const auto& row : prefixes) {
+        if (dense.substr(times + 1) == row.power) return row.prefix + dense.substr(0, times);
+    }
+    return programmatic;
 }
 
 std::string unitsOf(const Schema& schema, const std::string& className,

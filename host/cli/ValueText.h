@@ -2,6 +2,7 @@
 #define HOST_CLI_VALUE_TEXT_H
 
 #include <cstdint>
+#include <optional>
 #include <string>
 
 #include "host/broker/Value.h"
@@ -29,9 +30,15 @@ enum class TypeCategory {
 /// Null for a null of any type; the accessor of Value that belongs to the category never throws.
 TypeCategory categoryOf(const Value& value);
 
-/// A size in the largest binary unit that leaves at least one: 8123456 gives "7.7 GiB", 512 gives
+/// What a property that holds a size counts, as CIM counts: each is 1024 of the one before.
+enum class SizeUnit { Bytes, Kibibytes, Mebibytes };
+
+/// Absent for a unit, as unitsOf() gives it, that is none of a size.
+std::optional<SizeUnit> sizeUnit(const std::string& units);
+
+/// A size in the largest binary unit that leaves at least one: 8123456 KiB give "7.7 GiB", 512 give
 /// "512 KiB". One digit after the point, rounded half up.
-std::string humanReadableSize(std::uint64_t kibibytes);
+std::string humanReadableSize(std::uint64_t count, SizeUnit unit);
 
 /// A CIM datetime for people: an instant in the time zone of this process ("2024-01-02 04:04:05
 /// +01:00"), an interval as "3 days 04:05:06". Empty for a text that is neither, and for one that
@@ -47,9 +54,12 @@ std::string isoDateTime(const std::string& cimText);
 /// The name of an integer, or null: it has none, or the value is something else.
 const std::string* nameOf(const Value& value, const ValueMap& names);
 
+/// A unit of the qualifier PUnit in words, with a prefix in place of the usual powers: "kibibyte"
+/// for "byte * 2^10". Any other one as it is.
+std::string unitWords(const std::string& programmatic);
+
 /// The unit in which a property counts, in words: its qualifier Units as written ("KiloBytes"),
-/// else its PUnit, with a prefix in place of the usual powers ("byte * 2^10" is "kibibyte"). Empty
-/// for none.
+/// else the words of its PUnit. Empty for none.
 std::string unitsOf(const Schema& schema, const std::string& className,
                     const std::string& propertyName);
 

@@ -331,7 +331,20 @@ TEST(HumanReadableSize, HasTheLargestUnitThatLeavesAtLeastOneAndRoundsIntoTheNex
                                                           {1024 * 1024 - 1, "1.0 GiB"},
                                                           {4294967295, "4.0 TiB"},
                                                           {18446744073709551615U, "16.0 ZiB"}};
-    for (const auto& [kibibytes, text] : rows) EXPECT_EQ(humanReadableSize(kibibytes), text);
+    for (const auto& [kibibytes, text] : rows)
+        EXPECT_EQ(humanReadableSize(kibibytes, SizeUnit::Kibibytes), text);
+    EXPECT_EQ(humanReadableSize(1023, SizeUnit::Bytes), "1023 B");
+    EXPECT_EQ(humanReadableSize(123456789, SizeUnit::Bytes), "117.7 MiB");
+    EXPECT_EQ(humanReadableSize(18446744073709551615U, SizeUnit::Mebibytes), "16.0 YiB");
+}
+
+TEST(SizeUnit, IsThatOfTheWordsInWhichClassesTellIt) {
+    EXPECT_EQ(sizeUnit("bytes"), SizeUnit::Bytes);
+    EXPECT_EQ(sizeUnit("byte"), SizeUnit::Bytes);
+    EXPECT_EQ(sizeUnit("KiloBytes"), SizeUnit::Kibibytes);
+    EXPECT_EQ(sizeUnit("mebibyte"), SizeUnit::Mebibytes);
+    for (const char* other : {"", "kilobyte", "Bits", "Bytes per Second"})
+        EXPECT_EQ(sizeUnit(other), std::nullopt) << other;
 }
 
 TEST(IsoDateTime, IsTheTrueInstantInUtcOrADuration) {
