@@ -79,6 +79,12 @@ Format parseFormat(const std::string& word) {
     return meaningOf(word, formats, "--format");
 }
 
+bool beginsWithLogLevel(const std::string& text) {
+    const std::string level = text.substr(0, text.find(','));
+    return std::any_of(std::begin(logLevels), std::end(logLevels),
+                       [&](const Word<LogLevel>& word) { return level == word.text; });
+}
+
 LogRequest parseLogRequest(const std::string& text) {
     const std::size_t comma = text.find(',');
     LogRequest request;

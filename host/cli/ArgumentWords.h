@@ -20,6 +20,9 @@ void appendNames(const std::string& list, std::vector<std::string>& to);
 /// The value of --format. Throws UsageError, with the words that there are.
 Format parseFormat(const std::string& word);
 
+/// Whether it may be meant as the value of --log.
+bool beginsWithLogLevel(const std::string& text);
+
 /// The value of --log, LEVEL[,CHANNEL]. Throws UsageError, with the words that there are.
 LogRequest parseLogRequest(const std::string& text);
 

@@ -118,7 +118,10 @@ ParsedCommandLine CommandLineParser::parse(int argumentCount, const char* const*
     const bool hasMof = operation && result_.operation != Operation::InvokeMethod;
     if (!hasMof && result_.format == Format::Mof)
         return refused("--format: " + name() + " has the forms table and json");
-    if (!operation && result_.value) return refused("--value: " + name() + " prints no values");
+    const bool modifies = operation && (result_.operation == Operation::ModifyInstance ||
+                                        result_.operation == Operation::DeleteInstance);
+    if ((!operation || modifies) && result_.value)
+        return refused("--value: " + name() + " prints no values");
     collectProperties();
     return {result_, {}, exitDone};
 }
@@ -133,11 +136,17 @@ ParsedCommandLine CommandLineParser::refused(const std::string& complaint) const
 /// CLI11's own complaints speak of subcommands, a word that the help does not know, and suggest
 /// nothing.
 std::string CommandLineParser::complaint(const CLI::ParseError& error) const {
+    const std::string text = error.what();
+    const std::string option = text.substr(0, text.find(':'));
+    if (dynamic_cast<const CLI::ArgumentMismatch*>(&error) != nullptr) {
+        const bool lacksValue = text.find("missing") != std::string::npos;
+        return option + (lacksValue ? ": the value is missing" : " stands more than once");
+    }
     const bool missing = dynamic_cast<const CLI::RequiredError*>(&error) != nullptr;
-    if (!missing && dynamic_cast<const CLI::ExtrasError*>(&error) == nullptr) return error.what();
+    if (!missing && dynamic_cast<const CLI::ExtrasError*>(&error) == nullptr) return text;
     const std::vector<std::string> unknown = app_.remaining(true);
     if (!unknown.empty()) return complaintAbout(unknown);
-    return name().empty() ? "a command is required" : error.what();
+    return name().empty() ? "a command is required" : text;
 }
 
 std::string CommandLineParser::complaintAbout(const std::vector<std::string>& unknown) const {
@@ -148,7 +157,12 @@ std::string CommandLineParser::complaintAbout(const std::vector<std::string>& un
         return (name().empty() ? "there is" : name() + " has") + " no option '" + written + "'" +
                didYouMean(written, optionNames());
     }
-    if (!name().empty()) return name() + " takes no argument '" + unknown.front() + "'";
+    if (!name().empty()) {
+        const bool meansLog =
+            app_.get_option("--log")->count() > 0 && beginsWithLogLevel(unknown.front());
+        return name() + " takes no argument '" + unknown.front() + "'" +
+               (meansLog ? "; did you mean --log=" + unknown.front() + "?" : "");
+    }
     std::vector<std::string> commands;
     for (const CommandRow& row : commandRows()) commands.emplace_back(row.name);
     return "there is no command '" + unknown.front() + "'" + didYouMean(unknown.front(), commands);
@@ -175,6 +189,7 @@ std::string CommandLineParser::name() const {
 void CommandLineParser::addHostOptions() {
     for (const OptionRow& row : optionRows()) addHostOption(row);
     app_.get_option("--bare")->excludes("--provider")->option_text(" ");
+    app_.get_option("--value")->excludes("--format")->option_text("PROPERTY");
     app_.get_option("--name")->needs("--provider")->option_text("NAME");
 }
 
