@@ -11,6 +11,7 @@
 #include "host/cli/Diagnostics.h"
 #include "host/cli/Explanation.h"
 #include "host/cli/Suggestion.h"
+#include "host/mof/ResolvedClass.h"
 
 namespace cmpihost {
 
@@ -21,10 +22,13 @@ std::string quoted(const std::string& name) {
 }
 
 /// The classes whose properties the answer can hold.
-std::vector<std::string> classesOf(const OperationRequest& request, const OperationResult& result) {
+std::vector<std::string> classesOf(const OperationRequest& request, const OperationResult& result,
+                                   const Schema& schema) {
     std::vector<std::string> classes;
-    if (request.operation == Operation::EnumerateInstances ||
-        request.operation == Operation::GetInstance) {
+    const bool asksOne = request.operation == Operation::EnumerateInstances ||
+                         request.operation == Operation::GetInstance;
+    // Instances tell more than a class that the schema knows by its name at most.
+    if (asksOne && (schema.find(request.path.className) != nullptr || result.instances.empty())) {
         classes.push_back(request.path.className);
     }
     for (const InstanceValue& instance : result.instances) {
@@ -51,7 +55,7 @@ std::vector<std::string> propertyNames(const Schema& schema, const std::string& 
 
 std::string notesOnProperties(const OperationRequest& request, const OperationResult& result,
                               const Schema& schema) {
-    const std::vector<std::string> classes = classesOf(request, result);
+    const std::vector<std::string> classes = classesOf(request, result, schema);
     std::string notes;
     for (const std::string& name : request.properties.value_or(std::vector<std::string>())) {
         const auto declaresIt = [&](const std::string& className) {
@@ -115,6 +119,32 @@ std::vector<std::string> keyNames(const Schema& schema, const std::string& class
     return names;
 }
 
+/// A class may inherit methods that the schema does not have: silent unless one is near.
+std::string noteOnMethod(const OperationRequest& request, const Schema& schema) {
+    const auto resolved = resolvedClass(schema, request.path.className);
+    if (request.operation != Operation::InvokeMethod || !resolved) return {};
+    std::vector<std::string> names;
+    for (const ResolvedMethod& method : resolved->methods) {
+        names.push_back(method.result.declared->name);
+        if (base::equalsIgnoreCase(names.back(), request.method)) return {};
+    }
+    const std::string meant = didYouMean(request.method, names);
+    return meant.empty() ? meant
+                         : noteLine("the class " + resolved->declared->name +
+                                    " declares no method " + quoted(request.method) + meant);
+}
+
+std::string noteOnLanguage(const OperationRequest& request) {
+    const std::vector<std::string> usual = {"WQL", "CQL", "DMTF:CQL"};
+    const std::string& name = request.queryLanguage;
+    const auto isIt = [&](const std::string& other) { return base::equalsIgnoreCase(name, other); };
+    const bool silent =
+        request.operation != Operation::ExecQuery || std::any_of(usual.begin(), usual.end(), isIt);
+    return silent ? ""
+                  : noteLine("the usual query languages are WQL, CQL and DMTF:CQL, not " +
+                             quoted(name));
+}
+
 /// A line for each name of a request that is most likely misspelt.
 std::string notesOnUnknownNames(const OperationRequest& request, const Schema& schema) {
     const std::string& asked = request.path.className;
@@ -123,6 +153,7 @@ std::string notesOnUnknownNames(const OperationRequest& request, const Schema& s
         if (name && !name->empty()) notes += noteOnClass(*name, schema);
     for (const auto& name : {request.role, request.resultRole})
         if (name) notes += noteOnRole(*name, schema);
+    notes += noteOnMethod(request, schema) + noteOnLanguage(request);
     const mof::Class* declared = schema.find(asked);
     for (const KeyBinding& key : request.path.keys) {
         if (declared == nullptr || schema.isKey(asked, key.name)) continue;

@@ -12,7 +12,7 @@ class NameNotes : public testing::Test {
   protected:
     void SetUp() override {
         schema_.add(
-            mof::parse("class Thing : CIM_Thing { [Key] string Name; boolean On; };"
+            mof::parse("class Thing : CIM_Thing { [Key] string Name; boolean On; uint32 Stop(); };"
                        "class Part : Thing { uint16 Weight; };"
                        "[Association] class Link { [Key] Thing REF One; };",
                        "x.mof"));
@@ -62,6 +62,8 @@ TEST_F(NameNotes, TellEachListedNameThatNoClassOfTheAnswerDeclares) {
     EXPECT_EQ(notes(Operation::EnumerateInstances, {"Weight"}, {"thing", "Part"}), "");
     EXPECT_EQ(notes(Operation::Associators, {"On", "Far"}, {"Part"}, "Other"),
               "the class Part declares no property 'Far'\n");
+    EXPECT_EQ(notes(Operation::EnumerateInstances, {"Wieght"}, {"Part"}, "CIM_Thing"),
+              "the class Part declares no property 'Wieght'; did you mean Weight?\n");
     EXPECT_EQ(notes(Operation::References, {"Two"}, {"Link"}),
               "the class Link declares no property 'Two'\n");
 }
@@ -109,6 +111,24 @@ TEST_F(NameNotes, TellWhichNamesOfAnAssociationRequestTheSchemaDoesNotHave) {
               "no association of the schema has a role 'Name'\n"
               "no association of the schema has a role 'Onne'; did you mean One?\n"
               "the class Thing declares no key 'Nmae'; did you mean Name?\n");
+}
+
+TEST_F(NameNotes, TellAMethodThatIsNearlyOneOfTheClassAndAQueryLanguageThatFewKnow) {
+    OperationRequest request = about("Part", Operation::InvokeMethod);
+    const OperationResult refused = failure(CMPI_RC_ERR_METHOD_NOT_FOUND);
+    for (const char* method : {"STOP", "Launch"}) {
+        request.method = method;
+        EXPECT_EQ(notes(request, refused), "") << method;
+    }
+    request.method = "Sotp";
+    EXPECT_EQ(notes(request, refused),
+              "the class Part declares no method 'Sotp'; did you mean Stop?\n");
+    OperationRequest query = about("", Operation::ExecQuery);
+    query.queryLanguage = "WLQ";
+    EXPECT_EQ(notes(query, failure(CMPI_RC_ERR_FAILED)),
+              "the usual query languages are WQL, CQL and DMTF:CQL, not 'WLQ'\n");
+    query.queryLanguage = "dmtf:cql";
+    EXPECT_EQ(notes(query, failure(CMPI_RC_ERR_FAILED)), "");
 }
 
 TEST_F(NameNotes, NameTheAssociationsWhereARequestThatNamesNoneIsRefused) {
