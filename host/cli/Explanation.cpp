@@ -42,24 +42,33 @@ std::string written(const RequestFilter& filter, const OperationRequest& request
            base::escapeForTerminal((request.*filter.field).value_or(std::string()));
 }
 
+/// The filters of the request as they were written, with "and" between.
+std::string filtersOf(const OperationRequest& request) {
+    std::string all;
+    for (const RequestFilter& filter : requestFilters) {
+        if (request.*filter.field) all += (all.empty() ? "" : " and ") + written(filter, request);
+    }
+    return all;
+}
+
 /// What the filters leave out of that many results.
 std::string reasonOfFilters(const OperationRequest& request, std::size_t without, const Ask& ask) {
     const std::string end =
         ": without filters there " + (without == 1 ? std::string("is one result")
                                                    : "are " + std::to_string(without) + " results");
-    std::string all;
     std::string notes;
     for (const RequestFilter& filter : requestFilters) {
         if (!(request.*filter.field)) continue;
-        all += (all.empty() ? "" : " and ") + written(filter, request);
         if (isEmpty(ask(filteredBy(request, filter.field))))
             notes += noteLine("nothing passes the filter " + written(filter, request) + end);
     }
-    return notes.empty() ? noteLine("nothing passes the filters " + all + " together" + end)
-                         : notes;
+    return notes.empty()
+               ? noteLine("nothing passes the filters " + filtersOf(request) + " together" + end)
+               : notes;
 }
 
-std::string reasonOfSource(const OperationRequest& request, const Ask& ask) {
+std::string reasonOfSource(const OperationRequest& request, const std::string& limits,
+                           const Ask& ask) {
     OperationRequest source;
     source.operation = Operation::GetInstance;
     source.path = request.path;
@@ -68,18 +77,19 @@ std::string reasonOfSource(const OperationRequest& request, const Ask& ask) {
     const bool missing =
         result.rc == CMPI_RC_ERR_NOT_FOUND || (result.rc == CMPI_RC_OK && result.instances.empty());
     if (missing) return noteLine("there is no instance " + path);
-    return noteLine("nothing is associated with " + path);
+    return noteLine("nothing is associated with " + path + limits);
 }
 
 std::string reasonOfAssociation(const OperationRequest& request, const Ask& ask) {
-    bool filtered = false;
-    for (const RequestFilter& filter : requestFilters)
-        filtered = filtered || (request.*filter.field).has_value();
-    if (filtered) {
+    const std::string filters = filtersOf(request);
+    if (!filters.empty()) {
         const OperationResult unfiltered = ask(filteredBy(request, nullptr));
+        // Who cannot answer without filters leaves open what there is without them.
+        if (unfiltered.rc != CMPI_RC_OK)
+            return reasonOfSource(request, " that passes " + filters, ask);
         if (!isEmpty(unfiltered)) return reasonOfFilters(request, count(unfiltered), ask);
     }
-    return reasonOfSource(request, ask);
+    return reasonOfSource(request, "", ask);
 }
 
 std::string reasonOfClass(const OperationRequest& request, const Schema& schema) {

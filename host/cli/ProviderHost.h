@@ -40,6 +40,10 @@ class ProviderHost {
     /// of an association may be another provider's.
     OperationResult askAnyone(const OperationRequest& request);
 
+    /// Asks as ask() for an explanation of another answer: what the broker catches meanwhile, and a
+    /// library that does not load, are kept to itself. The latter is answered CMPI_RC_ERR_FAILED.
+    OperationResult askAside(const OperationRequest& request);
+
     /// Why libraries that providers needed did not load.
     std::vector<std::string> takeLoadErrors();
 
@@ -52,6 +56,9 @@ class ProviderHost {
   private:
     Broker broker_;
     Router router_;
+    /// What was there to be told before a question that nobody is to be told of.
+    std::vector<std::string> violations_;
+    std::vector<std::string> loadErrors_;
 };
 
 }  // namespace cmpihost

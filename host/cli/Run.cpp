@@ -163,8 +163,9 @@ class Run {
                         const Schema& schema, ProviderHost& host) const {
         const std::string names = notesOnNames(request, answer, schema);
         if (!names.empty() || !isEmptyAnswer(request, answer)) return names;
-        return reasonForNothing(
-            request, schema, [&](const OperationRequest& question) { return host.ask(question); });
+        return reasonForNothing(request, schema, [&](const OperationRequest& question) {
+            return host.askAside(question);
+        });
     }
 
     std::unique_ptr<Printer> printer(const Schema& schema) const {
@@ -210,7 +211,7 @@ class Run {
     std::string recordNotes(const OperationRequest& request, const OperationResult& answer) const {
         std::string notes;
         if (answer.rc == CMPI_RC_OK && !isEmptyAnswer(request, answer)) return notes;
-        std::vector<std::string> records = failures_.texts();
+        std::vector<std::string> records = failures_->texts();
         for (const std::string& message : messages_.failures()) records.push_back(message);
         // What is shown anyway need not be told again.
         if (commandLine_.log) records.clear();
@@ -236,6 +237,7 @@ class Run {
     template <class Work>
     std::invoke_result_t<Work, ProviderHost&> withHost(const SchemaCatalogue& catalogue,
                                                        Work work) {
+        failures_.emplace();
         // The logging library reads its configuration when it is loaded, and again while it runs.
         std::optional<ScopedLogConfiguration> log;
         const std::string configuration = logConfiguration();
@@ -258,13 +260,15 @@ class Run {
             err_ << "caught: " << base::escapeForTerminal(violation) << '\n';
             caught_ = true;
         }
+        // Before the results: a reader that closes their pipe ends the program where it stands.
+        failures_.reset();
         return result;
     }
 
     /// A configuration that the user names goes before the host's own.
     std::string logConfiguration() const {
         if (commandLine_.log) return stderrConfiguration(*commandLine_.log);
-        return std::getenv("ZBLOG_CONF") == nullptr ? failures_.configuration() : std::string();
+        return std::getenv("ZBLOG_CONF") == nullptr ? failures_->configuration() : std::string();
     }
 
     const CommandLine& commandLine_;
@@ -272,7 +276,8 @@ class Run {
     std::ostream& out_;
     std::ostream& err_;
     Stopwatch stopwatch_;
-    const FailureRecords failures_;
+    /// While the libraries are loaded.
+    std::optional<FailureRecords> failures_;
     BrokerMessages messages_;
     /// Whether a library that a provider needed did not load, and whether anything was caught.
     bool notLoaded_ = false;

@@ -48,19 +48,25 @@ Registrations readRegistrations(const CommandLine& commandLine, const fs::path& 
     const auto& given = commandLine.registrations;
     const fs::path shipped = registrationFolder(programFolder);
     std::error_code error;
+    const bool needsNone = commandLine.bare || !commandLine.provider.empty();
+    std::string places = given.empty() ? shipped.string() : std::string();
+    for (const std::string& path : given) places += (places.empty() ? "" : ", ") + path;
+    const ProviderNotFound none("there are no registrations in " + base::escapeForTerminal(places) +
+                                " (--registration PATH names others, --provider FILE a library)");
     if (given.empty() && !fs::is_directory(shipped, error)) {
-        if (commandLine.bare || !commandLine.provider.empty()) return {};
-        throw ProviderNotFound("there are no registrations in " +
-                               base::escapeForTerminal(shipped.string()) +
-                               " (--registration PATH names others, --provider FILE a library)");
+        if (!needsNone) throw none;
+        return {};
     }
+    Registrations found;
     try {
-        return Registrations::read(given.empty()
-                                       ? std::vector<fs::path>{shipped}
-                                       : std::vector<fs::path>(given.begin(), given.end()));
+        found =
+            Registrations::read(given.empty() ? std::vector<fs::path>{shipped}
+                                              : std::vector<fs::path>(given.begin(), given.end()));
     } catch (const std::runtime_error& wrong) {
         throw ProviderNotFound(base::escapeForTerminal(wrong.what()));
     }
+    if (found.all().empty() && !needsNone) throw none;
+    return found;
 }
 
 }  // namespace cmpihost

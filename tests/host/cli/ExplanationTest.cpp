@@ -66,6 +66,18 @@ TEST(Explanation, TellsASourceThatIsNotThereFromOneThatNothingIsAssociatedWith) 
     };
     EXPECT_EQ(reasonForNothing(association("there"), Schema(), alone),
               "cmpihost: note: nothing is associated with ns:Thing.Name=\"there\"\n");
+    // One that answers nothing without its filters.
+    const auto strict = [](const OperationRequest& asked) {
+        OperationResult result;
+        result.rc = asked.operation == Operation::GetInstance ? CMPI_RC_OK : CMPI_RC_ERR_FAILED;
+        if (result.rc == CMPI_RC_OK) result.instances.push_back({asked.path, {}});
+        return result;
+    };
+    request = association("there");
+    request.assocClass = "Link";
+    EXPECT_EQ(reasonForNothing(request, Schema(), strict),
+              "cmpihost: note: nothing is associated with ns:Thing.Name=\"there\" that passes "
+              "--assoc-class Link\n");
 }
 
 TEST(Explanation, SaysWhatTheOtherOperationsLack) {

@@ -91,7 +91,7 @@ const char* const failure = "Could not find 'CSName' or 'Name' Key in Moniker\n"
 TEST(ProgramRecords, ExplainAnEmptyAnswer) {
     const std::string nothing =
         "cmpihost: note: nothing is associated with root/cimv2:KORVA_OperatingSystem."
-        "CreationClassName=\"x\"\n";
+        "CreationClassName=\"x\" that passes --assoc-class KORVA_InstalledOS\n";
     const ProgramRun run = emptyAnswer({});
     EXPECT_EQ(run.status, 0);
     EXPECT_EQ(run.err, nothing + "cmpihost: note: the provider recorded: " + failure);

@@ -88,6 +88,47 @@ TEST_F(LibraryFile, WithoutFolderIsTakenFromTheCurrentOne) {
     EXPECT_THAT(run.out, HasSubstr(moonName));
 }
 
+TEST(QuestionsThatExplainAnEmptyAnswer, LeaveWhatTheyMeetThemselvesUntold) {
+    const TemporaryDirectory folder;
+    const std::string found = "\nprovider: OSStatusFacade\nlocation: " KORVA_STAND_IN
+                              "\ntype: instance association\nnamespace: *\n";
+    folder.write("a.reg", "[CIM_Faulty]" + found + "[KORVA_RunningOS]" + found +
+                              "[KORVA_InstalledOS]\nprovider: Nobody\nlocation: nowhere\n"
+                              "type: association\nnamespace: *\n");
+    const auto ask = [&](Words words) {
+        words.insert(words.begin(), {"--registration", folder.path()});
+        return cmpihost(words);
+    };
+    // The class's instance, asked for by itself, is null.
+    EXPECT_EQ(ask({"gi", "CIM_Faulty.A=1"}).status, 5);
+    const ProgramRun run = ask({"rin", "CIM_Faulty.A=1", "--result-class", "KORVA_RunningOS"});
+    EXPECT_EQ(run.status, 0);
+    EXPECT_EQ(run.err, "cmpihost: note: there is no instance root/cimv2:CIM_Faulty.A=1\n");
+    // Asked for itself, the library that is missing is told.
+    EXPECT_EQ(ask({"rin", "CIM_Faulty.A=1"}).status, 3);
+}
+
+TEST(EmptyRegistrations, ExitWithThreeUnlessALibraryIsNamed) {
+    const TemporaryDirectory folder;
+    const ProgramRun run = cmpihost({"--registration", folder.path(), "ei", "X"});
+    EXPECT_EQ(run.status, 3);
+    EXPECT_EQ(run.err, "cmpihost: there are no registrations in " + folder.path() +
+                           " (--registration PATH names others, --provider FILE a library)\n");
+    EXPECT_EQ(cmpihost({"--registration", folder.path(), "--bare", "tree"}).status, 1);
+}
+
+TEST(AFolderOfRecords, IsGoneAlsoWhenNobodyReadsTheResults) {
+    const TemporaryDirectory folder;
+    const ProgramRun run = runProgram(
+        "/bin/sh",
+        {"-c",
+         "mkfifo \"$1/pipe\"; mkdir \"$1/temporary\"; (: <\"$1/pipe\") & exec 4>\"$1/pipe\"; "
+         "wait; TMPDIR=$1/temporary exec \"$0\" ein KORVA_OperatingSystem >&4",
+         KORVA_CMPIHOST, folder.path()});
+    EXPECT_EQ(run.status, -1) << "no signal ended it";
+    EXPECT_TRUE(fs::is_empty(folder.path("temporary")));
+}
+
 /// The program in a folder of its own, with the schema and nothing else around it.
 class ProgramElsewhere : public LibraryFile {
   protected:
