@@ -99,7 +99,8 @@ ObjectPathValue completedPath(const ObjectPathValue& path,
     std::vector<ObjectPathValue> matching;
     std::copy_if(names.begin(), names.end(), std::back_inserter(matching),
                  [&](const ObjectPathValue& name) { return hasKeys(name, path.keys); });
-    if (matching.size() != 1) throw UsageError(complaint(path.className, names, matching));
+    if (matching.empty()) throw NoSuchInstance(complaint(path.className, names, matching));
+    if (matching.size() > 1) throw UsageError(complaint(path.className, names, matching));
     // A name that a provider gives may lack the namespace.
     ObjectPathValue result = std::move(matching.front());
     result.nameSpace = path.nameSpace;

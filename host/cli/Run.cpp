@@ -71,6 +71,8 @@ class Run {
             return failed(error.what(), exitNotLoaded);
         } catch (const LoadError& error) {
             return failed(base::escapeForTerminal(error.what()), exitNotLoaded);
+        } catch (const NoSuchInstance& error) {
+            return failed(error.what(), exitNothingFound);
         } catch (const UsageError& error) {
             return failed(error.what(), exitUsage);
         }

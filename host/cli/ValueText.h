@@ -38,7 +38,7 @@ std::optional<SizeUnit> sizeUnit(const std::string& units);
 
 /// A size in the largest binary unit that leaves at least one: 8123456 KiB give "7.7 GiB", 512 give
 /// "512 KiB". One digit after the point, rounded half up.
-std::string humanReadableSize(std::uint64_t count, SizeUnit unit);
+std::string humanReadableSize(std::uint64_t count, SizeUnit counted);
 
 /// A CIM datetime for people: an instant in the time zone of this process ("2024-01-02 04:04:05
 /// +01:00"), an interval as "3 days 04:05:06". Empty for a text that is neither, and for one that

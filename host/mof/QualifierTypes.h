@@ -20,7 +20,7 @@ struct Inheritance {
 class QualifierTypes {
   public:
     /// Throws mof::MofError when the qualifier is declared already, and otherwise.
-    void add(const mof::QualifierType& declared);
+    void add(const mof::QualifierType& added);
 
     /// The declaration, or null for one that no MOF declares.
     const mof::QualifierType* find(const std::string& name) const;

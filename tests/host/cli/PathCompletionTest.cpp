@@ -36,7 +36,7 @@ class PathCompletion : public testing::Test {
     std::string completed(const std::string& text, const std::vector<ObjectPathValue>& names) {
         try {
             return toString(completedPath(path(text), names));
-        } catch (const UsageError& error) {
+        } catch (const std::runtime_error& error) {
             return error.what();
         }
     }
@@ -145,6 +145,7 @@ TEST_F(PathCompletion, ListsTheNamesWhenNoneHasTheGivenKeys) {
             << given;
     }
     EXPECT_EQ(completed("Thing", {}), "the path lacks keys, and there is no instance of Thing");
+    EXPECT_THROW(completedPath(path("Thing"), {}), NoSuchInstance);
 }
 
 TEST_F(PathCompletion, ListsTheNamesThatHaveTheGivenKeysWhenTheyAreSeveral) {

@@ -22,8 +22,8 @@ static CMPIStatus AssociationCleanup(CMPIAssociationMI* mi, const CMPIContext* c
 
 static CMPIStatus AssociatorNames(CMPIAssociationMI* mi, const CMPIContext* context,
                                   const CMPIResult* result, const CMPIObjectPath* path,
-                                  const char* assocClass, const char* resultClass,
-                                  const char* role, const char* resultRole) {
+                                  const char* assocClass, const char* resultClass, const char* role,
+                                  const char* resultRole) {
     CMPIStatus status = {CMPI_RC_OK, NULL};
     CMPIEnumeration* const all = others(context, path, &status);
     (void)mi, (void)assocClass, (void)resultClass, (void)role, (void)resultRole;
@@ -66,9 +66,9 @@ static CMPIStatus ReferenceNames(CMPIAssociationMI* mi, const CMPIContext* conte
     CMReturn(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
-static CMPIAssociationMIFT table = {
-    CMPICurrentVersion, CMPICurrentVersion, "Links",    AssociationCleanup,
-    Associators,        AssociatorNames,    References, ReferenceNames};
+static CMPIAssociationMIFT table = {CMPICurrentVersion, CMPICurrentVersion, "Links",
+                                    AssociationCleanup, Associators,        AssociatorNames,
+                                    References,         ReferenceNames};
 
 CMPI_EXTERN_C CMPIAssociationMI* _Generic_Create_AssociationMI(const CMPIBroker* given,
                                                                const CMPIContext* context,

@@ -62,8 +62,8 @@ static CMPIStatus modify(CMPIInstanceMI* mi, const CMPIContext* context, const C
     CMReturn(CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
-static CMPIStatus deletion(CMPIInstanceMI* mi, const CMPIContext* context,
-                           const CMPIResult* result, const CMPIObjectPath* path) {
+static CMPIStatus deletion(CMPIInstanceMI* mi, const CMPIContext* context, const CMPIResult* result,
+                           const CMPIObjectPath* path) {
     (void)mi, (void)context, (void)result, (void)path;
     CMReturn(CMPI_RC_ERR_NOT_SUPPORTED);
 }
@@ -76,8 +76,7 @@ static CMPIStatus query(CMPIInstanceMI* mi, const CMPIContext* context, const CM
 
 #define TABLE(name)                                                                              \
     {                                                                                            \
-        {210,  210,    name,   cleanup,  names, instances, instances,                            \
-         create, modify, deletion, query},                                                       \
+        {210, 210, name, cleanup, names, instances, instances, create, modify, deletion, query}, \
             NULL                                                                                 \
     }
 static struct InstanceTable210 parts = TABLE("Parts");

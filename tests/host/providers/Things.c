@@ -59,8 +59,7 @@ static CMPIStatus EnumInstanceNames(CMPIInstanceMI* mi, const CMPIContext* conte
     int index;
     (void)mi, (void)context, (void)path;
     for (index = 0; index < most; ++index) {
-        if (things[index] != NULL)
-            CMReturnObjectPath(result, CMGetObjectPath(things[index], NULL));
+        if (things[index] != NULL) CMReturnObjectPath(result, CMGetObjectPath(things[index], NULL));
     }
     CMReturnDone(result);
     CMReturn(CMPI_RC_OK);
@@ -98,9 +97,9 @@ static CMPIStatus told(const char* what, const CMPIInstance* instance, const cha
     for (index = 0; index < count; ++index) {
         CMPIString* name = NULL;
         const CMPIData data = CMGetPropertyAt(instance, index, &name, NULL);
-        used += (size_t)snprintf(text + used, sizeof text - used, " %s:%x%s",
-                                 CMGetCharsPtr(name, NULL), (unsigned)data.type,
-                                 CMIsNullValue(data) ? "(null)" : "");
+        used +=
+            (size_t)snprintf(text + used, sizeof text - used, " %s:%x%s", CMGetCharsPtr(name, NULL),
+                             (unsigned)data.type, CMIsNullValue(data) ? "(null)" : "");
     }
     for (; list != NULL && *list != NULL; ++list)
         used += (size_t)snprintf(text + used, sizeof text - used, " [%s]", *list);
@@ -144,8 +143,8 @@ static CMPIStatus DeleteInstance(CMPIInstanceMI* mi, const CMPIContext* context,
 
 /* Knows one query of one language. */
 static CMPIStatus ExecQuery(CMPIInstanceMI* mi, const CMPIContext* context,
-                            const CMPIResult* result, const CMPIObjectPath* path,
-                            const char* query, const char* language) {
+                            const CMPIResult* result, const CMPIObjectPath* path, const char* query,
+                            const char* language) {
     if (strcmp(language, "DMTF:CQL") != 0)
         CMReturnWithChars(broker, CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED, language);
     if (strcmp(query, "SELECT * FROM TEST_Thing") != 0)
