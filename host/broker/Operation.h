@@ -62,6 +62,13 @@ constexpr bool isAssociationOperation(Operation operation) noexcept {
     return interfaceFor(operation) == Interface::Association;
 }
 
+/// Whether its results are paths, without properties.
+constexpr bool yieldsPaths(Operation operation) noexcept {
+    return operation == Operation::EnumerateInstanceNames ||
+           operation == Operation::AssociatorNames || operation == Operation::ReferenceNames ||
+           operation == Operation::CreateInstance;
+}
+
 /// What accompanies a request: flags, and who sent it.
 struct RequestContext {
     CMPIFlags flags = 0;

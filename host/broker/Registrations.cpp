@@ -191,11 +191,13 @@ bool collide(const Registration& left, const Registration& right) {
 
 }  // namespace
 
+bool Registration::isFor(const std::string& nameSpace) const {
+    return std::any_of(nameSpaces.begin(), nameSpaces.end(),
+                       [&](const auto& each) { return each == "*" || same(each, nameSpace); });
+}
+
 bool Registration::serves(Interface type, const std::string& nameSpace) const {
-    const bool typed = std::find(types.begin(), types.end(), type) != types.end();
-    return typed && std::any_of(nameSpaces.begin(), nameSpaces.end(), [&](const auto& each) {
-               return each == "*" || same(each, nameSpace);
-           });
+    return std::find(types.begin(), types.end(), type) != types.end() && isFor(nameSpace);
 }
 
 Registrations Registrations::read(const std::vector<fs::path>& paths) {
@@ -233,10 +235,8 @@ const Registration* Registrations::find(const std::string& className, const std:
 }
 
 bool Registrations::names(const std::string& nameSpace) const {
-    return std::any_of(sections_.begin(), sections_.end(), [&](const Registration& section) {
-        return std::any_of(section.nameSpaces.begin(), section.nameSpaces.end(),
-                           [&](const auto& each) { return each == "*" || same(each, nameSpace); });
-    });
+    return std::any_of(sections_.begin(), sections_.end(),
+                       [&](const Registration& section) { return section.isFor(nameSpace); });
 }
 
 std::vector<std::string> Registrations::nameSpaces() const {

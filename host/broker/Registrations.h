@@ -35,7 +35,9 @@ struct Registration {
     std::filesystem::path file{};
     std::size_t line = 0;
 
-    /// Whether it serves the class's namespace by that interface. Names compare without case.
+    /// Whether the namespace is one of its own. Names compare without case.
+    bool isFor(const std::string& nameSpace) const;
+    /// Whether it serves the class in that namespace by that interface.
     bool serves(Interface type, const std::string& nameSpace) const;
 };
 

@@ -13,12 +13,6 @@ namespace cmpihost {
 
 namespace {
 
-bool yieldsKeysOnly(Operation operation) {
-    return operation == Operation::EnumerateInstanceNames ||
-           operation == Operation::AssociatorNames || operation == Operation::ReferenceNames ||
-           operation == Operation::CreateInstance;
-}
-
 bool yieldsAssociations(Operation operation) {
     return operation == Operation::References || operation == Operation::ReferenceNames;
 }
@@ -48,7 +42,7 @@ std::vector<std::string> possibleNames(const OperationRequest& request, const Sc
         if (!base.empty() && !schema.isA(className, base)) continue;
         if (yieldsAssociations(request.operation) && !schema.isAssociation(className)) continue;
         for (const mof::Feature* property : schema.properties(className)) {
-            if (!yieldsKeysOnly(request.operation) || schema.isKey(className, property->name)) {
+            if (!yieldsPaths(request.operation) || schema.isKey(className, property->name)) {
                 names.push_back(property->name);
             }
         }
@@ -62,7 +56,7 @@ std::string whatLacksIt(const OperationRequest& request, const std::string& base
     if (request.operation == Operation::InvokeMethod) {
         return "the method " + base::escapeForTerminal(request.method) + " answers with no value";
     }
-    const std::string what = yieldsKeysOnly(request.operation) ? "key" : "property";
+    const std::string what = yieldsPaths(request.operation) ? "key" : "property";
     if (!base.empty()) return "the class " + schema.find(base)->name + " declares no " + what;
     const std::string kind = yieldsAssociations(request.operation) ? "association" : "class";
     return "no " + kind + " of the schema declares a " + what;

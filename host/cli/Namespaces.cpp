@@ -12,8 +12,6 @@ namespace cmpihost {
 
 namespace {
 
-constexpr const char* anyNamespace = "*";
-
 /// By their names in lower case, since letter case does not count.
 using Names = std::map<std::string, std::string>;
 
@@ -21,13 +19,6 @@ std::vector<std::string> valuesOf(const Names& names) {
     std::vector<std::string> result;
     for (const auto& entry : names) result.push_back(entry.second);
     return result;
-}
-
-bool isFor(const Registration& registration, const std::string& nameSpace) {
-    return std::any_of(registration.nameSpaces.begin(), registration.nameSpaces.end(),
-                       [&](const std::string& each) {
-                           return each == anyNamespace || base::equalsIgnoreCase(each, nameSpace);
-                       });
 }
 
 }  // namespace
@@ -40,7 +31,7 @@ std::vector<NamespaceSummary> namespaceSummaries(const Registrations& registrati
     for (const std::string& name : valuesOf(nameSpaces)) {
         Names classes;
         for (const Registration& registration : registrations.all()) {
-            if (isFor(registration, name))
+            if (registration.isFor(name))
                 classes.emplace(base::toLower(registration.className), registration.className);
         }
         result.push_back({name, valuesOf(classes)});

@@ -11,12 +11,6 @@ namespace cmpihost {
 
 namespace {
 
-bool yieldsPaths(Operation operation) {
-    return operation == Operation::EnumerateInstanceNames ||
-           operation == Operation::AssociatorNames || operation == Operation::ReferenceNames ||
-           operation == Operation::CreateInstance;
-}
-
 /// Not even an empty list in JSON: there is no result to be empty.
 bool yieldsNothing(Operation operation) {
     return operation == Operation::ModifyInstance || operation == Operation::DeleteInstance;
