@@ -54,7 +54,7 @@ lint_packages="clang-format clang-tidy shellcheck git"
 
 # What every build needs; g++-multilib compiles 32-bit code on a 64-bit machine.
 build_packages="cmake ninja-build g++ libc6-dev googletest libcli11-dev nlohmann-json3-dev \
-    libvalijson-dev"
+    libvalijson-dev libmicrohttpd-dev libexpat1-dev"
 [ "$(dpkg --print-architecture 2>/dev/null)" = i386 ] || build_packages="$build_packages g++-multilib"
 
 # What packs; binutils of i386 are for its packages on another machine.

@@ -1,0 +1,60 @@
+#ifndef HOST_SERVER_ELEMENT_WRITER_H
+#define HOST_SERVER_ELEMENT_WRITER_H
+
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "host/broker/Value.h"
+
+/// Writes the elements of responses, in the form that the weakest clients read: each function
+/// appends to `xml`. What is no XML in a text (control characters, bytes that are no UTF-8) becomes
+/// U+FFFD. Any threads may call these.
+namespace cmpihost::server {
+
+/// Appends a text as content of an element, or as the value of an attribute in double quotes.
+void writeText(std::string& xml, std::string_view text);
+void writeAttributeText(std::string& xml, std::string_view text);
+
+/// Where paths are: what HOST says, and the namespace of those that have none of their own.
+struct Site {
+    std::string hostName{};
+    std::string nameSpace{};
+};
+
+/// VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY; nothing for null.
+void writeValue(std::string& xml, const Value& value, const Site& site);
+
+/// INSTANCENAME, and that in an INSTANCEPATH.
+void writeInstanceName(std::string& xml, const ObjectPathValue& path, const Site& site);
+void writeInstancePath(std::string& xml, const ObjectPathValue& path, const Site& site);
+
+/// CLASSPATH.
+void writeClassPath(std::string& xml, const std::string& className, const Site& site);
+
+/// INSTANCE. Properties that are null are left out, for that is what NULL looks like to all
+/// clients; `classOrigin` writes CLASSORIGIN where the provider told one.
+void writeInstance(std::string& xml, const InstanceValue& instance, const Site& site,
+                   bool classOrigin = false);
+
+/// A parameter that comes out of an operation or method: PARAMVALUE.
+void writeParameter(std::string& xml, std::string_view name, const Value& value, const Site& site);
+
+/// Writes each element of a list in one of the forms that operations answer.
+void writeNamedInstances(std::string& xml, const std::vector<InstanceValue>& instances,
+                         const Site& site, bool classOrigin);
+void writeObjectsWithPath(std::string& xml, const std::vector<InstanceValue>& instances,
+                          const Site& site, bool classOrigin);
+void writeInstancesWithPath(std::string& xml, const std::vector<InstanceValue>& instances,
+                            const Site& site, bool classOrigin);
+void writeInstanceNames(std::string& xml, const std::vector<ObjectPathValue>& paths,
+                        const Site& site);
+void writeInstancePaths(std::string& xml, const std::vector<ObjectPathValue>& paths,
+                        const Site& site);
+void writeObjectPaths(std::string& xml, const std::vector<ObjectPathValue>& paths,
+                      const Site& site);
+
+}  // namespace cmpihost::server
+
+#endif

@@ -1,0 +1,42 @@
+#ifndef HOST_SERVER_INTEROP_H
+#define HOST_SERVER_INTEROP_H
+
+#include <string>
+#include <vector>
+
+#include "host/broker/Operation.h"
+#include "host/mof/Schema.h"
+#include "host/server/Statistics.h"
+
+namespace cmpihost::server {
+
+/// The interop namespace, "root/interop": the classes by which clients find out what a server has
+/// (CIM_ObjectManager, CIM_Namespace, __Namespace). Any threads may ask.
+class Interop {
+  public:
+    static constexpr const char* nameSpace = "root/interop";
+
+    /// `nameSpaces` are all that the server has. `statistics` outlives this object.
+    Interop(std::string hostName, std::vector<std::string> nameSpaces,
+            const Statistics& statistics);
+
+    const Schema& schema() const noexcept { return schema_; }
+    const ClassCatalogue& catalogue() const noexcept { return catalogue_; }
+
+    /// Whether the class, or one below it, is one of those that are served here.
+    bool serves(const std::string& className) const;
+
+    /// Answers as a provider of these classes does.
+    OperationResult ask(const OperationRequest& request) const;
+
+  private:
+    const std::string hostName_;
+    const std::vector<std::string> nameSpaces_;
+    const Statistics& statistics_;
+    const Schema schema_;
+    const SchemaCatalogue catalogue_;
+};
+
+}  // namespace cmpihost::server
+
+#endif

@@ -1,0 +1,3 @@
+#include "host/server/OpenEnumerations.h"
+
+namespace cmpihost::server {}  // namespace cmpihost::server

@@ -1,0 +1,10 @@
+#include "host/server/Operations.h"
+
+namespace cmpihost::server {
+
+const std::vector<OperationRow>& pullOperations() {
+    static const std::vector<OperationRow> rows;
+    return rows;
+}
+
+}  // namespace cmpihost::server
