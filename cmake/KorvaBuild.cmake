@@ -20,7 +20,7 @@ math(EXPR korva_word_size "8 * ${CMAKE_SIZEOF_VOID_P}")
 set(KORVA_WORD_SIZE "${korva_word_size}" CACHE STRING "Word size of everything that is built: 32 or 64")
 set(KORVA_SANITIZE "" CACHE STRING "Value for -fsanitize=, empty for none")
 option(KORVA_WERROR "Treat warnings as errors" OFF)
-option(KORVA_UNITY "Compile the files of each test program, and those of cmpihost, as one" OFF)
+option(KORVA_UNITY "Compile the files of cmpihost as one, as those of each test program are" OFF)
 
 include(CheckPIESupported)
 check_pie_supported()

@@ -198,9 +198,9 @@ TEST(FileStates, AreEqualWhereEverythingIsThatAChangeWouldChange) {
         [](FileState& each) { each.changed.nanoseconds = 1; },
     };
     for (const auto& change : changes) {
-        FileState other;
-        change(other);
-        EXPECT_FALSE(state == other) << &change - changes;
+        FileState altered;
+        change(altered);
+        EXPECT_FALSE(state == altered) << &change - changes;
     }
 }
 

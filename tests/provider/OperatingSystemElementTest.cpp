@@ -76,10 +76,10 @@ TEST_F(OperatingSystemElement, FiltersReadAndMoveNoMoreThanTheyNeed) {
     const auto readings = [this] {
         return host->calls(Operation::ReadText) + host->calls(Operation::ComputerName);
     };
-    OperatingSystem none;  // on a host without a node
-    none.setFilter(OperatingSystem::CSNameFilter, "Host1");
-    none.setFilter(OperatingSystem::NameFilter, "a");
-    EXPECT_FALSE(static_cast<bool>(none));
+    OperatingSystem absent;  // on a host without a node
+    absent.setFilter(OperatingSystem::CSNameFilter, "Host1");
+    absent.setFilter(OperatingSystem::NameFilter, "a");
+    EXPECT_FALSE(static_cast<bool>(absent));
     EXPECT_EQ(readings(), 0U);
     addNodes({"a", "a", "b"});
     OperatingSystem element;

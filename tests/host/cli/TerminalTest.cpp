@@ -53,10 +53,10 @@ TEST(Terminal, HasTheLocaleOfTheFirstVariableThatSaysOne) {
 }
 
 TEST(Terminal, ShowsNothingThatItCannot) {
-    const std::string text = "caf\u00e9\x1b[31m \U0001f600\xff";
-    EXPECT_EQ((Terminal{80, true}.shown(text)), "caf\u00e9\\x1b[31m \U0001f600\\xff");
-    EXPECT_EQ((Terminal{80, false}.shown(text)), "caf\\u00e9\\x1b[31m \\U0001f600\\xff");
-    EXPECT_EQ((Terminal{0, false}.shown(text)), "caf\u00e9\\x1b[31m \U0001f600\\xff");
+    const std::string written = "caf\u00e9\x1b[31m \U0001f600\xff";
+    EXPECT_EQ((Terminal{80, true}.shown(written)), "caf\u00e9\\x1b[31m \U0001f600\\xff");
+    EXPECT_EQ((Terminal{80, false}.shown(written)), "caf\\u00e9\\x1b[31m \\U0001f600\\xff");
+    EXPECT_EQ((Terminal{0, false}.shown(written)), "caf\u00e9\\x1b[31m \U0001f600\\xff");
 }
 
 TEST(ColumnsOf, CountsWideCharactersTwiceAndCombiningMarksNot) {
@@ -69,12 +69,12 @@ TEST(ColumnsOf, CountsWideCharactersTwiceAndCombiningMarksNot) {
 }
 
 TEST(Wrap, BreaksAtBlanksAndAlignsWhatFollows) {
-    const std::string text = "one two three four five six seven";
-    EXPECT_EQ(wrap(text, 0), text);
-    EXPECT_EQ(wrap(text, 33), text);
-    EXPECT_EQ(wrap(text, 32), "one two three four five six\nseven");
-    EXPECT_EQ(wrap(text, 24, 4), "one two three four\n    five six seven");
-    EXPECT_EQ(wrap(text, 23, 4), text) << "hardly any room";
+    const std::string words = "one two three four five six seven";
+    EXPECT_EQ(wrap(words, 0), words);
+    EXPECT_EQ(wrap(words, 33), words);
+    EXPECT_EQ(wrap(words, 32), "one two three four five six\nseven");
+    EXPECT_EQ(wrap(words, 24, 4), "one two three four\n    five six seven");
+    EXPECT_EQ(wrap(words, 23, 4), words) << "hardly any room";
     EXPECT_EQ(wrap("one two three\nfour", 24, 4), "one two three\n    four");
     EXPECT_EQ(wrap(" a  b ", 24), " a  b ");
     EXPECT_EQ(wrap("", 24), "");
