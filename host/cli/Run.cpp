@@ -12,12 +12,12 @@
 #include <utility>
 
 #include "base/Utf8.h"
+#include "host/InstallPaths.h"
 #include "host/cli/BareValues.h"
 #include "host/cli/Describe.h"
 #include "host/cli/DescribeJson.h"
 #include "host/cli/Diagnostics.h"
 #include "host/cli/Explanation.h"
-#include "host/cli/InstallPaths.h"
 #include "host/cli/MethodAnswer.h"
 #include "host/cli/NameNotes.h"
 #include "host/cli/Namespaces.h"

@@ -3,8 +3,8 @@
 #include <exception>
 
 #include "base/Utf8.h"
+#include "host/InstallPaths.h"
 #include "host/broker/Router.h"
-#include "host/cli/InstallPaths.h"
 #include "host/cli/PathParser.h"
 
 namespace cmpihost {

@@ -3,9 +3,9 @@
 #include <exception>
 #include <iostream>
 
+#include "host/InstallPaths.h"
 #include "host/cli/CommandLine.h"
 #include "host/cli/Diagnostics.h"
-#include "host/cli/InstallPaths.h"
 #include "host/cli/Run.h"
 
 namespace cmpihost {

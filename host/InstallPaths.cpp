@@ -1,6 +1,6 @@
 // Everything is found relative to the program, so that a build tree, an installation under any
 // prefix and an unpacked package all work without configuration.
-#include "host/cli/InstallPaths.h"
+#include "host/InstallPaths.h"
 
 #include <algorithm>
 #include <string>

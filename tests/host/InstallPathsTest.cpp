@@ -1,4 +1,4 @@
-#include "host/cli/InstallPaths.h"
+#include "host/InstallPaths.h"
 
 #include <gmock/gmock.h>
 

@@ -1,5 +1,5 @@
-#ifndef HOST_CLI_INSTALL_PATHS_H
-#define HOST_CLI_INSTALL_PATHS_H
+#ifndef HOST_INSTALL_PATHS_H
+#define HOST_INSTALL_PATHS_H
 
 #include <filesystem>
 #include <string>

@@ -1,0 +1,278 @@
+#include "host/server/Service.h"
+
+#include <fcntl.h>
+#include <pthread.h>
+#include <signal.h>
+#include <sys/utsname.h>
+#include <unistd.h>
+
+#include <future>
+#include <memory>
+#include <optional>
+#include <system_error>
+#include <thread>
+#include <utility>
+
+#include "host/InstallPaths.h"
+#include "host/server/AccessLog.h"
+#include "host/server/CimOverHttp.h"
+#include "host/server/ConfigurationFile.h"
+#include "host/server/ListenAddress.h"
+#include "host/server/ObjectManager.h"
+#include "host/server/ServiceManager.h"
+
+namespace cmpihost::server {
+
+namespace fs = std::filesystem;
+
+namespace {
+
+/// How long requests may go on after the signal to end.
+constexpr std::chrono::seconds lastRequests{10};
+
+std::string nodeName() {
+    utsname names{};
+    uname(&names);
+    return names.nodename[0] == '\0' ? "localhost" : names.nodename;
+}
+
+std::vector<fs::path> pathsOf(const std::vector<std::string>& given, const fs::path& otherwise) {
+    if (given.empty()) return {otherwise};
+    return {given.begin(), given.end()};
+}
+
+/// What providers log through their broker, as far as the level of the log goes.
+void logProviderMessage(Log& log, const ProviderMessage& message) {
+    const bool failure = message.level >= CMPI_SEV_ERROR;
+    const bool wanted =
+        log.level() == LogLevel::Requests || (log.level() == LogLevel::Failures && failure);
+    if (message.trace || !wanted) return;
+    log.write(failure ? Priority::Error : Priority::Info,
+              "provider: " + message.source + (message.source.empty() ? "" : ": ") + message.text);
+}
+
+ObjectManagerSetup managerSetup(const ServiceOptions& options, const fs::path& programFolder,
+                                Log& log) {
+    ObjectManagerSetup setup;
+    try {
+        setup.schema = Schema::load(pathsOf(options.schemas, schemaFolder(programFolder)));
+        setup.registrations =
+            Registrations::read(pathsOf(options.registrations, registrationFolder(programFolder)));
+    } catch (const std::runtime_error& error) {
+        throw ServiceError(serviceNotLoaded, error.what());
+    }
+    if (setup.registrations.all().empty())
+        throw ServiceError(serviceNotLoaded, "there are no registrations of providers");
+    setup.libraryFolders = libraryFolders(programFolder);
+    setup.messageSink = [&log](const ProviderMessage& message) {
+        logProviderMessage(log, message);
+    };
+    setup.hostName = nodeName();
+    return setup;
+}
+
+/// Nobody is asked for a password.
+class Everybody final : public AccessControl {
+  public:
+    Verdict judge(const HttpRequest&) override { return {true, std::nullopt}; }
+};
+
+CimOverHttp::Options httpOptions(const ServiceOptions& options) {
+    CimOverHttp::Options result;
+    result.hostNames = options.hostNames;
+    result.hostNames.insert(result.hostNames.end(), {"localhost", nodeName()});
+    return result;
+}
+
+sigset_t handledSignals() {
+    sigset_t signals;
+    sigemptyset(&signals);
+    for (const int signal : {SIGTERM, SIGINT, SIGHUP, SIGUSR1}) sigaddset(&signals, signal);
+    return signals;
+}
+
+/// Ends the process when it is not gone in time.
+class Deadline {
+  public:
+    Deadline(std::chrono::seconds time, Log& log)
+        : thread_([this, time, &log] {
+              if (done_.get_future().wait_for(time) == std::future_status::ready) return;
+              log.write(Priority::Error, "requests still run; they are given up");
+              _exit(serviceFailed);
+          }) {}
+    ~Deadline() {
+        done_.set_value();
+        thread_.join();
+    }
+    Deadline(const Deadline&) = delete;
+    Deadline& operator=(const Deadline&) = delete;
+
+  private:
+    std::promise<void> done_;
+    std::thread thread_;
+};
+
+class Service {
+  public:
+    Service(const ServiceOptions& options, const fs::path& programFolder, Log& log);
+    ServiceStatus run();
+
+  private:
+    struct Listener {
+        ListenAddress address;
+        /// Stays open while servers come and go.
+        base::FileDescriptor socket;
+        bool isPassed = false;
+        std::unique_ptr<HttpServer> server{};
+    };
+
+    void listen();
+    void listenOn(const std::string& text);
+    void refuseUnsafe(const ListenAddress& address) const;
+    void start(Listener& listener);
+    void reload();
+    void restart(Listener& listener);
+    void logCounters();
+    void stop();
+
+    const ServiceOptions& options_;
+    Log& log_;
+    ObjectManager manager_;
+    Everybody access_;
+    CimOverHttp cim_;
+    AccessLog accessLog_;
+    std::optional<TlsIdentity> identity_;
+    std::vector<Listener> listeners_;
+    /// Servers that end with the connections that they have.
+    std::vector<std::future<void>> retired_;
+};
+
+Service::Service(const ServiceOptions& options, const fs::path& programFolder, Log& log)
+    : options_(options),
+      log_(log),
+      manager_(managerSetup(options, programFolder, log)),
+      cim_(manager_, access_, httpOptions(options)),
+      accessLog_(cim_, log, [this] { return manager_.takeComplaints(); }) {
+    if (!options.certificate.empty())
+        identity_ = {readConfigurationFile(options.certificate, false),
+                     readConfigurationFile(options.key, true)};
+    if (!options.users.empty())
+        throw ServiceError(serviceRefused, "--users: passwords are not checked yet");
+    listen();
+}
+
+void Service::listen() {
+    for (base::FileDescriptor& socket : takePassedSockets()) {
+        const ListenAddress address = ListenAddress::of(socket.number());
+        refuseUnsafe(address);
+        listeners_.push_back({address, std::move(socket), true});
+    }
+    for (const std::string& text : options_.listen) listenOn(text);
+    if (listeners_.empty()) listenOn(identity_ ? "localhost:5989" : "localhost:5988");
+}
+
+void Service::listenOn(const std::string& text) {
+    for (const ListenAddress& address : ListenAddress::read(text)) {
+        refuseUnsafe(address);
+        try {
+            base::FileDescriptor socket = address.listen();
+            const ListenAddress bound = address.at(socket.number());
+            listeners_.push_back({bound, std::move(socket)});
+        } catch (const std::system_error& error) {
+            const bool noFamily = error.code() == std::errc::address_family_not_supported ||
+                                  error.code() == std::errc::address_not_available;
+            if (!address.isOptional() || !noFamily)
+                throw ServiceError(serviceFailed, std::string("cannot listen on ") + error.what());
+        }
+    }
+}
+
+void Service::refuseUnsafe(const ListenAddress& address) const {
+    if (address.isLocal()) return;
+    const bool safe = identity_ && !address.isPlain() && !options_.users.empty();
+    if (!safe)
+        throw ServiceError(serviceRefused, address.text() +
+                                               " can be reached from other hosts: this takes TLS "
+                                               "(--tls-cert, --tls-key) and --users");
+}
+
+/// Throws std::runtime_error, and leaves the listener without a server then.
+void Service::start(Listener& listener) {
+    const bool tls = identity_ && !listener.address.isPlain();
+    base::FileDescriptor socket(fcntl(listener.socket.number(), F_DUPFD_CLOEXEC, 0));
+    listener.server = std::make_unique<HttpServer>(std::move(socket), accessLog_, options_.limits,
+                                                   tls ? &*identity_ : nullptr);
+}
+
+ServiceStatus Service::run() {
+    for (Listener& listener : listeners_) {
+        start(listener);
+        const bool tls = identity_ && !listener.address.isPlain();
+        const char* const scheme = listener.address.isUnix() ? "" : tls ? "https://" : "http://";
+        log_.write(Priority::Info, "listening on " + (scheme + listener.address.text()));
+    }
+    notifyServiceManager("READY=1");
+    const sigset_t signals = handledSignals();
+    for (;;) {
+        int signal = 0;
+        sigwait(&signals, &signal);
+        if (signal == SIGTERM || signal == SIGINT) break;
+        if (signal == SIGHUP) reload();
+        if (signal == SIGUSR1) logCounters();
+    }
+    stop();
+    return serviceEnded;
+}
+
+void Service::reload() {
+    notifyServiceManager("RELOADING=1");
+    log_.write(Priority::Info, "reading certificate, key and users again");
+    notifyServiceManager("READY=1");
+}
+
+void Service::logCounters() {
+    const Statistics& counted = manager_.statistics();
+    const auto microseconds = [](std::chrono::nanoseconds time) {
+        return std::to_string(std::chrono::duration_cast<std::chrono::microseconds>(time).count());
+    };
+    log_.write(Priority::Info, "counters: operations " + std::to_string(counted.operations()) +
+                                   ", failed " + std::to_string(counted.failures()) +
+                                   ", requests refused " + std::to_string(counted.refusals()) +
+                                   ", busy " + microseconds(counted.busyTime()) + "us, up " +
+                                   microseconds(counted.upTime()) + "us, log lines lost " +
+                                   std::to_string(log_.lost()));
+}
+
+void Service::stop() {
+    notifyServiceManager("STOPPING=1");
+    const Deadline deadline(lastRequests, log_);
+    for (Listener& listener : listeners_) listener.server->stopListening();
+    for (Listener& listener : listeners_) {
+        listener.server.reset();
+        if (!listener.isPassed) listener.address.removeFile();
+    }
+    retired_.clear();
+    accessLog_.logComplaints();
+}
+
+}  // namespace
+
+ServiceStatus serve(const ServiceOptions& options, const fs::path& programFolder, Log& log) {
+    const sigset_t signals = handledSignals();
+    // Before the first thread: all of them leave the signals to this one.
+    pthread_sigmask(SIG_BLOCK, &signals, nullptr);
+    signal(SIGPIPE, SIG_IGN);
+    try {
+        return Service(options, programFolder, log).run();
+    } catch (const ServiceError&) {
+        throw;
+    } catch (const std::invalid_argument& error) {
+        throw ServiceError(serviceRefused, error.what());
+    } catch (const std::system_error& error) {
+        throw ServiceError(serviceFailed, error.what());
+    } catch (const std::runtime_error& error) {
+        throw ServiceError(serviceRefused, error.what());
+    }
+}
+
+}  // namespace cmpihost::server
