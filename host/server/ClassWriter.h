@@ -21,8 +21,9 @@ struct ClassView {
     std::optional<std::vector<std::string>> properties{};
 };
 
-/// CLASS.
-void writeClass(std::string& xml, const ResolvedClass& described, const ClassView& view);
+/// CLASS. `types` are those of the schema of the class.
+void writeClass(std::string& xml, const ResolvedClass& described, const QualifierTypes& types,
+                const ClassView& view);
 
 /// QUALIFIER.DECLARATION.
 void writeQualifierDeclaration(std::string& xml, const mof::QualifierType& type);

@@ -23,10 +23,13 @@ struct Site {
     std::string nameSpace{};
 };
 
-/// VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY; nothing for null.
+/// VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY; nothing for null. An embedded instance is
+/// a text. An element of an array that is null becomes an empty text among texts, and is left out
+/// of any other array.
 void writeValue(std::string& xml, const Value& value, const Site& site);
 
-/// INSTANCENAME, and that in an INSTANCEPATH.
+/// INSTANCENAME, and that in an INSTANCEPATH: with the host and the namespace of the path, else
+/// those of the site.
 void writeInstanceName(std::string& xml, const ObjectPathValue& path, const Site& site);
 void writeInstancePath(std::string& xml, const ObjectPathValue& path, const Site& site);
 
@@ -40,6 +43,9 @@ void writeInstance(std::string& xml, const InstanceValue& instance, const Site& 
 
 /// A parameter that comes out of an operation or method: PARAMVALUE.
 void writeParameter(std::string& xml, std::string_view name, const Value& value, const Site& site);
+
+/// What a method returns: RETURNVALUE; nothing for null. Methods return no arrays.
+void writeReturnValue(std::string& xml, const Value& value, const Site& site);
 
 /// Writes each element of a list in one of the forms that operations answer.
 void writeNamedInstances(std::string& xml, const std::vector<InstanceValue>& instances,
