@@ -1,21 +1,177 @@
+// A handful of instances, made anew for each request: the counters are as of now.
 #include "host/server/Interop.h"
 
+#include <algorithm>
+#include <iterator>
 #include <utility>
 
+#include "base/Ascii.h"
+#include "host/mof/MofParser.h"
+#include "host/server/InteropClasses.h"
+
 namespace cmpihost::server {
+
+namespace {
+
+constexpr const char* managerClass = "KORVA_ObjectManager";
+constexpr const char* nameSpaceClass = "CIM_Namespace";
+constexpr const char* tieClass = "CIM_NamespaceInManager";
+constexpr const char* systemClass = "KORVA_ComputerSystem";
+constexpr const char* managerName = "cmpihost";
+
+Schema interopSchema() {
+    Schema schema;
+    schema.add(mof::parse(interopMof, Interop::nameSpace));
+    return schema;
+}
+
+void refuse(OperationResult& result, CMPIrc rc, std::string message) {
+    result.rc = rc;
+    result.message = std::move(message);
+}
+
+std::uint64_t whole(std::chrono::nanoseconds time, std::chrono::nanoseconds unit) {
+    return static_cast<std::uint64_t>(time / unit);
+}
+
+}  // namespace
 
 Interop::Interop(std::string hostName, std::vector<std::string> nameSpaces,
                  const Statistics& statistics)
     : hostName_(std::move(hostName)),
       nameSpaces_(std::move(nameSpaces)),
       statistics_(statistics),
+      schema_(interopSchema()),
       catalogue_(schema_) {}
 
-bool Interop::serves(const std::string&) const {
-    return false;
+// The schema declares nothing but what is served and what that descends from.
+bool Interop::serves(const std::string& className) const {
+    return schema_.find(className) != nullptr;
 }
-OperationResult Interop::ask(const OperationRequest&) const {
-    return {};
+
+OperationResult Interop::ask(const OperationRequest& request) const {
+    OperationResult result;
+    const std::string& className = request.path.className;
+    if (!serves(className)) {
+        refuse(result, CMPI_RC_ERR_INVALID_CLASS, className + ": no such class in " + nameSpace);
+        return result;
+    }
+    switch (request.operation) {
+        case Operation::EnumerateInstances:
+        case Operation::EnumerateInstanceNames:
+            for (InstanceValue& each : instances()) {
+                if (!isA(each.path.className, className)) continue;
+                if (yieldsPaths(request.operation)) {
+                    result.paths.push_back(std::move(each.path));
+                } else {
+                    result.instances.push_back(std::move(each));
+                }
+            }
+            break;
+        case Operation::GetInstance:
+            for (InstanceValue& each : instances())
+                if (each.path == request.path) result.instances.push_back(std::move(each));
+            if (result.instances.empty())
+                refuse(result, CMPI_RC_ERR_NOT_FOUND,
+                       toString(request.path) + ": no such instance");
+            break;
+        case Operation::Associators:
+        case Operation::AssociatorNames:
+            associate(request, result);
+            break;
+        default:
+            refuse(result, CMPI_RC_ERR_NOT_SUPPORTED,
+                   std::string("what ") + nameSpace + " holds is only to be read, not by " +
+                       operationName(request.operation));
+    }
+    return result;
+}
+
+/// The far ends of CIM_NamespaceInManager. Filters other than the association class are for the
+/// caller.
+void Interop::associate(const OperationRequest& request, OperationResult& result) const {
+    if (request.assocClass && !isA(tieClass, *request.assocClass)) return;
+    std::vector<InstanceValue> all = instances();
+    const auto isManager = [](const ObjectPathValue& path) {
+        return base::equalsIgnoreCase(path.className, managerClass);
+    };
+    const auto isEnd = [&](const ObjectPathValue& path) {
+        return isManager(path) || base::equalsIgnoreCase(path.className, nameSpaceClass);
+    };
+    const bool exists = std::any_of(all.begin(), all.end(), [&](const InstanceValue& each) {
+        return each.path == request.path;
+    });
+    if (!exists || !isEnd(request.path)) return;
+    for (InstanceValue& each : all) {
+        if (!isEnd(each.path) || isManager(each.path) == isManager(request.path)) continue;
+        if (yieldsPaths(request.operation)) {
+            result.paths.push_back(std::move(each.path));
+        } else {
+            result.instances.push_back(std::move(each));
+        }
+    }
+}
+
+bool Interop::isA(const std::string& className, const std::string& ancestor) const {
+    return schema_.isA(className, ancestor);
+}
+
+std::vector<InstanceValue> Interop::instances() const {
+    std::vector<InstanceValue> result = {objectManager()};
+    const ObjectPathValue manager = result.front().path;
+    std::vector<InstanceValue> others;
+    for (const std::string& name : nameSpaces_) {
+        result.push_back(nameSpaceInstance(name));
+        others.push_back(
+            instanceOf(tieClass, {{"Antecedent", Value::fromReference(manager)},
+                                  {"Dependent", Value::fromReference(result.back().path)}}));
+    }
+    for (const std::string& name : nameSpaces_)
+        others.push_back(instanceOf("__Namespace", {{"Name", name}}));
+    std::move(others.begin(), others.end(), std::back_inserter(result));
+    return result;
+}
+
+InstanceValue Interop::objectManager() const {
+    using std::chrono::microseconds;
+    using std::chrono::seconds;
+    return instanceOf(
+        managerClass,
+        {{"Description", "cmpihost version " KORVA_VERSION
+                         ", which answers WBEM clients from the CMPI providers of this host"},
+         {"ElementName", managerName},
+         {"EnabledState", Value::fromUnsigned(2, CMPI_uint16)},
+         {"SystemCreationClassName", systemClass},
+         {"SystemName", hostName_},
+         {"CreationClassName", managerClass},
+         {"Name", managerName},
+         {"Started", Value::fromBoolean(true)},
+         {"GatherStatisticalData", Value::fromBoolean(false)},
+         {"Operations", Value::fromUnsigned(statistics_.operations())},
+         {"FailedOperations", Value::fromUnsigned(statistics_.failures())},
+         {"RefusedRequests", Value::fromUnsigned(statistics_.refusals())},
+         {"OperationTime", Value::fromUnsigned(whole(statistics_.busyTime(), microseconds(1)))},
+         {"UpTime", Value::fromUnsigned(whole(statistics_.upTime(), seconds(1)))}});
+}
+
+InstanceValue Interop::nameSpaceInstance(const std::string& name) const {
+    return instanceOf(nameSpaceClass, {{"SystemCreationClassName", systemClass},
+                                       {"SystemName", hostName_},
+                                       {"ObjectManagerCreationClassName", managerClass},
+                                       {"ObjectManagerName", managerName},
+                                       {"CreationClassName", nameSpaceClass},
+                                       {"Name", name},
+                                       {"ClassInfo", Value::fromUnsigned(1, CMPI_uint16)}});
+}
+
+/// An instance whose path has those of its properties that are keys.
+InstanceValue Interop::instanceOf(const char* className,
+                                  std::vector<PropertyValue> properties) const {
+    InstanceValue result{{nameSpace, className}, std::move(properties)};
+    for (const PropertyValue& property : result.properties)
+        if (schema_.isKey(className, property.name))
+            result.path.keys.push_back({property.name, property.value});
+    return result;
 }
 
 }  // namespace cmpihost::server

@@ -16,7 +16,7 @@ class Interop {
   public:
     static constexpr const char* nameSpace = "root/interop";
 
-    /// `nameSpaces` are all that the server has. `statistics` outlives this object.
+    /// `nameSpaces` are all that the server has, this one too. `statistics` outlives this object.
     Interop(std::string hostName, std::vector<std::string> nameSpaces,
             const Statistics& statistics);
 
@@ -26,10 +26,19 @@ class Interop {
     /// Whether the class, or one below it, is one of those that are served here.
     bool serves(const std::string& className) const;
 
-    /// Answers as a provider of these classes does.
+    /// Answers as a provider of these classes does: enumerations with the instances of the class
+    /// and of those below it, all with all their properties; what it does not serve, and all
+    /// writing, with a status and a message.
     OperationResult ask(const OperationRequest& request) const;
 
   private:
+    std::vector<InstanceValue> instances() const;
+    InstanceValue objectManager() const;
+    InstanceValue nameSpaceInstance(const std::string& name) const;
+    InstanceValue instanceOf(const char* className, std::vector<PropertyValue> properties) const;
+    bool isA(const std::string& className, const std::string& ancestor) const;
+    void associate(const OperationRequest& request, OperationResult& result) const;
+
     const std::string hostName_;
     const std::vector<std::string> nameSpaces_;
     const Statistics& statistics_;
