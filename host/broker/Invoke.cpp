@@ -169,6 +169,7 @@ Outcome invoke(const ManagementInterfaces& interfaces, Broker& broker,
     // Last: with the objects gone, the contents are moved out instead of copied.
     Results results = collector.take();
     outcome.doneCount = results.doneCount;
+    outcome.done = results.doneCount > 0;
     outcome.paths = std::move(results.paths);
     outcome.instances = std::move(results.instances);
     outcome.refusedPaths = std::move(results.refusedPaths);

@@ -115,6 +115,9 @@ struct OperationResult {
     std::optional<Value> value{};
     /// The arguments that came out of a method.
     std::vector<NamedValue> arguments{};
+    /// Whether everybody who was asked ended the answer with returnDone. A provider that breaks off
+    /// without a status leaves it out.
+    bool done = false;
 };
 
 }  // namespace cmpihost

@@ -228,6 +228,7 @@ template <class Call>
 OperationResult Router::joined(const std::vector<Target>& targets, const OperationRequest& request,
                                const Call& call) {
     OperationResult all;
+    all.done = true;
     const bool once = isAssociationOperation(request.operation);
     for (const Target& target : targets) {
         OperationRequest each = request;
@@ -241,6 +242,7 @@ OperationResult Router::joined(const std::vector<Target>& targets, const Operati
         }
         append(all.paths, result.paths, once);
         append(all.instances, result.instances, once);
+        all.done = all.done && result.done;
     }
     return all;
 }

@@ -1,10 +1,90 @@
+// Providers speak in the terms of CMPI and as they please; what leaves this file is whole, spelled
+// as the schema has it, or a CimError.
 #include "host/server/ObjectManager.h"
 
+#include "base/Ascii.h"
 #include "host/server/CimError.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace cmpihost::server {
+
+namespace {
+
+bool isInterop(const std::string& nameSpace) {
+    return base::equalsIgnoreCase(nameSpace, Interop::nameSpace);
+}
+
+std::vector<std::string> namesOfSpaces(const Registrations& registrations) {
+    std::vector<std::string> names = registrations.nameSpaces();
+    names.erase(std::remove_if(names.begin(), names.end(), isInterop), names.end());
+    if (names.empty()) names.emplace_back("root/cimv2");
+    names.emplace_back(Interop::nameSpace);
+    return names;
+}
+
+bool isEnumeration(Operation operation) {
+    return operation == Operation::EnumerateInstances ||
+           operation == Operation::EnumerateInstanceNames;
+}
+
+/// Whether an answer of that operation without returnDone may lack some of its results.
+bool needsDone(Operation operation) {
+    return isEnumeration(operation) || operation == Operation::ExecQuery ||
+           isAssociationOperation(operation);
+}
+
+/// What a status says of an operation whose provider leaves it without words.
+std::string wordsFor(unsigned code) {
+    switch (code) {
+        case cimAccessDenied:
+            return "access is denied";
+        case cimInvalidNamespace:
+            return "the namespace is unknown";
+        case cimInvalidParameter:
+            return "a parameter is wrong";
+        case cimInvalidClass:
+            return "the class is not served";
+        case cimNotFound:
+            return "there is no such instance";
+        case cimNotSupported:
+            return "it is not supported";
+        case 11:
+            return "it exists already";
+        case cimNoSuchProperty:
+            return "the class has no such property";
+        case cimTypeMismatch:
+            return "a value is of the wrong type";
+        case cimQueryLanguageNotSupported:
+            return "the query language is not supported";
+        case cimInvalidQuery:
+            return "the query is not understood";
+        case cimMethodNotAvailable:
+            return "the method is not available";
+        case cimMethodNotFound:
+            return "there is no such method";
+        default:
+            return "the provider failed with status " + std::to_string(code);
+    }
+}
+
+std::string subject(const OperationRequest& request) {
+    return std::string(operationName(request.operation)) + " of " + request.path.className;
+}
+
+[[noreturn]] void refuse(const OperationRequest& request, const OperationResult& result) {
+    const auto code = static_cast<unsigned>(result.rc);
+    const bool said = result.message && !result.message->empty();
+    throw CimError(code, said ? *result.message : subject(request) + ": " + wordsFor(code));
+}
+
+template <class Element>
+void moveOver(std::vector<Element>& to, std::vector<Element>& from) {
+    to.insert(to.end(), std::make_move_iterator(from.begin()), std::make_move_iterator(from.end()));
+}
+
+}  // namespace
 
 ObjectManager::ObjectManager(ObjectManagerSetup setup)
     : hostName_(std::move(setup.hostName)),
@@ -12,38 +92,190 @@ ObjectManager::ObjectManager(ObjectManagerSetup setup)
       catalogue_(schema_),
       broker_(&catalogue_),
       router_(broker_, catalogue_, std::move(setup.registrations), std::move(setup.libraryFolders)),
-      interop_(hostName_, {}, statistics_) {
+      interop_(hostName_, namesOfSpaces(router_.registrations()), statistics_),
+      nameSpaces_(readNameSpaces()) {
     broker_.setMessageSink(std::move(setup.messageSink));
 }
 
 ObjectManager::~ObjectManager() = default;
 
+std::vector<ObjectManager::NameSpace> ObjectManager::readNameSpaces() const {
+    std::vector<NameSpace> spaces;
+    for (const std::string& name : namesOfSpaces(registrations())) {
+        NameSpace space{name, {}};
+        for (const std::string& declared : schema(name).classNames()) addLine(space, declared);
+        for (const Registration& each : registrations().all()) {
+            if (each.isFor(name)) addLine(space, each.className);
+        }
+        spaces.push_back(std::move(space));
+    }
+    return spaces;
+}
+
+/// Adds a class and all that it descends from.
+void ObjectManager::addLine(NameSpace& space, const std::string& className) const {
+    std::optional<std::string_view> each = className;
+    // What is registered for the interop namespace may come from a schema of its maker.
+    while (each && !each->empty()) {
+        if (!space.classes.emplace(base::toLower(*each), *each).second) return;
+        const auto above = catalogue(space.name).superclassOf(*each);
+        each = above ? above : catalogue_.superclassOf(*each);
+    }
+}
+
+const ObjectManager::NameSpace* ObjectManager::find(const std::string& name) const {
+    const auto found = std::find_if(
+        nameSpaces_.begin(), nameSpaces_.end(),
+        [&](const NameSpace& each) { return base::equalsIgnoreCase(each.name, name); });
+    return found == nameSpaces_.end() ? nullptr : &*found;
+}
+
 std::string ObjectManager::nameSpace(const std::string& name) const {
-    return name;
+    if (const NameSpace* const found = find(name)) return found->name;
+    throw CimError(cimInvalidNamespace, name + ": no such namespace");
 }
+
 std::vector<std::string> ObjectManager::nameSpaces() const {
-    return {};
+    std::vector<std::string> names;
+    for (const NameSpace& each : nameSpaces_) names.push_back(each.name);
+    return names;
 }
-const Schema& ObjectManager::schema(const std::string&) const {
-    return schema_;
+
+const Schema& ObjectManager::schema(const std::string& nameSpace) const {
+    return isInterop(nameSpace) ? interop_.schema() : schema_;
 }
-const ClassCatalogue& ObjectManager::catalogue(const std::string&) const {
+
+const ClassCatalogue& ObjectManager::catalogue(const std::string& nameSpace) const {
+    if (isInterop(nameSpace)) return interop_.catalogue();
     return catalogue_;
 }
-bool ObjectManager::knowsClass(const std::string&, const std::string&) const {
-    return false;
+
+bool ObjectManager::knowsClass(const std::string& nameSpace, const std::string& className) const {
+    const NameSpace* const space = find(nameSpace);
+    return space != nullptr && space->classes.count(base::toLower(className)) > 0;
 }
-std::string ObjectManager::spelling(const std::string&, const std::string& className) const {
-    return className;
+
+std::string ObjectManager::spelling(const std::string& nameSpace,
+                                    const std::string& className) const {
+    const NameSpace* const space = find(nameSpace);
+    if (space == nullptr) return className;
+    const auto found = space->classes.find(base::toLower(className));
+    return found == space->classes.end() ? className : found->second;
 }
-bool ObjectManager::isA(const std::string&, const std::string&, const std::string&) const {
-    return false;
+
+std::string ObjectManager::knownClass(const std::string& nameSpace,
+                                      const std::string& className) const {
+    if (knowsClass(nameSpace, className)) return spelling(nameSpace, className);
+    throw CimError(cimInvalidClass, className + ": no such class in " + nameSpace);
 }
-OperationResult ObjectManager::ask(const OperationRequest&) {
-    throw CimError(cimNotSupported, "not built yet");
+
+bool ObjectManager::isA(const std::string& nameSpace, const std::string& className,
+                        const std::string& ancestor) const {
+    const auto holds = [&](const ClassCatalogue& classes) {
+        const ClassRelation relation = classRelation(&classes, className, ancestor);
+        return relation == ClassRelation::Same || relation == ClassRelation::Subclass;
+    };
+    return holds(catalogue(nameSpace)) || (isInterop(nameSpace) && holds(catalogue_));
 }
+
+OperationResult ObjectManager::ask(const OperationRequest& request) {
+    OperationResult result = answerOf(request);
+    if (result.rc != CMPI_RC_OK) refuse(request, result);
+    if (!result.done && needsDone(request.operation)) {
+        throw CimError(cimFailed, subject(request) + ": the answer of the provider broke off");
+    }
+    finish(request, result);
+    return result;
+}
+
+/// Whether a provider is registered for the class or, of an enumeration, for one below it.
+bool ObjectManager::isServed(const OperationRequest& request) const {
+    const ObjectPathValue& path = request.path;
+    if (!isEnumeration(request.operation))
+        return registrations().find(path.className, path.nameSpace, Interface::Instance) != nullptr;
+    const auto& all = registrations().all();
+    return std::any_of(all.begin(), all.end(), [&](const Registration& each) {
+        return each.serves(Interface::Instance, path.nameSpace) &&
+               isA(path.nameSpace, each.className, path.className);
+    });
+}
+
+OperationResult ObjectManager::answerOf(const OperationRequest& request) {
+    const ObjectPathValue& path = request.path;
+    if (isInterop(path.nameSpace) && !isAssociationOperation(request.operation) &&
+        interop_.serves(path.className))
+        return askInterop(request);
+    const bool reads =
+        isEnumeration(request.operation) || request.operation == Operation::GetInstance;
+    if (reads && !isServed(request) && knowsClass(path.nameSpace, path.className)) {
+        OperationResult nothing;
+        nothing.done = true;
+        return nothing;
+    }
+    return askProviders(request);
+}
+
+OperationResult ObjectManager::askProviders(const OperationRequest& request) {
+    try {
+        OperationResult result = router_.ask(request);
+        gatherComplaints();
+        return result;
+    } catch (const LoadError& error) {
+        complain(error.what());
+        throw CimError(cimFailed, error.what());
+    }
+}
+
+/// Of a class of the interop namespace there may be instances of other makers, too.
+OperationResult ObjectManager::askInterop(const OperationRequest& request) {
+    OperationResult result = interop_.ask(request);
+    result.done = true;
+    if (result.rc != CMPI_RC_OK || !isEnumeration(request.operation) || !isServed(request))
+        return result;
+    OperationResult others = askProviders(request);
+    if (others.rc != CMPI_RC_OK) return others;
+    moveOver(result.paths, others.paths);
+    moveOver(result.instances, others.instances);
+    result.done = others.done;
+    return result;
+}
+
+void ObjectManager::finish(const OperationRequest& request, OperationResult& result) const {
+    for (ObjectPathValue& path : result.paths) finish(request, path);
+    for (InstanceValue& instance : result.instances) finish(request, instance.path);
+}
+
+void ObjectManager::finish(const OperationRequest& request, ObjectPathValue& path) const {
+    // Only an association leads to another namespace.
+    const bool elsewhere =
+        isAssociationOperation(request.operation) && find(path.nameSpace) != nullptr;
+    path.nameSpace = nameSpace(elsewhere ? path.nameSpace : request.path.nameSpace);
+    path.className = spelling(path.nameSpace, path.className);
+    path.hostName.clear();
+}
+
+void ObjectManager::complain(const std::string& line) {
+    const std::lock_guard<std::mutex> lock(complaintMutex_);
+    if (complaints_.size() < mostComplaints) {
+        complaints_.push_back(line);
+    } else {
+        ++complaintsLeftOut_;
+    }
+}
+
+/// Takes over what the broker and the router would keep until somebody asks.
+void ObjectManager::gatherComplaints() {
+    for (const std::string& line : broker_.takeViolations()) complain(line);
+    for (const std::string& line : router_.takeLoadErrors()) complain(line);
+}
+
 std::vector<std::string> ObjectManager::takeComplaints() {
-    return {};
+    gatherComplaints();
+    const std::lock_guard<std::mutex> lock(complaintMutex_);
+    std::vector<std::string> lines = std::exchange(complaints_, {});
+    const std::size_t more = std::exchange(complaintsLeftOut_, 0);
+    if (more > 0) lines.push_back("and " + std::to_string(more) + " more complaints");
+    return lines;
 }
 
 }  // namespace cmpihost::server

@@ -1,9 +1,12 @@
 #ifndef HOST_SERVER_OBJECT_MANAGER_H
 #define HOST_SERVER_OBJECT_MANAGER_H
 
+#include <cstddef>
 #include <filesystem>
 #include <memory>
+#include <mutex>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "host/broker/Broker.h"
@@ -28,6 +31,9 @@ struct ObjectManagerSetup {
     std::string hostName{};
 };
 
+/// Its namespaces are those that registrations name (root/cimv2 where they name none) and the
+/// interop namespace. A class of the schema is known in each of them but the last, a class that is
+/// registered only where it is registered. Names of namespaces and classes compare without case.
 /// Any threads may ask at once.
 class ObjectManager {
   public:
@@ -41,21 +47,25 @@ class ObjectManager {
     /// All of them, the interop namespace included.
     std::vector<std::string> nameSpaces() const;
 
-    /// The classes of a namespace.
+    /// The classes of a namespace; it is one of nameSpaces().
     const Schema& schema(const std::string& nameSpace) const;
     const ClassCatalogue& catalogue(const std::string& nameSpace) const;
     /// Whether the class is declared there, registered there, or an ancestor of one that is.
     bool knowsClass(const std::string& nameSpace, const std::string& className) const;
     /// The class as the schema spells it, else as it is given.
     std::string spelling(const std::string& nameSpace, const std::string& className) const;
+    /// The same for a class that the client named; throws CimError with cimInvalidClass for one
+    /// that is not known.
+    std::string knownClass(const std::string& nameSpace, const std::string& className) const;
     /// Whether the class is the other one or below it.
     bool isA(const std::string& nameSpace, const std::string& className,
              const std::string& ancestor) const;
 
     /// Asks the providers, or the classes of the interop namespace, and gives what they answer,
-    /// each result with its namespace and with the schema's spelling of its class. A status other
-    /// than OK, a library that does not load and an answer that breaks off become a CimError that
-    /// has a description.
+    /// each result with its namespace and with the schema's spelling of its class. An enumeration
+    /// or GetInstance of a known class that nobody serves has no result. A status other than OK, a
+    /// library that does not load and a list of results that breaks off become a CimError that has
+    /// a description.
     OperationResult ask(const OperationRequest& request);
 
     const std::string& hostName() const noexcept { return hostName_; }
@@ -63,11 +73,31 @@ class ObjectManager {
     OpenEnumerations& openEnumerations() noexcept { return openEnumerations_; }
     Statistics& statistics() noexcept { return statistics_; }
 
-    /// What the broker caught the providers at, and why libraries did not load, since the last
-    /// call: one line each.
+    /// Keeps a line for takeComplaints().
+    void complain(const std::string& line);
+    /// What the broker caught the providers at, why libraries did not load, and what complain()
+    /// was given since the last call: one line each, of which the first `mostComplaints` are kept.
     std::vector<std::string> takeComplaints();
+    static constexpr std::size_t mostComplaints = 200;
 
   private:
+    struct NameSpace {
+        std::string name;
+        /// All that are known there as they are spelled, by their names in lower case.
+        std::unordered_map<std::string, std::string> classes;
+    };
+
+    std::vector<NameSpace> readNameSpaces() const;
+    void addLine(NameSpace& space, const std::string& className) const;
+    const NameSpace* find(const std::string& name) const;
+    bool isServed(const OperationRequest& request) const;
+    OperationResult answerOf(const OperationRequest& request);
+    OperationResult askProviders(const OperationRequest& request);
+    OperationResult askInterop(const OperationRequest& request);
+    void finish(const OperationRequest& request, OperationResult& result) const;
+    void finish(const OperationRequest& request, ObjectPathValue& path) const;
+    void gatherComplaints();
+
     const std::string hostName_;
     const Schema schema_;
     const SchemaCatalogue catalogue_;
@@ -75,7 +105,12 @@ class ObjectManager {
     Router router_;
     Statistics statistics_;
     Interop interop_;
+    const std::vector<NameSpace> nameSpaces_;
     OpenEnumerations openEnumerations_;
+    /// Guards what follows.
+    std::mutex complaintMutex_;
+    std::vector<std::string> complaints_;
+    std::size_t complaintsLeftOut_ = 0;
 };
 
 }  // namespace cmpihost::server

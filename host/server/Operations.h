@@ -3,6 +3,7 @@
 
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "host/server/ElementWriter.h"
@@ -42,6 +43,11 @@ const std::vector<OperationRow>& pullOperations();
 /// The row of a name (without case), null for none.
 const OperationRow* findOperation(std::string_view name);
 
+/// Calls a method of a class or instance, as a METHODCALL asks for it: appends what stands in
+/// METHODRESPONSE. `nameSpace` is that of the message as the server spells it. Throws CimError.
+void invokeMethod(ObjectManager& manager, const std::string& nameSpace, const Message& message,
+                  const std::optional<std::string>& user, std::string& xml);
+
 /// What the operations that yield objects answer, before it is written: the pull operations hand it
 /// out piece by piece. Their parameters are those of the operations of the same name. They throw
 /// CimError.
@@ -53,10 +59,16 @@ std::vector<ObjectPathValue> associatorNames(const Call& call, std::string_view 
 std::vector<InstanceValue> references(const Call& call, std::string_view sourceParameter);
 std::vector<ObjectPathValue> referenceNames(const Call& call, std::string_view sourceParameter);
 
-/// The one instance that has all the keys of the path, which typedPath gave; throws CimError with
-/// cimNotFound where there is none.
+/// The one instance that has all the keys of the path of a GetInstance, with the properties that it
+/// asks for; typedPath gave the path. Throws CimError with cimNotFound where there is none.
+InstanceValue gottenInstance(ObjectManager& manager, const OperationRequest& request);
 InstanceValue gottenInstance(ObjectManager& manager, const ObjectPathValue& path,
                              const std::optional<std::vector<std::string>>& properties);
+
+/// Whether two paths name the same instance: class names without case, string keys with it but for
+/// CSName and Name, numbers by value. The host does not count, a namespace only where both have
+/// one.
+bool sameInstance(const ObjectPathValue& left, const ObjectPathValue& right);
 
 /// Leaves out the properties that are not in the list (names without case), but for keys where
 /// `keepKeys`. An absent list keeps all.

@@ -1,0 +1,56 @@
+#ifndef TESTS_HOST_SERVER_SERVER_FIXTURE_H
+#define TESTS_HOST_SERVER_SERVER_FIXTURE_H
+
+#include <string>
+
+#include "host/server/ObjectManager.h"
+
+/// Object managers in the test program, and requests for them.
+namespace cmpihost::server::fixture {
+
+/// A new object manager over the shipped libraries, with the schema and the registrations of the
+/// source tree, on the fixture host: "fixture.example". Its own name is "server.example".
+std::unique_ptr<ObjectManager> shippedManager();
+/// The one over the providers of tests/host/providers, in root/test and root/other. `registrations`
+/// is text of further sections, `mof` of further classes.
+std::unique_ptr<ObjectManager> foreignManager(const std::string& registrations = {},
+                                              const std::string& mof = {});
+
+/// The response document that a manager answers to the text of a request message; "HTTP 400: why"
+/// for one that is no message. The first form asks one shippedManager() for the whole program.
+std::string respond(const std::string& request);
+std::string respond(ObjectManager& manager, const std::string& request,
+                    const std::optional<std::string>& user = {});
+
+/// A request message of an intrinsic operation; `parameters` is XML. Namespaces are as
+/// "root/cimv2".
+std::string operation(const std::string& name, const std::string& parameters = {},
+                      const std::string& nameSpace = "root/cimv2");
+/// Of a method; `object` is a CLASSNAME or an INSTANCENAME.
+std::string methodCall(const std::string& name, const std::string& object,
+                       const std::string& parameters = {},
+                       const std::string& nameSpace = "root/cimv2");
+
+/// Elements of requests. Values are put in as they are, so they are XML.
+std::string parameter(const std::string& name, const std::string& content);
+std::string className(const std::string& parameterName, const std::string& name);
+std::string value(const std::string& parameterName, const std::string& text);
+std::string list(const std::string& parameterName, const std::vector<std::string>& names);
+/// An INSTANCENAME with string keys.
+std::string instanceName(const std::string& name,
+                         const std::vector<std::pair<std::string, std::string>>& keys);
+/// The INSTANCENAMEs of the instances of the fixture host.
+std::string operatingSystem();
+std::string computerSystem();
+std::string capabilities();
+
+/// The content of IMETHODRESPONSE or METHODRESPONSE; the whole document where there is neither.
+std::string content(const std::string& document);
+/// "6: DESCRIPTION" of an answer with an ERROR; empty for one without.
+std::string error(const std::string& document);
+/// How often a text stands in another.
+std::size_t count(const std::string& text, const std::string& part);
+
+}  // namespace cmpihost::server::fixture
+
+#endif
