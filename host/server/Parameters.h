@@ -2,6 +2,7 @@
 #define HOST_SERVER_PARAMETERS_H
 
 #include <cstdint>
+#include <initializer_list>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -36,7 +37,8 @@ struct ParameterRow {
 
 /// What a client gave for the parameters of an operation, checked against their rows. A parameter
 /// that is not given, or given without a value, is absent. Asking for a name that has no row, or by
-/// a function that does not fit its kind, is a mistake of the caller's (std::logic_error).
+/// a function that does not fit its kind, is a mistake of the caller's (std::logic_error). The rows
+/// and the message outlive it.
 class Parameters {
   public:
     /// Throws CimError with cimInvalidParameter for a parameter that is unknown, doubled, missing
@@ -57,9 +59,11 @@ class Parameters {
   private:
     struct Given {
         const ParameterRow* row;
+        /// Null for a parameter that is absent or NULL.
         const XmlElement* value;
+        bool isGiven;
     };
-    const Given* find(std::string_view name) const;
+    const XmlElement* find(std::string_view name, std::initializer_list<ParameterKind> kinds) const;
 
     std::vector<Given> given_;
 };

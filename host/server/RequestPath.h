@@ -37,8 +37,12 @@ struct RequestPath {
 };
 
 /// Reads a CLASSNAME, INSTANCENAME, LOCALCLASSPATH, LOCALINSTANCEPATH, CLASSPATH or INSTANCEPATH
-/// of a message. Its structure has been checked. HOST is left out.
+/// of a message, also in a VALUE.REFERENCE. Its structure has been checked. HOST is left out.
 RequestPath readPath(const XmlElement& element);
+
+/// The namespace that a LOCALNAMESPACEPATH of a message names: "root/cimv2", without slashes at its
+/// ends or double ones, however it is spread over NAMESPACE elements.
+std::string readNameSpace(const XmlElement& element);
 
 /// The path of an instance as a provider is entitled to get it: the schema's spelling, types and
 /// order of keys, all keys there; `nameSpace` where the path has none. Of a class that the

@@ -12,8 +12,8 @@
 namespace cmpihost::server {
 
 /// The value that a text stands for; none when it stands for none of that type. `type` is a scalar
-/// type other than a reference. Integers are decimal or hexadecimal, datetimes 25 characters,
-/// booleans TRUE or FALSE in any case.
+/// type other than a reference. Integers are decimal or hexadecimal and in range, datetimes 25
+/// characters, booleans TRUE or FALSE in any case, reals decimal or INF, -INF, NaN. Blanks count.
 std::optional<Value> valueFromText(const std::string& text, CMPIType type);
 
 /// The CMPI type that a name of a CIM type stands for ("uint16", "reference"), without case; none
