@@ -1,23 +1,131 @@
-#include "host/server/Operations.h"
+// The four association operations, from instances and from classes.
+#include "host/server/AssociationTraversal.h"
+#include "host/server/ClassWriter.h"
 
 namespace cmpihost::server {
 
-const std::vector<OperationRow>& associationOperations() {
-    static const std::vector<OperationRow> rows;
-    return rows;
+namespace {
+
+std::vector<InstanceValue> traversedInstances(const Call& call, std::string_view sourceParameter,
+                                              Operation operation) {
+    std::vector<InstanceValue> instances = traversed(call, sourceParameter, operation).instances;
+    applyPropertyList(instances, call.parameters.names("PropertyList"));
+    return instances;
 }
 
-std::vector<InstanceValue> associators(const Call&, std::string_view) {
-    return {};
+}  // namespace
+
+std::vector<InstanceValue> associators(const Call& call, std::string_view sourceParameter) {
+    return traversedInstances(call, sourceParameter, Operation::Associators);
 }
-std::vector<ObjectPathValue> associatorNames(const Call&, std::string_view) {
-    return {};
+std::vector<ObjectPathValue> associatorNames(const Call& call, std::string_view sourceParameter) {
+    return traversed(call, sourceParameter, Operation::AssociatorNames).paths;
 }
-std::vector<InstanceValue> references(const Call&, std::string_view) {
-    return {};
+std::vector<InstanceValue> references(const Call& call, std::string_view sourceParameter) {
+    return traversedInstances(call, sourceParameter, Operation::References);
 }
-std::vector<ObjectPathValue> referenceNames(const Call&, std::string_view) {
-    return {};
+std::vector<ObjectPathValue> referenceNames(const Call& call, std::string_view sourceParameter) {
+    return traversed(call, sourceParameter, Operation::ReferenceNames).paths;
+}
+
+namespace {
+
+constexpr const char* sourceObject = "ObjectName";
+
+/// The source is a class: an instance without keys is how some clients name one.
+bool asksForClasses(const Call& call) {
+    return call.parameters.path(sourceObject)->keys.empty();
+}
+
+std::vector<std::string> tiedClasses(const Call& call, Operation operation) {
+    const RequestPath source = associationSource(call, sourceObject);
+    const AssociationFilter filter = associationFilter(call, operation);
+    return (isReferenceOperation(operation) ? referringClasses : associatedClasses)(
+        call.manager, call.nameSpace, source.className, filter);
+}
+
+void writeClasses(const Call& call, Operation operation, std::string& xml) {
+    ClassView view;
+    view.qualifiers = call.parameters.flag("IncludeQualifiers", false);
+    view.classOrigin = call.parameters.flag("IncludeClassOrigin", false);
+    view.properties = call.parameters.names("PropertyList");
+    const Schema& schema = call.manager.schema(call.nameSpace);
+    for (const std::string& name : tiedClasses(call, operation)) {
+        xml += "<VALUE.OBJECTWITHPATH>";
+        writeClassPath(xml, name, call.site());
+        writeClass(xml, resolvedClass(schema, name).value(), schema.qualifierTypes(), view);
+        xml += "</VALUE.OBJECTWITHPATH>";
+    }
+}
+
+void writeClassNames(const Call& call, Operation operation, std::string& xml) {
+    for (const std::string& name : tiedClasses(call, operation)) {
+        xml += "<OBJECTPATH>";
+        writeClassPath(xml, name, call.site());
+        xml += "</OBJECTPATH>";
+    }
+}
+
+/// Answers Associators or References.
+template <Operation operation>
+void runWithObjects(const Call& call, std::string& xml) {
+    xml += "<IRETURNVALUE>";
+    if (asksForClasses(call)) {
+        writeClasses(call, operation, xml);
+    } else {
+        writeObjectsWithPath(xml, traversedInstances(call, sourceObject, operation), call.site(),
+                             call.parameters.flag("IncludeClassOrigin", false));
+    }
+    xml += "</IRETURNVALUE>";
+}
+
+/// Answers AssociatorNames or ReferenceNames.
+template <Operation operation>
+void runWithNames(const Call& call, std::string& xml) {
+    xml += "<IRETURNVALUE>";
+    if (asksForClasses(call)) {
+        writeClassNames(call, operation, xml);
+    } else {
+        writeObjectPaths(xml, traversed(call, sourceObject, operation).paths, call.site());
+    }
+    xml += "</IRETURNVALUE>";
+}
+
+}  // namespace
+
+const std::vector<OperationRow>& associationOperations() {
+    using Kind = ParameterKind;
+    static const std::vector<OperationRow> rows = {{"Associators",
+                                                    {{sourceObject, Kind::ObjectName, true},
+                                                     {"AssocClass", Kind::ClassName},
+                                                     {"ResultClass", Kind::ClassName},
+                                                     {"Role", Kind::Text},
+                                                     {"ResultRole", Kind::Text},
+                                                     {"IncludeQualifiers", Kind::Boolean},
+                                                     {"IncludeClassOrigin", Kind::Boolean},
+                                                     {"PropertyList", Kind::PropertyList}},
+                                                    runWithObjects<Operation::Associators>},
+                                                   {"AssociatorNames",
+                                                    {{sourceObject, Kind::ObjectName, true},
+                                                     {"AssocClass", Kind::ClassName},
+                                                     {"ResultClass", Kind::ClassName},
+                                                     {"Role", Kind::Text},
+                                                     {"ResultRole", Kind::Text}},
+                                                    runWithNames<Operation::AssociatorNames>},
+                                                   {"References",
+                                                    {{sourceObject, Kind::ObjectName, true},
+                                                     {"ResultClass", Kind::ClassName},
+                                                     {"Role", Kind::Text},
+                                                     {"IncludeQualifiers", Kind::Boolean},
+                                                     {"IncludeClassOrigin", Kind::Boolean},
+                                                     {"PropertyList", Kind::PropertyList}},
+                                                    runWithObjects<Operation::References>},
+                                                   {"ReferenceNames",
+                                                    {{sourceObject, Kind::ObjectName, true},
+                                                     {"ResultClass", Kind::ClassName},
+                                                     {"Role", Kind::Text}},
+                                                    runWithNames<Operation::ReferenceNames>}};
+    return rows;
 }
 
 }  // namespace cmpihost::server

@@ -1,9 +1,209 @@
+// An enumeration is computed whole when it is opened: what a client does not take at once waits.
 #include "host/server/Operations.h"
+
+#include "host/server/CimError.h"
+
+#include <chrono>
+#include <cstdint>
+#include <iterator>
+#include <utility>
 
 namespace cmpihost::server {
 
+namespace {
+
+constexpr std::uint32_t defaultTimeout = 30;
+constexpr std::uint32_t longestTimeout = 90;
+constexpr std::uint32_t mostObjects = 10000;
+
+std::uint32_t objectCount(const Parameters& given, std::uint32_t byDefault) {
+    const std::uint32_t count = given.number("MaxObjectCount").value_or(byDefault);
+    if (count > mostObjects)
+        throw CimError(cimInvalidParameter,
+                       "MaxObjectCount is at most " + std::to_string(mostObjects));
+    return count;
+}
+
+/// What a client may ask of any enumeration that it opens.
+struct OpenOptions {
+    std::uint32_t count;
+    std::chrono::seconds timeout;
+};
+
+OpenOptions openOptions(const Parameters& given) {
+    const std::uint32_t count = objectCount(given, 0);
+    if (given.text("FilterQueryLanguage") || given.text("FilterQuery"))
+        throw CimError(cimFilteredEnumerationNotSupported, "enumerations are not filtered here");
+    if (given.flag("ContinueOnError", false))
+        throw CimError(cimContinuationOnErrorNotSupported,
+                       "an enumeration does not go on after an error here");
+    const std::uint32_t timeout = given.number("OperationTimeout").value_or(defaultTimeout);
+    if (timeout == 0 || timeout > longestTimeout)
+        throw CimError(cimInvalidOperationTimeout, "OperationTimeout is from 1 to " +
+                                                       std::to_string(longestTimeout) + " seconds");
+    return {count, std::chrono::seconds(timeout)};
+}
+
+WrittenResults writtenInstances(const std::vector<InstanceValue>& instances, const Call& call) {
+    const Site site = call.site();
+    const bool classOrigin = call.parameters.flag("IncludeClassOrigin", false);
+    WrittenResults results;
+    for (const InstanceValue& instance : instances) {
+        results.xml += "<VALUE.INSTANCEWITHPATH>";
+        writeInstancePath(results.xml, instance.path, site);
+        writeInstance(results.xml, instance, site, classOrigin);
+        results.xml += "</VALUE.INSTANCEWITHPATH>";
+        results.ends.push_back(results.xml.size());
+    }
+    return results;
+}
+
+WrittenResults writtenPaths(const std::vector<ObjectPathValue>& paths, const Call& call) {
+    const Site site = call.site();
+    WrittenResults results;
+    for (const ObjectPathValue& path : paths) {
+        writeInstancePath(results.xml, path, site);
+        results.ends.push_back(results.xml.size());
+    }
+    return results;
+}
+
+EnumerationOwner ownerOf(const Call& call) {
+    return {call.user, call.nameSpace};
+}
+
+void writePiece(const Piece& piece, const Call& call, std::string& xml) {
+    xml += "<IRETURNVALUE>" + piece.xml + "</IRETURNVALUE>";
+    writeParameter(xml, "EnumerationContext", piece.context, call.site());
+    writeParameter(xml, "EndOfSequence", Value::fromBoolean(piece.context.empty()), call.site());
+}
+
+/// What an enumeration yields, by the parameters of its call.
+using InstanceSource = std::vector<InstanceValue> (*)(const Call&);
+using PathSource = std::vector<ObjectPathValue> (*)(const Call&);
+
+template <InstanceSource source>
+void openInstances(const Call& call, std::string& xml) {
+    const OpenOptions options = openOptions(call.parameters);
+    WrittenResults results = writtenInstances(source(call), call);
+    writePiece(
+        call.manager.openEnumerations().open(ownerOf(call), PulledKind::InstancesWithPath,
+                                             std::move(results), options.count, options.timeout),
+        call, xml);
+}
+
+template <PathSource source>
+void openPaths(const Call& call, std::string& xml) {
+    const OpenOptions options = openOptions(call.parameters);
+    WrittenResults results = writtenPaths(source(call), call);
+    writePiece(
+        call.manager.openEnumerations().open(ownerOf(call), PulledKind::InstancePaths,
+                                             std::move(results), options.count, options.timeout),
+        call, xml);
+}
+
+constexpr const char* sourceInstance = "InstanceName";
+
+std::vector<InstanceValue> openedAssociators(const Call& call) {
+    return associators(call, sourceInstance);
+}
+std::vector<ObjectPathValue> openedAssociatorNames(const Call& call) {
+    return associatorNames(call, sourceInstance);
+}
+std::vector<InstanceValue> openedReferences(const Call& call) {
+    return references(call, sourceInstance);
+}
+std::vector<ObjectPathValue> openedReferenceNames(const Call& call) {
+    return referenceNames(call, sourceInstance);
+}
+
+template <PulledKind kind>
+void pullNext(const Call& call, std::string& xml) {
+    const std::uint32_t count = objectCount(call.parameters, 0);
+    writePiece(call.manager.openEnumerations().pull(*call.parameters.text("EnumerationContext"),
+                                                    ownerOf(call), kind, count),
+               call, xml);
+}
+
+void closeEnumeration(const Call& call, std::string&) {
+    call.manager.openEnumerations().close(*call.parameters.text("EnumerationContext"),
+                                          ownerOf(call));
+}
+
+void refuseQuery(const Call&, std::string&) {
+    throw CimError(cimNotSupported, "enumerations of queries are not supported");
+}
+void refuseCount(const Call&, std::string&) {
+    throw CimError(cimNotSupported, "what is left of an enumeration is not counted");
+}
+
+/// An operation that opens an enumeration: its own parameters and those of all.
+OperationRow opening(const char* name, std::vector<ParameterRow> parameters,
+                     void (*run)(const Call&, std::string&)) {
+    using Kind = ParameterKind;
+    const ParameterRow common[] = {{"FilterQueryLanguage", Kind::Text},
+                                   {"FilterQuery", Kind::Text},
+                                   {"OperationTimeout", Kind::Number},
+                                   {"ContinueOnError", Kind::Boolean},
+                                   {"MaxObjectCount", Kind::Number}};
+    parameters.insert(parameters.end(), std::begin(common), std::end(common));
+    return {name, std::move(parameters), run};
+}
+
+OperationRow pulling(const char* name, void (*run)(const Call&, std::string&)) {
+    using Kind = ParameterKind;
+    return {name,
+            {{"EnumerationContext", Kind::Text, true}, {"MaxObjectCount", Kind::Number, true}},
+            run};
+}
+
+}  // namespace
+
 const std::vector<OperationRow>& pullOperations() {
-    static const std::vector<OperationRow> rows;
+    using Kind = ParameterKind;
+    static const std::vector<OperationRow> rows = {
+        opening("OpenEnumerateInstances",
+                {{"ClassName", Kind::ClassName, true},
+                 {"DeepInheritance", Kind::Boolean},
+                 {"IncludeClassOrigin", Kind::Boolean},
+                 {"PropertyList", Kind::PropertyList}},
+                openInstances<enumeratedInstances>),
+        opening("OpenEnumerateInstancePaths", {{"ClassName", Kind::ClassName, true}},
+                openPaths<enumeratedInstanceNames>),
+        opening("OpenAssociatorInstances",
+                {{sourceInstance, Kind::InstanceName, true},
+                 {"AssocClass", Kind::ClassName},
+                 {"ResultClass", Kind::ClassName},
+                 {"Role", Kind::Text},
+                 {"ResultRole", Kind::Text},
+                 {"IncludeClassOrigin", Kind::Boolean},
+                 {"PropertyList", Kind::PropertyList}},
+                openInstances<openedAssociators>),
+        opening("OpenAssociatorInstancePaths",
+                {{sourceInstance, Kind::InstanceName, true},
+                 {"AssocClass", Kind::ClassName},
+                 {"ResultClass", Kind::ClassName},
+                 {"Role", Kind::Text},
+                 {"ResultRole", Kind::Text}},
+                openPaths<openedAssociatorNames>),
+        opening("OpenReferenceInstances",
+                {{sourceInstance, Kind::InstanceName, true},
+                 {"ResultClass", Kind::ClassName},
+                 {"Role", Kind::Text},
+                 {"IncludeClassOrigin", Kind::Boolean},
+                 {"PropertyList", Kind::PropertyList}},
+                openInstances<openedReferences>),
+        opening("OpenReferenceInstancePaths",
+                {{sourceInstance, Kind::InstanceName, true},
+                 {"ResultClass", Kind::ClassName},
+                 {"Role", Kind::Text}},
+                openPaths<openedReferenceNames>),
+        opening("OpenQueryInstances", {{"ReturnQueryResultClass", Kind::Boolean}}, refuseQuery),
+        pulling("PullInstancesWithPath", pullNext<PulledKind::InstancesWithPath>),
+        pulling("PullInstancePaths", pullNext<PulledKind::InstancePaths>),
+        pulling("PullInstances", pullNext<PulledKind::Instances>),
+        {"CloseEnumeration", {{"EnumerationContext", Kind::Text, true}}, closeEnumeration},
+        {"EnumerationCount", {{"EnumerationContext", Kind::Text, true}}, refuseCount}};
     return rows;
 }
 
