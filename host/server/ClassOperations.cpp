@@ -50,8 +50,8 @@ ClassView viewOf(const Parameters& parameters) {
 
 void getClass(const Call& call, std::string& xml) {
     const std::string name = call.parameters.className("ClassName").value_or("");
-    const std::optional<ResolvedClass> found =
-        resolvedClass(call.manager.schema(call.nameSpace), name);
+    const Schema& schema = call.manager.schema(call.nameSpace);
+    const std::optional<ResolvedClass> found = resolvedClass(schema, name);
     if (!found && call.manager.knowsClass(call.nameSpace, name)) {
         throw CimError(cimNotFound, name +
                                         ": only the name of this class is known here; the option "
@@ -61,16 +61,17 @@ void getClass(const Call& call, std::string& xml) {
     ClassView view = viewOf(call.parameters);
     view.properties = call.parameters.names("PropertyList");
     xml += "<IRETURNVALUE>";
-    writeClass(xml, *found, view);
+    writeClass(xml, *found, schema.qualifierTypes(), view);
     xml += "</IRETURNVALUE>";
 }
 
 void enumerateClasses(const Call& call, std::string& xml) {
+    const Schema& schema = call.manager.schema(call.nameSpace);
     const ClassView view = viewOf(call.parameters);
     const std::size_t before = xml.size();
     xml += "<IRETURNVALUE>";
     for (const std::string& name : enumeratedClassNames(call)) {
-        writeClass(xml, *resolvedClass(call.manager.schema(call.nameSpace), name), view);
+        writeClass(xml, *resolvedClass(schema, name), schema.qualifierTypes(), view);
         if (xml.size() - before > mostClassBytes) {
             throw CimError(cimServerLimitsExceeded,
                            "these classes are more than the server sends at once, 16 MiB; ask for "

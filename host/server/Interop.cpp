@@ -1,11 +1,8 @@
 // A handful of instances, made anew for each request: the counters are as of now.
 #include "host/server/Interop.h"
 
-#include <algorithm>
-#include <iterator>
 #include <utility>
 
-#include "base/Ascii.h"
 #include "host/mof/MofParser.h"
 #include "host/server/InteropClasses.h"
 
@@ -15,7 +12,6 @@ namespace {
 
 constexpr const char* managerClass = "KORVA_ObjectManager";
 constexpr const char* nameSpaceClass = "CIM_Namespace";
-constexpr const char* tieClass = "CIM_NamespaceInManager";
 constexpr const char* systemClass = "KORVA_ComputerSystem";
 constexpr const char* managerName = "cmpihost";
 
@@ -60,7 +56,7 @@ OperationResult Interop::ask(const OperationRequest& request) const {
         case Operation::EnumerateInstances:
         case Operation::EnumerateInstanceNames:
             for (InstanceValue& each : instances()) {
-                if (!isA(each.path.className, className)) continue;
+                if (!schema_.isA(each.path.className, className)) continue;
                 if (yieldsPaths(request.operation)) {
                     result.paths.push_back(std::move(each.path));
                 } else {
@@ -75,10 +71,6 @@ OperationResult Interop::ask(const OperationRequest& request) const {
                 refuse(result, CMPI_RC_ERR_NOT_FOUND,
                        toString(request.path) + ": no such instance");
             break;
-        case Operation::Associators:
-        case Operation::AssociatorNames:
-            associate(request, result);
-            break;
         default:
             refuse(result, CMPI_RC_ERR_NOT_SUPPORTED,
                    std::string("what ") + nameSpace + " holds is only to be read, not by " +
@@ -87,48 +79,11 @@ OperationResult Interop::ask(const OperationRequest& request) const {
     return result;
 }
 
-/// The far ends of CIM_NamespaceInManager. Filters other than the association class are for the
-/// caller.
-void Interop::associate(const OperationRequest& request, OperationResult& result) const {
-    if (request.assocClass && !isA(tieClass, *request.assocClass)) return;
-    std::vector<InstanceValue> all = instances();
-    const auto isManager = [](const ObjectPathValue& path) {
-        return base::equalsIgnoreCase(path.className, managerClass);
-    };
-    const auto isEnd = [&](const ObjectPathValue& path) {
-        return isManager(path) || base::equalsIgnoreCase(path.className, nameSpaceClass);
-    };
-    const bool exists = std::any_of(all.begin(), all.end(), [&](const InstanceValue& each) {
-        return each.path == request.path;
-    });
-    if (!exists || !isEnd(request.path)) return;
-    for (InstanceValue& each : all) {
-        if (!isEnd(each.path) || isManager(each.path) == isManager(request.path)) continue;
-        if (yieldsPaths(request.operation)) {
-            result.paths.push_back(std::move(each.path));
-        } else {
-            result.instances.push_back(std::move(each));
-        }
-    }
-}
-
-bool Interop::isA(const std::string& className, const std::string& ancestor) const {
-    return schema_.isA(className, ancestor);
-}
-
 std::vector<InstanceValue> Interop::instances() const {
     std::vector<InstanceValue> result = {objectManager()};
-    const ObjectPathValue manager = result.front().path;
-    std::vector<InstanceValue> others;
-    for (const std::string& name : nameSpaces_) {
-        result.push_back(nameSpaceInstance(name));
-        others.push_back(
-            instanceOf(tieClass, {{"Antecedent", Value::fromReference(manager)},
-                                  {"Dependent", Value::fromReference(result.back().path)}}));
-    }
+    for (const std::string& name : nameSpaces_) result.push_back(nameSpaceInstance(name));
     for (const std::string& name : nameSpaces_)
-        others.push_back(instanceOf("__Namespace", {{"Name", name}}));
-    std::move(others.begin(), others.end(), std::back_inserter(result));
+        result.push_back(instanceOf("__Namespace", {{"Name", name}}));
     return result;
 }
 

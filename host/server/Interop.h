@@ -36,8 +36,6 @@ class Interop {
     InstanceValue objectManager() const;
     InstanceValue nameSpaceInstance(const std::string& name) const;
     InstanceValue instanceOf(const char* className, std::vector<PropertyValue> properties) const;
-    bool isA(const std::string& className, const std::string& ancestor) const;
-    void associate(const OperationRequest& request, OperationResult& result) const;
 
     const std::string hostName_;
     const std::vector<std::string> nameSpaces_;

@@ -123,29 +123,6 @@ class CIM_Namespace : CIM_ManagedElement {
    uint16 ClassInfo;
 };
 
-   [Association, Abstract, Version ( "1.0.0" ), Description ("Something depends on something else.")]
-class CIM_Dependency {
-      [Key, Description ("What the other one depends on.")]
-   CIM_ManagedElement REF Antecedent;
-
-      [Key, Description ("What depends on the other one.")]
-   CIM_ManagedElement REF Dependent;
-};
-
-   [Association, Abstract, Version ( "1.0.0" ),
-    Description ("Something exists only where something else is.")]
-class CIM_HostedDependency : CIM_Dependency {
-};
-
-   [Association, Version ( "1.0.0" ), Description ("Ties the server to its namespaces.")]
-class CIM_NamespaceInManager : CIM_HostedDependency {
-      [Key, Override ( "Antecedent" ), Min ( 1 ), Max ( 1 ), Description ("The server.")]
-   CIM_ObjectManager REF Antecedent;
-
-      [Key, Override ( "Dependent" ), Weak, Description ("The namespace.")]
-   CIM_Namespace REF Dependent;
-};
-
    [Version ( "1.0.0" ), Description ("A namespace, for clients that look for no other class.")]
 class __Namespace {
       [Key, MaxLen ( 256 ), Description ("The whole name of the namespace, as requests have it.")]
