@@ -1,6 +1,7 @@
 #ifndef HOST_SERVER_CIM_OVER_HTTP_H
 #define HOST_SERVER_CIM_OVER_HTTP_H
 
+#include <atomic>
 #include <optional>
 #include <string>
 #include <vector>
@@ -47,9 +48,13 @@ class CimOverHttp final : public HttpHandler {
     HttpResponse answer(const HttpRequest& request) override;
 
   private:
+    HttpResponse responseTo(const HttpRequest& request);
+    HttpResponse carriedOut(const HttpRequest& request, const std::optional<std::string>& user);
+
     ObjectManager& manager_;
     AccessControl& access_;
     const Options options_;
+    std::atomic<unsigned> running_ = 0;
 };
 
 }  // namespace cmpihost::server

@@ -3,6 +3,7 @@
 
 #include <chrono>
 #include <cstddef>
+#include <functional>
 #include <memory>
 #include <string>
 
@@ -14,13 +15,27 @@ namespace cmpihost::server {
 /// What a server withstands.
 struct HttpLimits {
     unsigned connections = 64;
+    /// Of one numeric address; those of a unix socket have none.
     unsigned connectionsOfAnAddress = 16;
     std::size_t headerBytes = 8192;
+    std::size_t headerFields = 64;
     std::size_t bodyBytes = 1024 * 1024;
-    /// For the whole header, the whole body, the whole response.
-    std::chrono::seconds transfer{10};
-    /// For the next request on a kept connection.
-    std::chrono::seconds idle{60};
+    /// For the first request line, for each whole header after it, for each whole body, for each
+    /// whole response.
+    std::chrono::milliseconds transfer = std::chrono::seconds(10);
+    /// For the next request line on a kept connection.
+    std::chrono::milliseconds idle = std::chrono::seconds(60);
+};
+
+/// What a server tells of its work. Several threads call these at once; what they throw is lost.
+struct HttpEvents {
+    /// After each response, whether or not the client took it; the time is that from the whole
+    /// request until then.
+    std::function<void(const HttpRequest&, const HttpResponse&, std::chrono::nanoseconds)>
+        answered{};
+    /// A connection was refused, or cut while a request or response was on its way: who, and why in
+    /// a few ASCII words. The peer is empty where no connection could be accepted.
+    std::function<void(const std::string& peer, const char* reason)> cut{};
 };
 
 /// A certificate chain and its key, as the texts of PEM files.
@@ -29,14 +44,16 @@ struct TlsIdentity {
     std::string key;
 };
 
-/// An HTTP/1.1 server on one listening socket, with a thread for each connection.
+/// An HTTP/1.1 server on one listening socket (IPv4, IPv6 or unix), with a thread for each
+/// connection. Where all connections are taken, a new one replaces the one that has waited longest
+/// for a request.
 class HttpServer {
   public:
     /// Starts to serve. `tls` null: without TLS. The handler outlives the server. Throws
     /// std::runtime_error when it cannot start, with the reason.
     HttpServer(base::FileDescriptor listener, HttpHandler& handler, const HttpLimits& limits,
-               const TlsIdentity* tls = nullptr);
-    /// Ends when the requests that run have been answered.
+               const TlsIdentity* tls = nullptr, HttpEvents events = {});
+    /// Ends when the requests that run have been answered; connections without one end at once.
     ~HttpServer();
     HttpServer(const HttpServer&) = delete;
     HttpServer& operator=(const HttpServer&) = delete;

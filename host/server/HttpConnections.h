@@ -1,0 +1,84 @@
+#ifndef HOST_SERVER_HTTP_CONNECTIONS_H
+#define HOST_SERVER_HTTP_CONNECTIONS_H
+
+#include <atomic>
+#include <chrono>
+#include <condition_variable>
+#include <map>
+#include <memory>
+#include <mutex>
+#include <string>
+
+#include "host/server/HttpServer.h"
+
+/// The connections of an HTTP server: how many there may be and how long each may take.
+namespace cmpihost::server {
+
+/// One connection. But for `phase` and `since` it is its own thread's alone.
+struct HttpConnection {
+    using Clock = std::chrono::steady_clock;
+
+    /// What it is at; Opening and Idle wait for a request line.
+    enum class Phase { Opening, Idle, Header, Body, Answer, Response };
+
+    HttpConnection(int socketNumber, std::string peerAddress)
+        : socket(socketNumber), peer(std::move(peerAddress)) {}
+
+    void enter(Phase next) noexcept {
+        since = Clock::now().time_since_epoch();
+        phase = next;
+    }
+
+    const int socket;
+    const std::string peer;
+    std::atomic<Phase> phase = Phase::Opening;
+    std::atomic<Clock::duration> since = Clock::now().time_since_epoch();
+    /// Guarded by HttpConnections.
+    bool cut = false;
+
+    HttpRequest request{};
+    HttpResponse response{};
+    /// The header has been looked at.
+    bool begun = false;
+    /// There is a response, and since when it was worked on.
+    bool answered = false;
+    Clock::time_point asked{};
+};
+
+/// Any threads may call it.
+class HttpConnections {
+  public:
+    HttpConnections(const HttpLimits& limits, const HttpEvents& events)
+        : limits_(limits), events_(events) {}
+
+    /// Takes a new connection in, null where there are too many.
+    HttpConnection* admit(int socket, const std::string& peer);
+    /// The connection with that socket, null for none.
+    HttpConnection* find(int socket);
+    /// Forgets a connection, before its socket is closed.
+    void remove(int socket);
+
+    /// Shuts the sockets of those that take too long, which makes their threads end them.
+    void cutLate();
+    /// From now on, those that wait for a request or are reading one are late.
+    void end() { ending_ = true; }
+    bool ending() const noexcept { return ending_; }
+    /// Waits until there is none.
+    void awaitNone();
+    bool none();
+
+  private:
+    std::chrono::nanoseconds allowance(HttpConnection::Phase phase) const;
+    bool makeRoom(const std::string& peer, bool ofThatPeer);
+
+    const HttpLimits& limits_;
+    const HttpEvents& events_;
+    std::atomic<bool> ending_ = false;
+    std::mutex mutex_;
+    std::condition_variable removed_;
+    std::map<int, std::unique_ptr<HttpConnection>> connections_;
+};
+
+}  // namespace cmpihost::server
+
+#endif
