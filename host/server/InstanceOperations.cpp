@@ -85,17 +85,32 @@ bool isCaseless(const std::string& key) {
            base::equalsIgnoreCase(key, "Name");
 }
 
+bool sameKeys(const ObjectPathValue& asked, const ObjectPathValue& given);
+
+/// A path without a namespace is in the other one's.
+bool sameInstance(const ObjectPathValue& asked, const ObjectPathValue& given) {
+    const bool elsewhere = !asked.nameSpace.empty() && !given.nameSpace.empty() &&
+                           !base::equalsIgnoreCase(asked.nameSpace, given.nameSpace);
+    return !elsewhere && base::equalsIgnoreCase(asked.className, given.className) &&
+           asked.keys.size() == given.keys.size() && sameKeys(asked, given);
+}
+
+bool sameKey(const std::string& name, const Value& asked, const Value& given) {
+    if (asked.isNull() || given.isNull()) return false;
+    const bool references = asked.type() == CMPI_ref;
+    if (references != (given.type() == CMPI_ref)) return false;
+    if (references) return sameInstance(asked.reference(), given.reference());
+    // A number of another width is the same number, and so is its text.
+    const std::string left = asked.toText();
+    const std::string right = given.toText();
+    return isCaseless(name) ? base::equalsIgnoreCase(left, right) : left == right;
+}
+
+/// Whether all keys that are asked for are those of the given path.
 bool sameKeys(const ObjectPathValue& asked, const ObjectPathValue& given) {
     return std::all_of(asked.keys.begin(), asked.keys.end(), [&](const KeyBinding& key) {
         const Value* const other = given.key(key.name);
-        if (other == nullptr || other->isNull() || key.value.isNull()) return false;
-        const bool references = key.value.type() == CMPI_ref;
-        if (references != (other->type() == CMPI_ref)) return false;
-        if (references) return sameInstance(key.value.reference(), other->reference());
-        // A number of another width is the same number, and so is its text.
-        const std::string left = key.value.toText();
-        const std::string right = other->toText();
-        return isCaseless(key.name) ? base::equalsIgnoreCase(left, right) : left == right;
+        return other != nullptr && sameKey(key.name, key.value, *other);
     });
 }
 
@@ -316,13 +331,6 @@ InstanceValue gottenInstance(ObjectManager& manager, const ObjectPathValue& path
     request.path = path;
     request.properties = properties;
     return gottenInstance(manager, request);
-}
-
-bool sameInstance(const ObjectPathValue& left, const ObjectPathValue& right) {
-    const bool elsewhere = !left.nameSpace.empty() && !right.nameSpace.empty() &&
-                           !base::equalsIgnoreCase(left.nameSpace, right.nameSpace);
-    return !elsewhere && base::equalsIgnoreCase(left.className, right.className) &&
-           left.keys.size() == right.keys.size() && sameKeys(left, right);
 }
 
 void applyPropertyList(std::vector<InstanceValue>& instances,

@@ -83,15 +83,6 @@ std::vector<NamedValue> argumentsOf(const MethodCall& call) {
     return arguments;
 }
 
-void writeReturnValue(std::string& xml, const Value& value, const Site& site) {
-    if (value.isNull()) return;
-    const CMPIType type = value.type() == CMPI_chars ? CMPI_string : value.type();
-    const std::string name = type == CMPI_ref ? "reference" : cimTypeName(type);
-    xml += "<RETURNVALUE PARAMTYPE=\"" + name + "\">";
-    writeValue(xml, value, site);
-    xml += "</RETURNVALUE>";
-}
-
 }  // namespace
 
 void invokeMethod(ObjectManager& manager, const std::string& nameSpace, const Message& message,

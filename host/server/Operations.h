@@ -65,11 +65,6 @@ InstanceValue gottenInstance(ObjectManager& manager, const OperationRequest& req
 InstanceValue gottenInstance(ObjectManager& manager, const ObjectPathValue& path,
                              const std::optional<std::vector<std::string>>& properties);
 
-/// Whether two paths name the same instance: class names without case, string keys with it but for
-/// CSName and Name, numbers by value. The host does not count, a namespace only where both have
-/// one.
-bool sameInstance(const ObjectPathValue& left, const ObjectPathValue& right);
-
 /// Leaves out the properties that are not in the list (names without case), but for keys where
 /// `keepKeys`. An absent list keeps all.
 void applyPropertyList(std::vector<InstanceValue>& instances,

@@ -4,10 +4,9 @@
 
 #include <dlfcn.h>
 
-#include <memory>
+#include <algorithm>
 #include <stdexcept>
 
-#include "host/mof/MofParser.h"
 #include "host/server/Dispatcher.h"
 
 namespace cmpihost::server::fixture {
@@ -39,26 +38,36 @@ std::string nameSpacePath(const std::string& nameSpace) {
 
 }  // namespace
 
-std::unique_ptr<ObjectManager> shippedManager() {
+std::unique_ptr<ObjectManager> managerOf(Schema schema, Registrations registrations) {
     loadFixtureHost();
     ObjectManagerSetup setup;
-    setup.schema = Schema::load(KORVA_SOURCE_DIR "/schema");
-    setup.registrations = Registrations::read({KORVA_SOURCE_DIR "/schema/registration"});
+    setup.schema = std::move(schema);
+    setup.registrations = std::move(registrations);
     setup.libraryFolders = {KORVA_BINARY_DIR "/lib"};
     setup.hostName = "server.example";
     return std::make_unique<ObjectManager>(std::move(setup));
 }
 
-std::unique_ptr<ObjectManager> foreignManager(const std::string& registrations,
-                                              const std::string& mof) {
-    ObjectManagerSetup setup;
-    setup.schema = Schema::load(KORVA_SOURCE_DIR "/tests/host/providers/test.mof");
-    if (!mof.empty()) setup.schema.add(mof::parse(mof, "more.mof"));
-    setup.registrations = Registrations::read({KORVA_SOURCE_DIR "/tests/host/providers/test.reg"});
-    setup.registrations.add(registrations, "more.reg");
-    setup.libraryFolders = {KORVA_BINARY_DIR "/lib"};
-    setup.hostName = "server.example";
-    return std::make_unique<ObjectManager>(std::move(setup));
+Schema shippedSchema() {
+    return Schema::load(KORVA_SOURCE_DIR "/schema");
+}
+
+Registrations registered(const std::string& text) {
+    Registrations registrations;
+    registrations.add(text, "test.reg");
+    return registrations;
+}
+
+std::unique_ptr<ObjectManager> shippedManager() {
+    return managerOf(shippedSchema(),
+                     Registrations::read({KORVA_SOURCE_DIR "/schema/registration"}));
+}
+
+std::unique_ptr<ObjectManager> foreignManager(const std::string& registrations) {
+    auto all = Registrations::read({KORVA_SOURCE_DIR "/tests/host/providers/test.reg"});
+    all.add(registrations, "more.reg");
+    return managerOf(Schema::load(KORVA_SOURCE_DIR "/tests/host/providers/test.mof"),
+                     std::move(all));
 }
 
 std::string respond(const std::string& request) {
@@ -130,8 +139,7 @@ std::string computerSystem() {
 }
 
 std::string capabilities() {
-    return instanceName("KORVA_OperatingSystemCapabilities",
-                        {{"InstanceID", "Fixture Linux"}});
+    return instanceName("KORVA_OperatingSystemCapabilities", {{"InstanceID", "Fixture Linux"}});
 }
 
 std::string content(const std::string& document) {

@@ -1,7 +1,11 @@
 #ifndef TESTS_HOST_SERVER_SERVER_FIXTURE_H
 #define TESTS_HOST_SERVER_SERVER_FIXTURE_H
 
+#include <memory>
+#include <optional>
 #include <string>
+#include <utility>
+#include <vector>
 
 #include "host/server/ObjectManager.h"
 
@@ -11,10 +15,14 @@ namespace cmpihost::server::fixture {
 /// A new object manager over the shipped libraries, with the schema and the registrations of the
 /// source tree, on the fixture host: "fixture.example". Its own name is "server.example".
 std::unique_ptr<ObjectManager> shippedManager();
-/// The one over the providers of tests/host/providers, in root/test and root/other. `registrations`
-/// is text of further sections, `mof` of further classes.
-std::unique_ptr<ObjectManager> foreignManager(const std::string& registrations = {},
-                                              const std::string& mof = {});
+/// One over the providers of tests/host/providers, in root/test and root/other, and those of more
+/// sections of registrations.
+std::unique_ptr<ObjectManager> foreignManager(const std::string& registrations = {});
+/// One that looks for libraries in the folder of the build.
+std::unique_ptr<ObjectManager> managerOf(Schema schema, Registrations registrations);
+Schema shippedSchema();
+/// Registrations from a text.
+Registrations registered(const std::string& text);
 
 /// The response document that a manager answers to the text of a request message; "HTTP 400: why"
 /// for one that is no message. The first form asks one shippedManager() for the whole program.
