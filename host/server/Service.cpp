@@ -6,6 +6,7 @@
 #include <sys/utsname.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <future>
 #include <memory>
 #include <optional>
@@ -20,6 +21,7 @@
 #include "host/server/ListenAddress.h"
 #include "host/server/ObjectManager.h"
 #include "host/server/ServiceManager.h"
+#include "host/server/Users.h"
 
 namespace cmpihost::server {
 
@@ -126,19 +128,25 @@ class Service {
         std::unique_ptr<HttpServer> server{};
     };
 
+    std::optional<TlsIdentity> readIdentity() const;
     void listen();
     void listenOn(const std::string& text);
     void refuseUnsafe(const ListenAddress& address) const;
     void start(Listener& listener);
     void reload();
-    void restart(Listener& listener);
+    template <class Read>
+    void readAgain(const char* what, const Read& read);
+    void replaceIdentity(TlsIdentity identity);
+    void retire(std::unique_ptr<HttpServer> server);
     void logCounters();
     void stop();
 
     const ServiceOptions& options_;
     Log& log_;
     ObjectManager manager_;
-    Everybody access_;
+    /// Null: nobody is asked for a password.
+    std::unique_ptr<Users> users_;
+    Everybody everybody_;
     CimOverHttp cim_;
     AccessLog accessLog_;
     std::optional<TlsIdentity> identity_;
@@ -151,14 +159,18 @@ Service::Service(const ServiceOptions& options, const fs::path& programFolder, L
     : options_(options),
       log_(log),
       manager_(managerSetup(options, programFolder, log)),
-      cim_(manager_, access_, httpOptions(options)),
+      users_(options.users.empty() ? nullptr : std::make_unique<Users>(options.users, log)),
+      cim_(manager_, users_ ? static_cast<AccessControl&>(*users_) : everybody_,
+           httpOptions(options)),
       accessLog_(cim_, log, [this] { return manager_.takeComplaints(); }) {
-    if (!options.certificate.empty())
-        identity_ = {readConfigurationFile(options.certificate, false),
-                     readConfigurationFile(options.key, true)};
-    if (!options.users.empty())
-        throw ServiceError(serviceRefused, "--users: passwords are not checked yet");
+    identity_ = readIdentity();
     listen();
+}
+
+std::optional<TlsIdentity> Service::readIdentity() const {
+    if (options_.certificate.empty()) return std::nullopt;
+    return TlsIdentity{readConfigurationFile(options_.certificate, false),
+                       readConfigurationFile(options_.key, true)};
 }
 
 void Service::listen() {
@@ -226,8 +238,48 @@ ServiceStatus Service::run() {
 
 void Service::reload() {
     notifyServiceManager("RELOADING=1");
-    log_.write(Priority::Info, "reading certificate, key and users again");
+    if (users_) readAgain("users", [this] { users_->reload(); });
+    if (identity_) readAgain("certificate and key", [this] { replaceIdentity(*readIdentity()); });
     notifyServiceManager("READY=1");
+}
+
+/// Where it fails, what was in force stays so.
+template <class Read>
+void Service::readAgain(const char* what, const Read& read) {
+    try {
+        read();
+        log_.write(Priority::Info, std::string("read again: ") + what);
+    } catch (const std::runtime_error& error) {
+        log_.write(Priority::Error, std::string("kept ") + what + ": " + error.what());
+    }
+}
+
+/// New connections are served with the new certificate, those that are there go on with the old
+/// one. Throws std::runtime_error, and has the old one in force then.
+void Service::replaceIdentity(TlsIdentity identity) {
+    const std::optional<TlsIdentity> old = std::exchange(identity_, std::move(identity));
+    for (Listener& listener : listeners_) {
+        if (listener.address.isPlain()) continue;
+        retire(std::move(listener.server));
+        try {
+            start(listener);
+        } catch (const std::runtime_error&) {
+            identity_ = old;
+            start(listener);
+            throw;
+        }
+    }
+}
+
+void Service::retire(std::unique_ptr<HttpServer> server) {
+    const auto isDone = [](const std::future<void>& each) {
+        return each.wait_for(std::chrono::seconds(0)) == std::future_status::ready;
+    };
+    retired_.erase(std::remove_if(retired_.begin(), retired_.end(), isDone), retired_.end());
+    if (!server) return;
+    server->stopListening();
+    retired_.push_back(
+        std::async(std::launch::async, [ending = std::move(server)]() mutable { ending.reset(); }));
 }
 
 void Service::logCounters() {
@@ -246,9 +298,8 @@ void Service::logCounters() {
 void Service::stop() {
     notifyServiceManager("STOPPING=1");
     const Deadline deadline(lastRequests, log_);
-    for (Listener& listener : listeners_) listener.server->stopListening();
     for (Listener& listener : listeners_) {
-        listener.server.reset();
+        retire(std::move(listener.server));
         if (!listener.isPassed) listener.address.removeFile();
     }
     retired_.clear();

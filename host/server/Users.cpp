@@ -1,0 +1,165 @@
+#include "host/server/Users.h"
+
+#include <crypt.h>
+#include <string.h>
+#include <sys/random.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <memory>
+#include <set>
+#include <sstream>
+#include <stdexcept>
+#include <system_error>
+#include <thread>
+#include <utility>
+
+#include "host/server/ConfigurationFile.h"
+
+namespace cmpihost::server {
+
+namespace {
+
+/// Addresses whose failures are counted; beyond, the one that is longest ago is forgotten.
+constexpr std::size_t mostAddresses = 1024;
+
+/// The hash of a password; empty: crypt does not know the kind of hash.
+std::string hashOf(const std::string& password, const std::string& setting) {
+    const auto data = std::make_unique<crypt_data>();
+    const char* const hash = crypt_r(password.c_str(), setting.c_str(), data.get());
+    const std::string result = hash == nullptr || hash[0] == '*' ? "" : hash;
+    explicit_bzero(data.get(), sizeof *data);
+    return result;
+}
+
+/// Takes the same time wherever texts of one length differ.
+bool isEqual(const std::string& left, const std::string& right) {
+    if (left.size() != right.size() || left.empty()) return false;
+    unsigned difference = 0;
+    for (std::size_t index = 0; index < left.size(); ++index)
+        difference |=
+            static_cast<unsigned char>(left[index]) ^ static_cast<unsigned char>(right[index]);
+    return difference == 0;
+}
+
+/// SHA-256 at the fewest rounds that there are, with a salt that no other process has.
+std::string makeShortSetting() {
+    constexpr char digits[] = "./0123456789ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz";
+    unsigned char random[16];
+    if (getrandom(random, sizeof random, 0) != static_cast<ssize_t>(sizeof random))
+        throw std::system_error(errno, std::generic_category(), "no random numbers");
+    std::string setting = "$5$rounds=1000$";
+    for (const unsigned char byte : random) setting += digits[byte % 64U];
+    return setting + "$";
+}
+
+/// What stands before the salt: "$6$".
+std::string kindOf(const std::string& hash) {
+    return hash.substr(0, hash.find('$', 1) + 1);
+}
+
+}  // namespace
+
+Users::Users(std::string file, Log& log, Waits waits)
+    : file_(std::move(file)),
+      log_(log),
+      waits_(waits),
+      shortSetting_(makeShortSetting()),
+      hashes_(readFile()) {}
+
+void Users::reload() {
+    Hashes hashes = readFile();
+    const std::lock_guard<std::mutex> lock(mutex_);
+    hashes_ = std::move(hashes);
+    accepted_.clear();
+}
+
+Users::Hashes Users::readFile() const {
+    std::istringstream text(readConfigurationFile(file_, true));
+    Hashes hashes;
+    std::set<std::string> knownKinds;
+    unsigned number = 0;
+    const auto refuse = [&](const char* why) {
+        throw std::runtime_error(file_ + ":" + std::to_string(number) + ": " + why);
+    };
+    for (std::string line; std::getline(text, line);) {
+        ++number;
+        if (line.empty() || line.front() == '#') continue;
+        const std::size_t colon = line.find(':');
+        if (colon == std::string::npos || colon == 0) refuse("is no line name:hash");
+        const std::string hash = line.substr(colon + 1);
+        const bool graphic =
+            std::all_of(hash.begin(), hash.end(), [](char c) { return c > ' ' && c < '\x7F'; });
+        if (hash.empty() || hash.front() != '$' || !graphic) refuse("the hash is none of crypt(5)");
+        // Of each kind one is tried, for this takes time.
+        if (knownKinds.insert(kindOf(hash)).second && hashOf("", hash).size() != hash.size())
+            refuse("the hash is of a kind that this system does not know, or is cut off");
+        if (!hashes.emplace(line.substr(0, colon), hash).second) refuse("has a name again");
+    }
+    if (hashes.empty()) throw std::runtime_error(file_ + ": holds no users");
+    return hashes;
+}
+
+AccessControl::Verdict Users::judge(const HttpRequest& request) {
+    const std::string* const header = request.header("Authorization");
+    // That a client waits to be asked is no failure.
+    if (header == nullptr) return {};
+    if (request.count("Authorization") != 1) return refuse(request.peer, "more than one header");
+    const std::optional<BasicCredentials> given = readBasicCredentials(*header);
+    if (!given) return refuse(request.peer, "credentials that are none");
+    std::string shortHash = hashOf(given->password, shortSetting_);
+    if (!isRemembered(given->name, shortHash) && !accept(*given, std::move(shortHash)))
+        return refuse(request.peer, "wrong name or password of '" + given->name + "'");
+    return {true, given->name};
+}
+
+bool Users::isRemembered(const std::string& name, const std::string& shortHash) {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    const auto found = accepted_.find(name);
+    return found != accepted_.end() && Clock::now() < found->second.until &&
+           isEqual(found->second.shortHash, shortHash);
+}
+
+bool Users::accept(const BasicCredentials& given, std::string shortHash) {
+    std::unique_lock<std::mutex> lock(mutex_);
+    const auto found = hashes_.find(given.name);
+    const bool known = found != hashes_.end();
+    const std::string expected = known ? found->second : hashes_.begin()->second;
+    lock.unlock();
+    {
+        const std::lock_guard<std::mutex> alone(hashing_);
+        if (!isEqual(hashOf(given.password, expected), expected) || !known) return false;
+    }
+    lock.lock();
+    // The file may have been read again meanwhile.
+    const auto current = hashes_.find(given.name);
+    if (current == hashes_.end() || current->second != expected) return false;
+    accepted_[given.name] = {std::move(shortHash), Clock::now() + remembered};
+    return true;
+}
+
+AccessControl::Verdict Users::refuse(const std::string& peer, const std::string& what) {
+    log_.write(Priority::Warning, peer + ": refused: " + what);
+    std::this_thread::sleep_for(countFailure(peer));
+    return {};
+}
+
+std::chrono::milliseconds Users::countFailure(const std::string& peer) {
+    const std::lock_guard<std::mutex> lock(mutex_);
+    const Clock::time_point now = Clock::now();
+    if (failures_.size() >= mostAddresses && failures_.count(peer) == 0) {
+        const auto earlier = [](const auto& left, const auto& right) {
+            return left.second.last < right.second.last;
+        };
+        failures_.erase(std::min_element(failures_.begin(), failures_.end(), earlier));
+    }
+    Failures& failures = failures_[peer];
+    if (now - failures.last > waits_.forgotten) failures.count = 0;
+    failures.last = now;
+    std::chrono::milliseconds wait = waits_.first;
+    for (unsigned count = 0; count < failures.count && wait < waits_.longest; ++count) wait *= 2;
+    ++failures.count;
+    return std::min(wait, waits_.longest);
+}
+
+}  // namespace cmpihost::server
