@@ -38,10 +38,10 @@ bool asksForClasses(const Call& call) {
 }
 
 std::vector<std::string> tiedClasses(const Call& call, Operation operation) {
-    const RequestPath source = associationSource(call, sourceObject);
+    const std::string source = sourceClass(call, sourceObject);
     const AssociationFilter filter = associationFilter(call, operation);
     return (isReferenceOperation(operation) ? referringClasses : associatedClasses)(
-        call.manager, call.nameSpace, source.className, filter);
+        call.manager, call.nameSpace, source, filter);
 }
 
 void writeClasses(const Call& call, Operation operation, std::string& xml) {
@@ -94,36 +94,36 @@ void runWithNames(const Call& call, std::string& xml) {
 }  // namespace
 
 const std::vector<OperationRow>& associationOperations() {
-    using Kind = ParameterKind;
+    using Holds = ParameterKind;
     static const std::vector<OperationRow> rows = {{"Associators",
-                                                    {{sourceObject, Kind::ObjectName, true},
-                                                     {"AssocClass", Kind::ClassName},
-                                                     {"ResultClass", Kind::ClassName},
-                                                     {"Role", Kind::Text},
-                                                     {"ResultRole", Kind::Text},
-                                                     {"IncludeQualifiers", Kind::Boolean},
-                                                     {"IncludeClassOrigin", Kind::Boolean},
-                                                     {"PropertyList", Kind::PropertyList}},
+                                                    {{sourceObject, Holds::ObjectName, true},
+                                                     {"AssocClass", Holds::ClassName},
+                                                     {"ResultClass", Holds::ClassName},
+                                                     {"Role", Holds::Text},
+                                                     {"ResultRole", Holds::Text},
+                                                     {"IncludeQualifiers", Holds::Boolean},
+                                                     {"IncludeClassOrigin", Holds::Boolean},
+                                                     {"PropertyList", Holds::PropertyList}},
                                                     runWithObjects<Operation::Associators>},
                                                    {"AssociatorNames",
-                                                    {{sourceObject, Kind::ObjectName, true},
-                                                     {"AssocClass", Kind::ClassName},
-                                                     {"ResultClass", Kind::ClassName},
-                                                     {"Role", Kind::Text},
-                                                     {"ResultRole", Kind::Text}},
+                                                    {{sourceObject, Holds::ObjectName, true},
+                                                     {"AssocClass", Holds::ClassName},
+                                                     {"ResultClass", Holds::ClassName},
+                                                     {"Role", Holds::Text},
+                                                     {"ResultRole", Holds::Text}},
                                                     runWithNames<Operation::AssociatorNames>},
                                                    {"References",
-                                                    {{sourceObject, Kind::ObjectName, true},
-                                                     {"ResultClass", Kind::ClassName},
-                                                     {"Role", Kind::Text},
-                                                     {"IncludeQualifiers", Kind::Boolean},
-                                                     {"IncludeClassOrigin", Kind::Boolean},
-                                                     {"PropertyList", Kind::PropertyList}},
+                                                    {{sourceObject, Holds::ObjectName, true},
+                                                     {"ResultClass", Holds::ClassName},
+                                                     {"Role", Holds::Text},
+                                                     {"IncludeQualifiers", Holds::Boolean},
+                                                     {"IncludeClassOrigin", Holds::Boolean},
+                                                     {"PropertyList", Holds::PropertyList}},
                                                     runWithObjects<Operation::References>},
                                                    {"ReferenceNames",
-                                                    {{sourceObject, Kind::ObjectName, true},
-                                                     {"ResultClass", Kind::ClassName},
-                                                     {"Role", Kind::Text}},
+                                                    {{sourceObject, Holds::ObjectName, true},
+                                                     {"ResultClass", Holds::ClassName},
+                                                     {"Role", Holds::Text}},
                                                     runWithNames<Operation::ReferenceNames>}};
     return rows;
 }

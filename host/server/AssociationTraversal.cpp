@@ -66,15 +66,24 @@ AssociationFilter associationFilter(const Call& call, Operation operation) {
     return filter;
 }
 
-RequestPath associationSource(const Call& call, std::string_view parameter) {
-    RequestPath source = *call.parameters.path(parameter);
-    if (!call.manager.knowsClass(call.nameSpace, source.className))
-        throw CimError(cimInvalidParameter,
-                       source.className + ": no such class in " + call.nameSpace);
-    return source;
+std::string sourceClass(const Call& call, std::string_view parameter) {
+    const std::string name = call.parameters.path(parameter)->className;
+    if (!call.manager.knowsClass(call.nameSpace, name))
+        throw CimError(cimInvalidParameter, name + ": no such class in " + call.nameSpace);
+    return call.manager.spelling(call.nameSpace, name);
 }
 
 namespace {
+
+ObjectPathValue sourcePath(const Call& call, std::string_view parameter) {
+    RequestPath given = *call.parameters.path(parameter);
+    given.className = sourceClass(call, parameter);
+    given.nameSpace = call.nameSpace;
+    ObjectPathValue path = typedPath(given, call.manager.catalogue(call.nameSpace), call.nameSpace);
+    if (path.keys.empty())
+        throw CimError(cimInvalidParameter, path.className + ": the path names no instance");
+    return path;
+}
 
 /// An association operation from an instance.
 class Traversal {
@@ -82,13 +91,14 @@ class Traversal {
     Traversal(const Call& call, std::string_view sourceParameter, Operation operation)
         : call_(call),
           operation_(operation),
-          given_(associationSource(call, sourceParameter)),
+          source_(sourcePath(call, sourceParameter)),
           filter_(associationFilter(call, operation)) {}
 
     OperationResult answer();
 
   private:
-    bool sourceExists();
+    bool sourceExists() const;
+    bool isServed() const;
     OperationResult asked(const Tie& tie) const;
     OperationResult answerOf(const Tie& tie) const;
     OperationRequest requestTo(const Tie& tie) const;
@@ -100,12 +110,9 @@ class Traversal {
 
     const Call& call_;
     const Operation operation_;
-    const RequestPath given_;
+    const ObjectPathValue source_;
     const AssociationFilter filter_;
-    ObjectPathValue source_{};
-    /// By pathIdentity: the source in the client's words and in its provider's, and what has been
-    /// found already.
-    std::set<std::string> sourceNames_{};
+    /// What has been found, by pathIdentity.
     std::set<std::string> seen_{};
 };
 
@@ -127,22 +134,30 @@ OperationResult Traversal::answer() {
     return all;
 }
 
-/// Providers look at some of the keys only, and would answer for an object that is not there.
-bool Traversal::sourceExists() {
-    source_ = typedPath(given_, call_.manager.catalogue(call_.nameSpace), call_.nameSpace);
-    if (source_.keys.empty())
-        throw CimError(cimInvalidParameter, source_.className + ": the path names no instance");
-    sourceNames_.insert(pathIdentity(source_, call_.nameSpace));
+/// Providers look at some of the keys only, and would answer for an object that is not there. Of a
+/// class whose instances nobody serves, nobody can tell.
+bool Traversal::sourceExists() const {
+    OperationRequest request;
+    request.operation = Operation::GetInstance;
+    request.path = source_;
+    request.context.principal = call_.user;
     try {
-        const InstanceValue found = gottenInstance(call_.manager, source_, std::nullopt);
-        sourceNames_.insert(pathIdentity(found.path, call_.nameSpace));
+        gottenInstance(call_.manager, request);
         return true;
     } catch (const CimError& error) {
-        if (error.code() == cimNotFound) return false;
-        if (error.code() != cimNotSupported) throw;
-        // Nobody can tell. Of a class that is only known as an ancestor there are no instances.
-        return call_.manager.catalogue(call_.nameSpace).find(source_.className) != nullptr;
+        if (error.code() == cimNotFound) return !isServed();
+        if (error.code() == cimNotSupported) return true;
+        throw;
     }
+}
+
+/// Whether the class of the source has a provider of instances, or one below it has.
+bool Traversal::isServed() const {
+    const auto& all = call_.manager.registrations().all();
+    return std::any_of(all.begin(), all.end(), [&](const Registration& each) {
+        return each.serves(Interface::Instance, call_.nameSpace) &&
+               call_.manager.isA(call_.nameSpace, each.className, source_.className);
+    });
 }
 
 /// An association that may have nothing to do with the source may refuse it.
@@ -215,7 +230,7 @@ bool Traversal::refersToSource(const Tie& tie, const std::string& role, const Va
     const bool near = tie.ways.empty()
                           ? !filter_.role || base::equalsIgnoreCase(*filter_.role, role)
                           : std::any_of(tie.ways.begin(), tie.ways.end(), isNear);
-    return near && sourceNames_.count(pathIdentity(value.reference(), call_.nameSpace)) != 0;
+    return near && sameInstance(value.reference(), source_);
 }
 
 /// Whether a result of that class is one that was asked for.

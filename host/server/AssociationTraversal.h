@@ -1,6 +1,7 @@
 #ifndef HOST_SERVER_ASSOCIATION_TRAVERSAL_H
 #define HOST_SERVER_ASSOCIATION_TRAVERSAL_H
 
+#include <string>
 #include <string_view>
 
 #include "host/server/Associations.h"
@@ -19,9 +20,9 @@ constexpr bool isReferenceOperation(Operation operation) noexcept {
 /// an association class of the standard that is not served.
 AssociationFilter associationFilter(const Call& call, Operation operation);
 
-/// The source as the client gave it. Throws CimError with cimInvalidParameter for a class that
-/// nobody knows.
-RequestPath associationSource(const Call& call, std::string_view parameter);
+/// The class of the source, as the schema spells it. Throws CimError with cimInvalidParameter for
+/// one that nobody knows.
+std::string sourceClass(const Call& call, std::string_view parameter);
 
 /// The instances or paths that an association operation yields, each once, all of their properties
 /// with them; none where the source does not exist. A failure of one provider is that of the

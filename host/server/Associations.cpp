@@ -22,12 +22,6 @@ void addOnce(std::vector<std::string>& names, const std::string& name) {
 std::vector<std::string> servedAssociations(const ObjectManager& manager,
                                             const std::string& nameSpace) {
     std::vector<std::string> names;
-    if (base::equalsIgnoreCase(nameSpace, Interop::nameSpace)) {
-        const Schema& schema = manager.schema(nameSpace);
-        for (const std::string& name : schema.classNames())
-            if (schema.isAssociation(name)) names.push_back(name);
-        return names;
-    }
     for (const Registration& each : manager.registrations().all())
         if (each.serves(Interface::Association, nameSpace))
             addOnce(names, manager.spelling(nameSpace, each.className));

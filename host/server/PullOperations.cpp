@@ -140,70 +140,70 @@ void refuseCount(const Call&, std::string&) {
 /// An operation that opens an enumeration: its own parameters and those of all.
 OperationRow opening(const char* name, std::vector<ParameterRow> parameters,
                      void (*run)(const Call&, std::string&)) {
-    using Kind = ParameterKind;
-    const ParameterRow common[] = {{"FilterQueryLanguage", Kind::Text},
-                                   {"FilterQuery", Kind::Text},
-                                   {"OperationTimeout", Kind::Number},
-                                   {"ContinueOnError", Kind::Boolean},
-                                   {"MaxObjectCount", Kind::Number}};
+    using Holds = ParameterKind;
+    const ParameterRow common[] = {{"FilterQueryLanguage", Holds::Text},
+                                   {"FilterQuery", Holds::Text},
+                                   {"OperationTimeout", Holds::Number},
+                                   {"ContinueOnError", Holds::Boolean},
+                                   {"MaxObjectCount", Holds::Number}};
     parameters.insert(parameters.end(), std::begin(common), std::end(common));
     return {name, std::move(parameters), run};
 }
 
 OperationRow pulling(const char* name, void (*run)(const Call&, std::string&)) {
-    using Kind = ParameterKind;
+    using Holds = ParameterKind;
     return {name,
-            {{"EnumerationContext", Kind::Text, true}, {"MaxObjectCount", Kind::Number, true}},
+            {{"EnumerationContext", Holds::Text, true}, {"MaxObjectCount", Holds::Number, true}},
             run};
 }
 
 }  // namespace
 
 const std::vector<OperationRow>& pullOperations() {
-    using Kind = ParameterKind;
+    using Holds = ParameterKind;
     static const std::vector<OperationRow> rows = {
         opening("OpenEnumerateInstances",
-                {{"ClassName", Kind::ClassName, true},
-                 {"DeepInheritance", Kind::Boolean},
-                 {"IncludeClassOrigin", Kind::Boolean},
-                 {"PropertyList", Kind::PropertyList}},
+                {{"ClassName", Holds::ClassName, true},
+                 {"DeepInheritance", Holds::Boolean},
+                 {"IncludeClassOrigin", Holds::Boolean},
+                 {"PropertyList", Holds::PropertyList}},
                 openInstances<enumeratedInstances>),
-        opening("OpenEnumerateInstancePaths", {{"ClassName", Kind::ClassName, true}},
+        opening("OpenEnumerateInstancePaths", {{"ClassName", Holds::ClassName, true}},
                 openPaths<enumeratedInstanceNames>),
         opening("OpenAssociatorInstances",
-                {{sourceInstance, Kind::InstanceName, true},
-                 {"AssocClass", Kind::ClassName},
-                 {"ResultClass", Kind::ClassName},
-                 {"Role", Kind::Text},
-                 {"ResultRole", Kind::Text},
-                 {"IncludeClassOrigin", Kind::Boolean},
-                 {"PropertyList", Kind::PropertyList}},
+                {{sourceInstance, Holds::InstanceName, true},
+                 {"AssocClass", Holds::ClassName},
+                 {"ResultClass", Holds::ClassName},
+                 {"Role", Holds::Text},
+                 {"ResultRole", Holds::Text},
+                 {"IncludeClassOrigin", Holds::Boolean},
+                 {"PropertyList", Holds::PropertyList}},
                 openInstances<openedAssociators>),
         opening("OpenAssociatorInstancePaths",
-                {{sourceInstance, Kind::InstanceName, true},
-                 {"AssocClass", Kind::ClassName},
-                 {"ResultClass", Kind::ClassName},
-                 {"Role", Kind::Text},
-                 {"ResultRole", Kind::Text}},
+                {{sourceInstance, Holds::InstanceName, true},
+                 {"AssocClass", Holds::ClassName},
+                 {"ResultClass", Holds::ClassName},
+                 {"Role", Holds::Text},
+                 {"ResultRole", Holds::Text}},
                 openPaths<openedAssociatorNames>),
         opening("OpenReferenceInstances",
-                {{sourceInstance, Kind::InstanceName, true},
-                 {"ResultClass", Kind::ClassName},
-                 {"Role", Kind::Text},
-                 {"IncludeClassOrigin", Kind::Boolean},
-                 {"PropertyList", Kind::PropertyList}},
+                {{sourceInstance, Holds::InstanceName, true},
+                 {"ResultClass", Holds::ClassName},
+                 {"Role", Holds::Text},
+                 {"IncludeClassOrigin", Holds::Boolean},
+                 {"PropertyList", Holds::PropertyList}},
                 openInstances<openedReferences>),
         opening("OpenReferenceInstancePaths",
-                {{sourceInstance, Kind::InstanceName, true},
-                 {"ResultClass", Kind::ClassName},
-                 {"Role", Kind::Text}},
+                {{sourceInstance, Holds::InstanceName, true},
+                 {"ResultClass", Holds::ClassName},
+                 {"Role", Holds::Text}},
                 openPaths<openedReferenceNames>),
-        opening("OpenQueryInstances", {{"ReturnQueryResultClass", Kind::Boolean}}, refuseQuery),
+        opening("OpenQueryInstances", {{"ReturnQueryResultClass", Holds::Boolean}}, refuseQuery),
         pulling("PullInstancesWithPath", pullNext<PulledKind::InstancesWithPath>),
         pulling("PullInstancePaths", pullNext<PulledKind::InstancePaths>),
         pulling("PullInstances", pullNext<PulledKind::Instances>),
-        {"CloseEnumeration", {{"EnumerationContext", Kind::Text, true}}, closeEnumeration},
-        {"EnumerationCount", {{"EnumerationContext", Kind::Text, true}}, refuseCount}};
+        {"CloseEnumeration", {{"EnumerationContext", Holds::Text, true}}, closeEnumeration},
+        {"EnumerationCount", {{"EnumerationContext", Holds::Text, true}}, refuseCount}};
     return rows;
 }
 
