@@ -97,7 +97,7 @@ class Traversal {
     OperationResult answer();
 
   private:
-    bool sourceExists() const;
+    bool sourceExists();
     bool isServed() const;
     OperationResult asked(const Tie& tie) const;
     OperationResult answerOf(const Tie& tie) const;
@@ -112,7 +112,9 @@ class Traversal {
     const Operation operation_;
     const ObjectPathValue source_;
     const AssociationFilter filter_;
-    /// What has been found, by pathIdentity.
+    /// By pathIdentity: the source in the client's words and in those of its provider, which may
+    /// compare some keys without case; and what has been found.
+    std::set<std::string> sourceNames_{};
     std::set<std::string> seen_{};
 };
 
@@ -136,13 +138,15 @@ OperationResult Traversal::answer() {
 
 /// Providers look at some of the keys only, and would answer for an object that is not there. Of a
 /// class whose instances nobody serves, nobody can tell.
-bool Traversal::sourceExists() const {
+bool Traversal::sourceExists() {
     OperationRequest request;
     request.operation = Operation::GetInstance;
     request.path = source_;
     request.context.principal = call_.user;
+    sourceNames_.insert(pathIdentity(source_, call_.nameSpace));
     try {
-        gottenInstance(call_.manager, request);
+        const InstanceValue found = gottenInstance(call_.manager, request);
+        sourceNames_.insert(pathIdentity(found.path, call_.nameSpace));
         return true;
     } catch (const CimError& error) {
         if (error.code() == cimNotFound) return !isServed();
@@ -230,7 +234,7 @@ bool Traversal::refersToSource(const Tie& tie, const std::string& role, const Va
     const bool near = tie.ways.empty()
                           ? !filter_.role || base::equalsIgnoreCase(*filter_.role, role)
                           : std::any_of(tie.ways.begin(), tie.ways.end(), isNear);
-    return near && sameInstance(value.reference(), source_);
+    return near && sourceNames_.count(pathIdentity(value.reference(), call_.nameSpace)) != 0;
 }
 
 /// Whether a result of that class is one that was asked for.
