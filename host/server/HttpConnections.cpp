@@ -2,18 +2,16 @@
 
 #include <sys/socket.h>
 
-#include <algorithm>
 #include <exception>
+#include <utility>
+#include <vector>
 
 namespace cmpihost::server {
 
 namespace {
 
+using std::chrono::nanoseconds;
 using Phase = HttpConnection::Phase;
-
-bool awaitsRequest(Phase phase) {
-    return phase == Phase::Opening || phase == Phase::Idle;
-}
 
 const char* lateness(Phase phase) {
     switch (phase) {
@@ -35,35 +33,38 @@ void cutConnection(HttpConnection& connection) {
 
 }  // namespace
 
-HttpConnection* HttpConnections::admit(int socket, const std::string& peer) {
-    const std::lock_guard lock(mutex_);
-    if (ending_) return nullptr;
-    // Those that were cut are on their way out.
-    std::size_t all = 0;
-    std::size_t ofPeer = 0;
-    for (const auto& [number, each] : connections_) {
-        if (each->cut) continue;
-        ++all;
-        if (each->peer == peer) ++ofPeer;
+bool HttpConnections::admit(int socket, const std::string& peer) {
+    HttpConnection* replaced = nullptr;
+    {
+        const std::lock_guard lock(mutex_);
+        std::size_t all = 0;
+        std::size_t ofPeer = 0;
+        for (const auto& [number, each] : connections_) {
+            if (each->cut) continue;
+            ++all;
+            if (each->peer == peer) ++ofPeer;
+        }
+        const bool peerFull = peer != "unix" && ofPeer >= limits_.connectionsOfAnAddress;
+        if (peerFull || all >= limits_.connections) {
+            replaced = longestWaiting(peer, peerFull);
+            if (replaced == nullptr) return false;
+            cutConnection(*replaced);
+        }
+        connections_[socket] = std::make_unique<HttpConnection>(socket, peer);
     }
-    const bool peerFull = peer != "unix" && ofPeer >= limits_.connectionsOfAnAddress;
-    if ((peerFull || all >= limits_.connections) && !makeRoom(peer, peerFull)) return nullptr;
-    auto& place = connections_[socket];
-    place = std::make_unique<HttpConnection>(socket, peer);
-    return place.get();
+    return true;
 }
 
-/// Cuts the connection that has waited longest for a request; one that has a request is never cut.
-bool HttpConnections::makeRoom(const std::string& peer, bool ofThatPeer) {
+/// The connection that has waited longest for a request; null where all have one.
+HttpConnection* HttpConnections::longestWaiting(const std::string& peer, bool ofThatPeer) const {
     HttpConnection* longest = nullptr;
     for (const auto& [number, each] : connections_) {
-        if (each->cut || !awaitsRequest(each->phase)) continue;
+        const Phase phase = each->phase;
+        if (each->cut || (phase != Phase::Opening && phase != Phase::Idle)) continue;
         if (ofThatPeer && each->peer != peer) continue;
         if (longest == nullptr || each->since.load() < longest->since.load()) longest = each.get();
     }
-    if (longest == nullptr) return false;
-    cutConnection(*longest);
-    return true;
+    return longest;
 }
 
 HttpConnection* HttpConnections::find(int socket) {
@@ -75,37 +76,43 @@ HttpConnection* HttpConnections::find(int socket) {
 void HttpConnections::remove(int socket) {
     const std::lock_guard lock(mutex_);
     connections_.erase(socket);
-    removed_.notify_all();
-}
-
-std::chrono::nanoseconds HttpConnections::allowance(Phase phase) const {
-    if (phase == Phase::Answer) return std::chrono::nanoseconds::max();
-    if (ending_ && phase != Phase::Response) return std::chrono::nanoseconds(-1);
-    return phase == Phase::Idle ? limits_.idle : limits_.transfer;
-}
-
-void HttpConnections::cutLate() {
-    const std::lock_guard lock(mutex_);
-    for (const auto& [number, each] : connections_) {
-        if (each->cut) continue;
-        // `since` first: it is written first, so a phase is never older than its time.
-        const auto since = each->since.load();
-        const Phase phase = each->phase;
-        if (HttpConnection::Clock::now().time_since_epoch() - since <= allowance(phase)) continue;
-        cutConnection(*each);
-        if (!ending_ && phase != Phase::Idle && events_.cut)
-            events_.cut(each->peer, lateness(phase));
-    }
-}
-
-void HttpConnections::awaitNone() {
-    std::unique_lock lock(mutex_);
-    removed_.wait(lock, [this] { return connections_.empty(); });
 }
 
 bool HttpConnections::none() {
     const std::lock_guard lock(mutex_);
     return connections_.empty();
+}
+
+nanoseconds HttpConnections::allowance(Phase phase) const {
+    if (phase == Phase::Answer) return nanoseconds::max();
+    if (ending_ && phase != Phase::Response) return nanoseconds(-1);
+    return phase == Phase::Idle ? limits_.idle : limits_.transfer;
+}
+
+void HttpConnections::cutLate() {
+    std::vector<std::pair<std::string, const char*>> late;
+    {
+        const std::lock_guard lock(mutex_);
+        for (const auto& [number, each] : connections_) {
+            if (each->cut) continue;
+            // In this order: no phase is taken for older than it is.
+            const Phase phase = each->phase;
+            const auto since = each->since.load();
+            if (HttpConnection::Clock::now().time_since_epoch() - since <= allowance(phase))
+                continue;
+            cutConnection(*each);
+            if (!ending_ && phase != Phase::Idle) late.emplace_back(each->peer, lateness(phase));
+        }
+    }
+    for (const auto& [peer, reason] : late) tellCut(peer, reason);
+}
+
+void HttpConnections::tellCut(const std::string& peer, const char* reason) const noexcept {
+    try {
+        if (events_.cut) events_.cut(peer, reason);
+    } catch (const std::exception&) {
+        // Whoever keeps the log has lost a line of it.
+    }
 }
 
 }  // namespace cmpihost::server

@@ -3,7 +3,6 @@
 
 #include <atomic>
 #include <chrono>
-#include <condition_variable>
 #include <map>
 #include <memory>
 #include <mutex>
@@ -14,7 +13,7 @@
 /// The connections of an HTTP server: how many there may be and how long each may take.
 namespace cmpihost::server {
 
-/// One connection. But for `phase` and `since` it is its own thread's alone.
+/// One connection. But for what is atomic it is its own thread's alone.
 struct HttpConnection {
     using Clock = std::chrono::steady_clock;
 
@@ -33,9 +32,10 @@ struct HttpConnection {
     const std::string peer;
     std::atomic<Phase> phase = Phase::Opening;
     std::atomic<Clock::duration> since = Clock::now().time_since_epoch();
-    /// Guarded by HttpConnections.
-    bool cut = false;
+    /// It is ending, for a reason that has been told.
+    std::atomic<bool> cut = false;
 
+    /// The request that is being read or answered, and its response.
     HttpRequest request{};
     HttpResponse response{};
     /// The header has been looked at.
@@ -51,8 +51,8 @@ class HttpConnections {
     HttpConnections(const HttpLimits& limits, const HttpEvents& events)
         : limits_(limits), events_(events) {}
 
-    /// Takes a new connection in, null where there are too many.
-    HttpConnection* admit(int socket, const std::string& peer);
+    /// Takes a new connection in; false where there are too many.
+    bool admit(int socket, const std::string& peer);
     /// The connection with that socket, null for none.
     HttpConnection* find(int socket);
     /// Forgets a connection, before its socket is closed.
@@ -63,19 +63,19 @@ class HttpConnections {
     /// From now on, those that wait for a request or are reading one are late.
     void end() { ending_ = true; }
     bool ending() const noexcept { return ending_; }
-    /// Waits until there is none.
-    void awaitNone();
     bool none();
+
+    /// Tells why a connection is refused or cut.
+    void tellCut(const std::string& peer, const char* reason) const noexcept;
 
   private:
     std::chrono::nanoseconds allowance(HttpConnection::Phase phase) const;
-    bool makeRoom(const std::string& peer, bool ofThatPeer);
+    HttpConnection* longestWaiting(const std::string& peer, bool ofThatPeer) const;
 
     const HttpLimits& limits_;
     const HttpEvents& events_;
     std::atomic<bool> ending_ = false;
     std::mutex mutex_;
-    std::condition_variable removed_;
     std::map<int, std::unique_ptr<HttpConnection>> connections_;
 };
 

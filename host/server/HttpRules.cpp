@@ -37,6 +37,10 @@ bool isHost(const std::string& text) {
 }
 
 bool isHeaderWellFormed(const HttpRequest& request) {
+    const std::string& target = request.target;
+    if (std::any_of(target.begin(), target.end(), [](char c) { return c <= ' ' || c == 0x7F; })) {
+        return false;
+    }
     if (!std::all_of(request.headers.begin(), request.headers.end(), isWellFormed)) return false;
     const std::size_t hosts = request.count("Host");
     if (hosts > 1 || (hosts == 0 && request.version != "HTTP/1.0")) return false;
@@ -69,25 +73,15 @@ unsigned refusalOfExpectation(const HttpRequest& request) {
     return known ? 0 : 417;
 }
 
-unsigned statusOfRefusal(const HttpRequest& request, std::size_t headerBytes,
+}  // namespace
+
+unsigned refusalOfHeader(const HttpRequest& request, std::size_t headerBytes,
                          const HttpLimits& limits) {
     if (headerBytes > limits.headerBytes) return 431;
     if (request.headers.size() > limits.headerFields) return 431;
     if (!isHeaderWellFormed(request)) return 400;
     if (const unsigned status = refusalOfLength(request, limits.bodyBytes)) return status;
     return refusalOfExpectation(request);
-}
-
-}  // namespace
-
-std::optional<HttpResponse> refusalOfHeader(const HttpRequest& request, std::size_t headerBytes,
-                                            const HttpLimits& limits) {
-    const unsigned status = statusOfRefusal(request, headerBytes, limits);
-    if (status == 0) return std::nullopt;
-    HttpResponse response;
-    response.status = status;
-    response.close = true;
-    return response;
 }
 
 }  // namespace cmpihost::server
