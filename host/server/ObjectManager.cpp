@@ -29,8 +29,12 @@ bool isEnumeration(Operation operation) {
            operation == Operation::EnumerateInstanceNames;
 }
 
-/// Whether an answer of that operation without returnDone may lack some of its results.
-bool needsDone(Operation operation) {
+/// Whether an answer that the provider did not end may lack something. A GetInstance without a
+/// result has found none; an operation that changes something has none.
+bool brokeOff(Operation operation, const OperationResult& result) {
+    if (result.done) return false;
+    if (operation == Operation::InvokeMethod || operation == Operation::GetProperty)
+        return !result.value;
     return isEnumeration(operation) || operation == Operation::ExecQuery ||
            isAssociationOperation(operation);
 }
@@ -181,9 +185,8 @@ bool ObjectManager::isA(const std::string& nameSpace, const std::string& classNa
 OperationResult ObjectManager::ask(const OperationRequest& request) {
     OperationResult result = answerOf(request);
     if (result.rc != CMPI_RC_OK) refuse(request, result);
-    if (!result.done && needsDone(request.operation)) {
+    if (brokeOff(request.operation, result))
         throw CimError(cimFailed, subject(request) + ": the answer of the provider broke off");
-    }
     finish(request, result);
     return result;
 }
@@ -257,7 +260,7 @@ void ObjectManager::finish(const OperationRequest& request, ObjectPathValue& pat
 void ObjectManager::complain(const std::string& line) {
     const std::lock_guard<std::mutex> lock(complaintMutex_);
     if (complaints_.size() < mostComplaints) {
-        complaints_.push_back(line);
+        complaints_.push_back(line.substr(0, longestComplaint));
     } else {
         ++complaintsLeftOut_;
     }

@@ -76,9 +76,11 @@ class ObjectManager {
     /// Keeps a line for takeComplaints().
     void complain(const std::string& line);
     /// What the broker caught the providers at, why libraries did not load, and what complain()
-    /// was given since the last call: one line each, of which the first `mostComplaints` are kept.
+    /// was given since the last call: one line each, of which the first `mostComplaints` are kept,
+    /// and of each so many bytes.
     std::vector<std::string> takeComplaints();
     static constexpr std::size_t mostComplaints = 200;
+    static constexpr std::size_t longestComplaint = 1000;
 
   private:
     struct NameSpace {

@@ -27,12 +27,12 @@ std::vector<std::string> shown(const OperationResult& result) {
 }
 
 TEST(ObjectManager, AsksTheShippedProviders) {
-    const auto manager = fixture::shippedManager();
-    EXPECT_THAT(shown(manager->ask(enumeration("cim_operatingsystem", "ROOT/cimv2"))),
+    ObjectManager& manager = fixture::shippedManager();
+    EXPECT_THAT(shown(manager.ask(enumeration("cim_operatingsystem", "ROOT/cimv2"))),
                 ElementsAre("root/cimv2:KORVA_OperatingSystem.CSCreationClassName=\"KORVA_"
                             "ComputerSystem\",CSName=\"fixture.example\",CreationClassName="
                             "\"KORVA_OperatingSystem\",Name=\"Fixture Linux\""));
-    EXPECT_THAT(manager->takeComplaints(), IsEmpty());
+    EXPECT_THAT(manager.takeComplaints(), IsEmpty());
 }
 
 }  // namespace

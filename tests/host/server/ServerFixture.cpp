@@ -5,8 +5,10 @@
 #include <dlfcn.h>
 
 #include <algorithm>
+#include <memory>
 #include <stdexcept>
 
+#include "host/mof/MofParser.h"
 #include "host/server/Dispatcher.h"
 
 namespace cmpihost::server::fixture {
@@ -17,6 +19,31 @@ void loadFixtureHost() {
     static void* const library =
         dlopen(KORVA_BINARY_DIR "/fixture-host/libvainstrumentation.so.1", RTLD_NOW | RTLD_GLOBAL);
     if (library == nullptr) throw std::runtime_error(dlerror());
+}
+
+/// The only manager there is, null at first.
+std::unique_ptr<ObjectManager>& current() {
+    static std::unique_ptr<ObjectManager> manager;
+    return manager;
+}
+
+/// Where current() came from; empty: it is nobody's but one test's.
+std::string& currentName() {
+    static std::string name;
+    return name;
+}
+
+ObjectManager& make(const std::string& name, Schema schema, Registrations registrations) {
+    loadFixtureHost();
+    current().reset();
+    ObjectManagerSetup setup;
+    setup.schema = std::move(schema);
+    setup.registrations = std::move(registrations);
+    setup.libraryFolders = {KORVA_BINARY_DIR "/lib"};
+    setup.hostName = "server.example";
+    current() = std::make_unique<ObjectManager>(std::move(setup));
+    currentName() = name;
+    return *current();
 }
 
 std::string message(const std::string& call) {
@@ -38,41 +65,30 @@ std::string nameSpacePath(const std::string& nameSpace) {
 
 }  // namespace
 
-std::unique_ptr<ObjectManager> managerOf(Schema schema, Registrations registrations) {
-    loadFixtureHost();
-    ObjectManagerSetup setup;
-    setup.schema = std::move(schema);
-    setup.registrations = std::move(registrations);
-    setup.libraryFolders = {KORVA_BINARY_DIR "/lib"};
-    setup.hostName = "server.example";
-    return std::make_unique<ObjectManager>(std::move(setup));
+ObjectManager& shippedManager() {
+    if (currentName() == "shipped") return *current();
+    return make("shipped", Schema::load(KORVA_SOURCE_DIR "/schema"),
+                Registrations::read({KORVA_SOURCE_DIR "/schema/registration"}));
 }
 
-Schema shippedSchema() {
-    return Schema::load(KORVA_SOURCE_DIR "/schema");
-}
-
-Registrations registered(const std::string& text) {
-    Registrations registrations;
-    registrations.add(text, "test.reg");
-    return registrations;
-}
-
-std::unique_ptr<ObjectManager> shippedManager() {
-    return managerOf(shippedSchema(),
-                     Registrations::read({KORVA_SOURCE_DIR "/schema/registration"}));
-}
-
-std::unique_ptr<ObjectManager> foreignManager(const std::string& registrations) {
+ObjectManager& foreignManager(const std::string& registrations, const std::string& mof) {
+    const bool plain = registrations.empty() && mof.empty();
+    if (plain && currentName() == "foreign") return *current();
+    Schema schema = Schema::load(KORVA_SOURCE_DIR "/tests/host/providers/test.mof");
+    schema.add(mof::parse(mof, "more.mof"));
     auto all = Registrations::read({KORVA_SOURCE_DIR "/tests/host/providers/test.reg"});
     all.add(registrations, "more.reg");
-    return managerOf(Schema::load(KORVA_SOURCE_DIR "/tests/host/providers/test.mof"),
-                     std::move(all));
+    return make(plain ? "foreign" : "", std::move(schema), std::move(all));
+}
+
+ObjectManager& newManager(const std::string& schema, const std::string& registrations) {
+    Registrations read;
+    read.add(registrations, "test.reg");
+    return make("", Schema::load(KORVA_SOURCE_DIR "/" + schema), std::move(read));
 }
 
 std::string respond(const std::string& request) {
-    static const std::unique_ptr<ObjectManager> manager = shippedManager();
-    return respond(*manager, request);
+    return respond(shippedManager(), request);
 }
 
 std::string respond(ObjectManager& manager, const std::string& request,

@@ -1,7 +1,6 @@
 #ifndef TESTS_HOST_SERVER_SERVER_FIXTURE_H
 #define TESTS_HOST_SERVER_SERVER_FIXTURE_H
 
-#include <memory>
 #include <optional>
 #include <string>
 #include <utility>
@@ -12,20 +11,21 @@
 /// Object managers in the test program, and requests for them.
 namespace cmpihost::server::fixture {
 
-/// A new object manager over the shipped libraries, with the schema and the registrations of the
-/// source tree, on the fixture host: "fixture.example". Its own name is "server.example".
-std::unique_ptr<ObjectManager> shippedManager();
-/// One over the providers of tests/host/providers, in root/test and root/other, and those of more
-/// sections of registrations.
-std::unique_ptr<ObjectManager> foreignManager(const std::string& registrations = {});
-/// One that looks for libraries in the folder of the build.
-std::unique_ptr<ObjectManager> managerOf(Schema schema, Registrations registrations);
-Schema shippedSchema();
-/// Registrations from a text.
-Registrations registered(const std::string& text);
+/// Object managers over real providers. Providers have one broker in a process, so there is one
+/// object manager at a time: it lives until one of these functions is asked for another. All of
+/// them are named "server.example" and see the fixture host, "fixture.example".
+///
+/// The one over the shipped libraries, with the schema and the registrations of the source tree.
+ObjectManager& shippedManager();
+/// The one over the providers of tests/host/providers, in root/test and root/other; a new one with
+/// more sections of registrations, or more MOF.
+ObjectManager& foreignManager(const std::string& registrations = {}, const std::string& mof = {});
+/// A new one, with a schema of a file or folder of the source tree, with registrations from a text,
+/// and with libraries from the folder of the build.
+ObjectManager& newManager(const std::string& schema, const std::string& registrations);
 
 /// The response document that a manager answers to the text of a request message; "HTTP 400: why"
-/// for one that is no message. The first form asks one shippedManager() for the whole program.
+/// for one that is no message. The first form asks shippedManager().
 std::string respond(const std::string& request);
 std::string respond(ObjectManager& manager, const std::string& request,
                     const std::optional<std::string>& user = {});
