@@ -22,11 +22,13 @@ constexpr std::size_t mostElements = 10000;
 constexpr std::size_t mostAttributes = 16;
 constexpr std::size_t longestName = 256;
 
-bool isUtf8(std::string_view text) {
+/// A zero byte is a character of UTF-8, but not of XML; in UTF-16, which the parser would recognise
+/// in spite of everything, every other byte is one.
+bool isUtf8WithoutZeros(std::string_view text) {
     while (!text.empty()) {
-        if (static_cast<unsigned char>(text.front()) < 0x80) {
+        if (text.front() > 0) {
             text.remove_prefix(1);
-        } else if (!base::takeUtf8(text).valid) {
+        } else if (text.front() == 0 || !base::takeUtf8(text).valid) {
             return false;
         }
     }
@@ -183,7 +185,7 @@ XmlElement parseXml(std::string_view document) {
         document.remove_prefix(byteOrderMark.size());
     }
     if (document.size() > INT_MAX) throw XmlError("the document is too long");
-    if (!isUtf8(document)) throw XmlError("the document is not UTF-8");
+    if (!isUtf8WithoutZeros(document)) throw XmlError("the document is not UTF-8");
 
     // Named here, else the parser would believe what the document says.
     const std::unique_ptr<XML_ParserStruct, decltype(&XML_ParserFree)> parser(
