@@ -52,6 +52,10 @@ bench_packages="libbenchmark-dev valgrind"
 # shellcheck disable=SC2034
 lint_packages="clang-format clang-tidy shellcheck git"
 
+# What the tests of the endpoint run.
+# shellcheck disable=SC2034
+client_packages="sblim-wbemcli python3 openssl"
+
 # What every build needs; g++-multilib compiles 32-bit code on a 64-bit machine.
 build_packages="cmake ninja-build g++ libc6-dev googletest libcli11-dev nlohmann-json3-dev \
     libvalijson-dev libmicrohttpd-dev libexpat1-dev"
