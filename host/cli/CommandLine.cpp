@@ -36,6 +36,11 @@ bool isShown(Operation operation) {
            isAssociationOperation(operation);
 }
 
+const char* groupOf(Command command) {
+    if (command == Command::Operation) return "Operations";
+    return command == Command::Serve ? "Service" : "Overviews";
+}
+
 std::string commandFooter(const CommandRow& row) {
     const std::string paths = row.path == nullptr ? "" : std::string(pathHelp) + "\n";
     const bool refused = row.command == Command::Operation && !isShown(row.operation);
@@ -102,6 +107,12 @@ CommandLineParser::CommandLineParser() : app_(programHelp, "cmpihost") {
 }
 
 ParsedCommandLine CommandLineParser::parse(int argumentCount, const char* const* arguments) {
+    // What stands behind it is for another program, --help included.
+    if (argumentCount > 1 && arguments[1] == std::string("serve")) {
+        result_.command = Command::Serve;
+        result_.serverArguments.assign(arguments + 2, arguments + argumentCount);
+        return {result_, {}, exitDone};
+    }
     try {
         app_.parse(splitArguments(argumentCount, arguments));
     } catch (const CLI::CallForVersion& version) {
@@ -114,6 +125,8 @@ ParsedCommandLine CommandLineParser::parse(int argumentCount, const char* const*
         return refused(error.what());
     }
     // Refused, not ignored: a script that asks for one thing would take another for it.
+    if (result_.command == Command::Serve)
+        return refused("serve goes first: its options stand behind it");
     const bool operation = result_.command == Command::Operation;
     const bool hasMof = operation && result_.operation != Operation::InvokeMethod;
     if (!hasMof && result_.format == Format::Mof)
@@ -219,9 +232,12 @@ void CommandLineParser::addHostOption(const OptionRow& row) {
 
 void CommandLineParser::addCommand(const CommandRow& row) {
     CLI::App& added = *app_.add_subcommand(row.name, row.help);
-    // Options of the program may stand behind the command, too.
-    added.fallthrough();
-    added.group(row.command == Command::Operation ? "Operations" : "Overviews");
+    // Options of the program may stand behind the command, too; those of the server are another
+    // program's, and parse() hands them on.
+    const bool serves = row.command == Command::Serve;
+    added.fallthrough(!serves)->allow_extras(serves);
+    if (serves) added.set_help_flag();
+    added.group(groupOf(row.command));
     added.footer(commandFooter(row));
     added.callback([this, &row] {
         result_.command = row.command;

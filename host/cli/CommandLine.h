@@ -12,8 +12,8 @@
 namespace cmpihost {
 
 /// The exit statuses of the program. exitCimStatus also says that results cannot be written,
-/// exitNotLoaded that a registration cannot be read; exitCaught wins over exitDone, exitCimStatus
-/// and exitNothingFound.
+/// exitNotLoaded that a registration cannot be read or the server not be started; exitCaught wins
+/// over exitDone, exitCimStatus and exitNothingFound.
 enum ExitStatus {
     exitDone = 0,
     exitCimStatus = 1,
@@ -23,8 +23,9 @@ enum ExitStatus {
     exitCaught = 5
 };
 
-/// What the user wants to see: the answer to an operation, or something about host and schema.
-enum class Command { Operation, Tree, Classes, Describe, Namespaces };
+/// What the user wants: the answer to an operation, to see something about host and schema, or a
+/// server for others.
+enum class Command { Operation, Tree, Classes, Describe, Namespaces, Serve };
 
 /// How much of what providers record is shown: failures only, the coarser level (3000, calls with
 /// their parameters), or everything.
@@ -79,6 +80,9 @@ struct CommandLine {
     std::string query;
     std::string queryLanguage = "WQL";
     std::string nameSpace = defaultNamespace;
+
+    /// For Command::Serve, which looks into nothing itself.
+    std::vector<std::string> serverArguments;
 };
 
 /// A command line to carry out, or else a text to show: on the standard output when the status is

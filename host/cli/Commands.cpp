@@ -64,6 +64,8 @@ const std::vector<CommandRow>& commandRows() {
                  Takes::Subject, "describe KORVA_OperatingSystem.FreePhysicalMemory"),
         overview("namespaces", "List the namespaces that have providers", Command::Namespaces,
                  Takes::Nothing, "namespaces"),
+        overview("serve", "Serve WBEM clients over HTTP: becomes cmpihost-serve", Command::Serve,
+                 Takes::Nothing, "serve --listen localhost:5988"),
     };
     return rows;
 }
@@ -130,7 +132,7 @@ const char* const statusHelp =
     "  1  the provider answered a CIM status other than OK, named on the standard\n"
     "     error, or the results cannot be written\n"
     "  2  wrong usage, or a path that lacks keys and that several instances fit\n"
-    "  3  a library or registration does not load\n"
+    "  3  a library or registration does not load, or there is no cmpihost-serve\n"
     "  4  there is no such instance: gi was returned none or answered\n"
     "     CIM_ERR_NOT_FOUND, or none fits a path that lacks keys\n"
     "  5  the host caught the provider at something, in place of 0, 1 and 4\n"

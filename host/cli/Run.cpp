@@ -27,6 +27,7 @@
 #include "host/cli/ProviderRecords.h"
 #include "host/cli/RequestBuilder.h"
 #include "host/cli/Results.h"
+#include "host/cli/Serve.h"
 #include "host/cli/Sources.h"
 #include "host/cli/Stopwatch.h"
 #include "host/cli/Tree.h"
@@ -94,6 +95,8 @@ class Run {
                 return told(describe(schema, commandLine_.subject));
             case Command::Namespaces:
                 return told(namespaceSummaries(readRegistrations(commandLine_, programFolder_)));
+            case Command::Serve:
+                break;
         }
         return failed("no such command", exitUsage);
     }
@@ -290,6 +293,8 @@ class Run {
 
 ExitStatus run(const CommandLine& commandLine, const fs::path& programFolder, std::ostream& out,
                std::ostream& err) {
+    if (commandLine.command == Command::Serve)
+        return becomeServer(commandLine.serverArguments, programFolder, err);
     return Run(commandLine, programFolder, out, err).exitStatus();
 }
 

@@ -12,12 +12,12 @@ namespace {
 
 const char* const help =
     "WBEM endpoint: answers CIM operations over HTTP with the CMPI providers that are\n"
-    "registered, until SIGTERM ends it. SIGHUP reads certificate, key and users again,\n"
-    "SIGUSR1 writes the counters to the log.";
+    "registered, until SIGTERM ends it. SIGHUP reads certificate, key and users\n"
+    "again, SIGUSR1 writes the counters to the log.";
 
 const char* const footer =
     "\n"
-    "Whom clients reach it from other hosts by takes TLS and a users file. On loopback\n"
+    "An address that other hosts reach takes TLS and a users file. On loopback\n"
     "addresses and unix: sockets nobody is asked for a password unless --users is\n"
     "given.\n"
     "\n"
@@ -28,7 +28,7 @@ const char* const footer =
     "  3  the registrations or the classes cannot be read\n"
     "\n"
     "Example:\n"
-    "  cmpihost-serve --listen 127.0.0.1:5988";
+    "  cmpihost-serve --listen localhost:5988 --log requests";
 
 struct TextRow {
     const char* name;
@@ -44,28 +44,36 @@ struct ListRow {
     const char* help;
 };
 
+// Lines end where they do so that the help fits a terminal of the usual width.
 const ListRow listRows[] = {
     {"--listen", "ADDRESS:PORT", &ServiceOptions::listen,
-     "Listen there: a numeric address, localhost, or unix:PATH; can be given again; without it "
-     "localhost:5988, with TLS localhost:5989. plain: before a loopback address: without TLS "
-     "there"},
+     "Listen there: a numeric address, localhost, or\n"
+     "unix:PATH; can be given again. plain: before a\n"
+     "loopback address: without TLS there. Without it\n"
+     "localhost:5988, with TLS localhost:5989"},
     {"--registration", "PATH", &ServiceOptions::registrations,
-     "File, or folder of *.reg, that says which provider serves which class; can be given again; "
-     "without it the folder beside this program"},
+     "File, or folder of *.reg, that says which provider\n"
+     "serves which class; can be given again; without it\n"
+     "the folder beside this program"},
     {"--schema", "PATH", &ServiceOptions::schemas,
-     "MOF file or folder of MOF files; can be given again; without it the folder beside this "
-     "program"},
+     "MOF file or folder of MOF files; can be given\n"
+     "again; without it the folder beside this program"},
     {"--host-name", "NAME", &ServiceOptions::hostNames,
-     "A name by which clients may address this host, beside localhost and its own name; can be "
-     "given again"},
+     "A name by which clients may address this host,\n"
+     "beside localhost and its own name; can be given\n"
+     "again"},
 };
 
 const TextRow textRows[] = {
-    {"--tls-cert", "FILE", &ServiceOptions::certificate, "Certificates for TLS, as PEM"},
+    {"--tls-cert", "FILE", &ServiceOptions::certificate,
+     "PEM file of the certificate for TLS and those that\n"
+     "vouch for it"},
     {"--tls-key", "FILE", &ServiceOptions::key,
-     "Key of the first of them, as PEM; not readable by everybody"},
+     "PEM file of its key, which not everybody may read"},
     {"--users", "FILE", &ServiceOptions::users,
-     "Who may ask: lines of name:hash, as crypt(5) has them"},
+     "Who may ask: lines of name:hash, hashes as\n"
+     "'openssl passwd -6' prints them; a file that not\n"
+     "everybody may read"},
 };
 
 const std::map<std::string, LogLevel> logLevels = {
@@ -107,12 +115,15 @@ ServeParser::ServeParser() : app_(help, "cmpihost-serve") {
     app_.get_option("--tls-cert")->needs("--tls-key")->option_text("FILE");
     app_.get_option("--tls-key")->needs("--tls-cert")->option_text("FILE");
     addNumber("--connections", options_.limits.connections,
-              "How many connections an address takes at once (64)");
+              "So many connections at each of the addresses at\n"
+              "once; 64 without it");
     addNumber("--connections-per-address", options_.limits.connectionsOfAnAddress,
-              "How many of them one client may have (16)");
+              "So many of them for one client address; 16 without\n"
+              "it");
     app_.add_option_function<std::string>(
             "--log", [this](const std::string& word) { options_.logLevel = logLevels.at(word); },
-            "What is logged of requests: none, failures (the default) or requests")
+            "Which requests are logged: none, failures (the\n"
+            "default) or requests, which is all of them")
         ->check(CLI::IsMember(logLevels))
         ->option_text("LEVEL");
 }
