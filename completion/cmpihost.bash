@@ -31,7 +31,8 @@ _cmpihost_look_back() {
         word=${COMP_WORDS[index]}
         case $word in
             --provider | --name | --registration | --schema | --format | --value | --properties | \
-                --assoc-class | --result-class | --role | --result-role | --lang | --namespace)
+                --assoc-class | --result-class | --role | --result-role | --lang | --namespace | \
+                --listen | --host-name | --tls-cert | --tls-key | --users | --connections*)
                 ((++index))
                 [[ ${COMP_WORDS[index]} == = ]] && ((++index))
                 ;;
@@ -57,6 +58,11 @@ _cmpihost_look_back() {
 
 _cmpihost_options() {
     local filters="--result-class --role"
+    if [[ $command == serve ]]; then
+        echo "--listen --registration --schema --host-name --tls-cert --tls-key --users --connections"
+        echo "--connections-per-address --log --help --version"
+        return
+    fi
     echo "--provider --name --registration --schema --bare --format --value --log --time --help"
     case $command in
         "") echo "--version" ;;
@@ -74,11 +80,12 @@ _cmpihost_options() {
 _cmpihost_values() {
     case $1 in
         --format) echo "table mof json" ;;
-        --log) echo "failures 3000 4000" {failures,3000,4000},{log,trace,cmpi} ;;
+        --log) [[ $command == serve ]] && echo "none failures requests" ||
+            echo "failures 3000 4000" {failures,3000,4000},{log,trace,cmpi} ;;
         --value | --properties) _cmpihost_members "$class" Properties ;;
         --assoc-class | --result-class) _cmpihost_classes ;;
         --namespace) _cmpihost_ask namespaces | awk 'NF { print $1 }' ;;
-        --name | --role | --result-role | --lang) ;;
+        --name | --role | --result-role | --lang | --listen | --host-name | --connections*) ;;
         *) return 1 ;;
     esac
 }
@@ -86,7 +93,7 @@ _cmpihost_values() {
 # What can stand as the next argument of the command.
 _cmpihost_arguments() {
     case $command:$count in
-        :0) echo "ei ein gi ci mi di ai ain ri rin im xq tree classes describe namespaces" ;;
+        :0) echo "ei ein gi ci mi di ai ain ri rin im xq tree classes describe namespaces serve" ;;
         describe:0)
             if [[ $current == *.* ]]; then
                 { _cmpihost_members "${current%%.*}" Properties
@@ -111,12 +118,12 @@ _cmpihost() {
         current="" before=${COMP_WORDS[COMP_CWORD - 1]}
     elif [[ $before == = ]]; then
         before=${COMP_WORDS[COMP_CWORD - 2]}
-    elif [[ $before == --log ]]; then
+    elif [[ $before == --log && $command != serve ]]; then
         # Its value stands behind a sign of equality only.
         before=""
     fi
     case $before in
-        --provider | --registration | --schema)
+        --provider | --registration | --schema | --tls-cert | --tls-key | --users)
             compopt -o filenames 2>/dev/null
             mapfile -t COMPREPLY < <(compgen -f -- "$current")
             return

@@ -65,7 +65,7 @@ const std::vector<CommandRow>& commandRows() {
         overview("namespaces", "List the namespaces that have providers", Command::Namespaces,
                  Takes::Nothing, "namespaces"),
         overview("serve", "Serve WBEM clients over HTTP: becomes cmpihost-serve", Command::Serve,
-                 Takes::Nothing, "serve --listen localhost:5988"),
+                 Takes::Nothing, "serve"),
     };
     return rows;
 }

@@ -37,14 +37,15 @@ PagesReferToPagesThatThereAre() {
 
 host=$KORVA_BINARY_DIR/bin/cmpihost
 
-# The commands in the help of the host.
+# The commands in the help of the host, and those with a help of their own: serve is another program.
 commands() { "$host" --help | sed -n '/^Operations:/,/^Paths:/s/^  \([a-z][a-z]*\) .*/\1/p'; }
+own_commands() { commands | grep -vx serve; }
 
 PageOfTheHostHasItsOptions() {
     need_tool mandoc mandoc
     {
         "$host" --help
-        for command in $(commands); do "$host" "$command" --help; done
+        for command in $(own_commands); do "$host" "$command" --help; done
     } | options_in >"$work/told"
     expect_equal options "$(cat "$work/told")" "$(text cmpihost.1 | options_in)"
 }
@@ -52,7 +53,7 @@ PageOfTheHostHasItsOptions() {
 PageOfTheHostHasItsCommands() {
     expect_equal commands "$(commands | sort)" \
         "$(sed -n '/^\.Ss Commands/,/^\.El/s/^\.It Cm \([a-z]*\).*/\1/p' "$pages/cmpihost.1" | sort)"
-    [ "$(commands | wc -l)" -eq 16 ] || fail "not sixteen commands: $(commands)"
+    [ "$(commands | wc -l)" -eq 17 ] || fail "not seventeen commands: $(commands)"
 }
 
 PageOfTheHostHasItsExitStatuses() {
@@ -62,11 +63,22 @@ PageOfTheHostHasItsExitStatuses() {
 
 PageOfTheHostHasItsExamples() {
     need_tool mandoc mandoc
-    for command in $(commands); do
+    for command in $(own_commands); do
         example=$("$host" "$command" --help | sed -n 's/^  \(cmpihost .*\)/\1/p')
         [ -n "$example" ] || fail "no example of $command"
         expect_text "$example" "$(text cmpihost.1)"
     done
+}
+
+PageOfTheServerHasItsOptionsAndExitStatuses() {
+    need_tool mandoc mandoc
+    server=$KORVA_BINARY_DIR/bin/cmpihost-serve
+    [ "$KORVA_WORD_SIZE" = 64 ] || return 0
+    "$server" --help >"$work/help"
+    expect_equal options "$(options_in <"$work/help")" "$(text cmpihost-serve.1 | options_in)"
+    expect_equal statuses "$(sed -n '/^Exit status:/,$s/^  \([0-9]\)  .*/\1/p' "$work/help")" \
+        "$(sed -n '/^\.Sh EXIT STATUS/,/^\.El/s/^\.It \([0-9]\)$/\1/p' "$pages/cmpihost-serve.1")"
+    expect_text "$(sed -n 's/^  \(cmpihost-serve .*\)/\1/p' "$work/help")" "$(text cmpihost-serve.1)"
 }
 
 PageOfTheRegisterCommandHasItsOptions() {

@@ -42,6 +42,23 @@ TEST(CommandLine, KnowsEveryOperation) {
     }
 }
 
+TEST(CommandLine, HandsWhatStandsBehindServeOnAsItIs) {
+    const CommandLine line =
+        accepted({"serve", "--listen=", "--help", "--log", "-x", "--", "ei", ""});
+    EXPECT_EQ(line.command, Command::Serve);
+    EXPECT_THAT(line.serverArguments,
+                ElementsAre("--listen=", "--help", "--log", "-x", "--", "ei", ""));
+    EXPECT_THAT(accepted({"serve"}).serverArguments, IsEmpty());
+    for (const auto& words : std::vector<std::vector<const char*>>{
+             {"--time", "serve"}, {"--schema=d", "serve", "--help"}, {"--time", "serve", "-x"}}) {
+        const ParsedCommandLine refused = parsedLine(words);
+        EXPECT_EQ(refused.status, exitUsage);
+        EXPECT_EQ(refused.text,
+                  "cmpihost: serve goes first: its options stand behind it\n"
+                  "cmpihost: note: cmpihost serve --help tells more\n");
+    }
+}
+
 TEST(CommandLine, TakesOptionsBeforeAndAfterTheOperation) {
     for (const auto& words : std::vector<std::vector<const char*>>{
              {"--provider", "p.so", "--format", "json", "--log", "--schema=d", "ei", "X"},

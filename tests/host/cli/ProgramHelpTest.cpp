@@ -37,9 +37,11 @@ std::vector<std::string> examples(const std::string& command) {
 }
 
 TEST(ProgramHelp, HasAnExampleForEachCommandThatRunsAsItStands) {
-    ASSERT_EQ(commands().size(), 16U);
+    ASSERT_EQ(commands().size(), 17U);
     std::string text;
     for (const std::string& command : commands()) {
+        // It runs until it is stopped, and its help is another program's.
+        if (command == "serve") continue;
         const std::vector<std::string> found = examples(command);
         EXPECT_EQ(found.size(), 1U) << command;
         for (const std::string& example : found) {
@@ -56,7 +58,9 @@ TEST(ProgramHelp, HasAnExampleForEachCommandThatRunsAsItStands) {
 
 TEST(ProgramHelp, FitsATerminalOfTheUsualWidth) {
     std::vector<Words> runs = {{"--help"}};
-    for (const std::string& command : commands()) runs.push_back({command, "--help"});
+    for (const std::string& command : commands()) {
+        if (command != "serve") runs.push_back({command, "--help"});
+    }
     for (const Words& run : runs)
         for (const std::string& line : lines(cmpihost(run).out))
             EXPECT_LE(line.size(), 80U) << line;
