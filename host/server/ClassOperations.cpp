@@ -13,17 +13,18 @@ namespace cmpihost::server {
 namespace {
 
 /// A whole CIM schema makes larger answers than anybody can use.
-constexpr std::size_t mostClassBytes = 16U << 20U;
+constexpr std::size_t mostClassBytes = 4U << 20U;
 
 /// Whether a declared class is below the other one (empty: below all), directly or in any degree.
 /// What is between them and known by name alone does not count.
 bool isBelow(const Call& call, const std::string& className, const std::string& ancestor,
              bool anyDegree) {
     const ClassCatalogue& catalogue = call.manager.catalogue(call.nameSpace);
+    const Schema& schema = call.manager.schema(call.nameSpace);
     std::optional<std::string_view> above = catalogue.superclassOf(className);
     for (; above && !above->empty(); above = catalogue.superclassOf(*above)) {
         if (base::equalsIgnoreCase(*above, ancestor)) return true;
-        if (!anyDegree && catalogue.find(*above) != nullptr) return false;
+        if (!anyDegree && schema.find(*above) != nullptr) return false;
     }
     return ancestor.empty();
 }
@@ -53,9 +54,10 @@ void getClass(const Call& call, std::string& xml) {
     const Schema& schema = call.manager.schema(call.nameSpace);
     const std::optional<ResolvedClass> found = resolvedClass(schema, name);
     if (!found && call.manager.knowsClass(call.nameSpace, name)) {
-        throw CimError(cimNotFound, name +
-                                        ": only the name of this class is known here; the option "
-                                        "--schema can give the server a whole CIM schema");
+        throw CimError(cimNotFound,
+                       name +
+                           ": only the name of this class is known here; the option --schema can "
+                           "give the server MOF that declares it, such as a whole CIM schema");
     }
     if (!found) throw CimError(cimNotFound, name + ": no such class in " + call.nameSpace);
     ClassView view = viewOf(call.parameters);
@@ -74,7 +76,7 @@ void enumerateClasses(const Call& call, std::string& xml) {
         writeClass(xml, *resolvedClass(schema, name), schema.qualifierTypes(), view);
         if (xml.size() - before > mostClassBytes) {
             throw CimError(cimServerLimitsExceeded,
-                           "these classes are more than the server sends at once, 16 MiB; ask for "
+                           "these classes are more than the server sends at once, 4 MiB; ask for "
                            "the classes below one class, or for one after the other");
         }
     }

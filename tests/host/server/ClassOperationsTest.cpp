@@ -218,7 +218,7 @@ TEST(ClassOperations, FailWithTheStatusThatClientsExpect) {
          "6: KORVA_OperatingSystem: no such class in root/interop"},
         {"GetClass", className("ClassName", "CIM_OperatingSystem"), "root/cimv2",
          "6: CIM_OperatingSystem: only the name of this class is known here; the option --schema "
-         "can give the server a whole CIM schema"},
+         "can give the server MOF that declares it, such as a whole CIM schema"},
         {"GetClass", className("ClassName", "CIM_RegisteredProfile"), "root/interop",
          "6: CIM_RegisteredProfile: no such class in root/interop"},
         {"GetClass", className("ClassName", "KORVA_Foo"), "root/other",
@@ -273,7 +273,7 @@ TEST(ClassOperations, RefuseParametersThatTheyDoNotKnow) {
 TEST(ClassOperations, MoreClassesThanAnybodyCanUseAreAnError) {
     // Each of the classes below the first shows its long text again.
     std::string mof =
-        "class BIG_A { [Description(\"" + std::string(1U << 20U, 'x') + "\")] uint8 P; };\n";
+        "class BIG_A { [Description(\"" + std::string(1U << 18U, 'x') + "\")] uint8 P; };\n";
     for (int index = 0; index < 17; ++index)
         mof += "class BIG_B" + std::to_string(index) + " : BIG_A {};\n";
     const auto manager = managerOf(mof);
