@@ -1,8 +1,11 @@
 #include "host/server/ElementWriter.h"
 
-#include <gtest/gtest.h>
+#include <gmock/gmock.h>
 
 #include <limits>
+
+#include "host/server/ResponseValidator.h"
+#include "host/server/ResponseWriter.h"
 
 namespace cmpihost::server {
 namespace {
@@ -130,6 +133,198 @@ TEST(ElementWriter, TextsAreEscapedAndWhatIsNoXmlIsReplaced) {
         writeAttributeText(attribute, row.text);
         EXPECT_EQ(attribute, "x" + std::string(row.attribute));
     }
+}
+
+const std::string vmRootCimv2 =
+    "<NAMESPACEPATH><HOST>vm</HOST><LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE "
+    "NAME=\"cimv2\"/></LOCALNAMESPACEPATH></NAMESPACEPATH>";
+
+/// What a function writes, which is a response of the operation that the validator takes.
+template <class Write>
+std::string writtenFor(const std::string& operation, Write write) {
+    Message message;
+    message.id = "7";
+    message.method = operation;
+    std::string xml;
+    beginResponse(xml, message);
+    const std::size_t start = xml.size();
+    write(xml);
+    const std::string written = xml.substr(start);
+    endResponse(xml, message);
+    EXPECT_THAT(complaintsAbout(xml, operation), testing::ElementsAre());
+    return written;
+}
+
+TEST(ElementWriter, KeysAreTaggedByTheirTypes) {
+    ObjectPathValue part;
+    part.nameSpace = "/root//other/";
+    part.className = "X_Part";
+    part.keys = {{"Id", "a\"<b>\""}};
+    part.hostName = "elsewhere";
+    ObjectPathValue path;
+    path.nameSpace = "root/cimv2";
+    path.className = "X_Link";
+    path.keys = {{"Text", "two words"},
+                 {"Chars", Value::fromText("", CMPI_chars)},
+                 {"Small", Value::fromUnsigned(36, CMPI_uint16)},
+                 {"Minus", Value::fromSigned(-5)},
+                 {"Yes", Value::fromBoolean(true)},
+                 {"When", Value::fromText("20250301101500.000000+000", CMPI_dateTime)},
+                 {"Letter", Value::fromUnsigned('x', CMPI_char16)},
+                 {"None", Value::null(CMPI_string)},
+                 {"Part", Value::fromReference(part)}};
+    const auto written = writtenFor("EnumerateInstanceNames", [&](std::string& xml) {
+        xml += "<IRETURNVALUE>";
+        writeInstanceNames(xml, {path}, elementSite);
+        xml += "</IRETURNVALUE>";
+    });
+    EXPECT_EQ(
+        written,
+        "<IRETURNVALUE><INSTANCENAME CLASSNAME=\"X_Link\">"
+        "<KEYBINDING NAME=\"Text\"><KEYVALUE VALUETYPE=\"string\">two words</KEYVALUE></KEYBINDING>"
+        "<KEYBINDING NAME=\"Chars\"><KEYVALUE VALUETYPE=\"string\"></KEYVALUE></KEYBINDING>"
+        "<KEYBINDING NAME=\"Small\"><KEYVALUE VALUETYPE=\"numeric\">36</KEYVALUE></KEYBINDING>"
+        "<KEYBINDING NAME=\"Minus\"><KEYVALUE VALUETYPE=\"numeric\">-5</KEYVALUE></KEYBINDING>"
+        "<KEYBINDING NAME=\"Yes\"><KEYVALUE VALUETYPE=\"boolean\">TRUE</KEYVALUE></KEYBINDING>"
+        "<KEYBINDING NAME=\"When\"><KEYVALUE VALUETYPE=\"string\">20250301101500.000000+000"
+        "</KEYVALUE></KEYBINDING>"
+        "<KEYBINDING NAME=\"Letter\"><KEYVALUE VALUETYPE=\"string\">x</KEYVALUE></KEYBINDING>"
+        "<KEYBINDING NAME=\"None\"><KEYVALUE VALUETYPE=\"string\"></KEYVALUE></KEYBINDING>"
+        "<KEYBINDING NAME=\"Part\"><VALUE.REFERENCE><INSTANCEPATH><NAMESPACEPATH><HOST>elsewhere"
+        "</HOST><LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"other\"/>"
+        "</LOCALNAMESPACEPATH></NAMESPACEPATH><INSTANCENAME CLASSNAME=\"X_Part\"><KEYBINDING "
+        "NAME=\"Id\"><KEYVALUE VALUETYPE=\"string\">a\"&lt;b&gt;\"</KEYVALUE></KEYBINDING>"
+        "</INSTANCENAME></INSTANCEPATH></VALUE.REFERENCE></KEYBINDING></INSTANCENAME>"
+        "</IRETURNVALUE>");
+}
+
+TEST(ElementWriter, AnInstanceHasThePropertiesThatHaveAValue) {
+    InstanceValue inner;
+    inner.path.className = "X_Inner";
+    inner.properties = {{"Text", "a&b"}};
+    InstanceValue instance;
+    instance.path = {"", "X_Thing", {}, ""};
+    instance.properties = {
+        {"Name", "x", "X_Base"},
+        {"Description", ""},
+        {"Nothing", Value::null(CMPI_uint32)},
+        {"Codes", Value::fromArray(CMPI_uint16, {Value::fromUnsigned(2, CMPI_uint16)})},
+        {"NoTexts", Value::fromArray(CMPI_string, std::vector<Value>())},
+        {"Inner", Value::fromInstance(inner)},
+        {"Inners", Value::fromArray(CMPI_instance, {Value::fromInstance(inner)})},
+        {"Link", Value::fromReference({"", "X_Far", {{"Id", Value::fromBoolean(false)}}, ""})},
+        {"Links", Value::fromArray(CMPI_ref, std::vector<Value>())},
+        {"Bytes", Value::fromPointer({nullptr, 0})}};
+    const std::string embedded =
+        "&lt;INSTANCE CLASSNAME=\"X_Inner\"&gt;&lt;PROPERTY NAME=\"Text\" TYPE=\"string\"&gt;"
+        "&lt;VALUE&gt;a&amp;amp;b&lt;/VALUE&gt;&lt;/PROPERTY&gt;&lt;/INSTANCE&gt;";
+    const std::string first =
+        "<INSTANCE CLASSNAME=\"X_Thing\"><PROPERTY NAME=\"Name\" TYPE=\"string\"";
+    const std::string rest =
+        "><VALUE>x</VALUE></PROPERTY>"
+        "<PROPERTY NAME=\"Description\" TYPE=\"string\"><VALUE></VALUE></PROPERTY>"
+        "<PROPERTY.ARRAY NAME=\"Codes\" TYPE=\"uint16\"><VALUE.ARRAY><VALUE>2</VALUE></VALUE.ARRAY>"
+        "</PROPERTY.ARRAY>"
+        "<PROPERTY.ARRAY NAME=\"NoTexts\" TYPE=\"string\"><VALUE.ARRAY></VALUE.ARRAY>"
+        "</PROPERTY.ARRAY>"
+        "<PROPERTY NAME=\"Inner\" TYPE=\"string\" EmbeddedObject=\"instance\"><VALUE>" +
+        embedded +
+        "</VALUE></PROPERTY>"
+        "<PROPERTY.ARRAY NAME=\"Inners\" TYPE=\"string\" EmbeddedObject=\"instance\"><VALUE.ARRAY>"
+        "<VALUE>" +
+        embedded +
+        "</VALUE></VALUE.ARRAY></PROPERTY.ARRAY>"
+        "<PROPERTY.REFERENCE NAME=\"Link\" "
+        "REFERENCECLASS=\"X_Far\"><VALUE.REFERENCE><INSTANCEPATH>" +
+        vmRootCimv2 +
+        "<INSTANCENAME CLASSNAME=\"X_Far\"><KEYBINDING NAME=\"Id\"><KEYVALUE VALUETYPE=\"boolean\">"
+        "FALSE</KEYVALUE></KEYBINDING></INSTANCENAME></INSTANCEPATH></VALUE.REFERENCE>"
+        "</PROPERTY.REFERENCE></INSTANCE>";
+    const auto written = [&](bool classOrigin) {
+        return writtenFor("GetInstance", [&](std::string& xml) {
+            xml += "<IRETURNVALUE>";
+            writeInstance(xml, instance, elementSite, classOrigin);
+            xml += "</IRETURNVALUE>";
+        });
+    };
+    EXPECT_EQ(written(false), "<IRETURNVALUE>" + first + rest + "</IRETURNVALUE>");
+    EXPECT_EQ(written(true),
+              "<IRETURNVALUE>" + first + " CLASSORIGIN=\"X_Base\"" + rest + "</IRETURNVALUE>");
+}
+
+TEST(ElementWriter, ListsHaveTheFormsThatOperationsAnswer) {
+    const ObjectPathValue path{"root/cimv2", "X", {{"K", "k"}}, ""};
+    const InstanceValue instance{path, {{"K", "k"}}};
+    const std::string name =
+        "<INSTANCENAME CLASSNAME=\"X\"><KEYBINDING NAME=\"K\"><KEYVALUE VALUETYPE=\"string\">k"
+        "</KEYVALUE></KEYBINDING></INSTANCENAME>";
+    const std::string wholePath = "<INSTANCEPATH>" + vmRootCimv2 + name + "</INSTANCEPATH>";
+    const std::string properties =
+        "<INSTANCE CLASSNAME=\"X\"><PROPERTY NAME=\"K\" TYPE=\"string\"><VALUE>k</VALUE></PROPERTY>"
+        "</INSTANCE>";
+    const auto twice = [](const std::string& text) {
+        return "<IRETURNVALUE>" + text + text + "</IRETURNVALUE>";
+    };
+    using Write = void (*)(std::string&, const std::vector<InstanceValue>&, const Site&, bool);
+    const auto instances = [&](const char* operation, Write write) {
+        return writtenFor(operation, [&](std::string& xml) {
+            xml += "<IRETURNVALUE>";
+            write(xml, {instance, instance}, elementSite, false);
+            xml += "</IRETURNVALUE>";
+        });
+    };
+    EXPECT_EQ(instances("EnumerateInstances", writeNamedInstances),
+              twice("<VALUE.NAMEDINSTANCE>" + name + properties + "</VALUE.NAMEDINSTANCE>"));
+    EXPECT_EQ(instances("Associators", writeObjectsWithPath),
+              twice("<VALUE.OBJECTWITHPATH>" + wholePath + properties + "</VALUE.OBJECTWITHPATH>"));
+    using WritePaths = void (*)(std::string&, const std::vector<ObjectPathValue>&, const Site&);
+    const auto paths = [&](const char* operation, WritePaths write) {
+        return writtenFor(operation, [&](std::string& xml) {
+            xml += "<IRETURNVALUE>";
+            write(xml, {path, path}, elementSite);
+            xml += "</IRETURNVALUE>";
+        });
+    };
+    EXPECT_EQ(paths("EnumerateInstanceNames", writeInstanceNames), twice(name));
+    EXPECT_EQ(paths("ReferenceNames", writeObjectPaths),
+              twice("<OBJECTPATH>" + wholePath + "</OBJECTPATH>"));
+    // Those of the pull operations, whose answers have more in them.
+    std::string pulledInstances;
+    writeInstancesWithPath(pulledInstances, {instance}, elementSite, false);
+    EXPECT_EQ(pulledInstances,
+              "<VALUE.INSTANCEWITHPATH>" + wholePath + properties + "</VALUE.INSTANCEWITHPATH>");
+    std::string pulledPaths;
+    writeInstancePaths(pulledPaths, {path, path}, elementSite);
+    EXPECT_EQ(pulledPaths, wholePath + wholePath);
+}
+
+TEST(ElementWriter, WhatComesOutOfOperationsAndMethodsTellsItsType) {
+    const auto written = writtenFor("PullInstancePaths", [](std::string& xml) {
+        xml += "<IRETURNVALUE></IRETURNVALUE>";
+        writeParameter(xml, "EnumerationContext", Value::null(CMPI_string), elementSite);
+        writeParameter(xml, "EndOfSequence", Value::fromBoolean(true), elementSite);
+    });
+    EXPECT_EQ(written,
+              "<IRETURNVALUE></IRETURNVALUE><PARAMVALUE NAME=\"EnumerationContext\" "
+              "PARAMTYPE=\"string\"></PARAMVALUE><PARAMVALUE NAME=\"EndOfSequence\" "
+              "PARAMTYPE=\"boolean\"><VALUE>TRUE</VALUE></PARAMVALUE>");
+    std::string xml;
+    writeReturnValue(xml, Value::fromUnsigned(0, CMPI_uint32), elementSite);
+    writeReturnValue(xml, Value::null(CMPI_uint32), elementSite);
+    writeParameter(xml, "List", Value::fromArray(CMPI_sint8, std::vector<Value>()), elementSite);
+    writeParameter(xml, "Job", Value::fromReference({"", "X", {}, ""}), elementSite);
+    writeParameter(xml, "Setting", Value::fromInstance(InstanceValue()), elementSite);
+    writeParameter(xml, "a<b", Value(), elementSite);
+    EXPECT_EQ(
+        xml,
+        "<RETURNVALUE PARAMTYPE=\"uint32\"><VALUE>0</VALUE></RETURNVALUE>"
+        "<PARAMVALUE NAME=\"List\" PARAMTYPE=\"sint8\"><VALUE.ARRAY></VALUE.ARRAY></PARAMVALUE>"
+        "<PARAMVALUE NAME=\"Job\" PARAMTYPE=\"reference\"><VALUE.REFERENCE><CLASSPATH>" +
+            vmRootCimv2 +
+            "<CLASSNAME NAME=\"X\"/></CLASSPATH></VALUE.REFERENCE></PARAMVALUE>"
+            "<PARAMVALUE NAME=\"Setting\" PARAMTYPE=\"string\" EmbeddedObject=\"instance\">"
+            "<VALUE>&lt;INSTANCE CLASSNAME=\"\"&gt;&lt;/INSTANCE&gt;</VALUE></PARAMVALUE>"
+            "<PARAMVALUE NAME=\"a&lt;b\"></PARAMVALUE>");
 }
 
 }  // namespace
