@@ -1,8 +1,10 @@
 // A handful of instances, made anew for each request: the counters are as of now.
 #include "host/server/Interop.h"
 
+#include <algorithm>
 #include <utility>
 
+#include "base/Ascii.h"
 #include "host/mof/MofParser.h"
 #include "host/server/InteropClasses.h"
 
@@ -24,6 +26,18 @@ Schema interopSchema() {
 void refuse(OperationResult& result, CMPIrc rc, std::string message) {
     result.rc = rc;
     result.message = std::move(message);
+}
+
+/// All keys here are names, of hosts, classes and namespaces: they compare without case.
+bool isNamedBy(const ObjectPathValue& given, const ObjectPathValue& asked) {
+    const auto same = [&](const KeyBinding& key) {
+        const Value* const other = asked.key(key.name);
+        return other != nullptr && other->isText() &&
+               base::equalsIgnoreCase(key.value.text(), other->text());
+    };
+    return base::equalsIgnoreCase(given.className, asked.className) &&
+           given.keys.size() == asked.keys.size() &&
+           std::all_of(given.keys.begin(), given.keys.end(), same);
 }
 
 std::uint64_t whole(std::chrono::nanoseconds time, std::chrono::nanoseconds unit) {
@@ -66,7 +80,7 @@ OperationResult Interop::ask(const OperationRequest& request) const {
             break;
         case Operation::GetInstance:
             for (InstanceValue& each : instances())
-                if (each.path == request.path) result.instances.push_back(std::move(each));
+                if (isNamedBy(each.path, request.path)) result.instances.push_back(std::move(each));
             if (result.instances.empty())
                 refuse(result, CMPI_RC_ERR_NOT_FOUND,
                        toString(request.path) + ": no such instance");

@@ -191,7 +191,7 @@ TEST(TheInteropNamespaceOfAServer, GivesItsObjectManagerByAllKeys) {
     const std::string brand = list("PropertyList", {"elementname"});
     EXPECT_EQ(
         content(interopAnswer("GetInstance",
-                              objectManagerParameter("KORVA_ObjectManager", "cmpihost") + brand)),
+                              objectManagerParameter("korva_objectmanager", "cmpihost") + brand)),
         "<IRETURNVALUE><INSTANCE CLASSNAME=\"KORVA_ObjectManager\"><PROPERTY "
         "NAME=\"ElementName\" TYPE=\"string\"><VALUE>cmpihost</VALUE></PROPERTY></INSTANCE>"
         "</IRETURNVALUE>");
