@@ -1,6 +1,5 @@
 #include "host/server/AccessLog.h"
 
-#include <chrono>
 #include <utility>
 
 #include "base/Utf8.h"
@@ -9,13 +8,16 @@ namespace cmpihost::server {
 
 namespace {
 
-/// Of the complaints after one answer.
+/// Of the complaints at a time.
 constexpr std::size_t mostComplaints = 16;
 constexpr std::size_t longestField = 128;
 
+/// Blanks in it are written out: the fields of a line stay apart.
 std::string field(const std::string& text) {
     if (text.empty()) return "-";
-    return text.size() <= longestField ? text : text.substr(0, longestField) + "...";
+    std::string result = base::escape(text.substr(0, longestField), base::EscapeStyle::logField);
+    if (text.size() > longestField) result += "...";
+    return result;
 }
 
 bool isFailure(const HttpResponse& response) {
@@ -24,25 +26,26 @@ bool isFailure(const HttpResponse& response) {
 
 }  // namespace
 
-AccessLog::AccessLog(HttpHandler& handler, Log& log, Complaints complaints)
-    : handler_(handler), log_(log), complaints_(std::move(complaints)) {}
+AccessLog::AccessLog(Log& log, Complaints complaints)
+    : log_(log), complaints_(std::move(complaints)) {}
 
-HttpResponse AccessLog::answer(const HttpRequest& request) {
-    using Clock = std::chrono::steady_clock;
-    const Clock::time_point begin = Clock::now();
-    HttpResponse response = handler_.answer(request);
+void AccessLog::answered(const HttpRequest& request, const HttpResponse& response,
+                         std::chrono::nanoseconds took) {
     const bool failure = isFailure(response);
     if (log_.level() == LogLevel::Requests || (failure && log_.level() == LogLevel::Failures)) {
-        const auto took =
-            std::chrono::duration_cast<std::chrono::microseconds>(Clock::now() - begin);
-        log_.write(failure ? Priority::Notice : Priority::Info,
-                   request.peer + " " + field(response.user) + " " + field(response.operation) +
-                       " " + std::to_string(response.status) + " " +
-                       std::to_string(response.cimStatus) + " " + std::to_string(took.count()) +
-                       "us");
+        const auto microseconds = std::chrono::duration_cast<std::chrono::microseconds>(took);
+        log_.writeClean(failure ? Priority::Notice : Priority::Info,
+                        field(request.peer) + " " + field(response.user) + " " +
+                            field(response.operation) + " " + std::to_string(response.status) +
+                            " " + std::to_string(response.cimStatus) + " " +
+                            std::to_string(microseconds.count()) + "us");
     }
     logComplaints();
-    return response;
+}
+
+void AccessLog::cut(const std::string& peer, const char* reason) {
+    if (log_.level() != LogLevel::None)
+        log_.write(Priority::Notice, (peer.empty() ? "-" : peer) + " cut: " + reason);
 }
 
 void AccessLog::logComplaints() {
@@ -55,6 +58,14 @@ void AccessLog::logComplaints() {
     if (complaints.size() > mostComplaints)
         log_.write(Priority::Warning,
                    "caught: " + std::to_string(complaints.size() - mostComplaints) + " more");
+}
+
+HttpEvents AccessLog::events() {
+    HttpEvents result;
+    result.answered = [this](const HttpRequest& request, const HttpResponse& response,
+                             std::chrono::nanoseconds took) { answered(request, response, took); };
+    result.cut = [this](const std::string& peer, const char* reason) { cut(peer, reason); };
+    return result;
 }
 
 }  // namespace cmpihost::server

@@ -1,33 +1,36 @@
 #ifndef HOST_SERVER_ACCESS_LOG_H
 #define HOST_SERVER_ACCESS_LOG_H
 
+#include <chrono>
 #include <functional>
 #include <string>
 #include <vector>
 
-#include "host/server/HttpMessage.h"
+#include "host/server/HttpServer.h"
 #include "host/server/Log.h"
 
 namespace cmpihost::server {
 
-/// Logs what another handler answers, and what it has to complain of afterwards. A line holds the
-/// peer, the user (or -), the operation (or -), the HTTP status, the CIM status, the microseconds:
-/// "127.0.0.1 - GetInstance 200 6 412us".
-class AccessLog final : public HttpHandler {
+/// Logs what clients were answered, as far as the level of the log goes, and what the server has to
+/// complain of afterwards. The line of a request holds the peer, the user (or -), the operation (or
+/// -), the HTTP status, the CIM status and the microseconds: "127.0.0.1 - GetInstance 200 6 412us".
+/// Any threads may call it at once.
+class AccessLog {
   public:
     using Complaints = std::function<std::vector<std::string>()>;
 
-    /// Handler and log outlive this object. `complaints` gives the lines that are to be logged
-    /// after each answer; any threads may call it at once.
-    AccessLog(HttpHandler& handler, Log& log, Complaints complaints);
+    /// The log outlives this object. `complaints` gives the lines that came since its last call.
+    AccessLog(Log& log, Complaints complaints);
 
-    HttpResponse answer(const HttpRequest& request) override;
-
-    /// Logs the complaints that there are.
+    void answered(const HttpRequest& request, const HttpResponse& response,
+                  std::chrono::nanoseconds took);
+    void cut(const std::string& peer, const char* reason);
     void logComplaints();
 
+    /// Has a server tell it all. This object outlives the server.
+    HttpEvents events();
+
   private:
-    HttpHandler& handler_;
     Log& log_;
     const Complaints complaints_;
 };

@@ -19,15 +19,15 @@ Log::Log(int file, LogLevel level, bool priorities)
     : file_(file), level_(level), priorities_(priorities) {}
 
 void Log::write(Priority priority, std::string_view text) {
-    const auto lead = [this](Priority which) {
-        return (priorities_ ? "<" + std::to_string(static_cast<int>(which)) + ">" : std::string()) +
-               "cmpihost-serve: ";
-    };
     const bool cut = text.size() > longestText;
-    std::string line =
-        lead(priority) + base::escape(text.substr(0, longestText), base::EscapeStyle::logText);
-    line += cut ? "...\n" : "\n";
+    const std::string shown = base::escape(text.substr(0, longestText), base::EscapeStyle::logText);
+    writeClean(priority, cut ? shown + "..." : shown);
+}
 
+void Log::writeClean(Priority priority, std::string_view text) {
+    std::string line = lead(priority);
+    line += text;
+    line += '\n';
     const std::lock_guard<std::mutex> lock(mutex_);
     if (untold_ > 0 && put(lead(Priority::Warning) + std::to_string(untold_) +
                            " lines of this log were lost: nobody read them in time\n"))
@@ -35,6 +35,11 @@ void Log::write(Priority priority, std::string_view text) {
     if (put(line)) return;
     ++lost_;
     ++untold_;
+}
+
+std::string Log::lead(Priority priority) const {
+    const std::string number = std::to_string(static_cast<int>(priority));
+    return (priorities_ ? "<" + number + ">" : "") + "cmpihost-serve: ";
 }
 
 bool Log::put(std::string_view line) {

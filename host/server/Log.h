@@ -27,11 +27,14 @@ class Log {
     /// Writes a line. Of the text, bytes that are no printable characters become \xNN, and what is
     /// longer than a line may be is cut.
     void write(Priority priority, std::string_view text);
+    /// The same for a text that is written out already.
+    void writeClean(Priority priority, std::string_view text);
 
     /// How many lines were lost.
     std::uint64_t lost() const;
 
   private:
+    std::string lead(Priority priority) const;
     bool put(std::string_view line);
 
     const int file_;

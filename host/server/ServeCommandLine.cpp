@@ -79,8 +79,42 @@ const TextRow textRows[] = {
 const std::map<std::string, LogLevel> logLevels = {
     {"none", LogLevel::None}, {"failures", LogLevel::Failures}, {"requests", LogLevel::Requests}};
 
-std::string nonEmpty(const std::string& given) {
+constexpr unsigned mostConnections = 10000;
+
+CLI::Validator validator(const std::function<std::string(const std::string&)>& complaint) {
+    return {complaint, {}};
+}
+
+std::string whyNoText(const std::string& given) {
     return given.empty() ? "the value is empty" : "";
+}
+
+std::string whyNoNumber(const std::string& given) {
+    const bool digits = !given.empty() && given.size() <= 5 &&
+                        given.find_first_not_of("0123456789") == std::string::npos;
+    const bool fits = digits && std::stoul(given) >= 1 && std::stoul(given) <= mostConnections;
+    return fits ? "" : "expected a number from 1 to 10000, found '" + given + "'";
+}
+
+std::string whyNoLevel(const std::string& given) {
+    return logLevels.count(given) == 1
+               ? ""
+               : "expected none, failures or requests, found '" + given + "'";
+}
+
+/// CLI11's own complaints about words that are too many or too few are hard to understand.
+std::string complaintOf(const CLI::App& app, const CLI::ParseError& error) {
+    const std::string text = error.what();
+    const std::vector<std::string> unknown = app.remaining();
+    if (dynamic_cast<const CLI::ExtrasError*>(&error) != nullptr && !unknown.empty()) {
+        const bool isOption = unknown.front().substr(0, 1) == "-";
+        return std::string("there is no ") + (isOption ? "option '" : "argument '") +
+               unknown.front() + "'";
+    }
+    if (dynamic_cast<const CLI::ArgumentMismatch*>(&error) == nullptr) return text;
+    const bool lacksValue = text.find("missing") != std::string::npos;
+    return text.substr(0, text.find(':')) +
+           (lacksValue ? ": the value is missing" : " stands more than once");
 }
 
 class ServeParser {
@@ -102,15 +136,14 @@ ServeParser::ServeParser() : app_(help, "cmpihost-serve") {
     app_.set_help_flag("-h,--help", "Print this help");
     app_.footer(footer);
     app_.get_formatter()->column_width(28);
-    const CLI::Validator check(nonEmpty, {});
     for (const ListRow& row : listRows)
         app_.add_option(row.name, options_.*row.field, row.help)
-            ->check(check)
+            ->check(validator(whyNoText))
             ->allow_extra_args(false)
             ->option_text(row.valueName);
     for (const TextRow& row : textRows)
         app_.add_option(row.name, options_.*row.field, row.help)
-            ->check(check)
+            ->check(validator(whyNoText))
             ->option_text(row.valueName);
     app_.get_option("--tls-cert")->needs("--tls-key")->option_text("FILE");
     app_.get_option("--tls-key")->needs("--tls-cert")->option_text("FILE");
@@ -124,13 +157,13 @@ ServeParser::ServeParser() : app_(help, "cmpihost-serve") {
             "--log", [this](const std::string& word) { options_.logLevel = logLevels.at(word); },
             "Which requests are logged: none, failures (the\n"
             "default) or requests, which is all of them")
-        ->check(CLI::IsMember(logLevels))
+        ->check(validator(whyNoLevel))
         ->option_text("LEVEL");
 }
 
 template <class Field>
 void ServeParser::addNumber(const char* name, Field& field, const char* text) {
-    app_.add_option(name, field, text)->check(CLI::Range(1, 10000))->option_text("N");
+    app_.add_option(name, field, text)->check(validator(whyNoNumber))->option_text("N");
 }
 
 ParsedServeCommandLine ServeParser::refused(const std::string& complaint) {
@@ -148,7 +181,7 @@ ParsedServeCommandLine ServeParser::parse(int argumentCount, const char* const* 
     } catch (const CLI::CallForHelp&) {
         return {std::nullopt, app_.help(), serviceEnded};
     } catch (const CLI::ParseError& error) {
-        return refused(error.what());
+        return refused(complaintOf(app_, error));
     }
     return {options_, {}, serviceEnded};
 }

@@ -45,7 +45,7 @@ std::vector<fs::path> pathsOf(const std::vector<std::string>& given, const fs::p
 
 /// What providers log through their broker, as far as the level of the log goes.
 void logProviderMessage(Log& log, const ProviderMessage& message) {
-    const bool failure = message.level >= CMPI_SEV_ERROR;
+    const bool failure = message.level == CMPI_SEV_ERROR || message.level == CMPI_SEV_WARNING;
     const bool wanted =
         log.level() == LogLevel::Requests || (log.level() == LogLevel::Failures && failure);
     if (message.trace || !wanted) return;
@@ -162,7 +162,7 @@ Service::Service(const ServiceOptions& options, const fs::path& programFolder, L
       users_(options.users.empty() ? nullptr : std::make_unique<Users>(options.users, log)),
       cim_(manager_, users_ ? static_cast<AccessControl&>(*users_) : everybody_,
            httpOptions(options)),
-      accessLog_(cim_, log, [this] { return manager_.takeComplaints(); }) {
+      accessLog_(log, [this] { return manager_.takeComplaints(); }) {
     identity_ = readIdentity();
     listen();
 }
@@ -212,8 +212,8 @@ void Service::refuseUnsafe(const ListenAddress& address) const {
 void Service::start(Listener& listener) {
     const bool tls = identity_ && !listener.address.isPlain();
     base::FileDescriptor socket(fcntl(listener.socket.number(), F_DUPFD_CLOEXEC, 0));
-    listener.server = std::make_unique<HttpServer>(std::move(socket), accessLog_, options_.limits,
-                                                   tls ? &*identity_ : nullptr);
+    listener.server = std::make_unique<HttpServer>(
+        std::move(socket), cim_, options_.limits, tls ? &*identity_ : nullptr, accessLog_.events());
 }
 
 ServiceStatus Service::run() {
