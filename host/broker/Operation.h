@@ -95,6 +95,8 @@ struct OperationRequest {
     std::optional<std::string> resultClass{};
     std::optional<std::string> role{};
     std::optional<std::string> resultRole{};
+    /// The association class that is named stands for itself alone, not for those below it too.
+    bool exactAssociation = false;
     /// For InvokeMethod, with the arguments that go in.
     std::string method{};
     std::vector<NamedValue> arguments{};

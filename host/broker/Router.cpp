@@ -176,7 +176,8 @@ std::vector<Router::Target> Router::associationTargets(const OperationRequest& r
         if (!each.serves(Interface::Association, request.path.nameSpace)) continue;
         if (association) {
             const ClassRelation relation = classRelation(&catalogue_, each.className, *association);
-            if (relation != ClassRelation::Same && relation != ClassRelation::Subclass) continue;
+            const bool below = relation == ClassRelation::Subclass && !request.exactAssociation;
+            if (relation != ClassRelation::Same && !below) continue;
         }
         const auto isSame = [&](const Target& other) {
             return providerKey(*other.registration) == providerKey(each);

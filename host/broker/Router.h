@@ -21,8 +21,8 @@ namespace cmpihost {
 ///   class and of its subclasses, each asked for the class that it is registered for; the first
 ///   status other than OK is the answer.
 /// - Association operations go to the association providers of the named association class and of
-///   its subclasses, or of the whole namespace where none is named, each provider once; an
-///   instance or path that several give is answered once.
+///   its subclasses (unless it stands for itself alone), or of the whole namespace where none is
+///   named, each provider once; an instance or path that several give is answered once.
 /// - Everything else goes to the provider of the very class.
 /// Where nobody is registered the answer is CMPI_RC_ERR_INVALID_NAMESPACE for a namespace that no
 /// registration names, CMPI_RC_ERR_INVALID_CLASS for an unknown class, else

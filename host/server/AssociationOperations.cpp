@@ -1,5 +1,6 @@
 // The four association operations, from instances and from classes.
 #include "host/server/AssociationTraversal.h"
+#include "host/server/CimError.h"
 #include "host/server/ClassWriter.h"
 
 namespace cmpihost::server {
@@ -44,7 +45,9 @@ std::vector<std::string> tiedClasses(const Call& call, Operation operation) {
         call.manager, call.nameSpace, source, filter);
 }
 
+/// Throws CimError where a whole CIM schema makes the answer larger than anybody can use.
 void writeClasses(const Call& call, Operation operation, std::string& xml) {
+    constexpr std::size_t mostBytes = 4U << 20U;
     ClassView view;
     view.qualifiers = call.parameters.flag("IncludeQualifiers", false);
     view.classOrigin = call.parameters.flag("IncludeClassOrigin", false);
@@ -55,6 +58,10 @@ void writeClasses(const Call& call, Operation operation, std::string& xml) {
         writeClassPath(xml, name, call.site());
         writeClass(xml, resolvedClass(schema, name).value(), schema.qualifierTypes(), view);
         xml += "</VALUE.OBJECTWITHPATH>";
+        if (xml.size() > mostBytes)
+            throw CimError(cimServerLimitsExceeded,
+                           "these classes are more than the server sends at once, 4 MiB; ask for "
+                           "their names");
     }
 }
 

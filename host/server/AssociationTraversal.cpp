@@ -191,6 +191,12 @@ OperationRequest Traversal::requestTo(const Tie& tie) const {
     request.path = source_;
     request.context.principal = call_.user;
     (isReferenceOperation(operation_) ? request.resultClass : request.assocClass) = tie.association;
+    request.exactAssociation = true;
+    if (!yieldsPaths(operation_)) {
+        request.properties = call_.parameters.names("PropertyList");
+        if (call_.parameters.flag("IncludeClassOrigin", false))
+            request.context.flags |= CMPI_FLAG_IncludeClassOrigin;
+    }
     request.role = filter_.role;
     request.resultRole = filter_.farRole;
     // In the schema's spelling, for those who compare with case.

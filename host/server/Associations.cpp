@@ -79,18 +79,18 @@ std::vector<std::string> associatedClasses(const ObjectManager& manager,
                                            const std::string& nameSpace,
                                            const std::string& className,
                                            const AssociationFilter& filter) {
-    const Schema& schema = manager.schema(nameSpace);
+    std::vector<std::string> ends;
+    for (const Tie& tie : certainTies(manager, nameSpace, className, filter))
+        for (const AssociationWay& way : tie.ways) addOnce(ends, way.far->referenceClass);
+    if (ends.empty()) return ends;
+
     std::vector<std::string> classes;
-    const auto add = [&](const std::string& name) {
-        if (filter.farClass && !manager.isA(nameSpace, name, *filter.farClass)) return;
-        addOnce(classes, name);
-    };
-    for (const Tie& tie : certainTies(manager, nameSpace, className, filter)) {
-        for (const AssociationWay& way : tie.ways) {
-            if (const mof::Class* const end = schema.find(way.far->referenceClass)) add(end->name);
-            for (const std::string& name : schema.subclasses(way.far->referenceClass, true))
-                add(name);
-        }
+    for (const std::string& name : manager.schema(nameSpace).classNames()) {
+        const auto isBelow = [&](const std::string& ancestor) {
+            return manager.isA(nameSpace, name, ancestor);
+        };
+        if (filter.farClass && !isBelow(*filter.farClass)) continue;
+        if (std::any_of(ends.begin(), ends.end(), isBelow)) classes.push_back(name);
     }
     return classes;
 }

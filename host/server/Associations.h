@@ -45,7 +45,7 @@ struct Tie {
 std::vector<Tie> tiesOf(const ObjectManager& manager, const std::string& nameSpace,
                         const std::string& className, const AssociationFilter& filter);
 
-/// The classes of the schema that associations tie the class `className` to, each once.
+/// The classes of the schema that associations tie the class `className` to, in alphabetical order.
 std::vector<std::string> associatedClasses(const ObjectManager& manager,
                                            const std::string& nameSpace,
                                            const std::string& className,

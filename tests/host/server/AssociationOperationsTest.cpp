@@ -1,4 +1,5 @@
 // Requests from text to text: over the shipped providers, the bare one and those of other makers.
+#include "host/server/ResponseValidator.h"
 #include "host/server/ResultSummary.h"
 #include "host/server/ServerFixture.h"
 
@@ -104,14 +105,15 @@ std::vector<Row> referenceRows() {
 }
 
 /// Asks for the objects and for their names.
-void expectFound(ObjectManager& manager, const std::string& name, const std::string& nameOfNames,
+void expectFound(ObjectManager& manager, const std::string& objects, const std::string& names,
                  const std::vector<Row>& rows, const std::string& nameSpace = "root/cimv2") {
     for (const Row& row : rows) {
-        const std::string given = from(row.source) + row.filters;
-        EXPECT_EQ(objectsIn(respond(manager, operation(name, given, nameSpace))), row.found)
-            << row.source << row.filters;
-        EXPECT_EQ(objectsIn(respond(manager, operation(nameOfNames, given, nameSpace))), row.found)
-            << row.source << row.filters;
+        for (const std::string& name : {objects, names}) {
+            const std::string answer =
+                respond(manager, operation(name, from(row.source) + row.filters, nameSpace));
+            EXPECT_EQ(objectsIn(answer), row.found) << name << row.source << row.filters;
+            EXPECT_THAT(complaintsAbout(answer, name), IsEmpty());
+        }
     }
 }
 
@@ -339,6 +341,19 @@ TEST(AssociationOperations, AskProvidersOfOtherMakers) {
                   {"TEST_Thing(first)"}},
                  {instanceName("TEST_Part", {{"Id", "no such"}}), "", {}}},
                 "root/test");
+}
+
+TEST(AssociationOperations, AskEachProviderForTheAssociationsThatAreItsOwn) {
+    // The second provider fails for any association but those that it knows, which this is not.
+    ObjectManager& manager = foreignManager(
+        "[TEST_OwnLink]\nprovider: OperatingSystemProvider\n"
+        "location: korzbosstatusprofileprovider\ntype: association\n"
+        "namespace: root/test\n",
+        "[Association] class TEST_OwnLink : TEST_Link {};");
+    EXPECT_THAT(error(respond(manager, operation("AssociatorNames",
+                                                 from(thing) + className("AssocClass", "TEST_Link"),
+                                                 "root/test"))),
+                StartsWith("5: the provider of TEST_OwnLink: "));
 }
 
 TEST(AssociationOperations, OfAProviderThatTellsNoReferencesAndNoInstancesFailAndNameIt) {

@@ -1,3 +1,4 @@
+#include "host/server/ResponseValidator.h"
 #include "host/server/ResultSummary.h"
 #include "host/server/ServerFixture.h"
 
@@ -32,6 +33,15 @@ std::string continued(const std::string& context, unsigned count) {
 /// A manager that nobody else has altered.
 ObjectManager& newForeignManager() {
     return foreignManager("# Nothing more.\n");
+}
+
+/// The answer of a manager, which is one that clients can read.
+std::string answerOf(ObjectManager& manager, const std::string& name, const std::string& parameters,
+                     const std::string& nameSpace = "root/test",
+                     const std::optional<std::string>& user = {}) {
+    const std::string answer = respond(manager, operation(name, parameters, nameSpace), user);
+    EXPECT_THAT(complaintsAbout(answer, name), ::testing::IsEmpty());
+    return answer;
 }
 
 /// One with five things in root/test.
@@ -78,14 +88,15 @@ TEST(PullOperations, HandOutWhatTheOrdinaryOperationsAnswer) {
     };
     for (const Row& row : rows) {
         const Names expected = objectsIn(respond(operation(row.ordinary, row.ordinaryParameters)));
-        const std::string all = respond(operation(row.open, row.parameters + most(10000)));
+        const std::string all =
+            answerOf(shippedManager(), row.open, row.parameters + most(10000), "root/cimv2");
         EXPECT_EQ(objectsIn(all), expected) << row.open;
         EXPECT_EQ(valueOf(all, "EndOfSequence"), "TRUE");
         EXPECT_EQ(contextOf(all), "");
         // One by one.
         const bool paths = std::string(row.open).find("Paths") != std::string::npos;
         Names pulled;
-        std::string answer = respond(operation(row.open, row.parameters));
+        std::string answer = answerOf(shippedManager(), row.open, row.parameters, "root/cimv2");
         EXPECT_EQ(objectsIn(answer), Names());
         for (unsigned pulls = 0; pulls < 100 && valueOf(answer, "EndOfSequence") == "FALSE";
              ++pulls) {
@@ -117,7 +128,7 @@ TEST(PullOperations, AnswerInTheFormsThatClientsRead) {
     const std::string names = list("PropertyList", {"Name"});
     ObjectManager& manager = newForeignManager();
     const auto asked = [&](const std::string& name, const std::string& parameters) {
-        return respond(manager, operation(name, parameters, "root/test"));
+        return answerOf(manager, name, parameters);
     };
     EXPECT_EQ(content(asked("OpenEnumerateInstances", things + names + most(1))),
               "<IRETURNVALUE>" + instance + "</IRETURNVALUE>" + ended);
@@ -140,7 +151,7 @@ TEST(PullOperations, AnswerInTheFormsThatClientsRead) {
 TEST(PullOperations, KeepTheOrderAndTheCountThatWasAskedFor) {
     ObjectManager& manager = managerOfThings();
     const auto asked = [&](const std::string& name, const std::string& parameters) {
-        return respond(manager, operation(name, parameters, "root/test"));
+        return answerOf(manager, name, parameters);
     };
     const std::string first = asked("OpenEnumerateInstancePaths", things + most(2));
     EXPECT_EQ(objectsIn(first), (Names{"TEST_Thing(first)", "TEST_Thing(second)"}));
@@ -203,7 +214,8 @@ TEST(PullOperations, RefuseWhatIsWrongOrNotServed) {
         {"CloseEnumeration", "", "4: "},
     };
     for (const Refusal& row : rows)
-        EXPECT_THAT(error(respond(operation(row.name, row.parameters))), StartsWith(row.status))
+        EXPECT_THAT(error(answerOf(shippedManager(), row.name, row.parameters, "root/cimv2")),
+                    StartsWith(row.status))
             << row.name << row.parameters;
     for (const char* const timeout : {"1", "90"})
         EXPECT_EQ(error(respond(operation("OpenEnumerateInstances",
@@ -219,7 +231,7 @@ TEST(PullOperations, ServeAContextToItsUserInItsNamespaceOnly) {
     const auto asked = [&](const std::string& name, const std::string& parameters,
                            const std::optional<std::string>& user,
                            const std::string& nameSpace = "root/test") {
-        return respond(manager, operation(name, parameters, nameSpace), user);
+        return answerOf(manager, name, parameters, nameSpace, user);
     };
     const std::string context = contextOf(asked("OpenEnumerateInstancePaths", things, "anna"));
     const std::string one = continued(context, 1);
