@@ -79,7 +79,7 @@ constexpr ElementRow elementRows[] = {
 };
 
 /// The part of a list before the first separator; takes it off.
-std::string_view takePart(std::string_view& list, char separator) {
+std::string_view takeListPart(std::string_view& list, char separator) {
     const std::size_t end = list.find(separator);
     const std::string_view part = list.substr(0, end);
     list = end == list.npos ? std::string_view() : list.substr(end + 1);
@@ -88,7 +88,7 @@ std::string_view takePart(std::string_view& list, char separator) {
 
 bool isOneOf(std::string_view name, std::string_view choice) {
     while (!choice.empty()) {
-        if (takePart(choice, '|') == name) return true;
+        if (takeListPart(choice, '|') == name) return true;
     }
     return false;
 }
@@ -124,7 +124,7 @@ bool isBlank(std::string_view text) {
 
 std::optional<std::string> attributeError(const XmlElement& element, std::string_view attributes) {
     while (!attributes.empty()) {
-        const std::string_view name = takePart(attributes, ' ');
+        const std::string_view name = takeListPart(attributes, ' ');
         if (element.attribute(name) == nullptr) {
             return element.name + " lacks the attribute " + std::string(name);
         }
@@ -136,7 +136,7 @@ std::optional<std::string> attributeError(const XmlElement& element, std::string
 std::optional<std::string> childrenError(const XmlElement& element, std::string_view content) {
     auto child = element.children.begin();
     while (!content.empty()) {
-        const ContentPart part = contentPart(takePart(content, ' '));
+        const ContentPart part = contentPart(takeListPart(content, ' '));
         std::size_t count = 0;
         while (child != element.children.end() && count < part.most &&
                isOneOf(child->name, part.choice)) {
