@@ -11,7 +11,7 @@ namespace cmpihost::server {
 
 namespace {
 
-constexpr std::size_t mostListedNames = 1000;
+constexpr std::size_t mostValueElements = 1000;
 
 [[noreturn]] void refuseStructure(const std::string& detail) {
     throw MessageError(400, "request-not-valid", detail);
@@ -61,8 +61,8 @@ MessageParameter readParameter(XmlElement& element, bool intrinsic) {
     if (const std::string* const type = element.attribute("PARAMTYPE")) parameter.type = *type;
     if (element.children.empty()) return parameter;
     parameter.value = std::move(element.children.front());
-    if (intrinsic && parameter.value->children.size() > mostListedNames) {
-        refuseStructure("a parameter lists more than 1000 values");
+    if (intrinsic && parameter.value->children.size() > mostValueElements) {
+        refuseStructure("a parameter holds more than 1000 elements");
     }
     return parameter;
 }

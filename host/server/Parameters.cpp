@@ -1,6 +1,7 @@
 #include "host/server/Parameters.h"
 
 #include <algorithm>
+#include <array>
 
 #include "base/Ascii.h"
 #include "host/server/CimError.h"
@@ -14,61 +15,41 @@ namespace {
     throw CimError(cimInvalidParameter, name + ": " + reason);
 }
 
-bool isElement(const XmlElement& element, std::initializer_list<std::string_view> names) {
-    return std::find(names.begin(), names.end(), element.name) != names.end();
-}
-
-bool isText(const XmlElement& element) {
-    return element.name == "VALUE";
-}
-
-bool isValueOf(const XmlElement& element, CMPIType type) {
-    return isText(element) && valueFromText(element.text, type).has_value();
-}
-
-bool isNameList(const XmlElement& element) {
-    return isText(element) ||
-           (element.name == "VALUE.ARRAY" &&
-            std::all_of(element.children.begin(), element.children.end(), isText));
-}
-
-/// What a parameter of the kind holds, and whether an element is that.
+/// What a parameter of a kind holds: one of these elements, and in a VALUE a text of this type.
 struct KindRow {
     ParameterKind kind;
     const char* content;
-    bool (*fits)(const XmlElement& element);
+    std::array<std::string_view, 4> elements;
+    CMPIType type = CMPI_string;
 };
 
-const KindRow kindRows[] = {
-    {ParameterKind::Boolean, "TRUE or FALSE",
-     [](const XmlElement& e) { return isValueOf(e, CMPI_boolean); }},
-    {ParameterKind::Text, "a text", isText},
-    {ParameterKind::Number, "a uint32",
-     [](const XmlElement& e) { return isValueOf(e, CMPI_uint32); }},
-    {ParameterKind::ClassName, "a CLASSNAME",
-     [](const XmlElement& e) { return isElement(e, {"CLASSNAME"}); }},
-    {ParameterKind::InstanceName, "an INSTANCENAME",
-     [](const XmlElement& e) { return isElement(e, {"INSTANCENAME"}); }},
-    {ParameterKind::ObjectName, "a CLASSNAME or an INSTANCENAME",
-     [](const XmlElement& e) {
-         return isElement(e, {"CLASSNAME", "INSTANCENAME"});
-     }},
-    {ParameterKind::PropertyList, "a VALUE.ARRAY of names", isNameList},
-    {ParameterKind::AnyValue, "a value",
-     [](const XmlElement& e) {
-         return isElement(e, {"VALUE", "VALUE.ARRAY", "VALUE.REFERENCE", "VALUE.REFARRAY"});
-     }},
-    {ParameterKind::Instance, "an INSTANCE",
-     [](const XmlElement& e) { return isElement(e, {"INSTANCE"}); }},
-    {ParameterKind::NamedInstance, "a VALUE.NAMEDINSTANCE",
-     [](const XmlElement& e) { return isElement(e, {"VALUE.NAMEDINSTANCE"}); }},
-    {ParameterKind::Anything, "anything", [](const XmlElement&) { return true; }},
+constexpr KindRow kindRows[] = {
+    {ParameterKind::Boolean, "TRUE or FALSE", {"VALUE"}, CMPI_boolean},
+    {ParameterKind::Text, "a text", {"VALUE"}},
+    {ParameterKind::Number, "a uint32", {"VALUE"}, CMPI_uint32},
+    {ParameterKind::ClassName, "a CLASSNAME", {"CLASSNAME"}},
+    {ParameterKind::InstanceName, "an INSTANCENAME", {"INSTANCENAME"}},
+    {ParameterKind::ObjectName, "a CLASSNAME or an INSTANCENAME", {"CLASSNAME", "INSTANCENAME"}},
+    {ParameterKind::PropertyList, "a VALUE.ARRAY of names", {"VALUE.ARRAY", "VALUE"}},
+    {ParameterKind::AnyValue,
+     "a value",
+     {"VALUE", "VALUE.ARRAY", "VALUE.REFERENCE", "VALUE.REFARRAY"}},
+    {ParameterKind::Instance, "an INSTANCE", {"INSTANCE"}},
+    {ParameterKind::NamedInstance, "a VALUE.NAMEDINSTANCE", {"VALUE.NAMEDINSTANCE"}},
 };
 
-void checkKind(const ParameterRow& row, const XmlElement& value) {
-    for (const KindRow& each : kindRows) {
-        if (each.kind != row.kind || each.fits(value)) continue;
-        refuseParameter(row.name, std::string("this parameter takes ") + each.content);
+bool fits(const XmlElement& element, const KindRow& row) {
+    if (std::find(row.elements.begin(), row.elements.end(), element.name) == row.elements.end()) {
+        return false;
+    }
+    return element.name != "VALUE" || valueFromText(element.text, row.type).has_value();
+}
+
+/// A kind without a row holds anything.
+void checkKind(const ParameterRow& parameter, const XmlElement& value) {
+    for (const KindRow& row : kindRows) {
+        if (row.kind != parameter.kind || fits(value, row)) continue;
+        refuseParameter(parameter.name, std::string("this parameter takes ") + row.content);
     }
 }
 
@@ -130,9 +111,10 @@ std::optional<RequestPath> Parameters::path(std::string_view name) const {
 std::optional<std::vector<std::string>> Parameters::names(std::string_view name) const {
     const XmlElement* const value = find(name, {ParameterKind::PropertyList});
     if (value == nullptr) return std::nullopt;
-    if (isText(*value)) return std::vector<std::string>{value->text};
+    if (value->name == "VALUE") return std::vector<std::string>{value->text};
     std::vector<std::string> result;
     result.reserve(value->children.size());
+    // NULL among them has no text, and no property has that name.
     for (const XmlElement& child : value->children) result.push_back(child.text);
     return result;
 }

@@ -262,7 +262,7 @@ TEST(Message, HasBoundedNumbersOfThings) {
     };
     EXPECT_EQ(readMessage(names(1000)).parameters.at(0).value->children.size(), 1000U);
     EXPECT_EQ(messageRefusal(names(1001)),
-              "400 request-not-valid: a parameter lists more than 1000 values");
+              "400 request-not-valid: a parameter holds more than 1000 elements");
     EXPECT_EQ(messageRefusal(names(10000)),
               "400 request-not-well-formed: there are more than 10000 elements");
     EXPECT_EQ(messageRefusal(callWith(times(30, "<A>") + times(30, "</A>"))),
