@@ -74,7 +74,7 @@ ListenAddress ListenAddress::inet(const std::string& host, const std::string& po
     hints.ai_flags = AI_NUMERICHOST | AI_NUMERICSERV | AI_PASSIVE;
     addrinfo* found = nullptr;
     if (host.empty() || getaddrinfo(host.c_str(), port.c_str(), &hints, &found) != 0)
-        throw std::invalid_argument("'" + host + "' is no numeric address");
+        throw std::invalid_argument("'" + host + "' is no numeric address, nor localhost");
     const std::unique_ptr<addrinfo, decltype(&freeaddrinfo)> owner(found, &freeaddrinfo);
     ListenAddress result;
     std::memcpy(&result.storage_, found->ai_addr, found->ai_addrlen);

@@ -237,7 +237,7 @@ ServiceStatus Service::run() {
 }
 
 void Service::reload() {
-    notifyServiceManager("RELOADING=1");
+    notifyServiceManager(reloadingState());
     if (users_) readAgain("users", [this] { users_->reload(); });
     if (identity_) readAgain("certificate and key", [this] { replaceIdentity(*readIdentity()); });
     notifyServiceManager("READY=1");

@@ -3,6 +3,7 @@
 #include <fcntl.h>
 #include <sys/socket.h>
 #include <sys/un.h>
+#include <time.h>
 #include <unistd.h>
 
 #include <cstddef>
@@ -46,6 +47,13 @@ std::vector<base::FileDescriptor> takePassedSockets() {
         fcntl(number, F_SETFD, FD_CLOEXEC);
     }
     return result;
+}
+
+std::string reloadingState() {
+    timespec now{};
+    clock_gettime(CLOCK_MONOTONIC, &now);
+    const long long microseconds = now.tv_sec * 1000000LL + now.tv_nsec / 1000;
+    return "RELOADING=1\nMONOTONIC_USEC=" + std::to_string(microseconds);
 }
 
 void notifyServiceManager(const std::string& state) noexcept {

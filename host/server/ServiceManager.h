@@ -15,6 +15,9 @@ namespace cmpihost::server {
 /// std::runtime_error for one that is no listening stream socket.
 std::vector<base::FileDescriptor> takePassedSockets();
 
+/// The state of a service that reads its configuration again, with the time that goes with it.
+std::string reloadingState();
+
 /// Tells the service manager a state, lines of NAME=VALUE, where it wants to know (NOTIFY_SOCKET).
 void notifyServiceManager(const std::string& state) noexcept;
 

@@ -2,8 +2,11 @@
 // record.
 #include <gmock/gmock.h>
 
+#include <filesystem>
+
 #include "host/cli/Cmpihost.h"
 #include "support/GoldenFile.h"
+#include "support/TemporaryDirectory.h"
 
 namespace {
 
@@ -64,6 +67,18 @@ TEST(ProgramHelp, FitsATerminalOfTheUsualWidth) {
     for (const Words& run : runs)
         for (const std::string& line : lines(cmpihost(run).out))
             EXPECT_LE(line.size(), 80U) << line;
+}
+
+TEST(ProgramServe, SaysWhatBringsTheServerWhereThereIsNone) {
+    const TemporaryDirectory directory;
+    const std::string program = directory.path("cmpihost");
+    std::filesystem::copy_file(KORVA_CMPIHOST, program);
+    const ProgramRun run = runProgram(program, {"serve", "--help"});
+    EXPECT_EQ(run.status, 3);
+    EXPECT_EQ(run.out, "");
+    EXPECT_EQ(run.err, "cmpihost: " + program +
+                           "-serve is not there; it is a 64-bit program, which the package "
+                           "korva-osstatus-server brings\n");
 }
 
 TEST(ProgramTime, IsTheLastLineOfTheStandardError) {
