@@ -74,14 +74,10 @@ void keepDeclared(std::vector<InstanceValue>& instances, const ClassDeclaration&
     }
 }
 
+/// The keys by which systems are named, whose providers compare them as names of hosts, and those
+/// that hold names of classes.
 bool isCaseless(const std::string& key) {
-    constexpr std::string_view className = "CreationClassName";
-    const bool namesClass =
-        key.size() >= className.size() &&
-        base::equalsIgnoreCase(std::string_view(key).substr(key.size() - className.size()),
-                               className);
-    // The providers of systems compare these two as names of hosts.
-    return namesClass || base::equalsIgnoreCase(key, "CSName") ||
+    return namesClass(key) || base::equalsIgnoreCase(key, "CSName") ||
            base::equalsIgnoreCase(key, "Name");
 }
 

@@ -90,6 +90,12 @@ void moveOver(std::vector<Element>& to, std::vector<Element>& from) {
 
 }  // namespace
 
+bool namesClass(std::string_view key) {
+    constexpr std::string_view ending = "CreationClassName";
+    return key.size() >= ending.size() &&
+           base::equalsIgnoreCase(key.substr(key.size() - ending.size()), ending);
+}
+
 ObjectManager::ObjectManager(ObjectManagerSetup setup)
     : hostName_(std::move(setup.hostName)),
       schema_(std::move(setup.schema)),
@@ -182,13 +188,28 @@ bool ObjectManager::isA(const std::string& nameSpace, const std::string& classNa
     return holds(catalogue(nameSpace)) || (isInterop(nameSpace) && holds(catalogue_));
 }
 
-OperationResult ObjectManager::ask(const OperationRequest& request) {
+OperationResult ObjectManager::ask(OperationRequest request) {
+    spellClassKeys(request.path);
     OperationResult result = answerOf(request);
     if (result.rc != CMPI_RC_OK) refuse(request, result);
     if (brokeOff(request.operation, result))
         throw CimError(cimFailed, subject(request) + ": the answer of the provider broke off");
     finish(request, result);
     return result;
+}
+
+/// Providers compare these as texts: CreationClassName, CSCreationClassName and the like.
+void ObjectManager::spellClassKeys(ObjectPathValue& path) const {
+    for (KeyBinding& key : path.keys) {
+        if (key.value.isNull()) continue;
+        if (key.value.type() == CMPI_ref) {
+            ObjectPathValue reference = key.value.reference();
+            spellClassKeys(reference);
+            key.value = Value::fromReference(std::move(reference));
+        } else if (key.value.type() == CMPI_string && namesClass(key.name)) {
+            key.value = spelling(path.nameSpace, key.value.text());
+        }
+    }
 }
 
 /// Whether a provider is registered for the class or, of an enumeration, for one below it.

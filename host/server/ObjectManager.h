@@ -6,6 +6,7 @@
 #include <memory>
 #include <mutex>
 #include <string>
+#include <string_view>
 #include <unordered_map>
 #include <vector>
 
@@ -18,6 +19,10 @@
 
 /// The object manager behind the endpoint: its namespaces, their classes, and who answers.
 namespace cmpihost::server {
+
+/// Whether the values of a key of that name are names of classes: "CreationClassName" is one, and
+/// names that end so are others.
+bool namesClass(std::string_view key);
 
 /// What an object manager works with.
 struct ObjectManagerSetup {
@@ -66,7 +71,8 @@ class ObjectManager {
     /// or GetInstance of a known class that nobody serves has no result. A status other than OK, a
     /// library that does not load and a list of results that breaks off become a CimError that has
     /// a description.
-    OperationResult ask(const OperationRequest& request);
+    /// Classes that keys name reach the providers as the schema spells them, too.
+    OperationResult ask(OperationRequest request);
 
     const std::string& hostName() const noexcept { return hostName_; }
     const Registrations& registrations() const noexcept { return router_.registrations(); }
@@ -92,6 +98,7 @@ class ObjectManager {
     std::vector<NameSpace> readNameSpaces() const;
     void addLine(NameSpace& space, const std::string& className) const;
     const NameSpace* find(const std::string& name) const;
+    void spellClassKeys(ObjectPathValue& path) const;
     bool isServed(const OperationRequest& request) const;
     OperationResult answerOf(const OperationRequest& request);
     OperationResult askProviders(const OperationRequest& request);

@@ -3,6 +3,7 @@
 #include "host/server/ServerFixture.h"
 
 #include <dlfcn.h>
+#include <gtest/gtest.h>
 
 #include <algorithm>
 #include <memory>
@@ -10,6 +11,7 @@
 
 #include "host/mof/MofParser.h"
 #include "host/server/Dispatcher.h"
+#include "host/server/ResponseValidator.h"
 
 namespace cmpihost::server::fixture {
 
@@ -82,9 +84,26 @@ ObjectManager& foreignManager(const std::string& registrations, const std::strin
 }
 
 ObjectManager& newManager(const std::string& schema, const std::string& registrations) {
+    return newManager(Schema::load(KORVA_SOURCE_DIR "/" + schema), registrations);
+}
+
+ObjectManager& newManager(Schema schema, const std::string& registrations) {
     Registrations read;
     read.add(registrations, "test.reg");
-    return make("", Schema::load(KORVA_SOURCE_DIR "/" + schema), std::move(read));
+    return make("", std::move(schema), std::move(read));
+}
+
+Schema schemaOf(const std::string& mof) {
+    Schema schema;
+    schema.add(mof::parse(mof, "test.mof"));
+    return schema;
+}
+
+std::string registration(const std::string& className, const std::string& provider,
+                         const std::string& location, const std::string& types,
+                         const std::string& nameSpaces) {
+    return "[" + className + "]\nprovider: " + provider + "\nlocation: " + location +
+           "\ntype: " + types + "\nnamespace: " + nameSpaces + "\n";
 }
 
 std::string respond(const std::string& request) {
@@ -94,7 +113,11 @@ std::string respond(const std::string& request) {
 std::string respond(ObjectManager& manager, const std::string& request,
                     const std::optional<std::string>& user) {
     try {
-        return answer(manager, readMessage(request), user).document;
+        const Message read = readMessage(request);
+        std::string document = answer(manager, read, user).document;
+        for (const std::string& complaint : complaintsAbout(document, read.method))
+            ADD_FAILURE() << complaint << "\n" << document;
+        return document;
     } catch (const MessageError& wrong) {
         return "HTTP " + std::to_string(wrong.httpStatus()) + ": " + wrong.what();
     }

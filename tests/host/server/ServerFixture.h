@@ -20,12 +20,19 @@ ObjectManager& shippedManager();
 /// The one over the providers of tests/host/providers, in root/test and root/other; a new one with
 /// more sections of registrations, or more MOF.
 ObjectManager& foreignManager(const std::string& registrations = {}, const std::string& mof = {});
-/// A new one, with a schema of a file or folder of the source tree, with registrations from a text,
-/// and with libraries from the folder of the build.
+/// A new one, with registrations from a text and with libraries from the folder of the build. Its
+/// schema is a file or folder of the source tree, or as given.
 ObjectManager& newManager(const std::string& schema, const std::string& registrations);
+ObjectManager& newManager(Schema schema, const std::string& registrations);
+Schema schemaOf(const std::string& mof);
+/// A section of a registration file.
+std::string registration(const std::string& className, const std::string& provider,
+                         const std::string& location, const std::string& types,
+                         const std::string& nameSpaces = "root/cimv2");
 
 /// The response document that a manager answers to the text of a request message; "HTTP 400: why"
-/// for one that is no message. The first form asks shippedManager().
+/// for one that is no message. A response that clients would not read fails the test. The first
+/// form asks shippedManager().
 std::string respond(const std::string& request);
 std::string respond(ObjectManager& manager, const std::string& request,
                     const std::optional<std::string>& user = {});
