@@ -398,6 +398,17 @@ TEST(AssociationOperations, AskForAnAssociationThatNoSchemaDeclaresByItsName) {
                 "root/test");
 }
 
+TEST(AssociationOperations, BelieveInASourceWhoseInstancesNobodyServes) {
+    ObjectManager& manager =
+        newManager("tests/host/providers/test.mof",
+                   "[TEST_Part]\nprovider: Parts\nlocation: foreign_parts\ntype: instance\n"
+                   "namespace: root/test\n"
+                   "[TEST_Link]\nprovider: Links\nlocation: foreign_links\ntype: association\n"
+                   "namespace: root/test\n");
+    expectFound(manager, "Associators", "AssociatorNames", {{thing, "", {"TEST_Part(wheel)"}}},
+                "root/test");
+}
+
 TEST(AssociationOperations, AskWhereTheSchemaLacksAClassThatWouldTell) {
     ObjectManager& manager = foreignManager(
         "[TEST_Gadget]\nprovider: Things\nlocation: foreign_things\ntype: instance\n"
