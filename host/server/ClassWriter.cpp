@@ -12,14 +12,6 @@ namespace cmpihost::server {
 
 namespace {
 
-void writeNamed(std::string& xml, std::string_view attribute, std::string_view value) {
-    xml += ' ';
-    xml += attribute;
-    xml += "=\"";
-    writeAttributeText(xml, value);
-    xml += '"';
-}
-
 bool isReal(mof::Type type) {
     return type == mof::Type::Real32 || type == mof::Type::Real64;
 }
@@ -172,8 +164,8 @@ class MembersWriter {
         const mof::QualifierType* const known = types_.find(declared.name);
         const mof::Type type = typeOf(declared, known);
         xml_ += "<QUALIFIER";
-        writeNamed(xml_, "NAME", declared.name);
-        writeNamed(xml_, "TYPE", mof::nameOf(type));
+        writeAttribute(xml_, "NAME", declared.name);
+        writeAttribute(xml_, "TYPE", mof::nameOf(type));
         if (qualifier.from != &owner_) xml_ += " PROPAGATED=\"true\"";
         writeFlavors(
             xml_, qualifier.inheritance,
@@ -204,16 +196,16 @@ class MembersWriter {
     void beginFeature(const char* tag, const mof::Feature& declared) const {
         xml_ += '<';
         xml_ += tag;
-        writeNamed(xml_, "NAME", declared.name);
+        writeAttribute(xml_, "NAME", declared.name);
         if (declared.type == mof::Type::Reference) {
-            writeNamed(xml_, "REFERENCECLASS", declared.referenceClass);
+            writeAttribute(xml_, "REFERENCECLASS", declared.referenceClass);
         } else {
-            writeNamed(xml_, "TYPE", mof::nameOf(declared.type));
+            writeAttribute(xml_, "TYPE", mof::nameOf(declared.type));
         }
     }
 
     void writeOrigin(const ResolvedFeature& feature) const {
-        if (view_.classOrigin) writeNamed(xml_, "CLASSORIGIN", feature.origin->name);
+        if (view_.classOrigin) writeAttribute(xml_, "CLASSORIGIN", feature.origin->name);
         if (feature.from != &owner_) xml_ += " PROPAGATED=\"true\"";
     }
 
@@ -256,8 +248,8 @@ void writeClass(std::string& xml, const ResolvedClass& described, const Qualifie
                 const ClassView& view) {
     const mof::Class& declared = *described.declared;
     xml += "<CLASS";
-    writeNamed(xml, "NAME", declared.name);
-    if (!declared.superclass.empty()) writeNamed(xml, "SUPERCLASS", declared.superclass);
+    writeAttribute(xml, "NAME", declared.name);
+    if (!declared.superclass.empty()) writeAttribute(xml, "SUPERCLASS", declared.superclass);
     xml += '>';
     const MembersWriter members(xml, declared, types, view);
     members.writeQualifiers(described.qualifiers);
@@ -268,9 +260,9 @@ void writeClass(std::string& xml, const ResolvedClass& described, const Qualifie
 
 void writeQualifierDeclaration(std::string& xml, const mof::QualifierType& type) {
     xml += "<QUALIFIER.DECLARATION";
-    writeNamed(xml, "NAME", type.name);
-    writeNamed(xml, "TYPE", mof::nameOf(type.type));
-    writeNamed(xml, "ISARRAY", type.array ? "true" : "false");
+    writeAttribute(xml, "NAME", type.name);
+    writeAttribute(xml, "TYPE", mof::nameOf(type.type));
+    writeAttribute(xml, "ISARRAY", type.array ? "true" : "false");
     writeFlavors(xml,
                  {type.flavor.toSubclass.value_or(true), type.flavor.overridable.value_or(true)},
                  type.flavor.translatable);

@@ -1,21 +1,16 @@
 #ifndef HOST_SERVER_ELEMENT_WRITER_H
 #define HOST_SERVER_ELEMENT_WRITER_H
 
-#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
 
 #include "host/broker/Value.h"
+#include "host/server/XmlText.h"
 
 /// Writes the elements of responses, in the form that the weakest clients read: each function
-/// appends to `xml`. What is no XML in a text (control characters, bytes that are no UTF-8) becomes
-/// U+FFFD. Any threads may call these.
+/// appends to `xml`. Any threads may call these.
 namespace cmpihost::server {
-
-/// Appends a text as content of an element, or as the value of an attribute in double quotes.
-void writeText(std::string& xml, std::string_view text);
-void writeAttributeText(std::string& xml, std::string_view text);
 
 /// Where paths are: what HOST says, and the namespace of those that have none of their own.
 struct Site {

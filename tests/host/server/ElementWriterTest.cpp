@@ -84,6 +84,8 @@ TEST(ElementWriter, ANullInAnArrayIsAnEmptyTextOrNothing) {
     EXPECT_EQ(elementValue(Value::fromArray(CMPI_boolean,
                                             {Value::null(CMPI_boolean), Value::fromBoolean(true)})),
               "<VALUE.ARRAY><VALUE>TRUE</VALUE></VALUE.ARRAY>");
+    EXPECT_EQ(elementValue(Value::fromArray(CMPI_instance, {Value::null(CMPI_instance)})),
+              "<VALUE.ARRAY></VALUE.ARRAY>");
     EXPECT_EQ(elementValue(Value::fromArray(CMPI_ref, {Value::null(CMPI_ref)})),
               "<VALUE.REFARRAY></VALUE.REFARRAY>");
 }
