@@ -180,6 +180,37 @@ TEST(AssociationOperations, OfASourceThatDoesNotExistFindNothing) {
     }
 }
 
+TEST(AssociationOperations, FindASourceByAnySpellingThatItsProviderTakes) {
+    const std::string shouted =
+        instanceName("korva_operatingsystem", {{"NAME", "Fixture Linux"},
+                                               {"creationclassname", "korva_operatingsystem"},
+                                               {"CSName", "FIXTURE.example"},
+                                               {"CSCreationClassName", "KORVA_ComputerSystem"}});
+    for (const auto give : {shippedManager, bareManager}) {
+        ObjectManager& manager = give();
+        expectFound(manager, "Associators", "AssociatorNames",
+                    {{shouted, "", {computer, abilities}}});
+        expectFound(manager, "References", "ReferenceNames",
+                    {{shouted, "", {installed, running, capable}}});
+    }
+}
+
+TEST(AssociationOperations, FindNothingInTheInteropNamespace) {
+    const std::string names = content(respond(operation(
+        "EnumerateInstanceNames", className("ClassName", "CIM_ObjectManager"), "root/interop")));
+    const std::size_t start = names.find("<INSTANCENAME");
+    ASSERT_NE(start, std::string::npos);
+    const std::string source = names.substr(start, names.find("</IRETURNVALUE>") - start);
+    expectFound(shippedManager(), "Associators", "AssociatorNames", {{source, "", {}}},
+                "root/interop");
+    expectFound(shippedManager(), "References", "ReferenceNames", {{source, "", {}}},
+                "root/interop");
+    const std::string asked =
+        from(source) + className("AssocClass", "CIM_ElementConformsToProfile");
+    EXPECT_EQ(error(respond(operation("AssociatorNames", asked, "root/interop"))),
+              "7: CIM_ElementConformsToProfile: not served in root/interop");
+}
+
 /// A request that fails, and the error that answers it.
 struct Refusal {
     std::string name;
