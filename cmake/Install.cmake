@@ -1,5 +1,5 @@
 # What `cmake --install` puts where. Components: provider (the provider, the framework's libraries,
-# schema and registration), companion, development, tools. Install*.cmake hold one subject each.
+# schema and registration), companion, development, tools, server. Install*.cmake hold one subject each.
 
 set(KORVA_SHARE_DIR share/korva-osstatus)
 

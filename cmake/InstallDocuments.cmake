@@ -28,6 +28,18 @@ if(KORVA_CMPIHOST)
     install(FILES "${PROJECT_SOURCE_DIR}/packaging/debian/korva-osstatus-tools.copyright" RENAME copyright.cmpihost
             DESTINATION "${CMAKE_INSTALL_DOCDIR}" COMPONENT tools)
 endif()
+if(KORVA_SERVER)
+    korva_man_page(server cmpihost-serve 1)
+    install(FILES "${PROJECT_SOURCE_DIR}/packaging/debian/korva-osstatus-server.copyright"
+            RENAME copyright.cmpihost-serve DESTINATION "${CMAKE_INSTALL_DOCDIR}" COMPONENT server)
+    # The units name the program by its whole path.
+    foreach(unit korva-osstatus-server.service korva-osstatus-server.socket)
+        file(READ "${PROJECT_SOURCE_DIR}/packaging/debian/${unit}" text)
+        string(REPLACE "=/usr/bin/cmpihost-serve" "=${CMAKE_INSTALL_FULL_BINDIR}/cmpihost-serve" text "${text}")
+        file(GENERATE OUTPUT "${CMAKE_BINARY_DIR}/generated/${unit}" CONTENT "${text}")
+        install(FILES "${CMAKE_BINARY_DIR}/generated/${unit}" DESTINATION lib/systemd/system COMPONENT server)
+    endforeach()
+endif()
 korva_man_page(provider zblog.conf 5)
 korva_man_page(provider korva-osstatus 7)
 korva_man_page(provider korva-osstatus-register 8)

@@ -17,7 +17,7 @@ EachComponentIsPacked() {
     cd "$packages/source" || fail "no folder to pack in"
     expect_success env KORVA_INSTALLED_TREE="$work/tree" DEB_BUILD_OPTIONS=noautodbgsym \
         dpkg-architecture "-a$architecture" -c debian/rules binary
-    for name in provider companion dev tools; do
+    for name in $components; do
         [ -f "$(package $name)" ] || fail "$(package $name) is missing: $output"
     done
 }
@@ -26,10 +26,12 @@ EachComponentIsPacked() {
 contents() { dpkg-deb --fsys-tarfile "$(package "$1")" | tar -t | sed -n 's|^\./||; /[^/]$/p' | LC_ALL=C sort; }
 
 PackagesHoldTheirFiles() {
-    for name in provider companion dev tools; do
+    for name in $components; do
         contents $name | sed "s|^|$name: |; s|/$triplet/|/TRIPLET/|" | grep -v 'share/doc/korva-osstatus/' >>"$work/contents"
     done
-    expect_equal "the packages" "$(cat package-files.txt)" "$(cat "$work/contents")"
+    expected=$(cat package-files.txt)
+    [ "$KORVA_WORD_SIZE" = 64 ] || expected=$(grep -v '^server: ' package-files.txt)
+    expect_equal "the packages" "$expected" "$(cat "$work/contents")"
 }
 
 # Versions of libraries are those of the machine that builds.
@@ -61,6 +63,35 @@ Package: korva-osstatus-tools
 Version: 1.0.0-1
 Architecture: $architecture
 korva-osstatus-companion (= 1.0.0-1) $own libc6 libgcc-s1 libstdc++6" "$(cat "$work/fields")"
+}
+
+PackageOfTheEndpointOpensNoPortByItself() {
+    [ "$KORVA_WORD_SIZE" = 64 ] || return 0
+    dpkg-deb -f "$(package server)" Package Version Architecture Multi-Arch >"$work/fields"
+    dpkg-deb -f "$(package server)" Depends | sed 's/ (>= [^)]*)//g; s/, /\n/g' | sort | paste -sd ' ' >>"$work/fields"
+    expect_equal "the fields" "Package: korva-osstatus-server
+Version: 1.0.0-1
+Architecture: amd64
+korva-osstatus-companion (= 1.0.0-1) korva-osstatus-provider (= 1.0.0-1) libc6 libcrypt1 libexpat1 libgcc-s1\
+ libmicrohttpd12 libstdc++6" "$(cat "$work/fields")"
+    dpkg-deb -e "$(package server)" "$work/control"
+    expect_equal "what is done with the service" "postinst: try-restart 'korva-osstatus-server.service' 'korva-osstatus-server.socket'
+prerm: stop korva-osstatus-server.socket korva-osstatus-server.service" \
+        "$(cd "$work/control" && grep -o 'invoke .*' p* | sed 's/invoke //; s| >/dev/null.*||; s/:/: /')"
+    # Enabled is what was so before an upgrade.
+    expect_equal "what is enabled" "was-enabled enable was-enabled enable" \
+        "$(grep -oE '(was-)?enabled? .korva' "$work/control/postinst" | sed 's/ .*//' | paste -sd ' ')"
+}
+
+UnitsAreWhatSystemdKnows() {
+    need_tool systemd-analyze systemd
+    mkdir "$work/units"
+    for unit in service socket; do
+        sed "s|=/usr/bin/cmpihost-serve|=$KORVA_BINARY_DIR/bin/cmpihost|" \
+            "$KORVA_SOURCE_DIR/packaging/debian/korva-osstatus-server.$unit" >"$work/units/korva-osstatus-server.$unit"
+    done
+    capture systemd-analyze verify --man=no "$work/units/korva-osstatus-server.service" "$work/units/korva-osstatus-server.socket"
+    expect_equal "what is wrong with the units" "0 " "$code $(echo "$output" | grep korva || true)"
 }
 
 LibrariesExportTheirSymbolsAndNoOther() {

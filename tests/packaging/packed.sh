@@ -10,4 +10,8 @@ else
     architecture=i386 triplet=i386-linux-gnu other=amd64 other_triplet=x86_64-linux-gnu
 fi
 
+# What is packed: the endpoint is there in 64 bit only.
+components="provider companion dev tools"
+[ "$KORVA_WORD_SIZE" = 32 ] || components="$components server"
+
 package() { echo "$packages/korva-osstatus-$1_1.0.0-1_$architecture.deb"; }

@@ -6,7 +6,7 @@ mkdir -p "$work/build/packages"
 
 # make_packages VERSION PRESET: empty files under the names of packages.
 make_packages() {
-    for name in provider companion dev tools; do
+    for name in provider companion dev tools server; do
         touch "$work/build/packages/korva-osstatus-${name}_$1_$2.deb"
     done
 }
