@@ -4,9 +4,7 @@
 
 #include <algorithm>
 #include <cctype>
-#include <iterator>
 #include <set>
-#include <sstream>
 #include <string_view>
 
 #include "host/server/ResponseValues.h"
@@ -87,32 +85,39 @@ const ElementRow* rowOf(const std::string& name) {
     return nullptr;
 }
 
-/// The words of a text, apart by blanks.
-std::vector<std::string> words(const std::string& text) {
-    std::istringstream stream(text);
-    return {std::istream_iterator<std::string>(stream), {}};
+/// Takes what stands before the separator, or all, off the front of a text.
+std::string_view takeFront(std::string_view& text, char separator) {
+    const std::string_view front = text.substr(0, text.find(separator));
+    text.remove_prefix(std::min(text.size(), front.size() + 1));
+    return front;
+}
+
+bool isAmong(std::string_view alternatives, const std::string& name) {
+    while (!alternatives.empty())
+        if (takeFront(alternatives, '|') == name) return true;
+    return false;
 }
 
 /// One item of a content model: how many of the children from `next` on it takes; none: it does
 /// not fit.
 std::optional<std::size_t> taken(const std::vector<Element>& children, std::size_t next,
-                                 std::string item) {
+                                 std::string_view item) {
     const char last = item.back();
     const bool many = last == '*' || last == '+';
     const bool optional = last == '*' || last == '?';
-    if (many || optional) item.pop_back();
-    const std::string alternatives = "|" + item + "|";
+    if (many || optional) item.remove_suffix(1);
     std::size_t count = 0;
     while (next + count < children.size() && (many || count == 0) &&
-           alternatives.find("|" + children[next + count].name + "|") != std::string::npos)
+           isAmong(item, children[next + count].name))
         ++count;
     if (count == 0 && !optional) return std::nullopt;
     return count;
 }
 
-bool fitsSequence(const Element& element, const std::string& sequence) {
+bool fitsSequence(const Element& element, std::string_view sequence) {
     std::size_t next = 0;
-    for (const std::string& item : words(sequence)) {
+    while (!sequence.empty()) {
+        const std::string_view item = takeFront(sequence, ' ');
         const std::optional<std::size_t> count = taken(element.children, next, item);
         if (!count) return false;
         next += *count;
@@ -165,15 +170,17 @@ class ElementCheck {
     void complain(const std::string& what) { complaints_.push_back(place_ + ": " + what); }
 
     void checkAttributes(const ElementRow& row) {
-        std::set<std::string> known;
-        for (std::string word : words(row.attributes)) {
+        std::vector<std::string_view> known;
+        for (std::string_view rest = row.attributes; !rest.empty();) {
+            std::string_view word = takeFront(rest, ' ');
             const bool optional = word.front() == '[';
             if (optional) word = word.substr(1, word.size() - 2);
-            if (!optional && element_.attribute(word) == nullptr) complain("no " + word);
-            known.insert(word);
+            known.push_back(word);
+            const std::string name(word);
+            if (!optional && element_.attribute(name) == nullptr) complain("no " + name);
         }
         for (const auto& [name, value] : element_.attributes) {
-            if (known.count(name) == 0) {
+            if (std::find(known.begin(), known.end(), name) == known.end()) {
                 complain("unknown attribute " + name);
             } else if (!fitsAttribute(element_.name, name, value)) {
                 complain("wrong " + name + " '" + value + "'");
@@ -287,12 +294,12 @@ class ElementCheck {
 
 }  // namespace
 
-bool fitsContent(const Element& element, const std::string& model) {
+bool fitsContent(const Element& element, std::string_view model) {
     std::size_t start = 0;
     while (true) {
         const std::size_t end = model.find(" / ", start);
         if (fitsSequence(element, model.substr(start, end - start))) return true;
-        if (end == std::string::npos) return false;
+        if (end == std::string_view::npos) return false;
         start = end + 3;
     }
 }

@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <cctype>
 #include <limits>
-#include <regex>
 
 namespace cmpihost::server::validator {
 
@@ -32,10 +31,18 @@ bool isInteger(const std::string& type, const std::string& text) {
     return text != "-0" && isNumberUpTo(text.substr(1), half + 1);
 }
 
-bool isReal(const std::string& text, const char* digits) {
+/// Like "-1.50000000e+00", with so many digits behind the point.
+bool isReal(const std::string& text, std::size_t digits) {
     if (text == "INF" || text == "-INF" || text == "NaN") return true;
-    const std::regex form(std::string("-?[0-9][.][0-9]{") + digits + "}e[-+][0-9]{2,3}");
-    return text.size() < 32 && std::regex_match(text, form);
+    std::string form = "d." + std::string(digits, 'd') + "esdd";
+    if (!text.empty() && text.front() == '-') form.insert(0, "-");
+    if (text.size() == form.size() + 1) form += 'd';
+    const auto fits = [](char letter, char kind) {
+        if (kind == 'd') return isDigit(letter);
+        if (kind == 's') return letter == '+' || letter == '-';
+        return letter == kind;
+    };
+    return std::equal(text.begin(), text.end(), form.begin(), form.end(), fits);
 }
 
 /// Whether a field is asterisks, or a number within bounds.
@@ -77,15 +84,15 @@ bool isValueText(const std::string& type, const std::string& text) {
     if (type == "boolean") return text == "TRUE" || text == "FALSE";
     if (type == "datetime") return isDateTime(text);
     if (type == "char16") return isCharacter(text);
-    if (type == "real32") return isReal(text, "8");
-    if (type == "real64") return isReal(text, "16");
+    if (type == "real32") return isReal(text, 8);
+    if (type == "real64") return isReal(text, 16);
     return isInteger(type, text);
 }
 
 bool isKeyText(const std::string& valueType, const std::string& text) {
     if (valueType != "numeric") return isValueText(valueType, text);
-    return isInteger("uint64", text) || isInteger("sint64", text) || isReal(text, "8") ||
-           isReal(text, "16");
+    return isInteger("uint64", text) || isInteger("sint64", text) || isReal(text, 8) ||
+           isReal(text, 16);
 }
 
 bool isIdentifier(const std::string& text) {
