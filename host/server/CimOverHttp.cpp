@@ -120,6 +120,7 @@ bool isXml(std::string_view type) {
     while (!type.empty()) {
         std::string_view value = takePart(type, ';');
         if (!base::equalsIgnoreCase(takePart(value, '='), "charset")) continue;
+        value = trimmed(value);
         if (value.size() > 2 && value.front() == '"' && value.back() == '"') {
             value = value.substr(1, value.size() - 2);
         }

@@ -83,6 +83,12 @@ bool HttpConnections::none() {
     return connections_.empty();
 }
 
+bool HttpConnections::crowded() {
+    constexpr std::size_t mostEnding = 16;
+    const std::lock_guard lock(mutex_);
+    return connections_.size() >= limits_.connections + mostEnding;
+}
+
 nanoseconds HttpConnections::allowance(Phase phase) const {
     if (phase == Phase::Answer) return nanoseconds::max();
     if (ending_ && phase != Phase::Response) return nanoseconds(-1);

@@ -64,6 +64,8 @@ class HttpConnections {
     void end() { ending_ = true; }
     bool ending() const noexcept { return ending_; }
     bool none();
+    /// Whether many that were cut have not ended yet.
+    bool crowded();
 
     /// Tells why a connection is refused or cut.
     void tellCut(const std::string& peer, const char* reason) const noexcept;

@@ -21,9 +21,6 @@ using Phase = HttpConnection::Phase;
 /// Enough for a provider's work; only what is touched takes memory.
 constexpr std::size_t threadStackBytes = 1024 * 1024;
 
-/// So many connections more may be ending at a time.
-constexpr unsigned connectionsThatEnd = 64;
-
 /// Copies the fields of a header and watches that they are all that was sent. The library hands out
 /// its read buffer, with nulls where names and values end. Where a field does not begin right after
 /// the two bytes of the line end before it, the library has joined, cut or skipped something: a
@@ -104,18 +101,21 @@ HttpLibrary::HttpLibrary(HttpHandler& handler, const HttpLimits& limits, const H
                    {MHD_OPTION_HTTPS_PRIORITIES, 0, const_cast<char*>(versions)},
                    {MHD_OPTION_END, 0, nullptr}}};
     }
-    // Its memory for a connection holds the header, a list of its fields and what is being read.
+    // It must never come to its own limit of connections, where it forgets to unlock its list of
+    // them. Its memory for a connection holds the header, a list of its fields and what is being
+    // read.
     daemon_ = MHD_start_daemon(
         flags, 0, nullptr, nullptr, &onRequest, this, MHD_OPTION_EXTERNAL_LOGGER, &onComplaint,
         this, MHD_OPTION_URI_LOG_CALLBACK, &onRequestLine, this, MHD_OPTION_NOTIFY_COMPLETED,
         &onCompleted, this, MHD_OPTION_NOTIFY_CONNECTION, &onConnection, this,
-        MHD_OPTION_CONNECTION_LIMIT, limits_.connections + connectionsThatEnd,
+        MHD_OPTION_CONNECTION_LIMIT, 1000 + 2 * limits_.connections,
         MHD_OPTION_CONNECTION_MEMORY_LIMIT, 4 * limits_.headerBytes, MHD_OPTION_THREAD_STACK_SIZE,
         threadStackBytes, MHD_OPTION_ARRAY, secure.data(), MHD_OPTION_END);
     if (daemon_ == nullptr) {
         throw std::runtime_error("HTTP does not start: " +
                                  (complaint_.empty() ? std::strerror(errno) : complaint_));
     }
+    started_ = true;
 }
 
 HttpLibrary::~HttpLibrary() {
@@ -204,6 +204,7 @@ MHD_Result HttpLibrary::respond(MHD_Connection* library, HttpConnection& connect
 }
 
 void HttpLibrary::finish(HttpConnection& connection, bool complete) noexcept {
+    connection.enter(Phase::Idle);
     if (!complete && !connection.cut && !connections_.ending()) {
         connections_.tellCut(connection.peer, connection.answered
                                                   ? "the client left before its response"
@@ -221,7 +222,6 @@ void HttpLibrary::finish(HttpConnection& connection, bool complete) noexcept {
     connection.response = {};
     connection.begun = false;
     connection.answered = false;
-    connection.enter(Phase::Idle);
 }
 
 void* HttpLibrary::onRequestLine(void*, const char* target, MHD_Connection* library) noexcept {
@@ -270,15 +270,15 @@ void HttpLibrary::onConnection(void* self, MHD_Connection* library, void** conte
 }
 
 void HttpLibrary::onComplaint(void* self, const char* format, va_list arguments) noexcept {
+    if (static_cast<HttpLibrary*>(self)->started_) return;
     auto& complaint = static_cast<HttpLibrary*>(self)->complaint_;
-    if (static_cast<HttpLibrary*>(self)->daemon_ != nullptr) return;
     std::array<char, 256> text{};
     const int length = std::vsnprintf(text.data(), text.size(), format, arguments);
     try {
-        complaint.assign(text.data(), length < 0 ? 0 : std::strlen(text.data()));
+        if (length > 0) complaint += (complaint.empty() ? "" : " ") + std::string(text.data());
         while (!complaint.empty() && complaint.back() == '\n') complaint.pop_back();
     } catch (const std::exception&) {
-        complaint.clear();
+        // What was said before is there.
     }
 }
 

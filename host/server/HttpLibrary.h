@@ -4,6 +4,7 @@
 #include <microhttpd.h>
 #include <sys/socket.h>
 
+#include <atomic>
 #include <cstdarg>
 #include <cstddef>
 #include <string>
@@ -53,8 +54,9 @@ class HttpLibrary {
     const HttpEvents& events_;
     HttpConnections& connections_;
     const bool tls_;
-    /// What the library complained of last, while it started.
+    /// What the library complained of while it started.
     std::string complaint_{};
+    std::atomic<bool> started_ = false;
     MHD_Daemon* daemon_ = nullptr;
 };
 

@@ -121,11 +121,13 @@ base::FileDescriptor HttpServer::Daemon::stopListening() {
 void HttpServer::Daemon::tend() {
     while (!(connections_.ending() && connections_.none())) {
         std::array<pollfd, 2> sources{{{wakeUp_.number(), POLLIN, 0}, {-1, POLLIN, 0}}};
-        if (!acceptFailed_) {
+        if (!acceptFailed_ && !connections_.crowded()) {
             const std::lock_guard lock(listenerMutex_);
             sources[1].fd = listener_.number();
         }
         ::poll(sources.data(), sources.size(), static_cast<int>(pause().count()));
+        eventfd_t wakings = 0;
+        [[maybe_unused]] const int drained = eventfd_read(wakeUp_.number(), &wakings);
         acceptAll();
         connections_.cutLate();
     }
@@ -136,14 +138,16 @@ milliseconds HttpServer::Daemon::pause() {
     constexpr milliseconds shortest(10);
     constexpr milliseconds longest(1000);
     constexpr milliseconds afterFailure(50);
+    constexpr milliseconds untilSomeEnd(2);
     if (connections_.ending()) return shortest;
+    if (connections_.crowded()) return untilSomeEnd;
     if (acceptFailed_) return afterFailure;
     if (connections_.none()) return milliseconds(-1);
     return std::clamp(std::min(limits_.transfer, limits_.idle) / 10, shortest, longest);
 }
 
 void HttpServer::Daemon::acceptAll() {
-    for (;;) {
+    while (!connections_.crowded()) {
         sockaddr_storage address{};
         socklen_t length = sizeof address;
         base::FileDescriptor socket;
