@@ -40,37 +40,30 @@ bool brokeOff(Operation operation, const OperationResult& result) {
 }
 
 /// What a status says of an operation whose provider leaves it without words.
+struct StatusWords {
+    unsigned code;
+    const char* words;
+};
+constexpr StatusWords statusWords[] = {
+    {cimAccessDenied, "access is denied"},
+    {cimInvalidNamespace, "the namespace is unknown"},
+    {cimInvalidParameter, "a parameter is wrong"},
+    {cimInvalidClass, "the class is not served"},
+    {cimNotFound, "there is no such instance"},
+    {cimNotSupported, "it is not supported"},
+    {CMPI_RC_ERR_ALREADY_EXISTS, "it exists already"},
+    {cimNoSuchProperty, "the class has no such property"},
+    {cimTypeMismatch, "a value is of the wrong type"},
+    {cimQueryLanguageNotSupported, "the query language is not supported"},
+    {cimInvalidQuery, "the query is not understood"},
+    {cimMethodNotAvailable, "the method is not available"},
+    {cimMethodNotFound, "there is no such method"},
+};
+
 std::string wordsFor(unsigned code) {
-    switch (code) {
-        case cimAccessDenied:
-            return "access is denied";
-        case cimInvalidNamespace:
-            return "the namespace is unknown";
-        case cimInvalidParameter:
-            return "a parameter is wrong";
-        case cimInvalidClass:
-            return "the class is not served";
-        case cimNotFound:
-            return "there is no such instance";
-        case cimNotSupported:
-            return "it is not supported";
-        case 11:
-            return "it exists already";
-        case cimNoSuchProperty:
-            return "the class has no such property";
-        case cimTypeMismatch:
-            return "a value is of the wrong type";
-        case cimQueryLanguageNotSupported:
-            return "the query language is not supported";
-        case cimInvalidQuery:
-            return "the query is not understood";
-        case cimMethodNotAvailable:
-            return "the method is not available";
-        case cimMethodNotFound:
-            return "there is no such method";
-        default:
-            return "the provider failed with status " + std::to_string(code);
-    }
+    for (const StatusWords& each : statusWords)
+        if (each.code == code) return each.words;
+    return "the provider failed with status " + std::to_string(code);
 }
 
 std::string subject(const OperationRequest& request) {
@@ -247,6 +240,11 @@ OperationResult ObjectManager::askProviders(const OperationRequest& request) {
     } catch (const LoadError& error) {
         complain(error.what());
         throw CimError(cimFailed, error.what());
+    } catch (const std::exception&) {
+        throw;
+    } catch (...) {
+        // Of a factory: whatever leaves a provider later is in the result.
+        throw CimError(cimFailed, subject(request) + ": the provider cannot be made");
     }
 }
 
