@@ -82,7 +82,7 @@ constexpr ElementRow elementRows[] = {
 std::string_view takeListPart(std::string_view& list, char separator) {
     const std::size_t end = list.find(separator);
     const std::string_view part = list.substr(0, end);
-    list = end == list.npos ? std::string_view() : list.substr(end + 1);
+    list = end == std::string_view::npos ? std::string_view() : list.substr(end + 1);
     return part;
 }
 
@@ -101,7 +101,7 @@ struct ContentPart {
 
 ContentPart contentPart(std::string_view text) {
     const std::size_t mark = text.find_first_of("?*");
-    if (mark == text.npos) return {text};
+    if (mark == std::string_view::npos) return {text};
     ContentPart part{text.substr(0, mark), 0};
     if (text[mark] == '*') {
         part.most = 0;
@@ -119,7 +119,7 @@ std::string shownName(const XmlElement& element) {
 }
 
 bool isBlank(std::string_view text) {
-    return text.find_first_not_of(" \t\r\n") == text.npos;
+    return text.find_first_not_of(" \t\r\n") == std::string_view::npos;
 }
 
 std::optional<std::string> attributeError(const XmlElement& element, std::string_view attributes) {

@@ -78,7 +78,7 @@ std::optional<Value> realFromText(std::string_view text, CMPIType type) {
     if (text == "-INF") return Value::fromReal(-infinity, type);
     if (text == "NaN") return Value::fromReal(std::numeric_limits<Real>::quiet_NaN(), type);
     // Other spellings of these are read by the library only.
-    if (text.find_first_not_of("+-.0123456789eE") != text.npos) return std::nullopt;
+    if (text.find_first_not_of("+-.0123456789eE") != std::string_view::npos) return std::nullopt;
     if (text.substr(0, 1) == "+" && text.substr(1, 1) != "-") text.remove_prefix(1);
     const std::optional<Real> number = wholeNumber<Real>(text);
     if (!number) return std::nullopt;

@@ -147,7 +147,7 @@ class TreeBuilder {
         std::string_view tag =
             document_.substr(static_cast<std::size_t>(XML_GetCurrentByteIndex(parser_)),
                              static_cast<std::size_t>(XML_GetCurrentByteCount(parser_)));
-        for (std::size_t at = tag.find('&'); at != tag.npos; at = tag.find('&')) {
+        for (std::size_t at = tag.find('&'); at != std::string_view::npos; at = tag.find('&')) {
             tag.remove_prefix(at + 1);
             if (!isBuiltInReference(tag)) throw XmlError("an entity is not declared");
         }
