@@ -1,17 +1,35 @@
 // Whole requests: what surrounds a message, the message, and the answer of an object manager over
 // the shipped providers, which clients have to be able to read.
+#include <dlfcn.h>
+
 #include <algorithm>
 
-#include "base/Ascii.h"
 #include "fuzz/Invariant.h"
 #include "host/server/CimOverHttp.h"
+#include "host/server/Dispatcher.h"
 #include "host/server/ResponseValidator.h"
-#include "host/server/ServerFixture.h"
 
 using namespace cmpihost::server;
 using fuzz::expect;
 
 namespace {
+
+/// The instrumentation of the fixture host is there before the provider asks for one.
+ObjectManager& shippedManager() {
+    static void* const fixtureHost =
+        dlopen(KORVA_BINARY_DIR "/fixture-host/libvainstrumentation.so.1", RTLD_NOW | RTLD_GLOBAL);
+    expect(fixtureHost != nullptr, "the fixture host is built");
+    static ObjectManager manager([] {
+        ObjectManagerSetup setup;
+        setup.schema = cmpihost::Schema::load(KORVA_SOURCE_DIR "/schema");
+        setup.registrations =
+            cmpihost::Registrations::read({KORVA_SOURCE_DIR "/schema/registration"});
+        setup.libraryFolders = {KORVA_BINARY_DIR "/lib"};
+        setup.hostName = "server.example";
+        return setup;
+    }());
+    return manager;
+}
 
 class Everybody final : public AccessControl {
   public:
@@ -93,15 +111,19 @@ void closeWhatIsOpen(ObjectManager& manager, const HttpResponse& response) {
     const std::size_t start = response.body.find(opened);
     if (start == std::string::npos) return;
     const std::size_t text = start + opened.size();
-    const std::string context = response.body.substr(text, response.body.find('<', text) - text);
-    fixture::respond(manager, fixture::operation("CloseEnumeration",
-                                                 fixture::value("EnumerationContext", context)));
+    MessageParameter context{"EnumerationContext", {}, XmlElement{"VALUE"}};
+    context.value->text = response.body.substr(text, response.body.find('<', text) - text);
+    Message close;
+    close.method = "CloseEnumeration";
+    close.nameSpace = "root/cimv2";
+    close.parameters.push_back(std::move(context));
+    answer(manager, close, std::nullopt);
 }
 
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    ObjectManager& manager = fixture::shippedManager();
+    ObjectManager& manager = shippedManager();
     static Everybody everybody;
     static CimOverHttp endpoint(manager, everybody, {});
     HttpRequest request = requestOf(fuzz::textOf(data, size));
