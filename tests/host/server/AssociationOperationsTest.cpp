@@ -394,6 +394,55 @@ TEST(AssociationOperations, OfAProviderThatTellsNoReferencesAndNoInstancesFailAn
                     StartsWith("7: the provider of TEST_Link: "));
 }
 
+std::string property(const std::string& name, const std::string& instance) {
+    return "<PROPERTY.REFERENCE NAME=\"" + name + "\"><VALUE.REFERENCE>" + instance +
+           "</VALUE.REFERENCE></PROPERTY.REFERENCE>";
+}
+
+TEST(AssociationOperations, FindReferencesByTheirRolesWhereBothEndsAreOfOneClass) {
+    // The provider of the associations refuses references; another one has instances of classes
+    // below them, and tells all that it keeps whatever it is asked for.
+    const auto section = [](const std::string& name, const std::string& provider,
+                            const std::string& library, const std::string& type) {
+        return "[" + name + "]\nprovider: " + provider + "\nlocation: " + library +
+               "\ntype: " + type + "\nnamespace: root/test\n";
+    };
+    ObjectManager& manager = foreignManager(
+        section("TEST_Bond", "Links", "foreign_links", "association") +
+            section("TEST_StrongBond", "Things", "foreign_things", "instance") +
+            section("TEST_Hold", "Links", "foreign_links", "association") +
+            section("TEST_StrongHold", "Things", "foreign_things", "instance"),
+        "[Association] class TEST_Bond { [Key] TEST_Thing REF Left; [Key] TEST_Thing REF Right; };"
+        "[Association] class TEST_Hold { [Key] TEST_Part REF Part; [Key] TEST_Thing REF Holder; };"
+        "class TEST_StrongBond : TEST_Bond {}; class TEST_StrongHold : TEST_Hold {};");
+    const std::string second = instanceName("TEST_Thing", {{"Name", "second"}});
+    const std::string wheel = instanceName("TEST_Part", {{"Id", "wheel"}});
+    const std::string kept[] = {
+        "<INSTANCE CLASSNAME=\"TEST_Thing\"><PROPERTY NAME=\"Name\" TYPE=\"string\"><VALUE>second"
+        "</VALUE></PROPERTY>" +
+            property("Part", wheel) + "</INSTANCE>",
+        "<INSTANCE CLASSNAME=\"TEST_StrongBond\">" + property("Left", thing) +
+            property("Right", second) + "</INSTANCE>"};
+    for (const std::string& instance : kept) {
+        EXPECT_EQ(
+            error(respond(manager, operation("CreateInstance", parameter("NewInstance", instance),
+                                             "root/test"))),
+            "");
+    }
+    const Objects bond = {"TEST_StrongBond(TEST_Thing(first), TEST_Thing(second))"};
+    const std::string bonds = className("ResultClass", "TEST_Bond");
+    expectFound(manager, "References", "ReferenceNames",
+                {{thing, bonds, bond},
+                 {thing, bonds + value("Role", "left"), bond},
+                 {thing, bonds + value("Role", "Right"), {}},
+                 {second, bonds, bond},
+                 {second, bonds + value("Role", "Right"), bond},
+                 {second, bonds + value("Role", "Left"), {}},
+                 // The second thing has a property of that name, but is no such association.
+                 {wheel, className("ResultClass", "TEST_Hold"), {}}},
+                "root/test");
+}
+
 TEST(AssociationOperations, FailAsAWholeWhenOneProviderFails) {
     ObjectManager& manager = foreignManager(
         "[TEST_OtherLink]\nprovider: Nobody\nlocation: nowhere\n"
@@ -460,6 +509,11 @@ TEST(AssociationOperations, AskWhereTheSchemaLacksAClassThatWouldTell) {
                 {{gadget, "", {"TEST_Thing(first)"}},
                  {gadget, className("AssocClass", "TEST_Tie"), {"TEST_Thing(first)"}},
                  {gadget, className("AssocClass", "TEST_Odd"), {}},
+                 {gadget,
+                  className("AssocClass", "TEST_Link") + value("Role", "Part"),
+                  {"TEST_Thing(first)"}},
+                 // That the provider answers with things is no reason to believe it.
+                 {gadget, className("AssocClass", "TEST_Link") + value("Role", "Whole"), {}},
                  {"<CLASSNAME NAME=\"TEST_Gadget\"/>", "", {}}},
                 "root/test");
     const std::string part = from(instanceName("TEST_Part", {{"Id", "wheel"}}));
