@@ -2,6 +2,7 @@
 // answers.
 #include <gmock/gmock.h>
 
+#include "host/mof/MofParser.h"
 #include "host/server/ServerFixture.h"
 
 namespace cmpihost::server {
@@ -278,6 +279,20 @@ TEST(InstanceOperations, AnEnumerationThatBreaksOffFails) {
             error(respond(manager, operation(name, className("ClassName", "KORVA_InstalledOS")))),
             std::string("1: ") + name +
                 " of KORVA_InstalledOS: the answer of the provider broke off");
+    }
+}
+
+TEST(InstanceOperations, WhatOneProviderLeavesUnfinishedIsNotWholeWithThatOfAnother) {
+    const std::string broken = registration("KORVA_InstalledOS", "OperatingSystemProvider",
+                                            "korzbosstatusprofileprovider", "instance");
+    const std::string whole = registration("TEST_Part", "Parts", "foreign_parts", "instance");
+    for (const std::string& sections : {broken + whole, whole + broken}) {
+        Schema schema = Schema::load(KORVA_SOURCE_DIR "/schema");
+        schema.add(mof::parse("class TEST_Part : CIM_Component { [Key] string Id; };", "more.mof"));
+        ObjectManager& manager = newManager(std::move(schema), sections);
+        EXPECT_EQ(error(respond(manager, operation("EnumerateInstances",
+                                                   className("ClassName", "CIM_Component")))),
+                  "1: EnumerateInstances of CIM_Component: the answer of the provider broke off");
     }
 }
 
