@@ -33,9 +33,16 @@ namespace {
 
 constexpr const char* sourceObject = "ObjectName";
 
-/// The source is a class: an instance without keys is how some clients name one.
+/// Whether the source is a class. Throws CimError for an instance without keys: some clients name a
+/// class so, but they cannot read paths of classes and are better served with a sentence.
 bool asksForClasses(const Call& call) {
-    return call.parameters.path(sourceObject)->keys.empty();
+    const RequestPath source = *call.parameters.path(sourceObject);
+    if (!source.instance) return true;
+    if (!source.keys.empty()) return false;
+    const std::string className = sourceClass(call, sourceObject);
+    throw CimError(cimNotSupported, className +
+                                        ": an instance without keys is none to start from; give "
+                                        "all keys, or a CLASSNAME to be answered with classes");
 }
 
 std::vector<std::string> tiedClasses(const Call& call, Operation operation) {
@@ -102,36 +109,25 @@ void runWithNames(const Call& call, std::string& xml) {
 
 const std::vector<OperationRow>& associationOperations() {
     using Holds = ParameterKind;
-    static const std::vector<OperationRow> rows = {{"Associators",
-                                                    {{sourceObject, Holds::ObjectName, true},
-                                                     {"AssocClass", Holds::ClassName},
-                                                     {"ResultClass", Holds::ClassName},
-                                                     {"Role", Holds::Text},
-                                                     {"ResultRole", Holds::Text},
-                                                     {"IncludeQualifiers", Holds::Boolean},
-                                                     {"IncludeClassOrigin", Holds::Boolean},
-                                                     {"PropertyList", Holds::PropertyList}},
-                                                    runWithObjects<Operation::Associators>},
-                                                   {"AssociatorNames",
-                                                    {{sourceObject, Holds::ObjectName, true},
-                                                     {"AssocClass", Holds::ClassName},
-                                                     {"ResultClass", Holds::ClassName},
-                                                     {"Role", Holds::Text},
-                                                     {"ResultRole", Holds::Text}},
-                                                    runWithNames<Operation::AssociatorNames>},
-                                                   {"References",
-                                                    {{sourceObject, Holds::ObjectName, true},
-                                                     {"ResultClass", Holds::ClassName},
-                                                     {"Role", Holds::Text},
-                                                     {"IncludeQualifiers", Holds::Boolean},
-                                                     {"IncludeClassOrigin", Holds::Boolean},
-                                                     {"PropertyList", Holds::PropertyList}},
-                                                    runWithObjects<Operation::References>},
-                                                   {"ReferenceNames",
-                                                    {{sourceObject, Holds::ObjectName, true},
-                                                     {"ResultClass", Holds::ClassName},
-                                                     {"Role", Holds::Text}},
-                                                    runWithNames<Operation::ReferenceNames>}};
+    static const ParameterRow source = {sourceObject, Holds::ObjectName, true};
+    static const ParameterRow assocClass = {"AssocClass", Holds::ClassName};
+    static const ParameterRow resultClass = {"ResultClass", Holds::ClassName};
+    static const ParameterRow role = {"Role", Holds::Text};
+    static const ParameterRow resultRole = {"ResultRole", Holds::Text};
+    static const ParameterRow qualifiers = {"IncludeQualifiers", Holds::Boolean};
+    static const ParameterRow classOrigin = {"IncludeClassOrigin", Holds::Boolean};
+    static const ParameterRow properties = {"PropertyList", Holds::PropertyList};
+    static const std::vector<OperationRow> rows = {
+        {"Associators",
+         {source, assocClass, resultClass, role, resultRole, qualifiers, classOrigin, properties},
+         runWithObjects<Operation::Associators>},
+        {"AssociatorNames",
+         {source, assocClass, resultClass, role, resultRole},
+         runWithNames<Operation::AssociatorNames>},
+        {"References",
+         {source, resultClass, role, qualifiers, classOrigin, properties},
+         runWithObjects<Operation::References>},
+        {"ReferenceNames", {source, resultClass, role}, runWithNames<Operation::ReferenceNames>}};
     return rows;
 }
 

@@ -314,14 +314,22 @@ TEST(AssociationOperations, ApplyPropertyLists) {
         Objects{computer});
 }
 
-TEST(AssociationOperations, AnswerClassesToAClass) {
+TEST(AssociationOperations, TellWhoNamesAnInstanceWithoutKeysWhatToGive) {
     const std::string keyless = "<INSTANCENAME CLASSNAME=\"korva_operatingsystem\"></INSTANCENAME>";
+    for (const char* name : {"Associators", "AssociatorNames", "References", "ReferenceNames"}) {
+        EXPECT_EQ(content(respond(operation(name, from(keyless)))),
+                  "<ERROR CODE=\"7\" DESCRIPTION=\"KORVA_OperatingSystem: an instance without keys "
+                  "is none to start from; give all keys, or a CLASSNAME to be answered with "
+                  "classes\"/>");
+    }
+}
+
+TEST(AssociationOperations, AnswerClassesToAClass) {
     const std::string os = "<CLASSNAME NAME=\"KORVA_OperatingSystem\"/>";
     const std::string cs = "<CLASSNAME NAME=\"KORVA_ComputerSystem\"/>";
     ObjectManager& manager = shippedManager();
     expectFound(manager, "Associators", "AssociatorNames",
                 {{os, "", {"KORVA_ComputerSystem", "KORVA_OperatingSystemCapabilities"}},
-                 {keyless, "", {"KORVA_ComputerSystem", "KORVA_OperatingSystemCapabilities"}},
                  {"<CLASSNAME NAME=\"CIM_OperatingSystem\"/>",
                   "",
                   {"KORVA_ComputerSystem", "KORVA_OperatingSystemCapabilities"}},
