@@ -34,7 +34,7 @@ void cutConnection(HttpConnection& connection) {
 }  // namespace
 
 bool HttpConnections::admit(int socket, const std::string& peer) {
-    HttpConnection* replaced = nullptr;
+    std::string replacedPeer;
     {
         const std::lock_guard lock(mutex_);
         std::size_t all = 0;
@@ -46,12 +46,14 @@ bool HttpConnections::admit(int socket, const std::string& peer) {
         }
         const bool peerFull = peer != "unix" && ofPeer >= limits_.connectionsOfAnAddress;
         if (peerFull || all >= limits_.connections) {
-            replaced = longestWaiting(peer, peerFull);
+            HttpConnection* const replaced = longestWaiting(peer, peerFull);
             if (replaced == nullptr) return false;
+            replacedPeer = replaced->peer;
             cutConnection(*replaced);
         }
         connections_[socket] = std::make_unique<HttpConnection>(socket, peer);
     }
+    if (!replacedPeer.empty()) tellCut(replacedPeer, "a newer connection took its place");
     return true;
 }
 

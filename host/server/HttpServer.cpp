@@ -13,6 +13,7 @@
 #include <cerrno>
 #include <cstring>
 #include <mutex>
+#include <new>
 #include <string_view>
 #include <system_error>
 #include <thread>
@@ -128,8 +129,12 @@ void HttpServer::Daemon::tend() {
         ::poll(sources.data(), sources.size(), static_cast<int>(pause().count()));
         eventfd_t wakings = 0;
         [[maybe_unused]] const int drained = eventfd_read(wakeUp_.number(), &wakings);
-        acceptAll();
-        connections_.cutLate();
+        try {
+            acceptAll();
+            connections_.cutLate();
+        } catch (const std::bad_alloc&) {
+            // Whoever is late is cut in the next round.
+        }
     }
 }
 

@@ -125,6 +125,8 @@ TEST(HttpServerLimits, ReplaceTheConnectionThatHasWaitedLongest) {
     EXPECT_THAT(first.receiveAll(), EndsWith("\r\n\r\n/a 0"));
     third.receive();
     EXPECT_FALSE(third.hasEnded());
+    EXPECT_THAT(tested.cuts(), ElementsAre("127.0.0.1: a newer connection took its place",
+                                           "127.0.0.1: a newer connection took its place"));
 }
 
 TEST(HttpServerLimits, RefuseConnectionsWhereAllHaveRequests) {
