@@ -18,7 +18,7 @@ namespace cmpihost::server {
 
 namespace {
 
-constexpr int backlog = 128;
+constexpr int backlog = SOMAXCONN;
 
 [[noreturn]] void fail(const std::string& what) {
     throw std::system_error(errno, std::generic_category(), what);
