@@ -38,7 +38,7 @@ class CimOverHttp final : public HttpHandler {
         /// What a Host header may name, without a port; literal addresses are always welcome.
         std::vector<std::string> hostNames{};
         /// So many operations run at once; one more is answered 503.
-        unsigned mostAtOnce = 32;
+        unsigned mostAtOnce = 64;
     };
 
     /// Both references outlive this object.
