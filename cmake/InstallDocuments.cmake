@@ -28,7 +28,7 @@ if(KORVA_CMPIHOST)
     install(FILES "${PROJECT_SOURCE_DIR}/packaging/debian/korva-osstatus-tools.copyright" RENAME copyright.cmpihost
             DESTINATION "${CMAKE_INSTALL_DOCDIR}" COMPONENT tools)
 endif()
-if(KORVA_SERVER)
+if(TARGET cmpihost-serve)
     korva_man_page(server cmpihost-serve 1)
     install(FILES "${PROJECT_SOURCE_DIR}/packaging/debian/korva-osstatus-server.copyright"
             RENAME copyright.cmpihost-serve DESTINATION "${CMAKE_INSTALL_DOCDIR}" COMPONENT server)

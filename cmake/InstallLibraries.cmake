@@ -24,6 +24,6 @@ set_target_properties(korvaosstatusfacade korzbosstatusprofileprovider korvacomp
 if(KORVA_CMPIHOST)
     install(TARGETS cmpihost RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}" COMPONENT tools)
 endif()
-if(KORVA_SERVER)
+if(TARGET cmpihost-serve)
     install(TARGETS cmpihost-serve RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}" COMPONENT server)
 endif()

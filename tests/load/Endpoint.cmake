@@ -1,5 +1,5 @@
 # A running endpoint under load.
-add_executable(endpoint_load EndpointLoad.cpp)
+add_executable(endpoint_load EndpointLoad.cpp EndpointClients.cpp)
 set_target_properties(endpoint_load PROPERTIES UNITY_BUILD OFF)
 target_link_libraries(endpoint_load PRIVATE korva_endpoint_process korva::options)
 add_dependencies(endpoint_load
