@@ -29,7 +29,8 @@ progress() {
     done 3>&1 >"$1"
 }
 
-# build PRESET LOG [TARGET...]: configures and builds; says the end of the log when that fails.
+# build PRESET LOG [TARGET...]: configures, with $configure_options, and builds; says the end of the log when
+# that fails.
 build() {
     preset=$1
     log=$2
@@ -38,7 +39,9 @@ build() {
     rm -f build/failed
     [ $# -eq 0 ] || set -- --target "$@"
     {
-        { cmake --preset "$preset" && NINJA_STATUS='[%f/%t] ' cmake --build --preset "$preset" "$@"; } 2>&1 ||
+        # Options, to be split.
+        # shellcheck disable=SC2086
+        { cmake --preset "$preset" ${configure_options:-} && NINJA_STATUS='[%f/%t] ' cmake --build --preset "$preset" "$@"; } 2>&1 ||
             touch build/failed
     } | progress "$log"
     [ -e build/failed ] || return 0

@@ -7,7 +7,8 @@
 set -eu
 cd "$(dirname "$0")/.."
 
-limit=9000
+# The endpoint took 1 500 more: it is a server, with clients, users and an administrator of its own.
+limit=10500
 words=$(cat README.md docs/*.md | wc -w)
 [ "$words" -le "$limit" ] || {
     echo "README.md and docs/*.md have $words words, which is more than $limit" >&2

@@ -24,20 +24,18 @@ opens_no_port_by_itself() {
 # The processes of the system whose program is that of the endpoint.
 pgrep_endpoint() { find /proc -maxdepth 2 -name exe -lname "$root/usr/bin/cmpihost-serve" 2>/dev/null | grep .; }
 
-# Without rights, as the unit has it, and with its command line. Its process is the one that is started here.
+# Without rights, as the unit has it, and with its command line.
 start() {
     command=$(sed -n 's/^ExecStart=//p' "$unit")
     # A command line, to be split.
     # shellcheck disable=SC2086
     inside setpriv --reuid 65534 --regid 65534 --clear-groups --no-new-privs $command 2>"$work/told" &
-    endpoint=$!
     for _ in 1 2 3 4 5 6 7 8 9 10; do
         grep -q "listening on http://127.0.0.1:5988" "$work/told" && break
         sleep 0.5
     done
-    echo "$endpoint" >"$work/endpoint"
     cat "$work/told"
-    kill -0 "$endpoint"
+    pgrep_endpoint | cut -d / -f 3 >"$work/endpoint"
 }
 
 runs_without_rights() { [ "$(sed -n 's/^Uid:\t\([0-9]*\)\t.*/\1/p' "/proc/$(cat "$work/endpoint")/status")" = 65534 ]; }
@@ -55,7 +53,7 @@ stop() {
 nothing_is_left() {
     inside apt-get -y --purge autoremove
     known_packages | diff "$work/packages.before" -
-    [ -z "$(find "$root" -xdev -name '*cmpihost-serve*' -o -xdev -name 'korva-osstatus*' | grep -v "^$root/packages")" ]
+    ! find "$root" -xdev \( -name '*cmpihost-serve*' -o -name 'korva-osstatus*' \) | grep -v "^$root/packages"
 }
 
 check "the packages, and wbemcli" bring_packages
