@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <utility>
 
 #include "base/Ascii.h"
 
@@ -56,9 +57,10 @@ void wipe(std::string& text) {
 BasicCredentials::BasicCredentials(std::string_view theName, std::string_view thePassword)
     : name(theName), password(thePassword) {}
 
-// A short text is copied where it is moved, and the copy wants to be wiped, too.
-BasicCredentials::BasicCredentials(BasicCredentials&& other)
-    : BasicCredentials(other.name, other.password) {
+// A short text is copied where it is moved, and the copy that stays behind wants to be wiped, too.
+BasicCredentials::BasicCredentials(BasicCredentials&& other) noexcept
+    : name(std::move(other.name)), password(std::move(other.password)) {
+    other.password.resize(other.password.capacity());
     wipe(other.password);
 }
 

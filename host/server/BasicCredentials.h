@@ -11,7 +11,7 @@ namespace cmpihost::server {
 struct BasicCredentials {
     BasicCredentials(std::string_view theName, std::string_view thePassword);
     ~BasicCredentials();
-    BasicCredentials(BasicCredentials&& other);
+    BasicCredentials(BasicCredentials&& other) noexcept;
     BasicCredentials& operator=(BasicCredentials&&) = delete;
 
     std::string name;

@@ -2,6 +2,7 @@
 #include "host/server/ServeCommandLine.h"
 
 #include <CLI/CLI.hpp>
+#include <functional>
 #include <map>
 
 #include "base/Utf8.h"
