@@ -63,4 +63,4 @@ build_packages="cmake ninja-build g++ libc6-dev googletest libcli11-dev nlohmann
 
 # What packs; binutils of i386 are for its packages on another machine.
 # shellcheck disable=SC2034
-package_packages="debhelper dpkg-dev xz-utils binutils-i686-linux-gnu rpm debugedit elfutils cpio file pkg-config"
+package_packages="debhelper dpkg-dev xz-utils binutils-i686-linux-gnu rpm debugedit elfutils cpio file pkg-config systemd"
