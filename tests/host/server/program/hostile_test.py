@@ -107,6 +107,8 @@ class GoodClient:
                 paths = self.client.returned("EnumerateInstanceNames", "root/test", ClassName=PART)
             except ConnectionError:
                 self.client.close()
+                if time.monotonic() > begin + 5:
+                    raise
         self.longest = max(self.longest, time.monotonic() - begin)
         self.answers += 1
         assert len(paths) == 2, paths
