@@ -64,6 +64,13 @@ class FieldReader {
     bool exact_ = true;
 };
 
+/// Whether this is a version of the library that leaves a header in its buffer as FieldReader reads
+/// it, and that is lenient with headers. Later versions are strict by themselves where they are
+/// told to be.
+bool isLenientVersion() {
+    return std::string_view(MHD_get_version()).substr(0, 4) == "0.9.";
+}
+
 struct ResponseDeleter {
     void operator()(MHD_Response* response) const { MHD_destroy_response(response); }
 };
@@ -110,7 +117,8 @@ HttpLibrary::HttpLibrary(HttpHandler& handler, const HttpLimits& limits, const H
         &onCompleted, this, MHD_OPTION_NOTIFY_CONNECTION, &onConnection, this,
         MHD_OPTION_CONNECTION_LIMIT, 1000 + 2 * limits_.connections,
         MHD_OPTION_CONNECTION_MEMORY_LIMIT, 4 * limits_.headerBytes, MHD_OPTION_THREAD_STACK_SIZE,
-        threadStackBytes, MHD_OPTION_ARRAY, secure.data(), MHD_OPTION_END);
+        threadStackBytes, MHD_OPTION_STRICT_FOR_CLIENT, isLenientVersion() ? 0 : 1,
+        MHD_OPTION_ARRAY, secure.data(), MHD_OPTION_END);
     if (daemon_ == nullptr) {
         throw std::runtime_error("HTTP does not start: " +
                                  (complaint_.empty() ? std::strerror(errno) : complaint_));
@@ -140,7 +148,9 @@ bool HttpLibrary::begin(MHD_Connection* library, HttpConnection& connection, con
     FieldReader fields(version, request);
     MHD_get_connection_values_n(library, MHD_HEADER_KIND, &FieldReader::read, &fields);
     const auto* size = MHD_get_connection_info(library, MHD_CONNECTION_INFO_REQUEST_HEADER_SIZE);
-    if (size == nullptr || !fields.endsAt(method + size->header_size)) {
+    const bool asSent =
+        size != nullptr && (!isLenientVersion() || fields.endsAt(method + size->header_size));
+    if (!asSent) {
         connection.response = closingResponse(400);
     } else if (const unsigned status = refusalOfHeader(request, size->header_size, limits_)) {
         connection.response = closingResponse(status);
