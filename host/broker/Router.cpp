@@ -79,6 +79,19 @@ std::string listed(const std::vector<std::string>& names) {
 
 }  // namespace
 
+std::string selectedClass(const std::string& query) {
+    constexpr const char* blanks = " \t\r\n;";
+    bool afterFrom = false;
+    for (std::size_t start = query.find_first_not_of(blanks); start != std::string::npos;) {
+        const std::size_t end = query.find_first_of(blanks, start);
+        std::string word = query.substr(start, end - start);
+        if (afterFrom) return word;
+        afterFrom = base::equalsIgnoreCase(word, "FROM");
+        start = query.find_first_not_of(blanks, end);
+    }
+    return {};
+}
+
 Router::Router(Broker& broker, const ClassCatalogue& catalogue, Registrations registrations,
                std::vector<std::filesystem::path> folders)
     : broker_(broker),

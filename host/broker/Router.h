@@ -15,6 +15,11 @@
 /// Sends operations to the providers that are registered for them.
 namespace cmpihost {
 
+/// The class that a query selects from, by which it finds its provider: the word after FROM. Empty
+/// where there is none; whether the query is one of its language is for the provider to say. Any
+/// thread may call it.
+std::string selectedClass(const std::string& query);
+
 /// Several libraries behind one broker. Requests of clients and up-calls of providers take the same
 /// way, by class and namespace:
 /// - EnumerateInstances, EnumerateInstanceNames and ExecQuery go to the instance providers of the

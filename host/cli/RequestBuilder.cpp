@@ -8,6 +8,7 @@
 #include "base/Ascii.h"
 #include "base/Utf8.h"
 #include "host/broker/DateTimeText.h"
+#include "host/broker/Router.h"
 #include "host/cli/PathParser.h"
 #include "host/cli/Suggestion.h"
 #include "host/mof/MofParser.h"
@@ -212,21 +213,6 @@ InstanceValue instance(const CommandLine& commandLine, const ObjectPathValue& pa
         }
     }
     return result;
-}
-
-/// The class that a query selects from: the word after FROM. Empty when there is none. Enough to
-/// route the query; whether it is one of its language is for the provider to say.
-std::string selectedClass(const std::string& query) {
-    constexpr const char* blanks = " \t\r\n;";
-    bool afterFrom = false;
-    for (std::size_t start = query.find_first_not_of(blanks); start != std::string::npos;) {
-        const std::size_t end = query.find_first_of(blanks, start);
-        std::string word = query.substr(start, end - start);
-        if (afterFrom) return word;
-        afterFrom = base::equalsIgnoreCase(word, "FROM");
-        start = query.find_first_not_of(blanks, end);
-    }
-    return {};
 }
 
 /// The property list of ModifyInstance: what is not in it must not be touched. The keys that only

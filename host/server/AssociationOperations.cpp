@@ -52,9 +52,8 @@ std::vector<std::string> tiedClasses(const Call& call, Operation operation) {
         call.manager, call.nameSpace, source, filter);
 }
 
-/// Throws CimError where a whole CIM schema makes the answer larger than anybody can use.
+/// Throws CimError for more than mostClassBytes.
 void writeClasses(const Call& call, Operation operation, std::string& xml) {
-    constexpr std::size_t mostBytes = 4U << 20U;
     ClassView view;
     view.qualifiers = call.parameters.flag("IncludeQualifiers", false);
     view.classOrigin = call.parameters.flag("IncludeClassOrigin", false);
@@ -65,7 +64,7 @@ void writeClasses(const Call& call, Operation operation, std::string& xml) {
         writeClassPath(xml, name, call.site());
         writeClass(xml, resolvedClass(schema, name).value(), schema.qualifierTypes(), view);
         xml += "</VALUE.OBJECTWITHPATH>";
-        if (xml.size() > mostBytes)
+        if (xml.size() > mostClassBytes)
             throw CimError(cimServerLimitsExceeded,
                            "these classes are more than the server sends at once, 4 MiB; ask for "
                            "their names");

@@ -98,7 +98,6 @@ class Traversal {
 
   private:
     bool sourceExists();
-    bool isServed(const std::string& className) const;
     OperationResult asked(const Tie& tie) const;
     OperationResult answerOf(const Tie& tie) const;
     OperationRequest requestTo(const Tie& tie) const;
@@ -149,19 +148,11 @@ bool Traversal::sourceExists() {
         sourceNames_.insert(pathIdentity(found.path, call_.nameSpace));
         return true;
     } catch (const CimError& error) {
-        if (error.code() == cimNotFound) return !isServed(source_.className);
+        if (error.code() == cimNotFound)
+            return !call_.manager.hasInstanceProvider(call_.nameSpace, source_.className);
         if (error.code() == cimNotSupported) return true;
         throw;
     }
-}
-
-/// Whether the class has a provider of instances, or one below it has.
-bool Traversal::isServed(const std::string& className) const {
-    const auto& all = call_.manager.registrations().all();
-    return std::any_of(all.begin(), all.end(), [&](const Registration& each) {
-        return each.serves(Interface::Instance, call_.nameSpace) &&
-               call_.manager.isA(call_.nameSpace, each.className, className);
-    });
 }
 
 /// An association that may have nothing to do with the source may refuse it.
@@ -180,7 +171,8 @@ OperationResult Traversal::answerOf(const Tie& tie) const {
     try {
         return call_.manager.ask(requestTo(tie));
     } catch (const CimError& error) {
-        if (error.code() != cimNotSupported || !isServed(tie.association)) throw;
+        const bool enumerable = call_.manager.hasInstanceProvider(call_.nameSpace, tie.association);
+        if (error.code() != cimNotSupported || !enumerable) throw;
     }
     return enumeratedReferences(tie);
 }

@@ -15,6 +15,7 @@ enum CimStatus : unsigned {
     cimInvalidClass = 5,
     cimNotFound = 6,
     cimNotSupported = 7,
+    cimAlreadyExists = 11,
     cimNoSuchProperty = 12,
     cimTypeMismatch = 13,
     cimQueryLanguageNotSupported = 14,
@@ -23,11 +24,9 @@ enum CimStatus : unsigned {
     cimMethodNotFound = 17,
     cimInvalidEnumerationContext = 21,
     cimInvalidOperationTimeout = 22,
-    cimPullHasBeenAbandoned = 23,
     cimFilteredEnumerationNotSupported = 25,
     cimContinuationOnErrorNotSupported = 26,
-    cimServerLimitsExceeded = 27,
-    cimServerIsShuttingDown = 28
+    cimServerLimitsExceeded = 27
 };
 
 /// Ends an operation with a status other than OK. The text is one sentence for the client and may
@@ -43,6 +42,10 @@ class CimError : public std::runtime_error {
   private:
     unsigned code_;
 };
+
+/// What a status says of an operation whose provider leaves it without words. Any thread may call
+/// it.
+std::string wordsForStatus(unsigned code);
 
 }  // namespace cmpihost::server
 

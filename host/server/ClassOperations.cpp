@@ -12,9 +12,6 @@ namespace cmpihost::server {
 
 namespace {
 
-/// A whole CIM schema makes larger answers than anybody can use.
-constexpr std::size_t mostClassBytes = 4U << 20U;
-
 /// Whether a declared class is below the other one (empty: below all), directly or in any degree.
 /// What is between them and known by name alone does not count.
 bool isBelow(const Call& call, const std::string& className, const std::string& ancestor,
@@ -50,7 +47,7 @@ ClassView viewOf(const Parameters& parameters) {
 }
 
 void getClass(const Call& call, std::string& xml) {
-    const std::string name = call.parameters.className("ClassName").value_or("");
+    const std::string name = *call.parameters.className("ClassName");
     const Schema& schema = call.manager.schema(call.nameSpace);
     const std::optional<ResolvedClass> found = resolvedClass(schema, name);
     if (!found && call.manager.knowsClass(call.nameSpace, name)) {
@@ -94,7 +91,7 @@ void enumerateClassNames(const Call& call, std::string& xml) {
 }
 
 void getQualifier(const Call& call, std::string& xml) {
-    const std::string name = call.parameters.text("QualifierName").value_or("");
+    const std::string name = *call.parameters.text("QualifierName");
     for (const mof::QualifierType& type : qualifierTypes(call.manager.schema(call.nameSpace))) {
         if (!base::equalsIgnoreCase(type.name, name)) continue;
         xml += "<IRETURNVALUE>";

@@ -1,6 +1,7 @@
 #ifndef HOST_SERVER_CLASS_WRITER_H
 #define HOST_SERVER_CLASS_WRITER_H
 
+#include <cstddef>
 #include <optional>
 #include <string>
 #include <vector>
@@ -10,6 +11,9 @@
 /// Writes classes and qualifiers of responses; each function appends to `xml`. Any threads may call
 /// these.
 namespace cmpihost::server {
+
+/// A response with more bytes of classes is larger than anybody can use: a whole CIM schema.
+constexpr std::size_t mostClassBytes = 4U << 20U;
 
 /// What of a class a client wants to see.
 struct ClassView {

@@ -220,24 +220,9 @@ void writeObjectsWithPath(std::string& xml, const std::vector<InstanceValue>& in
     }
 }
 
-void writeInstancesWithPath(std::string& xml, const std::vector<InstanceValue>& instances,
-                            const Site& site, bool classOrigin) {
-    for (const InstanceValue& instance : instances) {
-        xml += "<VALUE.INSTANCEWITHPATH>";
-        writeInstancePath(xml, instance.path, site);
-        writeInstance(xml, instance, site, classOrigin);
-        xml += "</VALUE.INSTANCEWITHPATH>";
-    }
-}
-
 void writeInstanceNames(std::string& xml, const std::vector<ObjectPathValue>& paths,
                         const Site& site) {
     for (const ObjectPathValue& path : paths) writeInstanceName(xml, path, site);
-}
-
-void writeInstancePaths(std::string& xml, const std::vector<ObjectPathValue>& paths,
-                        const Site& site) {
-    for (const ObjectPathValue& path : paths) writeInstancePath(xml, path, site);
 }
 
 void writeObjectPaths(std::string& xml, const std::vector<ObjectPathValue>& paths,

@@ -47,11 +47,7 @@ void writeNamedInstances(std::string& xml, const std::vector<InstanceValue>& ins
                          const Site& site, bool classOrigin);
 void writeObjectsWithPath(std::string& xml, const std::vector<InstanceValue>& instances,
                           const Site& site, bool classOrigin);
-void writeInstancesWithPath(std::string& xml, const std::vector<InstanceValue>& instances,
-                            const Site& site, bool classOrigin);
 void writeInstanceNames(std::string& xml, const std::vector<ObjectPathValue>& paths,
-                        const Site& site);
-void writeInstancePaths(std::string& xml, const std::vector<ObjectPathValue>& paths,
                         const Site& site);
 void writeObjectPaths(std::string& xml, const std::vector<ObjectPathValue>& paths,
                       const Site& site);

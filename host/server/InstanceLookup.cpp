@@ -1,5 +1,6 @@
 // What a provider returns for a path is compared with the path: many look at some of the keys only.
 #include <algorithm>
+#include <unordered_set>
 
 #include "base/Ascii.h"
 #include "host/server/CimError.h"
@@ -68,20 +69,17 @@ InstanceValue gottenInstance(ObjectManager& manager, const ObjectPathValue& path
 }
 
 void applyPropertyList(std::vector<InstanceValue>& instances,
-                       const std::optional<std::vector<std::string>>& properties, bool keepKeys) {
+                       const std::optional<std::vector<std::string>>& properties) {
     if (!properties) return;
-    const auto isLeftOut = [&](const InstanceValue& instance, const PropertyValue& property) {
-        if (keepKeys && instance.path.key(property.name) != nullptr) return false;
-        return std::none_of(properties->begin(), properties->end(), [&](const std::string& name) {
-            return base::equalsIgnoreCase(name, property.name);
-        });
+    // A client may send many names: instances, properties and names must not multiply.
+    std::unordered_set<std::string> names;
+    for (const std::string& name : *properties) names.insert(base::toLower(name));
+    const auto isLeftOut = [&](const PropertyValue& property) {
+        return names.count(base::toLower(property.name)) == 0;
     };
     for (InstanceValue& instance : instances) {
         auto& held = instance.properties;
-        held.erase(
-            std::remove_if(held.begin(), held.end(),
-                           [&](const PropertyValue& each) { return isLeftOut(instance, each); }),
-            held.end());
+        held.erase(std::remove_if(held.begin(), held.end(), isLeftOut), held.end());
     }
 }
 

@@ -137,11 +137,11 @@ void setProperty(const Call& call, std::string&) {
     call.manager.ask(request);
 }
 
-/// An instance that a client sent, in the schema's terms.
+/// An instance that a client sent, in the schema's terms. `unknownProperty` is the status for a
+/// property that the class does not have.
 InstanceValue sentInstance(const Call& call, const XmlElement& element, unsigned unknownProperty) {
-    const std::string* const className = element.attribute("CLASSNAME");
-    if (className == nullptr) throw CimError(cimInvalidParameter, "INSTANCE has no CLASSNAME");
-    const std::string spelled = call.manager.knownClass(call.nameSpace, *className);
+    const std::string spelled =
+        call.manager.knownClass(call.nameSpace, *element.attribute("CLASSNAME"));
     const ClassCatalogue& catalogue = call.manager.catalogue(call.nameSpace);
     InstanceValue instance = readInstance(element, catalogue, call.nameSpace);
     instance.path.className = spelled;
@@ -170,13 +170,9 @@ void createInstance(const Call& call, std::string& xml) {
 
 void modifyInstance(const Call& call, std::string&) {
     const XmlElement& element = *call.parameters.element("ModifiedInstance");
-    const XmlElement* const name = element.child("INSTANCENAME");
-    const XmlElement* const content = element.child("INSTANCE");
-    if (name == nullptr || content == nullptr)
-        throw CimError(cimInvalidParameter, "ModifiedInstance holds no named instance");
-    OperationRequest request =
-        requestFor(call, Operation::ModifyInstance, instancePath(call, readPath(*name)));
-    InstanceValue instance = sentInstance(call, *content, cimNoSuchProperty);
+    OperationRequest request = requestFor(call, Operation::ModifyInstance,
+                                          instancePath(call, readPath(element.children.front())));
+    InstanceValue instance = sentInstance(call, element.children.back(), cimNoSuchProperty);
     if (!base::equalsIgnoreCase(instance.path.className, request.path.className)) {
         throw CimError(cimInvalidParameter, "the instance is of " + instance.path.className +
                                                 ", its path of " + request.path.className);
@@ -189,21 +185,6 @@ void modifyInstance(const Call& call, std::string&) {
 
 void deleteInstance(const Call& call, std::string&) {
     call.manager.ask(requestFor(call, Operation::DeleteInstance, instancePath(call)));
-}
-
-/// The class that a query selects from, the word after FROM; empty where there is none. Whether the
-/// query is one of its language is for the provider to say.
-std::string selectedClass(const std::string& query) {
-    constexpr const char* blanks = " \t\r\n;";
-    bool afterFrom = false;
-    for (std::size_t start = query.find_first_not_of(blanks); start != std::string::npos;) {
-        const std::size_t end = query.find_first_of(blanks, start);
-        std::string word = query.substr(start, end - start);
-        if (afterFrom) return word;
-        afterFrom = base::equalsIgnoreCase(word, "FROM");
-        start = query.find_first_not_of(blanks, end);
-    }
-    return {};
 }
 
 void execQuery(const Call& call, std::string& xml) {

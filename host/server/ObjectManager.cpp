@@ -39,33 +39,6 @@ bool brokeOff(Operation operation, const OperationResult& result) {
            isAssociationOperation(operation);
 }
 
-/// What a status says of an operation whose provider leaves it without words.
-struct StatusWords {
-    unsigned code;
-    const char* words;
-};
-constexpr StatusWords statusWords[] = {
-    {cimAccessDenied, "access is denied"},
-    {cimInvalidNamespace, "the namespace is unknown"},
-    {cimInvalidParameter, "a parameter is wrong"},
-    {cimInvalidClass, "the class is not served"},
-    {cimNotFound, "there is no such instance"},
-    {cimNotSupported, "it is not supported"},
-    {CMPI_RC_ERR_ALREADY_EXISTS, "it exists already"},
-    {cimNoSuchProperty, "the class has no such property"},
-    {cimTypeMismatch, "a value is of the wrong type"},
-    {cimQueryLanguageNotSupported, "the query language is not supported"},
-    {cimInvalidQuery, "the query is not understood"},
-    {cimMethodNotAvailable, "the method is not available"},
-    {cimMethodNotFound, "there is no such method"},
-};
-
-std::string wordsFor(unsigned code) {
-    for (const StatusWords& each : statusWords)
-        if (each.code == code) return each.words;
-    return "the provider failed with status " + std::to_string(code);
-}
-
 std::string subject(const OperationRequest& request) {
     return std::string(operationName(request.operation)) + " of " + request.path.className;
 }
@@ -73,7 +46,7 @@ std::string subject(const OperationRequest& request) {
 [[noreturn]] void refuse(const OperationRequest& request, const OperationResult& result) {
     const auto code = static_cast<unsigned>(result.rc);
     const bool said = result.message && !result.message->empty();
-    throw CimError(code, said ? *result.message : subject(request) + ": " + wordsFor(code));
+    throw CimError(code, said ? *result.message : subject(request) + ": " + wordsForStatus(code));
 }
 
 template <class Element>
@@ -181,6 +154,15 @@ bool ObjectManager::isA(const std::string& nameSpace, const std::string& classNa
     return holds(catalogue(nameSpace)) || (isInterop(nameSpace) && holds(catalogue_));
 }
 
+bool ObjectManager::hasInstanceProvider(const std::string& nameSpace,
+                                        const std::string& className) const {
+    const auto& all = registrations().all();
+    return std::any_of(all.begin(), all.end(), [&](const Registration& each) {
+        return each.serves(Interface::Instance, nameSpace) &&
+               isA(nameSpace, each.className, className);
+    });
+}
+
 OperationResult ObjectManager::ask(OperationRequest request) {
     spellClassKeys(request.path);
     OperationResult result = answerOf(request);
@@ -210,11 +192,7 @@ bool ObjectManager::isServed(const OperationRequest& request) const {
     const ObjectPathValue& path = request.path;
     if (!isEnumeration(request.operation))
         return registrations().find(path.className, path.nameSpace, Interface::Instance) != nullptr;
-    const auto& all = registrations().all();
-    return std::any_of(all.begin(), all.end(), [&](const Registration& each) {
-        return each.serves(Interface::Instance, path.nameSpace) &&
-               isA(path.nameSpace, each.className, path.className);
-    });
+    return hasInstanceProvider(path.nameSpace, path.className);
 }
 
 OperationResult ObjectManager::answerOf(const OperationRequest& request) {

@@ -66,12 +66,14 @@ class ObjectManager {
     bool isA(const std::string& nameSpace, const std::string& className,
              const std::string& ancestor) const;
 
+    /// Whether a provider of instances is registered for the class or for one below it.
+    bool hasInstanceProvider(const std::string& nameSpace, const std::string& className) const;
+
     /// Asks the providers, or the classes of the interop namespace, and gives what they answer,
     /// each result with its namespace and with the schema's spelling of its class. An enumeration
     /// or GetInstance of a known class that nobody serves has no result. A status other than OK, a
     /// library that does not load and a list of results that breaks off become a CimError that has
-    /// a description.
-    /// Classes that keys name reach the providers as the schema spells them, too.
+    /// a description. Classes that keys name reach the providers as the schema spells them, too.
     OperationResult ask(OperationRequest request);
 
     const std::string& hostName() const noexcept { return hostName_; }

@@ -65,11 +65,10 @@ InstanceValue gottenInstance(ObjectManager& manager, const OperationRequest& req
 InstanceValue gottenInstance(ObjectManager& manager, const ObjectPathValue& path,
                              const std::optional<std::vector<std::string>>& properties);
 
-/// Leaves out the properties that are not in the list (names without case), but for keys where
-/// `keepKeys`. An absent list keeps all.
+/// Leaves out the properties that are not in the list (names without case), keys too. An absent
+/// list keeps all.
 void applyPropertyList(std::vector<InstanceValue>& instances,
-                       const std::optional<std::vector<std::string>>& properties,
-                       bool keepKeys = false);
+                       const std::optional<std::vector<std::string>>& properties);
 
 }  // namespace cmpihost::server
 

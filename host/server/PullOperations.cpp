@@ -16,8 +16,9 @@ constexpr std::uint32_t defaultTimeout = 30;
 constexpr std::uint32_t longestTimeout = 90;
 constexpr std::uint32_t mostObjects = 10000;
 
-std::uint32_t objectCount(const Parameters& given, std::uint32_t byDefault) {
-    const std::uint32_t count = given.number("MaxObjectCount").value_or(byDefault);
+/// The parameter MaxObjectCount; 0 where it is not given.
+std::uint32_t objectCount(const Parameters& given) {
+    const std::uint32_t count = given.number("MaxObjectCount").value_or(0);
     if (count > mostObjects)
         throw CimError(cimInvalidParameter,
                        "MaxObjectCount is at most " + std::to_string(mostObjects));
@@ -31,7 +32,7 @@ struct OpenOptions {
 };
 
 OpenOptions openOptions(const Parameters& given) {
-    const std::uint32_t count = objectCount(given, 0);
+    const std::uint32_t count = objectCount(given);
     if (given.text("FilterQueryLanguage") || given.text("FilterQuery"))
         throw CimError(cimFilteredEnumerationNotSupported, "enumerations are not filtered here");
     if (given.flag("ContinueOnError", false))
@@ -119,7 +120,7 @@ std::vector<ObjectPathValue> openedReferenceNames(const Call& call) {
 
 template <PulledKind kind>
 void pullNext(const Call& call, std::string& xml) {
-    const std::uint32_t count = objectCount(call.parameters, 0);
+    const std::uint32_t count = objectCount(call.parameters);
     writePiece(call.manager.openEnumerations().pull(*call.parameters.text("EnumerationContext"),
                                                     ownerOf(call), kind, count),
                call, xml);
@@ -161,49 +162,35 @@ OperationRow pulling(const char* name, void (*run)(const Call&, std::string&)) {
 
 const std::vector<OperationRow>& pullOperations() {
     using Holds = ParameterKind;
+    static const ParameterRow className = {"ClassName", Holds::ClassName, true};
+    static const ParameterRow source = {sourceInstance, Holds::InstanceName, true};
+    static const ParameterRow assocClass = {"AssocClass", Holds::ClassName};
+    static const ParameterRow resultClass = {"ResultClass", Holds::ClassName};
+    static const ParameterRow role = {"Role", Holds::Text};
+    static const ParameterRow resultRole = {"ResultRole", Holds::Text};
+    static const ParameterRow deepInheritance = {"DeepInheritance", Holds::Boolean};
+    static const ParameterRow classOrigin = {"IncludeClassOrigin", Holds::Boolean};
+    static const ParameterRow properties = {"PropertyList", Holds::PropertyList};
+    static const ParameterRow context = {"EnumerationContext", Holds::Text, true};
     static const std::vector<OperationRow> rows = {
-        opening("OpenEnumerateInstances",
-                {{"ClassName", Holds::ClassName, true},
-                 {"DeepInheritance", Holds::Boolean},
-                 {"IncludeClassOrigin", Holds::Boolean},
-                 {"PropertyList", Holds::PropertyList}},
+        opening("OpenEnumerateInstances", {className, deepInheritance, classOrigin, properties},
                 openInstances<enumeratedInstances>),
-        opening("OpenEnumerateInstancePaths", {{"ClassName", Holds::ClassName, true}},
-                openPaths<enumeratedInstanceNames>),
+        opening("OpenEnumerateInstancePaths", {className}, openPaths<enumeratedInstanceNames>),
         opening("OpenAssociatorInstances",
-                {{sourceInstance, Holds::InstanceName, true},
-                 {"AssocClass", Holds::ClassName},
-                 {"ResultClass", Holds::ClassName},
-                 {"Role", Holds::Text},
-                 {"ResultRole", Holds::Text},
-                 {"IncludeClassOrigin", Holds::Boolean},
-                 {"PropertyList", Holds::PropertyList}},
+                {source, assocClass, resultClass, role, resultRole, classOrigin, properties},
                 openInstances<openedAssociators>),
-        opening("OpenAssociatorInstancePaths",
-                {{sourceInstance, Holds::InstanceName, true},
-                 {"AssocClass", Holds::ClassName},
-                 {"ResultClass", Holds::ClassName},
-                 {"Role", Holds::Text},
-                 {"ResultRole", Holds::Text}},
+        opening("OpenAssociatorInstancePaths", {source, assocClass, resultClass, role, resultRole},
                 openPaths<openedAssociatorNames>),
-        opening("OpenReferenceInstances",
-                {{sourceInstance, Holds::InstanceName, true},
-                 {"ResultClass", Holds::ClassName},
-                 {"Role", Holds::Text},
-                 {"IncludeClassOrigin", Holds::Boolean},
-                 {"PropertyList", Holds::PropertyList}},
+        opening("OpenReferenceInstances", {source, resultClass, role, classOrigin, properties},
                 openInstances<openedReferences>),
-        opening("OpenReferenceInstancePaths",
-                {{sourceInstance, Holds::InstanceName, true},
-                 {"ResultClass", Holds::ClassName},
-                 {"Role", Holds::Text}},
+        opening("OpenReferenceInstancePaths", {source, resultClass, role},
                 openPaths<openedReferenceNames>),
         opening("OpenQueryInstances", {{"ReturnQueryResultClass", Holds::Boolean}}, refuseQuery),
         pulling("PullInstancesWithPath", pullNext<PulledKind::InstancesWithPath>),
         pulling("PullInstancePaths", pullNext<PulledKind::InstancePaths>),
         pulling("PullInstances", pullNext<PulledKind::Instances>),
-        {"CloseEnumeration", {{"EnumerationContext", Holds::Text, true}}, closeEnumeration},
-        {"EnumerationCount", {{"EnumerationContext", Holds::Text, true}}, refuseCount}};
+        {"CloseEnumeration", {context}, closeEnumeration},
+        {"EnumerationCount", {context}, refuseCount}};
     return rows;
 }
 

@@ -15,7 +15,7 @@ void beginResponse(std::string& xml, const Message& message);
 void endResponse(std::string& xml, const Message& message);
 
 /// The response that says that the operation failed. The description is cut at 500 characters; an
-/// empty one becomes the name of the status.
+/// empty one becomes "it failed".
 std::string errorResponse(const Message& message, unsigned code, const std::string& description);
 
 }  // namespace cmpihost::server

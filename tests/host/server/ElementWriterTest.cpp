@@ -290,14 +290,6 @@ TEST(ElementWriter, ListsHaveTheFormsThatOperationsAnswer) {
     EXPECT_EQ(paths("EnumerateInstanceNames", writeInstanceNames), twice(name));
     EXPECT_EQ(paths("ReferenceNames", writeObjectPaths),
               twice("<OBJECTPATH>" + wholePath + "</OBJECTPATH>"));
-    // Those of the pull operations, whose answers have more in them.
-    std::string pulledInstances;
-    writeInstancesWithPath(pulledInstances, {instance}, elementSite, false);
-    EXPECT_EQ(pulledInstances,
-              "<VALUE.INSTANCEWITHPATH>" + wholePath + properties + "</VALUE.INSTANCEWITHPATH>");
-    std::string pulledPaths;
-    writeInstancePaths(pulledPaths, {path, path}, elementSite);
-    EXPECT_EQ(pulledPaths, wholePath + wholePath);
 }
 
 TEST(ElementWriter, WhatComesOutOfOperationsAndMethodsTellsItsType) {
