@@ -2,6 +2,9 @@
 // known to every object manager, and so they are here.
 #include "host/mof/QualifierTypes.h"
 
+#include <algorithm>
+#include <iterator>
+
 #include "base/Ascii.h"
 
 namespace cmpihost {
@@ -44,6 +47,9 @@ constexpr StandardRow standard[] = {
     {"Version", restricted},
     {"Weak", fixed},
 };
+
+constexpr const char* translatable[] = {"Alias",    "BitValues", "Description", "DisplayName",
+                                        "Revision", "Units",     "Values",      "Version"};
 
 Inheritance standardInheritance(const std::string& name) {
     for (const StandardRow& row : standard)
@@ -88,6 +94,15 @@ Inheritance QualifierTypes::inheritanceOf(const mof::Qualifier& qualifier) const
     const Inheritance known =
         type == nullptr ? standardInheritance(qualifier.name) : with(type->flavor, {});
     return with(qualifier.flavor, known);
+}
+
+bool QualifierTypes::isTranslatable(const mof::Qualifier& qualifier) const {
+    if (qualifier.flavor.translatable) return true;
+    if (const mof::QualifierType* const type = find(qualifier.name))
+        return type->flavor.translatable;
+    return std::any_of(std::begin(translatable), std::end(translatable), [&](const char* name) {
+        return base::equalsIgnoreCase(name, qualifier.name);
+    });
 }
 
 }  // namespace cmpihost

@@ -32,6 +32,9 @@ class QualifierTypes {
     /// the standard, else it is inherited and may be overridden.
     Inheritance inheritanceOf(const mof::Qualifier& qualifier) const;
 
+    /// Whether its text may be told in several languages, by the same rules.
+    bool isTranslatable(const mof::Qualifier& qualifier) const;
+
   private:
     std::map<std::string, mof::QualifierType> declared_;
 };

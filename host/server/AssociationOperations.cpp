@@ -52,7 +52,6 @@ std::vector<std::string> tiedClasses(const Call& call, Operation operation) {
         call.manager, call.nameSpace, source, filter);
 }
 
-/// Throws CimError for more than mostClassBytes.
 void writeClasses(const Call& call, Operation operation, std::string& xml) {
     ClassView view;
     view.qualifiers = call.parameters.flag("IncludeQualifiers", false);
@@ -64,10 +63,7 @@ void writeClasses(const Call& call, Operation operation, std::string& xml) {
         writeClassPath(xml, name, call.site());
         writeClass(xml, resolvedClass(schema, name).value(), schema.qualifierTypes(), view);
         xml += "</VALUE.OBJECTWITHPATH>";
-        if (xml.size() > mostClassBytes)
-            throw CimError(cimServerLimitsExceeded,
-                           "these classes are more than the server sends at once, 4 MiB; ask for "
-                           "their names");
+        checkClassBytes(xml.size(), "their names");
     }
 }
 

@@ -67,15 +67,10 @@ void getClass(const Call& call, std::string& xml) {
 void enumerateClasses(const Call& call, std::string& xml) {
     const Schema& schema = call.manager.schema(call.nameSpace);
     const ClassView view = viewOf(call.parameters);
-    const std::size_t before = xml.size();
     xml += "<IRETURNVALUE>";
     for (const std::string& name : enumeratedClassNames(call)) {
         writeClass(xml, *resolvedClass(schema, name), schema.qualifierTypes(), view);
-        if (xml.size() - before > mostClassBytes) {
-            throw CimError(cimServerLimitsExceeded,
-                           "these classes are more than the server sends at once, 4 MiB; ask for "
-                           "the classes below one class, or for one after the other");
-        }
+        checkClassBytes(xml.size(), "the classes below one class, or for one after the other");
     }
     xml += "</IRETURNVALUE>";
 }

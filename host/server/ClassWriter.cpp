@@ -6,6 +6,7 @@
 #include <iterator>
 
 #include "base/Ascii.h"
+#include "host/server/CimError.h"
 #include "host/server/ElementWriter.h"
 
 namespace cmpihost::server {
@@ -167,9 +168,7 @@ class MembersWriter {
         writeAttribute(xml_, "NAME", declared.name);
         writeAttribute(xml_, "TYPE", mof::nameOf(type));
         if (qualifier.from != &owner_) xml_ += " PROPAGATED=\"true\"";
-        writeFlavors(
-            xml_, qualifier.inheritance,
-            declared.flavor.translatable || (known != nullptr && known->flavor.translatable));
+        writeFlavors(xml_, qualifier.inheritance, types_.isTranslatable(declared));
         xml_ += '>';
         if (declared.value) {
             if (!isNullConstant(*declared.value))
@@ -243,6 +242,14 @@ void writeScope(std::string& xml, const std::vector<std::string>& scopes) {
 }
 
 }  // namespace
+
+void checkClassBytes(std::size_t bytes, const std::string& instead) {
+    constexpr std::size_t most = 4U << 20U;
+    if (bytes > most)
+        throw CimError(
+            cimServerLimitsExceeded,
+            "these classes are more than the server sends at once, 4 MiB; ask for " + instead);
+}
 
 void writeClass(std::string& xml, const ResolvedClass& described, const QualifierTypes& types,
                 const ClassView& view) {

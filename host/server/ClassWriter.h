@@ -12,9 +12,6 @@
 /// these.
 namespace cmpihost::server {
 
-/// A response with more bytes of classes is larger than anybody can use: a whole CIM schema.
-constexpr std::size_t mostClassBytes = 4U << 20U;
-
 /// What of a class a client wants to see.
 struct ClassView {
     /// Only what the class itself declares or overrides.
@@ -28,6 +25,10 @@ struct ClassView {
 /// CLASS. `types` are those of the schema of the class.
 void writeClass(std::string& xml, const ResolvedClass& described, const QualifierTypes& types,
                 const ClassView& view);
+
+/// Throws CimError with cimServerLimitsExceeded for an answer with so many bytes of classes that
+/// nobody can use it, as a whole CIM schema makes it; `instead` is what a client may ask for.
+void checkClassBytes(std::size_t bytes, const std::string& instead);
 
 /// QUALIFIER.DECLARATION.
 void writeQualifierDeclaration(std::string& xml, const mof::QualifierType& type);

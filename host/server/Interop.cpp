@@ -13,6 +13,7 @@ namespace {
 
 constexpr const char* managerClass = "KORVA_ObjectManager";
 constexpr const char* nameSpaceClass = "CIM_Namespace";
+constexpr const char* otherNameSpaceClass = "__Namespace";
 constexpr const char* systemClass = "KORVA_ComputerSystem";
 constexpr const char* managerName = "cmpihost";
 
@@ -145,9 +146,14 @@ class __Namespace {
 };
 )mof";
 
-Schema interopSchema() {
+Schema interopSchema(mof::Document others) {
     Schema schema;
     schema.add(mof::parse(interopMof, Interop::nameSpace));
+    others.classes.erase(
+        std::remove_if(others.classes.begin(), others.classes.end(),
+                       [&](const mof::Class& each) { return schema.find(each.name) != nullptr; }),
+        others.classes.end());
+    schema.add(std::move(others));
     return schema;
 }
 
@@ -175,16 +181,17 @@ std::uint64_t whole(std::chrono::nanoseconds time, std::chrono::nanoseconds unit
 }  // namespace
 
 Interop::Interop(std::string hostName, std::vector<std::string> nameSpaces,
-                 const Statistics& statistics)
+                 const Statistics& statistics, mof::Document others)
     : hostName_(std::move(hostName)),
       nameSpaces_(std::move(nameSpaces)),
       statistics_(statistics),
-      schema_(interopSchema()),
+      schema_(interopSchema(std::move(others))),
       catalogue_(schema_) {}
 
-// The schema declares nothing but what is served and what that descends from.
 bool Interop::serves(const std::string& className) const {
-    return schema_.find(className) != nullptr;
+    const auto served = {managerClass, nameSpaceClass, otherNameSpaceClass};
+    return std::any_of(served.begin(), served.end(),
+                       [&](const char* each) { return schema_.isA(each, className); });
 }
 
 OperationResult Interop::ask(const OperationRequest& request) const {
@@ -225,7 +232,7 @@ std::vector<InstanceValue> Interop::instances() const {
     std::vector<InstanceValue> result = {objectManager()};
     for (const std::string& name : nameSpaces_) result.push_back(nameSpaceInstance(name));
     for (const std::string& name : nameSpaces_)
-        result.push_back(instanceOf("__Namespace", {{"Name", name}}));
+        result.push_back(instanceOf(otherNameSpaceClass, {{"Name", name}}));
     return result;
 }
 

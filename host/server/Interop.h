@@ -16,14 +16,17 @@ class Interop {
   public:
     static constexpr const char* nameSpace = "root/interop";
 
-    /// `nameSpaces` are all that the server has, this one too. `statistics` outlives this object.
-    Interop(std::string hostName, std::vector<std::string> nameSpaces,
-            const Statistics& statistics);
+    /// `nameSpaces` are all that the server has, this one too. `others` are classes of providers
+    /// that are registered here; of those that bear the name of one of the above, the one above
+    /// counts. `statistics` outlives this object.
+    Interop(std::string hostName, std::vector<std::string> nameSpaces, const Statistics& statistics,
+            mof::Document others = {});
 
+    /// The classes that are served here, and the others.
     const Schema& schema() const noexcept { return schema_; }
     const ClassCatalogue& catalogue() const noexcept { return catalogue_; }
 
-    /// Whether the class, or one below it, is one of those that are served here.
+    /// Whether this object has instances of the class, or of one below it.
     bool serves(const std::string& className) const;
 
     /// Answers as a provider of these classes does: enumerations with the instances of the class

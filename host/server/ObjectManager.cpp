@@ -6,6 +6,7 @@
 #include "host/server/CimError.h"
 
 #include <algorithm>
+#include <set>
 #include <utility>
 
 namespace cmpihost::server {
@@ -22,6 +23,22 @@ std::vector<std::string> namesOfSpaces(const Registrations& registrations) {
     if (names.empty()) names.emplace_back("root/cimv2");
     names.emplace_back(Interop::nameSpace);
     return names;
+}
+
+/// The classes that are registered for the interop namespace, and what they descend from.
+mof::Document classesForInterop(const Schema& schema, const Registrations& registrations) {
+    mof::Document document;
+    for (const mof::QualifierType* const type : schema.qualifierTypes().all())
+        document.qualifierTypes.push_back(*type);
+    std::set<const mof::Class*> added;
+    for (const Registration& each : registrations.all()) {
+        if (!each.isFor(Interop::nameSpace)) continue;
+        const mof::Class* found = schema.find(each.className);
+        for (; found != nullptr && added.insert(found).second;
+             found = schema.find(found->superclass))
+            document.classes.push_back(*found);
+    }
+    return document;
 }
 
 bool isEnumeration(Operation operation) {
@@ -68,7 +85,8 @@ ObjectManager::ObjectManager(ObjectManagerSetup setup)
       catalogue_(schema_),
       broker_(&catalogue_),
       router_(broker_, catalogue_, std::move(setup.registrations), std::move(setup.libraryFolders)),
-      interop_(hostName_, namesOfSpaces(router_.registrations()), statistics_),
+      interop_(hostName_, namesOfSpaces(router_.registrations()), statistics_,
+               classesForInterop(schema_, router_.registrations())),
       nameSpaces_(readNameSpaces()) {
     broker_.setMessageSink(std::move(setup.messageSink));
 }
@@ -91,11 +109,9 @@ std::vector<ObjectManager::NameSpace> ObjectManager::readNameSpaces() const {
 /// Adds a class and all that it descends from.
 void ObjectManager::addLine(NameSpace& space, const std::string& className) const {
     std::optional<std::string_view> each = className;
-    // What is registered for the interop namespace may come from a schema of its maker.
     while (each && !each->empty()) {
         if (!space.classes.emplace(base::toLower(*each), *each).second) return;
-        const auto above = catalogue(space.name).superclassOf(*each);
-        each = above ? above : catalogue_.superclassOf(*each);
+        each = catalogue(space.name).superclassOf(*each);
     }
 }
 
@@ -147,11 +163,8 @@ std::string ObjectManager::knownClass(const std::string& nameSpace,
 
 bool ObjectManager::isA(const std::string& nameSpace, const std::string& className,
                         const std::string& ancestor) const {
-    const auto holds = [&](const ClassCatalogue& classes) {
-        const ClassRelation relation = classRelation(&classes, className, ancestor);
-        return relation == ClassRelation::Same || relation == ClassRelation::Subclass;
-    };
-    return holds(catalogue(nameSpace)) || (isInterop(nameSpace) && holds(catalogue_));
+    const ClassRelation relation = classRelation(&catalogue(nameSpace), className, ancestor);
+    return relation == ClassRelation::Same || relation == ClassRelation::Subclass;
 }
 
 bool ObjectManager::hasInstanceProvider(const std::string& nameSpace,

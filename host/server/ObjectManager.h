@@ -37,9 +37,10 @@ struct ObjectManagerSetup {
 };
 
 /// Its namespaces are those that registrations name (root/cimv2 where they name none) and the
-/// interop namespace. A class of the schema is known in each of them but the last, a class that is
-/// registered only where it is registered. Names of namespaces and classes compare without case.
-/// Any threads may ask at once.
+/// interop namespace. A class of the schema is known in each of them, but in the last one only
+/// where it is registered there, or above one that is; a class that is registered and in no schema
+/// is known where it is registered. Names of namespaces and classes compare without case. Any
+/// threads may ask at once.
 class ObjectManager {
   public:
     explicit ObjectManager(ObjectManagerSetup setup);

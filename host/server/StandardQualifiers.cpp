@@ -17,7 +17,6 @@ struct StandardQualifier {
     const char* name;
     Type type;
     bool array;
-    bool translatable;
     /// With a blank between two.
     const char* scopes;
 };
@@ -27,35 +26,35 @@ constexpr const char* values = "property reference method parameter";
 constexpr const char* classes = "class association indication";
 
 constexpr StandardQualifier standardQualifiers[] = {
-    {"Abstract", Type::Boolean, false, false, classes},
-    {"Aggregate", Type::Boolean, false, false, "reference"},
-    {"Aggregation", Type::Boolean, false, false, "association"},
-    {"ArrayType", Type::String, false, false, "property parameter"},
-    {"Association", Type::Boolean, false, false, "association"},
-    {"Counter", Type::Boolean, false, false, features},
-    {"Deprecated", Type::String, true, false, "any"},
-    {"Description", Type::String, false, true, "any"},
-    {"DisplayName", Type::String, false, true, "any"},
-    {"Experimental", Type::Boolean, false, false, "any"},
-    {"Gauge", Type::Boolean, false, false, features},
-    {"In", Type::Boolean, false, false, "parameter"},
-    {"Key", Type::Boolean, false, false, "property reference"},
-    {"MappingStrings", Type::String, true, false, "any"},
-    {"Max", Type::UInt32, false, false, "reference"},
-    {"MaxLen", Type::UInt32, false, false, features},
-    {"Min", Type::UInt32, false, false, "reference"},
-    {"ModelCorrespondence", Type::String, true, false, "any"},
-    {"Out", Type::Boolean, false, false, "parameter"},
-    {"Override", Type::String, false, false, "property reference method"},
-    {"Propagated", Type::String, false, false, "property"},
-    {"Read", Type::Boolean, false, false, "property"},
-    {"Required", Type::Boolean, false, false, values},
-    {"Units", Type::String, false, true, features},
-    {"ValueMap", Type::String, true, false, features},
-    {"Values", Type::String, true, true, features},
-    {"Version", Type::String, false, true, classes},
-    {"Weak", Type::Boolean, false, false, "reference"},
-    {"Write", Type::Boolean, false, false, "property"},
+    {"Abstract", Type::Boolean, false, classes},
+    {"Aggregate", Type::Boolean, false, "reference"},
+    {"Aggregation", Type::Boolean, false, "association"},
+    {"ArrayType", Type::String, false, "property parameter"},
+    {"Association", Type::Boolean, false, "association"},
+    {"Counter", Type::Boolean, false, features},
+    {"Deprecated", Type::String, true, "any"},
+    {"Description", Type::String, false, "any"},
+    {"DisplayName", Type::String, false, "any"},
+    {"Experimental", Type::Boolean, false, "any"},
+    {"Gauge", Type::Boolean, false, features},
+    {"In", Type::Boolean, false, "parameter"},
+    {"Key", Type::Boolean, false, "property reference"},
+    {"MappingStrings", Type::String, true, "any"},
+    {"Max", Type::UInt32, false, "reference"},
+    {"MaxLen", Type::UInt32, false, features},
+    {"Min", Type::UInt32, false, "reference"},
+    {"ModelCorrespondence", Type::String, true, "any"},
+    {"Out", Type::Boolean, false, "parameter"},
+    {"Override", Type::String, false, "property reference method"},
+    {"Propagated", Type::String, false, "property"},
+    {"Read", Type::Boolean, false, "property"},
+    {"Required", Type::Boolean, false, values},
+    {"Units", Type::String, false, features},
+    {"ValueMap", Type::String, true, features},
+    {"Values", Type::String, true, features},
+    {"Version", Type::String, false, classes},
+    {"Weak", Type::Boolean, false, "reference"},
+    {"Write", Type::Boolean, false, "property"},
 };
 
 mof::QualifierType declarationOf(const StandardQualifier& row, const QualifierTypes& types) {
@@ -71,7 +70,7 @@ mof::QualifierType declarationOf(const StandardQualifier& row, const QualifierTy
     mof::Qualifier bare;
     bare.name = row.name;
     const Inheritance inheritance = types.inheritanceOf(bare);
-    result.flavor = {inheritance.toSubclass, inheritance.overridable, row.translatable};
+    result.flavor = {inheritance.toSubclass, inheritance.overridable, types.isTranslatable(bare)};
     return result;
 }
 

@@ -142,6 +142,30 @@ TEST(ClassOperations, ClassesAreListedFromTheRootsDownwards) {
     }
 }
 
+TEST(ClassOperations, ClassesThatAreRegisteredForTheInteropNamespaceAreKnownThere) {
+    ObjectManager& manager = foreignManager(
+        registration("TEST_SparePart", "Spares", "foreign_parts", "instance", "root/interop"));
+    const auto asked = [&](const char* name, const std::string& parameters) {
+        return respond(manager, operation(name, parameters, "root/interop"));
+    };
+    const auto classOf = [&](const char* name) {
+        return asked("GetClass", className("ClassName", name) + wholeClass);
+    };
+    EXPECT_EQ(namesInTags(classOf("test_sparepart"), "PROPERTY"), "Id");
+    EXPECT_EQ(namesInTags(classOf("TEST_Part"), "PROPERTY"), "Id");
+    EXPECT_EQ(error(classOf("TEST_Thing")), "6: TEST_Thing: no such class in root/interop");
+    EXPECT_EQ(namesInTags(asked("EnumerateClassNames", ""), "CLASSNAME"),
+              "__Namespace CIM_ManagedElement TEST_Part");
+    const auto gotten = [&](const std::string& key) {
+        return asked("GetInstance",
+                     parameter("InstanceName", instanceName("TEST_SparePart", {{key, "spare"}})));
+    };
+    EXPECT_EQ(content(gotten("ID")),
+              "<IRETURNVALUE><INSTANCE CLASSNAME=\"TEST_SparePart\"><PROPERTY NAME=\"Id\" "
+              "TYPE=\"string\"><VALUE>spare</VALUE></PROPERTY></INSTANCE></IRETURNVALUE>");
+    EXPECT_EQ(error(gotten("Name")), "4: TEST_SparePart.Name: the class has no such key");
+}
+
 TEST(ClassOperations, AnAnswerWithoutClassesIsStillAnAnswer) {
     const std::string leaf = className("ClassName", "KORVA_RunningOS");
     EXPECT_EQ(classAnswer("EnumerateClassNames", leaf, "root/cimv2"),
@@ -169,22 +193,29 @@ TEST(ClassOperations, QualifiersAreDeclared) {
               "</IRETURNVALUE>");
 }
 
-TEST(ClassOperations, EveryQualifierOfTheClassesHasADeclarationOfItsType) {
+/// The text without what stands between the two, these included.
+std::string leftOut(std::string text, const std::string& start, const std::string& end) {
+    for (std::size_t at = text.find(start); at != std::string::npos; at = text.find(start, at))
+        text.erase(at, text.find(end, at + start.size()) + end.size() - at);
+    return text;
+}
+
+TEST(ClassOperations, EveryQualifierOfTheClassesHasADeclarationOfItsTypeAndFlavors) {
     const std::string nothing;
     for (const char* nameSpace : {"root/cimv2", "root/interop"}) {
-        const std::string declared = classAnswer("EnumerateQualifiers", nothing, nameSpace);
-        const std::string classes = classAnswer(
-            "EnumerateClasses", deepInheritance + value("LocalOnly", "FALSE"), nameSpace);
+        const std::string declared =
+            leftOut(classAnswer("EnumerateQualifiers", nothing, nameSpace), " ISARRAY=\"", "\"");
+        const std::string classes =
+            leftOut(classAnswer("EnumerateClasses", deepInheritance + value("LocalOnly", "FALSE"),
+                                nameSpace),
+                    " PROPAGATED=\"", "\"");
         const std::string start = "<QUALIFIER NAME=\"";
         std::size_t met = 0;
         for (std::size_t at = classes.find(start); at != std::string::npos;
              at = classes.find(start, at + 1), ++met) {
             const std::size_t name = at + start.size();
-            // The name and the type behind it.
-            const std::size_t type = classes.find("TYPE=\"", name);
-            const std::size_t end = classes.find('"', type + 6);
-            const std::string both = classes.substr(name, end - name + 1);
-            EXPECT_EQ(count(declared, "<QUALIFIER.DECLARATION NAME=\"" + both), 1U) << both;
+            const std::string all = classes.substr(name, classes.find('>', name) - name + 1);
+            EXPECT_EQ(count(declared, "<QUALIFIER.DECLARATION NAME=\"" + all), 1U) << all;
         }
         EXPECT_GT(met, 40U);
     }

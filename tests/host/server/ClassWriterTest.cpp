@@ -55,11 +55,13 @@ TEST(ClassWriter, AClassHasWhatItDeclaresAndInheritsInTheOrderThatClientsCheck) 
     EXPECT_EQ(
         writtenClass(familyMof, view),
         "<CLASS NAME=\"B\" SUPERCLASS=\"A\">"
-        "<QUALIFIER NAME=\"Description\" TYPE=\"string\" PROPAGATED=\"true\"><VALUE>a &lt;base&gt;"
+        "<QUALIFIER NAME=\"Description\" TYPE=\"string\" PROPAGATED=\"true\" "
+        "TRANSLATABLE=\"true\"><VALUE>a &lt;base&gt;"
         "</VALUE></QUALIFIER>"
         "<QUALIFIER NAME=\"Association\" TYPE=\"boolean\" OVERRIDABLE=\"false\"><VALUE>TRUE</VALUE>"
         "</QUALIFIER>"
-        "<QUALIFIER NAME=\"Version\" TYPE=\"string\" TOSUBCLASS=\"false\"><VALUE>2.0</VALUE>"
+        "<QUALIFIER NAME=\"Version\" TYPE=\"string\" TOSUBCLASS=\"false\" "
+        "TRANSLATABLE=\"true\"><VALUE>2.0</VALUE>"
         "</QUALIFIER>"
         "<PROPERTY NAME=\"q\" TYPE=\"uint8\" CLASSORIGIN=\"A\">"
         "<QUALIFIER NAME=\"Override\" TYPE=\"string\" TOSUBCLASS=\"false\"><VALUE>Q</VALUE>"
@@ -75,7 +77,8 @@ TEST(ClassWriter, AClassHasWhatItDeclaresAndInheritsInTheOrderThatClientsCheck) 
         "<VALUE>TRUE</VALUE></QUALIFIER></PROPERTY>"
         "<METHOD NAME=\"Stop\" TYPE=\"uint32\" CLASSORIGIN=\"B\"></METHOD>"
         "<METHOD NAME=\"Start\" TYPE=\"uint32\" CLASSORIGIN=\"A\" PROPAGATED=\"true\">"
-        "<QUALIFIER NAME=\"Description\" TYPE=\"string\" PROPAGATED=\"true\"><VALUE>starts</VALUE>"
+        "<QUALIFIER NAME=\"Description\" TYPE=\"string\" PROPAGATED=\"true\" "
+        "TRANSLATABLE=\"true\"><VALUE>starts</VALUE>"
         "</QUALIFIER>"
         "<PARAMETER NAME=\"How\" TYPE=\"string\"><QUALIFIER NAME=\"In\" TYPE=\"boolean\" "
         "PROPAGATED=\"true\" OVERRIDABLE=\"false\"><VALUE>TRUE</VALUE></QUALIFIER></PARAMETER>"
@@ -106,7 +109,8 @@ TEST(ClassWriter, AViewLeavesOutWhatNobodyAskedFor) {
               "<CLASS NAME=\"B\" SUPERCLASS=\"A\">"
               "<QUALIFIER NAME=\"Association\" TYPE=\"boolean\" OVERRIDABLE=\"false\"><VALUE>TRUE"
               "</VALUE></QUALIFIER>"
-              "<QUALIFIER NAME=\"Version\" TYPE=\"string\" TOSUBCLASS=\"false\"><VALUE>2.0</VALUE>"
+              "<QUALIFIER NAME=\"Version\" TYPE=\"string\" TOSUBCLASS=\"false\" "
+              "TRANSLATABLE=\"true\"><VALUE>2.0</VALUE>"
               "</QUALIFIER>"
               "<PROPERTY.REFERENCE NAME=\"End\" REFERENCECLASS=\"A\"><QUALIFIER NAME=\"Key\" "
               "TYPE=\"boolean\" OVERRIDABLE=\"false\"><VALUE>TRUE</VALUE></QUALIFIER>"
@@ -182,7 +186,8 @@ TEST(ClassWriter, NamesOfValuesStandOnlyBesideAsManyNumbers) {
               "<QUALIFIER NAME=\"ValueMap\" TYPE=\"string\"><VALUE.ARRAY><VALUE>1</VALUE>"
               "<VALUE>2</VALUE></VALUE.ARRAY></QUALIFIER>");
     EXPECT_EQ(writtenQualifier("Values{\"none\", \"one\"}"),
-              "<QUALIFIER NAME=\"Values\" TYPE=\"string\"><VALUE.ARRAY><VALUE>none</VALUE>"
+              "<QUALIFIER NAME=\"Values\" TYPE=\"string\" "
+              "TRANSLATABLE=\"true\"><VALUE.ARRAY><VALUE>none</VALUE>"
               "<VALUE>one</VALUE></VALUE.ARRAY></QUALIFIER>");
 }
 

@@ -2,8 +2,10 @@
 
 #include <gmock/gmock.h>
 
+#include <iterator>
 #include <thread>
 
+#include "base/Ascii.h"
 #include "host/server/Operations.h"
 #include "host/server/ServerFixture.h"
 
@@ -16,23 +18,99 @@ using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::StartsWith;
 
-TEST(Operations, HaveTheirNamesWithoutCase) {
-    for (const char* name :
-         {"GetInstance",           "enumerateinstances", "ENUMERATEINSTANCENAMES",
-          "GetProperty",           "SetProperty",        "CreateInstance",
-          "ModifyInstance",        "DeleteInstance",     "ExecQuery",
-          "Associators",           "AssociatorNames",    "References",
-          "ReferenceNames",        "GetClass",           "EnumerateClasses",
-          "EnumerateClassNames",   "CreateClass",        "ModifyClass",
-          "DeleteClass",           "GetQualifier",       "EnumerateQualifiers",
-          "SetQualifier",          "DeleteQualifier",    "OpenEnumerateInstances",
-          "PullInstancesWithPath", "CloseEnumeration"}) {
-        const OperationRow* const row = findOperation(name);
-        ASSERT_NE(row, nullptr) << name;
-        EXPECT_STRCASEEQ(row->name, name);
+/// An operation and what it takes: "!" is a parameter that has to be there.
+struct OperationNames {
+    const char* name;
+    const char* parameters;
+};
+
+constexpr const char* pullParameters = "EnumerationContext! MaxObjectCount!";
+constexpr OperationNames operationNames[] = {
+    {"GetInstance", "InstanceName! LocalOnly IncludeQualifiers IncludeClassOrigin PropertyList"},
+    {"EnumerateInstances",
+     "ClassName! LocalOnly DeepInheritance IncludeQualifiers IncludeClassOrigin PropertyList"},
+    {"EnumerateInstanceNames", "ClassName!"},
+    {"GetProperty", "InstanceName! PropertyName!"},
+    {"SetProperty", "InstanceName! PropertyName! NewValue"},
+    {"CreateInstance", "NewInstance!"},
+    {"ModifyInstance", "ModifiedInstance! IncludeQualifiers PropertyList"},
+    {"DeleteInstance", "InstanceName!"},
+    {"ExecQuery", "QueryLanguage! Query!"},
+    {"Associators",
+     "ObjectName! AssocClass ResultClass Role ResultRole IncludeQualifiers IncludeClassOrigin "
+     "PropertyList"},
+    {"AssociatorNames", "ObjectName! AssocClass ResultClass Role ResultRole"},
+    {"References",
+     "ObjectName! ResultClass Role IncludeQualifiers IncludeClassOrigin PropertyList"},
+    {"ReferenceNames", "ObjectName! ResultClass Role"},
+    {"GetClass", "ClassName! LocalOnly IncludeQualifiers IncludeClassOrigin PropertyList"},
+    {"EnumerateClasses",
+     "ClassName DeepInheritance LocalOnly IncludeQualifiers IncludeClassOrigin"},
+    {"EnumerateClassNames", "ClassName DeepInheritance"},
+    {"GetQualifier", "QualifierName!"},
+    {"EnumerateQualifiers", ""},
+    // What is refused whatever comes.
+    {"CreateClass", "NewClass"},
+    {"ModifyClass", "ModifiedClass"},
+    {"DeleteClass", "ClassName"},
+    {"SetQualifier", "QualifierDeclaration"},
+    {"DeleteQualifier", "QualifierName"},
+    {"OpenQueryInstances",
+     "ReturnQueryResultClass FilterQueryLanguage FilterQuery OperationTimeout ContinueOnError "
+     "MaxObjectCount"},
+    {"EnumerationCount", "EnumerationContext!"},
+    {"OpenEnumerateInstances",
+     "ClassName! DeepInheritance IncludeClassOrigin PropertyList FilterQueryLanguage FilterQuery "
+     "OperationTimeout ContinueOnError MaxObjectCount"},
+    {"OpenEnumerateInstancePaths",
+     "ClassName! FilterQueryLanguage FilterQuery OperationTimeout ContinueOnError MaxObjectCount"},
+    {"OpenAssociatorInstances",
+     "InstanceName! AssocClass ResultClass Role ResultRole IncludeClassOrigin PropertyList "
+     "FilterQueryLanguage FilterQuery OperationTimeout ContinueOnError MaxObjectCount"},
+    {"OpenAssociatorInstancePaths",
+     "InstanceName! AssocClass ResultClass Role ResultRole FilterQueryLanguage FilterQuery "
+     "OperationTimeout ContinueOnError MaxObjectCount"},
+    {"OpenReferenceInstances",
+     "InstanceName! ResultClass Role IncludeClassOrigin PropertyList FilterQueryLanguage "
+     "FilterQuery OperationTimeout ContinueOnError MaxObjectCount"},
+    {"OpenReferenceInstancePaths",
+     "InstanceName! ResultClass Role FilterQueryLanguage FilterQuery OperationTimeout "
+     "ContinueOnError MaxObjectCount"},
+    {"PullInstancesWithPath", pullParameters},
+    {"PullInstancePaths", pullParameters},
+    {"PullInstances", pullParameters},
+    {"CloseEnumeration", "EnumerationContext!"},
+};
+
+TEST(Operations, HaveTheirNamesWithoutCaseAndTheirParameters) {
+    for (const OperationNames& each : operationNames) {
+        for (const std::string& name : {std::string(each.name), base::toLower(each.name)}) {
+            const OperationRow* const row = findOperation(name);
+            ASSERT_NE(row, nullptr) << name;
+            EXPECT_EQ(row->name, std::string(each.name));
+            std::string parameters;
+            for (const ParameterRow& parameter : row->parameters) {
+                parameters += parameters.empty() ? "" : " ";
+                parameters += parameter.name;
+                parameters += parameter.required ? "!" : "";
+            }
+            EXPECT_EQ(parameters, each.parameters) << name;
+        }
     }
+    std::size_t rows = 0;
+    for (const auto* const group :
+         {&instanceOperations(), &associationOperations(), &classOperations(), &pullOperations()})
+        rows += group->size();
+    EXPECT_EQ(rows, std::size(operationNames));
     EXPECT_EQ(findOperation(""), nullptr);
     EXPECT_EQ(findOperation("GetInstances"), nullptr);
+}
+
+TEST(Operations, KnowNoneButTheNamespacesThatThereAre) {
+    for (const OperationNames& each : operationNames)
+        EXPECT_EQ(error(respond(operation(each.name, {}, "root/nope"))),
+                  "3: root/nope: no such namespace")
+            << each.name;
 }
 
 /// What an operation is refused for, of several things that are wrong with it.

@@ -92,6 +92,9 @@ TEST(InstanceChanges, SentInstancesThatDoNotFitTheSchemaAreRefused) {
     EXPECT_EQ(create(property("U8", "uint8", "256")), "4: U8: '256' is no uint8");
     EXPECT_EQ(modify("TEST_Thing", property("Nonsense", "string", "x")),
               "12: TEST_Thing has no property Nonsense");
+    EXPECT_EQ(foreign("SetProperty", thingNamed("first") + value("PropertyName", "Colour") +
+                                         value("NewValue", "1")),
+              "12: TEST_Thing has no property Colour");
     EXPECT_EQ(modify("TEST_Part", ""), "4: the instance is of TEST_Part, its path of TEST_Thing");
     EXPECT_EQ(foreign("SetProperty",
                       thingNamed("first") + value("PropertyName", "List") + value("NewValue", "1")),

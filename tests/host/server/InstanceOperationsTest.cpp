@@ -59,6 +59,7 @@ TEST(InstanceOperations, EnumerateEachClassUnderTheNamesOfItsAncestors) {
         {"CIM_System", {"KORVA_ComputerSystem"}},
         {"CIM_ComputerSystem", {"KORVA_ComputerSystem"}},
         {"CIM_Capabilities", {"KORVA_OperatingSystemCapabilities"}},
+        {"CIM_EnabledLogicalElementCapabilities", {"KORVA_OperatingSystemCapabilities"}},
         {"CIM_ManagedElement",
          {"KORVA_ComputerSystem", "KORVA_OperatingSystem", "KORVA_OperatingSystemCapabilities"}},
     };
@@ -67,8 +68,19 @@ TEST(InstanceOperations, EnumerateEachClassUnderTheNamesOfItsAncestors) {
         EXPECT_EQ(classesIn(enumerated(row.asked)), row.found) << row.asked;
     }
     // The references of associations are paths, too.
-    for (const char* asked : {"KORVA_RunningOS", "CIM_RunningOS", "CIM_Dependency"})
-        EXPECT_EQ(count(names(asked), "<INSTANCENAME CLASSNAME=\"KORVA_RunningOS\">"), 1U) << asked;
+    const std::pair<const char*, const char*> associations[] = {
+        {"KORVA_RunningOS", "KORVA_RunningOS"},
+        {"CIM_RunningOS", "KORVA_RunningOS"},
+        {"CIM_Dependency", "KORVA_RunningOS"},
+        {"CIM_InstalledOS", "KORVA_InstalledOS"},
+        {"CIM_SystemComponent", "KORVA_InstalledOS"},
+        {"CIM_Component", "KORVA_InstalledOS"},
+        {"CIM_ElementCapabilities", "KORVA_OSElementCapabilities"},
+    };
+    for (const auto& [asked, found] : associations) {
+        EXPECT_EQ(classesIn(names(asked)).at(0), found) << asked;
+        EXPECT_EQ(count(enumerated(asked), "<VALUE.NAMEDINSTANCE>"), 1U) << asked;
+    }
 }
 
 TEST(InstanceOperations, EnumerateInstancesGivesNamedInstances) {
@@ -146,15 +158,22 @@ TEST(InstanceOperations, LocalOnlyAndIncludeQualifiersChangeNothing) {
 
 TEST(InstanceOperations, WithoutDeepInheritanceThePropertiesOfSubclassesAreLeftOut) {
     ObjectManager& manager = foreignManager();
-    const auto asked = [&](const char* name, const char* deep) {
-        return content(respond(
-            manager,
-            operation("EnumerateInstances",
-                      className("ClassName", name) + value("DeepInheritance", deep), "root/test")));
-    };
-    EXPECT_EQ(count(asked("TEST_Base", "TRUE"), "<PROPERTY "), 2U);
-    EXPECT_EQ(count(asked("TEST_Base", "FALSE"), "<PROPERTY "), 0U);
-    EXPECT_EQ(count(asked("TEST_Thing", "FALSE"), "<PROPERTY "), 2U);
+    const std::string deep = value("DeepInheritance", "TRUE");
+    const std::string flat = value("DeepInheritance", "FALSE");
+    for (const char* operationName : {"EnumerateInstances", "OpenEnumerateInstances"}) {
+        const std::string all =
+            operationName[0] == 'O' ? value("MaxObjectCount", "9") : std::string();
+        const auto properties = [&](const char* name, const std::string& more) {
+            return count(
+                respond(manager, operation(operationName, className("ClassName", name) + all + more,
+                                           "root/test")),
+                "<PROPERTY ");
+        };
+        EXPECT_EQ(properties("TEST_Base", deep), 2U);
+        EXPECT_EQ(properties("TEST_Base", ""), 2U);
+        EXPECT_EQ(properties("TEST_Base", flat), 0U);
+        EXPECT_EQ(properties("TEST_Thing", flat), 2U);
+    }
     // Of a class whose properties are unknown nothing is left out.
     EXPECT_EQ(
         count(enumerated("CIM_OperatingSystem", value("DeepInheritance", "FALSE")), "<PROPERTY"),
@@ -174,14 +193,14 @@ TEST(InstanceOperations, GetInstanceGivesOneInstanceWithoutAPath) {
 }
 
 /// A KEYBINDING that refers to an instance.
-std::string referenceKey(const std::string& name, const std::string& path) {
+std::string keyOfReference(const std::string& name, const std::string& path) {
     return "<KEYBINDING NAME=\"" + name + "\"><VALUE.REFERENCE>" + path +
            "</VALUE.REFERENCE></KEYBINDING>";
 }
 
 std::string runningOS(const std::string& antecedent, const std::string& dependent) {
-    return "<INSTANCENAME CLASSNAME=\"KORVA_RunningOS\">" + referenceKey("dependent", dependent) +
-           referenceKey("Antecedent", antecedent) + "</INSTANCENAME>";
+    return "<INSTANCENAME CLASSNAME=\"KORVA_RunningOS\">" + keyOfReference("dependent", dependent) +
+           keyOfReference("Antecedent", antecedent) + "</INSTANCENAME>";
 }
 
 std::string on(const std::string& host, const std::string& path) {
@@ -189,6 +208,12 @@ std::string on(const std::string& host, const std::string& path) {
            "</HOST><LOCALNAMESPACEPATH><NAMESPACE NAME=\"root\"/><NAMESPACE NAME=\"cimv2\"/>"
            "</LOCALNAMESPACEPATH></NAMESPACEPATH>" +
            path + "</INSTANCEPATH>";
+}
+
+/// Below that namespace, on no host.
+std::string inNameSpace(const std::string& above, const std::string& path) {
+    return "<LOCALINSTANCEPATH><LOCALNAMESPACEPATH><NAMESPACE NAME=\"" + above +
+           "\"/><NAMESPACE NAME=\"cimv2\"/></LOCALNAMESPACEPATH>" + path + "</LOCALINSTANCEPATH>";
 }
 
 TEST(InstanceOperations, GetInstanceFindsByAllKeysInAnyOrderAndSpelling) {
@@ -202,6 +227,7 @@ TEST(InstanceOperations, GetInstanceFindsByAllKeysInAnyOrderAndSpelling) {
         "</KEYVALUE></INSTANCENAME>",
         runningOS(operatingSystem(), computerSystem()),
         runningOS(on("elsewhere", operatingSystem()), on("nowhere", computerSystem())),
+        runningOS(inNameSpace("ROOT", operatingSystem()), computerSystem()),
     };
     for (const std::string& path : found)
         EXPECT_THAT(gotten(path), StartsWith("<IRETURNVALUE><INSTANCE CLASSNAME=\"KORVA_")) << path;
@@ -227,6 +253,7 @@ TEST(InstanceOperations, GetInstanceOfKeysThatNameNothingIsStatusSix) {
         runningOS(operatingSystem(), instanceName("KORVA_ComputerSystem",
                                                   {{"CreationClassName", "KORVA_ComputerSystem"},
                                                    {"Name", "other.example"}})),
+        runningOS(inNameSpace("other", operatingSystem()), computerSystem()),
     };
     for (const std::string& path : others) EXPECT_THAT(gotten(path), StartsWith("6: ")) << path;
 }
@@ -247,8 +274,8 @@ TEST(InstanceOperations, GetInstanceOfWrongKeysIsStatusFour) {
 /// where the computer system is missing.
 ObjectManager& providerAlone() {
     std::string sections;
-    for (const char* each :
-         {"KORVA_OperatingSystem", "KORVA_OperatingSystemCapabilities", "KORVA_InstalledOS"})
+    for (const char* each : {"KORVA_OperatingSystem", "KORVA_OperatingSystemCapabilities",
+                             "KORVA_InstalledOS", "KORVA_OSElementCapabilities"})
         sections += registration(each, "OperatingSystemProvider", "korzbosstatusprofileprovider",
                                  "instance");
     return newManager("schema", sections);
@@ -270,6 +297,15 @@ TEST(InstanceOperations, CompareTheKeysThatAProviderDoesNotLookAt) {
                                                            {"CreationClassName", "x"},
                                                            {"Name", "Fixture Linux"}})),
               "6:");
+    const auto capable = [](const std::string& able) {
+        return "<INSTANCENAME CLASSNAME=\"KORVA_OSElementCapabilities\">" +
+               keyOfReference("ManagedElement", operatingSystem()) +
+               keyOfReference("Capabilities", able) + "</INSTANCENAME>";
+    };
+    EXPECT_EQ(asked(capable(capabilities())), "");
+    EXPECT_EQ(
+        asked(capable(instanceName("KORVA_OperatingSystemCapabilities", {{"InstanceID", "x"}}))),
+        "6:");
 }
 
 TEST(InstanceOperations, AnEnumerationThatBreaksOffFails) {
