@@ -68,4 +68,13 @@ HttpEvents AccessLog::events() {
     return result;
 }
 
+void logProviderMessage(Log& log, const ProviderMessage& message) {
+    const bool failure = message.level == CMPI_SEV_ERROR || message.level == CMPI_SEV_WARNING;
+    const bool wanted =
+        log.level() == LogLevel::Requests || (log.level() == LogLevel::Failures && failure);
+    if (message.trace || !wanted) return;
+    log.write(failure ? Priority::Error : Priority::Info,
+              "provider: " + message.source + (message.source.empty() ? "" : ": ") + message.text);
+}
+
 }  // namespace cmpihost::server

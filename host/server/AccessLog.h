@@ -6,6 +6,7 @@
 #include <string>
 #include <vector>
 
+#include "host/broker/Broker.h"
 #include "host/server/HttpServer.h"
 #include "host/server/Log.h"
 
@@ -34,6 +35,10 @@ class AccessLog {
     Log& log_;
     const Complaints complaints_;
 };
+
+/// Logs what a provider logs through its broker, as far as the level of the log goes. Any thread
+/// may call it.
+void logProviderMessage(Log& log, const ProviderMessage& message);
 
 }  // namespace cmpihost::server
 

@@ -101,7 +101,8 @@ bool isLiteralAddress(const std::string& host) {
 /// Whether a Host header names this server. A browser that was told a foreign name for one of this
 /// machine's addresses sends that name.
 bool namesThisServer(const std::string& header, const std::vector<std::string>& names) {
-    const auto port = header.find(':', header.front() == '[' ? header.find(']') : 0);
+    const bool bracketed = header.substr(0, 1) == "[";
+    const auto port = header.find(':', bracketed ? header.find(']') : 0);
     std::string host = header.substr(0, port);
     if (!host.empty() && host.back() == '.') host.pop_back();
     return isLiteralAddress(host) || base::equalsIgnoreCase(host, "localhost") ||

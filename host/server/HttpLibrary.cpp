@@ -91,11 +91,7 @@ HttpConnection* connectionOf(MHD_Connection* library) {
 
 HttpLibrary::HttpLibrary(HttpHandler& handler, const HttpLimits& limits, const HttpEvents& events,
                          HttpConnections& connections, const TlsIdentity* tls)
-    : handler_(handler),
-      limits_(limits),
-      events_(events),
-      connections_(connections),
-      tls_(tls != nullptr) {
+    : handler_(handler), limits_(limits), events_(events), connections_(connections) {
     unsigned flags = MHD_USE_THREAD_PER_CONNECTION | MHD_USE_INTERNAL_POLLING_THREAD |
                      MHD_USE_POLL | MHD_USE_NO_LISTEN_SOCKET | MHD_USE_ITC | MHD_USE_ERROR_LOG;
     std::array<MHD_OptionItem, 4> secure{{{MHD_OPTION_END, 0, nullptr}}};
@@ -144,7 +140,6 @@ bool HttpLibrary::begin(MHD_Connection* library, HttpConnection& connection, con
     request.method = method;
     request.version = version;
     request.peer = connection.peer;
-    request.tls = tls_;
     FieldReader fields(version, request);
     MHD_get_connection_values_n(library, MHD_HEADER_KIND, &FieldReader::read, &fields);
     const auto* size = MHD_get_connection_info(library, MHD_CONNECTION_INFO_REQUEST_HEADER_SIZE);

@@ -53,7 +53,6 @@ class HttpLibrary {
     const HttpLimits& limits_;
     const HttpEvents& events_;
     HttpConnections& connections_;
-    const bool tls_;
     /// What the library complained of while it started.
     std::string complaint_{};
     std::atomic<bool> started_ = false;

@@ -20,7 +20,6 @@ struct HttpRequest {
     std::string body{};
     /// The numeric address of the peer: "127.0.0.1", "::1", "unix".
     std::string peer{};
-    bool tls = false;
 
     /// The value of the first header of that name (without case), null for none.
     const std::string* header(std::string_view name) const;

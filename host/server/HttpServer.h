@@ -46,11 +46,11 @@ struct TlsIdentity {
 
 /// An HTTP/1.1 server on one listening socket (IPv4, IPv6 or unix), with a thread for each
 /// connection. Where all connections are taken, a new one replaces the one that has waited longest
-/// for a request.
+/// for a request. Any thread may call it, one at a time, but none that answers a request.
 class HttpServer {
   public:
-    /// Starts to serve. `tls` null: without TLS. The handler outlives the server. Throws
-    /// std::runtime_error when it cannot start, with the reason.
+    /// Starts to serve. `tls` null: without TLS; it is read here only. The handler outlives the
+    /// server. Throws std::runtime_error when it cannot start, with the reason.
     HttpServer(base::FileDescriptor listener, HttpHandler& handler, const HttpLimits& limits,
                const TlsIdentity* tls = nullptr, HttpEvents events = {});
     /// Ends when the requests that run have been answered; connections without one end at once.

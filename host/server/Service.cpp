@@ -43,16 +43,6 @@ std::vector<fs::path> pathsOf(const std::vector<std::string>& given, const fs::p
     return {given.begin(), given.end()};
 }
 
-/// What providers log through their broker, as far as the level of the log goes.
-void logProviderMessage(Log& log, const ProviderMessage& message) {
-    const bool failure = message.level == CMPI_SEV_ERROR || message.level == CMPI_SEV_WARNING;
-    const bool wanted =
-        log.level() == LogLevel::Requests || (log.level() == LogLevel::Failures && failure);
-    if (message.trace || !wanted) return;
-    log.write(failure ? Priority::Error : Priority::Info,
-              "provider: " + message.source + (message.source.empty() ? "" : ": ") + message.text);
-}
-
 ObjectManagerSetup managerSetup(const ServiceOptions& options, const fs::path& programFolder,
                                 Log& log) {
     ObjectManagerSetup setup;
@@ -132,24 +122,26 @@ class Service {
     void listen();
     void listenOn(const std::string& text);
     void refuseUnsafe(const ListenAddress& address) const;
-    void start(Listener& listener);
+    bool speaksTls(const Listener& listener) const;
+    std::unique_ptr<HttpServer> serverFor(const Listener& listener,
+                                          const std::optional<TlsIdentity>& identity);
     void reload();
     template <class Read>
     void readAgain(const char* what, const Read& read);
-    void replaceIdentity(TlsIdentity identity);
+    void replaceIdentity();
     void retire(std::unique_ptr<HttpServer> server);
     void logCounters();
     void stop();
 
     const ServiceOptions& options_;
     Log& log_;
+    const bool speaksTls_;
     ObjectManager manager_;
     /// Null: nobody is asked for a password.
     std::unique_ptr<Users> users_;
     Everybody everybody_;
     CimOverHttp cim_;
     AccessLog accessLog_;
-    std::optional<TlsIdentity> identity_;
     std::vector<Listener> listeners_;
     /// Servers that end with the connections that they have.
     std::vector<std::future<void>> retired_;
@@ -158,17 +150,20 @@ class Service {
 Service::Service(const ServiceOptions& options, const fs::path& programFolder, Log& log)
     : options_(options),
       log_(log),
+      speaksTls_(!options.certificate.empty()),
       manager_(managerSetup(options, programFolder, log)),
       users_(options.users.empty() ? nullptr : std::make_unique<Users>(options.users, log)),
       cim_(manager_, users_ ? static_cast<AccessControl&>(*users_) : everybody_,
            httpOptions(options)),
       accessLog_(log, [this] { return manager_.takeComplaints(); }) {
-    identity_ = readIdentity();
+    const std::optional<TlsIdentity> identity = readIdentity();
     listen();
+    for (Listener& listener : listeners_) listener.server = serverFor(listener, identity);
 }
 
+/// Absent: no TLS.
 std::optional<TlsIdentity> Service::readIdentity() const {
-    if (options_.certificate.empty()) return std::nullopt;
+    if (!speaksTls_) return std::nullopt;
     return TlsIdentity{readConfigurationFile(options_.certificate, false),
                        readConfigurationFile(options_.key, true)};
 }
@@ -180,7 +175,7 @@ void Service::listen() {
         listeners_.push_back({address, std::move(socket), true});
     }
     for (const std::string& text : options_.listen) listenOn(text);
-    if (listeners_.empty()) listenOn(identity_ ? "localhost:5989" : "localhost:5988");
+    if (listeners_.empty()) listenOn(speaksTls_ ? "localhost:5989" : "localhost:5988");
 }
 
 void Service::listenOn(const std::string& text) {
@@ -201,26 +196,31 @@ void Service::listenOn(const std::string& text) {
 
 void Service::refuseUnsafe(const ListenAddress& address) const {
     if (address.isLocal()) return;
-    const bool safe = identity_ && !address.isPlain() && !options_.users.empty();
+    const bool safe = speaksTls_ && !address.isPlain() && !options_.users.empty();
     if (!safe)
         throw ServiceError(serviceRefused, address.text() +
                                                " can be reached from other hosts: this takes TLS "
                                                "(--tls-cert, --tls-key) and --users");
 }
 
-/// Throws std::runtime_error, and leaves the listener without a server then.
-void Service::start(Listener& listener) {
-    const bool tls = identity_ && !listener.address.isPlain();
+bool Service::speaksTls(const Listener& listener) const {
+    return speaksTls_ && !listener.address.isPlain();
+}
+
+/// Throws std::runtime_error.
+std::unique_ptr<HttpServer> Service::serverFor(const Listener& listener,
+                                               const std::optional<TlsIdentity>& identity) {
     base::FileDescriptor socket(fcntl(listener.socket.number(), F_DUPFD_CLOEXEC, 0));
-    listener.server = std::make_unique<HttpServer>(
-        std::move(socket), cim_, options_.limits, tls ? &*identity_ : nullptr, accessLog_.events());
+    return std::make_unique<HttpServer>(std::move(socket), cim_, options_.limits,
+                                        speaksTls(listener) ? &*identity : nullptr,
+                                        accessLog_.events());
 }
 
 ServiceStatus Service::run() {
-    for (Listener& listener : listeners_) {
-        start(listener);
-        const bool tls = identity_ && !listener.address.isPlain();
-        const char* const scheme = listener.address.isUnix() ? "" : tls ? "https://" : "http://";
+    for (const Listener& listener : listeners_) {
+        const char* const scheme = listener.address.isUnix() ? ""
+                                   : speaksTls(listener)     ? "https://"
+                                                             : "http://";
         log_.write(Priority::Info, "listening on " + (scheme + listener.address.text()));
     }
     notifyServiceManager("READY=1");
@@ -239,7 +239,7 @@ ServiceStatus Service::run() {
 void Service::reload() {
     notifyServiceManager(reloadingState());
     if (users_) readAgain("users", [this] { users_->reload(); });
-    if (identity_) readAgain("certificate and key", [this] { replaceIdentity(*readIdentity()); });
+    if (speaksTls_) readAgain("certificate and key", [this] { replaceIdentity(); });
     notifyServiceManager("READY=1");
 }
 
@@ -249,25 +249,21 @@ void Service::readAgain(const char* what, const Read& read) {
     try {
         read();
         log_.write(Priority::Info, std::string("read again: ") + what);
-    } catch (const std::runtime_error& error) {
+    } catch (const std::exception& error) {
         log_.write(Priority::Error, std::string("kept ") + what + ": " + error.what());
     }
 }
 
-/// New connections are served with the new certificate, those that are there go on with the old
-/// one. Throws std::runtime_error, and has the old one in force then.
-void Service::replaceIdentity(TlsIdentity identity) {
-    const std::optional<TlsIdentity> old = std::exchange(identity_, std::move(identity));
-    for (Listener& listener : listeners_) {
-        if (listener.address.isPlain()) continue;
-        retire(std::move(listener.server));
-        try {
-            start(listener);
-        } catch (const std::runtime_error&) {
-            identity_ = old;
-            start(listener);
-            throw;
-        }
+/// New connections are served with the new certificate, requests that run are answered with the old
+/// one. Throws std::runtime_error where the new one does not serve, and changes nothing then.
+void Service::replaceIdentity() {
+    const std::optional<TlsIdentity> identity = readIdentity();
+    std::vector<std::unique_ptr<HttpServer>> servers;
+    for (const Listener& listener : listeners_)
+        servers.push_back(speaksTls(listener) ? serverFor(listener, identity) : nullptr);
+    for (std::size_t place = 0; place < servers.size(); ++place) {
+        if (servers[place])
+            retire(std::exchange(listeners_[place].server, std::move(servers[place])));
     }
 }
 
@@ -276,7 +272,6 @@ void Service::retire(std::unique_ptr<HttpServer> server) {
         return each.wait_for(std::chrono::seconds(0)) == std::future_status::ready;
     };
     retired_.erase(std::remove_if(retired_.begin(), retired_.end(), isDone), retired_.end());
-    if (!server) return;
     server->stopListening();
     retired_.push_back(
         std::async(std::launch::async, [ending = std::move(server)]() mutable { ending.reset(); }));

@@ -6,14 +6,17 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <cstdint>
 #include <memory>
 #include <set>
 #include <sstream>
 #include <stdexcept>
+#include <string_view>
 #include <system_error>
 #include <thread>
 #include <utility>
 
+#include "base/Ascii.h"
 #include "host/server/ConfigurationFile.h"
 
 namespace cmpihost::server {
@@ -22,6 +25,83 @@ namespace {
 
 /// Addresses whose failures are counted; beyond, the one that is longest ago is forgotten.
 constexpr std::size_t mostAddresses = 1024;
+
+constexpr std::size_t longestCredentials = 512;
+constexpr std::string_view base64Digits =
+    "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789+/";
+
+/// Four digits, of which the last `padding` are signs of equality: their bytes are appended. False:
+/// one is no digit, or bits that stand for nothing are set.
+bool appendQuartet(std::string_view quartet, std::size_t padding, std::string& bytes) {
+    std::uint32_t bits = 0;
+    for (std::size_t index = 0; index < 4; ++index) {
+        const bool padded = index >= 4 - padding;
+        const std::size_t digit = padded ? 0 : base64Digits.find(quartet[index]);
+        if (digit == std::string_view::npos || (padded && quartet[index] != '=')) return false;
+        bits = bits << 6U | static_cast<std::uint32_t>(digit);
+    }
+    for (unsigned shift = 16, count = 0; count < 3 - padding; shift -= 8, ++count)
+        bytes += static_cast<char>(bits >> shift & 0xFFU);
+    return (bits & ((1U << 8U * static_cast<unsigned>(padding)) - 1U)) == 0;
+}
+
+/// False: it is not base64 in the form that encoders write.
+bool decodeBase64(std::string_view text, std::string& bytes) {
+    if (text.empty() || text.size() % 4 != 0) return false;
+    std::size_t padding = 0;
+    while (padding < 2 && text[text.size() - 1 - padding] == '=') ++padding;
+    // Grows no more: a buffer that moves would leave a copy behind.
+    bytes.reserve(text.size());
+    for (; !text.empty(); text.remove_prefix(4))
+        if (!appendQuartet(text.substr(0, 4), text.size() == 4 ? padding : 0, bytes)) return false;
+    return true;
+}
+
+bool isControl(char byte) {
+    const auto code = static_cast<unsigned char>(byte);
+    return code < 0x20 || code == 0x7F;
+}
+
+void wipe(std::string& text) {
+    explicit_bzero(text.data(), text.size());
+}
+
+/// A name with its password, which is wiped out of memory at the end of the object's life.
+class BasicCredentials {
+  public:
+    BasicCredentials() = default;
+    ~BasicCredentials() { wipe(password); }
+    BasicCredentials(const BasicCredentials&) = delete;
+    BasicCredentials& operator=(const BasicCredentials&) = delete;
+
+    /// Reads the value of a header Authorization of the scheme Basic. False: it is of another
+    /// scheme, is longer than any honest one, is not base64 in its strict form, or holds no colon,
+    /// no name or a control character.
+    bool read(std::string_view header);
+
+    std::string name{};
+    std::string password{};
+};
+
+bool BasicCredentials::read(std::string_view header) {
+    constexpr std::string_view scheme = "Basic ";
+    if (header.size() > longestCredentials ||
+        !base::equalsIgnoreCase(header.substr(0, scheme.size()), scheme))
+        return false;
+    header.remove_prefix(std::min(header.find_first_not_of(' ', scheme.size()), header.size()));
+    std::string decoded;
+    bool understood =
+        decodeBase64(header, decoded) && std::none_of(decoded.begin(), decoded.end(), isControl);
+    // A password may hold colons, a name cannot.
+    const std::size_t colon = decoded.find(':');
+    understood = understood && colon != std::string::npos && colon > 0;
+    if (understood) {
+        name.assign(decoded, 0, colon);
+        password.assign(decoded, colon + 1);
+    }
+    wipe(decoded);
+    return understood;
+}
 
 /// The hash of a password; empty: crypt does not know the kind of hash.
 std::string hashOf(const std::string& password, const std::string& setting) {
@@ -105,12 +185,13 @@ AccessControl::Verdict Users::judge(const HttpRequest& request) {
     // That a client waits to be asked is no failure.
     if (header == nullptr) return {};
     if (request.count("Authorization") != 1) return refuse(request.peer, "more than one header");
-    const std::optional<BasicCredentials> given = readBasicCredentials(*header);
-    if (!given) return refuse(request.peer, "credentials that are none");
-    std::string shortHash = hashOf(given->password, shortSetting_);
-    if (!isRemembered(given->name, shortHash) && !accept(*given, std::move(shortHash)))
-        return refuse(request.peer, "wrong name or password of '" + given->name + "'");
-    return {true, given->name};
+    BasicCredentials given;
+    if (!given.read(*header)) return refuse(request.peer, "credentials that are none");
+    std::string shortHash = hashOf(given.password, shortSetting_);
+    if (!isRemembered(given.name, shortHash) &&
+        !accept(given.name, given.password, std::move(shortHash)))
+        return refuse(request.peer, "wrong name or password of '" + given.name + "'");
+    return {true, given.name};
 }
 
 bool Users::isRemembered(const std::string& name, const std::string& shortHash) {
@@ -120,21 +201,21 @@ bool Users::isRemembered(const std::string& name, const std::string& shortHash) 
            isEqual(found->second.shortHash, shortHash);
 }
 
-bool Users::accept(const BasicCredentials& given, std::string shortHash) {
+bool Users::accept(const std::string& name, const std::string& password, std::string shortHash) {
     std::unique_lock<std::mutex> lock(mutex_);
-    const auto found = hashes_.find(given.name);
+    const auto found = hashes_.find(name);
     const bool known = found != hashes_.end();
     const std::string expected = known ? found->second : hashes_.begin()->second;
     lock.unlock();
     {
         const std::lock_guard<std::mutex> alone(hashing_);
-        if (!isEqual(hashOf(given.password, expected), expected) || !known) return false;
+        if (!isEqual(hashOf(password, expected), expected) || !known) return false;
     }
     lock.lock();
     // The file may have been read again meanwhile.
-    const auto current = hashes_.find(given.name);
+    const auto current = hashes_.find(name);
     if (current == hashes_.end() || current->second != expected) return false;
-    accepted_[given.name] = {std::move(shortHash), Clock::now() + remembered};
+    accepted_[name] = {std::move(shortHash), Clock::now() + remembered};
     return true;
 }
 

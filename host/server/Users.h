@@ -6,7 +6,6 @@
 #include <mutex>
 #include <string>
 
-#include "host/server/BasicCredentials.h"
 #include "host/server/CimOverHttp.h"
 #include "host/server/Log.h"
 
@@ -35,7 +34,8 @@ class Users final : public AccessControl {
     Users(std::string file, Log& log, Waits waits);
     Users(std::string file, Log& log) : Users(std::move(file), log, Waits()) {}
 
-    /// Reads the file again; where it throws as the constructor does, everything stays as it was.
+    /// Reads the file again, on any thread; where it throws as the constructor does, everything
+    /// stays as it was.
     void reload();
 
     Verdict judge(const HttpRequest& request) override;
@@ -54,7 +54,7 @@ class Users final : public AccessControl {
 
     Hashes readFile() const;
     bool isRemembered(const std::string& name, const std::string& shortHash);
-    bool accept(const BasicCredentials& given, std::string shortHash);
+    bool accept(const std::string& name, const std::string& password, std::string shortHash);
     std::chrono::milliseconds countFailure(const std::string& peer);
     Verdict refuse(const std::string& peer, const std::string& what);
 

@@ -59,7 +59,6 @@ TEST(HttpServer, HandsTheWholeRequestOver) {
     EXPECT_EQ(request.target, "/path?and=query");
     EXPECT_EQ(request.peer, "127.0.0.1");
     EXPECT_EQ(request.body, "xy");
-    EXPECT_FALSE(request.tls);
     EXPECT_THAT(request.headers,
                 ElementsAre(testing::Pair("Host", "h:1"), testing::Pair("A", "1"),
                             testing::Pair("a", "2"), testing::Pair("Content-Length", "2")));
