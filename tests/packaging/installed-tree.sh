@@ -87,7 +87,7 @@ LibrariesAreLookedForBesideTheProviderOnly() {
 ComponentsShareNoFile() {
     for component in provider companion development tools $([ "$KORVA_WORD_SIZE" = 32 ] || echo server); do
         destination=$work/$component
-        install_tree --component $component
+        install_tree --component "$component"
         listing "$work/$component" >"$work/$component.list"
     done
     cat "$work"/*.list >"$work/all"

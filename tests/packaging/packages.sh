@@ -18,7 +18,7 @@ EachComponentIsPacked() {
     expect_success env KORVA_INSTALLED_TREE="$work/tree" DEB_BUILD_OPTIONS=noautodbgsym \
         dpkg-architecture "-a$architecture" -c debian/rules binary
     for name in $components; do
-        [ -f "$(package $name)" ] || fail "$(package $name) is missing: $output"
+        [ -f "$(package "$name")" ] || fail "$(package "$name") is missing: $output"
     done
 }
 
@@ -27,7 +27,7 @@ contents() { dpkg-deb --fsys-tarfile "$(package "$1")" | tar -t | sed -n 's|^\./
 
 PackagesHoldTheirFiles() {
     for name in $components; do
-        contents $name | sed "s|^|$name: |; s|/$triplet/|/TRIPLET/|" | grep -v 'share/doc/korva-osstatus/' >>"$work/contents"
+        contents "$name" | sed "s|^|$name: |; s|/$triplet/|/TRIPLET/|" | grep -v 'share/doc/korva-osstatus/' >>"$work/contents"
     done
     expected=$(cat package-files.txt)
     [ "$KORVA_WORD_SIZE" = 64 ] || expected=$(grep -v '^server: ' package-files.txt)

@@ -74,7 +74,7 @@ PackagesHoldTheComponentsAndSayWhatTheyNeed() {
 
     own=" = 1.0.0-1"
     for name in companion devel tools $([ "$KORVA_WORD_SIZE" = 32 ] || echo server); do
-        query $name --requires | sed -n "s/^korva/$name: &/p" | uniq
+        query "$name" --requires | sed -n "s/^korva/$name: &/p" | uniq
     done >"$work/needs"
     expect_equal "what they need of each other" "companion: korva-osstatus-provider($isa)$own
 devel: korva-osstatus-provider($isa)$own
