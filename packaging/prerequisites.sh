@@ -52,13 +52,17 @@ bench_packages="libbenchmark-dev valgrind"
 # shellcheck disable=SC2034
 lint_packages="clang-format clang-tidy shellcheck git"
 
-# What the tests of the endpoint run.
+# What 64-bit builds need beside that, for the endpoint and its tests.
 # shellcheck disable=SC2034
-client_packages="sblim-wbemcli python3 openssl"
+server_packages="libmicrohttpd-dev libexpat1-dev libcrypt-dev libgnutls28-dev python3"
+
+# What asks the endpoint in tests and documents.
+# shellcheck disable=SC2034
+client_packages="sblim-wbemcli openssl curl"
 
 # What every build needs; g++-multilib compiles 32-bit code on a 64-bit machine.
 build_packages="cmake ninja-build g++ libc6-dev googletest libcli11-dev nlohmann-json3-dev \
-    libvalijson-dev libmicrohttpd-dev libexpat1-dev"
+    libvalijson-dev"
 [ "$(dpkg --print-architecture 2>/dev/null)" = i386 ] || build_packages="$build_packages g++-multilib"
 
 # What packs; binutils of i386 are for its packages on another machine.
