@@ -93,7 +93,8 @@ bool HttpConnections::crowded() {
 
 nanoseconds HttpConnections::allowance(Phase phase) const {
     if (phase == Phase::Answer) return nanoseconds::max();
-    if (ending_ && phase != Phase::Response) return nanoseconds(-1);
+    // Less for the last responses: whoever waits for the end does not wait as long as for a client.
+    if (ending_) return phase == Phase::Response ? limits_.transfer / 2 : nanoseconds(-1);
     return phase == Phase::Idle ? limits_.idle : limits_.transfer;
 }
 

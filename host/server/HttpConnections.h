@@ -53,14 +53,15 @@ class HttpConnections {
 
     /// Takes a new connection in; false where there are too many.
     bool admit(int socket, const std::string& peer);
-    /// The connection with that socket, null for none.
+    /// The connection with that socket, null for none; it is there until remove().
     HttpConnection* find(int socket);
     /// Forgets a connection, before its socket is closed.
     void remove(int socket);
 
     /// Shuts the sockets of those that take too long, which makes their threads end them.
     void cutLate();
-    /// From now on, those that wait for a request or are reading one are late.
+    /// From now on those that wait for a request or are reading one are late, and responses have
+    /// half of their time.
     void end() { ending_ = true; }
     bool ending() const noexcept { return ending_; }
     bool none();

@@ -53,7 +53,8 @@ class HttpServer {
     /// server. Throws std::runtime_error when it cannot start, with the reason.
     HttpServer(base::FileDescriptor listener, HttpHandler& handler, const HttpLimits& limits,
                const TlsIdentity* tls = nullptr, HttpEvents events = {});
-    /// Ends when the requests that run have been answered; connections without one end at once.
+    /// Ends when the requests that run have been answered; connections without one end at once, and
+    /// clients have half of `transfer` to take the last responses.
     ~HttpServer();
     HttpServer(const HttpServer&) = delete;
     HttpServer& operator=(const HttpServer&) = delete;

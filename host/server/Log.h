@@ -19,7 +19,8 @@ enum class Priority { Error = 3, Warning = 4, Notice = 5, Info = 6 };
 /// server. Any threads may write.
 class Log {
   public:
-    /// `priorities`: each line begins with its priority, "<6>", as the journal has it.
+    /// The file stays the caller's. `priorities`: each line begins with its priority, "<6>", as the
+    /// journal has it.
     Log(int file, LogLevel level, bool priorities);
 
     LogLevel level() const noexcept { return level_; }

@@ -83,24 +83,25 @@ void writePiece(const Piece& piece, const Call& call, std::string& xml) {
 using InstanceSource = std::vector<InstanceValue> (*)(const Call&);
 using PathSource = std::vector<ObjectPathValue> (*)(const Call&);
 
+void openEnumeration(const Call& call, const OpenOptions& options, PulledKind kind,
+                     WrittenResults results, std::string& xml) {
+    writePiece(call.manager.openEnumerations().open(ownerOf(call), kind, std::move(results),
+                                                    options.count, options.timeout),
+               call, xml);
+}
+
 template <InstanceSource source>
 void openInstances(const Call& call, std::string& xml) {
     const OpenOptions options = openOptions(call.parameters);
-    WrittenResults results = writtenInstances(source(call), call);
-    writePiece(
-        call.manager.openEnumerations().open(ownerOf(call), PulledKind::InstancesWithPath,
-                                             std::move(results), options.count, options.timeout),
-        call, xml);
+    openEnumeration(call, options, PulledKind::InstancesWithPath,
+                    writtenInstances(source(call), call), xml);
 }
 
 template <PathSource source>
 void openPaths(const Call& call, std::string& xml) {
     const OpenOptions options = openOptions(call.parameters);
-    WrittenResults results = writtenPaths(source(call), call);
-    writePiece(
-        call.manager.openEnumerations().open(ownerOf(call), PulledKind::InstancePaths,
-                                             std::move(results), options.count, options.timeout),
-        call, xml);
+    openEnumeration(call, options, PulledKind::InstancePaths, writtenPaths(source(call), call),
+                    xml);
 }
 
 constexpr const char* sourceInstance = "InstanceName";

@@ -97,6 +97,18 @@ TEST(HttpServerLimits, LetAHandlerTakeItsTime) {
     EXPECT_THAT(client.receive(), EndsWith("\r\n\r\n/wait 0"));
 }
 
+TEST(HttpServerLimits, GiveTheLastResponsesHalfOfTheirTime) {
+    HttpLimits limits;
+    limits.transfer = milliseconds(800);
+    HttpTestServer tested(limits);
+    HttpTestClient client(tested.port(), "127.0.0.1", 4096);
+    client.send(httpPost("/big"));
+    tested.handler.await(1);
+    const auto start = HttpTestClock::now();
+    tested.server.reset();
+    EXPECT_LT(HttpTestClock::now() - start, limits.transfer);
+}
+
 TEST(HttpServerLimits, ReplaceTheConnectionThatHasWaitedLongest) {
     HttpLimits limits;
     limits.connections = 3;
