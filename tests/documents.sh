@@ -18,6 +18,11 @@ echo "$words words for users, of $limit"
 
 sh tests/links.sh ./*.md docs/*.md docs/dev/*.md
 
+# Ports of one's own in the place of those that are shown, which somebody else may use.
+port=$((12000 + $$ % 6000 * 3))
+used() { grep -qE ":($(printf '%04X|%04X|%04X' "$1" $(($1 + 1)) $(($1 + 2)))) " /proc/net/tcp /proc/net/tcp6 2>/dev/null; }
+while used "$port"; do port=$((port + 3)); done
+
 script=$(mktemp)
 trap 'rm -f "$script" "$script.errors"' EXIT
 for document in ./*.md docs/*.md docs/dev/*.md; do
@@ -31,7 +36,8 @@ for document in ./*.md docs/*.md docs/dev/*.md; do
             if (!run) print "left out, needs " $2 ": " document ":" NR >"/dev/stderr"
             next
         }
-        run' "$document" >"$script"
+        run' "$document" |
+        sed "s/15988/$port/g; s/15989/$((port + 1))/g; s/15990/$((port + 2))/g" >"$script"
     [ -s "$script" ] || continue
     echo "commands of $document"
     sh -eu "$script" >/dev/null 2>"$script.errors" || {

@@ -49,9 +49,10 @@ std::vector<ListenAddress> ListenAddress::read(const std::string& text) {
     const bool plain = takePrefix(rest, "plain:");
     const std::size_t colon = rest.rfind(':');
     const std::string port = colon == std::string::npos ? "" : rest.substr(colon + 1);
-    if (!isPort(port))
-        throw std::invalid_argument("'" + text + "' is not ADDRESS:PORT or unix:PATH");
-    const std::string host = rest.substr(0, colon);
+    const std::string host = colon == std::string::npos ? "" : rest.substr(0, colon);
+    if (host.empty() || !isPort(port))
+        throw std::invalid_argument("'" + text +
+                                    "' is not ADDRESS:PORT (a port up to 65535) or unix:PATH");
     std::vector<ListenAddress> result;
     if (host == "localhost") {
         result = {inet("127.0.0.1", port), inet("::1", port)};

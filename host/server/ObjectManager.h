@@ -82,6 +82,10 @@ class ObjectManager {
     OpenEnumerations& openEnumerations() noexcept { return openEnumerations_; }
     Statistics& statistics() noexcept { return statistics_; }
 
+    /// Ends the providers, while no request runs; what they are caught at then is for
+    /// takeComplaints(), too.
+    void unload() noexcept { router_.unload(); }
+
     /// Keeps a line for takeComplaints().
     void complain(const std::string& line);
     /// What the broker caught the providers at, why libraries did not load, and what complain()

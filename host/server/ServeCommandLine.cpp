@@ -90,6 +90,11 @@ std::string whyNoText(const std::string& given) {
     return given.empty() ? "the value is empty" : "";
 }
 
+std::string whyNoHostName(const std::string& given) {
+    const bool isName = !given.empty() && given.find_first_of(":/@ ") == std::string::npos;
+    return isName ? "" : "expected a name, without a port, found '" + given + "'";
+}
+
 std::string whyNoNumber(const std::string& given) {
     const bool digits = !given.empty() && given.size() <= 5 &&
                         given.find_first_not_of("0123456789") == std::string::npos;
@@ -146,6 +151,7 @@ ServeParser::ServeParser() : app_(help, "cmpihost-serve") {
         app_.add_option(row.name, options_.*row.field, row.help)
             ->check(validator(whyNoText))
             ->option_text(row.valueName);
+    app_.get_option("--host-name")->check(validator(whyNoHostName));
     app_.get_option("--tls-cert")->needs("--tls-key")->option_text("FILE");
     app_.get_option("--tls-key")->needs("--tls-cert")->option_text("FILE");
     addNumber("--connections", options_.limits.connections,

@@ -53,8 +53,12 @@ ObjectManagerSetup managerSetup(const ServiceOptions& options, const fs::path& p
     } catch (const std::runtime_error& error) {
         throw ServiceError(serviceNotLoaded, error.what());
     }
-    if (setup.registrations.all().empty())
-        throw ServiceError(serviceNotLoaded, "there are no registrations of providers");
+    if (setup.registrations.all().empty()) {
+        const std::string where = options.registrations.empty()
+                                      ? registrationFolder(programFolder).string()
+                                      : options.registrations.front();
+        throw ServiceError(serviceNotLoaded, where + ": there are no registrations of providers");
+    }
     setup.libraryFolders = libraryFolders(programFolder);
     setup.messageSink = [&log](const ProviderMessage& message) {
         logProviderMessage(log, message);
@@ -196,7 +200,11 @@ void Service::listenOn(const std::string& text) {
 
 void Service::refuseUnsafe(const ListenAddress& address) const {
     if (address.isLocal()) return;
-    const bool safe = speaksTls_ && !address.isPlain() && !options_.users.empty();
+    if (address.isPlain())
+        throw ServiceError(serviceRefused, address.text() +
+                                               " can be reached from other hosts: plain: is for "
+                                               "loopback addresses");
+    const bool safe = speaksTls_ && !options_.users.empty();
     if (!safe)
         throw ServiceError(serviceRefused, address.text() +
                                                " can be reached from other hosts: this takes TLS "
@@ -211,9 +219,14 @@ bool Service::speaksTls(const Listener& listener) const {
 std::unique_ptr<HttpServer> Service::serverFor(const Listener& listener,
                                                const std::optional<TlsIdentity>& identity) {
     base::FileDescriptor socket(fcntl(listener.socket.number(), F_DUPFD_CLOEXEC, 0));
-    return std::make_unique<HttpServer>(std::move(socket), cim_, options_.limits,
-                                        speaksTls(listener) ? &*identity : nullptr,
-                                        accessLog_.events());
+    const bool tls = speaksTls(listener);
+    try {
+        return std::make_unique<HttpServer>(std::move(socket), cim_, options_.limits,
+                                            tls ? &*identity : nullptr, accessLog_.events());
+    } catch (const std::runtime_error& error) {
+        if (!tls) throw;
+        throw std::runtime_error(options_.certificate + ", " + options_.key + ": " + error.what());
+    }
 }
 
 ServiceStatus Service::run() {
@@ -298,6 +311,7 @@ void Service::stop() {
         if (!listener.isPassed) listener.address.removeFile();
     }
     retired_.clear();
+    manager_.unload();
     accessLog_.logComplaints();
 }
 

@@ -166,15 +166,19 @@ Users::Hashes Users::readFile() const {
         ++number;
         if (line.empty() || line.front() == '#') continue;
         const std::size_t colon = line.find(':');
-        if (colon == std::string::npos || colon == 0) refuse("is no line name:hash");
+        if (colon == std::string::npos || colon == 0) refuse("expected name:hash");
         const std::string hash = line.substr(colon + 1);
         const bool graphic =
             std::all_of(hash.begin(), hash.end(), [](char c) { return c > ' ' && c < '\x7F'; });
-        if (hash.empty() || hash.front() != '$' || !graphic) refuse("the hash is none of crypt(5)");
+        if (hash.empty() || hash.front() != '$' || !graphic)
+            refuse(
+                "no hash stands behind the colon, as 'openssl passwd -6' prints it, without "
+                "blanks");
         // Of each kind one is tried, for this takes time.
         if (knownKinds.insert(kindOf(hash)).second && hashOf("", hash).size() != hash.size())
             refuse("the hash is of a kind that this system does not know, or is cut off");
-        if (!hashes.emplace(line.substr(0, colon), hash).second) refuse("has a name again");
+        if (!hashes.emplace(line.substr(0, colon), hash).second)
+            refuse("the name stands in an earlier line, too");
     }
     if (hashes.empty()) throw std::runtime_error(file_ + ": holds no users");
     return hashes;

@@ -10,6 +10,7 @@ namespace {
 
 using namespace fixture;
 using testing::AllOf;
+using testing::Contains;
 using testing::Each;
 using testing::ElementsAre;
 using testing::HasSubstr;
@@ -174,6 +175,17 @@ TEST(ObjectManager, KeepsSoManyComplaintsAndCountsTheRest) {
     manager.complain(std::string(5000, 'x'));
     EXPECT_THAT(manager.takeComplaints(),
                 ElementsAre(std::string(ObjectManager::longestComplaint, 'x')));
+}
+
+TEST(ObjectManager, TellsWhatProvidersAreCaughtAtInTheEnd) {
+    ObjectManager& manager =
+        newManager("schema", registration("KORVA_OSElementCapabilities", "OperatingSystemProvider",
+                                          "cmpihost_stand_in", "instance"));
+    asked(manager, namesOf("KORVA_OSElementCapabilities"));
+    setenv("STAND_IN_CLEANUP", "fails", 1);
+    manager.unload();
+    unsetenv("STAND_IN_CLEANUP");
+    EXPECT_THAT(manager.takeComplaints(), Contains("cleanup answered status 1"));
 }
 
 /// A provider that tells what accompanies a request.

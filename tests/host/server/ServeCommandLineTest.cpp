@@ -79,6 +79,8 @@ TEST(ServeCommandLine, RefusesWhatItDoesNotUnderstand) {
         {{"--tls-key", "k"}, "cmpihost-serve: --tls-key requires --tls-cert\n"},
         {{"--log", "all"},
          "cmpihost-serve: --log: expected none, failures or requests, found 'all'\n"},
+        {{"--host-name", "vm:5989"},
+         "cmpihost-serve: --host-name: expected a name, without a port, found 'vm:5989'\n"},
         {{"--connections", "0"},
          "cmpihost-serve: --connections: expected a number from 1 to 10000, found '0'\n"},
         {{"--connections", "many"},

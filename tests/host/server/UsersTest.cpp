@@ -151,23 +151,26 @@ TEST_F(UsersFile, IsReadAgainAndForgetsWhoIsGone) {
 }
 
 TEST_F(UsersFile, IsRefusedWhereItIsWrong) {
+    const char* const noHash =
+        "FILE:1: no hash stands behind the colon, as 'openssl passwd -6' prints it, without blanks";
     const struct {
         std::string text;
         const char* complaint;
     } rows[] = {
         {"", "FILE: holds no users"},
         {"# nobody\n", "FILE: holds no users"},
-        {"joe\n", "FILE:1: is no line name:hash"},
-        {"\n:$6$x$y\n", "FILE:2: is no line name:hash"},
-        {"joe:secret\n", "FILE:1: the hash is none of crypt(5)"},
-        {"joe:\n", "FILE:1: the hash is none of crypt(5)"},
-        {"joe:*\n", "FILE:1: the hash is none of crypt(5)"},
-        {"joe:$6$salt$with blank\n", "FILE:1: the hash is none of crypt(5)"},
+        {"joe\n", "FILE:1: expected name:hash"},
+        {"\n:$6$x$y\n", "FILE:2: expected name:hash"},
+        {"joe:secret\n", noHash},
+        {"joe:\n", noHash},
+        {"joe:*\n", noHash},
+        {"joe:$6$salt$with blank\n", noHash},
+        {"joe:$6$salt$hash\r\n", noHash},
         {"joe:$nonsense$salt$hash\n",
          "FILE:1: the hash is of a kind that this system does not know, or is cut off"},
         {"joe:$5$rounds=1000$saltsalt$eKLZ\n",
          "FILE:1: the hash is of a kind that this system does not know, or is cut off"},
-        {std::string(joe) + joe, "FILE:2: has a name again"},
+        {std::string(joe) + joe, "FILE:2: the name stands in an earlier line, too"},
         {std::string(1024 * 1024 + 1, '#'), "FILE: larger than 1 MiB"},
     };
     for (const auto& row : rows) {

@@ -86,14 +86,19 @@ class Refusals(ServiceTest):
                 (2, "[::]:0" + unsafe, "--listen", "[::]:0"),
                 (2, "0.0.0.0:0" + unsafe, "--listen", "0.0.0.0:0", *tls),
                 (2, "0.0.0.0:0" + unsafe, "--listen", "0.0.0.0:0", "--users", users),
-                (2, "0.0.0.0:0" + unsafe, "--listen", "plain:0.0.0.0:0", "--users", users, *tls),
+                (2, "0.0.0.0:0 can be reached from other hosts: plain: is for loopback addresses",
+                 "--listen", "plain:0.0.0.0:0", "--users", users, *tls),
+                (2, f"{users}, {tls[3]}: HTTP does not start: GnuTLS failed to setup x509 "
+                 "certificate/key: Base64 decoding error. Failed to initialize TLS support.",
+                 "--listen", "127.0.0.1:0", "--tls-cert", users, *tls[2:]),
                 (2, "'vm' is no numeric address, nor localhost", "--listen", "vm:5988"),
                 (2, f"{key}: everybody may use this file; chmod o= takes that away",
                  "--tls-cert", tls[1], "--tls-key", key),
                 (2, "/nonexistent: No such file or directory", "--users", "/nonexistent"),
                 (1, f"cannot listen on 127.0.0.1:{port}: Address already in use",
                  "--listen", f"127.0.0.1:{port}"),
-                (3, "there are no registrations of providers", "--registration", str(self.folder)),
+                (3, f"{self.folder}: there are no registrations of providers",
+                 "--registration", str(self.folder)),
         ):
             ended = run(*arguments)
             self.assertEqual((ended.returncode, ended.stdout, ended.stderr),
@@ -240,7 +245,7 @@ class Addresses(ServiceTest):
     def test_the_sockets_of_another_process_are_left_alone(self):
         ended = run("--listen", "nowhere", env=dict(os.environ, LISTEN_FDS="1", LISTEN_PID="1"))
         self.assertEqual(ended.stderr,
-                         "cmpihost-serve: 'nowhere' is not ADDRESS:PORT or unix:PATH\n")
+                         "cmpihost-serve: 'nowhere' is not ADDRESS:PORT (a port up to 65535) or unix:PATH\n")
 
 
 class CommandOfTheHost(ServiceTest):
@@ -249,7 +254,7 @@ class CommandOfTheHost(ServiceTest):
         ended = subprocess.run([host, "serve", "--listen", "nowhere"], capture_output=True, text=True,
                                timeout=20, check=False)
         self.assertEqual((ended.returncode, ended.stderr),
-                         (2, "cmpihost-serve: 'nowhere' is not ADDRESS:PORT or unix:PATH\n"))
+                         (2, "cmpihost-serve: 'nowhere' is not ADDRESS:PORT (a port up to 65535) or unix:PATH\n"))
 
 
 if __name__ == "__main__":
