@@ -297,15 +297,17 @@ TEST(InstanceOperations, CompareTheKeysThatAProviderDoesNotLookAt) {
                                                            {"CreationClassName", "x"},
                                                            {"Name", "Fixture Linux"}})),
               "6:");
-    const auto capable = [](const std::string& able) {
+    const auto capable = [](const std::string& source, const std::string& able) {
         return "<INSTANCENAME CLASSNAME=\"KORVA_OSElementCapabilities\">" +
-               keyOfReference("ManagedElement", operatingSystem()) +
-               keyOfReference("Capabilities", able) + "</INSTANCENAME>";
+               keyOfReference("ManagedElement", source) + keyOfReference("Capabilities", able) +
+               "</INSTANCENAME>";
     };
-    EXPECT_EQ(asked(capable(capabilities())), "");
-    EXPECT_EQ(
-        asked(capable(instanceName("KORVA_OperatingSystemCapabilities", {{"InstanceID", "x"}}))),
-        "6:");
+    const std::string others =
+        instanceName("KORVA_OperatingSystemCapabilities", {{"InstanceID", "x"}});
+    EXPECT_EQ(asked(capable(operatingSystem(), capabilities())), "");
+    EXPECT_EQ(asked(capable(inNameSpace("ROOT", operatingSystem()), capabilities())), "");
+    EXPECT_EQ(asked(capable(inNameSpace("other", operatingSystem()), capabilities())), "6:");
+    EXPECT_EQ(asked(capable(operatingSystem(), others)), "6:");
 }
 
 TEST(InstanceOperations, AnEnumerationThatBreaksOffFails) {

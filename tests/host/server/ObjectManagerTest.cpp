@@ -118,8 +118,9 @@ TEST(ObjectManager, KnowsClassesAndTheirAncestors) {
 }
 
 TEST(ObjectManager, AsksTheProvidersOfTheInteropNamespaceBesideItsOwnClasses) {
+    // The provider answers with the class as it is registered.
     ObjectManager& manager = foreignManager(
-        registration("TEST_SparePart", "Spares", "foreign_parts", "instance", "root/interop"));
+        registration("test_SPAREpart", "Spares", "foreign_parts", "instance", "root/interop"));
     EXPECT_THAT(asked(manager, namesOf("test_sparepart", "root/interop")),
                 ElementsAre("root/interop:TEST_SparePart.Id=\"spare\""));
     EXPECT_THAT(asked(manager, namesOf("TEST_Part", "root/interop")),
