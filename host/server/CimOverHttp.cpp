@@ -16,6 +16,8 @@ namespace cmpihost::server {
 
 namespace {
 
+constexpr std::size_t longestUsualBody = 64 * 1024;
+
 /// Ends a request before it is an operation.
 HttpResponse refusal(unsigned status, const char* cimError = nullptr,
                      std::string_view detail = {}) {
@@ -254,6 +256,10 @@ HttpResponse CimOverHttp::responseTo(const HttpRequest& request) {
 
 HttpResponse CimOverHttp::carriedOut(const HttpRequest& request,
                                      const std::optional<std::string>& user) {
+    // What is read of a message takes many times the memory of its text: long ones, which honest
+    // clients do not send, wait for each other.
+    std::unique_lock<std::mutex> alone(longMessage_, std::defer_lock);
+    if (request.body.size() > longestUsualBody) alone.lock();
     try {
         const Message message = readMessage(request.body);
         HttpResponse response;

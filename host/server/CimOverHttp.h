@@ -2,6 +2,7 @@
 #define HOST_SERVER_CIM_OVER_HTTP_H
 
 #include <atomic>
+#include <mutex>
 #include <optional>
 #include <string>
 #include <vector>
@@ -55,6 +56,8 @@ class CimOverHttp final : public HttpHandler {
     AccessControl& access_;
     const Options options_;
     std::atomic<unsigned> running_ = 0;
+    /// Held while a long message is worked on.
+    std::mutex longMessage_;
 };
 
 }  // namespace cmpihost::server

@@ -68,7 +68,7 @@ class Endpoint:
     def descriptors(self):
         return len(os.listdir(f"/proc/{self.process.pid}/fd"))
 
-    def resident(self):
-        """Its resident memory in kilobytes."""
+    def resident(self, at="VmRSS"):
+        """Its resident memory in kilobytes; at="VmHWM": the most that it ever had."""
         with open(f"/proc/{self.process.pid}/status", encoding="ascii") as file:
-            return next(int(line.split()[1]) for line in file if line.startswith("VmRSS:"))
+            return next(int(line.split()[1]) for line in file if line.startswith(at + ":"))

@@ -2,6 +2,7 @@
 
 The good client gets each answer within a second, and in the end the endpoint holds what it held
 before and ends by itself. --no-memory: resident memory may grow."""
+import concurrent.futures
 import contextlib
 import os
 import resource
@@ -128,6 +129,26 @@ class GoodClient:
         self.ended.set()
         self.thread.join()
         self.client.close()
+
+
+class LongMessages(unittest.TestCase):
+    @unittest.skipUnless(MEMORY_COUNTS, "memory does not count")
+    def test_do_not_take_memory_all_at_once(self):
+        part = "<A " + " ".join(letter + '=""' for letter in "abcdefghijklmnop") + "/>"
+        request = http_request(("<CIM>" + 9990 * part + "</CIM>").encode())
+
+        def ask(number):
+            source = (f"127.0.0.{2 + number % 4}", 0)
+            with socket.create_connection((ADDRESS, endpoint.port), 10, source) as connection:
+                for _ in range(3):
+                    connection.sendall(request)
+                    self.assertTrue(connection.recv(4096).startswith(b"HTTP/1.1 400 "))
+
+        with Endpoint(PROGRAM, "--registration", PROVIDERS, "--schema", PROVIDERS) as endpoint:
+            with concurrent.futures.ThreadPoolExecutor(64) as pool:
+                list(pool.map(ask, range(64)))
+            # A tree of each at once would take 500 MB.
+            self.assertLess(endpoint.resident(at="VmHWM"), 300_000)
 
 
 class Hostile(unittest.TestCase):
