@@ -1,6 +1,8 @@
-// Methods that the schema does not declare are called all the same where their class is not
-// declared either: its provider knows them, and the types are those that the client tells.
+// Methods that the schema does not declare are called all the same where it lacks their class or
+// one that this descends from: the provider knows them, and the types are those that the client
+// tells.
 #include <algorithm>
+#include <iterator>
 
 #include "base/Ascii.h"
 #include "host/server/CimError.h"
@@ -16,21 +18,40 @@ struct MethodCall {
     ObjectManager& manager;
     const std::string& nameSpace;
     const Message& message;
-    /// Null where the schema does not have the class.
+    /// Null where the schema does not tell of it.
     const mof::Method* declared;
 
     const ClassCatalogue& catalogue() const { return manager.catalogue(nameSpace); }
 };
 
-/// Null where the schema does not have the class; throws CimError for a class without the method.
+/// Methods that operating systems inherit from classes of the standard, which few schemas declare.
+constexpr std::string_view inheritedMethods[] = {"Reboot", "Shutdown", "RequestStateChange"};
+
+bool isInherited(const ObjectManager& manager, const std::string& nameSpace,
+                 const std::string& className, const std::string& method) {
+    return manager.isA(nameSpace, className, "CIM_OperatingSystem") &&
+           std::any_of(std::begin(inheritedMethods), std::end(inheritedMethods),
+                       [&](auto each) { return base::equalsIgnoreCase(each, method); });
+}
+
+/// Whether the schema declares the class and all that it descends from.
+bool isWhollyDeclared(const Schema& schema, const std::string& className) {
+    const mof::Class* each = schema.find(className);
+    while (each != nullptr && !each->superclass.empty()) each = schema.find(each->superclass);
+    return each != nullptr;
+}
+
+/// Null where the schema does not tell whether the class has the method: its provider knows. Throws
+/// CimError for a class without the method, and where nobody serves it.
 const mof::Method* declaredMethod(const ObjectManager& manager, const std::string& nameSpace,
                                   const std::string& className, const std::string& name) {
     const Schema& schema = manager.schema(nameSpace);
     const mof::Method* const found = schema.findMethod(className, name);
     const bool registered =
         manager.registrations().find(className, nameSpace, Interface::Method) != nullptr;
-    if (found == nullptr && (schema.find(className) != nullptr || !registered))
-        throw CimError(cimMethodNotFound, className + " has no method " + name);
+    const bool canHave = found != nullptr || (registered && !isWhollyDeclared(schema, className)) ||
+                         isInherited(manager, nameSpace, className, name);
+    if (!canHave) throw CimError(cimMethodNotFound, className + " has no method " + name);
     if (!registered)
         throw CimError(cimMethodNotAvailable,
                        "nobody serves the method " + name + " of " + className);

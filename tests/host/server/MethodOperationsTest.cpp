@@ -80,10 +80,16 @@ TEST(MethodOperations, AParameterWithoutAValueIsNull) {
               "<PARAMVALUE NAME=\"Total\" PARAMTYPE=\"uint32\"><VALUE>1</VALUE></PARAMVALUE>");
 }
 
-/// Of a class that only its registration names, the provider alone knows the methods.
-TEST(MethodOperations, WithoutADeclarationTheTypesAreThoseOfTheClient) {
+/// Of a class that only its registration names, and of one that descends from a class that no
+/// schema declares, the provider alone knows the methods.
+class UndeclaredMethods : public testing::TestWithParam<const char*> {};
+
+INSTANTIATE_TEST_SUITE_P(Of, UndeclaredMethods,
+                         testing::Values("", "class OTHER_Thing : CIM_Elsewhere {};"));
+
+TEST_P(UndeclaredMethods, TakeTheTypesThatTheClientTells) {
     ObjectManager& manager = foreignManager(
-        registration("OTHER_Thing", "Things", "foreign_things", "method", "root/test"));
+        registration("OTHER_Thing", "Things", "foreign_things", "method", "root/test"), GetParam());
     const auto asked = [&](const std::string& arguments) {
         const std::string document =
             respond(manager,
@@ -99,11 +105,17 @@ TEST(MethodOperations, WithoutADeclarationTheTypesAreThoseOfTheClient) {
               "4: uint23: there is no such type");
 }
 
-TEST(MethodOperations, TheShippedClassesHaveNone) {
-    for (const char* method : {"Reboot", "Shutdown", "RequestStateChange"}) {
-        EXPECT_EQ(error(respond(methodCall(method, operatingSystem()))),
-                  std::string("17: KORVA_OperatingSystem has no method ") + method);
+TEST(MethodOperations, OfOperatingSystemsAreServedByNobodyHere) {
+    const std::string computer = "<CLASSNAME NAME=\"KORVA_ComputerSystem\"/>";
+    for (const char* method : {"Reboot", "Shutdown", "requestStateChange"}) {
+        EXPECT_EQ(
+            error(respond(methodCall(method, operatingSystem()))),
+            std::string("16: nobody serves the method ") + method + " of KORVA_OperatingSystem");
     }
+    EXPECT_EQ(error(respond(methodCall("Nonsense", operatingSystem()))),
+              "17: KORVA_OperatingSystem has no method Nonsense");
+    EXPECT_EQ(error(respond(methodCall("Reboot", computer))),
+              "17: KORVA_ComputerSystem has no method Reboot");
 }
 
 }  // namespace
