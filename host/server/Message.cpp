@@ -12,6 +12,8 @@ namespace cmpihost::server {
 namespace {
 
 constexpr std::size_t mostValueElements = 1000;
+/// A response repeats it, escaped.
+constexpr std::size_t longestId = 4096;
 
 [[noreturn]] void refuseStructure(const std::string& detail) {
     throw MessageError(400, "request-not-valid", detail);
@@ -94,6 +96,7 @@ Message readMessage(std::string_view body) {
     XmlElement& envelope = root.children.front();
     Message message;
     message.id = *envelope.attribute("ID");
+    if (message.id.size() > longestId) refuseStructure("ID is longer than 4096 bytes");
     message.protocolVersion = *envelope.attribute("PROTOCOLVERSION");
     readCall(envelope.children.front().children.back(), message);
     return message;

@@ -1,3 +1,4 @@
+#include <malloc.h>
 #include <time.h>
 #include <unistd.h>
 
@@ -30,6 +31,8 @@ ServiceStatus complain(ServiceStatus status, const std::string& text) {
 int main(int argumentCount, char** arguments) {
     // Providers find the time zone set, as in a server that writes a log.
     tzset();
+    // What a large request took goes back to the system with it.
+    mallopt(M_MMAP_THRESHOLD, 65536);
     try {
         const ParsedServeCommandLine parsed = parseServeCommandLine(argumentCount, arguments);
         if (!parsed.options) return show(parsed);

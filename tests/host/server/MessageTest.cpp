@@ -156,6 +156,13 @@ TEST(Message, IsOneRequest) {
               "501 multiple-requests-unsupported: a message is one request here");
 }
 
+TEST(Message, HasAnIdThatCanBeRepeated) {
+    const std::string longest(4096, '"');
+    EXPECT_EQ(readMessage(replaced(plainCall, "ID='7'", "ID='" + longest + "'")).id, longest);
+    EXPECT_EQ(messageRefusal(replaced(plainCall, "ID='7'", "ID='" + longest + "x'")),
+              "400 request-not-valid: ID is longer than 4096 bytes");
+}
+
 TEST(Message, HasTheStructureOfARequest) {
     const struct {
         const char* part;
