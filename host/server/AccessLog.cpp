@@ -11,6 +11,8 @@ namespace {
 /// Of the complaints at a time.
 constexpr std::size_t mostComplaints = 16;
 constexpr std::size_t longestField = 128;
+/// Of the connections that were cut, in a period.
+constexpr unsigned mostCuts = 10;
 
 /// Blanks in it are written out: the fields of a line stay apart.
 std::string field(const std::string& text) {
@@ -26,8 +28,8 @@ bool isFailure(const HttpResponse& response) {
 
 }  // namespace
 
-AccessLog::AccessLog(Log& log, Complaints complaints)
-    : log_(log), complaints_(std::move(complaints)) {}
+AccessLog::AccessLog(Log& log, Complaints complaints, std::chrono::milliseconds period)
+    : log_(log), complaints_(std::move(complaints)), period_(period) {}
 
 void AccessLog::answered(const HttpRequest& request, const HttpResponse& response,
                          std::chrono::nanoseconds took) {
@@ -40,12 +42,29 @@ void AccessLog::answered(const HttpRequest& request, const HttpResponse& respons
                             " " + std::to_string(response.cimStatus) + " " +
                             std::to_string(microseconds.count()) + "us");
     }
+    {
+        const std::lock_guard<std::mutex> lock(mutex_);
+        logMoreCuts();
+    }
     logComplaints();
 }
 
 void AccessLog::cut(const std::string& peer, const char* reason) {
-    if (log_.level() != LogLevel::None)
+    if (log_.level() == LogLevel::None) return;
+    const std::lock_guard<std::mutex> lock(mutex_);
+    logMoreCuts();
+    if (++cuts_ <= mostCuts)
         log_.write(Priority::Notice, (peer.empty() ? "-" : peer) + " cut: " + reason);
+}
+
+/// Tells, where a period is over, how many were not told in it.
+void AccessLog::logMoreCuts() {
+    const Clock::time_point now = Clock::now();
+    if (now - periodStart_ < period_) return;
+    if (cuts_ > mostCuts)
+        log_.write(Priority::Notice, std::to_string(cuts_ - mostCuts) + " more connections cut");
+    periodStart_ = now;
+    cuts_ = 0;
 }
 
 void AccessLog::logComplaints() {
@@ -58,14 +77,6 @@ void AccessLog::logComplaints() {
     if (complaints.size() > mostComplaints)
         log_.write(Priority::Warning,
                    "caught: " + std::to_string(complaints.size() - mostComplaints) + " more");
-}
-
-HttpEvents AccessLog::events() {
-    HttpEvents result;
-    result.answered = [this](const HttpRequest& request, const HttpResponse& response,
-                             std::chrono::nanoseconds took) { answered(request, response, took); };
-    result.cut = [this](const std::string& peer, const char* reason) { cut(peer, reason); };
-    return result;
 }
 
 void logProviderMessage(Log& log, const ProviderMessage& message) {

@@ -3,6 +3,7 @@
 
 #include <chrono>
 #include <functional>
+#include <mutex>
 #include <string>
 #include <vector>
 
@@ -21,19 +22,27 @@ class AccessLog {
     using Complaints = std::function<std::vector<std::string>()>;
 
     /// The log outlives this object. `complaints` gives the lines that came since its last call.
-    AccessLog(Log& log, Complaints complaints);
+    /// Of the connections that are cut in each `period` ten are told, and later how many more.
+    AccessLog(Log& log, Complaints complaints,
+              std::chrono::milliseconds period = std::chrono::seconds(1));
 
     void answered(const HttpRequest& request, const HttpResponse& response,
                   std::chrono::nanoseconds took);
     void cut(const std::string& peer, const char* reason);
     void logComplaints();
 
-    /// Has a server tell it all. This object outlives the server.
-    HttpEvents events();
-
   private:
+    using Clock = std::chrono::steady_clock;
+
+    void logMoreCuts();
+
     Log& log_;
     const Complaints complaints_;
+    const std::chrono::milliseconds period_;
+    /// Guards what follows.
+    std::mutex mutex_;
+    Clock::time_point periodStart_{};
+    unsigned cuts_ = 0;
 };
 
 /// Logs what a provider logs through its broker, as far as the level of the log goes. Any thread

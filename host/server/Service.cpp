@@ -126,6 +126,7 @@ class Service {
     void listen();
     void listenOn(const std::string& text);
     void refuseUnsafe(const ListenAddress& address) const;
+    HttpEvents events();
     bool speaksTls(const Listener& listener) const;
     std::unique_ptr<HttpServer> serverFor(const Listener& listener,
                                           const std::optional<TlsIdentity>& identity);
@@ -211,6 +212,20 @@ void Service::refuseUnsafe(const ListenAddress& address) const {
                                                "(--tls-cert, --tls-key) and --users");
 }
 
+HttpEvents Service::events() {
+    HttpEvents result;
+    result.answered = [this](const HttpRequest& request, const HttpResponse& response,
+                             std::chrono::nanoseconds took) {
+        if (response.status != 200) manager_.statistics().countRefusal();
+        accessLog_.answered(request, response, took);
+    };
+    result.cut = [this](const std::string& peer, const char* reason) {
+        manager_.statistics().countCut();
+        accessLog_.cut(peer, reason);
+    };
+    return result;
+}
+
 bool Service::speaksTls(const Listener& listener) const {
     return speaksTls_ && !listener.address.isPlain();
 }
@@ -222,7 +237,7 @@ std::unique_ptr<HttpServer> Service::serverFor(const Listener& listener,
     const bool tls = speaksTls(listener);
     try {
         return std::make_unique<HttpServer>(std::move(socket), cim_, options_.limits,
-                                            tls ? &*identity : nullptr, accessLog_.events());
+                                            tls ? &*identity : nullptr, events());
     } catch (const std::runtime_error& error) {
         if (!tls) throw;
         throw std::runtime_error(options_.certificate + ", " + options_.key + ": " + error.what());
@@ -298,6 +313,7 @@ void Service::logCounters() {
     log_.write(Priority::Info, "counters: operations " + std::to_string(counted.operations()) +
                                    ", failed " + std::to_string(counted.failures()) +
                                    ", requests refused " + std::to_string(counted.refusals()) +
+                                   ", connections cut " + std::to_string(counted.cuts()) +
                                    ", busy " + microseconds(counted.busyTime()) + "us, up " +
                                    microseconds(counted.upTime()) + "us, log lines lost " +
                                    std::to_string(log_.lost()));

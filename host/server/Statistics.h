@@ -21,9 +21,13 @@ class Statistics {
     /// Counts a request that was answered with an HTTP status other than 200.
     void countRefusal() noexcept { refusals_.fetch_add(1, std::memory_order_relaxed); }
 
+    /// Counts a connection that was refused, or cut with a request under way.
+    void countCut() noexcept { cuts_.fetch_add(1, std::memory_order_relaxed); }
+
     std::uint64_t operations() const noexcept { return operations_; }
     std::uint64_t failures() const noexcept { return failures_; }
     std::uint64_t refusals() const noexcept { return refusals_; }
+    std::uint64_t cuts() const noexcept { return cuts_; }
     /// The time that operations took, in sum.
     std::chrono::nanoseconds busyTime() const noexcept {
         return std::chrono::nanoseconds(nanoseconds_.load());
@@ -35,6 +39,7 @@ class Statistics {
     std::atomic<std::uint64_t> operations_ = 0;
     std::atomic<std::uint64_t> failures_ = 0;
     std::atomic<std::uint64_t> refusals_ = 0;
+    std::atomic<std::uint64_t> cuts_ = 0;
     std::atomic<std::uint64_t> nanoseconds_ = 0;
 };
 

@@ -6,6 +6,7 @@
 
 #include <array>
 #include <cerrno>
+#include <thread>
 
 #include "base/FileDescriptor.h"
 
@@ -56,7 +57,7 @@ std::string line(LogLevel level, unsigned status, unsigned cimStatus,
     response.cimStatus = cimStatus;
     response.operation = operation;
     response.user = user;
-    access.events().answered(request, response, std::chrono::microseconds(412));
+    access.answered(request, response, std::chrono::microseconds(412));
     return pipe.read();
 }
 
@@ -90,9 +91,9 @@ TEST(AccessLog, TellsComplaintsAndConnectionsThatWereCut) {
     Log log(pipe.writer(), LogLevel::Failures, true);
     std::vector<std::string> complaints = {"one", "two\nlines"};
     AccessLog access(log, [&] { return std::exchange(complaints, {}); });
-    access.events().answered({}, {}, std::chrono::nanoseconds(1));
-    access.events().cut("192.0.2.1", "header too slow");
-    access.events().cut("", "no descriptor");
+    access.answered({}, {}, std::chrono::nanoseconds(1));
+    access.cut("192.0.2.1", "header too slow");
+    access.cut("", "no descriptor");
     EXPECT_EQ(pipe.read(),
               "<4>cmpihost-serve: caught: one\n<4>cmpihost-serve: caught: two\\x0Alines\n"
               "<5>cmpihost-serve: 192.0.2.1 cut: header too slow\n"
@@ -100,6 +101,21 @@ TEST(AccessLog, TellsComplaintsAndConnectionsThatWereCut) {
     complaints.assign(100, "many");
     access.logComplaints();
     EXPECT_THAT(pipe.read(), EndsWith("many\n<4>cmpihost-serve: caught: 84 more\n"));
+}
+
+TEST(AccessLog, SumsUpConnectionsThatWereCutInAFlood) {
+    const LogPipe pipe;
+    Log log(pipe.writer(), LogLevel::Failures, false);
+    AccessLog access(log, &noComplaints, std::chrono::milliseconds(200));
+    for (int count = 0; count < 30; ++count) access.cut("::1", "late");
+    std::this_thread::sleep_for(std::chrono::milliseconds(210));
+    access.answered({}, {}, std::chrono::nanoseconds(1));
+    access.cut("::1", "later");
+    std::string expected;
+    for (int count = 0; count < 10; ++count) expected += "cmpihost-serve: ::1 cut: late\n";
+    EXPECT_EQ(pipe.read(), expected +
+                               "cmpihost-serve: 20 more connections cut\n"
+                               "cmpihost-serve: ::1 cut: later\n");
 }
 
 TEST(Log, CutsALongText) {
