@@ -100,12 +100,18 @@ bool isLiteralAddress(const std::string& host) {
     return inet_pton(AF_INET, host.c_str(), address.data()) == 1;
 }
 
+/// The port may be left out behind its colon.
+bool isPort(const std::string& text) {
+    return text.size() <= 5 && std::all_of(text.begin(), text.end(), base::isDigit);
+}
+
 /// Whether a Host header names this server. A browser that was told a foreign name for one of this
 /// machine's addresses sends that name.
 bool namesThisServer(const std::string& header, const std::vector<std::string>& names) {
-    const bool bracketed = header.substr(0, 1) == "[";
-    const auto port = header.find(':', bracketed ? header.find(']') : 0);
-    std::string host = header.substr(0, port);
+    const std::size_t bracket = header.substr(0, 1) == "[" ? header.find(']') : 0;
+    const auto colon = header.find(':', bracket);
+    std::string host = header.substr(0, colon);
+    if (colon != std::string::npos && !isPort(header.substr(colon + 1))) return false;
     if (!host.empty() && host.back() == '.') host.pop_back();
     return isLiteralAddress(host) || base::equalsIgnoreCase(host, "localhost") ||
            std::any_of(names.begin(), names.end(), [&host](const std::string& name) {
@@ -233,12 +239,6 @@ CimOverHttp::CimOverHttp(ObjectManager& manager, AccessControl& access, Options 
     : manager_(manager), access_(access), options_(std::move(options)) {}
 
 HttpResponse CimOverHttp::answer(const HttpRequest& request) {
-    HttpResponse response = responseTo(request);
-    if (response.status != 200) manager_.statistics().countRefusal();
-    return response;
-}
-
-HttpResponse CimOverHttp::responseTo(const HttpRequest& request) {
     if (auto refused = refusalOfMethodAndOrigin(request, options_.hostNames)) return *refused;
     // Which of two is meant, nobody can say.
     if (request.count("Authorization") > 1) return refusal(400);
@@ -246,6 +246,7 @@ HttpResponse CimOverHttp::responseTo(const HttpRequest& request) {
     if (!verdict.allowed) {
         HttpResponse response = refusal(401);
         response.headers.emplace_back("WWW-Authenticate", "Basic realm=\"cimom\"");
+        response.delay = verdict.delay;
         return response;
     }
     auto refused = refusalOfCimHeaders(request);

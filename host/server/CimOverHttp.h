@@ -2,6 +2,7 @@
 #define HOST_SERVER_CIM_OVER_HTTP_H
 
 #include <atomic>
+#include <chrono>
 #include <mutex>
 #include <optional>
 #include <string>
@@ -21,8 +22,10 @@ class AccessControl {
         bool allowed = false;
         /// Who it is; none: a client that need not say.
         std::optional<std::string> user{};
+        /// So long the client waits for a refusal.
+        std::chrono::milliseconds delay{0};
     };
-    /// Judges the header Authorization. May take its time over a wrong password.
+    /// Judges the header Authorization.
     virtual Verdict judge(const HttpRequest& request) = 0;
 
   protected:
@@ -49,7 +52,6 @@ class CimOverHttp final : public HttpHandler {
     HttpResponse answer(const HttpRequest& request) override;
 
   private:
-    HttpResponse responseTo(const HttpRequest& request);
     HttpResponse carriedOut(const HttpRequest& request, const std::optional<std::string>& user);
 
     ObjectManager& manager_;

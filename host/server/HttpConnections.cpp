@@ -2,6 +2,7 @@
 
 #include <sys/socket.h>
 
+#include <algorithm>
 #include <exception>
 #include <utility>
 #include <vector>
@@ -12,6 +13,8 @@ namespace {
 
 using std::chrono::nanoseconds;
 using Phase = HttpConnection::Phase;
+
+constexpr const char* newerTookItsPlace = "a newer connection took its place";
 
 const char* lateness(Phase phase) {
     switch (phase) {
@@ -24,11 +27,6 @@ const char* lateness(Phase phase) {
         default:
             return "the response was not taken in time";
     }
-}
-
-void cutConnection(HttpConnection& connection) {
-    connection.cut = true;
-    ::shutdown(connection.socket, SHUT_RDWR);
 }
 
 }  // namespace
@@ -46,27 +44,68 @@ bool HttpConnections::admit(int socket, const std::string& peer) {
         }
         const bool peerFull = peer != "unix" && ofPeer >= limits_.connectionsOfAnAddress;
         if (peerFull || all >= limits_.connections) {
-            HttpConnection* const replaced = longestWaiting(peer, peerFull);
+            HttpConnection* const replaced = replaceable(peer, peerFull);
             if (replaced == nullptr) return false;
             replacedPeer = replaced->peer;
-            cutConnection(*replaced);
+            cut(*replaced);
         }
         connections_[socket] = std::make_unique<HttpConnection>(socket, peer);
     }
-    if (!replacedPeer.empty()) tellCut(replacedPeer, "a newer connection took its place");
+    if (!replacedPeer.empty()) tellCut(replacedPeer, newerTookItsPlace);
     return true;
 }
 
-/// The connection that has waited longest for a request; null where all have one.
-HttpConnection* HttpConnections::longestWaiting(const std::string& peer, bool ofThatPeer) const {
-    HttpConnection* longest = nullptr;
+bool HttpConnections::makeRoom() {
+    std::string replacedPeer;
+    {
+        const std::lock_guard lock(mutex_);
+        // One at a time: what it had is free a little later.
+        if (std::any_of(connections_.begin(), connections_.end(),
+                        [](const auto& each) { return each.second->cut.load(); })) {
+            return true;
+        }
+        HttpConnection* const replaced = replaceable("", false);
+        if (replaced == nullptr) return false;
+        replacedPeer = replaced->peer;
+        cut(*replaced);
+    }
+    tellCut(replacedPeer, newerTookItsPlace);
+    return true;
+}
+
+/// The connection that has waited longest for a delayed response, else for a request; null for
+/// none. An address that is kept waiting gains nothing by connections of its own.
+HttpConnection* HttpConnections::replaceable(const std::string& peer, bool ofThatPeer) const {
+    HttpConnection* delayed = nullptr;
+    HttpConnection* waiting = nullptr;
     for (const auto& [number, each] : connections_) {
+        const bool samePeer = each->peer == peer;
+        if (each->cut || (ofThatPeer && !samePeer)) continue;
         const Phase phase = each->phase;
-        if (each->cut || (phase != Phase::Opening && phase != Phase::Idle)) continue;
-        if (ofThatPeer && each->peer != peer) continue;
+        const bool waits = phase == Phase::Opening || phase == Phase::Idle;
+        if (!waits && (phase != Phase::Delay || samePeer)) continue;
+        HttpConnection*& longest = waits ? waiting : delayed;
         if (longest == nullptr || each->since.load() < longest->since.load()) longest = each.get();
     }
-    return longest;
+    return delayed != nullptr ? delayed : waiting;
+}
+
+void HttpConnections::cut(HttpConnection& connection) {
+    connection.cut = true;
+    ::shutdown(connection.socket, SHUT_RDWR);
+    changed_.notify_all();
+}
+
+void HttpConnections::delay(HttpConnection& connection, std::chrono::milliseconds time) {
+    std::unique_lock lock(mutex_);
+    connection.enter(Phase::Delay);
+    changed_.wait_for(lock, time, [&] { return connection.cut || ending_; });
+}
+
+void HttpConnections::end() {
+    const std::lock_guard lock(mutex_);
+    ending_ = true;
+    changed_.notify_all();
 }
 
 HttpConnection* HttpConnections::find(int socket) {
@@ -92,7 +131,7 @@ bool HttpConnections::crowded() {
 }
 
 nanoseconds HttpConnections::allowance(Phase phase) const {
-    if (phase == Phase::Answer) return nanoseconds::max();
+    if (phase == Phase::Answer || phase == Phase::Delay) return nanoseconds::max();
     // Less for the last responses: whoever waits for the end does not wait as long as for a client.
     if (ending_) return phase == Phase::Response ? limits_.transfer / 2 : nanoseconds(-1);
     return phase == Phase::Idle ? limits_.idle : limits_.transfer;
@@ -109,7 +148,7 @@ void HttpConnections::cutLate() {
             const auto since = each->since.load();
             if (HttpConnection::Clock::now().time_since_epoch() - since <= allowance(phase))
                 continue;
-            cutConnection(*each);
+            cut(*each);
             if (!ending_ && phase != Phase::Idle) late.emplace_back(each->peer, lateness(phase));
         }
     }

@@ -3,6 +3,7 @@
 
 #include <atomic>
 #include <chrono>
+#include <condition_variable>
 #include <map>
 #include <memory>
 #include <mutex>
@@ -18,7 +19,7 @@ struct HttpConnection {
     using Clock = std::chrono::steady_clock;
 
     /// What it is at; Opening and Idle wait for a request line.
-    enum class Phase { Opening, Idle, Header, Body, Answer, Response };
+    enum class Phase { Opening, Idle, Header, Body, Answer, Delay, Response };
 
     HttpConnection(int socketNumber, std::string peerAddress)
         : socket(socketNumber), peer(std::move(peerAddress)) {}
@@ -53,16 +54,23 @@ class HttpConnections {
 
     /// Takes a new connection in; false where there are too many.
     bool admit(int socket, const std::string& peer);
+    /// Has the connection that has waited longest give way where descriptors or memory are short;
+    /// false where none is ending then.
+    bool makeRoom();
     /// The connection with that socket, null for none; it is there until remove().
     HttpConnection* find(int socket);
     /// Forgets a connection, before its socket is closed.
     void remove(int socket);
 
+    /// Lets the time pass, or less where the connection is cut or all of them end. A client that
+    /// leaves does not shorten it.
+    void delay(HttpConnection& connection, std::chrono::milliseconds time);
+
     /// Shuts the sockets of those that take too long, which makes their threads end them.
     void cutLate();
-    /// From now on those that wait for a request or are reading one are late, and responses have
-    /// half of their time.
-    void end() { ending_ = true; }
+    /// From now on those that wait for a request or are reading one are late, responses have half
+    /// of their time, and none is delayed.
+    void end();
     bool ending() const noexcept { return ending_; }
     bool none();
     /// Whether many that were cut have not ended yet.
@@ -73,12 +81,14 @@ class HttpConnections {
 
   private:
     std::chrono::nanoseconds allowance(HttpConnection::Phase phase) const;
-    HttpConnection* longestWaiting(const std::string& peer, bool ofThatPeer) const;
+    HttpConnection* replaceable(const std::string& peer, bool ofThatPeer) const;
+    void cut(HttpConnection& connection);
 
     const HttpLimits& limits_;
     const HttpEvents& events_;
     std::atomic<bool> ending_ = false;
     std::mutex mutex_;
+    std::condition_variable changed_;
     std::map<int, std::unique_ptr<HttpConnection>> connections_;
 };
 

@@ -177,6 +177,9 @@ MHD_Result HttpLibrary::take(MHD_Connection* library, HttpConnection& connection
     connection.asked = HttpConnection::Clock::now();
     connection.enter(Phase::Answer);
     connection.response = answerTo(connection.request);
+    if (connection.response.delay.count() > 0) {
+        connections_.delay(connection, connection.response.delay);
+    }
     // Programs differ in what they take for the end of a chunk: nothing after it is a request.
     if (connection.request.header("Transfer-Encoding") != nullptr) connection.response.close = true;
     return respond(library, connection);

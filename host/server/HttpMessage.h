@@ -1,6 +1,7 @@
 #ifndef HOST_SERVER_HTTP_MESSAGE_H
 #define HOST_SERVER_HTTP_MESSAGE_H
 
+#include <chrono>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -34,6 +35,9 @@ struct HttpResponse {
     std::string body{};
     /// The connection ends after it.
     bool close = false;
+    /// So long the client waits for it. Meanwhile the connection gives way to one of another
+    /// address, where all are taken.
+    std::chrono::milliseconds delay{0};
     /// For the access log: the operation, empty for none, and the CIM status of a response 200.
     std::string operation{};
     unsigned cimStatus = 0;

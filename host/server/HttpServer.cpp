@@ -75,6 +75,7 @@ class HttpServer::Daemon {
     void tend();
     milliseconds pause();
     void acceptAll();
+    bool somebodyWaits();
     void take(base::FileDescriptor socket, const sockaddr_storage& address, socklen_t length);
     void refuse(base::FileDescriptor socket, const std::string& peer);
 
@@ -87,6 +88,8 @@ class HttpServer::Daemon {
     base::FileDescriptor listener_;
     /// No descriptor was free the last time.
     bool acceptFailed_ = false;
+    /// A connection ends for the one that could not be accepted.
+    bool roomComes_ = false;
     HttpLibrary library_;
     std::thread thread_;
 };
@@ -146,7 +149,7 @@ milliseconds HttpServer::Daemon::pause() {
     constexpr milliseconds untilSomeEnd(2);
     if (connections_.ending()) return shortest;
     if (connections_.crowded()) return untilSomeEnd;
-    if (acceptFailed_) return afterFailure;
+    if (acceptFailed_) return roomComes_ ? untilSomeEnd : afterFailure;
     if (connections_.none()) return milliseconds(-1);
     return std::clamp(std::min(limits_.transfer, limits_.idle) / 10, shortest, longest);
 }
@@ -164,14 +167,23 @@ void HttpServer::Daemon::acceptAll() {
         }
         if (!socket.isOpen()) {
             if (errno == ECONNABORTED || errno == EINTR) continue;
-            const bool failed = errno != EAGAIN;
-            if (failed && !acceptFailed_) connections_.tellCut("", std::strerror(errno));
+            const int error = errno;
+            const bool failed = error != EAGAIN && somebodyWaits();
+            if (failed && !acceptFailed_) connections_.tellCut("", std::strerror(error));
             acceptFailed_ = failed;
+            roomComes_ = failed && connections_.makeRoom();
             return;
         }
         acceptFailed_ = false;
         take(std::move(socket), address, length);
     }
+}
+
+/// Without a free descriptor accept fails whether or not there is a connection.
+bool HttpServer::Daemon::somebodyWaits() {
+    const std::lock_guard lock(listenerMutex_);
+    pollfd source{listener_.number(), POLLIN, 0};
+    return ::poll(&source, 1, 0) == 1;
 }
 
 void HttpServer::Daemon::take(base::FileDescriptor socket, const sockaddr_storage& address,

@@ -46,7 +46,8 @@ struct TlsIdentity {
 
 /// An HTTP/1.1 server on one listening socket (IPv4, IPv6 or unix), with a thread for each
 /// connection. Where all connections are taken, a new one replaces the one that has waited longest
-/// for a request. Any thread may call it, one at a time, but none that answers a request.
+/// for a delayed response, else for a request. Any thread may call it, one at a time, but none that
+/// answers a request.
 class HttpServer {
   public:
     /// Starts to serve. `tls` null: without TLS; it is read here only. The handler outlives the

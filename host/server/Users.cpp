@@ -13,7 +13,6 @@
 #include <stdexcept>
 #include <string_view>
 #include <system_error>
-#include <thread>
 #include <utility>
 
 #include "base/Ascii.h"
@@ -225,8 +224,7 @@ bool Users::accept(const std::string& name, const std::string& password, std::st
 
 AccessControl::Verdict Users::refuse(const std::string& peer, const std::string& what) {
     log_.write(Priority::Warning, peer + ": refused: " + what);
-    std::this_thread::sleep_for(countFailure(peer));
-    return {};
+    return {false, std::nullopt, countFailure(peer)};
 }
 
 std::chrono::milliseconds Users::countFailure(const std::string& peer) {

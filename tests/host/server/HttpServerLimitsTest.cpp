@@ -141,6 +141,46 @@ TEST(HttpServerLimits, ReplaceTheConnectionThatHasWaitedLongest) {
                                            "127.0.0.1: a newer connection took its place"));
 }
 
+TEST(HttpServerLimits, DelayAResponse) {
+    HttpTestServer tested;
+    const auto start = HttpTestClock::now();
+    HttpTestClient client(tested.port());
+    client.send(httpPost("/delay"));
+    EXPECT_THAT(client.receive(), EndsWith("\r\n\r\n/delay 0"));
+    EXPECT_GE(HttpTestClock::now() - start, tested.handler.delay);
+}
+
+TEST(HttpServerLimits, LetDelayedResponsesHoldUpNobodyButTheirOwnAddress) {
+    HttpLimits limits;
+    limits.connections = 3;
+    limits.connectionsOfAnAddress = 2;
+    HttpTestServer tested(limits);
+    tested.handler.delay = std::chrono::seconds(60);
+    HttpTestClient kept(tested.port(), "127.0.0.3");
+    kept.send(httpPost("/a"));
+    kept.receive();
+    HttpTestClient first(tested.port(), "127.0.0.2");
+    HttpTestClient second(tested.port(), "127.0.0.2");
+    for (HttpTestClient* client : {&first, &second}) client->send(httpPost("/delay"));
+    tested.handler.await(3);
+    // Neither more connections nor leaving early helps the address that has to wait.
+    second.reset();
+    for (int i = 0; i < 3; ++i) {
+        HttpTestClient third(tested.port(), "127.0.0.2");
+        EXPECT_THAT(third.receiveAll(), StartsWith("HTTP/1.1 503 "));
+    }
+    EXPECT_FALSE(first.hasEnded());
+    EXPECT_TRUE(soon([&] {
+        HttpTestClient other(tested.port(), "127.0.0.4");
+        other.send(httpPost("/b"));
+        return other.receive().substr(0, 12) == "HTTP/1.1 200";
+    }));
+    EXPECT_FALSE(kept.hasEnded());
+    const auto start = HttpTestClock::now();
+    tested.server.reset();
+    EXPECT_LT(HttpTestClock::now() - start, std::chrono::seconds(1));
+}
+
 TEST(HttpServerLimits, RefuseConnectionsWhereAllHaveRequests) {
     HttpLimits limits;
     limits.connections = 3;
@@ -208,24 +248,40 @@ TEST(HttpServerLimits, SurviveClientsThatLeaveAtAnyByte) {
 
 TEST(HttpServerLimits, WaitForADescriptorWhereNoneIsFree) {
     HttpTestServer tested;
-    HttpTestClient kept(tested.port());
-    kept.send(httpPost("/a"));
-    kept.receive();
+    HttpTestClient busy(tested.port());
+    busy.send(httpPost("/wait"));
+    tested.handler.await(1);
     std::deque<HttpTestClient> unserved;
     {
-        base::FileDescriptor next(::dup(kept.socket()));
+        base::FileDescriptor next(::dup(busy.socket()));
         // The client has a descriptor, its connection gets none.
         const DescriptorLimit none(static_cast<rlim_t>(next.number()) + 1);
         next.reset();
         unserved.emplace_back(tested.port()).send(httpPost("/later"));
         EXPECT_TRUE(soon([&] { return !tested.cuts().empty(); }));
-        kept.send(httpPost("/b"));
-        EXPECT_THAT(kept.receive(), EndsWith("\r\n\r\n/b 0"));
         std::this_thread::sleep_for(milliseconds(120));
         EXPECT_FALSE(unserved.back().hasEnded());
+        tested.handler.open();
+        EXPECT_THAT(busy.receive(), EndsWith("\r\n\r\n/wait 0"));
     }
     EXPECT_THAT(unserved.back().receive(), EndsWith("\r\n\r\n/later 0"));
     EXPECT_THAT(tested.cuts(), ElementsAre(": Too many open files"));
+}
+
+TEST(HttpServerLimits, ReplaceConnectionsWhereNoDescriptorIsFree) {
+    HttpTestServer tested;
+    HttpTestClient idle(tested.port());
+    idle.send(httpPost("/a"));
+    idle.receive();
+    base::FileDescriptor next(::dup(idle.socket()));
+    const DescriptorLimit none(static_cast<rlim_t>(next.number()) + 1);
+    next.reset();
+    HttpTestClient newer(tested.port());
+    newer.send(httpPost("/b"));
+    EXPECT_THAT(newer.receive(), EndsWith("\r\n\r\n/b 0"));
+    EXPECT_TRUE(idle.hasEnded());
+    EXPECT_THAT(tested.cuts(), ElementsAre("127.0.0.1: a newer connection took its place",
+                                           ": Too many open files"));
 }
 
 }  // namespace

@@ -135,6 +135,7 @@ HttpResponse PlainHandler::answer(const HttpRequest& request) {
     changed_.notify_all();
     if (request.target == "/throw") throw std::bad_alloc();
     if (request.target == "/wait") changed_.wait(lock, [this] { return isOpen_; });
+    if (request.target == "/delay") response.delay = delay;
     if (request.target == "/big") response.body.assign(std::size_t{8} << 20U, 'x');
     return response;
 }

@@ -56,9 +56,12 @@ class HttpTestClient {
 std::string httpPost(const std::string& target, const std::string& body = {});
 
 /// Answers "TARGET BYTES", the bytes of the body. /wait waits until open() was called, /throw
-/// throws, /big answers 8 MiB.
+/// throws, /big answers 8 MiB, /delay delays its answer.
 class PlainHandler final : public HttpHandler {
   public:
+    /// To be set before the first request.
+    std::chrono::milliseconds delay{50};
+
     HttpResponse answer(const HttpRequest& request) override;
     void open();
     /// Waits until that many requests have come.
