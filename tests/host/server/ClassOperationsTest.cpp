@@ -56,9 +56,7 @@ const std::string deepInheritance = value("DeepInheritance", "TRUE");
 const std::string wholeClass = value("LocalOnly", "FALSE") + value("IncludeClassOrigin", "TRUE");
 
 TEST(ClassOperations, GetClassTellsAllOfAShippedClass) {
-    for (const char* name :
-         {"KORVA_ComputerSystem", "KORVA_InstalledOS", "KORVA_OSElementCapabilities",
-          "KORVA_OperatingSystem", "KORVA_OperatingSystemCapabilities", "KORVA_RunningOS"}) {
+    for (const char* name : {"KORVA_OperatingSystem", "KORVA_RunningOS"}) {
         expectGolden(
             std::string(KORVA_TEST_DATA "/classes/") + name + ".xml",
             elementsOf(classAnswer("GetClass", className("ClassName", name), "root/cimv2")));
@@ -66,7 +64,7 @@ TEST(ClassOperations, GetClassTellsAllOfAShippedClass) {
 }
 
 TEST(ClassOperations, GetClassTellsWhatAClassOfTheInteropNamespaceInherits) {
-    for (const char* name : {"KORVA_ObjectManager", "CIM_Namespace", "__Namespace"}) {
+    for (const char* name : {"KORVA_ObjectManager", "__Namespace"}) {
         expectGolden(std::string(KORVA_TEST_DATA "/classes/") + name + ".xml",
                      elementsOf(classAnswer("GetClass", className("ClassName", name) + wholeClass,
                                             "root/interop")));
