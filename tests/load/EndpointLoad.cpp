@@ -53,12 +53,12 @@ void print(const char* when, const EndpointProcess::State& state) {
 // turn: memory is steady once a turn leaves it as it was, give or take what the allocator keeps.
 bool staysSteady(const EndpointProcess& endpoint, EndpointClients& clients,
                  const Options& options) {
-    constexpr int turns = 4;
+    constexpr unsigned long turns = 4;
     constexpr long grain = 256;
     clients.run(options.settle);
     EndpointProcess::State before = endpoint.state();
     print("settled", before);
-    for (int turn = 1; turn <= turns; ++turn) {
+    for (unsigned long turn = 1; turn <= turns; ++turn) {
         clients.run(options.requests);
         const EndpointProcess::State after = endpoint.state();
         print(("after " + std::to_string(options.requests * turn) + " requests more").c_str(),
