@@ -1,12 +1,10 @@
 #include "host/server/Service.h"
 
-#include <fcntl.h>
 #include <pthread.h>
 #include <signal.h>
 #include <sys/utsname.h>
 #include <unistd.h>
 
-#include <algorithm>
 #include <future>
 #include <memory>
 #include <optional>
@@ -17,8 +15,7 @@
 #include "host/InstallPaths.h"
 #include "host/server/AccessLog.h"
 #include "host/server/CimOverHttp.h"
-#include "host/server/ConfigurationFile.h"
-#include "host/server/ListenAddress.h"
+#include "host/server/Listeners.h"
 #include "host/server/ObjectManager.h"
 #include "host/server/ServiceManager.h"
 #include "host/server/Users.h"
@@ -114,103 +111,33 @@ class Service {
     ServiceStatus run();
 
   private:
-    struct Listener {
-        ListenAddress address;
-        /// Stays open while servers come and go.
-        base::FileDescriptor socket;
-        bool isPassed = false;
-        std::unique_ptr<HttpServer> server{};
-    };
-
-    std::optional<TlsIdentity> readIdentity() const;
-    void listen();
-    void listenOn(const std::string& text);
-    void refuseUnsafe(const ListenAddress& address) const;
     HttpEvents events();
-    bool speaksTls(const Listener& listener) const;
-    std::unique_ptr<HttpServer> serverFor(const Listener& listener,
-                                          const std::optional<TlsIdentity>& identity);
     void reload();
     template <class Read>
     void readAgain(const char* what, const Read& read);
-    void replaceIdentity();
-    void retire(std::unique_ptr<HttpServer> server);
     void logCounters();
     void stop();
 
     const ServiceOptions& options_;
     Log& log_;
-    const bool speaksTls_;
     ObjectManager manager_;
     /// Null: nobody is asked for a password.
     std::unique_ptr<Users> users_;
     Everybody everybody_;
     CimOverHttp cim_;
     AccessLog accessLog_;
-    std::vector<Listener> listeners_;
-    /// Servers that end with the connections that they have.
-    std::vector<std::future<void>> retired_;
+    Listeners listeners_;
 };
 
 Service::Service(const ServiceOptions& options, const fs::path& programFolder, Log& log)
     : options_(options),
       log_(log),
-      speaksTls_(!options.certificate.empty()),
       manager_(managerSetup(options, programFolder, log)),
       users_(options.users.empty() ? nullptr : std::make_unique<Users>(options.users, log)),
       cim_(manager_, users_ ? static_cast<AccessControl&>(*users_) : everybody_,
            httpOptions(options)),
-      accessLog_(log, [this] { return manager_.takeComplaints(); }) {
-    const std::optional<TlsIdentity> identity = readIdentity();
-    listen();
-    for (Listener& listener : listeners_) listener.server = serverFor(listener, identity);
-}
-
-/// Absent: no TLS.
-std::optional<TlsIdentity> Service::readIdentity() const {
-    if (!speaksTls_) return std::nullopt;
-    return TlsIdentity{readConfigurationFile(options_.certificate, false),
-                       readConfigurationFile(options_.key, true)};
-}
-
-void Service::listen() {
-    for (base::FileDescriptor& socket : takePassedSockets()) {
-        const ListenAddress address = ListenAddress::of(socket.number());
-        refuseUnsafe(address);
-        listeners_.push_back({address, std::move(socket), true});
-    }
-    for (const std::string& text : options_.listen) listenOn(text);
-    if (listeners_.empty()) listenOn(speaksTls_ ? "localhost:5989" : "localhost:5988");
-}
-
-void Service::listenOn(const std::string& text) {
-    for (const ListenAddress& address : ListenAddress::read(text)) {
-        refuseUnsafe(address);
-        try {
-            base::FileDescriptor socket = address.listen();
-            const ListenAddress bound = address.at(socket.number());
-            listeners_.push_back({bound, std::move(socket)});
-        } catch (const std::system_error& error) {
-            const bool noFamily = error.code() == std::errc::address_family_not_supported ||
-                                  error.code() == std::errc::address_not_available;
-            if (!address.isOptional() || !noFamily)
-                throw ServiceError(serviceFailed, std::string("cannot listen on ") + error.what());
-        }
-    }
-}
-
-void Service::refuseUnsafe(const ListenAddress& address) const {
-    if (address.isLocal()) return;
-    if (address.isPlain())
-        throw ServiceError(serviceRefused, address.text() +
-                                               " can be reached from other hosts: plain: is for "
-                                               "loopback addresses");
-    const bool safe = speaksTls_ && !options_.users.empty();
-    if (!safe)
-        throw ServiceError(serviceRefused, address.text() +
-                                               " can be reached from other hosts: this takes TLS "
-                                               "(--tls-cert, --tls-key) and --users");
-}
+      accessLog_(log, [this] { return manager_.takeComplaints(); }),
+      listeners_(options, cim_, events()) {}
 
 HttpEvents Service::events() {
     HttpEvents result;
@@ -226,31 +153,9 @@ HttpEvents Service::events() {
     return result;
 }
 
-bool Service::speaksTls(const Listener& listener) const {
-    return speaksTls_ && !listener.address.isPlain();
-}
-
-/// Throws std::runtime_error.
-std::unique_ptr<HttpServer> Service::serverFor(const Listener& listener,
-                                               const std::optional<TlsIdentity>& identity) {
-    base::FileDescriptor socket(fcntl(listener.socket.number(), F_DUPFD_CLOEXEC, 0));
-    const bool tls = speaksTls(listener);
-    try {
-        return std::make_unique<HttpServer>(std::move(socket), cim_, options_.limits,
-                                            tls ? &*identity : nullptr, events());
-    } catch (const std::runtime_error& error) {
-        if (!tls) throw;
-        throw std::runtime_error(options_.certificate + ", " + options_.key + ": " + error.what());
-    }
-}
-
 ServiceStatus Service::run() {
-    for (const Listener& listener : listeners_) {
-        const char* const scheme = listener.address.isUnix() ? ""
-                                   : speaksTls(listener)     ? "https://"
-                                                             : "http://";
-        log_.write(Priority::Info, "listening on " + (scheme + listener.address.text()));
-    }
+    for (const std::string& url : listeners_.urls())
+        log_.write(Priority::Info, "listening on " + url);
     notifyServiceManager("READY=1");
     const sigset_t signals = handledSignals();
     for (;;) {
@@ -267,7 +172,8 @@ ServiceStatus Service::run() {
 void Service::reload() {
     notifyServiceManager(reloadingState());
     if (users_) readAgain("users", [this] { users_->reload(); });
-    if (speaksTls_) readAgain("certificate and key", [this] { replaceIdentity(); });
+    if (!options_.certificate.empty())
+        readAgain("certificate and key", [this] { listeners_.replaceIdentity(); });
     notifyServiceManager("READY=1");
 }
 
@@ -280,29 +186,6 @@ void Service::readAgain(const char* what, const Read& read) {
     } catch (const std::exception& error) {
         log_.write(Priority::Error, std::string("kept ") + what + ": " + error.what());
     }
-}
-
-/// New connections are served with the new certificate, requests that run are answered with the old
-/// one. Throws std::runtime_error where the new one does not serve, and changes nothing then.
-void Service::replaceIdentity() {
-    const std::optional<TlsIdentity> identity = readIdentity();
-    std::vector<std::unique_ptr<HttpServer>> servers;
-    for (const Listener& listener : listeners_)
-        servers.push_back(speaksTls(listener) ? serverFor(listener, identity) : nullptr);
-    for (std::size_t place = 0; place < servers.size(); ++place) {
-        if (servers[place])
-            retire(std::exchange(listeners_[place].server, std::move(servers[place])));
-    }
-}
-
-void Service::retire(std::unique_ptr<HttpServer> server) {
-    const auto isDone = [](const std::future<void>& each) {
-        return each.wait_for(std::chrono::seconds(0)) == std::future_status::ready;
-    };
-    retired_.erase(std::remove_if(retired_.begin(), retired_.end(), isDone), retired_.end());
-    server->stopListening();
-    retired_.push_back(
-        std::async(std::launch::async, [ending = std::move(server)]() mutable { ending.reset(); }));
 }
 
 void Service::logCounters() {
@@ -322,11 +205,7 @@ void Service::logCounters() {
 void Service::stop() {
     notifyServiceManager("STOPPING=1");
     const Deadline deadline(lastRequests, log_);
-    for (Listener& listener : listeners_) {
-        retire(std::move(listener.server));
-        if (!listener.isPassed) listener.address.removeFile();
-    }
-    retired_.clear();
+    listeners_.stop();
     manager_.unload();
     accessLog_.logComplaints();
 }

@@ -168,7 +168,7 @@ class Hostile(unittest.TestCase):
             for _ in range(50):
                 client.returned("EnumerateInstances", "root/test", ClassName=PART)
         self.await_state(lambda: self.endpoint.threads() == self.idle_threads)
-        before = self.endpoint.descriptors(), self.endpoint.threads()
+        before = self.settled_state()
         resident = self.endpoint.resident()
         self.addCleanup(self.assert_as_before, before, resident)
         good = self.enterContext(GoodClient(self.endpoint.port))
@@ -185,11 +185,22 @@ class Hostile(unittest.TestCase):
         self.assertLess(good.longest, 1)
         self.assertGreater(good.answers, 2)
 
+    def state(self):
+        return self.endpoint.descriptors(), self.endpoint.threads()
+
+    def settled_state(self):
+        """The state once it has held for a tenth of a second: sockets are closed after their threads ended."""
+        state, since = self.state(), time.monotonic()
+        deadline = since + 5
+        while time.monotonic() < min(since + 0.1, deadline):
+            time.sleep(0.01)
+            if self.state() != state:
+                state, since = self.state(), time.monotonic()
+        return state
+
     def assert_as_before(self, before, resident):
-        def state():
-            return self.endpoint.descriptors(), self.endpoint.threads()
-        self.await_state(lambda: state() == before)
-        self.assertEqual(state(), before)
+        self.await_state(lambda: self.state() == before)
+        self.assertEqual(self.state(), before)
         if MEMORY_COUNTS:
             self.assertLess(self.endpoint.resident(), resident + 6144)
 
