@@ -76,7 +76,9 @@ bool staysSteady(const EndpointProcess& endpoint, EndpointClients& clients,
 
 int main(int count, char** arguments) try {
     const Options options = parse({arguments + 1, arguments + count});
-    EndpointProcess endpoint(options.program);
+    // Room for the connection of before, which may end a little later.
+    EndpointProcess endpoint(options.program,
+                             {"--connections", std::to_string(options.connections + 16)});
     const EndpointProcess::State idle = endpoint.state();
     print("started", idle);
     const auto started = std::chrono::steady_clock::now();
